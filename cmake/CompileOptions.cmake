@@ -1,0 +1,10 @@
+# What every target of this project is compiled with.
+add_library(zor_compile_options INTERFACE)
+target_compile_options(zor_compile_options INTERFACE
+  -Wall -Wextra -Wpedantic -Wshadow -Wnon-virtual-dtor -Wold-style-cast -Wcast-qual
+  -ffp-contract=off  # so that results repeat on every processor
+  $<$<BOOL:${ZOR_WARNINGS_AS_ERRORS}>:-Werror>)
+if(ZOR_SANITIZE)
+  add_compile_options(-fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)
+  add_link_options(-fsanitize=address,undefined)
+endif()

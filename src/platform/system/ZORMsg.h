@@ -1,0 +1,21 @@
+// One message of a catalogue.
+#ifndef ZOR_PLATFORM_SYSTEM_ZORMSG_H
+#define ZOR_PLATFORM_SYSTEM_ZORMSG_H
+
+#include "ZORPlatformExport.h"
+#include "platform/system/ZORUnicodeString.h"
+
+/// A message text that may hold the places /p1 to /p9 for parameters ("//" is a slash).
+class ZOR_PLATFORM_EXPORT ZORMsg {
+ public:
+  ZORMsg();
+  explicit ZORMsg(const ZORUnicodeString& inText);
+  /// @param inParameters inCount texts, or null for none; a place without parameter stays empty.
+  ZORUnicodeString BuildMessage(const ZORUnicodeString* inParameters = nullptr,
+                                int inCount = 0) const;
+
+ private:
+  ZORUnicodeString text_;
+};
+
+#endif

@@ -1,0 +1,34 @@
+// A handle of a document.
+#ifndef ZOR_PLATFORM_XML_DOM_DOCUMENT_H
+#define ZOR_PLATFORM_XML_DOM_DOCUMENT_H
+
+#include "platform/xml/DOM_Element.h"
+
+/// A document lives as long as a handle of it, of one of its nodes or of one of its strings. Nodes
+/// that were made but never put into the tree go when their last handle goes; nodes that were taken
+/// out of it go with the document.
+class ZOR_PLATFORM_EXPORT DOM_Document : public DOM_Node {
+ public:
+  DOM_Document();
+  /// A cast: null when the node is not a document.
+  explicit DOM_Document(const DOM_Node& inNode);
+  /// A new document without a root.
+  static DOM_Document createDocument();
+
+  DOM_Element getDocumentElement() const;  ///< the root element, null when there is none
+  DOM_Node getDoctype() const;             ///< null when there is none
+
+  // New nodes of this document, without parent. A name that XML does not allow raises
+  // INVALID_CHARACTER_ERR.
+  DOM_Element createElement(const DOMString& inName);
+  DOM_Node createTextNode(const DOMString& inText);
+  DOM_Node createCDATASection(const DOMString& inText);
+  DOM_Node createComment(const DOMString& inText);
+  DOM_Node createProcessingInstruction(const DOMString& inTarget, const DOMString& inData);
+  DOM_Node createDocumentFragment();
+  /// A copy, in this document, of a node of any document (this one too); without parent. The source
+  /// is not changed. Raises NOT_SUPPORTED_ERR for a document or a document type.
+  DOM_Node importNode(const DOM_Node& inNode, bool inDeep);
+};
+
+#endif
