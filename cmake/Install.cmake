@@ -1,1 +1,52 @@
-# What is installed, and how other projects find it.
+# What is installed, and how other projects find it. The installed tree can be moved as a whole: nothing in it holds an
+# absolute path.
+include(CMakePackageConfigHelpers)
+
+set(headerDir ${CMAKE_INSTALL_INCLUDEDIR}/ZORLyra)
+set(packageDir ${CMAKE_INSTALL_LIBDIR}/cmake/ZORLyra)
+set(noNetworkDir ${CMAKE_INSTALL_LIBDIR}/ZORLyra/no-network)
+
+# The default platform looks for its resources beside its own directory, in ../share/ZORLyra.
+cmake_path(GET CMAKE_INSTALL_LIBDIR PARENT_PATH libraryParent)
+set(resourceDir share/ZORLyra)
+if(libraryParent)
+  set(resourceDir ${libraryParent}/share/ZORLyra)
+endif()
+
+file(RELATIVE_PATH binToLib /prefix/${CMAKE_INSTALL_BINDIR} /prefix/${CMAKE_INSTALL_LIBDIR})
+set_target_properties(ZORLyra ZORDefaultPlatform PROPERTIES INSTALL_RPATH "$ORIGIN")
+
+install(TARGETS ZORPlatformDeclarations ZORDefaultPlatform ZORLyra EXPORT ZORLyraTargets
+  RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR}
+  LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
+  ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR})
+if(TARGET lyra)
+  # The directory of the network's stand-in comes first, so that libcurl is never found.
+  set_target_properties(lyra PROPERTIES
+    INSTALL_RPATH "$ORIGIN/${binToLib}/ZORLyra/no-network;$ORIGIN/${binToLib}")
+  install(TARGETS lyra RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+endif()
+get_target_property(noNetworkType lyra_no_network TYPE)
+if(noNetworkType STREQUAL "SHARED_LIBRARY")
+  install(TARGETS lyra_no_network LIBRARY DESTINATION ${noNetworkDir} NAMELINK_SKIP)
+endif()
+
+install(DIRECTORY include/ DESTINATION ${headerDir} FILES_MATCHING PATTERN "*.h")
+install(DIRECTORY src/platform/ DESTINATION ${headerDir}/platform FILES_MATCHING PATTERN "*.h")
+install(FILES ${PROJECT_BINARY_DIR}/generated/ZORLyraExport.h ${PROJECT_BINARY_DIR}/generated/ZORPlatformExport.h
+  DESTINATION ${headerDir})
+install(DIRECTORY resources/ DESTINATION ${resourceDir} OPTIONAL)
+
+install(EXPORT ZORLyraTargets NAMESPACE ZORLyra:: DESTINATION ${packageDir})
+configure_package_config_file(cmake/ZORLyraConfig.cmake.in ${PROJECT_BINARY_DIR}/generated/ZORLyraConfig.cmake
+  INSTALL_DESTINATION ${packageDir})
+write_basic_package_version_file(${PROJECT_BINARY_DIR}/generated/ZORLyraConfigVersion.cmake
+  COMPATIBILITY SameMinorVersion)
+install(FILES ${PROJECT_BINARY_DIR}/generated/ZORLyraConfig.cmake
+  ${PROJECT_BINARY_DIR}/generated/ZORLyraConfigVersion.cmake
+  DESTINATION ${packageDir})
+
+file(RELATIVE_PATH pcToPrefix /prefix/${CMAKE_INSTALL_LIBDIR}/pkgconfig /prefix)
+string(REGEX REPLACE "/$" "" pcToPrefix "${pcToPrefix}")
+configure_file(cmake/zorlyra.pc.in ${PROJECT_BINARY_DIR}/generated/zorlyra.pc @ONLY)
+install(FILES ${PROJECT_BINARY_DIR}/generated/zorlyra.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)
