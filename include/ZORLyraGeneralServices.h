@@ -1,0 +1,64 @@
+// Conversions between documents and texts, lengths, and logical names.
+#ifndef ZOR_LYRA_GENERAL_SERVICES_H
+#define ZOR_LYRA_GENERAL_SERVICES_H
+
+#include "ZORLyraExport.h"
+#include "platform/mathematics/ZORMathPointf.h"
+#include "platform/mathematics/ZORMathVectorf.h"
+#include "platform/system/ZORUnicodeString.h"
+#include "platform/xml/DOM_Document.h"
+
+/// Services that every reader and writer uses. Only static operations; nothing is kept between two
+/// calls. None reports a failure by a code or an error of its own.
+class ZOR_LYRA_EXPORT ZORLyraGeneralServices {
+ public:
+  ZORLyraGeneralServices() = delete;
+
+  // From a document
+  /// The value of an attribute; empty when the attribute is missing or the node is null or has no
+  /// attributes.
+  static ZORUnicodeString GetAttrOnNode(DOM_Node inNode, const char* inName);
+  /// The text of a DOM string; empty for a null one.
+  static ZORUnicodeString GetDOMName(DOMString inText);
+  /// The tag name of an element; empty for a null one.
+  static ZORUnicodeString GetDOMName(DOM_Element inElement);
+  /// The name of a node of any kind; empty for a null one.
+  static ZORUnicodeString GetDOMName(DOM_Node inNode);
+
+  // Towards a document
+  /// The number as decimal text ("%i").
+  static DOMString GetDOMString(int inNumber);
+  /// The number in fixed notation with six decimals ("%f"), however large it is.
+  static DOMString GetDOMString(double inNumber);
+  /// The narrow form of a text: what the narrow character set cannot carry is carried as that
+  /// conversion gives it.
+  static DOMString GetDOMString(ZORUnicodeString inText);
+  /// A new element of the document, not attached, with the attributes "Ux", "Uy" and "Uz" in this
+  /// order, each with six decimals. Raises what the document raises for a name that is none or a
+  /// null document.
+  static DOM_Element GetDOMVector(ZORUnicodeString inName, DOM_Document inDocument,
+                                  ZORMathPointf inPoint);
+  /// The same for a vector, with the same attribute names.
+  static DOM_Element GetDOMVector(ZORUnicodeString inName, DOM_Document inDocument,
+                                  ZORMathVectorf inVector);
+
+  // Lengths
+  /// A length such as "0.5m" or "25 mm" in millimetres; a bare number is in millimetres already.
+  /// @return the length; -1.0 when the platform knows no magnitude "LENGTH" or no unit for it; -0.1
+  ///         when the text cannot be read. A genuine negative length cannot be told from these.
+  static double ConvertValueInMM(ZORUnicodeString inValue);
+
+  // Logical names
+  /// The directory of a logical name of a document location.
+  /// A name that holds "ZORDLN://" is looked up without its first nine characters, and one that
+  /// does not begin with an ASCII character above 0x01 without its first three; then a failed
+  /// look-up gives the empty string. Any other name that is not in the table comes back unchanged.
+  /// An expansion that fails gives the empty string.
+  static ZORUnicodeString TransformFromDLName(ZORUnicodeString inName);
+  /// The path that a reference such as "ZORDLN://NAME\folder\file" stands for.
+  /// @return the reference itself when it holds no "ZORDLN://" (text before it is dropped); the
+  ///         empty string for an unknown name; "error" when the directory cannot be expanded.
+  static ZORUnicodeString TransformPathnameFromDLName(ZORUnicodeString inReference);
+};
+
+#endif

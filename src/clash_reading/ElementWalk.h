@@ -1,0 +1,38 @@
+// Walking the element children of a node by name.
+#ifndef ZOR_CLASH_READING_ELEMENT_WALK_H
+#define ZOR_CLASH_READING_ELEMENT_WALK_H
+
+#include "ZORLyraGeneralServices.h"
+#include "platform/xml/DOM_Node.h"
+
+/// Whether a node is an element of a name; the name is a ZORUnicodeString or ASCII text.
+template <class NameText>
+bool IsElementNamed(const DOM_Node& inNode, const NameText& inName) {
+  return inNode.getNodeType() == DOM_Node::ELEMENT_NODE &&
+         ZORLyraGeneralServices::GetDOMName(inNode) == inName;
+}
+
+/// Calls inVisit for each child node of a parent in document order.
+template <class Visit>
+void ForEachChild(const DOM_Node& inParent, const Visit& inVisit) {
+  for (DOM_Node child = inParent.getFirstChild(); !child.isNull(); child = child.getNextSibling())
+    inVisit(child);
+}
+
+/// Calls inVisit for each child element of a name in document order.
+template <class NameText, class Visit>
+void ForEachElement(const DOM_Node& inParent, const NameText& inName, const Visit& inVisit) {
+  ForEachChild(inParent, [&](const DOM_Node& inChild) {
+    if (IsElementNamed(inChild, inName)) inVisit(inChild);
+  });
+}
+
+/// The first child element of a name, or a null node.
+template <class NameText>
+DOM_Node FirstElement(const DOM_Node& inParent, const NameText& inName) {
+  DOM_Node child = inParent.getFirstChild();
+  while (!child.isNull() && !IsElementNamed(child, inName)) child = child.getNextSibling();
+  return child;
+}
+
+#endif

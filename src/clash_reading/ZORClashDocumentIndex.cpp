@@ -1,0 +1,126 @@
+#include "clash_reading/ZORClashDocumentIndex.h"
+
+#include <algorithm>
+
+#include "clash_reading/ElementWalk.h"
+#include "clash_reading/NamedConstants.h"
+
+void ZORClashDocumentIndex::Refresh(const DOM_Element& inRoot) {
+  const std::uint64_t changeCount = inRoot.getChangeCount();
+  if (root_ == inRoot && changeCount_ == changeCount) return;
+  Forget();
+  root_ = inRoot;
+  changeCount_ = changeCount;
+}
+
+void ZORClashDocumentIndex::Forget() { *this = ZORClashDocumentIndex(); }
+
+const std::vector<DOM_Node>& ZORClashDocumentIndex::ResultSets() {
+  BuildInterferences();
+  return resultSets_;
+}
+
+const std::vector<DOM_Node>& ZORClashDocumentIndex::Interferences() {
+  BuildInterferences();
+  return interferences_;
+}
+
+bool ZORClashDocumentIndex::IsInLastResultSet(std::size_t inInterference) {
+  BuildInterferences();
+  return !firstInterference_.empty() && inInterference >= firstInterference_.back();
+}
+
+void ZORClashDocumentIndex::BuildInterferences() {
+  if (interferencesBuilt_) return;
+  ForEachElement(root_, "ClashResult", [&](const DOM_Node& inResultSet) {
+    resultSets_.push_back(inResultSet);
+    firstInterference_.push_back(interferences_.size());
+    ForEachElement(inResultSet, "Interference", [&](const DOM_Node& inInterference) {
+      interferences_.push_back(inInterference);
+    });
+  });
+  interferencesBuilt_ = true;
+}
+
+// A counting sort of the interferences by their place in their own result set; it is stable, so
+// that each rank keeps document order.
+void ZORClashDocumentIndex::BuildRanks() {
+  if (ranksBuilt_) return;
+  BuildInterferences();
+  std::vector<std::size_t> ranks(interferences_.size());
+  std::size_t rankCount = 0;
+  for (std::size_t set = 0; set < resultSets_.size(); ++set) {
+    const std::size_t first = firstInterference_[set];
+    const std::size_t end =
+        set + 1 < resultSets_.size() ? firstInterference_[set + 1] : interferences_.size();
+    for (std::size_t i = first; i < end; ++i) ranks[i] = i - first;
+    rankCount = std::max(rankCount, end - first);
+  }
+  rankStart_.assign(rankCount + 1, 0);
+  for (std::size_t rank : ranks) ++rankStart_[rank + 1];
+  for (std::size_t rank = 0; rank < rankCount; ++rank) rankStart_[rank + 1] += rankStart_[rank];
+  std::vector<std::size_t> next = rankStart_;
+  rankInterference_.resize(ranks.size());
+  for (std::size_t i = 0; i < ranks.size(); ++i) rankInterference_[next[ranks[i]]++] = i;
+  ranksBuilt_ = true;
+}
+
+std::vector<DOM_Node> ZORClashDocumentIndex::InterferencesAtRank(std::size_t inRank) {
+  BuildRanks();
+  std::vector<DOM_Node> found;
+  if (inRank + 1 >= rankStart_.size()) return found;
+  for (std::size_t i = rankStart_[inRank]; i < rankStart_[inRank + 1]; ++i)
+    found.push_back(interferences_[rankInterference_[i]]);
+  return found;
+}
+
+const std::vector<DOM_Node>& ZORClashDocumentIndex::Specifications() {
+  if (!specificationsBuilt_) {
+    ForEachElement(root_, "ProductsInSpec", [&](const DOM_Node& inProducts) {
+      ForEachElement(inProducts, "Specification", [&](const DOM_Node& inSpecification) {
+        specifications_.push_back(inSpecification);
+      });
+    });
+    specificationsBuilt_ = true;
+  }
+  return specifications_;
+}
+
+const std::vector<DOM_Node>& ZORClashDocumentIndex::RealAttributes(const DOM_Node& inComponent) {
+  if (attributesOf_.isNull() || attributesOf_ != inComponent) {
+    realAttributes_.clear();
+    ForEachElement(inComponent, names::ComponentAttributes, [&](const DOM_Node& inAttributes) {
+      ForEachElement(inAttributes, names::ComponentAttribute, [&](const DOM_Node& inAttribute) {
+        if (ZORLyraGeneralServices::GetAttrOnNode(inAttribute, names::AttrType.ConvertToChar()) !=
+            "Feature")
+          realAttributes_.push_back(inAttribute);
+      });
+    });
+    attributesOf_ = inComponent;
+  }
+  return realAttributes_;
+}
+
+const std::vector<DOM_Node>& ZORClashDocumentIndex::Shapes(const DOM_Node& inComponent) {
+  if (shapesOf_.isNull() || shapesOf_ != inComponent) {
+    shapes_.clear();
+    ForEachElement(inComponent, names::ComponentShapes, [&](const DOM_Node& inShapes) {
+      ForEachElement(inShapes, names::ComponentShape,
+                     [&](const DOM_Node& inShape) { shapes_.push_back(inShape); });
+    });
+    shapesOf_ = inComponent;
+  }
+  return shapes_;
+}
+
+const std::vector<DOM_Node>& ZORClashDocumentIndex::NamedChildren(const DOM_Node& inParent,
+                                                                  const ZORUnicodeString& inName) {
+  if (childrenOf_.isNull() || childrenOf_ != inParent || childrenName_ != inName) {
+    namedChildren_.clear();
+    ForEachElement(inParent, inName,
+                   [&](const DOM_Node& inChild) { namedChildren_.push_back(inChild); });
+    childrenOf_ = inParent;
+    childrenName_ = inName;
+  }
+  return namedChildren_;
+}
