@@ -16,8 +16,8 @@ class ZORClashDocumentIndex;
 
 /// Reads a clash-result document from a file or from memory and answers questions about it.
 ///
-/// Typical use: construct, LoadSequence once, then ask. Before a successful load, and after one that
-/// found no root element, every question answers as for a missing root. Outputs are filled in
+/// Typical use: construct, LoadSequence once, then ask. Before a successful load, and after one
+/// that found no root element, every question answers as for a missing root. Outputs are filled in
 /// place; unless an operation says otherwise, what is not found leaves its output untouched. A
 /// missing attribute reads as the empty string. Names are compared exactly, letter case included.
 /// The reader catches nothing: what the platform raises (ZORXMLParseError for a malformed document)
@@ -44,9 +44,9 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
 
   // Loading
   /// Parses the source and recognises the kind of document. May be called again: the source is
-  /// parsed once more. @param outKind      "ClashElement", "InterferenceElement",
-  /// "FederatorClashElement", "Components",
-  ///                     "Errors", or "Unknown" for another root element or none.
+  /// parsed once more.
+  /// @param outKind      "ClashElement", "InterferenceElement", "FederatorClashElement",
+  ///                     "Components", "Errors", or "Unknown" for another root element or none.
   /// @param outReference emptied first, then the root's "ZORDocument" for the first three kinds.
   /// @param ioVersion    for the first three kinds the root's "Version", "1.1" when that is empty;
   ///                     else untouched.
@@ -107,16 +107,18 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
   // Interferences
   /// Finds an interference by number.
   /// @param outInterference a deep copy, of the same document but without parent.
-  /// @param outFirstLabel   "instance -- shape" of the first product, and so on.
+  /// @param ioFirstLabel    must be empty on entry: a filled one means that the first product is
+  ///                        known, and each product then goes to the second outputs. Becomes
+  ///                        "instance -- shape".
   /// @return S_OK, or E_FAIL with all outputs untouched.
-  HRESULT GetithInterference(int inIndex, DOM_Node& outInterference,
-                             ZORUnicodeString& outFirstLabel, ZORUnicodeString& outSecondLabel,
-                             ZORUnicodeString& outFirstPreview, ZORUnicodeString& outSecondPreview);
-  /// The picture reference ("Picture"/"HRef") of an interference. In a single-interference document,
-  /// or with the index -1, of the first "Interference" directly under the root, with ".." replaced
-  /// by the setting "PublishDefDir" of "ClashPublish". Otherwise the index counts within each
-  /// result set anew, and the last result set that has such an interference with a picture wins.
-  /// To be called on a loaded reader only.
+  HRESULT GetithInterference(int inIndex, DOM_Node& outInterference, ZORUnicodeString& ioFirstLabel,
+                             ZORUnicodeString& outSecondLabel, ZORUnicodeString& outFirstPreview,
+                             ZORUnicodeString& outSecondPreview);
+  /// The picture reference ("Picture"/"HRef") of an interference. In a single-interference
+  /// document, or with the index -1, of the first "Interference" directly under the root, with ".."
+  /// replaced by the setting "PublishDefDir" of "ClashPublish". Otherwise the index counts within
+  /// each result set anew, and the last result set that has such an interference with a picture
+  /// wins. To be called on a loaded reader only.
   void GetClashPreviewURL(int inIndex, ZORUnicodeString& outPicture);
   /// Value, result type (as written), rule name and aliases of an interference. The aliases are
   /// emptied first; a second product is told from the first by a filled first alias.
@@ -131,45 +133,44 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
   /// that last set replaces the latter). In a document of any other kind outResultName is emptied
   /// and the first "Interference" directly under the root is read, whatever index and version.
   /// A rule's clearance that is not empty replaces outClearance.
-  void GetClashInfos(
-      ZORUnicodeString inVersion, int inIndex, ZORUnicodeString& outResultName,
-      ZORUnicodeString& outResultType, ZORUnicodeString& outClearance, ZORUnicodeString& outStatus,
-      ZORUnicodeString& outComputationType, ZORUnicodeString& outRetrieve,
-      ZORUnicodeString& outRuleName, ZORUnicodeString& outRuleClearance,
-      ZORUnicodeString& outFirstDescriptionId, ZORUnicodeString& outSecondDescriptionId,
-      ZORUnicodeString& outFirstProcessMode, ZORUnicodeString& outSecondProcessMode,
-      ZORUnicodeString& outComment, ZORUnicodeString& outFirstAlien,
-      ZORUnicodeString& outSecondAlien, ZORUnicodeString& outFirstDescriptionIdAgain,
-      ZORUnicodeString& outSecondDescriptionIdAgain, ZORUnicodeString& outFirstInstance,
-      ZORUnicodeString& outSecondInstance, ZORUnicodeString& outFirstShapeName,
-      ZORUnicodeString& outSecondShapeName, ZORUnicodeString& outFirstShapeSource,
-      ZORUnicodeString& outSecondShapeSource, ZORUnicodeString& outSeverity,
-      ZORUnicodeString& outPenetrationCandidate, ZORUnicodeString& outCurveLength,
-      ZORUnicodeString& outDistance, ZORUnicodeString& outReserved, ZORUnicodeString& outPoints,
-      ZORUnicodeString& outFocusDistance, ZORUnicodeString& outNearPlane,
-      ZORUnicodeString& outFarPlane, ZORUnicodeString& outProjection,
-      ZORUnicodeString& outViewpointX, ZORUnicodeString& outViewpointY,
-      ZORUnicodeString& outViewpointZ, ZORUnicodeString& outSightX, ZORUnicodeString& outSightY,
-      ZORUnicodeString& outSightZ, ZORUnicodeString& outSecondVectorX,
-      ZORUnicodeString& outSecondVectorY, ZORUnicodeString& outSecondVectorZ);
-  /// Reads one "Interference" element that is already in hand.
+  void GetClashInfos(ZORUnicodeString inVersion, int inIndex, ZORUnicodeString& outResultName,
+                     ZORUnicodeString& outResultType, ZORUnicodeString& outClearance,
+                     ZORUnicodeString& outStatus, ZORUnicodeString& outComputationType,
+                     ZORUnicodeString& outRetrieve, ZORUnicodeString& outRuleName,
+                     ZORUnicodeString& outRuleClearance, ZORUnicodeString& outFirstDescriptionId,
+                     ZORUnicodeString& outSecondDescriptionId,
+                     ZORUnicodeString& outFirstProcessMode, ZORUnicodeString& outSecondProcessMode,
+                     ZORUnicodeString& outComment, ZORUnicodeString& outFirstAlien,
+                     ZORUnicodeString& outSecondAlien, ZORUnicodeString& outFirstDescriptionIdAgain,
+                     ZORUnicodeString& outSecondDescriptionIdAgain,
+                     ZORUnicodeString& outFirstInstance, ZORUnicodeString& outSecondInstance,
+                     ZORUnicodeString& outFirstShapeName, ZORUnicodeString& outSecondShapeName,
+                     ZORUnicodeString& outFirstShapeSource, ZORUnicodeString& outSecondShapeSource,
+                     ZORUnicodeString& outSeverity, ZORUnicodeString& outPenetrationCandidate,
+                     ZORUnicodeString& outCurveLength, ZORUnicodeString& outDistance,
+                     ZORUnicodeString& outReserved, ZORUnicodeString& outPoints,
+                     ZORUnicodeString& outFocusDistance, ZORUnicodeString& outNearPlane,
+                     ZORUnicodeString& outFarPlane, ZORUnicodeString& outProjection,
+                     ZORUnicodeString& outViewpointX, ZORUnicodeString& outViewpointY,
+                     ZORUnicodeString& outViewpointZ, ZORUnicodeString& outSightX,
+                     ZORUnicodeString& outSightY, ZORUnicodeString& outSightZ,
+                     ZORUnicodeString& outSecondVectorX, ZORUnicodeString& outSecondVectorY,
+                     ZORUnicodeString& outSecondVectorZ);
+  /// Reads one "Interference" element that is already in hand. Distances are in millimetres. In
+  /// numbers, which stay texts, the first comma has become a point.
   /// @param outResultType    "Clash", "Contact", "Clearance" or "error"; a "ResultTypeNoNLS" as it
-  /// stands. @param outClearance     a distance in millimetres; here and wherever a number is
-  /// handed out as text, the first
-  ///                         decimal comma has become a point.
+  ///                         stands.
   /// @param outStatus        "Relevant", "Irrelevant", "Not inspected" or "error".
   /// @param outComputationType, outRuleName, outRuleClearance, outSeverity,
-  /// outPenetrationCandidate
-  ///                         of the violated rule; untouched without one.
+  ///                         outPenetrationCandidate of the violated rule; untouched without one.
   /// @param outRetrieve      "Old", "New", or the text as written.
   /// @param ioFirstAlien     must be empty on entry: a filled one means that the first product is
   ///                         known, and each product then goes to the second outputs. "YES" when
   ///                         empty in the document.
   /// @param outFirstInstance the alias of a product that the PDM system manages, else the last
-  /// segment of the
-  ///                         description identifier.
+  ///                         segment of the description identifier.
   /// @param outReserved      emptied when there is a "GeometricAspect", never filled.
-  /// @param outPoints        emptied, then "x/y/z/x/y/z…" of the contact geometry.
+  /// @param outPoints        emptied, then "x/y/z/x/y/z..." of the contact geometry.
   /// @param outFocusDistance as written, comma included.
   /// @param outProjection    "NOVIEWPOINT" without viewpoint.
   /// @param outSecondVectorX, outSecondVectorY, outSecondVectorZ never touched.
@@ -287,6 +288,7 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
   ZORUnicodeString GetAttrOnNode(DOM_Node inNode, const char* inName);
   double GetAttrDoubleOnNode(DOM_Node inNode, const char* inName);
   double TransDouble(DOM_NamedNodeMap inAttributes, char* inName);
+  DOM_Node ComponentAt(int inPosition);
 
   char* path_;
   char* buffer_;

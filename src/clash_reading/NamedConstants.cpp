@@ -35,3 +35,47 @@ const ZORUnicodeString ShapeOnDisk ZOR_STATIC_ORDER_NAMES("ShapeOnDisk");
 const ZORUnicodeString ShapeType ZOR_STATIC_ORDER_NAMES("ShapeType");
 const ZORUnicodeString Transaction ZOR_STATIC_ORDER_NAMES("Transaction");
 }  // namespace names
+
+namespace {
+
+// The narrow forms are made while the library is loaded, so that readers on different threads only
+// ever read these objects.
+struct NarrowForms {
+  NarrowForms() {
+    using namespace names;
+    for (const ZORUnicodeString* name : {&Name,
+                                         &AttrType,
+                                         &AttrValue,
+                                         &Component,
+                                         &Components,
+                                         &Alias,
+                                         &Alien,
+                                         &ComponentAttribute,
+                                         &ComponentAttributes,
+                                         &DocumentVersionUUID,
+                                         &ComponentUuid,
+                                         &PartNumber,
+                                         &ShapePosition,
+                                         &ComponentShape,
+                                         &ComponentShapes,
+                                         &ComponentType,
+                                         &ZORDocument,
+                                         &Rx,
+                                         &Ry,
+                                         &Rz,
+                                         &T,
+                                         &Ux,
+                                         &Uy,
+                                         &Uz,
+                                         &PRCName,
+                                         &ServerMarker,
+                                         &ShapeId,
+                                         &ShapeName,
+                                         &ShapeOnDisk,
+                                         &ShapeType,
+                                         &Transaction})
+      name->ConvertToChar();
+  }
+} narrowForms ZOR_STATIC_ORDER_NAMES;
+
+}  // namespace

@@ -1,0 +1,159 @@
+// Components, specification, linked documents, rebuilding a session.
+#include <utility>
+
+#include "ZORClashParsing.h"
+#include "ZORLyraGeneralServices.h"
+#include "clash_reading/ElementWalk.h"
+#include "clash_reading/NamedConstants.h"
+#include "clash_reading/ZORClashDocumentIndex.h"
+
+int ZORClashParsing::GetNbProd() { return static_cast<int>(root_.getChildNodes().getLength()); }
+
+ZORUnicodeString ZORClashParsing::GetPrdId(int inPosition) {
+  return GetAttrOnNode(ComponentAt(inPosition), names::Alias.ConvertToChar());
+}
+
+ZORUnicodeString ZORClashParsing::GetPrdName(int inPosition) { return GetPrdId(inPosition); }
+
+ZORUnicodeString ZORClashParsing::GetPrdType(int inPosition) {
+  return GetAttrOnNode(ComponentAt(inPosition), names::ComponentType.ConvertToChar());
+}
+
+int ZORClashParsing::GetNbRealAttr(int inPosition) {
+  index_->Refresh(root_);
+  const DOM_Node component = ComponentAt(inPosition);
+  return static_cast<int>(index_->RealAttributes(component).size());
+}
+
+void ZORClashParsing::GetSetOfRealAttr(int inPosition, int inNumber, ZORUnicodeString& outName,
+                                       ZORUnicodeString& outType, ZORUnicodeString& outValue) {
+  index_->Refresh(root_);
+  const DOM_Node component = ComponentAt(inPosition);
+  const auto& attributes = index_->RealAttributes(component);
+  if (inNumber < 1 || static_cast<std::size_t>(inNumber) > attributes.size()) return;
+  const DOM_Node& attribute = attributes[static_cast<std::size_t>(inNumber) - 1];
+  outName = GetAttrOnNode(attribute, names::Name.ConvertToChar());
+  outType = GetAttrOnNode(attribute, names::AttrType.ConvertToChar());
+  outValue = GetAttrOnNode(attribute, names::AttrValue.ConvertToChar());
+}
+
+int ZORClashParsing::GetNbShapes(int inPosition) {
+  index_->Refresh(root_);
+  const DOM_Node component = ComponentAt(inPosition);
+  return static_cast<int>(index_->Shapes(component).size());
+}
+
+ZORUnicodeString ZORClashParsing::GetShapeAttrValue(int inPosition, int inShape,
+                                                    ZORUnicodeString inName) {
+  index_->Refresh(root_);
+  const DOM_Node component = ComponentAt(inPosition);
+  const auto& shapes = index_->Shapes(component);
+  if (inShape < 0 || static_cast<std::size_t>(inShape) >= shapes.size()) return ZORUnicodeString();
+  return GetAttrOnNode(shapes[static_cast<std::size_t>(inShape)], inName.ConvertToChar());
+}
+
+void ZORClashParsing::GetPosition(int inPosition, double*& outPosition) {
+  outPosition = new double[12];
+  const DOM_Node component = ComponentAt(inPosition);
+  char ux[] = "Ux", uy[] = "Uy", uz[] = "Uz";
+  const ZORUnicodeString* triples[] = {&names::Rx, &names::Ry, &names::Rz, &names::T};
+  ForEachElement(component, names::ShapePosition, [&](const DOM_Node& inPlacement) {
+    ForEachChild(inPlacement, [&](const DOM_Node& inTriple) {
+      for (int i = 0; i < 4; ++i) {
+        if (!IsElementNamed(inTriple, *triples[i])) continue;
+        const DOM_NamedNodeMap attributes = inTriple.getAttributes();
+        outPosition[3 * i] = TransDouble(attributes, ux);
+        outPosition[3 * i + 1] = TransDouble(attributes, uy);
+        outPosition[3 * i + 2] = TransDouble(attributes, uz);
+      }
+    });
+  });
+}
+
+// Specification
+// ------------------------------------------------------------------------------------
+
+void ZORClashParsing::GetSpecInfos(int& outCount) {
+  index_->Refresh(root_);
+  outCount = static_cast<int>(index_->Specifications().size());
+}
+
+void ZORClashParsing::GetProductsInSpec(
+    int inNumber, ZORUnicodeString& outFirstAlias, ZORUnicodeString& outSecondAlias,
+    ZORUnicodeString& outFirstId, ZORUnicodeString& outSecondId, ZORUnicodeString& outFirstVersion,
+    ZORUnicodeString& outSecondVersion, ZORUnicodeString& outFirstAlien,
+    ZORUnicodeString& outSecondAlien, ZORUnicodeString& outFirstShapeName,
+    ZORUnicodeString& outSecondShapeName) {
+  index_->Refresh(root_);
+  const auto& specifications = index_->Specifications();
+  if (inNumber < 1 || static_cast<std::size_t>(inNumber) > specifications.size()) return;
+  const DOM_Node& specification = specifications[static_cast<std::size_t>(inNumber) - 1];
+
+  const auto readSet = [&](const char* inSetName, ZORUnicodeString& outAlias,
+                           ZORUnicodeString& outId, ZORUnicodeString& outVersion,
+                           ZORUnicodeString& outAlien, ZORUnicodeString& outShapeName) {
+    ForEachElement(specification, inSetName, [&](const DOM_Node& inSet) {
+      outAlias = GetAttrOnNode(inSet, names::Alias.ConvertToChar());
+      outId = GetAttrOnNode(inSet, "DisplayableID");
+      outVersion = GetAttrOnNode(inSet, "DocumentVersion");
+      outAlien = GetAttrOnNode(inSet, names::Alien.ConvertToChar());
+      outShapeName = GetAttrOnNode(inSet, names::ShapeName.ConvertToChar());
+    });
+  };
+  readSet("ProdListe1", outFirstAlias, outFirstId, outFirstVersion, outFirstAlien,
+          outFirstShapeName);
+  readSet("ProdListe2", outSecondAlias, outSecondId, outSecondVersion, outSecondAlien,
+          outSecondShapeName);
+}
+
+// Linked documents
+// ---------------------------------------------------------------------------------
+
+DOM_NodeList ZORClashParsing::GetListOfLinkedElements() {
+  return GetElementsNode().getChildNodes();
+}
+
+void ZORClashParsing::GetAttOfLinkedElement(
+    DOM_Node inElement, ZORUnicodeString& outLink, ZORUnicodeString& outFirstName,
+    ZORUnicodeString& outSecondName, ZORUnicodeString& outFirstId, ZORUnicodeString& outSecondId,
+    ZORUnicodeString& outFirstURL, ZORUnicodeString& outSecondURL) {
+  outLink = GetAttrOnNode(inElement, "Link");
+  outFirstName = GetAttrOnNode(inElement, "FirstProductName");
+  outSecondName = GetAttrOnNode(inElement, "SecondProductName");
+  outFirstId = GetAttrOnNode(inElement, "FirstProductId");
+  outSecondId = GetAttrOnNode(inElement, "SecondProductId");
+  outFirstURL = GetAttrOnNode(inElement, "FirstProductURL");
+  outSecondURL = GetAttrOnNode(inElement, "SecondProductURL");
+}
+
+// Rebuilding a session
+// -----------------------------------------------------------------------------
+
+void ZORClashParsing::GetReBuildSessionInfos(ZORListValZORUnicodeString& ioAliases,
+                                             ZORListValZORUnicodeString& ioDescriptionIds,
+                                             ZORMathTransformation*& outPositions) {
+  ForEachElement(root_, "ClashResult", [&](const DOM_Node& inResultSet) {
+    int declared = 0;
+    GetAttrOnNode(inResultSet, "NbInterf").ConvertToNum(&declared, "%d");
+    if (declared < 1) return;
+    // An earlier result set's array is abandoned here: the caller is promised the last one.
+    outPositions = new ZORMathTransformation[2 * static_cast<std::size_t>(declared)];
+
+    int taken = 0;
+    DOM_Node child = inResultSet.getFirstChild();
+    for (; taken < declared && !child.isNull(); child = child.getNextSibling()) {
+      if (!IsElementNamed(child, "Interference")) continue;
+      ZORUnicodeString firstAlias, secondAlias, firstId, secondId;
+      ZORMathTransformation firstPosition, secondPosition;
+      GetInterferenceData(child, firstAlias, secondAlias, firstId, secondId, firstPosition,
+                          secondPosition);
+      ioAliases.Append(firstAlias);
+      ioAliases.Append(secondAlias);
+      ioDescriptionIds.Append(firstId);
+      ioDescriptionIds.Append(secondId);
+      outPositions[2 * static_cast<std::size_t>(taken)] = firstPosition;
+      outPositions[2 * static_cast<std::size_t>(taken) + 1] = secondPosition;
+      ++taken;
+    }
+  });
+}
