@@ -36,11 +36,6 @@ ZORUnicodeString DirectoryOfLogicalName(const ZORUnicodeString& inName) {
   return DirectoryOr(inName.SubString(kMarkLength), ZORUnicodeString());
 }
 
-ZORUnicodeString DirectoryOfSchemeName(const ZORUnicodeString& inName) {
-  if (inName.SearchSubString(kScheme) < 0) return DirectoryOfLogicalName(inName);
-  return DirectoryOr(inName.SubString(kSchemeLength), ZORUnicodeString());
-}
-
 ZORUnicodeString PathOfReference(const ZORUnicodeString& inReference) {
   const int scheme = inReference.SearchSubString(kScheme);
   if (scheme < 0) return inReference;
