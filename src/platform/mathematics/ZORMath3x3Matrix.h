@@ -11,7 +11,7 @@ class ZOR_PLATFORM_EXPORT ZORMath3x3Matrix {
   ZORMath3x3Matrix();
   ZORMath3x3Matrix(const ZORMathVector& inFirstColumn, const ZORMathVector& inSecondColumn,
                    const ZORMathVector& inThirdColumn);
-  /// @param inColumn 0 to 2.
+  /// @param inColumn 0 to 2; another one raises ZORFatalError.
   const ZORMathVector& GetColumn(int inColumn) const;
   ZORMathVector operator*(const ZORMathVector& inVector) const;
   ZORMath3x3Matrix operator*(const ZORMath3x3Matrix& inOther) const;

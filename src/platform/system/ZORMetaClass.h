@@ -40,6 +40,7 @@ class ZOR_PLATFORM_EXPORT ZORMetaClass {
 /// Gives the meta-class of a class, made at the first call with its name; later calls give the same
 /// one.
 /// @param inBase meta-class of the base class, or null for a root.
+/// @return null for a class without name.
 ZOR_PLATFORM_EXPORT ZORMetaClass* fct_RetrieveMetaObject(
     const char* inClassName, ZORTypeOfClass inType, const ZORMetaClass* inBase,
     const char* inExtendedClass, const char* inFramework, unsigned int inInstanceSize);

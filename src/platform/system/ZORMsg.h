@@ -5,7 +5,8 @@
 #include "ZORPlatformExport.h"
 #include "platform/system/ZORUnicodeString.h"
 
-/// A message text that may hold the places /p1 to /p9 for parameters ("//" is a slash).
+/// A message text that may hold the places /p1 to /p9 for parameters ("//" is a slash; a slash before
+/// anything else stands for itself).
 class ZOR_PLATFORM_EXPORT ZORMsg {
  public:
   ZORMsg();
@@ -16,6 +17,7 @@ class ZOR_PLATFORM_EXPORT ZORMsg {
 
  private:
   ZORUnicodeString text_;
+  bool isPlain_ = true;  // holds no place, so that building it is a copy
 };
 
 #endif

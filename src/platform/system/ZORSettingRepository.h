@@ -26,13 +26,17 @@ class ZOR_PLATFORM_EXPORT ZORSettingRepository {
   virtual ~ZORSettingRepository();
 
   /// Reads one setting. Numbers and truth values are read as their text by the text forms; numbers
-  /// in text as numbers.
+  /// in text as numbers. An int is read from a number without fraction within its range.
   /// @return S_OK; E_FAIL when the setting is missing or of a kind that does not convert (the
-  /// output is unchanged).
+  /// output is unchanged);
+  /// E_INVALIDARG for a null argument.
   virtual HRESULT ReadSetting(const char* inName, ZORString* outValue) = 0;
   virtual HRESULT ReadSetting(const char* inName, ZORUnicodeString* outValue) = 0;
   virtual HRESULT ReadSetting(const char* inName, int* outValue) = 0;
   virtual HRESULT ReadSetting(const char* inName, double* outValue) = 0;
+  /// Reads the first inCount numbers of an array; a single number is an array of one.
+  /// @return as above; also E_FAIL when there are fewer numbers, E_INVALIDARG for a count below 1.
+  virtual HRESULT ReadSetting(const char* inName, int* outValues, int inCount) = 0;
 };
 
 #endif

@@ -1,0 +1,39 @@
+// Conversion between UTF-8 and UTF-16.
+#ifndef ZOR_DEFAULT_PLATFORM_SYSTEM_UTF8_H
+#define ZOR_DEFAULT_PLATFORM_SYSTEM_UTF8_H
+
+#include <cstddef>
+#include <string_view>
+
+namespace ZORDefault {
+
+/// What stands for text that cannot be converted.
+inline constexpr char16_t kReplacementCharacter = 0xFFFD;
+
+inline bool IsHighSurrogate(char32_t inUnit) { return inUnit >= 0xD800 && inUnit <= 0xDBFF; }
+inline bool IsLowSurrogate(char32_t inUnit) { return inUnit >= 0xDC00 && inUnit <= 0xDFFF; }
+
+/// Writes UTF-8 as UTF-16; each maximal part of an ill-formed sequence becomes one U+FFFD.
+/// @param outUnits room for one unit a byte.
+/// @return the number of units written.
+std::size_t DecodeUtf8(std::string_view inBytes, char16_t* outUnits);
+
+/// @return the number of bytes that EncodeUtf8 writes for these units.
+std::size_t Utf8Length(std::u16string_view inUnits);
+
+/// Writes UTF-16 as UTF-8; a lone surrogate becomes U+FFFD.
+/// @param outBytes room for Utf8Length bytes, at most three a unit.
+/// @return the number of bytes written.
+std::size_t EncodeUtf8(std::u16string_view inUnits, char* outBytes);
+
+/// Takes the character at a position of a UTF-16 text and moves the position past it; a lone
+/// surrogate is U+FFFD.
+char32_t NextCharacter(std::u16string_view inUnits, std::size_t& ioPosition);
+
+/// Writes one character below U+110000, no surrogate, as UTF-8.
+/// @return the end of what was written.
+char* EncodeCharacter(char32_t inCharacter, char* outBytes);
+
+}  // namespace ZORDefault
+
+#endif

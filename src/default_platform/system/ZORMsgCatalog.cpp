@@ -1,0 +1,88 @@
+#include "platform/system/ZORMsgCatalog.h"
+
+#include <map>
+#include <string>
+#include <string_view>
+
+#include "default_platform/system/FileCache.h"
+#include "default_platform/system/SearchPath.h"
+#include "default_platform/system/TomlTable.h"
+#include "platform/system/ZORGetEnv.h"
+
+struct ZORMsgCatalog::Messages {
+  std::map<std::string, ZORMsg, std::less<>> byKey;
+};
+
+namespace {
+
+using ZORDefault::FileCache;
+using Messages = ZORMsgCatalog::Messages;
+using MessagesPointer = std::shared_ptr<const Messages>;
+
+MessagesPointer ReadMessages(std::string_view inText) {
+  const auto table = ZORDefault::ParseToml(inText);
+  if (!table) return nullptr;
+  auto messages = std::make_shared<Messages>();
+  for (const auto& [key, value] : *table)
+    if (const std::string* const text = std::get_if<std::string>(&value))
+      messages->byKey.emplace(key, ZORMsg(ZORUnicodeString(text->c_str())));
+  return messages;
+}
+
+FileCache<Messages>& CatalogueFiles() {
+  static auto* const files = new FileCache<Messages>(&ReadMessages);
+  return *files;
+}
+
+// The language of a locale's name: "fr_FR.UTF-8" is "fr", "C" and its like are English.
+std::string LanguageOf(std::string_view inLocale) {
+  std::string language(inLocale.substr(0, inLocale.find_first_of("_-.@")));
+  for (char& letter : language)
+    if (letter >= 'A' && letter <= 'Z') letter = static_cast<char>(letter - 'A' + 'a');
+  const bool isWord = language.find_first_not_of("abcdefghijklmnopqrstuvwxyz") == language.npos;
+  return language.size() < 2 || language == "posix" || !isWord ? "en" : language;
+}
+
+std::string UserLanguage() {
+  for (const char* const variable : {"ZOR_LANG", "LC_ALL", "LC_MESSAGES", "LANG"}) {
+    const char* const value = ZORGetEnv(variable);
+    if (value && *value) return LanguageOf(value);
+  }
+  return "en";
+}
+
+MessagesPointer FindMessages(const char* inName) {
+  if (!inName) return nullptr;
+  const std::vector<std::string> directories = ZORDefault::CatalogueDirectories();
+  ZORDefault::FoundFile file;
+  if (!ZORDefault::FindToml(directories, UserLanguage() + "/", inName, file) &&
+      !ZORDefault::FindToml(directories, "en/", inName, file))
+    return nullptr;
+  return CatalogueFiles().Get(file.path, file.stamp);
+}
+
+}  // namespace
+
+ZORMsgCatalog::ZORMsgCatalog() = default;
+ZORMsgCatalog::~ZORMsgCatalog() = default;
+
+int ZORMsgCatalog::LoadMsgCatalog(const char* inName) {
+  messages_ = FindMessages(inName);
+  return messages_ ? 1 : 0;
+}
+
+ZORMsg ZORMsgCatalog::GetCatalogMsg(const char* inKey) const {
+  if (!messages_ || !inKey) return ZORMsg();
+  const auto found = messages_->byKey.find(std::string_view(inKey));
+  return found == messages_->byKey.end() ? ZORMsg() : found->second;
+}
+
+ZORUnicodeString ZORMsgCatalog::BuildMessage(const char* inCatalogue, const char* inKey,
+                                             const ZORUnicodeString* inParameters, int inCount,
+                                             const ZORUnicodeString& inDefault) {
+  const MessagesPointer messages = FindMessages(inCatalogue);
+  if (!messages || !inKey) return inDefault;
+  const auto found = messages->byKey.find(std::string_view(inKey));
+  if (found == messages->byKey.end()) return inDefault;
+  return found->second.BuildMessage(inParameters, inCount);
+}

@@ -1,0 +1,234 @@
+#include "platform/system/ZORUnicodeString.h"
+
+#include <algorithm>
+#include <cstring>
+#include <string_view>
+#include <utility>
+
+#include "default_platform/system/Utf8.h"
+
+namespace {
+
+constexpr std::size_t kNotFound = std::u16string_view::npos;
+
+// The first position from inFrom on that holds a unit. Whole blocks are tested without a branch for
+// each unit, which compilers turn into vector instructions.
+std::size_t FindUnit(std::u16string_view inText, char16_t inUnit, std::size_t inFrom) {
+  constexpr std::size_t kBlock = 16;
+  for (; inFrom + kBlock <= inText.size(); inFrom += kBlock) {
+    const char16_t* const block = inText.data() + inFrom;
+    unsigned hits = 0;
+    for (std::size_t i = 0; i < kBlock; ++i) hits |= block[i] == inUnit;
+    if (hits) break;
+  }
+  for (; inFrom < inText.size(); ++inFrom)
+    if (inText[inFrom] == inUnit) return inFrom;
+  return kNotFound;
+}
+
+std::size_t FindText(std::u16string_view inText, std::u16string_view inSought, std::size_t inFrom) {
+  if (inSought.empty() || inText.size() < inSought.size()) return kNotFound;
+  const std::u16string_view starts = inText.substr(0, inText.size() - inSought.size() + 1);
+  while ((inFrom = FindUnit(starts, inSought[0], inFrom)) != kNotFound) {
+    if (std::memcmp(inText.data() + inFrom, inSought.data(), inSought.size() * sizeof(char16_t)) ==
+        0)
+      return inFrom;
+    ++inFrom;
+  }
+  return kNotFound;
+}
+
+int Position(std::size_t inFound) { return inFound == kNotFound ? -1 : static_cast<int>(inFound); }
+
+}  // namespace
+
+ZORUnicodeString::ZORUnicodeString() = default;
+
+ZORUnicodeString::ZORUnicodeString(const char* inNarrow) {
+  if (inNarrow) BuildFromUTF8(inNarrow, std::strlen(inNarrow));
+}
+
+ZORUnicodeString::ZORUnicodeString(const ZORString& inNarrow) {
+  BuildFromUTF8(inNarrow.CastToCharPtr(), static_cast<std::size_t>(inNarrow.GetLengthInChar()));
+}
+
+// The narrow form is not copied: it is made again where it is asked for.
+ZORUnicodeString::ZORUnicodeString(const ZORUnicodeString& inOther) : units_(inOther.units_) {}
+
+ZORUnicodeString::ZORUnicodeString(ZORUnicodeString&& ioOther) noexcept
+    : units_(std::move(ioOther.units_)), narrow_(std::move(ioOther.narrow_)) {
+  ioOther.units_.clear();
+}
+
+ZORUnicodeString& ZORUnicodeString::operator=(const ZORUnicodeString& inOther) {
+  if (this == &inOther) return *this;
+  units_ = inOther.units_;
+  narrow_.reset();
+  return *this;
+}
+
+ZORUnicodeString& ZORUnicodeString::operator=(ZORUnicodeString&& ioOther) noexcept {
+  if (this == &ioOther) return *this;
+  units_ = std::move(ioOther.units_);
+  narrow_ = std::move(ioOther.narrow_);
+  ioOther.units_.clear();
+  return *this;
+}
+
+ZORUnicodeString::~ZORUnicodeString() = default;
+
+void ZORUnicodeString::BuildFromUTF16(const ZORUC2Bytes* inUnits, std::size_t inCount) {
+  if (inUnits)
+    units_.assign(inUnits, inCount);
+  else
+    units_.clear();
+  narrow_.reset();
+}
+
+void ZORUnicodeString::BuildFromUTF8(const char* inBytes, std::size_t inCount) {
+  // The bytes may be this string's own narrow form, so that is let go last.
+  units_.resize(inBytes ? inCount : 0);
+  if (!units_.empty())
+    units_.resize(ZORDefault::DecodeUtf8(std::string_view(inBytes, inCount), units_.data()));
+  narrow_.reset();
+}
+
+ZORUnicodeString& ZORUnicodeString::Append(const ZORUnicodeString& inTail) {
+  units_ += inTail.units_;
+  narrow_.reset();
+  return *this;
+}
+
+ZORUnicodeString& ZORUnicodeString::operator+=(const ZORUnicodeString& inTail) {
+  return Append(inTail);
+}
+
+ZORUnicodeString& ZORUnicodeString::operator+=(ZORUnicodeChar inTail) {
+  units_ += inTail.ConvertToUC2Bytes();
+  narrow_.reset();
+  return *this;
+}
+
+ZORUnicodeString& ZORUnicodeString::AppendUTF16(const ZORUC2Bytes* inUnits, std::size_t inCount) {
+  if (inUnits) units_.append(inUnits, inCount);
+  narrow_.reset();
+  return *this;
+}
+
+void ZORUnicodeString::Reserve(std::size_t inCount) {
+  if (inCount > units_.capacity()) units_.reserve(inCount);
+}
+
+ZORUnicodeString& ZORUnicodeString::Insert(int inPosition, const ZORUnicodeString& inText) {
+  units_.insert(static_cast<std::size_t>(std::clamp(inPosition, 0, GetLengthInChar())),
+                inText.units_);
+  narrow_.reset();
+  return *this;
+}
+
+ZORUnicodeString ZORUnicodeString::Strip(int inMode, ZORUnicodeChar inCharacter) const {
+  const bool leading = inMode == kStripLeading || inMode == kStripBoth;
+  const bool trailing = inMode == kStripTrailing || inMode == kStripBoth;
+  const char16_t unit = inCharacter.ConvertToUC2Bytes();
+  std::size_t begin = 0;
+  std::size_t end = units_.size();
+  while (leading && begin < end && units_[begin] == unit) ++begin;
+  while (trailing && end > begin && units_[end - 1] == unit) --end;
+  ZORUnicodeString stripped;
+  stripped.units_.assign(units_, begin, end - begin);
+  return stripped;
+}
+
+int ZORUnicodeString::ReplaceSubString(const ZORUnicodeString& inOld,
+                                       const ZORUnicodeString& inNew) {
+  const std::size_t found = FindText(units_, inOld.units_, 0);
+  if (found == kNotFound) return -1;
+  units_.replace(found, inOld.units_.size(), inNew.units_);
+  narrow_.reset();
+  return Position(found);
+}
+
+int ZORUnicodeString::GetLengthInChar() const { return static_cast<int>(units_.size()); }
+
+int ZORUnicodeString::SearchSubString(const ZORUnicodeString& inText, int inStart,
+                                      int inMode) const {
+  if (inStart < 0 || inStart >= GetLengthInChar() || inText.units_.empty()) return -1;
+  const std::size_t start = static_cast<std::size_t>(inStart);
+  if (inMode == kSearchForward) return Position(FindText(units_, inText.units_, start));
+  if (inMode == kSearchBackward) return Position(units_.rfind(inText.units_, start));
+  return -1;
+}
+
+ZORUnicodeString ZORUnicodeString::SubString(int inStart, int inLength) const {
+  ZORUnicodeString part;
+  if (inStart < 0 || inStart >= GetLengthInChar()) return part;
+  const std::size_t length = inLength < 0 ? kNotFound : static_cast<std::size_t>(inLength);
+  part.units_.assign(units_, static_cast<std::size_t>(inStart), length);
+  return part;
+}
+
+const ZORUC2Bytes* ZORUnicodeString::ConvertToUCChar() const {
+  return units_.empty() ? nullptr : units_.data();
+}
+
+const char* ZORUnicodeString::ConvertToChar() const {
+  if (units_.empty()) return "";
+  if (!narrow_) {
+    auto narrow = std::make_unique<std::string>(ZORDefault::Utf8Length(units_), '\0');
+    ZORDefault::EncodeUtf8(units_, narrow->data());
+    narrow_ = std::move(narrow);
+  }
+  return narrow_->c_str();
+}
+
+ZORString ZORUnicodeString::ConvertToString() const {
+  const char* const narrow = ConvertToChar();
+  return ZORString(narrow, narrow_ ? static_cast<int>(narrow_->size()) : 0);
+}
+
+HRESULT ZORUnicodeString::ConvertToUTF8(char* outBytes, std::size_t* outCount) const {
+  if (!outBytes || !outCount) return E_INVALIDARG;
+  *outCount = ZORDefault::EncodeUtf8(units_, outBytes);
+  return S_OK;
+}
+
+HRESULT ZORUnicodeString::ConvertToWChar(wchar_t* outWide) const {
+  if (!outWide) return E_INVALIDARG;
+  if constexpr (sizeof(wchar_t) == sizeof(char16_t)) {
+    for (const char16_t unit : units_) *outWide++ = static_cast<wchar_t>(unit);
+  } else {
+    for (std::size_t position = 0; position < units_.size();)
+      *outWide++ = static_cast<wchar_t>(ZORDefault::NextCharacter(units_, position));
+  }
+  *outWide = L'\0';
+  return S_OK;
+}
+
+bool operator==(const ZORUnicodeString& inA, const ZORUnicodeString& inB) {
+  return inA.units_ == inB.units_;
+}
+
+bool operator!=(const ZORUnicodeString& inA, const ZORUnicodeString& inB) { return !(inA == inB); }
+
+bool operator==(const ZORUnicodeString& inA, const char* inB) {
+  if (!inB) return inA.units_.empty();
+  for (std::size_t i = 0;; ++i) {
+    const unsigned char byte = static_cast<unsigned char>(inB[i]);
+    if (byte >= 0x80) return inA == ZORUnicodeString(inB);
+    if (byte == 0) return i == inA.units_.size();
+    if (i == inA.units_.size() || inA.units_[i] != byte) return false;
+  }
+}
+
+bool operator!=(const ZORUnicodeString& inA, const char* inB) { return !(inA == inB); }
+
+ZORUnicodeString operator+(const ZORUnicodeString& inA, const ZORUnicodeString& inB) {
+  ZORUnicodeString sum;
+  sum.units_.reserve(inA.units_.size() + inB.units_.size());
+  sum.units_.append(inA.units_).append(inB.units_);
+  return sum;
+}
+
+ZORUnicodeString operator+(const ZORUnicodeString& inA, const char* inB) {
+  return inA + ZORUnicodeString(inB);
+}

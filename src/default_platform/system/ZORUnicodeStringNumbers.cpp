@@ -1,0 +1,173 @@
+// Numbers in texts: what the C library's formatted reading and printing do in the C locale, with
+// short ways for the plain formats.
+#include <algorithm>
+#include <charconv>
+#include <cstdio>
+#include <cstring>
+#include <limits>
+#include <string>
+#include <string_view>
+
+#include "default_platform/system/CLocale.h"
+#include "default_platform/system/NumberFormat.h"
+#include "platform/system/ZORUnicodeString.h"
+
+namespace {
+
+using ZORDefault::FindConversion;
+using ZORDefault::FormatUse;
+using ZORDefault::NumberKind;
+
+bool IsSpace(char16_t inUnit) { return inUnit == ' ' || (inUnit >= '\t' && inUnit <= '\r'); }
+bool IsDigit(char16_t inUnit) { return inUnit >= '0' && inUnit <= '9'; }
+
+const char16_t* SkipSpace(const char16_t* inText, const char16_t* inEnd) {
+  while (inText < inEnd && IsSpace(*inText)) ++inText;
+  return inText;
+}
+
+int Saturated(long long inNumber) {
+  return static_cast<int>(std::clamp<long long>(inNumber, std::numeric_limits<int>::min(),
+                                                std::numeric_limits<int>::max()));
+}
+
+// Reads a decimal int straight from the code units: "%d" without conversion to narrow text.
+bool ReadDecimalInt(std::u16string_view inText, int& outNumber) {
+  const char16_t* const end = inText.data() + inText.size();
+  const char16_t* text = SkipSpace(inText.data(), end);
+  const bool negative = text < end && *text == '-';
+  if (text < end && (*text == '-' || *text == '+')) ++text;
+  if (text == end || !IsDigit(*text)) return false;
+  constexpr long long kEnough = 1LL << 40;  // past every int: further digits change nothing
+  long long number = 0;
+  for (; text < end && IsDigit(*text); ++text)
+    if (number < kEnough) number = number * 10 + (*text - '0');
+  outNumber = Saturated(negative ? -number : number);
+  return true;
+}
+
+// The start of a text as narrow characters, as long as they are those of a plain decimal number;
+// empty when the number is not plain: then the C library decides.
+class PlainNumber {
+ public:
+  explicit PlainNumber(std::u16string_view inText) {
+    const char16_t* const end = inText.data() + inText.size();
+    const char16_t* text = SkipSpace(inText.data(), end);
+    if (text < end && *text == '+') {
+      if (++text < end && *text == '-') return;
+    }
+    std::size_t length = 0;
+    for (; text < end && IsPart(*text); ++text) {
+      if (length == sizeof(characters_)) return;
+      characters_[length++] = static_cast<char>(*text);
+    }
+    // Letters here mean "0x1p3", "inf", "nan" and their like.
+    if (text == end || !IsWord(*text)) length_ = length;
+  }
+  const char* begin() const { return characters_; }
+  const char* end() const { return characters_ + length_; }
+
+ private:
+  static bool IsPart(char16_t inUnit) {
+    return IsDigit(inUnit) || inUnit == '.' || inUnit == '-' || inUnit == '+' || inUnit == 'e' ||
+           inUnit == 'E';
+  }
+  static bool IsWord(char16_t inUnit) {
+    return (inUnit >= 'a' && inUnit <= 'z') || (inUnit >= 'A' && inUnit <= 'Z');
+  }
+
+  char characters_[64];
+  std::size_t length_ = 0;
+};
+
+// @return false also where only the C library can tell.
+bool ReadPlainDouble(std::u16string_view inText, double& outNumber) {
+  const PlainNumber plain(inText);
+  double number = 0;
+  const auto [rest, error] = std::from_chars(plain.begin(), plain.end(), number);
+  // What is left over (such as the "e" of "1e") and what is out of range is the C library's affair.
+  if (error != std::errc() || rest != plain.end()) return false;
+  outNumber = number;
+  return true;
+}
+
+template <class Number>
+int Scan(const char* inText, const char* inFormat, Number* outNumber) {
+  const ZORDefault::CLocaleScope cLocale;
+  return std::sscanf(inText, inFormat, outNumber) == 1 ? 1 : 0;
+}
+
+// Prints into a buffer that fits most numbers, and again into one that fits them all.
+template <class Number>
+std::string Print(const char* inFormat, Number inNumber) {
+  const ZORDefault::CLocaleScope cLocale;
+  char buffer[400];
+  const int length = std::snprintf(buffer, sizeof(buffer), inFormat, inNumber);
+  if (length < 0) return std::string();
+  const std::size_t size = static_cast<std::size_t>(length);
+  if (size < sizeof(buffer)) return std::string(buffer, size);
+  std::string text(size + 1, '\0');
+  std::snprintf(text.data(), text.size(), inFormat, inNumber);
+  text.resize(size);
+  return text;
+}
+
+bool IsFormat(const char* inFormat, const char* inPlain) {
+  return inFormat && std::strcmp(inFormat, inPlain) == 0;
+}
+
+}  // namespace
+
+HRESULT ZORUnicodeString::BuildFromNum(int inNumber, const char* inFormat) {
+  if (IsFormat(inFormat, "%d") || IsFormat(inFormat, "%i")) {
+    char digits[std::numeric_limits<int>::digits10 + 3];
+    char* const end = std::to_chars(digits, digits + sizeof(digits), inNumber).ptr;
+    units_.assign(digits, end);
+    narrow_.reset();
+    return S_OK;
+  }
+  if (!FindConversion(inFormat, NumberKind::kInt, FormatUse::kPrint)) return E_INVALIDARG;
+  const std::string text = Print(inFormat, inNumber);
+  BuildFromUTF8(text.data(), text.size());
+  return S_OK;
+}
+
+HRESULT ZORUnicodeString::BuildFromNum(double inNumber, const char* inFormat) {
+  if (IsFormat(inFormat, "%f")) {
+    char digits[330];  // the longest double has 309 digits before the point
+    char* const end =
+        std::to_chars(digits, digits + sizeof(digits), inNumber, std::chars_format::fixed, 6).ptr;
+    units_.assign(digits, end);
+    narrow_.reset();
+    return S_OK;
+  }
+  if (!FindConversion(inFormat, NumberKind::kDouble, FormatUse::kPrint)) return E_INVALIDARG;
+  const std::string text = Print(inFormat, inNumber);
+  BuildFromUTF8(text.data(), text.size());
+  return S_OK;
+}
+
+int ZORUnicodeString::ConvertToNum(int* outNumber, const char* inFormat) const {
+  if (!outNumber) return 0;
+  if (IsFormat(inFormat, "%d")) return ReadDecimalInt(units_, *outNumber) ? 1 : 0;
+  const auto letter = FindConversion(inFormat, NumberKind::kInt, FormatUse::kScan);
+  if (!letter) return 0;
+  // Scanned as a long long, so that a number past the range of int is seen and not cut.
+  const std::string wideFormat = std::string(inFormat).insert(*letter, "ll");
+  long long number = 0;
+  if (!Scan(ConvertToChar(), wideFormat.c_str(), &number)) return 0;
+  *outNumber = Saturated(number);
+  return 1;
+}
+
+int ZORUnicodeString::ConvertToNum(double* outNumber, const char* inFormat) const {
+  if (!outNumber) return 0;
+  const bool plain =
+      IsFormat(inFormat, "%le") || IsFormat(inFormat, "%lf") || IsFormat(inFormat, "%lg");
+  if (plain && ReadPlainDouble(units_, *outNumber)) return 1;
+  if (!plain && !FindConversion(inFormat, NumberKind::kDouble, FormatUse::kScan)) return 0;
+  double number = 0;
+  if (!Scan(ConvertToChar(), inFormat, &number)) return 0;
+  *outNumber = number;
+  return 1;
+}
