@@ -1,0 +1,60 @@
+// The scripts that judge: a failure must reach whoever asked.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <fstream>
+
+#include "house/Program.h"
+
+using testing::ElementsAre;
+
+namespace {
+/// Runs one of the project's scripts on a file of this content; the last line is the exit code.
+std::vector<std::string> RunScript(const std::string& inScript, const std::string& inContent) {
+  const testing::TestInfo& test = *testing::UnitTest::GetInstance()->current_test_info();
+  const std::string file = testing::TempDir() + "/zor script " + test.name() + ".txt";
+  std::ofstream(file) << inContent;
+  auto lines = house::LinesOf("bash '" ZOR_SOURCE_DIR "/scripts/" + inScript + "' '" + file +
+                              "' 2>/dev/null; echo code $?");
+  std::filesystem::remove(file);
+  return lines;
+}
+}  // namespace
+
+TEST(RunReadmeCommands, RunsTheShellBlocksInOrder) {
+  EXPECT_THAT(RunScript("run-readme-commands",
+                        "# Title\n```sh\necho one\n\necho two\n```\ntext\n```cpp\nexit(1);\n```\n"),
+              ElementsAre("$ echo one", "one", "$ echo two", "two", "2 commands", "code 0"));
+}
+
+TEST(RunReadmeCommands, StopsAtACommandThatFails) {
+  EXPECT_THAT(RunScript("run-readme-commands", "```sh\nfalse\necho beyond\n```\n"),
+              ElementsAre("$ false", "code 1"));
+}
+
+TEST(RunReadmeCommands, NoticesAFailureBeforeAPipe) {
+  EXPECT_THAT(RunScript("run-readme-commands", "```sh\nfalse | true\n```\n"),
+              ElementsAre("$ false | true", "code 1"));
+}
+
+TEST(RunReadmeCommands, RefusesAFileWithoutCommands) {
+  EXPECT_THAT(RunScript("run-readme-commands", "no block\n"), ElementsAre("code 1"));
+}
+
+TEST(TestCounts, AreThoseOfTheReport) {
+  EXPECT_THAT(
+      RunScript("test-counts",
+                "<?xml version=\"1.0\"?>\n<testsuite name=\"x\"\n\ttests=\"9\"\n\tfailures=\"2\"\n"
+                "\tdisabled=\"1\"\n\tskipped=\"3\"\n>\n<testcase name=\"a\"/>\n</testsuite>\n"),
+      ElementsAre("3 2 4", "code 0"));
+}
+
+TEST(TestCounts, RefuseAReportWithoutCounts) {
+  EXPECT_THAT(RunScript("test-counts", "<testsuite name=\"x\" tests=\"9\">\n"),
+              ElementsAre("code 1"));
+}
+
+TEST(TestCounts, RefuseAnEmptyReport) {
+  EXPECT_THAT(RunScript("test-counts", ""), ElementsAre("code 1"));
+}

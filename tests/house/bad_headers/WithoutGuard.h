@@ -1,0 +1,2 @@
+// A header that compiles only once: the check must notice it.
+struct WithoutGuard {};
