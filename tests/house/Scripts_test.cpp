@@ -58,3 +58,42 @@ TEST(TestCounts, RefuseAReportWithoutCounts) {
 TEST(TestCounts, RefuseAnEmptyReport) {
   EXPECT_THAT(RunScript("test-counts", ""), ElementsAre("code 1"));
 }
+
+namespace {
+/// What `install-packages format` asks for on a system where `dpkg-query` answers inState for every
+/// package and the user has this number; the last line is the exit code.
+std::vector<std::string> Install(const std::string& inState, int inUser) {
+  return house::LinesOf(
+      "dir=$(mktemp -d) && cd \"$dir\" && "
+      "printf '#!/bin/sh\\necho " +
+      inState +
+      "\\n' >dpkg-query && "
+      "printf '#!/bin/sh\\necho " +
+      std::to_string(inUser) +
+      "\\n' >id && "
+      "printf '#!/bin/sh\\necho apt-get \"$@\"\\n' >apt-get && "
+      "printf '#!/bin/sh\\necho sudo; exec \"$@\"\\n' >sudo && "
+      "chmod +x dpkg-query id apt-get sudo && "
+      "PATH=\"$dir:$PATH\" bash '" ZOR_SOURCE_DIR
+      "/scripts/install-packages' format 2>&1; "
+      "echo code $?; rm -r \"$dir\"");
+}
+}  // namespace
+
+TEST(InstallPackages, AskNothingWhenAllAreThere) {
+  EXPECT_THAT(Install("installed", 0), ElementsAre("code 0"));
+}
+
+TEST(InstallPackages, InstallWhatIsMissing) {
+  EXPECT_THAT(
+      Install("not-installed", 0),
+      ElementsAre("Installing git clang-format", "apt-get update -qq",
+                  "apt-get install -y -qq --no-install-recommends git clang-format", "code 0"));
+}
+
+TEST(InstallPackages, BecomeRootBySudo) {
+  EXPECT_THAT(
+      Install("not-installed", 1000),
+      ElementsAre("Installing git clang-format", "sudo", "apt-get update -qq", "sudo",
+                  "apt-get install -y -qq --no-install-recommends git clang-format", "code 0"));
+}

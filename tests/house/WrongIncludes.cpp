@@ -51,8 +51,6 @@ Seen SeenInSource(const std::string& inName, const std::string& inFile) {
   if (inName.starts_with("default_platform/")) {
     return Folders(inName, 2).empty() ? Seen::kFrontOfDefaultPlatform : Seen::kDefaultPlatform;
   }
-  // Logical names are one piece of code behind two classes of different groups.
-  if (inName == "path_text/LogicalNames.h") return Seen::kSharedLibrary;
   const std::string group = Folders(inName, 1);
   if (group.empty()) return Seen::kSharedLibrary;
   return "src/" + group == Folders(inFile, 2) ? Seen::kOwnGroup : Seen::kOtherGroup;
