@@ -45,8 +45,7 @@ Names Strangers(const Names& inDemangled) {
 /// Those that come neither from the platform nor from the compiler's and the system's libraries.
 Names Unexpected(const Names& inNeeded, const Names& inPlatform) {
   static const std::regex kSystem(
-      ".*@(GLIBC|GLIBCXX|CXXABI|GCC)_.*|__(gmon_start__|cxa_finalize)|_ITM_.*"
-      "|__(asan|ubsan|lsan|sanitizer)_.*");
+      ".*@(GLIBC|GLIBCXX|CXXABI|GCC)_.*|__(gmon_start__|cxa_finalize)|_ITM_.*");
   const std::set<std::string> platform(inPlatform.begin(), inPlatform.end());
   Names unexpected;
   std::ranges::copy_if(inNeeded, std::back_inserter(unexpected), [&](const std::string& name) {
@@ -94,7 +93,7 @@ TEST(Symbols, LibraryLoadsNoThirdParty) {
   }
   EXPECT_THAT(needed, Contains(testing::StartsWith("libZORDefaultPlatform.so")));
   const testing::Matcher<std::string> known = testing::MatchesRegex(
-      "(libZORDefaultPlatform|libstdc\\+\\+|libm|libc|libgcc_s|libasan|libubsan|ld-linux.*)\\.so."
+      "(libZORDefaultPlatform|libstdc\\+\\+|libm|libc|libgcc_s|ld-linux.*)\\.so."
       "*");
   EXPECT_THAT(needed, testing::Each(known));
 }
