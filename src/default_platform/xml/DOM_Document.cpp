@@ -1,0 +1,90 @@
+#include "platform/xml/DOM_Document.h"
+
+#include "default_platform/xml/DOM_HandleAccess.h"
+#include "default_platform/xml/XMLNames.h"
+#include "platform/xml/DOM_DOMException.h"
+
+namespace {
+
+DOM_Tree& TreeToChange(const DOM_Node& inDocument) {
+  if (inDocument.isNull())
+    throw DOM_DOMException(DOM_DOMException::NULL_HANDLE_ERR, "a node made by a null document");
+  return *DOM_HandleAccess::TreeOf(inDocument);
+}
+
+DOM_Node NewNode(const DOM_Node& inDocument, int inKind, const DOMString& inText) {
+  DOM_Tree& tree = TreeToChange(inDocument);
+  return DOM_HandleAccess::Handle(
+      &tree, tree.NewDetached(inKind, 0, DOM_HandleAccess::TextFor(tree, inText)));
+}
+
+}  // namespace
+
+DOM_Document::DOM_Document() = default;
+
+DOM_Document::DOM_Document(const DOM_Node& inNode)
+    : DOM_Node(inNode.getNodeType() == DOCUMENT_NODE ? inNode : DOM_Node()) {}
+
+DOM_Document DOM_Document::createDocument() {
+  return DOM_HandleAccess::DocumentOf(DOM_Tree::Create());
+}
+
+DOM_Element DOM_Document::getDocumentElement() const {
+  if (isNull()) return DOM_Element();
+  return DOM_Element(DOM_HandleAccess::Handle(tree_, tree_->FirstChildOfKind(node_, ELEMENT_NODE)));
+}
+
+DOM_Node DOM_Document::getDoctype() const {
+  if (isNull()) return DOM_Node();
+  return DOM_HandleAccess::Handle(tree_, tree_->FirstChildOfKind(node_, DOCUMENT_TYPE_NODE));
+}
+
+DOM_Element DOM_Document::createElement(const DOMString& inName) {
+  DOM_Tree& tree = TreeToChange(*this);
+  const std::u16string_view name = DOM_HandleAccess::View(inName);
+  RequireXMLName(name);
+  return DOM_Element(DOM_HandleAccess::Handle(
+      &tree, tree.NewDetached(ELEMENT_NODE, tree.InternName(name), nullptr)));
+}
+
+DOM_Node DOM_Document::createTextNode(const DOMString& inText) {
+  return NewNode(*this, TEXT_NODE, inText);
+}
+
+DOM_Node DOM_Document::createCDATASection(const DOMString& inText) {
+  return NewNode(*this, CDATA_SECTION_NODE, inText);
+}
+
+DOM_Node DOM_Document::createComment(const DOMString& inText) {
+  return NewNode(*this, COMMENT_NODE, inText);
+}
+
+DOM_Node DOM_Document::createProcessingInstruction(const DOMString& inTarget,
+                                                   const DOMString& inData) {
+  DOM_Tree& tree = TreeToChange(*this);
+  const std::u16string_view target = DOM_HandleAccess::View(inTarget);
+  RequireXMLName(target);
+  if (IsReservedTarget(target))
+    throw DOM_DOMException(DOM_DOMException::INVALID_CHARACTER_ERR,
+                           "\"xml\" is not a target of processing instructions");
+  return DOM_HandleAccess::Handle(
+      &tree, tree.NewDetached(PROCESSING_INSTRUCTION_NODE, tree.InternName(target),
+                              DOM_HandleAccess::TextFor(tree, inData)));
+}
+
+DOM_Node DOM_Document::createDocumentFragment() {
+  DOM_Tree& tree = TreeToChange(*this);
+  return DOM_HandleAccess::Handle(&tree, tree.NewDetached(DOCUMENT_FRAGMENT_NODE, 0, nullptr));
+}
+
+DOM_Node DOM_Document::importNode(const DOM_Node& inNode, bool inDeep) {
+  DOM_Tree& tree = TreeToChange(*this);
+  if (inNode.isNull())
+    throw DOM_DOMException(DOM_DOMException::NULL_HANDLE_ERR, "a null node to import");
+  const int kind = inNode.getNodeType();
+  if (kind == DOCUMENT_NODE || kind == DOCUMENT_TYPE_NODE || kind == ATTRIBUTE_NODE)
+    throw DOM_DOMException(DOM_DOMException::NOT_SUPPORTED_ERR,
+                           "a document, document type or attribute cannot be imported");
+  return DOM_HandleAccess::Handle(&tree, tree.Copy(*DOM_HandleAccess::TreeOf(inNode),
+                                                   DOM_HandleAccess::NodeOf(inNode), inDeep));
+}

@@ -1,0 +1,50 @@
+// From handles to the tree and back.
+#ifndef ZOR_DEFAULT_PLATFORM_XML_DOM_HANDLEACCESS_H
+#define ZOR_DEFAULT_PLATFORM_XML_DOM_HANDLEACCESS_H
+
+#include "default_platform/xml/DOM_Tree.h"
+#include "platform/xml/DOMString.h"
+#include "platform/xml/DOM_Document.h"
+
+/// The one door through which the default platform, and tests that count nodes, see what a handle
+/// refers to.
+class DOM_HandleAccess {
+ public:
+  static DOM_Tree* TreeOf(const DOM_Node& inHandle) { return inHandle.tree_; }
+  static DOM_Tree::Node NodeOf(const DOM_Node& inHandle) { return inHandle.node_; }
+  static DOM_Tree::Attribute AttributeOf(const DOM_Node& inHandle) { return inHandle.attribute_; }
+
+  /// @return a null handle for the node 0.
+  static DOM_Node Handle(DOM_Tree* inTree, DOM_Tree::Node inNode) {
+    return inNode == 0 ? DOM_Node() : DOM_Node(inTree, inNode, 0);
+  }
+  static DOM_Node Handle(DOM_Tree* inTree, DOM_Tree::Node inElement,
+                         DOM_Tree::Attribute inAttribute) {
+    return inAttribute == 0 ? DOM_Node() : DOM_Node(inTree, inElement, inAttribute);
+  }
+  static DOM_Document DocumentOf(DOM_Tree* inTree) {
+    return DOM_Document(DOM_Node(inTree, DOM_Tree::kDocument, 0));
+  }
+
+  /// @return the null string for a null text.
+  static DOMString String(DOM_Tree* inTree, const DOM_Text* inText) {
+    return inText == nullptr ? DOMString() : DOMString(inTree, inText);
+  }
+  static std::u16string_view View(const DOMString& inText) {
+    return inText.text_ == nullptr ? std::u16string_view() : inText.text_->View();
+  }
+  /// A text for a tree; the text itself when it is the tree's own.
+  static const DOM_Text* TextFor(DOM_Tree& ioTree, const DOMString& inText) {
+    return inText.tree_ == &ioTree ? inText.text_ : ioTree.AddText(View(inText));
+  }
+  /// Makes a string of a block that was allocated by NewOwnedText.
+  static DOMString Adopt(DOM_Text* inOwned) { return DOMString(nullptr, inOwned); }
+};
+
+/// A counted text block for inCount code units with one handle, to be filled and adopted.
+DOM_Text* NewOwnedText(std::uint32_t inCount);
+/// The same block with room for another number of code units.
+DOM_Text* ResizeOwnedText(DOM_Text* inOwned, std::uint32_t inCount);
+void ReleaseOwnedText(const DOM_Text* inOwned);
+
+#endif

@@ -1,0 +1,206 @@
+#include "platform/xml/DOM_Node.h"
+
+#include <utility>
+
+#include "default_platform/xml/DOM_HandleAccess.h"
+#include "platform/xml/DOM_DOMException.h"
+#include "platform/xml/DOM_NamedNodeMap.h"
+#include "platform/xml/DOM_NodeList.h"
+
+namespace {
+
+// Names of the kinds that have no name of their own. Never deleted: handles may be asked while the
+// process ends.
+const DOMString& KindName(int inKind) {
+  static const DOMString* const text = new DOMString("#text");
+  static const DOMString* const section = new DOMString("#cdata-section");
+  static const DOMString* const comment = new DOMString("#comment");
+  static const DOMString* const document = new DOMString("#document");
+  static const DOMString* const fragment = new DOMString("#document-fragment");
+  switch (inKind) {
+    case DOM_Node::TEXT_NODE:
+      return *text;
+    case DOM_Node::CDATA_SECTION_NODE:
+      return *section;
+    case DOM_Node::COMMENT_NODE:
+      return *comment;
+    case DOM_Node::DOCUMENT_NODE:
+      return *document;
+    default:
+      return *fragment;
+  }
+}
+
+[[noreturn]] void RefuseNull() {
+  throw DOM_DOMException(DOM_DOMException::NULL_HANDLE_ERR, "a change through a null handle");
+}
+
+}  // namespace
+
+DOM_Node::DOM_Node() : tree_(nullptr), node_(0), attribute_(0) {}
+
+DOM_Node::DOM_Node(DOM_Tree* inTree, std::uint32_t inNode, std::uint32_t inAttribute)
+    : tree_(inTree), node_(inNode), attribute_(inAttribute) {
+  if (tree_ != nullptr) tree_->HoldNode(node_);
+}
+
+DOM_Node::DOM_Node(const DOM_Node& inOther)
+    : DOM_Node(inOther.tree_, inOther.node_, inOther.attribute_) {}
+
+DOM_Node::DOM_Node(DOM_Node&& ioOther) noexcept
+    : tree_(std::exchange(ioOther.tree_, nullptr)),
+      node_(std::exchange(ioOther.node_, 0)),
+      attribute_(std::exchange(ioOther.attribute_, 0)) {}
+
+DOM_Node& DOM_Node::operator=(const DOM_Node& inOther) { return *this = DOM_Node(inOther); }
+
+DOM_Node& DOM_Node::operator=(DOM_Node&& ioOther) noexcept {
+  DOM_Node taken(std::move(ioOther));
+  std::swap(tree_, taken.tree_);
+  std::swap(node_, taken.node_);
+  std::swap(attribute_, taken.attribute_);
+  return *this;
+}
+
+DOM_Node::~DOM_Node() {
+  if (tree_ != nullptr) tree_->ReleaseNode(node_);
+}
+
+bool DOM_Node::isNull() const { return tree_ == nullptr; }
+
+bool DOM_Node::operator==(const DOM_Node& inOther) const {
+  return tree_ == inOther.tree_ && node_ == inOther.node_ && attribute_ == inOther.attribute_;
+}
+
+bool DOM_Node::operator!=(const DOM_Node& inOther) const { return !(*this == inOther); }
+
+// ---- asking
+
+short DOM_Node::getNodeType() const {
+  if (tree_ == nullptr) return NULL_NODE;
+  return attribute_ != 0 ? static_cast<short>(ATTRIBUTE_NODE) : tree_->At(node_).kind;
+}
+
+DOMString DOM_Node::getNodeName() const {
+  if (tree_ == nullptr) return DOMString();
+  const std::uint32_t name =
+      attribute_ != 0 ? tree_->AttributeAt(attribute_).name : tree_->At(node_).name;
+  if (name == 0) return KindName(tree_->At(node_).kind);
+  return DOM_HandleAccess::String(tree_, tree_->NameText(name));
+}
+
+DOMString DOM_Node::getNodeValue() const {
+  if (tree_ == nullptr) return DOMString();
+  if (attribute_ != 0) return DOM_HandleAccess::String(tree_, tree_->AttributeAt(attribute_).value);
+  const DOM_Tree::NodeRecord& record = tree_->At(node_);
+  return DOM_HandleAccess::String(tree_, DOM_Tree::HasText(record.kind) ? record.text : nullptr);
+}
+
+DOM_Node DOM_Node::getParentNode() const {
+  if (tree_ == nullptr || attribute_ != 0) return DOM_Node();
+  return DOM_HandleAccess::Handle(tree_, tree_->At(node_).parent);
+}
+
+DOM_Node DOM_Node::getFirstChild() const {
+  if (tree_ == nullptr || attribute_ != 0) return DOM_Node();
+  return DOM_HandleAccess::Handle(tree_, tree_->FirstChild(node_));
+}
+
+DOM_Node DOM_Node::getLastChild() const {
+  if (tree_ == nullptr || attribute_ != 0) return DOM_Node();
+  return DOM_HandleAccess::Handle(tree_, tree_->LastChild(node_));
+}
+
+DOM_Node DOM_Node::getPreviousSibling() const {
+  if (tree_ == nullptr || attribute_ != 0) return DOM_Node();
+  return DOM_HandleAccess::Handle(tree_, tree_->At(node_).previous);
+}
+
+DOM_Node DOM_Node::getNextSibling() const {
+  if (tree_ == nullptr || attribute_ != 0) return DOM_Node();
+  return DOM_HandleAccess::Handle(tree_, tree_->At(node_).next);
+}
+
+bool DOM_Node::hasChildNodes() const {
+  return tree_ != nullptr && attribute_ == 0 && tree_->FirstChild(node_) != 0;
+}
+
+DOM_NodeList DOM_Node::getChildNodes() const {
+  return attribute_ != 0 ? DOM_NodeList() : DOM_NodeList(*this);
+}
+
+DOM_NamedNodeMap DOM_Node::getAttributes() const {
+  return getNodeType() == ELEMENT_NODE ? DOM_NamedNodeMap(*this) : DOM_NamedNodeMap();
+}
+
+DOM_Document DOM_Node::getOwnerDocument() const {
+  if (tree_ == nullptr || node_ == DOM_Tree::kDocument) return DOM_Document();
+  return DOM_HandleAccess::DocumentOf(tree_);
+}
+
+std::uint64_t DOM_Node::getChangeCount() const {
+  return tree_ == nullptr ? 0 : tree_->ChangeCount();
+}
+
+// ---- changing
+
+void DOM_Node::setNodeValue(const DOMString& inValue) {
+  if (tree_ == nullptr) RefuseNull();
+  if (attribute_ != 0)
+    tree_->SetAttributeValue(node_, attribute_, DOM_HandleAccess::TextFor(*tree_, inValue));
+  else if (DOM_Tree::HasText(tree_->At(node_).kind))
+    tree_->SetText(node_, DOM_HandleAccess::TextFor(*tree_, inValue));
+}
+
+DOM_Node DOM_Node::appendChild(const DOM_Node& inChild) {
+  return insertBefore(inChild, DOM_Node());
+}
+
+DOM_Node DOM_Node::insertBefore(const DOM_Node& inChild, const DOM_Node& inBefore) {
+  if (tree_ == nullptr || inChild.tree_ == nullptr) RefuseNull();
+  if (tree_ != inChild.tree_)
+    throw DOM_DOMException(DOM_DOMException::WRONG_DOCUMENT_ERR, "a node of another document");
+  if (attribute_ != 0 || inChild.attribute_ != 0)
+    throw DOM_DOMException(DOM_DOMException::HIERARCHY_REQUEST_ERR,
+                           "an attribute has no children and is no child");
+  if (!inBefore.isNull() && (inBefore.tree_ != tree_ || inBefore.attribute_ != 0))
+    throw DOM_DOMException(DOM_DOMException::NOT_FOUND_ERR, "not a child of this node");
+  const DOM_Node child(inChild);  // inChild may be what keeps a node alive that moves
+  tree_->Insert(node_, child.node_, inBefore.node_);
+  return child;
+}
+
+DOM_Node DOM_Node::replaceChild(const DOM_Node& inNew, const DOM_Node& inOld) {
+  if (tree_ == nullptr || inNew.tree_ == nullptr || inOld.tree_ == nullptr) RefuseNull();
+  if (tree_ != inNew.tree_)
+    throw DOM_DOMException(DOM_DOMException::WRONG_DOCUMENT_ERR, "a node of another document");
+  if (attribute_ != 0 || inNew.attribute_ != 0)
+    throw DOM_DOMException(DOM_DOMException::HIERARCHY_REQUEST_ERR,
+                           "an attribute has no children and is no child");
+  if (inOld.tree_ != tree_ || inOld.attribute_ != 0 || tree_->At(inOld.node_).parent != node_)
+    throw DOM_DOMException(DOM_DOMException::NOT_FOUND_ERR, "not a child of this node");
+  const DOM_Node old(inOld);
+  if (inNew == old) return old;
+  tree_->Insert(node_, inNew.node_, old.node_, old.node_);
+  tree_->Remove(old.node_);
+  return old;
+}
+
+DOM_Node DOM_Node::removeChild(const DOM_Node& inChild) {
+  if (tree_ == nullptr || inChild.tree_ == nullptr) RefuseNull();
+  if (tree_ != inChild.tree_ || attribute_ != 0 || inChild.attribute_ != 0 ||
+      tree_->At(inChild.node_).parent != node_)
+    throw DOM_DOMException(DOM_DOMException::NOT_FOUND_ERR, "not a child of this node");
+  const DOM_Node child(inChild);
+  tree_->Remove(child.node_);
+  return child;
+}
+
+DOM_Node DOM_Node::cloneNode(bool inDeep) const {
+  if (tree_ == nullptr) return DOM_Node();
+  const int kind = getNodeType();
+  if (kind == DOCUMENT_NODE || kind == DOCUMENT_TYPE_NODE || kind == ATTRIBUTE_NODE)
+    throw DOM_DOMException(DOM_DOMException::NOT_SUPPORTED_ERR,
+                           "a document, document type or attribute cannot be copied");
+  return DOM_HandleAccess::Handle(tree_, tree_->Copy(*tree_, node_, inDeep));
+}

@@ -1,0 +1,207 @@
+#include "default_platform/xml/DOM_Tree.h"
+
+#include <atomic>
+#include <utility>
+
+namespace {
+std::uint64_t NextSerial() {
+  static std::atomic<std::uint64_t> last{0};
+  return ++last;
+}
+
+// Shorter lists are walked each time, which costs less than an index of them.
+constexpr std::uint32_t kLongestWalk = 24;
+}  // namespace
+
+DOM_Tree::DOM_Tree() : serial_(NextSerial()), names_(texts_) {
+  NewNode(DOM_Node::DOCUMENT_NODE, 0, nullptr);
+}
+
+DOM_Tree::Node DOM_Tree::NextWithin(Node inNode, Node inRoot) const {
+  const Node child = FirstChild(inNode);
+  if (child != 0) return child;
+  while (inNode != inRoot && At(inNode).next == 0) inNode = At(inNode).parent;
+  return inNode == inRoot ? 0 : At(inNode).next;
+}
+
+DOM_Tree::Node DOM_Tree::FirstChildOfKind(Node inParent, int inKind) const {
+  Node child = FirstChild(inParent);
+  while (child != 0 && At(child).kind != inKind) child = At(child).next;
+  return child;
+}
+
+// ---- positions
+
+const PositionIndexes::Children* DOM_Tree::IndexOf(Node inParent) {
+  const PositionIndexes::Children* const known = indexes_.Find(inParent);
+  if (known != nullptr) return known;
+  Node child = FirstChild(inParent);
+  for (std::uint32_t steps = 0; child != 0 && steps < kLongestWalk; ++steps) child = At(child).next;
+  if (child == 0) return nullptr;
+  PositionIndexes::Children children;
+  for (child = FirstChild(inParent); child != 0; child = At(child).next) children.push_back(child);
+  return &indexes_.Keep(inParent, std::move(children));
+}
+
+std::uint32_t DOM_Tree::CountOf(Node inParent) {
+  const PositionIndexes::Children* const index = IndexOf(inParent);
+  if (index != nullptr) return static_cast<std::uint32_t>(index->size());
+  std::uint32_t count = 0;
+  for (Node child = FirstChild(inParent); child != 0; child = At(child).next) ++count;
+  return count;
+}
+
+DOM_Tree::Node DOM_Tree::ChildAt(Node inParent, std::uint32_t inPosition) {
+  const PositionIndexes::Children* const index = IndexOf(inParent);
+  if (index != nullptr) return inPosition < index->size() ? (*index)[inPosition] : 0;
+  Node child = FirstChild(inParent);
+  while (child != 0 && inPosition-- > 0) child = At(child).next;
+  return child;
+}
+
+std::uint32_t DOM_Tree::AttributeCount(Node inElement) {
+  if (cursor_.element == inElement && cursor_.count != 0) return cursor_.count;
+  std::uint32_t count = 0;
+  for (Attribute at = At(inElement).firstAttribute; at != 0; at = attributes_[at].next) ++count;
+  if (cursor_.element != inElement) cursor_ = {inElement, 0, At(inElement).firstAttribute, 0};
+  cursor_.count = count;
+  return count;
+}
+
+DOM_Tree::Attribute DOM_Tree::AttributeAtPosition(Node inElement, std::uint32_t inPosition) {
+  if (cursor_.element != inElement || inPosition < cursor_.position)
+    cursor_ = {inElement, 0, At(inElement).firstAttribute,
+               cursor_.element == inElement ? cursor_.count : 0};
+  std::uint32_t position = cursor_.position;
+  Attribute attribute = cursor_.attribute;
+  while (attribute != 0 && position < inPosition) {
+    attribute = attributes_[attribute].next;
+    ++position;
+  }
+  if (attribute == 0) return 0;  // the cursor stays where it is of use
+  cursor_.position = position;
+  cursor_.attribute = attribute;
+  return attribute;
+}
+
+DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, std::u16string_view inName) const {
+  Attribute attribute = At(inElement).firstAttribute;
+  if (attribute == 0) return 0;
+  const Name name = names_.Find(inName);
+  if (name == 0) return 0;
+  while (attribute != 0 && attributes_[attribute].name != name)
+    attribute = attributes_[attribute].next;
+  return attribute;
+}
+
+// ---- making
+
+DOM_Tree::Node DOM_Tree::TakeNode() {
+  if (freeNode_ == 0) return nodes_.Add();
+  const Node node = freeNode_;
+  freeNode_ = nodes_[node].next;
+  --freeNodeCount_;
+  return node;
+}
+
+DOM_Tree::Attribute DOM_Tree::TakeAttribute() {
+  if (freeAttribute_ == 0) return attributes_.Add();
+  const Attribute attribute = freeAttribute_;
+  freeAttribute_ = attributes_[attribute].next;
+  return attribute;
+}
+
+DOM_Tree::Node DOM_Tree::NewNode(int inKind, Name inName, const DOM_Text* inText) {
+  const Node node = TakeNode();
+  NodeRecord& record = nodes_[node];
+  record = NodeRecord();
+  record.kind = static_cast<std::uint8_t>(inKind);
+  record.name = inName;
+  if (HasText(inKind)) {
+    record.text = inText;
+  } else {
+    record.children = {0, 0};
+  }
+  return node;
+}
+
+DOM_Tree::Node DOM_Tree::NewDetached(int inKind, Name inName, const DOM_Text* inText) {
+  const Node node = NewNode(inKind, inName, inText);
+  const DetachedNodes::Group group = detached_.NewGroup();
+  nodes_[node].flags = kDetached;
+  detached_.AddNode(node, group);
+  ListRoot(node, group);
+  return node;
+}
+
+DOM_Tree::Node DOM_Tree::AppendNew(Node inParent, int inKind, Name inName, const DOM_Text* inText) {
+  const Node node = NewNode(inKind, inName, inText);
+  LinkLast(inParent, node);
+  return node;
+}
+
+DOM_Tree::Attribute DOM_Tree::AppendNewAttribute(Node inElement, Attribute inLast, Name inName,
+                                                 const DOM_Text* inValue) {
+  const Attribute attribute = TakeAttribute();
+  attributes_[attribute] = {inValue, inName, 0};
+  (inLast == 0 ? nodes_[inElement].firstAttribute : attributes_[inLast].next) = attribute;
+  return attribute;
+}
+
+// ---- copying
+
+DOM_Tree::Name DOM_Tree::NameFrom(const DOM_Tree& inSource, Name inName) {
+  if (&inSource == this || inName == 0) return inName;
+  if (importSerial_ != inSource.serial_) {
+    importSerial_ = inSource.serial_;
+    importedNames_.clear();
+  }
+  if (inName >= importedNames_.size()) importedNames_.resize(inSource.NameEnd());
+  Name& name = importedNames_[inName];
+  if (name == 0) name = names_.Intern(inSource.NameText(inName)->View());
+  return name;
+}
+
+const DOM_Text* DOM_Tree::TextFrom(const DOM_Tree& inSource, const DOM_Text* inText) {
+  return &inSource == this ? inText : texts_.Add(inText->View());
+}
+
+DOM_Tree::Node DOM_Tree::CopyOne(const DOM_Tree& inSource, Node inNode,
+                                 DetachedNodes::Group inGroup) {
+  const NodeRecord& from = inSource.At(inNode);
+  const DOM_Text* const text = HasText(from.kind) ? TextFrom(inSource, from.text) : nullptr;
+  const Node copy = NewNode(from.kind, NameFrom(inSource, from.name), text);
+  nodes_[copy].flags = kDetached;
+  detached_.AddNode(copy, inGroup);
+  Attribute last = 0;
+  for (Attribute at = from.firstAttribute; at != 0; at = inSource.attributes_[at].next) {
+    const AttributeRecord& attribute = inSource.attributes_[at];
+    last = AppendNewAttribute(copy, last, NameFrom(inSource, attribute.name),
+                              TextFrom(inSource, attribute.value));
+  }
+  return copy;
+}
+
+DOM_Tree::Node DOM_Tree::Copy(const DOM_Tree& inSource, Node inNode, bool inDeep) {
+  const DetachedNodes::Group group = detached_.NewGroup();
+  const Node root = CopyOne(inSource, inNode, group);
+  ListRoot(root, group);
+  Node parent = root;  // the copy of the parent of what is copied next
+  Node from = inDeep ? inSource.FirstChild(inNode) : 0;
+  while (from != 0) {
+    const Node copy = CopyOne(inSource, from, group);
+    LinkLast(parent, copy);
+    const Node child = inSource.FirstChild(from);
+    if (child != 0) {
+      parent = copy;
+      from = child;
+      continue;
+    }
+    while (from != inNode && inSource.At(from).next == 0) {
+      from = inSource.At(from).parent;
+      if (from != inNode) parent = nodes_[parent].parent;
+    }
+    from = from == inNode ? 0 : inSource.At(from).next;
+  }
+  return root;
+}

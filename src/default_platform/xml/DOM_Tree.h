@@ -1,0 +1,221 @@
+// The nodes of one document.
+#ifndef ZOR_DEFAULT_PLATFORM_XML_DOM_TREE_H
+#define ZOR_DEFAULT_PLATFORM_XML_DOM_TREE_H
+
+#include <cstdint>
+#include <vector>
+
+#include "default_platform/xml/ChunkedRecords.h"
+#include "default_platform/xml/DetachedNodes.h"
+#include "default_platform/xml/PositionIndexes.h"
+#include "default_platform/xml/TextStore.h"
+#include "platform/xml/DOM_Node.h"
+
+/// What a document type declaration says; null parts are not there.
+struct DocumentType {
+  const DOM_Text* publicId = nullptr;
+  const DOM_Text* systemId = nullptr;
+  const DOM_Text* internalSubset = nullptr;
+};
+
+/// All nodes, attributes and texts of a document, in a few large blocks, addressed by number. The
+/// handles are the only ones who count: the tree ends with its last handle or string. Counts are
+/// plain numbers, since a document is used by one thread at a time.
+///
+/// A node is attached when it is, or once was, part of the document's tree; such nodes live as long
+/// as the document. A node that was only made is detached: it goes with the last handle on the nodes
+/// that can be reached from it (see DetachedNodes).
+///
+/// Operations trust their arguments unless they say what they raise; nothing here recurses.
+class DOM_Tree {
+ public:
+  using Node = std::uint32_t;
+  using Attribute = std::uint32_t;
+  using Name = std::uint32_t;
+
+  static constexpr Node kDocument = 1;
+
+  enum Flag : std::uint8_t {
+    kDetached = 1,    // see above
+    kListedRoot = 2,  // among the roots of its group
+    kFree = 4         // not a node now
+  };
+
+  struct ChildLinks {
+    Node first;
+    Node last;
+  };
+
+  struct NodeRecord {
+    std::uint8_t kind;  // a DOM_Node::NodeType
+    std::uint8_t flags;
+    Name name;  // of elements, processing instructions and document types
+    Node parent;
+    Node previous;
+    Node next;
+    Attribute firstAttribute;
+    union {
+      ChildLinks children;   // of the kinds that may have children
+      const DOM_Text* text;  // of the kinds that have a text
+    };
+  };
+  static_assert(sizeof(NodeRecord) == 32);
+
+  struct AttributeRecord {
+    const DOM_Text* value;
+    Name name;
+    Attribute next;
+  };
+  static_assert(sizeof(AttributeRecord) == 16);
+
+  /// A tree with the document node alone and no handle; the first handle that goes ends it.
+  static DOM_Tree* Create() { return new DOM_Tree; }
+  DOM_Tree(const DOM_Tree&) = delete;
+  DOM_Tree& operator=(const DOM_Tree&) = delete;
+
+  // Handles
+  void Hold() { ++handles_; }
+  void Release() {
+    if (--handles_ == 0) delete this;
+  }
+  void HoldNode(Node inNode) {
+    ++handles_;
+    if (nodes_[inNode].flags & kDetached) detached_.Hold(inNode);
+  }
+  void ReleaseNode(Node inNode) {
+    if ((nodes_[inNode].flags & kDetached) && detached_.Release(inNode))
+      Reclaim(detached_.GroupOf(inNode));
+    Release();
+  }
+
+  // Asking
+  const NodeRecord& At(Node inNode) const { return nodes_[inNode]; }
+  const AttributeRecord& AttributeAt(Attribute inAttribute) const {
+    return attributes_[inAttribute];
+  }
+  static bool HasText(int inKind);  ///< whether nodes of a kind carry a text of their own
+  static bool MayHaveChildren(int inKind);
+  Node FirstChild(Node inNode) const {
+    return MayHaveChildren(At(inNode).kind) ? At(inNode).children.first : 0;
+  }
+  Node LastChild(Node inNode) const {
+    return MayHaveChildren(At(inNode).kind) ? At(inNode).children.last : 0;
+  }
+  /// The node after inNode in document order within inRoot and all below it; 0 at the end.
+  Node NextWithin(Node inNode, Node inRoot) const;
+  std::uint32_t ChildCount(Node inParent) { return CountOf(inParent); }
+  Node ChildAt(Node inParent, std::uint32_t inPosition);
+  std::uint32_t AttributeCount(Node inElement);
+  Attribute AttributeAtPosition(Node inElement, std::uint32_t inPosition);
+  Attribute FindAttribute(Node inElement, std::u16string_view inName) const;
+  Node FirstChildOfKind(Node inParent, int inKind) const;
+  const DOM_Text* NameText(Name inName) const { return names_.TextOf(inName); }
+  Name NameEnd() const { return names_.End(); }
+  const DocumentType& Doctype() const { return doctype_; }
+  std::uint64_t ChangeCount() const { return changes_; }
+  /// Nodes in use, attached or not, the document node included.
+  std::uint32_t LiveNodes() const { return nodes_.End() - 1 - freeNodeCount_; }
+
+  // Making parts; a node made here has no parent
+  Name InternName(std::u16string_view inName) { return names_.Intern(inName); }
+  const DOM_Text* AddText(std::u16string_view inText) { return texts_.Add(inText); }
+  Node NewDetached(int inKind, Name inName, const DOM_Text* inText);
+  /// A detached copy of a node of this or another tree.
+  Node Copy(const DOM_Tree& inSource, Node inNode, bool inDeep);
+
+  // Filling a new document in document order, without checks and without counting changes
+  Node AppendNew(Node inParent, int inKind, Name inName, const DOM_Text* inText);
+  /// @param inLast the element's last attribute so far, 0 for none.
+  Attribute AppendNewAttribute(Node inElement, Attribute inLast, Name inName,
+                               const DOM_Text* inValue);
+  void ReplaceText(Node inNode, const DOM_Text* inText) { nodes_[inNode].text = inText; }
+  void SetDoctype(const DocumentType& inDoctype) { doctype_ = inDoctype; }
+
+  // Changing
+  /// Puts a node (or a fragment's children) before inBefore, or last when that is 0; inReplaced is a
+  /// child that will leave at once and therefore does not count in the checks. Raises
+  /// DOM_DOMException.
+  void Insert(Node inParent, Node inChild, Node inBefore, Node inReplaced = 0);
+  /// Takes a node away from its parent.
+  void Remove(Node inChild);
+  void SetText(Node inNode, const DOM_Text* inText);
+  void SetAttributeValue(Node inElement, Attribute inAttribute, const DOM_Text* inValue);
+  void SetAttribute(Node inElement, std::u16string_view inName, const DOM_Text* inValue);
+  void RemoveAttribute(Node inElement, std::u16string_view inName);
+
+ private:
+  DOM_Tree();
+  ~DOM_Tree() = default;
+
+  Node TakeNode();
+  Attribute TakeAttribute();
+  Node NewNode(int inKind, Name inName, const DOM_Text* inText);
+  Node CopyOne(const DOM_Tree& inSource, Node inNode, DetachedNodes::Group inGroup);
+  Name NameFrom(const DOM_Tree& inSource, Name inName);
+  const DOM_Text* TextFrom(const DOM_Tree& inSource, const DOM_Text* inText);
+
+  void LinkLast(Node inParent, Node inChild);
+  void LinkBefore(Node inParent, Node inChild, Node inBefore);
+  void Unlink(Node inChild);
+  void InsertOne(Node inParent, Node inChild, Node inBefore);
+  void Join(Node inParent, Node inChild);
+  void MergeGroups(Node inParent, Node inChild);
+  void AttachSubtree(Node inRoot);
+  void AttachGroup(DetachedNodes::Group inGroup);
+  void EndGroupWhenUnused(DetachedNodes::Group inGroup);
+  bool IsRootOf(Node inNode, DetachedNodes::Group inGroup) const;
+  void ListRoot(Node inNode, DetachedNodes::Group inGroup);
+  std::vector<Node> ParentlessRoots(DetachedNodes::Group inGroup) const;
+  void Reclaim(DetachedNodes::Group inGroup);
+  void FreeSubtree(Node inRoot);
+  void FreeOne(Node inNode);
+  void NoteChange(Node inNode) {
+    if (!(nodes_[inNode].flags & kDetached)) ++changes_;
+  }
+
+  void CheckInsertion(Node inParent, Node inChild, Node inBefore, Node inReplaced) const;
+  void CheckKinds(Node inParent, Node inChild) const;
+  void CheckDocumentChildren(Node inChild, Node inBefore, Node inReplaced) const;
+  bool IsWithin(Node inNode, Node inRoot) const;
+
+  std::uint32_t CountOf(Node inParent);
+  const PositionIndexes::Children* IndexOf(Node inParent);
+
+  /// The attribute last asked for by position, from where the next one is found.
+  struct AttributeCursor {
+    Node element = 0;
+    std::uint32_t position = 0;
+    Attribute attribute = 0;
+    std::uint32_t count = 0;  // of the element's attributes; 0 when not counted
+  };
+
+  std::uint64_t handles_ = 0;
+  std::uint64_t changes_ = 0;
+  const std::uint64_t serial_;  // differs for all trees of the process
+  TextStore texts_;
+  NameTable names_;
+  ChunkedRecords<NodeRecord> nodes_;
+  ChunkedRecords<AttributeRecord> attributes_;
+  Node freeNode_ = 0;  // chained by next
+  std::uint32_t freeNodeCount_ = 0;
+  Attribute freeAttribute_ = 0;  // chained by next
+  DocumentType doctype_;
+  DetachedNodes detached_;
+  PositionIndexes indexes_;
+  AttributeCursor cursor_;
+  // What the names of the tree last copied from are here; 0 for one not met yet.
+  std::uint64_t importSerial_ = 0;
+  std::vector<Name> importedNames_;
+};
+
+inline bool DOM_Tree::HasText(int inKind) {
+  return inKind == DOM_Node::TEXT_NODE || inKind == DOM_Node::CDATA_SECTION_NODE ||
+         inKind == DOM_Node::COMMENT_NODE || inKind == DOM_Node::PROCESSING_INSTRUCTION_NODE;
+}
+
+inline bool DOM_Tree::MayHaveChildren(int inKind) {
+  return inKind == DOM_Node::ELEMENT_NODE || inKind == DOM_Node::DOCUMENT_NODE ||
+         inKind == DOM_Node::DOCUMENT_FRAGMENT_NODE;
+}
+
+#endif

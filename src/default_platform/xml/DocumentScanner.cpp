@@ -1,0 +1,254 @@
+#include "default_platform/xml/DocumentScanner.h"
+
+#include <new>
+#include <string_view>
+#include <xercesc/framework/XMLErrorCodes.hpp>
+#include <xercesc/internal/XMLScanner.hpp>
+#include <xercesc/sax/Locator.hpp>
+#include <xercesc/util/OutOfMemoryException.hpp>
+#include <xercesc/util/XMLUniDefs.hpp>
+
+#include "default_platform/xml/OneLineReason.h"
+#include "platform/xml/ZORXMLParseError.h"
+
+namespace {
+
+constexpr std::uint32_t kDeepest = 1'000'000;
+constexpr std::uint64_t kMostTextUnits = std::uint64_t{128} * 1024 * 1024;
+constexpr XMLSize_t kMostExpansions = 50'000;
+
+// A document holds no more text than its bytes have, unless entities or default attributes multiply
+// it. So much may come from there.
+constexpr std::uint64_t kMostMultiplied = std::uint64_t{8} * 1024 * 1024;
+constexpr std::uint64_t kUnitsOfNode = 4;  // "<a/>"
+constexpr std::uint64_t kUnitsOfAttribute = 4;
+
+struct EmptyDocument {};
+
+std::u16string_view View(const char16_t* inText) {
+  return inText == nullptr ? std::u16string_view() : std::u16string_view(inText);
+}
+
+bool IsSame(std::u16string_view inKnown, const char16_t* inText) {
+  for (const char16_t unit : inKnown)
+    if (*inText++ != unit) return false;
+  return *inText == 0;
+}
+
+}  // namespace
+
+DocumentScanner::DocumentScanner(ScannerMemory& ioMemory, ByteReader& ioReader)
+    : xercesc::SAXParser(nullptr, &ioMemory),
+      reader_(ioReader),
+      document_(DOM_Document::createDocument()),
+      tree_(DOM_HandleAccess::TreeOf(document_)) {
+  setValidationScheme(Val_Never);
+  setDoNamespaces(false);
+  setDoSchema(false);
+  setLoadExternalDTD(false);
+  setLoadSchema(false);
+  setDisableDefaultEntityResolution(true);
+  setExitOnFirstFatalError(true);
+  limits_.setEntityExpansionLimit(kMostExpansions);
+  setSecurityManager(&limits_);
+  // The handlers are never called, since this class answers first; they make the scanner report.
+  setDocumentHandler(&unused_);
+  setDTDHandler(&unused_);
+  setErrorHandler(&unused_);
+  setEntityResolver(&unused_);
+}
+
+DocumentScanner::~DocumentScanner() = default;
+
+DOM_Document DocumentScanner::Scan() {
+  if (reader_.IsEmpty()) return document_;
+  try {
+    RunScanner();
+  } catch (const EmptyDocument&) {
+    return DOM_Document::createDocument();
+  }
+  return document_;
+}
+
+void DocumentScanner::RunScanner() {
+  try {
+    parse(ReaderEntity(reader_));
+  } catch (const ScannerMemoryExhausted&) {
+    throw ScanFailure{0, 0, "a single name, value or text is too large"};
+  } catch (const xercesc::OutOfMemoryException&) {
+    throw ScanFailure{0, 0, "out of memory"};
+  } catch (const std::bad_alloc&) {
+    throw ScanFailure{0, 0, "out of memory"};
+  } catch (const xercesc::XMLException& failure) {
+    throw ScanFailure{0, 0, OneLineReason(failure.getMessage())};
+  } catch (const xercesc::SAXException& failure) {
+    throw ScanFailure{0, 0, OneLineReason(failure.getMessage())};
+  } catch (const std::length_error& failure) {
+    throw ScanFailure{0, 0, failure.what()};
+  }
+}
+
+void DocumentScanner::FailHere(const std::string& inReason) const {
+  const xercesc::Locator* const place = getScanner().getLocator();
+  throw ScanFailure{place->getLineNumber(), place->getColumnNumber(), inReason};
+}
+
+void DocumentScanner::Charge(std::uint64_t inUnits) {
+  charged_ += inUnits;
+  if (charged_ > reader_.Given() + kMostMultiplied)
+    FailHere("entities or default attributes expand to too much text");
+}
+
+// ---- content
+
+void DocumentScanner::startElement(const xercesc::XMLElementDecl& inElement, const unsigned int,
+                                   const XMLCh* const, const AttributeList& inAttributes,
+                                   const XMLSize_t inCount, const bool inIsEmpty, const bool) {
+  FlushText();
+  Charge(kUnitsOfNode);
+  ElementShape& shape = shapes_[&inElement];
+  if (shape.name == 0) shape.name = tree_->InternName(View(inElement.getFullName()));
+  const DOM_Tree::Node element =
+      tree_->AppendNew(current_, DOM_Node::ELEMENT_NODE, shape.name, nullptr);
+  AddAttributes(element, shape, inAttributes, inCount);
+  if (inIsEmpty) return;
+  if (++depth_ > kDeepest) FailHere("elements are nested deeper than 1,000,000");
+  current_ = element;
+}
+
+void DocumentScanner::AddAttributes(DOM_Tree::Node inElement, ElementShape& ioShape,
+                                    const AttributeList& inAttributes, XMLSize_t inCount) {
+  DOM_Tree::Attribute last = 0;
+  for (XMLSize_t position = 0; position < inCount; ++position) {
+    const xercesc::XMLAttr& attribute = *inAttributes.elementAt(position);
+    const std::u16string_view value = View(attribute.getValue());
+    Charge(kUnitsOfAttribute + value.size());
+    last = tree_->AppendNewAttribute(inElement, last,
+                                     AttributeName(ioShape, position, attribute.getName()),
+                                     tree_->AddText(value));
+  }
+}
+
+DOM_Tree::Name DocumentScanner::AttributeName(ElementShape& ioShape, std::size_t inPosition,
+                                              const XMLCh* inName) {
+  if (inPosition >= ioShape.attributes.size()) ioShape.attributes.resize(inPosition + 1);
+  DOM_Tree::Name& name = ioShape.attributes[inPosition];
+  if (name == 0 || !IsSame(tree_->NameText(name)->View(), inName))
+    name = tree_->InternName(View(inName));
+  return name;
+}
+
+void DocumentScanner::endElement(const xercesc::XMLElementDecl&, const unsigned int, const bool,
+                                 const XMLCh* const) {
+  FlushText();
+  current_ = tree_->At(current_).parent;
+  --depth_;
+}
+
+void DocumentScanner::docCharacters(const XMLCh* const inText, const XMLSize_t inCount,
+                                    const bool inIsSection) {
+  if (depth_ == 0) return;  // white space around the root
+  Charge(inCount);
+  if (inIsSection) {
+    FlushText();
+    tree_->AppendNew(current_, DOM_Node::CDATA_SECTION_NODE, 0, tree_->AddText({inText, inCount}));
+    return;
+  }
+  if (text_.size() + inCount > kMostTextUnits)
+    FailHere("a single name, value or text is too large");
+  text_.append(inText, inCount);
+}
+
+void DocumentScanner::ignorableWhitespace(const XMLCh* const inText, const XMLSize_t inCount,
+                                          const bool inIsSection) {
+  docCharacters(inText, inCount, inIsSection);
+}
+
+void DocumentScanner::FlushText() {
+  if (text_.empty()) return;
+  tree_->AppendNew(current_, DOM_Node::TEXT_NODE, 0, tree_->AddText(text_));
+  text_.clear();
+}
+
+void DocumentScanner::docComment(const XMLCh* const inText) {
+  FlushText();
+  const std::u16string_view text = View(inText);
+  Charge(kUnitsOfNode + text.size());
+  tree_->AppendNew(current_, DOM_Node::COMMENT_NODE, 0, tree_->AddText(text));
+}
+
+void DocumentScanner::docPI(const XMLCh* const inTarget, const XMLCh* const inData) {
+  FlushText();
+  const std::u16string_view data = View(inData);
+  Charge(kUnitsOfNode + data.size());
+  tree_->AppendNew(current_, DOM_Node::PROCESSING_INSTRUCTION_NODE,
+                   tree_->InternName(View(inTarget)), tree_->AddText(data));
+}
+
+// ---- document type
+
+void DocumentScanner::doctypeDecl(const xercesc::DTDElementDecl& inElement,
+                                  const XMLCh* const inPublicId, const XMLCh* const inSystemId,
+                                  const bool, const bool) {
+  tree_->AppendNew(DOM_Tree::kDocument, DOM_Node::DOCUMENT_TYPE_NODE,
+                   tree_->InternName(View(inElement.getFullName())), nullptr);
+  if (!View(inPublicId).empty()) doctype_.publicId = tree_->AddText(View(inPublicId));
+  if (inSystemId != nullptr) doctype_.systemId = tree_->AddText(View(inSystemId));
+  tree_->SetDoctype(doctype_);
+}
+
+void DocumentScanner::doctypeComment(const XMLCh* const inText) { subset_.AddComment(inText); }
+
+void DocumentScanner::doctypePI(const XMLCh* const inTarget, const XMLCh* const inData) {
+  subset_.AddProcessingInstruction(inTarget, inData);
+}
+
+void DocumentScanner::doctypeWhitespace(const XMLCh* const inText, const XMLSize_t inCount) {
+  subset_.AddWhitespace(inText, inCount);
+}
+
+void DocumentScanner::elementDecl(const xercesc::DTDElementDecl& inElement, const bool) {
+  subset_.AddElement(inElement);
+}
+
+void DocumentScanner::startAttList(const xercesc::DTDElementDecl& inElement) {
+  subset_.StartAttributes(inElement);
+}
+
+void DocumentScanner::attDef(const xercesc::DTDElementDecl&, const xercesc::DTDAttDef& inAttribute,
+                             const bool) {
+  subset_.AddAttribute(inAttribute);
+}
+
+void DocumentScanner::endAttList(const xercesc::DTDElementDecl&) { subset_.EndAttributes(); }
+
+void DocumentScanner::entityDecl(const xercesc::DTDEntityDecl& inEntity, const bool inIsParameter,
+                                 const bool) {
+  subset_.AddEntity(inEntity, inIsParameter);
+}
+
+void DocumentScanner::notationDecl(const xercesc::XMLNotationDecl& inNotation, const bool) {
+  subset_.AddNotation(inNotation);
+}
+
+void DocumentScanner::endIntSubset() {
+  doctype_.internalSubset = tree_->AddText(subset_.Text());
+  tree_->SetDoctype(doctype_);
+}
+
+// ---- failures
+
+void DocumentScanner::error(const unsigned int inCode, const XMLCh* const inDomain,
+                            const ErrTypes inType, const XMLCh* const inText, const XMLCh* const,
+                            const XMLCh* const, const XMLFileLoc inLine,
+                            const XMLFileLoc inColumn) {
+  if (inType != ErrType_Fatal) return;  // a document type that is not enforced
+  if (inCode == xercesc::XMLErrs::EmptyMainEntity &&
+      View(inDomain) == View(xercesc::XMLUni::fgXMLErrDomain))
+    throw EmptyDocument();
+  throw ScanFailure{inLine, inColumn, OneLineReason(inText)};
+}
+
+xercesc::InputSource* DocumentScanner::resolveEntity(xercesc::XMLResourceIdentifier*) {
+  FailHere("external entities are not opened");
+}

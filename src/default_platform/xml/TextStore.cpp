@@ -1,0 +1,75 @@
+#include "default_platform/xml/TextStore.h"
+
+#include <algorithm>
+#include <limits>
+#include <stdexcept>
+
+namespace {
+constexpr std::size_t kFirstBlock = std::size_t{4} * 1024;
+constexpr std::size_t kLargestBlock = std::size_t{1024} * 1024;
+constexpr std::size_t kFirstSlots = 64;
+}  // namespace
+
+TextStore::TextStore() : nextBlock_(kFirstBlock), shared_(new const DOM_Text*[kSharedSlots]()) {}
+
+const DOM_Text* TextStore::Add(std::u16string_view inText) {
+  if (inText.size() > kLongestShared) return AddUnshared(inText);
+  const DOM_Text*& slot = shared_[HashOfText(inText) % kSharedSlots];
+  if (slot == nullptr || slot->View() != inText) slot = AddUnshared(inText);
+  return slot;
+}
+
+const DOM_Text* TextStore::AddUnshared(std::u16string_view inText) {
+  if (inText.size() > std::numeric_limits<std::uint32_t>::max())
+    throw std::length_error("a text is longer than 4,294,967,295 units");
+  const std::size_t bytes = sizeof(DOM_Text) + inText.size() * sizeof(char16_t);
+  DOM_Text* text = new (Allocate((bytes + 3) & ~std::size_t{3}))
+      DOM_Text{static_cast<std::uint32_t>(inText.size())};
+  std::copy(inText.begin(), inText.end(), text->Units());
+  return text;
+}
+
+char* TextStore::Allocate(std::size_t inBytes) {
+  if (static_cast<std::size_t>(end_ - free_) >= inBytes) {
+    char* const place = free_;
+    free_ += inBytes;
+    return place;
+  }
+  if (inBytes > nextBlock_ / 4) {  // a block of its own; the current one stays in use
+    blocks_.emplace_back(new char[inBytes]);
+    return blocks_.back().get();
+  }
+  blocks_.emplace_back(new char[nextBlock_]);
+  free_ = blocks_.back().get();
+  end_ = free_ + nextBlock_;
+  nextBlock_ = std::min(nextBlock_ * 2, kLargestBlock);
+  return Allocate(inBytes);
+}
+
+NameTable::NameTable(TextStore& ioTexts) : texts_(ioTexts), names_(1), slots_(kFirstSlots) {
+  names_[0] = texts_.Add({});
+}
+
+std::size_t NameTable::SlotOf(std::u16string_view inName) const {
+  const std::size_t mask = slots_.size() - 1;
+  std::size_t slot = HashOfText(inName) & mask;
+  while (slots_[slot] != 0 && names_[slots_[slot]]->View() != inName) slot = (slot + 1) & mask;
+  return slot;
+}
+
+std::uint32_t NameTable::Find(std::u16string_view inName) const { return slots_[SlotOf(inName)]; }
+
+std::uint32_t NameTable::Intern(std::u16string_view inName) {
+  const std::size_t slot = SlotOf(inName);
+  if (slots_[slot] != 0) return slots_[slot];
+  const std::uint32_t name = End();
+  names_.push_back(texts_.AddUnshared(inName));
+  slots_[slot] = name;
+  if (names_.size() * 2 > slots_.size()) Grow();
+  return name;
+}
+
+void NameTable::Grow() {
+  slots_.assign(slots_.size() * 2, 0);
+  for (std::uint32_t name = 1; name < End(); ++name) slots_[SlotOf(names_[name]->View())] = name;
+}
