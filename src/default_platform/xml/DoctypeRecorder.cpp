@@ -1,5 +1,6 @@
 #include "default_platform/xml/DoctypeRecorder.h"
 
+#include <string>
 #include <string_view>
 #include <vector>
 #include <xercesc/validators/common/ContentSpecNode.hpp>
@@ -14,23 +15,11 @@ std::u16string_view OrEmpty(const char16_t* inText) {
   return inText == nullptr ? std::u16string_view() : std::u16string_view(inText);
 }
 
-std::u16string CharacterReference(char16_t inUnit) {
-  std::u16string digits;
-  for (unsigned int number = inUnit; number != 0; number /= 10)
-    digits.insert(digits.begin(), static_cast<char16_t>(u'0' + number % 10));
-  return u"&#" + digits + u";";
-}
-
-// A value as a literal: what the literal would not give back as it is becomes a reference.
-std::u16string Escaped(std::u16string_view inText, std::u16string_view inSpecial) {
-  std::u16string escaped;
-  for (const char16_t unit : inText) {
-    if (inSpecial.find(unit) != std::u16string_view::npos)
-      escaped += CharacterReference(unit);
-    else
-      escaped += unit;
-  }
-  return escaped;
+void AppendReference(std::u16string& ioText, char16_t inUnit) {
+  ioText += u"&#";
+  for (const char digit : std::to_string(static_cast<unsigned int>(inUnit)))
+    ioText += static_cast<char16_t>(digit);
+  ioText += u';';
 }
 
 constexpr std::u16string_view kSpecialInEntity = u"&%\"\r";
@@ -82,7 +71,7 @@ std::u16string ModelText(const ContentSpecNode& inModel) {
   const std::u16string_view suffix = SuffixOf(inModel);
   const ContentSpecNode& core = suffix.empty() ? inModel : *inModel.getFirst();
   if (core.getType() == ContentSpecNode::Leaf)
-    return u"(" + std::u16string(NameOf(core)) + u")" + std::u16string(suffix);
+    return std::u16string(u"(").append(NameOf(core)).append(u")").append(suffix);
   std::u16string text;
   std::vector<Pending> pending{{&inModel, {}, ContentSpecNode::Leaf}};
   while (!pending.empty()) {
@@ -166,7 +155,7 @@ void DoctypeRecorder::AddAttribute(const XMLAttDef& inAttribute) {
   if (defaultType == XMLAttDef::Implied) text_ += u" #IMPLIED";
   if (defaultType == XMLAttDef::Fixed) text_ += u" #FIXED";
   if (defaultType == XMLAttDef::Fixed || defaultType == XMLAttDef::Default)
-    text_ += u" \"" + Escaped(OrEmpty(inAttribute.getValue()), kSpecialInDefault) + u"\"";
+    AddValue(OrEmpty(inAttribute.getValue()), kSpecialInDefault);
 }
 
 void DoctypeRecorder::AddEntity(const xercesc::DTDEntityDecl& inEntity, bool inIsParameter) {
@@ -175,7 +164,7 @@ void DoctypeRecorder::AddEntity(const xercesc::DTDEntityDecl& inEntity, bool inI
     AddExternalId(inEntity.getPublicId(), inEntity.getSystemId());
     if (inEntity.isUnparsed()) text_.append(u" NDATA ").append(inEntity.getNotationName());
   } else {
-    text_ += u" \"" + Escaped(OrEmpty(inEntity.getValue()), kSpecialInEntity) + u"\"";
+    AddValue(OrEmpty(inEntity.getValue()), kSpecialInEntity);
   }
   text_ += u">";
 }
@@ -198,4 +187,16 @@ void DoctypeRecorder::AddIdLiteral(const char16_t* inText) {
   const char16_t quote = id.find(u'"') == std::u16string_view::npos ? u'"' : u'\'';
   text_ += u' ';
   text_.append(1, quote).append(id).append(1, quote);
+}
+
+// What the literal would not give back as it is becomes a reference.
+void DoctypeRecorder::AddValue(std::u16string_view inText, std::u16string_view inSpecial) {
+  text_ += u" \"";
+  for (const char16_t unit : inText) {
+    if (inSpecial.find(unit) != std::u16string_view::npos)
+      AppendReference(text_, unit);
+    else
+      text_ += unit;
+  }
+  text_ += u"\"";
 }

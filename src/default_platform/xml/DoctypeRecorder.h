@@ -3,6 +3,7 @@
 #define ZOR_DEFAULT_PLATFORM_XML_DOCTYPERECORDER_H
 
 #include <string>
+#include <string_view>
 #include <xercesc/framework/XMLAttDef.hpp>
 #include <xercesc/framework/XMLNotationDecl.hpp>
 #include <xercesc/validators/DTD/DTDElementDecl.hpp>
@@ -28,6 +29,7 @@ class DoctypeRecorder {
  private:
   void AddContentModel(const xercesc::DTDElementDecl& inElement);
   void AddExternalId(const char16_t* inPublicId, const char16_t* inSystemId);
+  void AddValue(std::u16string_view inText, std::u16string_view inSpecial);
   void AddIdLiteral(const char16_t* inText);
 
   std::u16string text_;

@@ -4,9 +4,9 @@ namespace {
 std::string Message(const std::string& inSource, std::uint64_t inLine, std::uint64_t inColumn,
                     const std::string& inReason) {
   std::string place = inSource;
-  if (inLine != 0) place += ":" + std::to_string(inLine);
-  if (inColumn != 0) place += ":" + std::to_string(inColumn);
-  return place + ": " + inReason;
+  if (inLine != 0) place.append(":").append(std::to_string(inLine));
+  if (inColumn != 0) place.append(":").append(std::to_string(inColumn));
+  return place.append(": ").append(inReason);
 }
 }  // namespace
 
