@@ -1,0 +1,35 @@
+// The drawn form of a part: triangles and edges.
+#ifndef ZOR_DEFAULT_PLATFORM_VISUALISATION_PARTMESH_H
+#define ZOR_DEFAULT_PLATFORM_VISUALISATION_PARTMESH_H
+
+#include <array>
+#include <cstdint>
+#include <memory>
+#include <vector>
+
+#include "platform/mathematics/ZORMathTransformation.h"
+#include "platform/visualisation/ZOR3DBoundingSphere.h"
+#include "platform/visualisation/ZOR3DRep.h"
+
+/// 8-bit red, green, blue, alpha.
+typedef std::array<std::uint8_t, 4> PartColour;
+
+/// Triangles and edge polylines of one part, shared by all its instances. Positions are single
+/// precision relative to `origin`, which lies in the middle of the part, so that a part far from
+/// the origin of its space loses nothing.
+struct PartMesh {
+  ZORMathVector origin;                       ///< in the part's space, millimetres
+  std::vector<std::array<float, 3>> points;   ///< relative to origin
+  std::vector<std::array<float, 3>> normals;  ///< unit, of the surface; one a point
+  std::vector<std::array<std::uint32_t, 3>> triangles;
+  /// Colour of each triangle as a position in `colours`; empty: all have none of their own.
+  std::vector<std::uint16_t> triangleColours;
+  std::vector<PartColour> colours;  ///< colours of faces and bodies below the part
+  /// Face boundaries as polylines: positions in edgePoints, each line from lineStarts[i] to
+  /// lineStarts[i + 1].
+  std::vector<std::array<float, 3>> edgePoints;
+  std::vector<std::uint32_t> lineStarts;
+  ZOR3DBoundingSphere sphere;  ///< in the part's space
+};
+
+#endif
