@@ -1,0 +1,275 @@
+// zor_bench: times and memory of the library beside those of its peers, on generated documents.
+#include <CLI/CLI.hpp>
+#include <cmath>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <iomanip>
+#include <iostream>
+#include <sstream>
+#include <stdexcept>
+
+#include "ChildProcess.h"
+#include "ClashDocumentGenerator.h"
+#include "Measurement.h"
+#include "Results.h"
+#include "StartTimes.h"
+
+namespace {
+namespace fs = std::filesystem;
+
+struct Options {
+  std::vector<std::size_t> sizes = {1000, 10'000, 100'000};
+  std::vector<std::string> benchmarks = {"load", "loop",   "merge", "report",
+                                         "dump", "escape", "start"};
+  std::size_t escapedCharacters = 100'000'000;
+  int repeats = 5;
+  std::string csv;
+};
+
+struct Subject {
+  const char* name;
+  const char* measurement;
+};
+
+// A directory of our own, gone at the end.
+class Scratch {
+ public:
+  Scratch() {
+    std::string pattern = (fs::temp_directory_path() / "zor_bench.XXXXXX").string();
+    if (mkdtemp(pattern.data()) == nullptr)
+      throw std::runtime_error("no directory can be made in " + fs::temp_directory_path().string());
+    path_ = pattern;
+  }
+  Scratch(const Scratch&) = delete;
+  Scratch& operator=(const Scratch&) = delete;
+  ~Scratch() {
+    std::error_code ignored;
+    fs::remove_all(path_, ignored);
+  }
+  const fs::path& Path() const { return path_; }
+
+ private:
+  fs::path path_;
+};
+
+// The measuring process prints its steps, name last since it may hold spaces.
+void PrintSteps(const Steps& inSteps) {
+  std::cout << std::setprecision(17);
+  for (const Step& step : inSteps)
+    std::cout << step.milliseconds << ' ' << step.peakMegabytes << ' ' << step.hash << ' '
+              << step.name << '\n';
+}
+
+Steps ReadSteps(const std::string& inText) {
+  Steps steps;
+  std::istringstream text(inText);
+  for (Step step; text >> step.milliseconds >> step.peakMegabytes >> step.hash;) {
+    std::getline(text >> std::ws, step.name);
+    steps.push_back(step);
+  }
+  return steps;
+}
+
+class Bench {
+ public:
+  explicit Bench(const Options& inOptions) : options_(inOptions) {}
+
+  void Run() {
+    for (std::size_t size : options_.sizes) RunOnDocuments(size);
+    if (IsWanted("escape")) {
+      Compare("escape", options_.escapedCharacters,
+              {{"ZORLyra", "escape-zorlyra"},
+               {"append each", "escape-append"},
+               {"push_back each", "escape-push-back"}},
+              {std::to_string(options_.escapedCharacters)});
+    }
+    if (IsWanted("start")) TimeStarts();
+    PrintTargets();
+  }
+
+  const Results& Measured() const { return results_; }
+
+ private:
+  bool IsWanted(const std::string& inBenchmark) const {
+    const auto& wanted = options_.benchmarks;
+    return std::find(wanted.begin(), wanted.end(), inBenchmark) != wanted.end();
+  }
+
+  std::string Document(const std::string& inName, std::size_t inCount, std::uint64_t inSeed,
+                       void (*inWrite)(std::size_t, std::uint64_t, std::ostream&)) {
+    const fs::path path = scratch_.Path() / inName;
+    std::ofstream file(path, std::ios::binary);
+    inWrite(inCount, inSeed, file);
+    if (!file.flush()) throw std::runtime_error("no room for the documents");
+    return path.string();
+  }
+
+  void RunOnDocuments(std::size_t inSize) {
+    const std::string clashes = Document("clashes.xml", inSize, 1, WriteClashDocument);
+    const std::string output = (scratch_.Path() / "output.xml").string();
+    if (IsWanted("load"))
+      Compare("load", inSize,
+              {{"ZORLyra", "load-zorlyra"},
+               {"Xerces-C DOM", "load-xerces"},
+               {"libxml2", "load-libxml2"},
+               {"pugixml", "load-pugixml"}},
+              {clashes});
+    if (IsWanted("loop"))
+      Compare("loop", inSize, {{"ZORLyra", "loop-zorlyra"}, {"pugixml, by hand", "loop-pugixml"}},
+              {clashes, Document("components.xml", inSize / 10, 2, WriteComponentsDocument)});
+    if (IsWanted("merge"))
+      Compare("merge", inSize, {{"ZORLyra", "merge-zorlyra"}, {"Xerces-C DOM", "merge-xerces"}},
+              {Document("first.xml", inSize / 2, 3, WriteClashDocument),
+               Document("second.xml", inSize / 2, 4, WriteClashDocument)});
+    if (IsWanted("report"))
+      Compare("report", inSize, {{"ZORLyra", "report-zorlyra"}, {"std::string", "report-plain"}},
+              {clashes, output});
+    if (IsWanted("dump"))
+      Compare("dump", inSize, {{"ZORLyra", "dump-zorlyra"}, {"Xerces-C DOM", "dump-xerces"}},
+              {clashes, output});
+  }
+
+  // Runs all subjects in turn, each time another one first, so that what the machine does meanwhile
+  // meets all of them.
+  void Compare(const std::string& inBenchmark, std::size_t inSize,
+               const std::vector<Subject>& inSubjects, const Arguments& inArguments) {
+    const int repeats = inSize <= 10'000 ? 3 * options_.repeats : options_.repeats;
+    std::vector<std::vector<Steps>> measured(inSubjects.size());
+    for (int repeat = 0; repeat < repeats; ++repeat)
+      for (std::size_t i = 0; i < inSubjects.size(); ++i) {
+        const std::size_t turn = (i + static_cast<std::size_t>(repeat)) % inSubjects.size();
+        measured[turn].push_back(RunMeasurement(inSubjects[turn].measurement, inArguments));
+      }
+    for (std::size_t i = 0; i < inSubjects.size(); ++i)
+      results_.Add(inBenchmark, inSubjects[i].name, inSize, measured[i]);
+    results_.PrintTable(inBenchmark, inSize, std::cout);
+  }
+
+  Steps RunMeasurement(const std::string& inMeasurement, const Arguments& inArguments) const {
+    std::vector<std::string> command = {program_, "--measure", inMeasurement};
+    command.insert(command.end(), inArguments.begin(), inArguments.end());
+    const ChildOutcome outcome = RunChild(command);
+    if (outcome.exitCode != 0) throw std::runtime_error(inMeasurement + " failed");
+    return ReadSteps(outcome.output);
+  }
+
+  void TimeStarts() {
+    const std::string lyra = (fs::path(program_).parent_path() / "lyra").string();
+    if (!fs::exists(lyra)) {
+      std::cerr << "zor_bench: the command is not built; its start is not measured\n";
+      return;
+    }
+    constexpr std::size_t kSmall = 32;
+    const std::string document = Document("small.xml", kSmall, 1, WriteClashDocument);
+    const std::vector<std::string> info = {lyra, "info", document};
+    const auto times =
+        TimeCommands({info, {"xmllint", "--noout", document}}, 20 * options_.repeats);
+    results_.Add("start", "lyra info", kSmall, times[0]);
+    results_.Add("start", "xmllint --noout", kSmall, times[1]);
+    results_.PrintTable("start", kSmall, std::cout);
+    heavyLibraries_ = HeavyLibrariesOf(info, scratch_.Path());
+    startMeasured_ = true;
+  }
+
+  void PrintTarget(const std::string& inWhat, double inRatio, const char* inRelation,
+                   double inLimit) const {
+    if (std::isnan(inRatio)) return;
+    const bool isLimitFromBelow = std::string_view(inRelation) == "at least";
+    const bool isKept = isLimitFromBelow ? inRatio >= inLimit : inRatio <= inLimit;
+    std::cout << "  " << (isKept ? "kept    " : "NOT KEPT") << "  " << std::left << std::setw(66)
+              << inWhat << std::right << std::fixed << std::setprecision(2) << std::setw(7)
+              << inRatio << "  (" << inRelation << ' ' << inLimit << ")\n";
+  }
+
+  double Ratio(const std::string& inBenchmark, std::size_t inSize, const char* inSubject,
+               const char* inStep, const char* inOtherSubject, const char* inOtherStep) const {
+    return results_.Milliseconds(inBenchmark, inSubject, inSize, inStep) /
+           results_.Milliseconds(inBenchmark, inOtherSubject, inSize, inOtherStep);
+  }
+
+  void PrintTargets() const {
+    const std::size_t least = options_.sizes.front();
+    const std::size_t most = options_.sizes.back();
+    const double growth = results_.AllMilliseconds("loop", "ZORLyra", most) /
+                          results_.AllMilliseconds("loop", "ZORLyra", least) *
+                          static_cast<double>(least) / static_cast<double>(most);
+    std::cout << "\nTargets, at " << most << '\n';
+    PrintTarget("reading loop, time each there / at " + std::to_string(least), growth, "at most",
+                1.5);
+    PrintTarget("all GetClashInfos, full form / load",
+                Ratio("loop", most, "ZORLyra", "full", "ZORLyra", "load"), "at most", 1);
+    PrintTarget("merge / load of both", Ratio("merge", most, "ZORLyra", "merge", "ZORLyra", "load"),
+                "at most", 0.5);
+    PrintTarget("report by markers, write / load",
+                Ratio("report", most, "ZORLyra", "write", "ZORLyra", "load"), "at most", 1);
+    PrintTarget("DumpDocument / Xerces-C's serialiser",
+                Ratio("dump", most, "ZORLyra", "dump", "Xerces-C DOM", "dump"), "at most", 1);
+    const std::size_t characters = options_.escapedCharacters;
+    PrintTarget("append each character / CheckXMLString",
+                Ratio("escape", characters, "append each", "escape", "ZORLyra", "escape"),
+                "at least", 10);
+    if (!startMeasured_) return;
+    PrintTarget("lyra info / xmllint --noout",
+                Ratio("start", 32, "lyra info", "run", "xmllint --noout", "run"), "at most", 3);
+    std::cout << "  CAD and rendering libraries that lyra info loads:";
+    for (const std::string& library : heavyLibraries_) std::cout << ' ' << library;
+    std::cout << (heavyLibraries_.empty() ? " none\n" : "\n");
+  }
+
+  Options options_;
+  Scratch scratch_;
+  const std::string program_ = fs::read_symlink("/proc/self/exe").string();
+  Results results_;
+  bool startMeasured_ = false;
+  std::vector<std::string> heavyLibraries_;
+};
+
+int Measure(const Arguments& inWords) {
+  const Measurement measurement = inWords.empty() ? nullptr : FindMeasurement(inWords[0]);
+  if (measurement == nullptr) throw std::runtime_error("unknown measurement");
+  PrintSteps(measurement({inWords.begin() + 1, inWords.end()}));
+  return 0;
+}
+
+int RunBench(const Options& inOptions) {
+  setenv("ZOR_LANG", "en", 1);  // the documents' words are English
+  Bench bench(inOptions);
+  bench.Run();
+  if (!inOptions.csv.empty()) {
+    std::ofstream csv(inOptions.csv);
+    bench.Measured().WriteCsv(csv);
+    if (!csv.flush()) throw std::runtime_error("cannot write " + inOptions.csv);
+  }
+  return bench.Measured().Agree(std::cerr) ? 0 : 1;
+}
+}  // namespace
+
+int main(int inCount, char** inArguments) {
+  try {
+    if (inCount > 1 && std::string_view(inArguments[1]) == "--measure")
+      return Measure({inArguments + 2, inArguments + inCount});
+
+    Options options;
+    CLI::App app{"Times and memory of the library beside those of its peers."};
+    app.add_option("--sizes", options.sizes, "numbers of interferences, ascending")
+        ->delimiter(',')
+        ->capture_default_str();
+    app.add_option("--only", options.benchmarks, "benchmarks to run")
+        ->delimiter(',')
+        ->check(CLI::IsMember(options.benchmarks))
+        ->capture_default_str();
+    app.add_option("--characters", options.escapedCharacters, "length of the text that is escaped")
+        ->capture_default_str();
+    app.add_option("--repeats", options.repeats,
+                   "runs of each, of which the median counts; three times as many up to 10000")
+        ->check(CLI::PositiveNumber)
+        ->capture_default_str();
+    app.add_option("--csv", options.csv, "file for all rows");
+    CLI11_PARSE(app, inCount, inArguments);
+    return RunBench(options);
+  } catch (const std::exception& error) {
+    std::cerr << "zor_bench: " << error.what() << '\n';
+    return 1;
+  }
+}

@@ -1,0 +1,28 @@
+#include "Measurement.h"
+
+#include <fstream>
+#include <map>
+
+double PeakMegabytes() {
+  std::ifstream status("/proc/self/status");
+  std::string word;
+  while (status >> word)
+    if (word == "VmHWM:") break;
+  double kilobytes = 0;
+  status >> kilobytes;
+  return kilobytes / 1024;
+}
+
+Measurement FindMeasurement(const std::string& inName) {
+  static const std::map<std::string, Measurement> kMeasurements = {
+      {"load-zorlyra", LoadWithZORLyra},     {"load-xerces", LoadWithXerces},
+      {"load-libxml2", LoadWithLibxml2},     {"load-pugixml", LoadWithPugixml},
+      {"loop-zorlyra", LoopWithZORLyra},     {"loop-pugixml", LoopWithPugixml},
+      {"merge-zorlyra", MergeWithZORLyra},   {"merge-xerces", MergeWithXerces},
+      {"report-zorlyra", ReportWithZORLyra}, {"report-plain", ReportWithPlainText},
+      {"dump-zorlyra", DumpWithZORLyra},     {"dump-xerces", DumpWithXerces},
+      {"escape-zorlyra", EscapeWithZORLyra}, {"escape-append", EscapeByCharacter},
+      {"escape-push-back", EscapeByPushBack}};
+  const auto found = kMeasurements.find(inName);
+  return found == kMeasurements.end() ? nullptr : found->second;
+}

@@ -1,0 +1,71 @@
+// What is measured. Each measurement runs in a process of its own, so that neither its memory nor
+// what it leaves warm is another's.
+#ifndef ZOR_BENCH_MEASUREMENT_H
+#define ZOR_BENCH_MEASUREMENT_H
+
+#include <chrono>
+#include <cstdint>
+#include <string>
+#include <vector>
+
+/// One timed step of a measurement.
+struct Step {
+  std::string name;
+  double milliseconds;
+  double peakMegabytes;  ///< of the process up to the end of the step
+  std::uint64_t hash;    ///< of what the step answered; 0 for a step without answer
+};
+using Steps = std::vector<Step>;
+using Arguments = std::vector<std::string>;
+
+/// The most memory that this process has had so far.
+double PeakMegabytes();
+
+class Stopwatch {
+ public:
+  double Milliseconds() const {
+    return std::chrono::duration<double, std::milli>(Clock::now() - start_).count();
+  }
+
+ private:
+  using Clock = std::chrono::steady_clock;
+  Clock::time_point start_ = Clock::now();
+};
+
+/// Times inWork and appends the step, its hash still 0.
+template <class Work>
+void TimeStep(const std::string& inName, Steps& ioSteps, const Work& inWork) {
+  const Stopwatch watch;
+  inWork();
+  const double milliseconds = watch.Milliseconds();
+  ioSteps.push_back({inName, milliseconds, PeakMegabytes(), 0});
+}
+
+// The measurements by subject. Arguments are paths of documents, outputs last.
+Steps LoadWithZORLyra(const Arguments& inArguments);
+Steps LoadWithXerces(const Arguments& inArguments);
+Steps LoadWithLibxml2(const Arguments& inArguments);
+Steps LoadWithPugixml(const Arguments& inArguments);
+/// Steps "load", "short", "full", "copy", "specifications", "load components", "components" of a
+/// clash document and a document of components.
+Steps LoopWithZORLyra(const Arguments& inArguments);
+Steps LoopWithPugixml(const Arguments& inArguments);
+/// Steps "load" of two documents and "merge".
+Steps MergeWithZORLyra(const Arguments& inArguments);
+Steps MergeWithXerces(const Arguments& inArguments);
+/// Steps "load" and "write", of a report of all interferences into a file.
+Steps ReportWithZORLyra(const Arguments& inArguments);
+Steps ReportWithPlainText(const Arguments& inArguments);
+/// Step "dump", of a document into a file.
+Steps DumpWithZORLyra(const Arguments& inArguments);
+Steps DumpWithXerces(const Arguments& inArguments);
+/// Step "escape", of a text of so many characters.
+Steps EscapeWithZORLyra(const Arguments& inArguments);
+Steps EscapeByCharacter(const Arguments& inArguments);
+Steps EscapeByPushBack(const Arguments& inArguments);
+
+using Measurement = Steps (*)(const Arguments&);
+/// @return null for an unknown name.
+Measurement FindMeasurement(const std::string& inName);
+
+#endif
