@@ -96,10 +96,7 @@ bool IsPlainUnit(std::string_view inUnit) {
   return true;
 }
 
-std::optional<Measure> MeasureOf(const std::string& inUnit) {
-  if (!IsPlainUnit(inUnit)) return std::nullopt;
-  static std::mutex mutex;  // the parser of the dictionary's grammar keeps its state in statics
-  const std::lock_guard lock(mutex);
+std::optional<Measure> ParseUnit(const std::string& inUnit) {
   const CLocaleScope cLocale;
   const std::unique_ptr<ut_unit, decltype(&ut_free)> unit(
       ut_parse(UnitSystem(), inUnit.c_str(), UT_UTF8), &ut_free);
@@ -108,6 +105,19 @@ std::optional<Measure> MeasureOf(const std::string& inUnit) {
   if (!unit || ut_accept_visitor(unit.get(), &visitor, &measure) != UT_SUCCESS) return std::nullopt;
   std::erase_if(measure.dimension, [](const auto& inPower) { return inPower.second == 0; });
   return measure;
+}
+
+// What a unit measures; remembered, since a document says "mm" many times.
+std::optional<Measure> MeasureOf(const std::string& inUnit) {
+  constexpr std::size_t kMostRemembered = 256;
+  if (!IsPlainUnit(inUnit)) return std::nullopt;
+  static std::mutex mutex;  // also for the parser, which keeps its state in statics
+  static auto* const known = new std::map<std::string, std::optional<Measure>, std::less<>>();
+  const std::lock_guard lock(mutex);
+  const auto found = known->find(inUnit);
+  if (found != known->end()) return found->second;
+  if (known->size() == kMostRemembered) known->clear();
+  return (*known)[inUnit] = ParseUnit(inUnit);
 }
 
 // Text without the blanks at its ends; those that typesetting puts before units count too.

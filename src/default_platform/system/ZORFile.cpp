@@ -105,24 +105,30 @@ int MakeFileBeside(const std::string& inPath, mode_t inMode, std::string& outPat
   return descriptor;
 }
 
-HRESULT Rename(const std::string& inFrom, const std::string& inTo, bool inKeepTarget) {
-  if (!inKeepTarget) return rename(inFrom.c_str(), inTo.c_str()) == 0 ? S_OK : ResultOf(errno);
+// What a copy finds in its target's place and may do with it.
+enum class Target { kReplaced, kNew, kNewOrRefused };
+
+HRESULT Rename(const std::string& inFrom, const std::string& inTo, Target inTarget) {
+  if (inTarget != Target::kNewOrRefused)
+    return rename(inFrom.c_str(), inTo.c_str()) == 0 ? S_OK : ResultOf(errno);
   // Seen to be free before; another process may have been quicker.
   if (renameat2(AT_FDCWD, inFrom.c_str(), AT_FDCWD, inTo.c_str(), RENAME_NOREPLACE) == 0)
     return S_OK;
   if (errno != EINVAL && errno != ENOSYS) return ResultOf(errno);
-  return Rename(inFrom, inTo, false);
+  return Rename(inFrom, inTo, Target::kNew);
 }
 
 // Copies to a new file beside the target and puts it in the target's place when it is complete.
-HRESULT CopyBeside(int inSource, const std::string& inTarget, mode_t inMode, bool inKeepTarget) {
+HRESULT CopyBeside(int inSource, const std::string& inTarget, mode_t inMode, Target inState) {
   std::string besidePath;
   Descriptor beside(MakeFileBeside(inTarget, inMode & 0777, besidePath));
   if (!beside.IsOpen()) return ResultOf(errno);
+  // A file that is replaced keeps its permissions; a new one has those of the user's mask.
+  if (inState == Target::kReplaced) fchmod(beside.Get(), inMode & 07777);
   HRESULT result = CopyBytes(inSource, beside.Get());
   const HRESULT closed = beside.Close();
   if (SUCCEEDED(result)) result = closed;
-  if (SUCCEEDED(result)) result = Rename(besidePath, inTarget, inKeepTarget);
+  if (SUCCEEDED(result)) result = Rename(besidePath, inTarget, inState);
   if (FAILED(result)) unlink(besidePath.c_str());
   return result;
 }
@@ -148,7 +154,7 @@ HRESULT CopyOnto(int inSource, const struct stat& inSourceStatus, const std::str
     return S_OK;
   if (access(inTarget.c_str(), W_OK) != 0) return ResultOf(errno);
   if (S_ISREG(inTargetStatus.st_mode))
-    return CopyBeside(inSource, ResolvedPath(inTarget), inTargetStatus.st_mode, false);
+    return CopyBeside(inSource, ResolvedPath(inTarget), inTargetStatus.st_mode, Target::kReplaced);
   // A device or a pipe is written into, not replaced by a file.
   Descriptor target(open(inTarget.c_str(), O_WRONLY | O_CLOEXEC));
   if (!target.IsOpen()) return ResultOf(errno);
@@ -225,7 +231,8 @@ HRESULT ZORFCopy(const wchar_t* inSource, const wchar_t* inTarget, int inFlags) 
   struct stat targetStatus;
   if (stat(targetPath.c_str(), &targetStatus) != 0) {
     if (errno != ENOENT) return ResultOf(errno);
-    return CopyBeside(source.Get(), targetPath, sourceStatus.st_mode, inFlags == 1);
+    return CopyBeside(source.Get(), targetPath, sourceStatus.st_mode,
+                      inFlags == 1 ? Target::kNewOrRefused : Target::kNew);
   }
   if (inFlags == 1) return kZORFileExists;
   return CopyOnto(source.Get(), sourceStatus, targetPath, targetStatus);
