@@ -35,4 +35,11 @@ DOM_Node FirstElement(const DOM_Node& inParent, const NameText& inName) {
   return child;
 }
 
+/// Whether a node is in the tree of its document: not made and kept outside, nor taken out.
+inline bool IsInDocument(const DOM_Node& inNode) {
+  DOM_Node top = inNode;
+  for (DOM_Node up = top.getParentNode(); !up.isNull(); up = top.getParentNode()) top = up;
+  return top.getNodeType() == DOM_Node::DOCUMENT_NODE;
+}
+
 #endif

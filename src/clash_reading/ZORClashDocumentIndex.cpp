@@ -7,7 +7,9 @@
 
 void ZORClashDocumentIndex::Refresh(const DOM_Element& inRoot) {
   const std::uint64_t changeCount = inRoot.getChangeCount();
-  if (root_ == inRoot && changeCount_ == changeCount) return;
+  // Changes outside the document's tree are not counted: of a root that the caller took out of it
+  // nothing can be kept.
+  if (root_ == inRoot && changeCount_ == changeCount && IsInDocument(inRoot)) return;
   Forget();
   root_ = inRoot;
   changeCount_ = changeCount;

@@ -22,12 +22,6 @@ bool HasClashAttributes(const ZORUnicodeString& inRootName) {
          inRootName == "FederatorClashElement";
 }
 
-bool IsAttached(const DOM_Node& inNode) {
-  DOM_Node top = inNode;
-  for (DOM_Node up = top.getParentNode(); !up.isNull(); up = top.getParentNode()) top = up;
-  return top.getNodeType() == DOM_Node::DOCUMENT_NODE;
-}
-
 }  // namespace
 
 ZORClashParsing::ZORClashParsing(char* inPath)
@@ -50,8 +44,7 @@ ZORClashParsing::~ZORClashParsing() {
   delete index_;
 }
 
-// Loading
-// ------------------------------------------------------------------------------------------
+// ---- Loading
 
 // @param ioResult set to the reason when the source is refused before parsing; a buffer source also
 //                 leaves the code of its creation here.
@@ -124,8 +117,7 @@ HRESULT ZORClashParsing::LoadSequence(DOM_Document& outDocument, ZORUnicodeStrin
   return result;
 }
 
-// Structure
-// ----------------------------------------------------------------------------------------
+// ---- Structure
 
 DOM_NodeList ZORClashParsing::GetNodeList() {
   const bool listed = documentKind_ == "ClashElement" || documentKind_ == "FederatorClashElement";
@@ -143,10 +135,10 @@ HRESULT ZORClashParsing::GetValideNode(DOM_Node inParent, int inIndex, ZORUnicod
   const unsigned int childCount = inParent.getChildNodes().getLength();
   if (inIndex < 1 || static_cast<unsigned int>(inIndex) >= childCount) return E_FAIL;
 
-  // Changes outside the tree are not counted, so an index could not tell that it is stale there.
+  // Only changes inside the loaded document are seen by the reader's index.
   ZORClashDocumentIndex ownIndex;
   const bool ours = !root_.isNull() && inParent.getOwnerDocument() == root_.getOwnerDocument() &&
-                    IsAttached(inParent);
+                    IsInDocument(inParent);
   ZORClashDocumentIndex& index = ours ? *index_ : ownIndex;
   if (ours) index.Refresh(root_);
   const auto& children = index.NamedChildren(inParent, inName);
@@ -172,8 +164,7 @@ DOM_Node ZORClashParsing::ComponentAt(int inPosition) {
   return root_.getChildNodes().item(static_cast<unsigned int>(inPosition));
 }
 
-// Attributes of the root, and errors
-// ---------------------------------------------------------------
+// ---- Attributes of the root, and errors
 
 void ZORClashParsing::GetErrorId(ZORUnicodeString& outMessage, int& outErrorId) {
   outErrorId = -1;
@@ -195,8 +186,7 @@ ZORUnicodeString ZORClashParsing::GetPRCName() {
   return GetAttrOnNode(root_, names::PRCName.ConvertToChar());
 }
 
-// Reading attributes
-// -------------------------------------------------------------------------------
+// ---- Reading attributes
 
 ZORUnicodeString ZORClashParsing::GetAttrOnNode(DOM_Node inNode, const char* inName) {
   return ZORLyraGeneralServices::GetAttrOnNode(std::move(inNode), inName);

@@ -45,8 +45,7 @@ ZORUnicodeString SegmentsAsLines(const ZORUnicodeString& inIdentifier) {
 
 }  // namespace
 
-// Finding an interference
-// ---------------------------------------------------------------------------
+// ---- Finding an interference
 
 void ZORClashParsing::GetClashInfos(int inIndex, ZORUnicodeString& outValue,
                                     ZORUnicodeString& outResultType, ZORUnicodeString& outRuleName,
@@ -132,8 +131,7 @@ void ZORClashParsing::GetClashInfos(
   if (!inLast) nameLastResultSet();
 }
 
-// Reading one interference
-// --------------------------------------------------------------------------
+// ---- Reading one interference
 
 void ZORClashParsing::GetInterferenceDataV12(
     DOM_Node inInterference, ZORUnicodeString& outResultType, ZORUnicodeString& outClearance,

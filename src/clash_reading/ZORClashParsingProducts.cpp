@@ -70,8 +70,7 @@ void ZORClashParsing::GetPosition(int inPosition, double*& outPosition) {
   });
 }
 
-// Specification
-// ------------------------------------------------------------------------------------
+// ---- Specification
 
 void ZORClashParsing::GetSpecInfos(int& outCount) {
   index_->Refresh(root_);
@@ -106,8 +105,7 @@ void ZORClashParsing::GetProductsInSpec(
           outSecondShapeName);
 }
 
-// Linked documents
-// ---------------------------------------------------------------------------------
+// ---- Linked documents
 
 DOM_NodeList ZORClashParsing::GetListOfLinkedElements() {
   return GetElementsNode().getChildNodes();
@@ -126,8 +124,7 @@ void ZORClashParsing::GetAttOfLinkedElement(
   outSecondURL = GetAttrOnNode(inElement, "SecondProductURL");
 }
 
-// Rebuilding a session
-// -----------------------------------------------------------------------------
+// ---- Rebuilding a session
 
 void ZORClashParsing::GetReBuildSessionInfos(ZORListValZORUnicodeString& ioAliases,
                                              ZORListValZORUnicodeString& ioDescriptionIds,
