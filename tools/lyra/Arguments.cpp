@@ -1,0 +1,54 @@
+#include "lyra/Arguments.h"
+
+#include <CLI/CLI.hpp>
+
+namespace lyra {
+
+void Arguments::Positional(const char* inName, std::string& outText, const char* inHelp) {
+  app_.add_option(inName, outText, inHelp)->required()->type_name("");
+}
+
+void Arguments::Positionals(const char* inName, std::vector<std::string>& outTexts,
+                            const char* inHelp, int inFewest) {
+  app_.add_option(inName, outTexts, inHelp)
+      ->required()
+      ->type_name("")
+      ->expected(inFewest, CLI::detail::expected_max_vector_size);
+}
+
+void Arguments::PositionalNumber(const char* inName, long long& outNumber, const char* inHelp) {
+  app_.add_option(inName, outNumber, inHelp)->required()->type_name("");
+}
+
+void Arguments::Flag(const char* inNames, bool& outGiven, const char* inHelp) {
+  app_.add_flag(inNames, outGiven, inHelp);
+}
+
+void Arguments::Text(const char* inNames, const char* inValue, std::string& outText,
+                     const char* inHelp) {
+  app_.add_option(inNames, outText, inHelp)->type_name(inValue);
+}
+
+void Arguments::Texts(const char* inNames, const char* inValue, std::vector<std::string>& outTexts,
+                      const char* inHelp) {
+  app_.add_option(inNames, outTexts, inHelp)
+      ->type_name(inValue)
+      ->expected(1)
+      ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll);
+}
+
+void Arguments::RequiredText(const char* inNames, const char* inValue, std::string& outText,
+                             const char* inHelp) {
+  app_.add_option(inNames, outText, inHelp)->required()->type_name(inValue);
+}
+
+void Arguments::Language(std::string& outLanguage) {
+  Text("--lang", "LANG", outLanguage,
+       "Language of the document's words, such as en or fr (default: that of the system)");
+}
+
+void Arguments::Exclusive(const char* inName, const char* inOther) {
+  app_.get_option(inName)->excludes(app_.get_option(inOther));
+}
+
+}  // namespace lyra

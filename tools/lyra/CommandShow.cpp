@@ -1,0 +1,129 @@
+// lyra show FILE N
+#include <charconv>
+#include <memory>
+
+#include "lyra/Facts.h"
+#include "lyra/Language.h"
+#include "lyra/RecordsJson.h"
+#include "lyra/Verbs.h"
+
+namespace lyra {
+namespace {
+
+struct ShowOptions {
+  std::string file, language;
+  long long number = 0;
+  bool json = false;
+};
+
+std::string Joined(const TextTriple& inTriple) {
+  const bool isEmpty = inTriple[0].empty() && inTriple[1].empty() && inTriple[2].empty();
+  return isEmpty ? "" : inTriple[0] + ", " + inTriple[1] + ", " + inTriple[2];
+}
+
+std::string NumberShown(double inNumber) {
+  char digits[32];
+  const auto end = std::to_chars(digits, digits + sizeof digits, inNumber).ptr;
+  return std::string(digits, end);
+}
+
+std::string TripleShown(const double* inTriple) {
+  return NumberShown(inTriple[0]) + ", " + NumberShown(inTriple[1]) + ", " +
+         NumberShown(inTriple[2]);
+}
+
+void AddPlacement(const Placement& inPlacement, Facts& ioFacts) {
+  ioFacts.Add("Position", TripleShown(&inPlacement[9]));
+  ioFacts.Add("Rx", TripleShown(&inPlacement[0]));
+  ioFacts.Add("Ry", TripleShown(&inPlacement[3]));
+  ioFacts.Add("Rz", TripleShown(&inPlacement[6]));
+}
+
+void AddProduct(const char* inGroup, const ProductRecord& inProduct, Facts& ioFacts) {
+  if (!inProduct.position) return;
+  ioFacts.AddGroup(inGroup);
+  ioFacts.Add("Alias", inProduct.alias);
+  ioFacts.Add("Identifier", inProduct.id);
+  ioFacts.Add("Instance", inProduct.instance);
+  ioFacts.Add("Label", inProduct.label);
+  ioFacts.Add("Shape", inProduct.shape);
+  ioFacts.Add("Shape source", inProduct.shapeSource);
+  ioFacts.Add("Alien", inProduct.alien);
+  ioFacts.Add("Process mode", inProduct.processMode);
+  ioFacts.Add("Preview", inProduct.preview);
+  AddPlacement(*inProduct.position, ioFacts);
+}
+
+void AddRule(const RuleRecord& inRule, Facts& ioFacts) {
+  if (inRule.name.empty() && inRule.clearance.empty() && inRule.severity.empty() &&
+      inRule.penetrationCandidate.empty())
+    return;
+  ioFacts.AddGroup("Violated rule");
+  ioFacts.Add("Name", inRule.name);
+  ioFacts.Add("Clearance", inRule.clearance);
+  ioFacts.Add("Severity", inRule.severity);
+  ioFacts.Add("Penetration candidate", inRule.penetrationCandidate);
+}
+
+void AddGeometry(const InterferenceRecord& inRecord, Facts& ioFacts) {
+  if (inRecord.curveLength.empty() && inRecord.distance.empty() && inRecord.points.empty()) return;
+  ioFacts.AddGroup("Geometry");
+  ioFacts.Add("Curve length", inRecord.curveLength);
+  ioFacts.Add("Value", inRecord.distance);
+  for (const TextTriple& point : inRecord.points) ioFacts.Add("Point", Joined(point));
+}
+
+void AddViewpoint(const ViewpointRecord& inViewpoint, Facts& ioFacts) {
+  ioFacts.AddGroup("Viewpoint");
+  ioFacts.Add("Projection", inViewpoint.projection);
+  ioFacts.Add("Focus distance", inViewpoint.focusDistance);
+  ioFacts.Add("Near plane", inViewpoint.nearPlane);
+  ioFacts.Add("Far plane", inViewpoint.farPlane);
+  ioFacts.Add("Point", Joined(inViewpoint.point));
+  ioFacts.Add("Sight", Joined(inViewpoint.sight));
+}
+
+void PrintText(const InterferenceRecord& inRecord, Output& ioOutput) {
+  Facts facts("Interference " + std::to_string(inRecord.index) +
+              (inRecord.name.empty() ? "" : ": " + inRecord.name));
+  facts.Add("Result", inRecord.result);
+  facts.Add("Type", inRecord.type);
+  facts.Add("Value", inRecord.value);
+  facts.Add("Clearance", inRecord.clearance);
+  facts.Add("Status", inRecord.status);
+  facts.Add("Computation case", inRecord.computationCase);
+  facts.Add("Retrieve", inRecord.retrieve);
+  facts.Add("Comment", inRecord.comment);
+  facts.Add("Picture", inRecord.picture);
+  AddRule(inRecord.rule, facts);
+  AddProduct("First product", inRecord.products[0], facts);
+  AddProduct("Second product", inRecord.products[1], facts);
+  AddGeometry(inRecord, facts);
+  if (inRecord.viewpoint) AddViewpoint(*inRecord.viewpoint, facts);
+  facts.Print(ioOutput);
+}
+
+int Show(const ShowOptions& inOptions, Output& ioOutput) {
+  ChooseLanguage(inOptions.language);
+  ClashResultFile file(inOptions.file);
+  const InterferenceRecord record =
+      ReadInterference(file, FindInterference(file, inOptions.number));
+  if (inOptions.json)
+    ioOutput.Write(JsonText(record) + "\n");
+  else
+    PrintText(record, ioOutput);
+  return 0;
+}
+
+}  // namespace
+
+VerbAction DeclareShow(Arguments& ioArguments) {
+  const auto options = std::make_shared<ShowOptions>();
+  ioArguments.Positional("FILE", options->file, "A clash result, or - for standard input");
+  ioArguments.PositionalNumber("N", options->number, "Number of the interference, from 1");
+  ioArguments.Flag("--json", options->json, "Print a JSON object");
+  ioArguments.Language(options->language);
+  return [options](Output& ioOutput) { return Show(*options, ioOutput); };
+}
+
+}  // namespace lyra

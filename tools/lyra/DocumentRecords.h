@@ -1,0 +1,85 @@
+// What a document says besides its interferences.
+#ifndef ZOR_TOOLS_LYRA_DOCUMENT_RECORDS_H
+#define ZOR_TOOLS_LYRA_DOCUMENT_RECORDS_H
+
+#include <array>
+#include <optional>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "lyra/ClashResultFile.h"
+#include "lyra/InterferenceRecord.h"
+
+namespace lyra {
+
+struct ResultSetRecord {
+  std::string name, computationCase;
+  int declared = 0;  // "NbInterf", 0 when it is no number
+  int found = 0;
+};
+
+struct ErrorRecord {
+  int id = -1;
+  std::string message;
+};
+
+using AttributeTexts = std::vector<std::pair<std::string, std::string>>;
+
+struct GeneralRecord {
+  std::string file;
+  DocumentKind kind = DocumentKind::kClash;
+  std::string version, reference, responsible;
+  AttributeTexts date, specification;  // of the last "Date" and "ClashSpec"
+  std::vector<ResultSetRecord> results;
+  int interferences = 0, specifications = 0;
+  int components = 0;  // of a component list
+  int links = 0;       // of a federator document
+  std::string serverMarker, transaction, prcName;
+  std::optional<ErrorRecord> error;  // of an error report
+};
+
+struct ComponentAttributeRecord {
+  std::string name, type, value;
+};
+
+struct ShapeRecord {
+  std::string type, id, name, onDisk;
+};
+
+struct ComponentRecord {
+  int position = 0;  // among all child nodes of the root, from 0
+  std::string id, type, partNumber, uuid, documentVersion, alien;
+  std::vector<ComponentAttributeRecord> attributes, features;
+  std::vector<ShapeRecord> shapes;
+  std::optional<Placement> placement;  // absent unless all four of its elements are there
+};
+
+struct SpecifiedProducts {
+  std::string alias, id, version, alien, shape;
+};
+
+struct SpecificationRecord {
+  int index = 0;  // from 1
+  std::array<SpecifiedProducts, 2> products;
+};
+
+struct LinkedProduct {
+  std::string name, id, url;
+};
+
+struct LinkRecord {
+  std::string link;
+  std::array<LinkedProduct, 2> products;
+};
+
+GeneralRecord ReadGeneral(ClashResultFile& ioFile);
+/// Empty for a document that is no component list.
+std::vector<ComponentRecord> ReadComponents(ClashResultFile& ioFile);
+std::vector<SpecificationRecord> ReadSpecifications(ClashResultFile& ioFile);
+/// Empty for a document that is no federator document.
+std::vector<LinkRecord> ReadLinks(ClashResultFile& ioFile);
+
+}  // namespace lyra
+
+#endif

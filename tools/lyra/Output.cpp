@@ -1,0 +1,54 @@
+#include "lyra/Output.h"
+
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstdlib>
+#include <cstring>
+#include <string>
+
+#include "lyra/CommandErrors.h"
+#include "platform/system/ZORGetEnv.h"
+
+namespace lyra {
+namespace {
+
+bool IsSet(const char* inName) {
+  const char* value = ZORGetEnv(inName);
+  return value != nullptr && *value != '\0';
+}
+
+bool IsTerminalStream(std::FILE* inStream) { return isatty(fileno(inStream)) == 1; }
+
+}  // namespace
+
+Output::Output(std::FILE* inStream)
+    : stream_(inStream),
+      isTerminal_(IsTerminalStream(inStream)),
+      isStyled_(isTerminal_ && !IsSet("NO_COLOR")) {}
+
+void Output::Write(std::string_view inBytes) {
+  if (std::fwrite(inBytes.data(), 1, inBytes.size(), stream_) != inBytes.size()) Fail(errno);
+}
+
+void Output::Finish() {
+  if (std::fflush(stream_) != 0) Fail(errno);
+}
+
+void Output::Fail(int inErrorNumber) {
+  if (inErrorNumber == EPIPE) throw ReaderGone();
+  throw InputError(std::string("standard output: ") + std::strerror(inErrorNumber));
+}
+
+int Output::Width() const {
+  if (!isTerminal_) return 0;
+  if (const char* columns = ZORGetEnv("COLUMNS"); columns != nullptr) {
+    const int width = std::atoi(columns);
+    if (width > 0) return width;
+  }
+  winsize size{};
+  return ioctl(fileno(stream_), TIOCGWINSZ, &size) == 0 ? size.ws_col : 0;
+}
+
+}  // namespace lyra

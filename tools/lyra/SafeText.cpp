@@ -1,0 +1,159 @@
+#include "lyra/SafeText.h"
+
+#include <algorithm>
+#include <clocale>
+#include <cstdio>
+#include <cwchar>
+#include <cwctype>
+#include <vector>
+
+#include "lyra/DocumentText.h"
+
+namespace lyra {
+namespace {
+
+bool IsAscii(std::string_view inText) {
+  return std::all_of(inText.begin(), inText.end(),
+                     [](char inByte) { return static_cast<unsigned char>(inByte) < 0x80; });
+}
+
+bool IsPlain(std::string_view inText) {
+  return std::all_of(inText.begin(), inText.end(),
+                     [](char inByte) { return inByte >= ' ' && inByte < 0x7F; });
+}
+
+std::vector<char32_t> CodePoints(std::string_view inText) {
+  const ZORUnicodeString text = FromUtf8(inText);
+  const ZORUC2Bytes* units = text.ConvertToUCChar();
+  const int count = text.GetLengthInChar();
+  std::vector<char32_t> points;
+  points.reserve(static_cast<std::size_t>(count));
+  for (int i = 0; i < count; ++i) {
+    const bool isPair = (units[i] & 0xFC00) == 0xD800 && i + 1 < count;
+    if (isPair) {
+      points.push_back(0x10000U + ((units[i] & 0x3FFU) << 10) + (units[i + 1] & 0x3FFU));
+      ++i;
+    } else {
+      points.push_back(units[i]);
+    }
+  }
+  return points;
+}
+
+void AppendCodePoint(char32_t inPoint, ZORUnicodeString& ioText) {
+  const ZORUC2Bytes pair[2] = {static_cast<ZORUC2Bytes>(0xD7C0 + (inPoint >> 10)),
+                               static_cast<ZORUC2Bytes>(0xDC00 + (inPoint & 0x3FF))};
+  const ZORUC2Bytes unit = static_cast<ZORUC2Bytes>(inPoint);
+  if (inPoint < 0x10000)
+    ioText.AppendUTF16(&unit, 1);
+  else
+    ioText.AppendUTF16(pair, 2);
+}
+
+bool IsControl(char32_t inPoint) { return inPoint < 0x20 || (inPoint >= 0x7F && inPoint < 0xA0); }
+
+// Marks, embeddings, overrides and isolates of the direction of writing; line and paragraph
+// separators; tags, which are invisible.
+bool IsDeceptive(char32_t inPoint) {
+  return inPoint == 0x061C || (inPoint >= 0x200E && inPoint <= 0x200F) ||
+         (inPoint >= 0x2028 && inPoint <= 0x202E) || (inPoint >= 0x2066 && inPoint <= 0x2069) ||
+         (inPoint >= 0xE0000 && inPoint <= 0xE007F);
+}
+
+std::string Hex(const char* inFormat, char32_t inPoint) {
+  char digits[16];
+  std::snprintf(digits, sizeof digits, inFormat, static_cast<unsigned int>(inPoint));
+  return digits;
+}
+
+/// Makes the character tables of Unicode current while it lives, whatever the process's locale.
+class UnicodeTables {
+ public:
+  UnicodeTables() : previous_(Tables() != nullptr ? uselocale(Tables()) : nullptr) {}
+  ~UnicodeTables() {
+    if (previous_ != nullptr) uselocale(previous_);
+  }
+  UnicodeTables(const UnicodeTables&) = delete;
+  UnicodeTables& operator=(const UnicodeTables&) = delete;
+
+ private:
+  // Loaded when the first text beyond ASCII comes, and kept for the process's lifetime.
+  static locale_t Tables() {
+    static const locale_t tables = newlocale(LC_CTYPE_MASK, "C.UTF-8", nullptr);
+    return tables;
+  }
+  locale_t previous_;
+};
+
+int ColumnsOf(char32_t inPoint) {
+  const int columns = wcwidth(static_cast<wchar_t>(inPoint));
+  return columns < 0 ? 1 : columns;  // not in the tables: most characters take one column
+}
+
+int ColumnsOf(const std::vector<char32_t>& inPoints) {
+  const UnicodeTables tables;
+  int width = 0;
+  for (char32_t point : inPoints) width += ColumnsOf(point);
+  return width;
+}
+
+}  // namespace
+
+std::string Printable(std::string_view inText) {
+  if (IsPlain(inText)) return std::string(inText);
+  ZORUnicodeString shown;
+  for (char32_t point : CodePoints(inText)) {
+    if (IsControl(point) || IsDeceptive(point))
+      shown += Hex("\\u{%X}", point).c_str();
+    else
+      AppendCodePoint(point, shown);
+  }
+  return Utf8(shown);
+}
+
+std::string EscapedForJson(std::string inJson) {
+  if (IsAscii(inJson) && inJson.find('\x7F') == std::string::npos) return inJson;
+  ZORUnicodeString escaped;
+  for (char32_t point : CodePoints(inJson)) {
+    if (!IsControl(point) && !IsDeceptive(point))
+      AppendCodePoint(point, escaped);
+    else if (point < 0x10000)
+      escaped += Hex("\\u%04x", point).c_str();
+    else
+      escaped += (Hex("\\u%04x", 0xD7C0 + (point >> 10)) + Hex("\\u%04x", 0xDC00 + (point & 0x3FF)))
+                     .c_str();
+  }
+  return Utf8(escaped);
+}
+
+int DisplayWidth(std::string_view inText) {
+  return IsAscii(inText) ? static_cast<int>(inText.size()) : ColumnsOf(CodePoints(inText));
+}
+
+std::string Fitted(std::string_view inText, int inWidth, Cut inCut) {
+  if (DisplayWidth(inText) <= inWidth) return std::string(inText);
+  std::vector<char32_t> points = CodePoints(inText);
+  if (inCut == Cut::kStart) std::reverse(points.begin(), points.end());
+  const UnicodeTables tables;
+  int width = 1;  // of the sign that something is missing
+  std::size_t kept = 0;
+  while (kept < points.size() && width + ColumnsOf(points[kept]) <= inWidth)
+    width += ColumnsOf(points[kept++]);
+  points.resize(kept);
+  points.push_back(U'…');
+  if (inCut == Cut::kStart) std::reverse(points.begin(), points.end());
+  ZORUnicodeString fitted;
+  for (char32_t point : points) AppendCodePoint(point, fitted);
+  return Utf8(fitted);
+}
+
+std::string CaseFolded(std::string_view inText) {
+  ZORUnicodeString folded;
+  const UnicodeTables tables;
+  // By way of the capital, so that both forms of a letter such as the Greek sigma meet.
+  for (char32_t point : CodePoints(inText))
+    AppendCodePoint(static_cast<char32_t>(towlower(towupper(static_cast<wint_t>(point)))), folded);
+  return Utf8(folded);
+}
+
+}  // namespace lyra

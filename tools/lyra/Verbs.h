@@ -1,0 +1,35 @@
+// The verbs of the command: one file each, one table of all.
+#ifndef ZOR_TOOLS_LYRA_VERBS_H
+#define ZOR_TOOLS_LYRA_VERBS_H
+
+#include <functional>
+#include <span>
+
+#include "lyra/Arguments.h"
+#include "lyra/Output.h"
+
+namespace lyra {
+
+/// What a verb does once its arguments are read. @return the exit code.
+using VerbAction = std::function<int(Output& ioOutput)>;
+
+struct Verb {
+  const char* name;
+  const char* summary;
+  VerbAction (*declare)(Arguments& ioArguments);  ///< declares the arguments of the action
+};
+
+/// In the order in which help shows them.
+std::span<const Verb> Verbs();
+
+VerbAction DeclareInfo(Arguments& ioArguments);
+VerbAction DeclareList(Arguments& ioArguments);
+VerbAction DeclareShow(Arguments& ioArguments);
+VerbAction DeclareComponents(Arguments& ioArguments);
+VerbAction DeclareSpecs(Arguments& ioArguments);
+VerbAction DeclareLinks(Arguments& ioArguments);
+VerbAction DeclareConvert(Arguments& ioArguments);
+
+}  // namespace lyra
+
+#endif

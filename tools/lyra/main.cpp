@@ -1,0 +1,3 @@
+#include "lyra/RunLyra.h"
+
+int main(int inCount, char** inArguments) { return lyra::RunLyra(inCount, inArguments); }
