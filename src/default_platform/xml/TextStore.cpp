@@ -10,13 +10,15 @@ constexpr std::size_t kLargestBlock = std::size_t{1024} * 1024;
 constexpr std::size_t kFirstSlots = 64;
 }  // namespace
 
-TextStore::TextStore() : nextBlock_(kFirstBlock), shared_(new const DOM_Text*[kSharedSlots]()) {}
+TextStore::TextStore() : nextBlock_(kFirstBlock), shared_(new Shared[kSharedSlots]()) {}
 
 const DOM_Text* TextStore::Add(std::u16string_view inText) {
   if (inText.size() > kLongestShared) return AddUnshared(inText);
-  const DOM_Text*& slot = shared_[HashOfText(inText) % kSharedSlots];
-  if (slot == nullptr || slot->View() != inText) slot = AddUnshared(inText);
-  return slot;
+  const std::uint64_t hash = HashOfText(inText);
+  Shared& slot = shared_[hash % kSharedSlots];
+  if (slot.hash != hash || slot.text == nullptr || slot.text->View() != inText)
+    slot = {hash, AddUnshared(inText)};
+  return slot.text;
 }
 
 const DOM_Text* TextStore::AddUnshared(std::u16string_view inText) {

@@ -19,16 +19,21 @@ class TextStore {
   const DOM_Text* AddUnshared(std::u16string_view inText);
 
  private:
+  /// A text met lately, with its hash, so that most others are told apart without being read.
+  struct Shared {
+    std::uint64_t hash;
+    const DOM_Text* text;
+  };
   char* Allocate(std::size_t inBytes);
 
-  static constexpr std::size_t kSharedSlots = 8192;
+  static constexpr std::size_t kSharedSlots = 4096;
   static constexpr std::size_t kLongestShared = 64;
 
   std::vector<std::unique_ptr<char[]>> blocks_;
   char* free_ = nullptr;
   char* end_ = nullptr;
   std::size_t nextBlock_;
-  std::unique_ptr<const DOM_Text*[]> shared_;
+  std::unique_ptr<Shared[]> shared_;
 };
 
 /// Numbers the names of a document: equal names have equal numbers, from 1.
