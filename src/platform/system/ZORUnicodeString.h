@@ -57,7 +57,8 @@ class ZOR_PLATFORM_EXPORT ZORUnicodeString {
   /// Puts a text before the code unit at inPosition (0 to length; other positions are brought into
   /// that range).
   ZORUnicodeString& Insert(int inPosition, const ZORUnicodeString& inText);
-  /// The text without the given character at the ends chosen by inMode (a StripMode).
+  /// The text without the given character at the ends chosen by inMode (a StripMode; any other
+  /// strips nothing).
   ZORUnicodeString Strip(int inMode = kStripBoth,
                          ZORUnicodeChar inCharacter = ZORUnicodeChar(' ')) const;
   /// Replaces the first occurrence of a text.
