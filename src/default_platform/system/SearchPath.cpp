@@ -25,7 +25,7 @@ void AppendList(std::string_view inList, std::vector<std::string>& ioDirectories
 void AppendUserDirectory(std::vector<std::string>& ioDirectories) {
   const std::string_view configuration = Variable("XDG_CONFIG_HOME");
   const std::string_view home = Variable("HOME");
-  // A relative path here is to be ignored, says the XDG base directory specification.
+  // The rules of XDG base directories: a relative path here is ignored.
   if (!configuration.empty() && configuration.front() == '/')
     ioDirectories.push_back(std::string(configuration) + "/zorlyra");
   else if (!home.empty())
