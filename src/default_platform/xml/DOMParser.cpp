@@ -1,5 +1,7 @@
 #include "platform/xml/DOMParser.h"
 
+#include <memory>
+
 #include "default_platform/xml/ByteSource.h"
 #include "default_platform/xml/DocumentScanner.h"
 #include "platform/xml/ZORXMLParseError.h"
@@ -26,7 +28,10 @@ DOMParser::~DOMParser() = default;
 
 void DOMParser::setDoValidation(bool) {}
 
-void DOMParser::parse(const char* inPath) { document_ = ScanDocument(*OpenFile(inPath), inPath); }
+void DOMParser::parse(const char* inPath) {
+  const std::unique_ptr<ByteReader> reader = OpenFile(inPath);
+  document_ = ScanDocument(*reader, inPath);
+}
 
 void DOMParser::parse(const InputSource& inSource) {
   const auto* const source = dynamic_cast<const MemorySource*>(&inSource);

@@ -56,6 +56,7 @@ DocumentScanner::DocumentScanner(ScannerMemory& ioMemory, ByteReader& ioReader)
   setDTDHandler(&unused_);
   setErrorHandler(&unused_);
   setEntityResolver(&unused_);
+  ioMemory.SetPlace(getScanner().getLocator());
 }
 
 DocumentScanner::~DocumentScanner() = default;
@@ -73,8 +74,9 @@ DOM_Document DocumentScanner::Scan() {
 void DocumentScanner::RunScanner() {
   try {
     parse(ReaderEntity(reader_));
-  } catch (const ScannerMemoryExhausted&) {
-    throw ScanFailure{0, 0, "a single name, value or text is too large"};
+  } catch (const ScannerMemoryExhausted& failure) {
+    throw ScanFailure{failure.line, failure.column,
+                      "a name, value or text is too large, or there are too many names"};
   } catch (const xercesc::OutOfMemoryException&) {
     throw ScanFailure{0, 0, "out of memory"};
   } catch (const std::bad_alloc&) {
@@ -154,8 +156,7 @@ void DocumentScanner::docCharacters(const XMLCh* const inText, const XMLSize_t i
     tree_->AppendNew(current_, DOM_Node::CDATA_SECTION_NODE, 0, tree_->AddText({inText, inCount}));
     return;
   }
-  if (text_.size() + inCount > kMostTextUnits)
-    FailHere("a single name, value or text is too large");
+  if (text_.size() + inCount > kMostTextUnits) FailHere("a text is too large");
   text_.append(inText, inCount);
 }
 
@@ -183,6 +184,14 @@ void DocumentScanner::docPI(const XMLCh* const inTarget, const XMLCh* const inDa
   Charge(kUnitsOfNode + data.size());
   tree_->AppendNew(current_, DOM_Node::PROCESSING_INSTRUCTION_NODE,
                    tree_->InternName(View(inTarget)), tree_->AddText(data));
+}
+
+// The scanner takes whatever begins with "1." for a version.
+void DocumentScanner::XMLDecl(const XMLCh* const inVersion, const XMLCh* const, const XMLCh* const,
+                              const XMLCh* const) {
+  const std::u16string_view version = View(inVersion);
+  if (version.find_first_not_of(u"0123456789", 2) != std::u16string_view::npos || version == u"1.")
+    FailHere("the XML version is not a number");
 }
 
 // ---- document type

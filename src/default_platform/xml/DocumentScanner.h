@@ -54,6 +54,8 @@ class DocumentScanner : private xercesc::SAXParser {
                            const bool inIsSection) override;
   void docComment(const XMLCh* const inText) override;
   void docPI(const XMLCh* const inTarget, const XMLCh* const inData) override;
+  void XMLDecl(const XMLCh* const inVersion, const XMLCh* const inEncoding,
+               const XMLCh* const inStandalone, const XMLCh* const inActualEncoding) override;
   void startDocument() override {}
   void endDocument() override {}
   void startEntityReference(const xercesc::XMLEntityDecl&) override {}

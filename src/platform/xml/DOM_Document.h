@@ -27,7 +27,7 @@ class ZOR_PLATFORM_EXPORT DOM_Document : public DOM_Node {
   DOM_Node createProcessingInstruction(const DOMString& inTarget, const DOMString& inData);
   DOM_Node createDocumentFragment();
   /// A copy, in this document, of a node of any document (this one too); without parent. The source
-  /// is not changed. Raises NOT_SUPPORTED_ERR for a document or a document type.
+  /// is not changed. Raises NOT_SUPPORTED_ERR for a document, a document type or an attribute.
   DOM_Node importNode(const DOM_Node& inNode, bool inDeep);
 };
 

@@ -87,7 +87,8 @@ class ZOR_PLATFORM_EXPORT DOM_Node {
   DOM_Node replaceChild(const DOM_Node& inNew, const DOM_Node& inOld);
   /// @return inChild, now without parent. Raises NOT_FOUND_ERR.
   DOM_Node removeChild(const DOM_Node& inChild);
-  /// A copy in the same document, without parent; an element's attributes are always copied.
+  /// A copy in the same document, without parent; an element's attributes are always copied. Null
+  /// for a null handle. Raises NOT_SUPPORTED_ERR for a document, a document type or an attribute.
   /// @param inDeep whether all descendants are copied too (whatever their depth: nothing here
   /// recurses).
   DOM_Node cloneNode(bool inDeep) const;

@@ -25,13 +25,15 @@ class ZOR_PLATFORM_EXPORT ZORXMLParser {
                                          const ZORUnicodeString& inIdentifier,
                                          unsigned char inAdopt, InputSource*& outSource);
 
-  /// Writes a node and all below it as XML text, without an XML declaration. Characters that must
-  /// be escaped are, so that the text reads back as an equal tree.
-  /// @param inEncoding name of the encoding the text is meant for; "UTF-8" and "UTF-16" are known.
+  /// Writes a node and all below it as XML text, without an XML declaration and with nothing between
+  /// the nodes of a document. Characters that must be escaped are, so that the text reads back as an
+  /// equal tree; only neighbouring texts read back as one, and a CDATA section that holds "]]>" or a
+  /// carriage return as several nodes with the same characters.
+  /// @param inEncoding name of the encoding the text is meant for; "UTF-8" and "UTF-16" are known, in
+  /// any case.
   /// @param outText    the text; unchanged on failure.
-  /// @return S_OK; E_INVALIDARG for a null node or an unknown encoding; E_FAIL for a tree that no
-  /// XML text can carry (a
-  ///         control character, "--" in a comment).
+  /// @return S_OK; E_INVALIDARG for a null node or an unknown encoding; E_FAIL for a tree that no XML
+  /// text can carry (a control character, half a surrogate pair, "--" in a comment).
   static HRESULT WriteXML(const DOM_Node& inNode, const ZORUnicodeString& inEncoding,
                           DOMString& outText);
 };

@@ -69,7 +69,8 @@ TEST(DOMString, CopiesShareAndAssignmentReplaces) {
 TEST(DOMString, KeepsItsDocumentAlive) {
   DOMString value;
   {
-    value = support::RootOf("<a>some longer text of the document</a>").getFirstChild().getNodeValue();
+    value =
+        support::RootOf("<a>some longer text of the document</a>").getFirstChild().getNodeValue();
   }
   EXPECT_TRUE(value.equals("some longer text of the document"));
 }

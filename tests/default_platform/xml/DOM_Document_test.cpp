@@ -53,8 +53,7 @@ TEST(DOM_Document, BuildsATreeFromNothing) {
   root.appendChild(document.createTextNode("t"));
   root.appendChild(document.createCDATASection("s"));
   root.appendChild(document.createProcessingInstruction("p", "d"));
-  EXPECT_EQ(WrittenText(document),
-            "<!--c--><root k=\"v\">t<![CDATA[s]]><?p d?></root>");
+  EXPECT_EQ(WrittenText(document), "<!--c--><root k=\"v\">t<![CDATA[s]]><?p d?></root>");
   EXPECT_EQ(document.getDocumentElement(), root);
 }
 
@@ -127,8 +126,7 @@ TEST(DOM_Document, ImportNodeFollowsNamesThatTheSourceGainsLater) {
   DOM_Document target = ParseText("<z/>");
   target.importNode(source.getDocumentElement(), true);
   source.getDocumentElement().setAttribute("added", "1");
-  EXPECT_EQ(WrittenText(target.importNode(source.getDocumentElement(), true)),
-            "<a added=\"1\"/>");
+  EXPECT_EQ(WrittenText(target.importNode(source.getDocumentElement(), true)), "<a added=\"1\"/>");
 }
 
 TEST(DOM_Document, ImportNodeOfItsOwnDocumentCopies) {
