@@ -22,7 +22,10 @@ struct PartMesh {
   std::vector<std::array<float, 3>> points;   ///< relative to origin
   std::vector<std::array<float, 3>> normals;  ///< unit, of the surface; one a point
   std::vector<std::array<std::uint32_t, 3>> triangles;
-  /// Colour of each triangle as a position in `colours`; empty: all have none of their own.
+  /// A triangle with this colour has none of its own, and is shown in the colour of its product.
+  static constexpr std::uint16_t kNoColour = 0xFFFF;
+  /// Colour of each triangle as a position in `colours`, or kNoColour; empty: all have none of
+  /// their own.
   std::vector<std::uint16_t> triangleColours;
   std::vector<PartColour> colours;  ///< colours of faces and bodies below the part
   /// Face boundaries as polylines: positions in edgePoints, each line from lineStarts[i] to

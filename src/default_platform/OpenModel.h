@@ -1,0 +1,91 @@
+// Opening a model: the way in for whoever needs products.
+#ifndef ZOR_DEFAULT_PLATFORM_OPENMODEL_H
+#define ZOR_DEFAULT_PLATFORM_OPENMODEL_H
+
+#include <array>
+#include <cstddef>
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <stdexcept>
+#include <string>
+
+#include "ZORPlatformExport.h"
+#include "platform/mathematics/ZORMathTransformation.h"
+#include "platform/product_structure/ZORDocument.h"
+#include "platform/product_structure/ZORIProduct.h"
+#include "platform/system/ZORUnicodeString.h"
+
+struct PartMesh;
+
+namespace ZORDefault {
+
+/// A model cannot be opened. what() is "PATH: REASON", one line of UTF-8.
+class ZOR_PLATFORM_EXPORT ModelError : public std::runtime_error {
+ public:
+  ModelError(const std::string& inPath, const std::string& inReason);
+  ~ModelError() override;
+  const std::string& GetPath() const { return path_; }
+  const std::string& GetReason() const { return reason_; }
+
+ private:
+  std::string path_;
+  std::string reason_;
+};
+
+struct ModelOptions {
+  /// How far triangles may lie from a part's surface, as a share of the diagonal of the part's box:
+  /// above 0, at most 0.1.
+  double deflection = 0.001;
+  /// Keep what was read in the user's cache directory ($XDG_CACHE_HOME/zorlyra, else
+  /// ~/.cache/zorlyra) and take it from there the next time. Where nothing can be written the model
+  /// is opened all the same.
+  bool useCache = true;
+  /// Told the share that is done, 0 to 1, never less than before. May be empty.
+  std::function<void(double inDone)> progress;
+  /// Told in one line of what was mended or left out. May be empty.
+  std::function<void(const std::string& inWarning)> warn;
+};
+
+/// The document and all its products live until the last handle on any of them is released.
+struct OpenedModel {
+  ZORDocument_var document;
+  ZORIProduct_var root;
+  bool isFromCache = false;
+};
+
+/// Opens a STEP, IGES, glTF, GLB, OBJ or STL file; the content decides, then the ending. Lengths
+/// become millimetres; STL and OBJ have no unit and are taken as millimetres. A file with several
+/// roots gets one above them. A placement that cannot be undone, or is not finite, is read as none,
+/// with a warning; a part without triangles stays in the tree.
+/// @param inPath in UTF-8 on Linux.
+/// Raises ModelError when nothing can be shown: there is no such file, it is empty, cut off, not of
+/// its format, or holds no geometry.
+ZOR_PLATFORM_EXPORT OpenedModel OpenModel(const std::string& inPath,
+                                          const ModelOptions& inOptions = {});
+
+/// What is known of one product of an opened model.
+struct ProductFacts {
+  ZORUnicodeString alias;
+  ZORUnicodeString instanceName;  ///< as the file has it; may be empty
+  ZORUnicodeString partName;      ///< as the file has it; may be empty
+  std::size_t part = 0;           ///< the same number for all instances of one part or assembly
+  bool isAssembly = false;
+  ZORMathTransformation fatherFromProduct;
+  ZORMathTransformation rootFromProduct;
+  std::optional<std::array<std::uint8_t, 4>>
+      colour;                 ///< its own, or its part's: red, green, blue, alpha
+  std::size_t triangles = 0;  ///< of this product alone
+  double area = 0;            ///< of those triangles, square millimetres
+  bool failedToTessellate = false;
+  std::size_t facesWithoutTriangles = 0;
+  std::shared_ptr<const PartMesh> mesh;  ///< shared by all instances; null when nothing is shown
+};
+
+/// @return false when the product is none of an opened model (or null); outFacts is untouched then.
+ZOR_PLATFORM_EXPORT bool GetProductFacts(ZORIProduct* inProduct, ProductFacts& outFacts);
+
+}  // namespace ZORDefault
+
+#endif

@@ -1,0 +1,219 @@
+#include "default_platform/product_structure/ModelCodec.h"
+
+#include <algorithm>
+#include <cstring>
+#include <type_traits>
+
+namespace ZORDefault {
+namespace {
+
+class Writer {
+ public:
+  template <class Value>
+  void Put(const Value& inValue) {
+    static_assert(std::is_trivially_copyable_v<Value>);
+    bytes_.append(reinterpret_cast<const char*>(&inValue), sizeof(Value));
+  }
+  template <class Sequence>  // a vector or a string
+  void PutAll(const Sequence& inValues) {
+    typedef typename Sequence::value_type Value;
+    static_assert(std::is_trivially_copyable_v<Value>);
+    Put<std::uint64_t>(inValues.size());
+    bytes_.append(reinterpret_cast<const char*>(inValues.data()), inValues.size() * sizeof(Value));
+  }
+  std::string Take() { return std::move(bytes_); }
+
+ private:
+  std::string bytes_;
+};
+
+/// Reads what a Writer wrote. After the first piece that is not there all others are empty too.
+class Reader {
+ public:
+  explicit Reader(std::string_view inBytes) : bytes_(inBytes) {}
+
+  template <class Value>
+  Value Get() {
+    Value value{};
+    if (Has(sizeof(Value), 1)) std::memcpy(&value, Advance(sizeof(Value)), sizeof(Value));
+    return value;
+  }
+  template <class Sequence>
+  void GetAll(Sequence& outValues) {
+    typedef typename Sequence::value_type Value;
+    const auto count = Get<std::uint64_t>();
+    if (!Has(sizeof(Value), count)) return;
+    outValues.resize(count);
+    if (count > 0)
+      std::memcpy(outValues.data(), Advance(count * sizeof(Value)), count * sizeof(Value));
+  }
+  /// A count of things that take at least one byte each.
+  std::size_t GetCount() {
+    const auto count = Get<std::uint64_t>();
+    return Has(1, count) ? count : 0;
+  }
+  bool IsAtEnd() const { return isWhole_ && position_ == bytes_.size(); }
+
+ private:
+  bool Has(std::size_t inSize, std::uint64_t inCount) {
+    isWhole_ = isWhole_ && inCount <= (bytes_.size() - position_) / inSize;
+    return isWhole_;
+  }
+  const char* Advance(std::size_t inCount) {
+    const char* const at = bytes_.data() + position_;
+    position_ += inCount;
+    return at;
+  }
+
+  std::string_view bytes_;
+  std::size_t position_ = 0;
+  bool isWhole_ = true;
+};
+
+void PutColour(Writer& ioWriter, const std::optional<PartColour>& inColour) {
+  ioWriter.Put<std::uint8_t>(inColour ? 1 : 0);
+  ioWriter.Put(inColour.value_or(PartColour{}));
+}
+
+std::optional<PartColour> GetColour(Reader& ioReader) {
+  const bool isSet = ioReader.Get<std::uint8_t>() != 0;
+  const auto colour = ioReader.Get<PartColour>();
+  return isSet ? std::optional(colour) : std::nullopt;
+}
+
+void PutMesh(Writer& ioWriter, const PartMesh& inMesh) {
+  ioWriter.Put(inMesh.origin);
+  ioWriter.PutAll(inMesh.points);
+  ioWriter.PutAll(inMesh.normals);
+  ioWriter.PutAll(inMesh.triangles);
+  ioWriter.PutAll(inMesh.triangleColours);
+  ioWriter.PutAll(inMesh.colours);
+  ioWriter.PutAll(inMesh.edgePoints);
+  ioWriter.PutAll(inMesh.lineStarts);
+  ioWriter.Put(inMesh.sphere.centre);
+  ioWriter.Put(inMesh.sphere.radius);
+}
+
+std::shared_ptr<const PartMesh> GetMesh(Reader& ioReader) {
+  auto mesh = std::make_shared<PartMesh>();
+  mesh->origin = ioReader.Get<ZORMathVector>();
+  ioReader.GetAll(mesh->points);
+  ioReader.GetAll(mesh->normals);
+  ioReader.GetAll(mesh->triangles);
+  ioReader.GetAll(mesh->triangleColours);
+  ioReader.GetAll(mesh->colours);
+  ioReader.GetAll(mesh->edgePoints);
+  ioReader.GetAll(mesh->lineStarts);
+  mesh->sphere.centre = ioReader.Get<ZORMathVector>();
+  mesh->sphere.radius = ioReader.Get<double>();
+  return mesh;
+}
+
+void PutPart(Writer& ioWriter, const ModelPart& inPart) {
+  ioWriter.PutAll(inPart.name);
+  PutColour(ioWriter, inPart.colour);
+  ioWriter.Put<std::uint8_t>(inPart.isAssembly);
+  ioWriter.Put<std::uint8_t>(inPart.failedToTessellate);
+  ioWriter.Put(inPart.facesWithoutTriangles);
+  ioWriter.Put(inPart.area);
+  ioWriter.Put<std::uint8_t>(inPart.mesh != nullptr);
+  if (inPart.mesh) PutMesh(ioWriter, *inPart.mesh);
+}
+
+ModelPart GetPart(Reader& ioReader) {
+  ModelPart part;
+  ioReader.GetAll(part.name);
+  part.colour = GetColour(ioReader);
+  part.isAssembly = ioReader.Get<std::uint8_t>() != 0;
+  part.failedToTessellate = ioReader.Get<std::uint8_t>() != 0;
+  part.facesWithoutTriangles = ioReader.Get<std::uint32_t>();
+  part.area = ioReader.Get<double>();
+  if (ioReader.Get<std::uint8_t>() != 0) part.mesh = GetMesh(ioReader);
+  return part;
+}
+
+void PutProduct(Writer& ioWriter, const ModelProduct& inProduct) {
+  ioWriter.PutAll(inProduct.name);
+  ioWriter.Put(inProduct.father);
+  ioWriter.Put(inProduct.part);
+  std::array<double, 12> placement;
+  inProduct.fatherFromProduct.GetCoefficients(placement.data());
+  ioWriter.Put(placement);
+  PutColour(ioWriter, inProduct.colour);
+}
+
+ModelProduct GetProduct(Reader& ioReader) {
+  ModelProduct product;
+  ioReader.GetAll(product.name);
+  product.father = ioReader.Get<std::int32_t>();
+  product.part = ioReader.Get<std::uint32_t>();
+  const auto c = ioReader.Get<std::array<double, 12>>();
+  product.fatherFromProduct.SetMatrix({{c[0], c[1], c[2]}, {c[3], c[4], c[5]}, {c[6], c[7], c[8]}});
+  product.fatherFromProduct.SetVector({c[9], c[10], c[11]});
+  product.colour = GetColour(ioReader);
+  return product;
+}
+
+bool IsSound(const PartMesh& inMesh) {
+  const auto isPoint = [&](std::uint32_t point) { return point < inMesh.points.size(); };
+  const auto isTriangle = [&](const auto& corners) {
+    return std::ranges::all_of(corners, isPoint);
+  };
+  const auto isColour = [&](std::uint16_t colour) {
+    return colour == PartMesh::kNoColour || colour < inMesh.colours.size();
+  };
+  const auto& starts = inMesh.lineStarts;
+  return inMesh.normals.size() == inMesh.points.size() &&
+         std::ranges::all_of(inMesh.triangles, isTriangle) &&
+         (inMesh.triangleColours.empty() ||
+          inMesh.triangleColours.size() == inMesh.triangles.size()) &&
+         std::ranges::all_of(inMesh.triangleColours, isColour) && std::ranges::is_sorted(starts) &&
+         (starts.empty() || starts.back() == inMesh.edgePoints.size());
+}
+
+bool IsSound(const ModelData& inModel) {
+  for (const ModelPart& part : inModel.parts)
+    if (part.mesh && !IsSound(*part.mesh)) return false;
+  for (std::size_t i = 0; i < inModel.products.size(); ++i) {
+    const ModelProduct& product = inModel.products[i];
+    const bool isRoot = product.father == ModelProduct::kNoFather;
+    if (isRoot != (i == 0) ||
+        (!isRoot && (product.father < 0 || static_cast<std::size_t>(product.father) >= i)))
+      return false;
+    if (product.part >= inModel.parts.size()) return false;
+  }
+  return !inModel.products.empty();
+}
+
+}  // namespace
+
+std::string EncodeModel(const ModelData& inModel) {
+  Writer writer;
+  writer.Put<std::uint64_t>(inModel.otherFiles.size());
+  for (const std::string& file : inModel.otherFiles) writer.PutAll(file);
+  writer.Put<std::uint64_t>(inModel.warnings.size());
+  for (const std::string& warning : inModel.warnings) writer.PutAll(warning);
+  writer.Put<std::uint64_t>(inModel.parts.size());
+  for (const ModelPart& part : inModel.parts) PutPart(writer, part);
+  writer.Put<std::uint64_t>(inModel.products.size());
+  for (const ModelProduct& product : inModel.products) PutProduct(writer, product);
+  return writer.Take();
+}
+
+bool DecodeModel(std::string_view inBytes, ModelData& outModel) {
+  Reader reader(inBytes);
+  ModelData model;
+  model.otherFiles.resize(reader.GetCount());
+  for (std::string& file : model.otherFiles) reader.GetAll(file);
+  model.warnings.resize(reader.GetCount());
+  for (std::string& warning : model.warnings) reader.GetAll(warning);
+  const std::size_t parts = reader.GetCount();
+  for (std::size_t i = 0; i < parts; ++i) model.parts.push_back(GetPart(reader));
+  const std::size_t products = reader.GetCount();
+  for (std::size_t i = 0; i < products; ++i) model.products.push_back(GetProduct(reader));
+  if (!reader.IsAtEnd() || !IsSound(model)) return false;
+  outModel = std::move(model);
+  return true;
+}
+
+}  // namespace ZORDefault

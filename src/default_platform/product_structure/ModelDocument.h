@@ -1,0 +1,69 @@
+// The document of an opened model.
+#ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELDOCUMENT_H
+#define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELDOCUMENT_H
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "default_platform/product_structure/Facet.h"
+#include "default_platform/product_structure/ModelData.h"
+#include "default_platform/product_structure/Product.h"
+#include "default_platform/system/ObjectCounters.h"
+#include "platform/product_structure/ZORDocument.h"
+#include "platform/product_structure/ZORIProviders.h"
+#include "platform/system/ZORUnicodeString.h"
+
+namespace ZORDefault {
+
+/// Owns a model and its products, and ends with the last reference on itself or any of them.
+class ModelDocument final : public FacetedComponent, private CountedObject<ModelDocument> {
+ public:
+  static const char* CountedName() { return "ModelDocument"; }
+
+  /// Made with one reference.
+  /// @param inFileName the root's name where it has none.
+  ModelDocument(ModelData inModel, const std::u16string& inFileName);
+  ModelDocument(const ModelDocument&) = delete;
+  ModelDocument& operator=(const ModelDocument&) = delete;
+
+  ZORBaseUnknown* FindFacet(const IID& inInterface) override;
+  ZORMetaClass* GetClass() const override;
+  unsigned int AddReference() override;
+  unsigned int ReleaseReference() override;
+
+  ZORDocument* GetInterface() { return &document_; }
+  Product& GetRoot() { return *products_.front(); }
+  const ModelData& GetModel() const { return model_; }
+  const ZORUnicodeString& GetAlias(std::size_t inProduct) const { return aliases_[inProduct]; }
+
+ private:
+  class ProvidersFacet final : public Facet<ZORIProviders> {
+   public:
+    explicit ProvidersFacet(ModelDocument& inOwner) : Facet(inOwner), self_(inOwner) {}
+    HRESULT AddProvider(const IID& inInterface, ZORBaseUnknown* inProvider) override;
+
+   private:
+    ModelDocument& self_;
+  };
+  struct Provider {
+    IID interfaceId;
+    ZORBaseUnknown* component;
+    ZORBaseUnknown_var reference;  // empty for what lives in this document anyway
+  };
+
+  ~ModelDocument() = default;
+  bool Holds(ZORBaseUnknown* inComponent) const;
+
+  unsigned int referenceCount_ = 1;
+  ModelData model_;
+  std::vector<ZORUnicodeString> aliases_;
+  std::vector<std::unique_ptr<Product>> products_;
+  std::vector<Provider> providers_;
+  Facet<ZORDocument> document_;
+  ProvidersFacet providersFacet_;
+};
+
+}  // namespace ZORDefault
+
+#endif

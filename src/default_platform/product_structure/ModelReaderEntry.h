@@ -1,0 +1,30 @@
+// The one function of the reader library.
+#ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELREADERENTRY_H
+#define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELREADERENTRY_H
+
+#include <functional>
+#include <string>
+
+#include "default_platform/product_structure/ModelData.h"
+#include "default_platform/product_structure/ModelFormat.h"
+
+namespace ZORDefault {
+
+struct ModelRequest {
+  std::string path;  ///< absolute: references to other files are resolved against its folder
+  ModelFormat format = ModelFormat::kUnknown;
+  double deflection = 0;  ///< of curves and surfaces, as a share of a part's diagonal
+  std::function<void(double)> progress;  ///< may be empty
+};
+
+/// Reads a model. Raises nothing.
+/// @param outReason why it could not be read, one line; untouched on success.
+/// @return true when the model was read.
+typedef bool ReadModelFunction(const ModelRequest& inRequest, ModelData& outModel,
+                               std::string& outReason);
+
+inline constexpr char kReadModelName[] = "ZORReadModel";
+
+}  // namespace ZORDefault
+
+#endif

@@ -1,0 +1,162 @@
+// A product of an opened model.
+#ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_PRODUCT_H
+#define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_PRODUCT_H
+
+#include <vector>
+
+#include "default_platform/OpenModel.h"
+#include "default_platform/product_structure/Facet.h"
+#include "default_platform/product_structure/ModelData.h"
+#include "default_platform/system/ObjectCounters.h"
+#include "platform/product_structure/ZORIAlias.h"
+#include "platform/product_structure/ZORILinkableObject.h"
+#include "platform/product_structure/ZORIProduct.h"
+#include "platform/product_structure/ZORIProductInSession.h"
+#include "platform/product_structure/ZORISpecObject.h"
+#include "platform/visualisation/ZORI3DGeoVisu.h"
+#include "platform/visualisation/ZORIVisProperties.h"
+
+class ZOR3DRep;
+
+namespace ZORDefault {
+
+class ModelDocument;
+
+/// The way back from any interface of a product to the product; only this platform asks for it.
+class ProductIdentity : public ZORBaseUnknown {
+ public:
+  static const IID& ClassId();
+  virtual class Product& GetProduct() = 0;
+};
+
+/// A product and all its interfaces. Products belong to their document and share its reference
+/// count: a handle on one keeps the document, and so the whole tree, alive; no product counts
+/// another.
+class Product final : public FacetedComponent, private CountedObject<Product> {
+ public:
+  static const char* CountedName() { return "Product"; }
+
+  /// @param inIndex the product's place in the document's model.
+  Product(ModelDocument& inDocument, std::size_t inIndex, Product* inFather);
+  ~Product();
+  Product(const Product&) = delete;
+  Product& operator=(const Product&) = delete;
+
+  ZORBaseUnknown* FindFacet(const IID& inInterface) override;
+  ZORMetaClass* GetClass() const override;
+  unsigned int AddReference() override;
+  unsigned int ReleaseReference() override;
+
+  ZORIProduct* GetInterface() { return &product_; }
+  Product* GetFather() const { return father_; }
+  const std::vector<Product*>& GetChildren() const { return children_; }
+  void AddChild(Product* inChild) { children_.push_back(inChild); }
+  ModelDocument& GetDocument() const { return *document_; }
+  const ModelProduct& GetModelProduct() const;
+  const ModelPart& GetPart() const;
+  const ZORUnicodeString& GetAlias() const;
+  const ZORMathTransformation& GetRootFromProduct() const { return rootFromProduct_; }
+  ProductFacts GetFacts() const;
+
+  /// The representation, made at the first call; null when there is nothing to show.
+  ZOR3DRep* GetRep();
+  const ZORVisPropertiesValues& GetProperties() const { return properties_; }
+  void SetProperties(const ZORVisPropertiesValues& inValues);
+  /// Whether the product has triangles or edges itself, not only below it.
+  bool HasGeometry() const { return GetPart().mesh != nullptr; }
+
+ private:
+  class ProductFacet final : public Facet<ZORIProduct> {
+   public:
+    explicit ProductFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+    ZORListValZORBaseUnknown_var* GetChildren(const char* inInterfaceName) override;
+    ZORIProduct_var GetFatherProduct() override;
+
+   private:
+    Product& self_;
+  };
+  class InSessionFacet final : public Facet<ZORIProductInSession> {
+   public:
+    explicit InSessionFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+    HRESULT GetRepresentationName(int& outState, int inShown, ZORUnicodeString& outName) override;
+    HRESULT GetRepresentation(int& outState, int inShown, ZORBaseUnknown_var& outRep) override;
+
+   private:
+    Product& self_;
+  };
+  class AliasFacet final : public Facet<ZORIAlias> {
+   public:
+    explicit AliasFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+    ZORUnicodeString GetAlias() override { return self_.GetAlias(); }
+
+   private:
+    Product& self_;
+  };
+  class SpecObjectFacet final : public Facet<ZORISpecObject> {
+   public:
+    explicit SpecObjectFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+    ZORISpecObject* GetFather() override;
+
+   private:
+    Product& self_;
+  };
+  class LinkableFacet final : public Facet<ZORILinkableObject> {
+   public:
+    explicit LinkableFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+    ZORDocument* GetDocument() override;
+
+   private:
+    Product& self_;
+  };
+  class GeoVisuFacet final : public Facet<ZORI3DGeoVisu> {
+   public:
+    explicit GeoVisuFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+    ZORRep* GetRep() override;
+
+   private:
+    Product& self_;
+  };
+  class VisPropertiesFacet final : public Facet<ZORIVisProperties> {
+   public:
+    explicit VisPropertiesFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+    HRESULT GetPropertiesAtt(ZORVisPropertiesValues& outValues, int inProperties, int inGeometry,
+                             int inReserved, int inAlsoReserved) override;
+    HRESULT SetPropertiesAtt(const ZORVisPropertiesValues& inValues) override;
+
+   private:
+    Product& self_;
+  };
+  class IdentityFacet final : public Facet<ProductIdentity> {
+   public:
+    explicit IdentityFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+    Product& GetProduct() override { return self_; }
+
+   private:
+    Product& self_;
+  };
+
+  void MakeRep();
+  void ShowColour(const ZORVisPropertiesValues& inValues);
+
+  ModelDocument* document_;
+  std::size_t index_;
+  Product* father_;
+  std::vector<Product*> children_;
+  ZORMathTransformation rootFromProduct_;
+  ZORVisPropertiesValues properties_;
+  ZOR3DRep* rep_ = nullptr;
+  bool isRepMade_ = false;
+
+  ProductFacet product_;
+  InSessionFacet inSession_;
+  AliasFacet alias_;
+  SpecObjectFacet specObject_;
+  LinkableFacet linkable_;
+  GeoVisuFacet geoVisu_;
+  VisPropertiesFacet visProperties_;
+  IdentityFacet identity_;
+};
+
+}  // namespace ZORDefault
+
+#endif

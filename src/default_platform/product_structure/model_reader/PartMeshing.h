@@ -1,0 +1,18 @@
+// From the shape of a part to its mesh.
+#ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_PARTMESHING_H
+#define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_PARTMESHING_H
+
+#include <TDF_Label.hxx>
+
+#include "default_platform/product_structure/ModelData.h"
+
+namespace ZORDefault {
+
+/// Tessellates a part and fills its mesh, area and what is missing of them. A part for which that
+/// fails stays without mesh.
+/// @param inDeflection as a share of the diagonal of the part's box.
+void MeshPart(const TDF_Label& inPart, double inDeflection, ModelPart& ioPart);
+
+}  // namespace ZORDefault
+
+#endif

@@ -1,0 +1,98 @@
+// The entry of the reader library.
+#include <Message_ProgressIndicator.hxx>
+#include <Message_ProgressScope.hxx>
+#include <Standard_Failure.hxx>
+#include <algorithm>
+#include <exception>
+
+#include "default_platform/product_structure/ModelReaderEntry.h"
+#include "default_platform/product_structure/model_reader/DocumentReading.h"
+#include "default_platform/product_structure/model_reader/PartMeshing.h"
+#include "default_platform/product_structure/model_reader/TreeWalk.h"
+
+namespace ZORDefault {
+namespace {
+
+constexpr int kReadingShare = 60;  // of a hundred: reading against tessellating
+constexpr int kMeshingShare = 40;
+
+/// Tells a function of every hundredth that is done.
+class Progress : public Message_ProgressIndicator {
+ public:
+  explicit Progress(const std::function<void(double)>& inTell) : tell_(inTell) {}
+
+ protected:
+  void Show(const Message_ProgressScope&, const Standard_Boolean) override {
+    const double done = std::min(GetPosition(), 1.0);
+    if (!tell_ || done < told_ + 0.01) return;
+    told_ = done;
+    tell_(done);
+  }
+
+ private:
+  const std::function<void(double)>& tell_;
+  double told_ = 0;
+};
+
+void MeshParts(const std::vector<TDF_Label>& inLabels, double inDeflection,
+               const Message_ProgressRange& inProgress, ModelData& ioModel) {
+  Message_ProgressScope scope(inProgress, nullptr, static_cast<double>(inLabels.size()));
+  for (std::size_t i = 0; i < inLabels.size(); ++i, scope.Next())
+    if (!ioModel.parts[i].isAssembly) MeshPart(inLabels[i], inDeflection, ioModel.parts[i]);
+}
+
+void WarnOfMissingTriangles(ModelData& ioModel) {
+  std::size_t parts = 0, faces = 0;
+  for (const ModelPart& part : ioModel.parts) {
+    parts += part.failedToTessellate ? 1 : 0;
+    faces += part.facesWithoutTriangles;
+  }
+  if (parts > 0)
+    ioModel.warnings.push_back(std::to_string(parts) + " parts could not be tessellated");
+  if (faces > 0) ioModel.warnings.push_back(std::to_string(faces) + " faces have no triangles");
+}
+
+bool HasGeometry(const ModelData& inModel) {
+  return std::ranges::any_of(inModel.parts, [](const ModelPart& part) {
+    return part.mesh != nullptr || part.failedToTessellate;
+  });
+}
+
+bool Read(const ModelRequest& inRequest, ModelData& outModel, std::string& outReason) {
+  PrepareReaders();
+  Handle(Progress) progress = new Progress(inRequest.progress);
+  Message_ProgressScope scope(progress->Start(), nullptr, kReadingShare + kMeshingShare);
+  const Handle(TDocStd_Document) document =
+      ReadDocument(inRequest, scope.Next(kReadingShare), outModel.otherFiles, outReason);
+  if (document.IsNull()) return false;
+  const std::vector<TDF_Label> labels = WalkTree(document, outModel);
+  MeshParts(labels, inRequest.deflection, scope.Next(kMeshingShare), outModel);
+  WarnOfMissingTriangles(outModel);
+  if (HasGeometry(outModel)) return true;
+  outReason = "holds no geometry";
+  return false;
+}
+
+/// Messages of the kernel may have several lines.
+std::string OneLine(const char* inMessage) {
+  std::string line = inMessage ? inMessage : "";
+  std::ranges::replace_if(
+      line, [](unsigned char byte) { return byte < 0x20; }, ' ');
+  return line;
+}
+
+}  // namespace
+}  // namespace ZORDefault
+
+extern "C" __attribute__((visibility("default"))) bool ZORReadModel(
+    const ZORDefault::ModelRequest& inRequest, ZORDefault::ModelData& outModel,
+    std::string& outReason) {
+  try {
+    return ZORDefault::Read(inRequest, outModel, outReason);
+  } catch (const Standard_Failure& failure) {
+    outReason = "cannot be read: " + ZORDefault::OneLine(failure.GetMessageString());
+  } catch (const std::exception& error) {
+    outReason = "cannot be read: " + ZORDefault::OneLine(error.what());
+  }
+  return false;
+}
