@@ -47,8 +47,4 @@ void Arguments::Language(std::string& outLanguage) {
        "Language of the document's words, such as en or fr (default: that of the system)");
 }
 
-void Arguments::Exclusive(const char* inName, const char* inOther) {
-  app_.get_option(inName)->excludes(app_.get_option(inOther));
-}
-
 }  // namespace lyra

@@ -33,8 +33,6 @@ class Arguments {
                     const char* inHelp);
   /// The language of the message catalogues, for verbs that translate words of documents.
   void Language(std::string& outLanguage);
-  /// Two flags of which only one may be given.
-  void Exclusive(const char* inName, const char* inOther);
 
  private:
   CLI::App& app_;

@@ -1,6 +1,7 @@
 // lyra list FILE
 #include <memory>
 
+#include "lyra/CommandErrors.h"
 #include "lyra/Csv.h"
 #include "lyra/Language.h"
 #include "lyra/ListFilter.h"
@@ -86,6 +87,8 @@ void PrintTable(ClashResultFile& ioFile, const ListFilter& inFilter, Output& ioO
 }
 
 int List(const ListOptions& inOptions, Output& ioOutput) {
+  if (inOptions.json && inOptions.csv)
+    throw UsageError("list: --json and --csv exclude each other");
   const ListFilter filter = FilterOf(inOptions);
   ChooseLanguage(inOptions.language);
   ClashResultFile file(inOptions.file);
@@ -113,7 +116,6 @@ VerbAction DeclareList(Arguments& ioArguments) {
                    "Only with a product whose alias, identifier, instance or label holds TEXT");
   ioArguments.Flag("--json", options->json, "Print a JSON array of all that is known of each");
   ioArguments.Flag("--csv", options->csv, "Print comma-separated values for a spreadsheet");
-  ioArguments.Exclusive("--json", "--csv");
   ioArguments.Language(options->language);
   return [options](Output& ioOutput) { return List(*options, ioOutput); };
 }

@@ -5,12 +5,16 @@
 namespace lyra {
 namespace {
 
+/// A number in decimal, with a point or, as many documents write it, a comma.
 bool IsPlainNumber(std::string_view inText) {
-  if (inText.starts_with('+')) inText.remove_prefix(1);
-  if (inText.find_first_not_of("0123456789.-+eE") != std::string_view::npos) return false;
-  double number = 0;
-  const auto [end, error] = std::from_chars(inText.data(), inText.data() + inText.size(), number);
-  return error != std::errc::invalid_argument && end == inText.data() + inText.size();
+  std::string number(inText.substr(inText.find_first_not_of("+-") == 1 ? 1 : 0));
+  const std::size_t comma = number.find(',');
+  if (comma != std::string::npos) number[comma] = '.';
+  if (number.find_first_not_of("0123456789.-+eE") != std::string::npos) return false;
+  double value = 0;
+  const char* const end = number.data() + number.size();
+  const auto read = std::from_chars(number.data(), end, value);
+  return read.ec != std::errc::invalid_argument && read.ptr == end;
 }
 
 bool IsFormula(std::string_view inText) {
