@@ -65,16 +65,21 @@ const char16_t* FindReplaced(const char16_t* inFrom, const char16_t* inEnd) {
   return std::find_if(inFrom, inEnd, IsReplaced<kConverter>);
 }
 
+/// Ordinary text is appended in runs, none so long that it has left the processor's cache between
+/// being tested and being copied.
 template <TextConverter kConverter>
 void AppendReplaced(const char16_t* inUnits, std::size_t inCount, ZORUnicodeString& ioOutput) {
+  constexpr std::ptrdiff_t kLongestRun = 8192;
   const char16_t* const end = inUnits + inCount;
   while (inUnits != end) {
-    const char16_t* const special = FindReplaced<kConverter>(inUnits, end);
+    const char16_t* const runEnd = inUnits + std::min(end - inUnits, kLongestRun);
+    const char16_t* const special = FindReplaced<kConverter>(inUnits, runEnd);
     ioOutput.AppendUTF16(inUnits, static_cast<std::size_t>(special - inUnits));
-    if (special == end) return;
+    inUnits = special;
+    if (special == runEnd) continue;
     const std::u16string_view replacement = ReplacementOf<kConverter>(*special);
     ioOutput.AppendUTF16(replacement.data(), replacement.size());
-    inUnits = special + 1;
+    ++inUnits;
   }
 }
 

@@ -167,6 +167,19 @@ TEST(BuildPath, ConvertersFindASpecialCharacterAnywhere) {
   }
 }
 
+// Long text is copied in runs; nothing may be lost or doubled where two runs meet.
+TEST(BuildPath, ConvertersKeepLongTextsWhole) {
+  for (std::size_t place : {0u, 8190u, 8191u, 8192u, 8193u, 16383u, 16384u, 20000u}) {
+    std::u16string units;
+    for (char16_t i = 0; i <= 20000; ++i) units += static_cast<char16_t>(0x100 + i);
+    units[place] = u'<';
+    ZORUnicodeString input = FromUnits(units);
+    ZORUnicodeString output;
+    BuildPath::CheckXMLString(input, output);
+    ASSERT_TRUE(Units(output) == units.replace(place, 1, u"&lt;")) << place;
+  }
+}
+
 TEST(BuildPath, ConvertersAgreeWithAUnitByUnitConversionOfRandomTexts) {
   const std::map<char16_t, std::u16string> columns[] = {
       {{u'"', u"&quot;"}, {u'&', u"&amp;"}, {u'<', u"&lt;"}, {u'>', u"&gt;"}},
