@@ -2,14 +2,24 @@
 #ifndef ZOR_CLASH_READING_ELEMENT_WALK_H
 #define ZOR_CLASH_READING_ELEMENT_WALK_H
 
+#include <algorithm>
+#include <cstddef>
+
 #include "ZORLyraGeneralServices.h"
 #include "platform/xml/DOM_Node.h"
+
+/// Whether a document's text is a given one. Nothing is copied: every child of every walk is asked.
+inline bool IsText(const DOMString& inText, const char* inAscii) { return inText.equals(inAscii); }
+inline bool IsText(const DOMString& inText, const ZORUnicodeString& inOther) {
+  const std::size_t length = inText.length();
+  return length == static_cast<std::size_t>(inOther.GetLengthInChar()) &&
+         std::equal(inText.rawBuffer(), inText.rawBuffer() + length, inOther.ConvertToUCChar());
+}
 
 /// Whether a node is an element of a name; the name is a ZORUnicodeString or ASCII text.
 template <class NameText>
 bool IsElementNamed(const DOM_Node& inNode, const NameText& inName) {
-  return inNode.getNodeType() == DOM_Node::ELEMENT_NODE &&
-         ZORLyraGeneralServices::GetDOMName(inNode) == inName;
+  return inNode.getNodeType() == DOM_Node::ELEMENT_NODE && IsText(inNode.getNodeName(), inName);
 }
 
 /// Calls inVisit for each child node of a parent in document order.

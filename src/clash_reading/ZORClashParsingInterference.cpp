@@ -218,14 +218,14 @@ void ZORClashParsing::GetInterferenceDataV12(
 
   ForEachChild(inInterference, [&](const DOM_Node& inChild) {
     if (inChild.getNodeType() != DOM_Node::ELEMENT_NODE) return;
-    const ZORUnicodeString name = ZORLyraGeneralServices::GetDOMName(inChild);
-    if (name == "ViolatedRule")
+    const DOMString name = inChild.getNodeName();
+    if (IsText(name, "ViolatedRule"))
       readRule(inChild);
-    else if (name == "Product")
+    else if (IsText(name, "Product"))
       readProduct(inChild);
-    else if (name == "GeometricAspect")
+    else if (IsText(name, "GeometricAspect"))
       readGeometry(inChild);
-    else if (name == "Comment")
+    else if (IsText(name, "Comment"))
       outComment = GetAttrOnNode(inChild, "Value");
   });
 }
