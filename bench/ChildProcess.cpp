@@ -5,9 +5,8 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <chrono>
 #include <stdexcept>
-
-#include "Measurement.h"
 
 namespace {
 std::string ReadToEnd(int inDescriptor) {
@@ -40,7 +39,7 @@ pid_t Start(const std::vector<std::string>& inCommand, int inOutput) {
 ChildOutcome RunChild(const std::vector<std::string>& inCommand) {
   int ends[2];
   if (pipe2(ends, O_CLOEXEC) != 0) throw std::runtime_error("no pipe");
-  const Stopwatch watch;
+  const auto start = std::chrono::steady_clock::now();
   const pid_t child = Start(inCommand, ends[1]);
   close(ends[1]);
   ChildOutcome outcome{};
@@ -48,7 +47,8 @@ ChildOutcome RunChild(const std::vector<std::string>& inCommand) {
   close(ends[0]);
   int status = 0;
   waitpid(child, &status, 0);
-  outcome.milliseconds = watch.Milliseconds();
+  outcome.milliseconds =
+      std::chrono::duration<double, std::milli>(std::chrono::steady_clock::now() - start).count();
   outcome.exitCode = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
   return outcome;
 }

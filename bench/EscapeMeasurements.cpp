@@ -1,4 +1,6 @@
-// Making a long text safe for XML.
+// Making texts safe for XML.
+#include <functional>
+
 #include "BuildPath.h"
 #include "Measurement.h"
 #include "ResultHash.h"
@@ -24,21 +26,25 @@ ZORUnicodeString StringOf(const std::u16string& inText) {
   return string;
 }
 
-template <class Output, class AppendUnit>
-void AppendEscaped(std::u16string_view inText, Output& ioOutput, const AppendUnit& inAppendUnit) {
+std::u16string_view View(const ZORUnicodeString& inText) { return Units(inText); }
+std::u16string_view View(const std::u16string& inText) { return inText; }
+
+template <class AppendLiteral, class AppendUnit>
+void AppendEscaped(std::u16string_view inText, const AppendLiteral& inAppendLiteral,
+                   const AppendUnit& inAppendUnit) {
   for (char16_t unit : inText) {
     switch (unit) {
       case u'"':
-        ioOutput += u"&quot;";
+        inAppendLiteral(u"&quot;");
         break;
       case u'&':
-        ioOutput += u"&amp;";
+        inAppendLiteral(u"&amp;");
         break;
       case u'<':
-        ioOutput += u"&lt;";
+        inAppendLiteral(u"&lt;");
         break;
       case u'>':
-        ioOutput += u"&gt;";
+        inAppendLiteral(u"&gt;");
         break;
       default:
         inAppendUnit(unit);
@@ -46,52 +52,71 @@ void AppendEscaped(std::u16string_view inText, Output& ioOutput, const AppendUni
   }
 }
 
-// The platform's string under the operators that AppendEscaped uses.
-struct PlatformOutput {
-  ZORUnicodeString text;
-  void operator+=(std::u16string_view inLiteral) {
-    text.AppendUTF16(inLiteral.data(), inLiteral.size());
-  }
-};
+constexpr std::size_t kShortText = 100'000;
 
-std::uint64_t HashOf(std::u16string_view inText) {
-  ResultHash hash;
-  hash.Add(inText);
-  return hash.Value();
+// Times the conversion of one long text and, in the second step, of as many characters in texts of
+// kShortText each: a long output is new memory, whose first touch costs more than the conversion.
+template <class Text, class Make, class Convert>
+Steps TimeConversions(std::size_t inCount, const Make& inMake, const Convert& inConvert) {
+  Steps steps;
+  ResultHash longHash, shortHash;
+  {
+    Text text = inMake(TextOf(inCount));
+    Text escaped;
+    TimeStep("one text", steps, [&] { inConvert(text, escaped); });
+    longHash.Add(View(escaped));
+  }
+  Text text = inMake(TextOf(kShortText));
+  std::size_t length = 0;
+  TimeStep("many texts", steps, [&] {
+    for (std::size_t done = 0; done < inCount; done += kShortText) {
+      Text escaped;
+      inConvert(text, escaped);
+      length += View(escaped).size();
+    }
+  });
+  Text escaped;
+  inConvert(text, escaped);
+  shortHash.Add(View(escaped));
+  shortHash.Add(std::uint64_t{length});
+  steps[0].hash = longHash.Value();
+  steps[1].hash = shortHash.Value();
+  return steps;
 }
+
+std::size_t CountOf(const Arguments& inArguments) { return std::stoul(inArguments.at(0)); }
 }  // namespace
 
 Steps EscapeWithZORLyra(const Arguments& inArguments) {
-  Steps steps;
-  ZORUnicodeString text = StringOf(TextOf(std::stoul(inArguments.at(0))));
-  ZORUnicodeString escaped;
-  TimeStep("escape", steps, [&] { BuildPath::CheckXMLString(text, escaped); });
-  steps[0].hash = HashOf(Units(escaped));
-  return steps;
+  return TimeConversions<ZORUnicodeString>(
+      CountOf(inArguments), StringOf, [](ZORUnicodeString& inText, ZORUnicodeString& ioOutput) {
+        BuildPath::CheckXMLString(inText, ioOutput);
+      });
 }
 
 Steps EscapeByCharacter(const Arguments& inArguments) {
-  Steps steps;
-  const ZORUnicodeString text = StringOf(TextOf(std::stoul(inArguments.at(0))));
-  PlatformOutput escaped;
-  TimeStep("escape", steps, [&] {
-    AppendEscaped(Units(text), escaped, [&](char16_t inUnit) {
-      ZORUnicodeChar character;
-      character.BuildFromUC2Bytes(inUnit);
-      escaped.text += character;
-    });
-  });
-  steps[0].hash = HashOf(Units(escaped.text));
-  return steps;
+  return TimeConversions<ZORUnicodeString>(
+      CountOf(inArguments), StringOf,
+      [](const ZORUnicodeString& inText, ZORUnicodeString& ioOutput) {
+        AppendEscaped(
+            Units(inText),
+            [&](std::u16string_view inLiteral) {
+              ioOutput.AppendUTF16(inLiteral.data(), inLiteral.size());
+            },
+            [&](char16_t inUnit) {
+              ZORUnicodeChar character;
+              character.BuildFromUC2Bytes(inUnit);
+              ioOutput += character;
+            });
+      });
 }
 
 Steps EscapeByPushBack(const Arguments& inArguments) {
-  Steps steps;
-  const std::u16string text = TextOf(std::stoul(inArguments.at(0)));
-  std::u16string escaped;
-  TimeStep("escape", steps, [&] {
-    AppendEscaped(text, escaped, [&](char16_t inUnit) { escaped.push_back(inUnit); });
-  });
-  steps[0].hash = HashOf(escaped);
-  return steps;
+  return TimeConversions<std::u16string>(
+      CountOf(inArguments), std::identity(),
+      [](const std::u16string& inText, std::u16string& ioOutput) {
+        AppendEscaped(
+            inText, [&](std::u16string_view inLiteral) { ioOutput += inLiteral; },
+            [&](char16_t inUnit) { ioOutput.push_back(inUnit); });
+      });
 }
