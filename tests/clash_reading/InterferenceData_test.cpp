@@ -395,6 +395,11 @@ TEST(InterferenceData, InstanceKeepsASeparatorThatIsCutShort) {
   EXPECT_EQ("--++-- B", InstanceOf("DescriptionID=\"A --++-- --++-- B\""));
 }
 
+TEST(InterferenceData, InstanceSkipsEmptySegments) {
+  EXPECT_EQ("B", InstanceOf("DescriptionID=\"A --++--  --++-- B\""));
+  EXPECT_EQ("B", InstanceOf("DescriptionID=\" --++-- B\""));
+}
+
 TEST(InterferenceData, InstanceStartsBehindALineFeed) {
   EXPECT_EQ("B", InstanceOf("DescriptionID=\"A&#10;B\""));
 }
