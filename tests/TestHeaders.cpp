@@ -1,0 +1,1 @@
+// Nothing: the target that this file is in exists for its precompiled headers.
