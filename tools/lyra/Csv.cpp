@@ -26,7 +26,8 @@ bool IsFormula(std::string_view inText) {
 }  // namespace
 
 std::string CsvCell(std::string_view inText) {
-  const std::string text = IsFormula(inText) ? "'" + std::string(inText) : std::string(inText);
+  std::string text(IsFormula(inText) ? 1 : 0, '\'');
+  text += inText;
   if (text.find_first_of("\",\r\n") == std::string::npos) return text;
   std::string quoted = "\"";
   for (char byte : text) {

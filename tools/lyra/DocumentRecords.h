@@ -71,6 +71,7 @@ struct LinkedProduct {
 struct LinkRecord {
   std::string link;
   std::array<LinkedProduct, 2> products;
+  std::optional<std::string> check = std::nullopt;  // what a check of the linked file said
 };
 
 GeneralRecord ReadGeneral(ClashResultFile& ioFile);

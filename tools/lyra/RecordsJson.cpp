@@ -134,7 +134,9 @@ Json ToJson(const SpecificationRecord& inRecord) {
 }
 
 Json ToJson(const LinkRecord& inRecord) {
-  return {{"link", inRecord.link}, {"products", ArrayJson(inRecord.products)}};
+  Json json = {{"link", inRecord.link}, {"products", ArrayJson(inRecord.products)}};
+  if (inRecord.check) json["check"] = *inRecord.check;
+  return json;
 }
 
 std::string LineOf(const Json& inValue) {

@@ -101,6 +101,7 @@ int ParseAndAct(int inCount, char** inArguments, Output& ioOutput) {
 int RunLyra(int inCount, char** inArguments) {
   // A reader that goes away shows as a failed write, so that work can stop in good order.
   std::signal(SIGPIPE, SIG_IGN);
+  std::signal(SIGXFSZ, SIG_IGN);  // likewise a file that may not grow any further
   try {
     Output output(stdout);
     const int code = ParseAndAct(inCount, inArguments, output);

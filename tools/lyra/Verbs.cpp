@@ -11,6 +11,12 @@ std::span<const Verb> Verbs() {
       {"specs", "List the pairs of products that a computation was asked to check", DeclareSpecs},
       {"links", "List the clash documents that a federator document links", DeclareLinks},
       {"convert", "Write a whole document in another format", DeclareConvert},
+      {"merge", "Merge clash documents into one", DeclareMerge},
+      {"federate", "Write a federator document that links clash documents", DeclareFederate},
+      {"report", "Write a result as an XML report with a style sheet", DeclareReport},
+      {"path", "Say which path a logical name stands for", DeclarePath},
+      {"escape", "Escape a text for XML", DeclareEscape},
+      {"filename", "Make a text fit for the name of a file", DeclareFilename},
   };
   return kVerbs;
 }

@@ -29,6 +29,12 @@ VerbAction DeclareComponents(Arguments& ioArguments);
 VerbAction DeclareSpecs(Arguments& ioArguments);
 VerbAction DeclareLinks(Arguments& ioArguments);
 VerbAction DeclareConvert(Arguments& ioArguments);
+VerbAction DeclareMerge(Arguments& ioArguments);
+VerbAction DeclareFederate(Arguments& ioArguments);
+VerbAction DeclareReport(Arguments& ioArguments);
+VerbAction DeclarePath(Arguments& ioArguments);
+VerbAction DeclareEscape(Arguments& ioArguments);
+VerbAction DeclareFilename(Arguments& ioArguments);
 
 }  // namespace lyra
 
