@@ -20,6 +20,14 @@ struct ScannerMemoryExhausted {
 /// single name, value or text without end, or an entity that grows inside a value, comes near it, and documents with a million different names.
 class ScannerMemory : public xercesc::MemoryManager {
  public:
+  ScannerMemory() = default;
+  /// Frees what the scanner forgot, as it does after some errors in a document type.
+  ~ScannerMemory() override {
+    while (blocks_.next != &blocks_) Free(blocks_.next);
+  }
+  ScannerMemory(const ScannerMemory&) = delete;
+  ScannerMemory& operator=(const ScannerMemory&) = delete;
+
   static constexpr std::size_t kMost = std::size_t{400} * 1024 * 1024;
 
   /// @param inPlace where the scanner is, for errors; null for nowhere. Lives as long as the scanner.
@@ -30,13 +38,13 @@ class ScannerMemory : public xercesc::MemoryManager {
     void* const block = std::malloc(sizeof(Head) + inBytes);
     if (block == nullptr) throw std::bad_alloc();
     used_ += inBytes;
-    return new (block) Head{inBytes} + 1;
+    Head* const head = new (block) Head{inBytes, &blocks_, blocks_.next};
+    head->next->previous = head;
+    blocks_.next = head;
+    return head + 1;
   }
   void deallocate(void* inPlace) override {
-    if (inPlace == nullptr) return;
-    Head* const head = static_cast<Head*>(inPlace) - 1;
-    used_ -= head->bytes;
-    std::free(head);
+    if (inPlace != nullptr) Free(static_cast<Head*>(inPlace) - 1);
   }
   xercesc::MemoryManager* getExceptionMemoryManager() override {
     return xercesc::XMLPlatformUtils::fgMemoryManager;
@@ -45,13 +53,22 @@ class ScannerMemory : public xercesc::MemoryManager {
  private:
   struct alignas(std::max_align_t) Head {
     std::size_t bytes;
+    Head* previous;
+    Head* next;
   };
+  void Free(Head* inHead) {
+    used_ -= inHead->bytes;
+    inHead->previous->next = inHead->next;
+    inHead->next->previous = inHead->previous;
+    std::free(inHead);
+  }
   [[noreturn]] void Fail() const {
     if (place_ == nullptr) throw ScannerMemoryExhausted{0, 0};
     throw ScannerMemoryExhausted{place_->getLineNumber(), place_->getColumnNumber()};
   }
 
   std::size_t used_ = 0;
+  Head blocks_{0, &blocks_, &blocks_};  // a ring
   const xercesc::Locator* place_ = nullptr;
 };
 
