@@ -7,6 +7,7 @@
 #include <memory>
 #include <vector>
 
+#include "default_platform/visualisation/DrawingStructure.h"
 #include "platform/mathematics/ZORMathTransformation.h"
 #include "platform/visualisation/ZOR3DBoundingSphere.h"
 #include "platform/visualisation/ZOR3DRep.h"
@@ -32,7 +33,8 @@ struct PartMesh {
   /// lineStarts[i + 1].
   std::vector<std::array<float, 3>> edgePoints;
   std::vector<std::uint32_t> lineStarts;
-  ZOR3DBoundingSphere sphere;  ///< in the part's space
+  ZOR3DBoundingSphere sphere;        ///< in the part's space
+  mutable DrawingStructure drawing;  ///< the renderer's own; nobody else touches it
 };
 
 #endif

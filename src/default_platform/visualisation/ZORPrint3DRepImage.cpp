@@ -1,0 +1,45 @@
+#include "platform/visualisation/ZORPrint3DRepImage.h"
+
+#include <new>
+#include <utility>
+
+#include "default_platform/system/ObjectCounters.h"
+#include "default_platform/visualisation/PictureDrawing.h"
+#include "default_platform/visualisation/RayCasterLibrary.h"
+
+namespace {
+
+ZORDefault::ObjectCounter& Counter() {
+  static ZORDefault::ObjectCounter& counter = ZORDefault::CounterOf("ZORPrint3DRepImage");
+  return counter;
+}
+
+}  // namespace
+
+ZORPrint3DRepImage::ZORPrint3DRepImage(ZOR3DRep* inRep, int inWidth, int inHeight)
+    : rep_(inRep), width_(inWidth), height_(inHeight), viewpoint_(new ZOR3DViewpoint) {
+  ++Counter().built;
+  if (rep_) viewpoint_->scene_ = rep_->GetShowBoundingElement();
+  viewpoint_->Reframe(static_cast<float>(width_), static_cast<float>(height_), 1, 1);
+}
+
+ZORPrint3DRepImage::~ZORPrint3DRepImage() {
+  viewpoint_->Release();
+  ++Counter().released;
+}
+
+ZORSupport* ZORPrint3DRepImage::GetSupport() { return &support_; }
+ZOR3DViewpoint* ZORPrint3DRepImage::GetViewpoint() { return viewpoint_; }
+
+ZORPixelImage* ZORPrint3DRepImage::Rasterize() try {
+  if (!rep_ || !ZORDefault::IsPictureSize(width_, height_)) return nullptr;
+  const ZORDefault::RayCaster* const rayCaster = ZORDefault::LoadedRayCaster();
+  if (!rayCaster) return nullptr;
+  const ZORDefault::PictureRequest request =
+      ZORDefault::MakePictureRequest(*rep_, *viewpoint_, width_, height_, &support_);
+  std::vector<std::uint8_t> pixels;
+  if (!rayCaster->draw(request, pixels)) return nullptr;
+  return new ZORPixelImage(width_, height_, std::move(pixels));
+} catch (const std::bad_alloc&) {
+  return nullptr;
+}

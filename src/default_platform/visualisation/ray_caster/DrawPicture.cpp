@@ -1,0 +1,127 @@
+#include "default_platform/visualisation/ray_caster/DrawPicture.h"
+
+#include <algorithm>
+#include <cmath>
+
+#include "default_platform/visualisation/ray_caster/EdgeLines.h"
+#include "default_platform/visualisation/ray_caster/Parallel.h"
+#include "default_platform/visualisation/ray_caster/Refinement.h"
+
+namespace ZORRayCaster {
+namespace {
+
+using ZORDefault::PictureRequest;
+
+/// Strengths of what is drawn over surfaces.
+constexpr float kEdgeInk = 0.92F;
+constexpr float kHiddenEdgeInk = 0.22F;
+constexpr float kOutlineInk = 0.60F;
+constexpr float kOutlineInkAlone = 0.90F;  // where there is no shading
+
+/// The rows of the background: one colour, or a soft gradient, bluish grey above and nearly white
+/// below.
+std::vector<Vec3> BackgroundRows(const PictureRequest& inRequest) {
+  const auto light = [](const float* inShown) {
+    return Vec3{LightOf(inShown[0]), LightOf(inShown[1]), LightOf(inShown[2])};
+  };
+  std::vector<Vec3> rows(static_cast<std::size_t>(inRequest.height));
+  if (inRequest.hasBackground) {
+    std::fill(rows.begin(), rows.end(), light(inRequest.background));
+    return rows;
+  }
+  constexpr float kTop[3] = {0.68F, 0.76F, 0.86F};
+  constexpr float kBottom[3] = {0.95F, 0.96F, 0.98F};
+  for (std::size_t y = 0; y < rows.size(); ++y) {
+    const float share = (static_cast<float>(y) + 0.5F) / static_cast<float>(rows.size());
+    float shown[3];
+    for (int i = 0; i < 3; ++i) shown[i] = kTop[i] + share * (kBottom[i] - kTop[i]);
+    rows[y] = light(shown);
+  }
+  return rows;
+}
+
+/// Dark ink, or grey where the surface itself is nearly black.
+Vec3 InkOn(Vec3 inLight) {
+  constexpr float kDarkInk = 0.010F, kLightInk = 0.13F, kBlack = 0.012F, kDark = 0.04F;
+  const float luminance = 0.2126F * inLight.x + 0.7152F * inLight.y + 0.0722F * inLight.z;
+  const float share = std::clamp((kDark - luminance) / (kDark - kBlack), 0.F, 1.F);
+  const float ink = kDarkInk + share * (kLightInk - kDarkInk);
+  return {ink, ink, ink};
+}
+
+class Composition {
+ public:
+  Composition(const PictureRequest& inRequest, const Refinement& inRefinement,
+              const LineCoverage& inLines)
+      : request_(inRequest), refinement_(inRefinement), lines_(inLines) {}
+
+  void ComposeRow(int inY, std::uint8_t* outBytes) const {
+    for (int x = 0; x < request_.width; ++x) {
+      const Vec3 light = LightAt(x, inY);
+      *outBytes++ = ShownByte(light.x);
+      *outBytes++ = ShownByte(light.y);
+      *outBytes++ = ShownByte(light.z);
+    }
+  }
+
+ private:
+  Vec3 LightAt(int inX, int inY) const {
+    const std::size_t place =
+        static_cast<std::size_t>(inY) * static_cast<std::size_t>(request_.width) +
+        static_cast<std::size_t>(inX);
+    const ShownPixel pixel = refinement_.At(inX, inY);
+    // The strongest ink alone: an edge on an outline is no darker than an edge.
+    float ink = (request_.isShaded ? kOutlineInk : kOutlineInkAlone) * pixel.outline;
+    ink = std::max(ink, kEdgeInk * static_cast<float>(lines_.visible[place]) / 255);
+    if (!lines_.hidden.empty())
+      ink = std::max(ink, kHiddenEdgeInk * static_cast<float>(lines_.hidden[place]) / 255);
+    return ink > 0 ? Mix(pixel.light, InkOn(pixel.light), ink) : pixel.light;
+  }
+
+  const PictureRequest& request_;
+  const Refinement& refinement_;
+  const LineCoverage& lines_;
+};
+
+}  // namespace
+
+std::vector<std::uint8_t> DrawPicture(const PictureRequest& inRequest) {
+  const DrawnScene scene(inRequest);
+  const Backdrop backdrop{BackgroundRows(inRequest), inRequest.isShaded};
+  const SurfacePass surfaces(scene, backdrop);
+  const int threadCount = inRequest.threadCount;
+  const std::unique_ptr<Sample[]> pixels = surfaces.CastPixels(threadCount);
+  const LineCoverage lines =
+      DrawEdgeLines(scene, pixels.get(), inRequest.showsHiddenEdges, threadCount);
+  const Refinement refinement(surfaces, scene.GetView(), pixels.get(), threadCount);
+
+  const std::size_t rowSize = 3 * static_cast<std::size_t>(inRequest.width);
+  std::vector<std::uint8_t> bytes(rowSize * static_cast<std::size_t>(inRequest.height));
+  const Composition composition(inRequest, refinement, lines);
+  ForEach(threadCount, inRequest.height, [&](int inY) {
+    composition.ComposeRow(inY, bytes.data() + rowSize * static_cast<std::size_t>(inY));
+  });
+  return bytes;
+}
+
+std::vector<ZORDefault::SeenPixel> SeePicture(const PictureRequest& inRequest) {
+  const DrawnScene scene(inRequest);
+  const double offset = scene.GetView().depthOffset;
+  std::vector<ZORDefault::SeenPixel> seen;
+  seen.reserve(static_cast<std::size_t>(inRequest.width) *
+               static_cast<std::size_t>(inRequest.height));
+  for (int y = 0; y < inRequest.height; ++y) {
+    for (int x = 0; x < inRequest.width; ++x) {
+      const PicturePoint middle{static_cast<float>(x) + 0.5F, static_cast<float>(y) + 0.5F};
+      Hit hit;
+      scene.Cast(&middle, 1, &hit);
+      if (hit.item == Hit::kNothing)
+        seen.emplace_back();
+      else
+        seen.push_back({scene.GetItems()[hit.item].number, static_cast<float>(hit.depth + offset)});
+    }
+  }
+  return seen;
+}
+
+}  // namespace ZORRayCaster

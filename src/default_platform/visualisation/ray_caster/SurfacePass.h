@@ -1,0 +1,54 @@
+// What the surfaces show in each pixel.
+#ifndef ZOR_DEFAULT_PLATFORM_VISUALISATION_RAY_CASTER_SURFACEPASS_H
+#define ZOR_DEFAULT_PLATFORM_VISUALISATION_RAY_CASTER_SURFACEPASS_H
+
+#include <memory>
+#include <vector>
+
+#include "default_platform/visualisation/ray_caster/DrawnScene.h"
+
+namespace ZORRayCaster {
+
+/// What is seen at one point of the picture.
+struct Sample {
+  /// Of the surface at this point (View::Nearness); kBackground where there is none.
+  float nearness = 0;
+  float slopeX = 0;  ///< how the nearness changes over one pixel
+  float slopeY = 0;
+  std::uint32_t item = 0;  ///< Hit::kNothing: the background
+  Vec3 light;
+
+  static constexpr float kBackground = -1e30F;
+};
+
+/// The background of each row, and whether surfaces hide it.
+struct Backdrop {
+  std::vector<Vec3> rows;
+  bool isShaded = true;  ///< else surfaces are drawn in the background's colour
+};
+
+class SurfacePass {
+ public:
+  SurfacePass(const DrawnScene& inScene, const Backdrop& inBackdrop)
+      : scene_(inScene), backdrop_(inBackdrop) {}
+
+  /// One sample in the middle of each pixel, rows from the top.
+  std::unique_ptr<Sample[]> CastPixels(int inThreadCount) const;
+  /// @param inCount up to DrawnScene::kPacket.
+  void CastPoints(const PicturePoint* inPoints, int inCount, Sample* outSamples) const;
+
+ private:
+  void CastTile(int inTile, Sample* outPixels) const;
+  Sample SampleOf(PicturePoint inPoint, const Hit& inHit) const;
+  Vec3 LightOf(PicturePoint inPoint, const Hit& inHit, const SurfaceColour& inColour) const;
+  Vec3 FacingNormal(const DrawnItem& inItem, const Hit& inHit, Vec3 inToEye) const;
+  void SetSurface(PicturePoint inPoint, const Hit& inHit, Sample& outSample) const;
+  Vec3 Background(PicturePoint inPoint) const;
+
+  const DrawnScene& scene_;
+  const Backdrop& backdrop_;
+};
+
+}  // namespace ZORRayCaster
+
+#endif

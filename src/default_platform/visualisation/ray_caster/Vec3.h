@@ -1,0 +1,56 @@
+// Vectors in single precision, for drawing.
+#ifndef ZOR_DEFAULT_PLATFORM_VISUALISATION_RAY_CASTER_VEC3_H
+#define ZOR_DEFAULT_PLATFORM_VISUALISATION_RAY_CASTER_VEC3_H
+
+#include <array>
+#include <cmath>
+
+namespace ZORRayCaster {
+
+/// A direction, a place in camera space (x right, y down, z forward, the eye at the origin), or a
+/// colour in proportion to light.
+struct Vec3 {
+  float x = 0;
+  float y = 0;
+  float z = 0;
+
+  friend Vec3 operator+(Vec3 inA, Vec3 inB) {
+    return {inA.x + inB.x, inA.y + inB.y, inA.z + inB.z};
+  }
+  friend Vec3 operator-(Vec3 inA, Vec3 inB) {
+    return {inA.x - inB.x, inA.y - inB.y, inA.z - inB.z};
+  }
+  friend Vec3 operator*(float inFactor, Vec3 inA) {
+    return {inFactor * inA.x, inFactor * inA.y, inFactor * inA.z};
+  }
+};
+
+inline Vec3 ToVec3(const std::array<float, 3>& inArray) {
+  return {inArray[0], inArray[1], inArray[2]};
+}
+inline float Dot(Vec3 inA, Vec3 inB) { return inA.x * inB.x + inA.y * inB.y + inA.z * inB.z; }
+inline Vec3 Cross(Vec3 inA, Vec3 inB) {
+  return {inA.y * inB.z - inA.z * inB.y, inA.z * inB.x - inA.x * inB.z,
+          inA.x * inB.y - inA.y * inB.x};
+}
+/// The zero vector stays as it is.
+inline Vec3 Normalised(Vec3 inA) {
+  const float square = Dot(inA, inA);
+  return square > 0 ? (1 / std::sqrt(square)) * inA : inA;
+}
+inline Vec3 Mix(Vec3 inA, Vec3 inB, float inShareOfB) { return inA + inShareOfB * (inB - inA); }
+
+/// A linear map and a translation.
+struct Affine {
+  Vec3 columns[3];
+  Vec3 translation;
+
+  Vec3 Direction(Vec3 inDirection) const {
+    return inDirection.x * columns[0] + inDirection.y * columns[1] + inDirection.z * columns[2];
+  }
+  Vec3 Point(Vec3 inPoint) const { return Direction(inPoint) + translation; }
+};
+
+}  // namespace ZORRayCaster
+
+#endif
