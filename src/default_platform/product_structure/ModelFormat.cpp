@@ -62,26 +62,6 @@ bool IsBinaryStl(std::string_view inBytes) {
 
 }  // namespace
 
-const char* NameOfFormat(ModelFormat inFormat) {
-  switch (inFormat) {
-    case ModelFormat::kStep:
-      return "STEP";
-    case ModelFormat::kIges:
-      return "IGES";
-    case ModelFormat::kGltf:
-      return "glTF";
-    case ModelFormat::kGlb:
-      return "GLB";
-    case ModelFormat::kObj:
-      return "OBJ";
-    case ModelFormat::kStl:
-      return "STL";
-    case ModelFormat::kUnknown:
-      break;
-  }
-  return "";
-}
-
 ModelFormat FormatOfEnding(const std::string& inPath) {
   std::string ending = std::filesystem::path(inPath).extension().string();
   std::ranges::transform(ending, ending.begin(),

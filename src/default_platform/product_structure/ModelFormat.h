@@ -10,7 +10,25 @@ namespace ZORDefault {
 enum class ModelFormat { kUnknown, kStep, kIges, kGltf, kGlb, kObj, kStl };
 
 /// How people call the format; "" for the unknown one.
-const char* NameOfFormat(ModelFormat inFormat);
+inline const char* NameOfFormat(ModelFormat inFormat) {
+  switch (inFormat) {
+    case ModelFormat::kStep:
+      return "STEP";
+    case ModelFormat::kIges:
+      return "IGES";
+    case ModelFormat::kGltf:
+      return "glTF";
+    case ModelFormat::kGlb:
+      return "GLB";
+    case ModelFormat::kObj:
+      return "OBJ";
+    case ModelFormat::kStl:
+      return "STL";
+    case ModelFormat::kUnknown:
+      break;
+  }
+  return "";
+}
 
 /// The format that a file's ending promises, in any letter case.
 ModelFormat FormatOfEnding(const std::string& inPath);

@@ -1,0 +1,124 @@
+#include "default_platform/product_structure/ModelCodec.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+using testing::ElementsAre;
+using ZORDefault::DecodeModel;
+using ZORDefault::EncodeModel;
+using ZORDefault::ModelData;
+
+namespace {
+/// An assembly of two instances of one part with one coloured triangle and one edge.
+ModelData TwoInstances() {
+  auto mesh = std::make_shared<PartMesh>();
+  mesh->origin = {1, 2, 3};
+  mesh->points = {{0, 0, 0}, {1, 0, 0}, {0, 1, 0}};
+  mesh->normals = {{0, 0, 1}, {0, 0, 1}, {0, 0, 1}};
+  mesh->triangles = {{0, 1, 2}};
+  mesh->triangleColours = {0};
+  mesh->colours = {{10, 20, 30, 40}};
+  mesh->edgePoints = {{0, 0, 0}, {1, 0, 0}};
+  mesh->lineStarts = {0, 2};
+  mesh->sphere = {{1, 2, 3}, 4};
+  ModelData model;
+  model.parts.resize(2);
+  model.parts[0].name = u"assembly";
+  model.parts[0].isAssembly = true;
+  model.parts[1].name = u"part \u00e9";
+  model.parts[1].mesh = mesh;
+  model.parts[1].area = 0.5;
+  model.parts[1].facesWithoutTriangles = 7;
+  model.products.resize(3);
+  for (const std::size_t i : {1u, 2u}) {
+    model.products[i].father = 0;
+    model.products[i].part = 1;
+  }
+  model.products[1].colour = PartColour{1, 2, 3, 4};
+  model.products[2].name = u"second";
+  model.products[2].fatherFromProduct.SetVector({5, 6, 7});
+  model.otherFiles = {"other.bin"};
+  model.warnings = {"a warning"};
+  return model;
+}
+
+ModelData Decoded(const std::string& inBytes) {
+  ModelData model;
+  EXPECT_TRUE(DecodeModel(inBytes, model));
+  return model;
+}
+}  // namespace
+
+TEST(ModelCodec, DecodeGivesAllThatWasEncoded) {
+  const ModelData model = Decoded(EncodeModel(TwoInstances()));
+  ASSERT_EQ(model.parts.size(), 2u);
+  EXPECT_TRUE(model.parts[0].isAssembly);
+  EXPECT_EQ(model.parts[0].mesh, nullptr);
+  EXPECT_EQ(model.parts[1].name, u"part \u00e9");
+  EXPECT_EQ(model.parts[1].area, 0.5);
+  EXPECT_EQ(model.parts[1].facesWithoutTriangles, 7u);
+  ASSERT_EQ(model.products.size(), 3u);
+  EXPECT_EQ(model.products[0].father, -1);
+  EXPECT_EQ(model.products[1].colour, (PartColour{1, 2, 3, 4}));
+  EXPECT_FALSE(model.products[2].colour.has_value());
+  EXPECT_EQ(model.products[2].name, u"second");
+  EXPECT_EQ(model.products[2].fatherFromProduct.GetVector().y, 6);
+  EXPECT_THAT(model.otherFiles, ElementsAre("other.bin"));
+  EXPECT_THAT(model.warnings, ElementsAre("a warning"));
+}
+
+TEST(ModelCodec, DecodeGivesTheWholeMesh) {
+  const ModelData model = Decoded(EncodeModel(TwoInstances()));
+  ASSERT_NE(model.parts[1].mesh, nullptr);
+  const PartMesh& mesh = *model.parts[1].mesh;
+  EXPECT_EQ(mesh.origin.z, 3);
+  EXPECT_EQ(mesh.points.size(), 3u);
+  EXPECT_EQ(mesh.normals[2][2], 1);
+  EXPECT_EQ(mesh.triangles[0][2], 2u);
+  EXPECT_THAT(mesh.triangleColours, ElementsAre(0));
+  EXPECT_EQ(mesh.colours[0], (PartColour{10, 20, 30, 40}));
+  EXPECT_EQ(mesh.edgePoints[1][0], 1);
+  EXPECT_THAT(mesh.lineStarts, ElementsAre(0u, 2u));
+  EXPECT_EQ(mesh.sphere.radius, 4);
+}
+
+TEST(ModelCodec, DecodeRefusesEveryShorterText) {
+  const std::string bytes = EncodeModel(TwoInstances());
+  ModelData model;
+  for (std::size_t length = 0; length < bytes.size(); ++length)
+    EXPECT_FALSE(DecodeModel(std::string_view(bytes).substr(0, length), model)) << length;
+}
+
+TEST(ModelCodec, DecodeRefusesALongerText) {
+  ModelData model;
+  EXPECT_FALSE(DecodeModel(EncodeModel(TwoInstances()) + '\0', model));
+}
+
+TEST(ModelCodec, DecodeRefusesATriangleWithoutPoints) {
+  ModelData damaged = TwoInstances();
+  auto mesh = std::make_shared<PartMesh>(*damaged.parts[1].mesh);
+  mesh->triangles[0][1] = 3;
+  damaged.parts[1].mesh = mesh;
+  ModelData model;
+  EXPECT_FALSE(DecodeModel(EncodeModel(damaged), model));
+}
+
+TEST(ModelCodec, DecodeRefusesAFatherThatComesLater) {
+  ModelData damaged = TwoInstances();
+  damaged.products[1].father = 2;
+  ModelData model;
+  EXPECT_FALSE(DecodeModel(EncodeModel(damaged), model));
+}
+
+TEST(ModelCodec, DecodeRefusesAnUnknownPart) {
+  ModelData damaged = TwoInstances();
+  damaged.products[2].part = 2;
+  ModelData model;
+  EXPECT_FALSE(DecodeModel(EncodeModel(damaged), model));
+}
+
+TEST(ModelCodec, DecodeLeavesTheModelOnFailure) {
+  ModelData model = TwoInstances();
+  EXPECT_FALSE(DecodeModel("damaged", model));
+  EXPECT_EQ(model.products.size(), 3u);
+}
