@@ -9,6 +9,7 @@
 #include <xercesc/sax/HandlerBase.hpp>
 #include <xercesc/util/PlatformUtils.hpp>
 
+#include "default_platform/xml/ScannerMemory.h"
 #include "platform/xml/DOM_NamedNodeMap.h"
 #include "support/PlatformFolder.h"
 #include "support/XMLText.h"
@@ -41,7 +42,8 @@ class OwnParser {
 
  private:
   xercesc::HandlerBase handler_;  // raises what is fatal
-  xercesc::XercesDOMParser parser_;
+  ScannerMemory memory_;          // frees what the library forgets after errors
+  xercesc::XercesDOMParser parser_{nullptr, &memory_};
   bool isRead_ = false;
 };
 
