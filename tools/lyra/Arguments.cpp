@@ -42,6 +42,11 @@ void Arguments::RequiredText(const char* inNames, const char* inValue, std::stri
   app_.add_option(inNames, outText, inHelp)->required()->type_name(inValue);
 }
 
+void Arguments::Number(const char* inNames, const char* inValue,
+                       std::optional<long long>& outNumber, const char* inHelp) {
+  app_.add_option(inNames, outNumber, inHelp)->type_name(inValue);
+}
+
 void Arguments::Language(std::string& outLanguage) {
   Text("--lang", "LANG", outLanguage,
        "Language of the document's words, such as en or fr (default: that of the system)");

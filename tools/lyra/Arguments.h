@@ -2,6 +2,7 @@
 #ifndef ZOR_TOOLS_LYRA_ARGUMENTS_H
 #define ZOR_TOOLS_LYRA_ARGUMENTS_H
 
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -31,6 +32,8 @@ class Arguments {
              const char* inHelp);
   void RequiredText(const char* inNames, const char* inValue, std::string& outText,
                     const char* inHelp);
+  void Number(const char* inNames, const char* inValue, std::optional<long long>& outNumber,
+              const char* inHelp);
   /// The language of the message catalogues, for verbs that translate words of documents.
   void Language(std::string& outLanguage);
 

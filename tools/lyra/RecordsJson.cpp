@@ -139,6 +139,17 @@ Json ToJson(const LinkRecord& inRecord) {
   return json;
 }
 
+Json ToJson(const ModelProductRecord& inRecord) {
+  Json json = Json::object();
+  if (inRecord.path) json["path"] = *inRecord.path;
+  json["alias"] = inRecord.alias;
+  json["part"] = inRecord.part;
+  json["placement"] = inRecord.placement;
+  json["triangles"] = inRecord.triangles;
+  json["colour"] = inRecord.colour ? Json(*inRecord.colour) : Json(nullptr);
+  return json;
+}
+
 std::string LineOf(const Json& inValue) {
   return EscapedForJson(inValue.dump(-1, ' ', false, Json::error_handler_t::replace));
 }
@@ -150,6 +161,7 @@ std::string JsonText(const GeneralRecord& inRecord) { return LineOf(ToJson(inRec
 std::string JsonText(const ComponentRecord& inRecord) { return LineOf(ToJson(inRecord)); }
 std::string JsonText(const SpecificationRecord& inRecord) { return LineOf(ToJson(inRecord)); }
 std::string JsonText(const LinkRecord& inRecord) { return LineOf(ToJson(inRecord)); }
+std::string JsonText(const ModelProductRecord& inRecord) { return LineOf(ToJson(inRecord)); }
 
 JsonArray::JsonArray(Output& ioOutput) : output_(ioOutput) { output_.Write("["); }
 

@@ -5,6 +5,7 @@
 #include <string>
 
 #include "lyra/DocumentRecords.h"
+#include "lyra/ModelRecords.h"
 #include "lyra/Output.h"
 
 namespace lyra {
@@ -16,6 +17,7 @@ std::string JsonText(const GeneralRecord& inRecord);
 std::string JsonText(const ComponentRecord& inRecord);
 std::string JsonText(const SpecificationRecord& inRecord);
 std::string JsonText(const LinkRecord& inRecord);
+std::string JsonText(const ModelProductRecord& inRecord);
 
 /// Writes a JSON array record by record, one a line, so that no more than one is in memory.
 class JsonArray {

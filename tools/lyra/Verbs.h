@@ -32,6 +32,8 @@ VerbAction DeclareConvert(Arguments& ioArguments);
 VerbAction DeclareMerge(Arguments& ioArguments);
 VerbAction DeclareFederate(Arguments& ioArguments);
 VerbAction DeclareReport(Arguments& ioArguments);
+VerbAction DeclareTree(Arguments& ioArguments);
+VerbAction DeclareRender(Arguments& ioArguments);
 VerbAction DeclarePath(Arguments& ioArguments);
 VerbAction DeclareEscape(Arguments& ioArguments);
 VerbAction DeclareFilename(Arguments& ioArguments);

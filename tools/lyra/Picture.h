@@ -1,0 +1,47 @@
+// Taking a picture of a representation.
+#ifndef ZOR_TOOLS_LYRA_PICTURE_H
+#define ZOR_TOOLS_LYRA_PICTURE_H
+
+#include <optional>
+#include <string>
+
+#include "platform/mathematics/ZORMathVector.h"
+#include "platform/visualisation/ZOR3DRep.h"
+
+namespace lyra {
+
+enum class PictureFormat { kJpeg, kPng };
+
+struct PictureSize {
+  int width = 756;
+  int height = 506;
+};
+
+/// A direction to look in, without perspective.
+struct PictureView {
+  ZORMathVector sight;
+  ZORMathVector up;
+};
+
+struct PictureWishes {
+  PictureFormat format = PictureFormat::kJpeg;
+  PictureSize size;
+  std::optional<PictureView> view;  ///< none: from a corner, in perspective
+  bool keepsBackground = false;
+};
+
+// What users write; each raises UsageError for what it does not know.
+/// By the ending of the picture's name, in any letter case.
+PictureFormat FormatOfPicture(const std::string& inPath);
+/// "WxH", 1 to 16384 each.
+PictureSize SizeOf(const std::string& inText);
+/// "iso", which is none, "front", "back", "left", "right", "top" or "bottom". The front is seen in
+/// the direction of the y axis, z upwards; the top with the y axis upwards.
+std::optional<PictureView> ViewOf(const std::string& inWord);
+
+/// Writes a picture with all of a representation framed; no file when it cannot be drawn.
+void TakePicture(ZOR3DRep& inRep, const PictureWishes& inWishes, const std::string& inPath);
+
+}  // namespace lyra
+
+#endif
