@@ -18,6 +18,8 @@
 namespace {
 namespace fs = std::filesystem;
 
+constexpr std::size_t kSmallDocument = 32;
+
 struct Options {
   std::vector<std::size_t> sizes = {1000, 10'000, 100'000};
   std::vector<std::string> benchmarks = {"load", "loop",   "merge", "report",
@@ -116,7 +118,7 @@ class Bench {
                {"pugixml", "load-pugixml"}},
               {clashes});
     if (IsWanted("loop"))
-      Compare("loop", inSize, {{"ZORLyra", "loop-zorlyra"}, {"pugixml, by hand", "loop-pugixml"}},
+      Compare("loop", inSize, {{"ZORLyra", "loop-zorlyra"}, {"pugixml by hand", "loop-pugixml"}},
               {clashes, Document("components.xml", inSize / 10, 2, WriteComponentsDocument)});
     if (IsWanted("merge"))
       Compare("merge", inSize, {{"ZORLyra", "merge-zorlyra"}, {"Xerces-C DOM", "merge-xerces"}},
@@ -144,6 +146,7 @@ class Bench {
     for (std::size_t i = 0; i < inSubjects.size(); ++i)
       results_.Add(inBenchmark, inSubjects[i].name, inSize, measured[i]);
     results_.PrintTable(inBenchmark, inSize, std::cout);
+    std::cout.flush();
   }
 
   Steps RunMeasurement(const std::string& inMeasurement, const Arguments& inArguments) const {
@@ -160,14 +163,13 @@ class Bench {
       std::cerr << "zor_bench: the command is not built; its start is not measured\n";
       return;
     }
-    constexpr std::size_t kSmall = 32;
-    const std::string document = Document("small.xml", kSmall, 1, WriteClashDocument);
+    const std::string document = Document("small.xml", kSmallDocument, 1, WriteClashDocument);
     const std::vector<std::string> info = {lyra, "info", document};
     const auto times =
         TimeCommands({info, {"xmllint", "--noout", document}}, 20 * options_.repeats);
-    results_.Add("start", "lyra info", kSmall, times[0]);
-    results_.Add("start", "xmllint --noout", kSmall, times[1]);
-    results_.PrintTable("start", kSmall, std::cout);
+    results_.Add("start", "lyra info", kSmallDocument, times[0]);
+    results_.Add("start", "xmllint --noout", kSmallDocument, times[1]);
+    results_.PrintTable("start", kSmallDocument, std::cout);
     heavyLibraries_ = HeavyLibrariesOf(info, scratch_.Path());
     startMeasured_ = true;
   }
@@ -189,14 +191,31 @@ class Bench {
   }
 
   void PrintTargets() const {
+    std::cout << "\nTargets, at " << options_.sizes.back() << '\n';
+    PrintGrowth();
+    PrintRatios();
+    if (startMeasured_) PrintStartTarget();
+  }
+
+  // What is linear takes as long for each interference however many there are.
+  void PrintGrowth() const {
     const std::size_t least = options_.sizes.front();
     const std::size_t most = options_.sizes.back();
-    const double growth = results_.AllMilliseconds("loop", "ZORLyra", most) /
-                          results_.AllMilliseconds("loop", "ZORLyra", least) *
-                          static_cast<double>(least) / static_cast<double>(most);
-    std::cout << "\nTargets, at " << most << '\n';
-    PrintTarget("reading loop, time each there / at " + std::to_string(least), growth, "at most",
-                1.5);
+    const auto print = [&](const std::string& inWhat, double inMost, double inLeast) {
+      PrintTarget(inWhat + ", time each there / at " + std::to_string(least),
+                  inMost / inLeast * static_cast<double>(least) / static_cast<double>(most),
+                  "at most", 1.5);
+    };
+    print("reading loop", results_.AllMilliseconds("loop", "ZORLyra", most),
+          results_.AllMilliseconds("loop", "ZORLyra", least));
+    print("merge", results_.Milliseconds("merge", "ZORLyra", most, "merge"),
+          results_.Milliseconds("merge", "ZORLyra", least, "merge"));
+    print("report, write", results_.Milliseconds("report", "ZORLyra", most, "write"),
+          results_.Milliseconds("report", "ZORLyra", least, "write"));
+  }
+
+  void PrintRatios() const {
+    const std::size_t most = options_.sizes.back();
     PrintTarget("all GetClashInfos, full form / load",
                 Ratio("loop", most, "ZORLyra", "full", "ZORLyra", "load"), "at most", 1);
     PrintTarget("merge / load of both", Ratio("merge", most, "ZORLyra", "merge", "ZORLyra", "load"),
@@ -210,9 +229,12 @@ class Bench {
       PrintTarget(std::string("append each character / CheckXMLString, ") + step,
                   Ratio("escape", characters, "append each", step, "ZORLyra", step), "at least",
                   10);
-    if (!startMeasured_) return;
+  }
+
+  void PrintStartTarget() const {
     PrintTarget("lyra info / xmllint --noout",
-                Ratio("start", 32, "lyra info", "run", "xmllint --noout", "run"), "at most", 3);
+                Ratio("start", kSmallDocument, "lyra info", "run", "xmllint --noout", "run"),
+                "at most", 3);
     std::cout << "  CAD and rendering libraries that lyra info loads:";
     for (const std::string& library : heavyLibraries_) std::cout << ' ' << library;
     std::cout << (heavyLibraries_.empty() ? " none\n" : "\n");
