@@ -1,15 +1,18 @@
-// Conversions between documents and texts, lengths, and logical names.
+// Conversions between documents and texts, lengths, logical names, and products.
 #ifndef ZOR_LYRA_GENERAL_SERVICES_H
 #define ZOR_LYRA_GENERAL_SERVICES_H
 
 #include "ZORLyraExport.h"
 #include "platform/mathematics/ZORMathPointf.h"
 #include "platform/mathematics/ZORMathVectorf.h"
+#include "platform/product_structure/ZORDocument.h"
+#include "platform/product_structure/ZORIProduct.h"
+#include "platform/system/ZORListValZORBaseUnknown_var.h"
 #include "platform/system/ZORUnicodeString.h"
 #include "platform/xml/DOM_Document.h"
 
 /// Services that every reader and writer uses. Only static operations; nothing is kept between two
-/// calls. None reports a failure by a code or an error of its own.
+/// calls. None raises an error of its own; those that answer a code say which.
 class ZOR_LYRA_EXPORT ZORLyraGeneralServices {
  public:
   ZORLyraGeneralServices() = delete;
@@ -59,6 +62,36 @@ class ZOR_LYRA_EXPORT ZORLyraGeneralServices {
   /// @return the reference itself when it holds no "ZORDLN://" (text before it is dropped); the
   ///         empty string for an unknown name; "error" when the directory cannot be expanded.
   static ZORUnicodeString TransformPathnameFromDLName(ZORUnicodeString inReference);
+
+  // Identifiers under which products are stored
+  /// The PDM identifier, followed by "<uuiddv>" and the version where that is not empty. The PDM
+  /// identifier is not checked.
+  static ZORUnicodeString BuildStorageProdIdFromPDMIdDV(
+      const ZORUnicodeString& inPDMId, const ZORUnicodeString& inDocumentVersionId);
+  /// Splits such an identifier at its first "<uuiddv>"; without one all of it is the PDM
+  /// identifier. Both outputs are emptied first, so neither may be the input.
+  /// @return S_OK; E_FAIL, both outputs empty, for an empty identifier.
+  static HRESULT GetPDMIdDVFromStorageProdId(const ZORUnicodeString& inStorageId,
+                                             ZORUnicodeString& outPDMId,
+                                             ZORUnicodeString& outDocumentVersionId);
+
+  // Product trees
+  /// Appends the products that carry geometry, a product before those below it, children in their
+  /// order: all without children, and those with children that have a representation of their own
+  /// (in the old visualisation mode one with a name). Children that are no products end their
+  /// branch. A product that is reached twice is listed twice; what the list holds already stays.
+  /// @param inProduct null lists nothing.
+  static void Expand(ZORIProduct* inProduct, ZORListValZORBaseUnknown_var& ioList);
+  /// The aliases from below the root down to the product, joined by " --++-- "; empty for a root
+  /// and for what has no alias. Raises ZORNullVarError when a product on the way has an alias but
+  /// does not know its father (no ZORISpecObject).
+  static ZORUnicodeString GetPathRoot(ZORIProduct_var inProduct);
+  /// Adds a provider for an interface to a document, which keeps a reference.
+  /// @param inDocument null: the document that holds the provider.
+  /// @return what the document's list of providers answers; E_FAIL when the provider is null or
+  ///         lacks the interface, or there is no document or it takes no providers.
+  static HRESULT RegisterProvider(const IID& inInterface, ZORBaseUnknown_var& inProvider,
+                                  ZORDocument* inDocument);
 };
 
 #endif
