@@ -1,4 +1,4 @@
-// XML written by markers, federator documents, documents written to files.
+// XML written by markers, federator documents, documents written to files, pictures.
 #ifndef ZOR_LYRA_XML_SERVICES_H
 #define ZOR_LYRA_XML_SERVICES_H
 
@@ -7,6 +7,9 @@
 #include "platform/system/ZORResult.h"
 #include "platform/system/ZORUnicodeString.h"
 #include "platform/xml/DOM_Node.h"
+
+class ZOR3DViewpoint;
+class ZORRep;
 
 /// Writes XML text marker by marker into a text of its own, which DumpDocument then puts into a
 /// file.
@@ -104,6 +107,25 @@ class ZOR_LYRA_EXPORT ZORLyraXMLServices : public ZORBaseUnknown {
   /// @return S_OK, or the platform's negative code: E_INVALIDARG for a path of 260 bytes or more.
   HRESULT CopyFile(const char* inFileName, ZORUnicodeString inSourceDirectory,
                    ZORUnicodeString inTargetDirectory);
+
+  // Pictures; nothing is reported
+  /// Draws a representation, all of it framed, in 756 by 506 pixels, surfaces shaded and hidden
+  /// edges off, and writes it as a JPEG file, whatever the path ends in. A null representation, or
+  /// one that cannot be drawn, writes no file; in the latter case the print image is not released.
+  /// @param inRep            a ZOR3DRep.
+  /// @param inPath           its narrow form names the file.
+  /// @param inKeepBackground 0: white; any other value: the platform's own background.
+  static void TakeRepImage(ZORRep* inRep, ZORUnicodeString inPath, int inKeepBackground);
+  /// The same in any size; the print image is always released.
+  /// @param inWidth, inHeight in pixels, as the platform can draw them.
+  /// @param inViewMode       1: surfaces shaded and hidden edges off; any other value: as the
+  ///                         platform draws at first.
+  static void TakeRepImage(ZORRep* inRep, ZORUnicodeString inPath, int inWidth, int inHeight,
+                           int inViewMode, int inKeepBackground);
+  /// The same as the first, through a viewpoint instead of framed.
+  /// @param inViewpoint never null; copied.
+  static void TakeRepImage(ZORRep* inRep, ZORUnicodeString inPath, ZOR3DViewpoint* inViewpoint,
+                           int inKeepBackground);
 
  private:
   void AppendAttribute(const ZORUnicodeString& inName, const ZORUnicodeString& inValue);
