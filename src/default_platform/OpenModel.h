@@ -86,6 +86,13 @@ struct ProductFacts {
 /// @return false when the product is none of an opened model (or null); outFacts is untouched then.
 ZOR_PLATFORM_EXPORT bool GetProductFacts(ZORIProduct* inProduct, ProductFacts& outFacts);
 
+/// The product that an alias path leads to: the aliases from below the root down, joined by
+/// " --++-- ". A component to which its file gives no name is also found by the name "=>[0:1:1:30]"
+/// that other programs on the same geometry kernel write into their results.
+/// @return empty when no product of the model is meant, as by an empty path.
+ZOR_PLATFORM_EXPORT ZORIProduct_var FindProduct(const ZORIProduct_var& inRoot,
+                                                const ZORUnicodeString& inAliasPath);
+
 }  // namespace ZORDefault
 
 #endif

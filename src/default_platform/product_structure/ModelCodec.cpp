@@ -111,6 +111,7 @@ std::shared_ptr<const PartMesh> GetMesh(Reader& ioReader) {
 
 void PutPart(Writer& ioWriter, const ModelPart& inPart) {
   ioWriter.PutAll(inPart.name);
+  ioWriter.PutAll(inPart.label);
   PutColour(ioWriter, inPart.colour);
   ioWriter.Put<std::uint8_t>(inPart.isAssembly);
   ioWriter.Put<std::uint8_t>(inPart.failedToTessellate);
@@ -123,6 +124,7 @@ void PutPart(Writer& ioWriter, const ModelPart& inPart) {
 ModelPart GetPart(Reader& ioReader) {
   ModelPart part;
   ioReader.GetAll(part.name);
+  ioReader.GetAll(part.label);
   part.colour = GetColour(ioReader);
   part.isAssembly = ioReader.Get<std::uint8_t>() != 0;
   part.failedToTessellate = ioReader.Get<std::uint8_t>() != 0;

@@ -16,6 +16,7 @@ namespace ZORDefault {
 /// What one or more products are instances of: a part or an assembly. Held once.
 struct ModelPart {
   std::u16string name;  ///< as the file has it; may be empty
+  std::string label;    ///< the reader's own number for it, such as "0:1:1:30"; may be empty
   std::optional<PartColour> colour;
   std::shared_ptr<const PartMesh> mesh;  ///< null: an assembly, or a part with nothing to show
   bool isAssembly = false;

@@ -108,6 +108,12 @@ ProductFacts Product::GetFacts() const {
   return facts;
 }
 
+bool Product::IsCalled(const ZORUnicodeString& inName) const {
+  if (GetAlias() == inName) return true;
+  const bool hasName = !GetModelProduct().name.empty() || !GetPart().name.empty();
+  return !hasName && inName == ("=>[" + GetPart().label + "]").c_str();
+}
+
 ZOR3DRep* Product::GetRep() {
   if (!isRepMade_) MakeRep();
   isRepMade_ = true;
@@ -206,6 +212,29 @@ bool GetProductFacts(ZORIProduct* inProduct, ProductFacts& outFacts) {
   if (product.IsNull()) return false;
   outFacts = product->GetProduct().GetFacts();
   return true;
+}
+
+ZORIProduct_var FindProduct(const ZORIProduct_var& inRoot, const ZORUnicodeString& inAliasPath) {
+  static const ZORUnicodeString kSeparator(" --++-- ");
+  const ZORInterfaceHandle<ProductIdentity> root = inRoot;
+  if (root.IsNull()) return {};
+  Product* product = &root->GetProduct();
+  // A name may hold the separator itself, so each child is tried with all of its own name.
+  const auto find = [&](auto&& self, Product& father, const ZORUnicodeString& path) -> Product* {
+    for (Product* const child : father.GetChildren())
+      if (child->IsCalled(path)) return child;
+    for (int end = path.SearchSubString(kSeparator); end >= 0;
+         end = path.SearchSubString(kSeparator, end + 1)) {
+      const ZORUnicodeString name = path.SubString(0, end);
+      const ZORUnicodeString rest = path.SubString(end + kSeparator.GetLengthInChar());
+      for (Product* const child : father.GetChildren())
+        if (child->IsCalled(name))
+          if (Product* const found = self(self, *child, rest)) return found;
+    }
+    return nullptr;
+  };
+  product = find(find, *product, inAliasPath);
+  return product ? ZORIProduct_var(product->GetInterface()) : ZORIProduct_var();
 }
 
 }  // namespace ZORDefault

@@ -57,6 +57,8 @@ class Product final : public FacetedComponent, private CountedObject<Product> {
   const ZORUnicodeString& GetAlias() const;
   const ZORMathTransformation& GetRootFromProduct() const { return rootFromProduct_; }
   ProductFacts GetFacts() const;
+  /// Whether a name in an alias path means this product among its siblings.
+  bool IsCalled(const ZORUnicodeString& inName) const;
 
   /// The representation, made at the first call; null when there is nothing to show.
   ZOR3DRep* GetRep();

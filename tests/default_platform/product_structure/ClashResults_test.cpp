@@ -72,16 +72,13 @@ TEST_P(ClashResults, EveryProductIsFoundAtItsPlace) {
   const auto path = products::FindModel(GetParam().model);
   if (!path) GTEST_SKIP() << GetParam().model << " is not here; set ZOR_MODEL_DIR";
   const auto model = products::OpenAnew(*path);
-  std::map<std::string, ZORIProduct_var> byPath;
-  for (const auto& product : products::AllProducts(model.root))
-    byPath[products::AliasPathOf(product)] = product;
-
   const auto placements = PlacementsIn(products::Sample(GetParam().result));
   EXPECT_EQ(placements.size(), GetParam().products);
   for (const auto& [alias, expected] : placements) {
-    ASSERT_TRUE(byPath.contains(alias)) << alias;
+    const ZORIProduct_var product = ZORDefault::FindProduct(model.root, alias.c_str());
+    ASSERT_FALSE(product.IsNull()) << alias;
     Placement found;
-    products::FactsOf(byPath[alias]).rootFromProduct.GetCoefficients(found.data());
+    products::FactsOf(product).rootFromProduct.GetCoefficients(found.data());
     for (std::size_t i = 0; i < 12; ++i)  // the result has six digits
       EXPECT_NEAR(found[i], expected[i], 1e-3 + 5e-6 * std::abs(expected[i])) << alias << ' ' << i;
   }
@@ -94,7 +91,7 @@ INSTANTIATE_TEST_SUITE_P(
                     ClashResult{"printable_case.clash.xml", "printable_case_full.stp", 15},
                     ClashResult{"pushdevice.clash.xml", "pushdevice_assembly.step", 67},
                     ClashResult{"low_cost_robot_arm.clash.xml", "low_cost_robot_arm.step", 161},
-                    ClashResult{"stamp_c6lora.clash.xml", "stamp_c6lora_smd.step", 501}),
+                    ClashResult{"stamp_c6lora.clash.xml", "stamp_c6lora_smd.step", 498}),
     [](const auto& inInfo) {
       std::string name = inInfo.param.model;
       name = name.substr(0, name.find('.'));

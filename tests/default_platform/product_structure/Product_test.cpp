@@ -130,7 +130,7 @@ TEST_F(Product, FactsTellNamesAndPlacements) {
   EXPECT_STREQ(facts.partName.ConvertToChar(), "nut");
   EXPECT_FALSE(facts.isAssembly);
   EXPECT_NEAR(facts.rootFromProduct.GetVector().x, 175, 1e-6);
-  EXPECT_NEAR(facts.fatherFromProduct.GetVector().x, 10, 1e-6);
+  EXPECT_NEAR(facts.fatherFromProduct.GetVector().x, -10, 1e-6);
   EXPECT_GT(facts.triangles, 100u);
   EXPECT_FALSE(facts.failedToTessellate);
 }
@@ -263,4 +263,17 @@ TEST(NewVisuMode, IsNewUnlessSwitchedOff) {
   EXPECT_EQ(ZORPrdNewVisuMode(), 1);
   const support::ScopedVariable old("ZOR_NEW_VISU_MODE", "0");
   EXPECT_EQ(ZORPrdNewVisuMode(), 0);
+}
+
+TEST_F(Product, FindProductFollowsAliases) {
+  EXPECT_TRUE(ZORDefault::FindProduct(Root(), "rod-assembly_1 --++-- nut_1") == Nut());
+  EXPECT_TRUE(ZORDefault::FindProduct(Root(), "rod-assembly_1") == RodAssembly());
+  EXPECT_TRUE(ZORDefault::FindProduct(RodAssembly(), "nut_1") == Nut());
+}
+
+TEST_F(Product, FindProductAnswersNothingForAnotherPath) {
+  for (const char* path : {"", "as1", "nut_1", "rod-assembly_1 --++-- ", "rod-assembly_1 --++-- x",
+                           "rod-assembly_1--++--nut_1", "=>[0:1:1:2]"})
+    EXPECT_TRUE(ZORDefault::FindProduct(Root(), path).IsNull()) << path;
+  EXPECT_TRUE(ZORDefault::FindProduct(ZORIProduct_var(), "nut_1").IsNull());
 }

@@ -13,6 +13,7 @@
 #include <STEPCAFControl_Controller.hxx>
 #include <STEPCAFControl_ExternFile.hxx>
 #include <STEPCAFControl_Reader.hxx>
+#include <TopoDS_Compound.hxx>
 #include <TopoDS_Face.hxx>
 #include <XCAFDoc_DocumentTool.hxx>
 #include <XCAFDoc_ShapeTool.hxx>
@@ -84,10 +85,26 @@ bool ReadMeshes(RWMesh_CafReader& ioReader, const ModelRequest& inRequest,
   return true;
 }
 
+/// Puts several roots below one: the kernel would keep only one of roots that show the same mesh.
+class GltfReader : public RWGltf_CafReader {
+ protected:
+  void fillDocument() override {
+    if (myRootShapes.Length() > 1) {
+      TopoDS_Compound all;
+      BRep_Builder builder;
+      builder.MakeCompound(all);
+      for (const TopoDS_Shape& root : myRootShapes) builder.Add(all, root);
+      myRootShapes.Clear();
+      myRootShapes.Append(all);
+    }
+    RWGltf_CafReader::fillDocument();
+  }
+};
+
 /// glTF is in metres with y upwards.
 bool ReadGltf(const ModelRequest& inRequest, const Handle(TDocStd_Document) & inDocument,
               const Message_ProgressRange& inProgress, std::vector<std::string>& outOtherFiles) {
-  RWGltf_CafReader reader;
+  GltfReader reader;
   reader.SetSystemLengthUnit(kMillimetre);
   reader.SetSystemCoordinateSystem(RWMesh_CoordinateSystem_Zup);
   return ReadMeshes(reader, inRequest, inDocument, inProgress, outOtherFiles);

@@ -3,6 +3,7 @@
 #include <NCollection_DataMap.hxx>
 #include <TDF_LabelMapHasher.hxx>
 #include <TDF_LabelSequence.hxx>
+#include <TDF_Tool.hxx>
 #include <TDataStd_Name.hxx>
 #include <TopLoc_Location.hxx>
 #include <XCAFDoc_DocumentTool.hxx>
@@ -21,6 +22,12 @@ std::u16string NameOf(const TDF_Label& inLabel) {
   if (!inLabel.FindAttribute(TDataStd_Name::GetID(), name)) return {};
   const TCollection_ExtendedString& text = name->Get();
   return std::u16string(text.ToExtString(), static_cast<std::size_t>(text.Length()));
+}
+
+std::string EntryOf(const TDF_Label& inLabel) {
+  TCollection_AsciiString entry;
+  TDF_Tool::Entry(inLabel, entry);
+  return entry.ToCString();
 }
 
 ZORMathTransformation ToTransformation(const gp_Trsf& inPlacement) {
@@ -94,6 +101,7 @@ class Walk {
     if (const std::uint32_t* const known = parts_.Seek(inPart)) return *known;
     ModelPart part;
     part.name = NameOf(inPart);
+    part.label = EntryOf(inPart);
     part.colour = ColourOf(inPart);
     part.isAssembly = XCAFDoc_ShapeTool::IsAssembly(inPart);
     const auto position = static_cast<std::uint32_t>(model_.parts.size());
