@@ -34,7 +34,7 @@ struct PartMesh {
   std::vector<std::array<float, 3>> edgePoints;
   std::vector<std::uint32_t> lineStarts;
   ZOR3DBoundingSphere sphere;        ///< in the part's space
-  mutable DrawingStructure drawing;  ///< the renderer's own; nobody else touches it
+  mutable DrawingStructure drawing;  ///< kept by the renderer; nobody else touches it
 };
 
 #endif

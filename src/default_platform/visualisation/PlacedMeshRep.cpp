@@ -1,23 +1,9 @@
 #include "default_platform/visualisation/PlacedMeshRep.h"
 
-#include <algorithm>
-#include <cmath>
+#include <utility>
 
+#include "default_platform/visualisation/SphereAround.h"
 #include "default_platform/visualisation/ZOR3DSceneVisitor.h"
-
-namespace {
-
-/// By how much a transformation stretches lengths at most, for rotations with a scale of each axis.
-double LargestScale(const ZORMathTransformation& inTransformation) {
-  double largest = 0;
-  for (int i = 0; i < 3; ++i) {
-    const ZORMathVector& column = inTransformation.GetMatrix().GetColumn(i);
-    largest = std::max(largest, std::hypot(column.x, column.y, column.z));
-  }
-  return largest;
-}
-
-}  // namespace
 
 PlacedMeshRep::PlacedMeshRep(std::shared_ptr<const PartMesh> inMesh,
                              const ZORMathTransformation& inRootFromPart,
@@ -31,8 +17,9 @@ PlacedMeshRep::PlacedMeshRep(std::shared_ptr<const PartMesh> inMesh,
 PlacedMeshRep::~PlacedMeshRep() = default;
 
 ZOR3DBoundingSphere PlacedMeshRep::GetShowBoundingElement() const {
-  if (mesh_->sphere.IsEmpty()) return {};
-  return {rootFromPart_ * mesh_->sphere.centre, mesh_->sphere.radius * LargestScale(rootFromPart_)};
+  ZORDefault::SphereAround sphere;
+  sphere.AddMesh(*mesh_, rootFromPart_);
+  return sphere.Get();
 }
 
 void PlacedMeshRep::Accept(ZOR3DSceneVisitor& ioVisitor) const { ioVisitor.VisitMesh(*this); }

@@ -1,6 +1,7 @@
 #include "default_platform/visualisation/ray_caster/DrawPicture.h"
 
 #include <algorithm>
+#include <array>
 #include <cmath>
 
 #include "default_platform/visualisation/ray_caster/EdgeLines.h"
@@ -55,26 +56,33 @@ class Composition {
               const LineCoverage& inLines)
       : request_(inRequest), refinement_(inRefinement), lines_(inLines) {}
 
-  void ComposeRow(int inY, std::uint8_t* outBytes) const {
+  void ComposeRow(int inY, Vec3 inBackground, std::uint8_t* outBytes) const {
+    const ShownColour background = Shown(inBackground);
     for (int x = 0; x < request_.width; ++x) {
-      const Vec3 light = LightAt(x, inY);
-      *outBytes++ = ShownByte(light.x);
-      *outBytes++ = ShownByte(light.y);
-      *outBytes++ = ShownByte(light.z);
+      const std::size_t place =
+          static_cast<std::size_t>(inY) * static_cast<std::size_t>(request_.width) +
+          static_cast<std::size_t>(x);
+      const bool isPlain = refinement_.IsBackground(place) && lines_.visible[place] == 0 &&
+                           (lines_.hidden.empty() || lines_.hidden[place] == 0);
+      const ShownColour shown = isPlain ? background : Shown(LightAt(x, inY, place));
+      outBytes = std::copy(shown.begin(), shown.end(), outBytes);
     }
   }
 
  private:
-  Vec3 LightAt(int inX, int inY) const {
-    const std::size_t place =
-        static_cast<std::size_t>(inY) * static_cast<std::size_t>(request_.width) +
-        static_cast<std::size_t>(inX);
+  typedef std::array<std::uint8_t, 3> ShownColour;
+
+  static ShownColour Shown(Vec3 inLight) {
+    return {ShownByte(inLight.x), ShownByte(inLight.y), ShownByte(inLight.z)};
+  }
+
+  Vec3 LightAt(int inX, int inY, std::size_t inPlace) const {
     const ShownPixel pixel = refinement_.At(inX, inY);
     // The strongest ink alone: an edge on an outline is no darker than an edge.
     float ink = (request_.isShaded ? kOutlineInk : kOutlineInkAlone) * pixel.outline;
-    ink = std::max(ink, kEdgeInk * static_cast<float>(lines_.visible[place]) / 255);
+    ink = std::max(ink, kEdgeInk * static_cast<float>(lines_.visible[inPlace]) / 255);
     if (!lines_.hidden.empty())
-      ink = std::max(ink, kHiddenEdgeInk * static_cast<float>(lines_.hidden[place]) / 255);
+      ink = std::max(ink, kHiddenEdgeInk * static_cast<float>(lines_.hidden[inPlace]) / 255);
     return ink > 0 ? Mix(pixel.light, InkOn(pixel.light), ink) : pixel.light;
   }
 
@@ -99,7 +107,8 @@ std::vector<std::uint8_t> DrawPicture(const PictureRequest& inRequest) {
   std::vector<std::uint8_t> bytes(rowSize * static_cast<std::size_t>(inRequest.height));
   const Composition composition(inRequest, refinement, lines);
   ForEach(threadCount, inRequest.height, [&](int inY) {
-    composition.ComposeRow(inY, bytes.data() + rowSize * static_cast<std::size_t>(inY));
+    composition.ComposeRow(inY, backdrop.rows[static_cast<std::size_t>(inY)],
+                           bytes.data() + rowSize * static_cast<std::size_t>(inY));
   });
   return bytes;
 }
@@ -114,8 +123,7 @@ std::vector<ZORDefault::SeenPixel> SeePicture(const PictureRequest& inRequest) {
     for (int x = 0; x < inRequest.width; ++x) {
       const PicturePoint middle{static_cast<float>(x) + 0.5F, static_cast<float>(y) + 0.5F};
       Hit hit;
-      scene.Cast(&middle, 1, &hit);
-      if (hit.item == Hit::kNothing)
+      if (!scene.Cast(&middle, 1, &hit) || hit.item == Hit::kNothing)
         seen.emplace_back();
       else
         seen.push_back({scene.GetItems()[hit.item].number, static_cast<float>(hit.depth + offset)});

@@ -55,7 +55,7 @@ Vec3 Rounded(const ZORMathVector& inVector) {
 
 float LargestStretch(const Affine& inAffine) {
   float square = 0;
-  for (const Vec3& column : inAffine.columns)
+  for (const Vec3& column : inAffine.linear.columns)
     square = std::max(square, ZORRayCaster::Dot(column, column));
   return std::sqrt(square);
 }
@@ -66,7 +66,7 @@ void SetSphere(const PartMesh& inMesh, DrawnItem& ioItem) {
   const Vec3 fromOrigin{static_cast<float>(sphere.centre.x - inMesh.origin.x),
                         static_cast<float>(sphere.centre.y - inMesh.origin.y),
                         static_cast<float>(sphere.centre.z - inMesh.origin.z)};
-  ioItem.centre = ioItem.cameraFromMesh.Point(fromOrigin);
+  ioItem.centre = ioItem.cameraFromMesh * fromOrigin;
   ioItem.radius =
       std::max(static_cast<float>(sphere.radius), 0.F) * LargestStretch(ioItem.cameraFromMesh);
 }
@@ -75,11 +75,12 @@ DrawnItem MakeItem(const DrawnMesh& inMesh, const Placement& inPlacement, std::u
   DrawnItem item;
   item.mesh = inMesh.mesh.get();
   item.structure = &StructureOf(*item.mesh);
-  for (int i = 0; i < 3; ++i) item.cameraFromMesh.columns[i] = Rounded(inPlacement.columns[i]);
-  item.cameraFromMesh.translation = Rounded(inPlacement.translation);
-  const Vec3* const columns = item.cameraFromMesh.columns;
   for (int i = 0; i < 3; ++i)
-    item.normalMatrix[i] = Cross(columns[(i + 1) % 3], columns[(i + 2) % 3]);
+    item.cameraFromMesh.linear.columns[i] = Rounded(inPlacement.columns[i]);
+  item.cameraFromMesh.translation = Rounded(inPlacement.translation);
+  const Vec3* const columns = item.cameraFromMesh.linear.columns;
+  for (int i = 0; i < 3; ++i)
+    item.normalMatrix.columns[i] = Cross(columns[(i + 1) % 3], columns[(i + 2) % 3]);
   SetSphere(*item.mesh, item);
   item.hasNormals = item.mesh->normals.size() >= item.mesh->points.size();
   item.colour = ToSurfaceColour(inMesh.colour);
@@ -138,18 +139,6 @@ RTCIntersectContext CoherentContext() {
 
 }  // namespace
 
-Vec3 View::RayStart(PicturePoint inPoint) const {
-  if (isConic) return {};
-  return {(inPoint.x - 0.5F * static_cast<float>(width)) * pixelSize,
-          (inPoint.y - 0.5F * static_cast<float>(height)) * pixelSize, 0};
-}
-
-Vec3 View::RayDirection(PicturePoint inPoint) const {
-  if (!isConic) return {0, 0, 1};
-  return {(inPoint.x - 0.5F * static_cast<float>(width)) * pixelSize,
-          (inPoint.y - 0.5F * static_cast<float>(height)) * pixelSize, 1};
-}
-
 PicturePoint View::PointOf(Vec3 inPlace) const {
   const float scale = 1 / (isConic ? pixelSize * inPlace.z : pixelSize);
   return {inPlace.x * scale + 0.5F * static_cast<float>(width),
@@ -188,6 +177,7 @@ DrawnScene::DrawnScene(const ZORDefault::PictureRequest& inRequest) {
   }
   scene_ = Device() ? rtcNewScene(Device()) : nullptr;
   if (!scene_) throw std::bad_alloc();
+  box_ = BoxOfItems();
   AttachInstances();
 }
 
@@ -198,7 +188,8 @@ void DrawnScene::AttachInstances() {
   for (std::uint32_t i = 0; i < items_.size(); ++i) {
     const DrawnItem& item = items_[i];
     // A mesh pressed flat cannot be met by rays; its lines are drawn all the same.
-    const float determinant = Dot(item.cameraFromMesh.columns[0], item.normalMatrix[0]);
+    const float determinant =
+        Dot(item.cameraFromMesh.linear.columns[0], item.normalMatrix.columns[0]);
     if (!item.structure->HasTriangles() || !(std::fabs(determinant) > 0)) continue;
     const RTCGeometry instance = rtcNewGeometry(Device(), RTC_GEOMETRY_TYPE_INSTANCE);
     rtcSetGeometryInstancedScene(instance, item.structure->Scene());
@@ -214,7 +205,41 @@ void DrawnScene::AttachInstances() {
   }
 }
 
-void DrawnScene::Cast(const PicturePoint* inPoints, int inCount, Hit* outHits) const {
+PictureBox DrawnScene::BoxOf(const DrawnItem& inItem) const {
+  const PictureBox all{0, 0, view_.width, view_.height};
+  // A little more than the sphere, against rounding.
+  const float radius = 1.001F * inItem.radius;
+  const Vec3 centre = inItem.centre;
+  const float nearDepth = centre.z - radius;
+  if (centre.z + radius <= view_.nearest || nearDepth > view_.farthest) return {};
+  if (view_.isConic && !(nearDepth > 0)) return all;
+  const PicturePoint middle = view_.PointOf(centre);
+  const auto reach = [&](float inSideways) {
+    const float slant = view_.isConic ? std::fabs(inSideways / centre.z) : 0;
+    return view_.PixelsOf(radius * (1 + slant), nearDepth) + 3;
+  };
+  const auto pixel = [](float inPlace, int inSize) {
+    return static_cast<int>(std::clamp(inPlace, 0.F, static_cast<float>(inSize)));
+  };
+  if (!std::isfinite(middle.x + middle.y)) return all;
+  return {pixel(middle.x - reach(centre.x), view_.width),
+          pixel(middle.y - reach(centre.y), view_.height),
+          pixel(std::ceil(middle.x + reach(centre.x)), view_.width),
+          pixel(std::ceil(middle.y + reach(centre.y)), view_.height)};
+}
+
+PictureBox DrawnScene::BoxOfItems() const {
+  PictureBox all{view_.width, view_.height, 0, 0};
+  for (const DrawnItem& item : items_) {
+    const PictureBox box = BoxOf(item);
+    if (box.IsEmpty()) continue;
+    all = {std::min(all.left, box.left), std::min(all.top, box.top), std::max(all.right, box.right),
+           std::max(all.bottom, box.bottom)};
+  }
+  return all.IsEmpty() ? PictureBox() : all;
+}
+
+bool DrawnScene::Cast(const PicturePoint* inPoints, int inCount, Hit* outHits) const {
   alignas(32) int valid[kPacket];
   RTCRayHit8 packet;
   RTCRay8& ray = packet.ray;
@@ -241,6 +266,9 @@ void DrawnScene::Cast(const PicturePoint* inPoints, int inCount, Hit* outHits) c
   RTCIntersectContext context = CoherentContext();
   rtcIntersect8(valid, scene_, &context, &packet);
   const RTCHit8& hit = packet.hit;
+  if (std::all_of(hit.geomID, hit.geomID + kPacket,
+                  [](unsigned inId) { return inId == RTC_INVALID_GEOMETRY_ID; }))
+    return false;
   for (int i = 0; i < inCount; ++i) {
     outHits[i].item = hit.geomID[i] == RTC_INVALID_GEOMETRY_ID ? Hit::kNothing : hit.instID[0][i];
     outHits[i].triangle = hit.primID[i];
@@ -249,6 +277,7 @@ void DrawnScene::Cast(const PicturePoint* inPoints, int inCount, Hit* outHits) c
     outHits[i].v = hit.v[i];
     outHits[i].meshNormal = {hit.Ng_x[i], hit.Ng_y[i], hit.Ng_z[i]};
   }
+  return true;
 }
 
 Hit DrawnScene::CastBeyond(PicturePoint inPoint, float inDepth) const {
@@ -262,7 +291,7 @@ Hit DrawnScene::CastBeyond(PicturePoint inPoint, float inDepth) const {
   RTCIntersectContext context = CoherentContext();
   rtcIntersect1(scene_, &context, &ray);
   const RTCHit& hit = ray.hit;
-  if (hit.geomID == RTC_INVALID_GEOMETRY_ID) return {};
+  if (hit.geomID == RTC_INVALID_GEOMETRY_ID) return {Hit::kNothing, 0, 0, 0, 0, {0, 0, 0}};
   return {hit.instID[0], hit.primID, ray.ray.tfar, hit.u, hit.v, {hit.Ng_x, hit.Ng_y, hit.Ng_z}};
 }
 

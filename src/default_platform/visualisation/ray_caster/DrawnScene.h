@@ -14,8 +14,8 @@ namespace ZORRayCaster {
 
 /// A place in the picture: pixels from the left and from the top; pixel centres lie at halves.
 struct PicturePoint {
-  float x = 0;
-  float y = 0;
+  float x;
+  float y;
 };
 
 /// How camera space is seen. All lengths are relative to an eye that, in cylindric projection, was
@@ -30,13 +30,21 @@ struct View {
   double depthOffset = 0;  ///< add it to a depth to have the distance from the given eye
 
   /// The ray through a point is start + depth * direction.
-  Vec3 RayStart(PicturePoint inPoint) const;
-  Vec3 RayDirection(PicturePoint inPoint) const;
+  Vec3 RayStart(PicturePoint inPoint) const {
+    return isConic ? Vec3{0, 0, 0} : InPlane(inPoint, 0);
+  }
+  Vec3 RayDirection(PicturePoint inPoint) const {
+    return isConic ? InPlane(inPoint, 1) : Vec3{0, 0, 1};
+  }
   /// Grows towards the eye, and is linear on the picture along lines and over planes.
   float Nearness(float inDepth) const { return isConic ? 1 / inDepth : -inDepth; }
   /// The nearness that one pixel's size along the depth makes.
   float NearnessOfPixel(float inNearness) const {
     return isConic ? pixelSize * inNearness : pixelSize;
+  }
+  Vec3 InPlane(PicturePoint inPoint, float inDepth) const {
+    return {(inPoint.x - 0.5F * static_cast<float>(width)) * pixelSize,
+            (inPoint.y - 0.5F * static_cast<float>(height)) * pixelSize, inDepth};
   }
   /// Conic: only of a point in front of the eye.
   PicturePoint PointOf(Vec3 inPlace) const;
@@ -44,13 +52,23 @@ struct View {
   float PixelsOf(float inLength, float inDepth) const;
 };
 
+/// A part of the picture, in whole pixels; left and top belong to it, right and bottom do not.
+struct PictureBox {
+  int left = 0;
+  int top = 0;
+  int right = 0;
+  int bottom = 0;
+
+  bool IsEmpty() const { return left >= right || top >= bottom; }
+};
+
 /// One mesh in camera space.
 struct DrawnItem {
   const PartMesh* mesh = nullptr;
   const MeshStructure* structure = nullptr;
-  Affine cameraFromMesh;
-  Vec3 normalMatrix[3];  ///< columns; takes normals to camera space up to their length
-  Vec3 centre;
+  Affine cameraFromMesh{};
+  Linear normalMatrix{};  ///< takes normals to camera space up to their length
+  Vec3 centre{};
   float radius = 0;
   bool hasNormals = false;
   SurfaceColour colour;                ///< of triangles without their own
@@ -60,14 +78,14 @@ struct DrawnItem {
   const SurfaceColour& ColourOf(std::uint32_t inTriangle) const;
 };
 
-/// What a ray meets first.
+/// What a ray meets first. Nothing is set at first; only `item` is set where a ray meets nothing.
 struct Hit {
   static constexpr std::uint32_t kNothing = 0xFFFFFFFF;
-  std::uint32_t item = kNothing;
-  std::uint32_t triangle = 0;
-  float depth = 0;
-  float u = 0;
-  float v = 0;
+  std::uint32_t item;
+  std::uint32_t triangle;
+  float depth;
+  float u;
+  float v;
   Vec3 meshNormal;  ///< of the triangle's plane, in the mesh's space, of any length
 };
 
@@ -82,18 +100,25 @@ class DrawnScene {
 
   const View& GetView() const { return view_; }
   const std::vector<DrawnItem>& GetItems() const { return items_; }
+  /// All that an item may cover, with a pixel to spare for its lines; empty when it is not seen.
+  PictureBox BoxOf(const DrawnItem& inItem) const;
+  /// All that any item may cover.
+  const PictureBox& GetBox() const { return box_; }
 
   static constexpr int kPacket = 8;
   /// Casts up to kPacket rays, which should lie close together.
-  void Cast(const PicturePoint* inPoints, int inCount, Hit* outHits) const;
+  /// @return false when none meets anything; outHits is untouched then.
+  bool Cast(const PicturePoint* inPoints, int inCount, Hit* outHits) const;
   /// What the ray through a point meets beyond a depth.
   Hit CastBeyond(PicturePoint inPoint, float inDepth) const;
 
  private:
   void AttachInstances();
+  PictureBox BoxOfItems() const;
 
   View view_;
   std::vector<DrawnItem> items_;
+  PictureBox box_;
   RTCScene scene_;
 };
 

@@ -15,7 +15,7 @@ constexpr float kReach = kHalfWidth + 0.5F;
 /// A line's end on the picture.
 struct LineEnd {
   PicturePoint point;
-  float nearness = 0;
+  float nearness;
 };
 
 /// Draws lines of one share of a picture into a coverage of its own.
@@ -153,7 +153,6 @@ class ScenePainter {
   void Draw(int inShare, int inShareCount);
 
  private:
-  bool CanBeSeen(const DrawnItem& inItem) const;
   float Strength(const DrawnItem& inItem) const;
   void DrawSpeck(const DrawnItem& inItem);
   void DrawPolyline(const DrawnItem& inItem, std::size_t inStart, std::size_t inEnd);
@@ -170,7 +169,7 @@ class ScenePainter {
 
 void ScenePainter::Draw(int inShare, int inShareCount) {
   for (const DrawnItem& item : scene_.GetItems()) {
-    if (!CanBeSeen(item)) continue;
+    if (scene_.BoxOf(item).IsEmpty()) continue;
     nearest_ = std::max(view_.nearest, 1e-5F * (item.centre.z + item.radius));
     if (inShare == 0) DrawSpeck(item);
     painter_.SetStrength(Strength(item));
@@ -184,18 +183,6 @@ void ScenePainter::Draw(int inShare, int inShareCount) {
       DrawPolyline(item, starts[line],
                    std::min<std::size_t>(starts[line + 1], item.mesh->edgePoints.size()));
   }
-}
-
-/// False only when the whole of the mesh's sphere is outside the picture.
-bool ScenePainter::CanBeSeen(const DrawnItem& inItem) const {
-  const float nearDepth = inItem.centre.z - inItem.radius;
-  if (inItem.centre.z + inItem.radius <= view_.nearest || nearDepth > view_.farthest) return false;
-  if (view_.isConic && nearDepth <= 0) return true;
-  const float reach = view_.PixelsOf(inItem.radius, nearDepth) + 2;
-  const PicturePoint middle = view_.PointOf(inItem.centre);
-  return middle.x > -reach && middle.y > -reach &&
-         middle.x < static_cast<float>(view_.width) + reach &&
-         middle.y < static_cast<float>(view_.height) + reach;
 }
 
 /// Lines that would fill the mesh's place on the picture with ink are drawn lighter.
@@ -224,9 +211,9 @@ void ScenePainter::DrawSpeck(const DrawnItem& inItem) {
 void ScenePainter::DrawPolyline(const DrawnItem& inItem, std::size_t inStart, std::size_t inEnd) {
   const auto& points = inItem.mesh->edgePoints;
   if (inStart >= inEnd) return;
-  Vec3 from = inItem.cameraFromMesh.Point(ToVec3(points[inStart]));
+  Vec3 from = inItem.cameraFromMesh * ToVec3(points[inStart]);
   for (std::size_t i = inStart + 1; i < inEnd; ++i) {
-    const Vec3 to = inItem.cameraFromMesh.Point(ToVec3(points[i]));
+    const Vec3 to = inItem.cameraFromMesh * ToVec3(points[i]);
     DrawSegment(from, to);
     from = to;
   }

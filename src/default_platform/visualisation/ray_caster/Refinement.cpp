@@ -138,7 +138,7 @@ ShownPixel Refinement::At(int inX, int inY) const {
   const std::size_t place = Place(inX, inY);
   const std::int32_t first = firstSamples_[place];
   if (first == kNotRefined) return {pixels_[place].light, 0};
-  ShownPixel pixel;
+  ShownPixel pixel{{0, 0, 0}, 0};
   for (int i = 0; i < kSamples; ++i) {
     pixel.light = pixel.light + (1.F / kSamples) * samples_[first + i].light;
     if (IsOutline(kSide * inX + i % kSide, kSide * inY + i / kSide))

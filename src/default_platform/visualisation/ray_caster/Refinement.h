@@ -13,7 +13,7 @@ namespace ZORRayCaster {
 /// A pixel as it is shown, before lines are drawn over it.
 struct ShownPixel {
   Vec3 light;
-  float outline = 0;  ///< the share of the pixel that an outline covers
+  float outline;  ///< the share of the pixel that an outline covers
 };
 
 /// Four samples, in a square, in each pixel beside which something changes.
@@ -22,6 +22,10 @@ class Refinement {
   Refinement(const SurfacePass& inPass, const View& inView, const Sample* inPixels,
              int inThreadCount);
   ShownPixel At(int inX, int inY) const;
+  /// Whether nothing but the background is seen in a pixel.
+  bool IsBackground(std::size_t inPlace) const {
+    return firstSamples_[inPlace] == kNotRefined && pixels_[inPlace].item == Hit::kNothing;
+  }
 
  private:
   static constexpr int kSide = 2;  // samples along a pixel's side

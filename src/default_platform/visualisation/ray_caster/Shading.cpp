@@ -48,7 +48,7 @@ SurfaceColour ToSurfaceColour(const PartColour& inColour) {
 
 Vec3 Lit(Vec3 inSurface, Vec3 inNormal, Vec3 inToEye) {
   constexpr float kAmbient = 0.20F, kHead = 0.62F, kFill = 0.28F, kHighlight = 0.07F;
-  static const Vec3 kFromFill = Normalised({-0.55F, -0.75F, -0.45F});
+  constexpr Vec3 kFromFill{-0.532300F, -0.725864F, -0.435518F};  // of length 1
   const float towardsEye = std::max(Dot(inNormal, inToEye), 0.F);
   const float towardsFill = std::max(Dot(inNormal, kFromFill), 0.F);
   // Half way between the fill light and the eye, as in the model of Blinn.

@@ -11,7 +11,7 @@ namespace ZORRayCaster {
 
 /// A surface's colour in proportion to light.
 struct SurfaceColour {
-  Vec3 light;
+  Vec3 light{0, 0, 0};
   float opacity = 1;
 };
 

@@ -38,100 +38,115 @@ void SurfacePass::CastTile(int inTile, Sample* outPixels) const {
   const int top = inTile / TilesAcross(view.width) * kTileSize;
   const int right = std::min(left + kTileSize, view.width);
   const int bottom = std::min(top + kTileSize, view.height);
-  for (int blockY = top; blockY < bottom; blockY += kBlockHeight) {
-    for (int blockX = left; blockX < right; blockX += kBlockWidth) {
-      PicturePoint points[DrawnScene::kPacket];
-      Sample* targets[DrawnScene::kPacket];
-      int count = 0;
-      for (int y = blockY; y < std::min(blockY + kBlockHeight, bottom); ++y) {
-        for (int x = blockX; x < std::min(blockX + kBlockWidth, right); ++x) {
-          points[count] = {static_cast<float>(x) + 0.5F, static_cast<float>(y) + 0.5F};
-          targets[count++] = outPixels + static_cast<std::ptrdiff_t>(y) * view.width + x;
-        }
-      }
-      Sample samples[DrawnScene::kPacket];
-      CastPoints(points, count, samples);
-      for (int i = 0; i < count; ++i) *targets[i] = samples[i];
+  for (int y = top; y < bottom; y += kBlockHeight)
+    for (int x = left; x < right; x += kBlockWidth)
+      CastBlock({x, y, std::min(x + kBlockWidth, right), std::min(y + kBlockHeight, bottom)},
+                outPixels);
+}
+
+void SurfacePass::CastBlock(const PictureBox& inBlock, Sample* outPixels) const {
+  PicturePoint points[DrawnScene::kPacket];
+  Sample* targets[DrawnScene::kPacket];
+  int count = 0;
+  for (int y = inBlock.top; y < inBlock.bottom; ++y) {
+    for (int x = inBlock.left; x < inBlock.right; ++x) {
+      points[count] = {static_cast<float>(x) + 0.5F, static_cast<float>(y) + 0.5F};
+      targets[count++] = outPixels + static_cast<std::ptrdiff_t>(y) * scene_.GetView().width + x;
     }
   }
+  const PictureBox& box = scene_.GetBox();
+  const bool isOutside = inBlock.right <= box.left || inBlock.left >= box.right ||
+                         inBlock.bottom <= box.top || inBlock.top >= box.bottom;
+  Sample samples[DrawnScene::kPacket];
+  if (!isOutside) CastPoints(points, count, samples);
+  for (int i = 0; i < count; ++i)
+    *targets[i] = isOutside ? BackgroundSample(points[i]) : samples[i];
 }
 
 void SurfacePass::CastPoints(const PicturePoint* inPoints, int inCount, Sample* outSamples) const {
   Hit hits[DrawnScene::kPacket];
-  scene_.Cast(inPoints, inCount, hits);
-  for (int i = 0; i < inCount; ++i) outSamples[i] = SampleOf(inPoints[i], hits[i]);
+  const bool meetAny = scene_.Cast(inPoints, inCount, hits);
+  for (int i = 0; i < inCount; ++i)
+    outSamples[i] = meetAny ? SampleOf(inPoints[i], hits[i]) : BackgroundSample(inPoints[i]);
 }
 
 Vec3 SurfacePass::Background(PicturePoint inPoint) const {
-  const int row = static_cast<int>(inPoint.y);
-  return backdrop_.rows[static_cast<std::size_t>(std::clamp(row, 0, scene_.GetView().height - 1))];
+  return backdrop_.rows[static_cast<std::size_t>(inPoint.y)];
 }
 
 Sample SurfacePass::SampleOf(PicturePoint inPoint, const Hit& inHit) const {
+  if (inHit.item == Hit::kNothing) return BackgroundSample(inPoint);
+  const DrawnItem& item = scene_.GetItems()[inHit.item];
+  const SurfaceColour& colour = item.ColourOf(inHit.triangle);
+  if (colour.opacity < 1 && backdrop_.isShaded) return SampleThrough(inPoint, inHit);
+  const Vec3 direction = scene_.GetView().RayDirection(inPoint);
+  const Vec3 plane = item.normalMatrix * inHit.meshNormal;
   Sample sample;
   sample.item = inHit.item;
-  sample.nearness = Sample::kBackground;
-  Vec3 light;
-  float through = 1;  // the share of what lies behind that is still seen
-  Hit hit = inHit;
-  for (int layer = 0; hit.item != Hit::kNothing && layer < kMostLayers; ++layer) {
-    const SurfaceColour& colour = scene_.GetItems()[hit.item].ColourOf(hit.triangle);
-    const bool isOpaque = colour.opacity >= 1 || !backdrop_.isShaded;
-    const float opacity = isOpaque ? 1 : colour.opacity;
-    light = light + through * opacity * LightOf(inPoint, hit, colour);
-    through *= 1 - opacity;
-    if (isOpaque) {
-      SetSurface(inPoint, hit, sample);
-      break;
-    }
-    constexpr float kStep = 1e-6F;
-    hit = scene_.CastBeyond(inPoint, hit.depth * (1 + kStep));
-  }
-  sample.light = through > 0 ? light + through * Background(inPoint) : light;
+  SetSurface(direction, plane, inHit.depth, sample);
+  sample.light =
+      backdrop_.isShaded ? LightOf(direction, plane, inHit, colour) : Background(inPoint);
   return sample;
 }
 
-Vec3 SurfacePass::LightOf(PicturePoint inPoint, const Hit& inHit,
-                          const SurfaceColour& inColour) const {
-  if (!backdrop_.isShaded) return Background(inPoint);
-  const Vec3 toEye = Normalised(-1 * scene_.GetView().RayDirection(inPoint));
-  return Lit(inColour.light, FacingNormal(scene_.GetItems()[inHit.item], inHit, toEye), toEye);
+/// The item that is seen is the transparent one in front, the surface the opaque one behind.
+Sample SurfacePass::SampleThrough(PicturePoint inPoint, Hit inHit) const {
+  constexpr float kStep = 1e-6F;
+  const std::uint32_t front = inHit.item;
+  const Vec3 direction = scene_.GetView().RayDirection(inPoint);
+  Vec3 light{0, 0, 0};
+  float through = 1;  // the share of what lies behind that is still seen
+  for (int layer = 0; inHit.item != Hit::kNothing && layer < kMostLayers; ++layer) {
+    const DrawnItem& item = scene_.GetItems()[inHit.item];
+    const SurfaceColour& colour = item.ColourOf(inHit.triangle);
+    if (colour.opacity >= 1) break;
+    const Vec3 plane = item.normalMatrix * inHit.meshNormal;
+    light = light + through * colour.opacity * LightOf(direction, plane, inHit, colour);
+    through *= 1 - colour.opacity;
+    inHit = scene_.CastBeyond(inPoint, inHit.depth * (1 + kStep));
+  }
+  const bool isEnded = inHit.item != Hit::kNothing &&
+                       scene_.GetItems()[inHit.item].ColourOf(inHit.triangle).opacity < 1;
+  Sample sample = isEnded ? BackgroundSample(inPoint) : SampleOf(inPoint, inHit);
+  sample.item = front;
+  sample.light = light + through * sample.light;
+  return sample;
 }
 
-/// The surface's normal on the side that is seen, of unit length.
-Vec3 SurfacePass::FacingNormal(const DrawnItem& inItem, const Hit& inHit, Vec3 inToEye) const {
-  const Affine toCamera{{inItem.normalMatrix[0], inItem.normalMatrix[1], inItem.normalMatrix[2]},
-                        {}};
-  Vec3 plane = toCamera.Direction(inHit.meshNormal);
-  if (Dot(plane, inToEye) < 0) plane = -1 * plane;
-  if (!inItem.hasNormals) return Normalised(plane);
-  const auto& corners = inItem.mesh->triangles[inHit.triangle];
-  const auto& normals = inItem.mesh->normals;
+/// @param inPlane the triangle's normal in camera space.
+Vec3 SurfacePass::LightOf(Vec3 inDirection, Vec3 inPlane, const Hit& inHit,
+                          const SurfaceColour& inColour) const {
+  const Vec3 toEye = Normalised(-1 * inDirection);
+  const Vec3 plane = Dot(inPlane, toEye) < 0 ? -1 * inPlane : inPlane;
+  const DrawnItem& item = scene_.GetItems()[inHit.item];
+  if (!item.hasNormals) return Lit(inColour.light, Normalised(plane), toEye);
+  const auto& corners = item.mesh->triangles[inHit.triangle];
+  const auto& normals = item.mesh->normals;
   const Vec3 meshNormal = (1 - inHit.u - inHit.v) * ToVec3(normals[corners[0]]) +
                           inHit.u * ToVec3(normals[corners[1]]) +
                           inHit.v * ToVec3(normals[corners[2]]);
-  const Vec3 smooth = Normalised(toCamera.Direction(meshNormal));
+  const Vec3 smooth = Normalised(item.normalMatrix * meshNormal);
   const float side = Dot(smooth, plane);
-  if (side == 0 || std::isnan(side)) return Normalised(plane);
-  return side < 0 ? -1 * smooth : smooth;
+  // The side that is seen; without a usable normal the triangle's own.
+  if (!(side < 0 || side > 0)) return Lit(inColour.light, Normalised(plane), toEye);
+  return Lit(inColour.light, side < 0 ? -1 * smooth : smooth, toEye);
 }
 
-void SurfacePass::SetSurface(PicturePoint inPoint, const Hit& inHit, Sample& outSample) const {
+void SurfacePass::SetSurface(Vec3 inDirection, Vec3 inPlane, float inDepth,
+                             Sample& outSample) const {
   const View& view = scene_.GetView();
-  const DrawnItem& item = scene_.GetItems()[inHit.item];
-  const Affine toCamera{{item.normalMatrix[0], item.normalMatrix[1], item.normalMatrix[2]}, {}};
-  const Vec3 plane = toCamera.Direction(inHit.meshNormal);
-  outSample.nearness = view.Nearness(inHit.depth);
-  // Over the plane n . p = c, the nearness is n . direction / c (conic) or (n.x x + n.y y - c) / n.z.
-  const Vec3 direction = view.RayDirection(inPoint);
-  const float across = view.isConic ? inHit.depth * Dot(plane, direction) : plane.z;
+  outSample.nearness = view.Nearness(inDepth);
+  // Over the plane n . p = c, the nearness is n . direction / c, or (n.x x + n.y y - c) / n.z.
+  const float across = view.isConic ? inDepth * Dot(inPlane, inDirection) : inPlane.z;
+  const float scale = view.pixelSize / across;
   const float steepest = kSteepest * view.NearnessOfPixel(outSample.nearness);
   const auto slope = [&](float inComponent) {
-    const float value = inComponent * view.pixelSize / across;
-    return std::isfinite(value) ? std::clamp(value, -steepest, steepest) : 0.F;
+    const float value = inComponent * scale;
+    return std::fabs(value) <= steepest ? value : std::copysign(steepest, value);
   };
-  outSample.slopeX = slope(plane.x);
-  outSample.slopeY = slope(plane.y);
+  const bool isUsable = std::isfinite(scale);
+  outSample.slopeX = isUsable ? slope(inPlane.x) : 0;
+  outSample.slopeY = isUsable ? slope(inPlane.y) : 0;
 }
 
 }  // namespace ZORRayCaster

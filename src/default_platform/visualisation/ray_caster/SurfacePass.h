@@ -9,13 +9,13 @@
 
 namespace ZORRayCaster {
 
-/// What is seen at one point of the picture.
+/// What is seen at one point of the picture. Nothing is set at first.
 struct Sample {
   /// Of the surface at this point (View::Nearness); kBackground where there is none.
-  float nearness = 0;
-  float slopeX = 0;  ///< how the nearness changes over one pixel
-  float slopeY = 0;
-  std::uint32_t item = 0;  ///< Hit::kNothing: the background
+  float nearness;
+  float slopeX;  ///< how the nearness changes over one pixel
+  float slopeY;
+  std::uint32_t item;  ///< Hit::kNothing: the background
   Vec3 light;
 
   static constexpr float kBackground = -1e30F;
@@ -39,11 +39,16 @@ class SurfacePass {
 
  private:
   void CastTile(int inTile, Sample* outPixels) const;
+  void CastBlock(const PictureBox& inBlock, Sample* outPixels) const;
   Sample SampleOf(PicturePoint inPoint, const Hit& inHit) const;
-  Vec3 LightOf(PicturePoint inPoint, const Hit& inHit, const SurfaceColour& inColour) const;
-  Vec3 FacingNormal(const DrawnItem& inItem, const Hit& inHit, Vec3 inToEye) const;
-  void SetSurface(PicturePoint inPoint, const Hit& inHit, Sample& outSample) const;
+  Sample SampleThrough(PicturePoint inPoint, Hit inHit) const;
+  Vec3 LightOf(Vec3 inDirection, Vec3 inPlane, const Hit& inHit,
+               const SurfaceColour& inColour) const;
+  void SetSurface(Vec3 inDirection, Vec3 inPlane, float inDepth, Sample& outSample) const;
   Vec3 Background(PicturePoint inPoint) const;
+  Sample BackgroundSample(PicturePoint inPoint) const {
+    return {Sample::kBackground, 0, 0, Hit::kNothing, Background(inPoint)};
+  }
 
   const DrawnScene& scene_;
   const Backdrop& backdrop_;

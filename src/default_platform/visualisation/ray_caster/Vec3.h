@@ -9,10 +9,11 @@ namespace ZORRayCaster {
 
 /// A direction, a place in camera space (x right, y down, z forward, the eye at the origin), or a
 /// colour in proportion to light.
+/// Nothing is set at first, since millions are made for a picture.
 struct Vec3 {
-  float x = 0;
-  float y = 0;
-  float z = 0;
+  float x;
+  float y;
+  float z;
 
   friend Vec3 operator+(Vec3 inA, Vec3 inB) {
     return {inA.x + inB.x, inA.y + inB.y, inA.z + inB.z};
@@ -40,15 +41,24 @@ inline Vec3 Normalised(Vec3 inA) {
 }
 inline Vec3 Mix(Vec3 inA, Vec3 inB, float inShareOfB) { return inA + inShareOfB * (inB - inA); }
 
+/// A linear map.
+struct Linear {
+  Vec3 columns[3];
+
+  friend Vec3 operator*(const Linear& inMap, Vec3 inVector) {
+    return inVector.x * inMap.columns[0] + inVector.y * inMap.columns[1] +
+           inVector.z * inMap.columns[2];
+  }
+};
+
 /// A linear map and a translation.
 struct Affine {
-  Vec3 columns[3];
+  Linear linear;
   Vec3 translation;
 
-  Vec3 Direction(Vec3 inDirection) const {
-    return inDirection.x * columns[0] + inDirection.y * columns[1] + inDirection.z * columns[2];
+  friend Vec3 operator*(const Affine& inMap, Vec3 inPoint) {
+    return inMap.linear * inPoint + inMap.translation;
   }
-  Vec3 Point(Vec3 inPoint) const { return Direction(inPoint) + translation; }
 };
 
 }  // namespace ZORRayCaster
