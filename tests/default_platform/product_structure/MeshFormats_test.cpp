@@ -161,6 +161,21 @@ TEST(MeshFormats, GltfWithSeveralRootsGetsOneAbove) {
   EXPECT_EQ(products::Leaves(model.root).size(), 2u);
 }
 
+TEST(MeshFormats, GltfScalesAreWarnedOf) {
+  const Folder folder;
+  folder.Write("points.bin", Floats(kTriangle));
+  ZORDefault::ModelOptions options;
+  options.useCache = false;
+  std::vector<std::string> warnings;
+  options.warn = [&](const std::string& warning) { warnings.push_back(warning); };
+  const std::string path =
+      folder.Write("a.gltf", Gltf(R"([{"name":"top","children":[1,2,3]},{"mesh":0,"scale":[2,2,2]},
+                         {"mesh":0,"scale":[1,1,1]},{"mesh":0,"scale":[-1,1,1]}])",
+                                  "[0]"));
+  ZORDefault::OpenModel(path, options);
+  EXPECT_THAT(warnings, testing::ElementsAre(path + ": 2 scaled nodes are shown without scale"));
+}
+
 TEST(MeshFormats, GltfPlacementThatCannotBeUndoneIsRefused) {
   const Folder folder;
   folder.Write("points.bin", Floats(kTriangle));

@@ -88,7 +88,7 @@ INSTANTIATE_TEST_SUITE_P(
                     RealModel{"low_cost_robot_arm.step", 161, 32, 141356.7, 159, 1},
                     RealModel{"manta_model_4.glb", 81, 34, 359494.6, 80, 0},
                     RealModel{"stamp_c6lora_smd.step", 501, 127, 1928.391, 473, 0},
-                    RealModel{"opendog_v2_20.stp", 35, 23, 1, 8, 128}),
+                    RealModel{"opendog_v2_20.stp", 35, 23, 5645605, 8, 128}),
     [](const auto& inInfo) {
       std::string name = inInfo.param.file;
       name = name.substr(0, name.find('.'));

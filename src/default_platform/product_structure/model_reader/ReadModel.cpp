@@ -4,9 +4,11 @@
 #include <Standard_Failure.hxx>
 #include <algorithm>
 #include <exception>
+#include <filesystem>
 
 #include "default_platform/product_structure/ModelReaderEntry.h"
 #include "default_platform/product_structure/model_reader/DocumentReading.h"
+#include "default_platform/product_structure/model_reader/GltfScales.h"
 #include "default_platform/product_structure/model_reader/PartMeshing.h"
 #include "default_platform/product_structure/model_reader/TreeWalk.h"
 
@@ -52,6 +54,20 @@ void WarnOfMissingTriangles(ModelData& ioModel) {
   if (faces > 0) ioModel.warnings.push_back(std::to_string(faces) + " faces have no triangles");
 }
 
+void WarnOfScaledNodes(const ModelRequest& inRequest, ModelData& ioModel) {
+  if (inRequest.format != ModelFormat::kGltf && inRequest.format != ModelFormat::kGlb) return;
+  const std::size_t nodes = CountScaledNodes(inRequest.path);
+  if (nodes > 0)
+    ioModel.warnings.push_back(std::to_string(nodes) + " scaled nodes are shown without scale");
+}
+
+/// Readers of meshes call a root without name as the file, but the file may be renamed.
+void ForgetFileName(const ModelRequest& inRequest, ModelData& ioModel) {
+  if (ioModel.products.empty()) return;
+  std::u16string& rootName = ioModel.parts[ioModel.products[0].part].name;
+  if (rootName == std::filesystem::path(inRequest.path).filename().u16string()) rootName.clear();
+}
+
 bool HasGeometry(const ModelData& inModel) {
   return std::ranges::any_of(inModel.parts, [](const ModelPart& part) {
     return part.mesh != nullptr || part.failedToTessellate;
@@ -67,7 +83,9 @@ bool Read(const ModelRequest& inRequest, ModelData& outModel, std::string& outRe
   if (document.IsNull()) return false;
   const std::vector<TDF_Label> labels = WalkTree(document, outModel);
   MeshParts(labels, inRequest.deflection, scope.Next(kMeshingShare), outModel);
+  ForgetFileName(inRequest, outModel);
   WarnOfMissingTriangles(outModel);
+  WarnOfScaledNodes(inRequest, outModel);
   if (HasGeometry(outModel)) return true;
   outReason = "holds no geometry";
   return false;
