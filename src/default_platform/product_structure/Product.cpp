@@ -30,6 +30,23 @@ const PartColour* ShownColourOf(const Product& inProduct) {
   return nullptr;
 }
 
+/// A name may hold the separator itself, so every way to cut the path is tried.
+Product* FindBelow(const Product& inFather, const ZORUnicodeString& inPath) {
+  static const ZORUnicodeString kSeparator(" --++-- ");
+  for (Product* const child : inFather.GetChildren())
+    if (child->IsCalled(inPath)) return child;
+  for (int end = inPath.SearchSubString(kSeparator); end >= 0;
+       end = inPath.SearchSubString(kSeparator, end + 1)) {
+    const ZORUnicodeString name = inPath.SubString(0, end);
+    const ZORUnicodeString rest = inPath.SubString(end + kSeparator.GetLengthInChar());
+    for (Product* const child : inFather.GetChildren()) {
+      Product* const found = child->IsCalled(name) ? FindBelow(*child, rest) : nullptr;
+      if (found) return found;
+    }
+  }
+  return nullptr;
+}
+
 }  // namespace
 
 const IID& ProductIdentity::ClassId() {
@@ -215,26 +232,10 @@ bool GetProductFacts(ZORIProduct* inProduct, ProductFacts& outFacts) {
 }
 
 ZORIProduct_var FindProduct(const ZORIProduct_var& inRoot, const ZORUnicodeString& inAliasPath) {
-  static const ZORUnicodeString kSeparator(" --++-- ");
   const ZORInterfaceHandle<ProductIdentity> root = inRoot;
   if (root.IsNull()) return {};
-  Product* product = &root->GetProduct();
-  // A name may hold the separator itself, so each child is tried with all of its own name.
-  const auto find = [&](auto&& self, Product& father, const ZORUnicodeString& path) -> Product* {
-    for (Product* const child : father.GetChildren())
-      if (child->IsCalled(path)) return child;
-    for (int end = path.SearchSubString(kSeparator); end >= 0;
-         end = path.SearchSubString(kSeparator, end + 1)) {
-      const ZORUnicodeString name = path.SubString(0, end);
-      const ZORUnicodeString rest = path.SubString(end + kSeparator.GetLengthInChar());
-      for (Product* const child : father.GetChildren())
-        if (child->IsCalled(name))
-          if (Product* const found = self(self, *child, rest)) return found;
-    }
-    return nullptr;
-  };
-  product = find(find, *product, inAliasPath);
-  return product ? ZORIProduct_var(product->GetInterface()) : ZORIProduct_var();
+  Product* const found = FindBelow(root->GetProduct(), inAliasPath);
+  return found ? ZORIProduct_var(found->GetInterface()) : ZORIProduct_var();
 }
 
 }  // namespace ZORDefault
