@@ -14,6 +14,8 @@
 #include "platform/visualisation/ZOR3DBagRep.h"
 #include "platform/visualisation/ZORI3DGeoVisu.h"
 
+namespace fs = std::filesystem;
+
 namespace lyra {
 namespace {
 
@@ -23,36 +25,30 @@ struct RenderOptions {
   bool keepBackground = false;
 };
 
-/// Products that a name may stand for.
-struct Namesakes {
-  ZORIProduct_var byPath;
-  ZORIProduct_var byAlias;  // the first of them
-  int aliasCount = 0;
-};
-
-Namesakes FindNamesakes(const ZORIProduct_var& inRoot, const ZORUnicodeString& inName) {
-  Namesakes found;
+/// The products of an alias, from the root on.
+std::vector<ZORIProduct_var> FindByAlias(const ZORIProduct_var& inRoot,
+                                         const ZORUnicodeString& inAlias) {
+  std::vector<ZORIProduct_var> found;
   WalkProducts(inRoot, kAllLevels, [&](const ProductLevels& inLevels) {
-    const ZORIProduct_var& product = inLevels.back().product;
-    if (found.byPath.IsNull() && ZORLyraGeneralServices::GetPathRoot(product) == inName)
-      found.byPath = product;
-    if (ZORIAlias_var(product)->GetAlias() != inName) return;
-    if (found.aliasCount++ == 0) found.byAlias = product;
+    const ZORIAlias_var named = inLevels.back().product;
+    if (named->GetAlias() == inAlias) found.push_back(inLevels.back().product);
   });
   return found;
 }
 
 /// The product of a path, else the one product of that alias.
-ZORIProduct_var FindProduct(const RenderOptions& inOptions, const ZORIProduct_var& inRoot,
-                            const std::string& inName) {
-  const Namesakes found = FindNamesakes(inRoot, FromUtf8(inName));
-  if (!found.byPath.IsNull()) return found.byPath;
-  if (found.aliasCount == 1) return found.byAlias;
-  if (found.aliasCount == 0)
+ZORIProduct_var ChosenProduct(const RenderOptions& inOptions, const ZORIProduct_var& inRoot,
+                              const std::string& inName) {
+  const ZORUnicodeString name = FromUtf8(inName);
+  if (ZORIProduct_var product = ZORDefault::FindProduct(inRoot, name); !product.IsNull())
+    return product;
+  const std::vector<ZORIProduct_var> namesakes = FindByAlias(inRoot, name);
+  if (namesakes.size() == 1) return namesakes.front();
+  if (namesakes.empty())
     throw InputError(inOptions.file + ": there is no product \"" + inName + "\"");
-  throw InputError(inOptions.file + ": " + std::to_string(found.aliasCount) +
+  throw InputError(inOptions.file + ": " + std::to_string(namesakes.size()) +
                    " products are called \"" + inName + "\", such as \"" +
-                   Utf8(ZORLyraGeneralServices::GetPathRoot(found.byAlias)) + "\"");
+                   Utf8(ZORLyraGeneralServices::GetPathRoot(namesakes.front())) + "\"");
 }
 
 /// @return null when there is nothing to show.
@@ -88,11 +84,21 @@ void Fill(Scene& ioScene, const RenderOptions& inOptions, const ZORIProduct_var&
     ioScene.Add(all);
   }
   for (const std::string& name : inOptions.products) {
-    ZOR3DRep* const rep = RepOf(FindProduct(inOptions, inRoot, name));
+    ZOR3DRep* const rep = RepOf(ChosenProduct(inOptions, inRoot, name));
     if (!rep)
       throw InputError(inOptions.file + ": the product \"" + name + "\" has nothing to show");
     ioScene.Add(rep);
   }
+}
+
+/// @return false when the file is still empty. A picture takes the file's place, so what may be done
+/// with the file is carried over, and an open file's path is resolved first.
+bool Draw(ZOR3DRep& inRep, const PictureWishes& inWishes, const std::string& inPath) {
+  const fs::path place = fs::canonical(inPath);
+  const fs::perms permissions = fs::status(place).permissions();
+  TakePicture(inRep, inWishes, inPath);
+  fs::permissions(place, permissions);
+  return !fs::is_empty(place);
 }
 
 int Render(const RenderOptions& inOptions, Output& ioOutput) {
@@ -106,10 +112,8 @@ int Render(const RenderOptions& inOptions, Output& ioOutput) {
   Scene scene;
   Fill(scene, inOptions, root);
   ReplacedFile file(inOptions.picture);
-  TakePicture(*scene.Rep(), wishes, file.TemporaryPath());
-  std::error_code error;
-  const bool isEmpty = std::filesystem::file_size(file.TemporaryPath(), error) == 0 || error;
-  if (isEmpty) throw InputError(inOptions.picture + ": the picture cannot be drawn or written");
+  if (!Draw(*scene.Rep(), wishes, file.TemporaryPath()))
+    throw InputError(inOptions.picture + ": the picture cannot be drawn or written");
   file.Finish(ioOutput);
   return 0;
 }
@@ -121,9 +125,10 @@ VerbAction DeclareRender(Arguments& ioArguments) {
   ioArguments.Positional("MODEL", options->file, "A STEP, IGES, glTF, OBJ or STL file");
   ioArguments.RequiredText("-o,--output", "PICTURE", options->picture,
                            "The picture to write; its name ends in .jpg, .jpeg or .png");
-  ioArguments.Texts("--product", "PATH", options->products,
-                    "Only this product, by its path as lyra tree --leaves prints it or by an alias "
-                    "that no other has; may be given several times");
+  ioArguments.Texts(
+      "--product", "PATH", options->products,
+      "Only this product, by its path (see lyra tree --leaves) or by an alias that no "
+      "other has; may be given several times");
   ioArguments.Text("--size", "WxH", options->size, "Width and height in pixels (default: 756x506)");
   ioArguments.Text("--view", "VIEW", options->view,
                    "iso (default), front, back, left, right, top or bottom");
