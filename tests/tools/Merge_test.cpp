@@ -244,3 +244,19 @@ TEST(Outputs, NewFileHasTheUsualPermissions) {
   ASSERT_EQ(RunShell("umask 027; $LYRA report " + kAs1 + " -o " + out).code, 0);
   EXPECT_EQ(static_cast<int>(fs::status(out).permissions()), 0640);
 }
+
+TEST(Outputs, PathOfBytesThatAreNoTextWorks) {
+  const TemporaryDirectory directory;
+  const std::string folder = directory.Path("caf\xE9");
+  std::filesystem::create_directory(folder);
+  for (const std::vector<std::string>& command : std::vector<std::vector<std::string>>{
+           {"merge", kAs1, kAs1}, {"report", kAs1}, {"federate", kAs1}}) {
+    std::vector<std::string> arguments = command;
+    arguments.insert(arguments.end(), {"-o", folder + "/out\xFF.xml"});
+    const CommandResult result = RunCommand(arguments);
+    EXPECT_EQ(result.code, 0) << result.error;
+    EXPECT_EQ(RunCommand({"info", folder + "/out\xFF.xml"}).code, 0);
+    EXPECT_EQ(FilesIn(folder).size(), 1u);
+  }
+  EXPECT_EQ(FilesIn(directory.Path("")).size(), 1u);
+}

@@ -12,6 +12,7 @@
 #include <vector>
 
 #include "lyra/CommandErrors.h"
+#include "lyra/DocumentText.h"
 #include "platform/system/ZORFile.h"
 
 namespace fs = std::filesystem;
@@ -43,17 +44,6 @@ std::string DirectoryOf(const std::string& inPath) {
   return parent.empty() ? "." : parent.string();
 }
 
-/// A file that is closed with the scope.
-struct Descriptor {
-  explicit Descriptor(int inNumber) : number(inNumber) {}
-  ~Descriptor() {
-    if (number >= 0) close(number);
-  }
-  Descriptor(const Descriptor&) = delete;
-  Descriptor& operator=(const Descriptor&) = delete;
-  int number;
-};
-
 }  // namespace
 
 ReplacedFile::ReplacedFile(const std::string& inPath) : path_(inPath) {
@@ -72,6 +62,7 @@ ReplacedFile::ReplacedFile(const std::string& inPath) : path_(inPath) {
 }
 
 ReplacedFile::~ReplacedFile() {
+  if (descriptor_ >= 0) close(descriptor_);
   if (!temporary_.empty()) unlink(temporary_.c_str());
 }
 
@@ -81,10 +72,18 @@ void ReplacedFile::Fail(int inErrorNumber) const {
 
 void ReplacedFile::MakeTemporary(const std::string& inDirectory, unsigned int inMode) {
   std::string pattern = inDirectory + "/.lyra-XXXXXX";
-  const Descriptor file(mkostemp(pattern.data(), O_CLOEXEC));
-  if (file.number < 0) Fail(errno);
+  descriptor_ = mkostemp(pattern.data(), O_CLOEXEC);
+  if (descriptor_ < 0) Fail(errno);
   temporary_ = pattern;
-  if (fchmod(file.number, inMode) != 0) Fail(errno);
+  // A path goes through the library as text, which bytes that are no text do not survive.
+  writtenPath_ =
+      Utf8(FromUtf8(pattern)) == pattern ? pattern : "/proc/self/fd/" + std::to_string(descriptor_);
+  if (fchmod(descriptor_, inMode) != 0) {
+    const int reason = errno;
+    unlink(temporary_.c_str());
+    close(descriptor_);
+    Fail(reason);
+  }
 }
 
 void ReplacedFile::Check(HRESULT inResult) const {
@@ -93,8 +92,7 @@ void ReplacedFile::Check(HRESULT inResult) const {
 
 // Some file systems tell of a full disk only here.
 void ReplacedFile::Synchronise() const {
-  const Descriptor file(open(temporary_.c_str(), O_RDWR | O_CLOEXEC));
-  if (file.number < 0 || fsync(file.number) != 0) Fail(errno);
+  if (fsync(descriptor_) != 0) Fail(errno);
 }
 
 void ReplacedFile::CopyInto(Output& ioOutput) const {

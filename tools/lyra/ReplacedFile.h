@@ -19,8 +19,8 @@ class ReplacedFile {
   ReplacedFile(const ReplacedFile&) = delete;
   ReplacedFile& operator=(const ReplacedFile&) = delete;
 
-  /// Where the new file is to be written.
-  const std::string& TemporaryPath() const { return temporary_; }
+  /// Where the new file is to be written, by a path that is UTF-8 whatever the user's path is.
+  const std::string& TemporaryPath() const { return writtenPath_; }
   /// Raises InputError for a code that says that writing failed.
   void Check(HRESULT inResult) const;
   /// Makes sure that the new file is on the disk and puts it in its place.
@@ -35,6 +35,8 @@ class ReplacedFile {
   std::string path_;       // as the user gave it
   std::string target_;     // what is replaced; empty when the bytes are copied
   std::string temporary_;  // empty when it is gone
+  std::string writtenPath_;
+  int descriptor_ = -1;  // of the temporary file, as long as this lives
 };
 
 }  // namespace lyra
