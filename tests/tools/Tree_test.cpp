@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <functional>
+#include <map>
 #include <nlohmann/json.hpp>
 
 #include "tools/Command.h"
@@ -105,6 +106,22 @@ TEST(Tree, LeavesAreThoseOfTheTreeWithTheirPaths) {
 TEST(Tree, LeavesAsRowsStartWithTheirPaths) {
   EXPECT_THAT(RunWithCache({"tree", "--leaves", kModel}).out,
               HasSubstr("\nl-bracket-assembly_2 --++-- nut-bolt-assembly_3 --++-- bolt_1  bolt "));
+}
+
+TEST(Tree, ClashResultsNameProductsByThesePathsAndPlacements) {
+  std::map<std::string, json> placements;
+  for (const json& leaf : JsonOf({"tree", "--leaves", "--json", kModel}))
+    placements[leaf["path"]] = leaf["placement"];
+  int compared = 0;
+  for (const json& interference : JsonOf({"list", "--json", "samples/as1.clash.xml"})) {
+    for (const json& product : interference["products"]) {
+      ASSERT_TRUE(placements.contains(product["alias"])) << product["alias"];
+      for (std::size_t i = 0; i < 12; ++i)
+        EXPECT_NEAR(product["position"][i], placements[product["alias"]][i], 1e-3);
+      ++compared;
+    }
+  }
+  EXPECT_EQ(compared, 64);  // two of each of 32 interferences
 }
 
 TEST(Tree, DepthLeavesOutDeeperLevels) {
