@@ -12,6 +12,7 @@
 #include <utility>
 
 #include "default_platform/system/ObjectCounters.h"
+#include "default_platform/system/Utf8.h"
 #include "default_platform/visualisation/RayCasterLibrary.h"
 #include "platform/system/ZORFile.h"
 
@@ -43,9 +44,19 @@ bool HoldsAllPixels(int inWidth, int inHeight, std::size_t inByteCount) {
                             static_cast<std::size_t>(inHeight);
 }
 
+/// The path in UTF-8, whatever the process's locale.
+std::wstring ToWide(const std::string& inPath) {
+  std::u16string units(inPath.size(), u'\0');
+  units.resize(ZORDefault::DecodeUtf8(inPath, units.data()));
+  std::wstring wide;
+  for (std::size_t position = 0; position < units.size();)
+    wide += static_cast<wchar_t>(ZORDefault::NextCharacter(units, position));
+  return wide;
+}
+
 HRESULT WriteNewFile(const fs::path& inPath, const std::string& inBytes) {
   int descriptor = 0;
-  HRESULT result = ZORFOpen(inPath.wstring().c_str(), "wb", &descriptor);
+  HRESULT result = ZORFOpen(ToWide(inPath.string()).c_str(), "wb", &descriptor);
   if (FAILED(result)) return result;
   result = ZORFWrite(descriptor, inBytes.data(), inBytes.size(), nullptr);
   const HRESULT closed = ZORFClose(descriptor);

@@ -115,7 +115,6 @@ std::vector<std::uint8_t> DrawPicture(const PictureRequest& inRequest) {
 
 std::vector<ZORDefault::SeenPixel> SeePicture(const PictureRequest& inRequest) {
   const DrawnScene scene(inRequest);
-  const double offset = scene.GetView().depthOffset;
   std::vector<ZORDefault::SeenPixel> seen;
   seen.reserve(static_cast<std::size_t>(inRequest.width) *
                static_cast<std::size_t>(inRequest.height));
@@ -123,10 +122,12 @@ std::vector<ZORDefault::SeenPixel> SeePicture(const PictureRequest& inRequest) {
     for (int x = 0; x < inRequest.width; ++x) {
       const PicturePoint middle{static_cast<float>(x) + 0.5F, static_cast<float>(y) + 0.5F};
       Hit hit;
-      if (!scene.Cast(&middle, 1, &hit) || hit.item == Hit::kNothing)
+      if (!scene.Cast(&middle, 1, &hit) || hit.item == Hit::kNothing) {
         seen.emplace_back();
-      else
-        seen.push_back({scene.GetItems()[hit.item].number, static_cast<float>(hit.depth + offset)});
+        continue;
+      }
+      const DrawnItem& item = scene.GetItems()[hit.item];
+      seen.push_back({item.number, static_cast<float>(scene.RealDepth(item, hit.depth))});
     }
   }
   return seen;

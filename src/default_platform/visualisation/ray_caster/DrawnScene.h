@@ -74,6 +74,9 @@ struct DrawnItem {
   SurfaceColour colour;                ///< of triangles without their own
   std::vector<SurfaceColour> colours;  ///< of PartMesh::colours; empty when none is shown
   std::uint32_t number = 0;            ///< place in the request
+  /// Conic: depths are this many times the real ones. Cylindric: larger than the real ones by this
+  /// much. See MoveBack.
+  float depthChange = 0;
 
   const SurfaceColour& ColourOf(std::uint32_t inTriangle) const;
 };
@@ -100,6 +103,8 @@ class DrawnScene {
 
   const View& GetView() const { return view_; }
   const std::vector<DrawnItem>& GetItems() const { return items_; }
+  /// How far something at a depth of an item really lies from the given eye.
+  double RealDepth(const DrawnItem& inItem, float inDepth) const;
   /// All that an item may cover, with a pixel to spare for its lines; empty when it is not seen.
   PictureBox BoxOf(const DrawnItem& inItem) const;
   /// All that any item may cover.
@@ -115,6 +120,7 @@ class DrawnScene {
  private:
   void AttachInstances();
   PictureBox BoxOfItems() const;
+  void MoveBack(DrawnItem& ioItem, std::size_t inPlace) const;
 
   View view_;
   std::vector<DrawnItem> items_;
