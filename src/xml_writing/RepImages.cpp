@@ -1,30 +1,11 @@
 // Pictures of representations for reports.
 #include "ZORLyraXMLServices.h"
-#include "platform/visualisation/ZORPrint3DRepImage.h"
+#include "pictures/RepCapture.h"
 
 namespace {
 
 constexpr int kReportWidth = 756;
 constexpr int kReportHeight = 506;
-constexpr int kTrueColour = 2;
-
-void SetUp(ZORSupport* ioSupport, bool inKeepsBackground, bool inSetsViewModes) {
-  if (!ioSupport) return;
-  if (!inKeepsBackground) ioSupport->SetBackgroundColor(1.0F, 1.0F, 1.0F);
-  if (!inSetsViewModes) return;
-  ioSupport->SetViewMode(1, 1);
-  ioSupport->SetViewMode(2, 0);
-}
-
-/// @return false when rasterising gave no picture; whether writing succeeded is not looked at.
-bool Capture(ZORPrint3DRepImage& ioImage, const ZORUnicodeString& inPath) {
-  ZORPixelImage* const pixels = ioImage.Rasterize();
-  if (!pixels) return false;
-  pixels->Prepare(kTrueColour);
-  pixels->Write("JPEG", inPath.ConvertToString());
-  pixels->Release();
-  return true;
-}
 
 }  // namespace
 
@@ -34,16 +15,16 @@ void ZORLyraXMLServices::TakeRepImage(ZORRep* inRep, ZORUnicodeString inPath,
   if (!inRep) return;
   auto* const image =
       new ZORPrint3DRepImage(static_cast<ZOR3DRep*>(inRep), kReportWidth, kReportHeight);
-  SetUp(image->GetSupport(), inKeepBackground != 0, true);
-  if (Capture(*image, inPath)) image->Release();
+  SetUpSupport(image->GetSupport(), inKeepBackground != 0, true);
+  if (Capture(*image, "JPEG", inPath)) image->Release();
 }
 
 void ZORLyraXMLServices::TakeRepImage(ZORRep* inRep, ZORUnicodeString inPath, int inWidth,
                                       int inHeight, int inViewMode, int inKeepBackground) {
   if (!inRep) return;
   auto* const image = new ZORPrint3DRepImage(static_cast<ZOR3DRep*>(inRep), inWidth, inHeight);
-  SetUp(image->GetSupport(), inKeepBackground != 0, inViewMode == 1);
-  Capture(*image, inPath);
+  SetUpSupport(image->GetSupport(), inKeepBackground != 0, inViewMode == 1);
+  Capture(*image, "JPEG", inPath);
   image->Release();
 }
 
@@ -52,7 +33,7 @@ void ZORLyraXMLServices::TakeRepImage(ZORRep* inRep, ZORUnicodeString inPath,
   if (!inRep) return;
   auto* const image =
       new ZORPrint3DRepImage(static_cast<ZOR3DRep*>(inRep), kReportWidth, kReportHeight);
-  SetUp(image->GetSupport(), inKeepBackground != 0, true);
+  SetUpSupport(image->GetSupport(), inKeepBackground != 0, true);
   *image->GetViewpoint() = *inViewpoint;
-  if (Capture(*image, inPath)) image->Release();
+  if (Capture(*image, "JPEG", inPath)) image->Release();
 }

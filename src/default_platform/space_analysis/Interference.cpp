@@ -1,0 +1,200 @@
+#include "default_platform/space_analysis/Interference.h"
+
+#include <algorithm>
+#include <cmath>
+
+#include "default_platform/visualisation/PictureCamera.h"
+#include "platform/space_analysis/ZORISiSubInterference.h"
+
+namespace ZORDefault {
+namespace {
+
+ZORMetaClass* ClassNamed(const char* inName, unsigned int inSize) {
+  return fct_RetrieveMetaObject(inName, kZORTypeImplementation, ZORBaseUnknown::MetaObject(),
+                                "ZORNull", "SpaceAnalysis", inSize);
+}
+
+/// One point of an interference, which it keeps alive.
+class SubInterference final : public FacetedComponent, private CountedObject<SubInterference> {
+ public:
+  static const char* CountedName() { return "SubInterference"; }
+
+  SubInterference(Interference& inOwner, std::size_t inPoint)
+      : owner_(inOwner.GetInterface()),
+        self_(inOwner),
+        point_(inPoint),
+        subInterference_(*this),
+        specObject_(*this) {}
+
+  ZORBaseUnknown* FindFacet(const IID& inInterface) override {
+    if (inInterface == ZORBaseUnknown::ClassId() || inInterface == ZORISpecObject::ClassId())
+      return &specObject_;
+    return inInterface == ZORISiSubInterference::ClassId() ? &subInterference_ : nullptr;
+  }
+  ZORMetaClass* GetClass() const override {
+    static ZORMetaClass* const meta = ClassNamed("ZORSubInterference", sizeof(SubInterference));
+    return meta;
+  }
+  unsigned int AddReference() override { return ++referenceCount_; }
+  unsigned int ReleaseReference() override {
+    const unsigned int left = --referenceCount_;
+    if (left == 0) delete this;
+    return left;
+  }
+  ZORISpecObject* GetInterface() { return &specObject_; }
+
+ private:
+  class SubInterferenceFacet final : public Facet<ZORISiSubInterference> {
+   public:
+    explicit SubInterferenceFacet(SubInterference& inOwner) : Facet(inOwner), part_(inOwner) {}
+    int FillViewpoint(ZOR3DViewpoint* ioViewpoint) override {
+      if (!ioViewpoint) return 0;
+      part_.self_.FillPointViewpoint(part_.point_, *ioViewpoint);
+      return 1;
+    }
+
+   private:
+    SubInterference& part_;
+  };
+  class SpecObjectFacet final : public Facet<ZORISpecObject> {
+   public:
+    explicit SpecObjectFacet(SubInterference& inOwner) : Facet(inOwner), part_(inOwner) {}
+    ZORISpecObject* GetFather() override {
+      part_.self_.AddReference();
+      return part_.self_.GetSpecObject();
+    }
+
+   private:
+    SubInterference& part_;
+  };
+
+  ~SubInterference() = default;
+
+  unsigned int referenceCount_ = 0;
+  ZORISiInterference_var owner_;
+  Interference& self_;
+  std::size_t point_;
+  SubInterferenceFacet subInterference_;
+  SpecObjectFacet specObject_;
+};
+
+const ZOR3DRep* RepOf(const ZORIProduct_var& inProduct) {
+  const ZORI3DGeoVisu_var visualised = inProduct;
+  return visualised.IsNull() ? nullptr : dynamic_cast<const ZOR3DRep*>(visualised->GetRep());
+}
+
+}  // namespace
+
+Interference::Interference(const InterferenceElement& inElement,
+                           const std::array<ZORIProduct_var, 2>& inProducts)
+    : element_(inElement),
+      products_(inProducts),
+      flags_(element_.points.size() + 1, 1),
+      interference_(*this),
+      geoVisu_(*this),
+      specObject_(*this) {}
+
+ZORBaseUnknown* Interference::FindFacet(const IID& inInterface) {
+  if (inInterface == ZORBaseUnknown::ClassId() || inInterface == ZORISiInterference::ClassId())
+    return &interference_;
+  if (inInterface == ZORI3DGeoVisu::ClassId()) return &geoVisu_;
+  return inInterface == ZORISpecObject::ClassId() ? &specObject_ : nullptr;
+}
+
+ZORMetaClass* Interference::GetClass() const {
+  static ZORMetaClass* const meta = ClassNamed("ZORInterference", sizeof(Interference));
+  return meta;
+}
+
+unsigned int Interference::ReleaseReference() {
+  const unsigned int left = --referenceCount_;
+  if (left == 0) delete this;
+  return left;
+}
+
+const ChosenView& Interference::GetChosenView() {
+  if (!chosenView_)
+    chosenView_ = ChooseView({RepOf(products_[0]), RepOf(products_[1])}, element_.points,
+                             element_.isClearance);
+  return *chosenView_;
+}
+
+/// Sized for the picture that is going to be taken.
+MarkerStyle Interference::StyleOf() {
+  if (const auto& stored = element_.viewpoint; stored && stored->focusDistance > 0) {
+    const double radius = stored->focusDistance * std::tan(ZOR3DViewpoint().viewAngle / 2);
+    return {radius, stored->sight, UpFor(stored->sight), element_.isClearance};
+  }
+  const ChosenView& view = GetChosenView();
+  return {view.framed.radius, view.sight, view.up, element_.isClearance};
+}
+
+ZORRep* Interference::MakeRep() {
+  std::vector<ZORMathVector> shown;
+  for (std::size_t i = 0; i < element_.points.size(); ++i)
+    if (flags_[i] != 0 && flags_.back() != 0) shown.push_back(element_.points[i]);
+  if (shown.empty()) return nullptr;
+  const MarkerStyle style = StyleOf();
+  const ZOR3DBoundingSphere framed =
+      chosenView_ ? chosenView_->framed : ZOR3DBoundingSphere(shown.front(), style.viewRadius);
+  return new InterferenceRep(shown, style, framed);
+}
+
+void Interference::FillPointViewpoint(std::size_t inPoint, ZOR3DViewpoint& ioViewpoint) {
+  // Of a picture that is wider than high, the height decides.
+  constexpr float kWidth = 3, kHeight = 2;
+  constexpr double kCloser = 0.5;
+  const MarkerStyle style = StyleOf();
+  ioViewpoint.sight = style.sight;
+  ioViewpoint.up = style.up;
+  ioViewpoint.Reframe(kWidth, kHeight, 1, 1,
+                      {element_.points[inPoint], kCloser * style.viewRadius});
+}
+
+int* Interference::InterferenceFacet::GetFlags() {
+  int* const flags = new int[self_.flags_.size()];
+  std::ranges::copy(self_.flags_, flags);
+  return flags;
+}
+
+void Interference::InterferenceFacet::SetFlags(const int* inFlags) {
+  if (inFlags) std::copy_n(inFlags, self_.flags_.size(), self_.flags_.begin());
+}
+
+int Interference::InterferenceFacet::FillViewpoint(ZOR3DViewpoint* ioViewpoint) {
+  if (!ioViewpoint) return 0;
+  if (const auto& stored = self_.element_.viewpoint) {
+    ioViewpoint->projection = stored->projection;
+    ioViewpoint->origin = stored->origin;
+    ioViewpoint->sight = stored->sight;
+    ioViewpoint->up = UpFor(stored->sight);
+    ioViewpoint->focusDistance = PositiveOr(stored->focusDistance, ioViewpoint->focusDistance);
+    ioViewpoint->viewHeight = 2 * ioViewpoint->focusDistance * std::tan(ioViewpoint->viewAngle / 2);
+    ioViewpoint->nearPlane = std::max(stored->nearPlane, 0.0);
+    ioViewpoint->farPlane = stored->farPlane > stored->nearPlane ? stored->farPlane : 0;
+    return 1;
+  }
+  if (self_.element_.points.empty()) return 0;
+  ioViewpoint->sight = self_.GetChosenView().sight;
+  ioViewpoint->up = self_.GetChosenView().up;
+  return 0;
+}
+
+double* Interference::InterferenceFacet::GetGeometricResult() {
+  const std::vector<ZORMathVector>& points = self_.element_.points;
+  if (points.empty()) return nullptr;
+  double* const result = new double[3 * points.size()];
+  for (std::size_t i = 0; i < points.size(); ++i) {
+    result[3 * i] = points[i].x;
+    result[3 * i + 1] = points[i].y;
+    result[3 * i + 2] = points[i].z;
+  }
+  return result;
+}
+
+void Interference::InterferenceFacet::GetSubInterferences(ZORListValZORISpecObject_var& ioList) {
+  for (std::size_t i = 0; i < self_.element_.points.size(); ++i)
+    ioList.Append(ZORISpecObject_var((new SubInterference(self_, i))->GetInterface()));
+}
+
+}  // namespace ZORDefault

@@ -1,0 +1,89 @@
+// An interference of a clash result, as a component.
+#ifndef ZOR_DEFAULT_PLATFORM_SPACE_ANALYSIS_INTERFERENCE_H
+#define ZOR_DEFAULT_PLATFORM_SPACE_ANALYSIS_INTERFERENCE_H
+
+#include <array>
+#include <optional>
+#include <vector>
+
+#include "default_platform/product_structure/Facet.h"
+#include "default_platform/space_analysis/InterferenceElement.h"
+#include "default_platform/space_analysis/InterferenceRep.h"
+#include "default_platform/space_analysis/ViewChoice.h"
+#include "platform/product_structure/ZORIProduct.h"
+#include "platform/space_analysis/ZORISiInterference.h"
+#include "platform/visualisation/ZORI3DGeoVisu.h"
+
+namespace ZORDefault {
+
+/// Made of an "Interference" element; its elements and sub-interferences are the points that
+/// differ. Ends with its last reference, sub-interferences' included.
+class Interference final : public FacetedComponent, private CountedObject<Interference> {
+ public:
+  static const char* CountedName() { return "Interference"; }
+
+  /// Made without a reference.
+  /// @param inProducts empty where one is missing.
+  Interference(const InterferenceElement& inElement,
+               const std::array<ZORIProduct_var, 2>& inProducts);
+  Interference(const Interference&) = delete;
+  Interference& operator=(const Interference&) = delete;
+
+  ZORBaseUnknown* FindFacet(const IID& inInterface) override;
+  ZORMetaClass* GetClass() const override;
+  unsigned int AddReference() override { return ++referenceCount_; }
+  unsigned int ReleaseReference() override;
+
+  ZORISiInterference* GetInterface() { return &interference_; }
+  ZORISpecObject* GetSpecObject() { return &specObject_; }
+  /// A new one, for the caller to destroy; null when no flagged element is to be shown.
+  ZORRep* MakeRep();
+  /// A close view of one point.
+  void FillPointViewpoint(std::size_t inPoint, ZOR3DViewpoint& ioViewpoint);
+
+ private:
+  class InterferenceFacet final : public Facet<ZORISiInterference> {
+   public:
+    explicit InterferenceFacet(Interference& inOwner) : Facet(inOwner), self_(inOwner) {}
+    int* GetFlags() override;
+    int GetElementCount() override { return static_cast<int>(self_.element_.points.size()); }
+    void SetFlags(const int* inFlags) override;
+    int FillViewpoint(ZOR3DViewpoint* ioViewpoint) override;
+    double* GetGeometricResult() override;
+    void GetSubInterferences(ZORListValZORISpecObject_var& ioList) override;
+    int GetSubInterferenceCount() override { return GetElementCount(); }
+
+   private:
+    Interference& self_;
+  };
+  class GeoVisuFacet final : public Facet<ZORI3DGeoVisu> {
+   public:
+    explicit GeoVisuFacet(Interference& inOwner) : Facet(inOwner), self_(inOwner) {}
+    ZORRep* GetRep() override { return self_.MakeRep(); }
+
+   private:
+    Interference& self_;
+  };
+  class SpecObjectFacet final : public Facet<ZORISpecObject> {
+   public:
+    explicit SpecObjectFacet(Interference& inOwner) : Facet(inOwner) {}
+    ZORISpecObject* GetFather() override { return nullptr; }
+  };
+
+  ~Interference() = default;
+  const ChosenView& GetChosenView();
+  MarkerStyle StyleOf();
+
+  unsigned int referenceCount_ = 0;
+  InterferenceElement element_;
+  std::array<ZORIProduct_var, 2> products_;
+  std::vector<int> flags_;
+  std::optional<ChosenView> chosenView_;  // worked out when it is first needed
+  InterferenceFacet interference_;
+  GeoVisuFacet geoVisu_;
+  SpecObjectFacet specObject_;
+};
+
+}  // namespace ZORDefault
+
+#endif

@@ -1,0 +1,72 @@
+#include "default_platform/space_analysis/InterferenceRep.h"
+
+#include <algorithm>
+
+#include "default_platform/space_analysis/MarkerMesh.h"
+#include "default_platform/space_analysis/Vectors.h"
+#include "default_platform/visualisation/PictureCamera.h"
+
+namespace ZORDefault {
+namespace {
+
+// Shares of MarkerStyle::viewRadius.
+constexpr double kBall = 0.022;
+constexpr double kLine = 0.006;
+constexpr double kArrow = 0.018;
+constexpr double kArrowLength = 0.06;
+constexpr double kPin = 0.40;
+constexpr double kPinHead = 0.035;
+/// With more points than this they show the place by themselves.
+constexpr std::size_t kMostPins = 3;
+
+constexpr PartColour kMarkerColour = {255, 0, 140, 255};
+
+/// A needle from the point upwards and towards the eye: where surfaces hide the point, its head
+/// still stands out of them.
+void AddPin(const ZORMathVector& inPoint, const MarkerStyle& inStyle, MarkerMesh& ioMesh) {
+  const double size = inStyle.viewRadius;
+  const ZORMathVector aside = Cross(inStyle.sight, inStyle.up);
+  const ZORMathVector way = Direction(inStyle.up + 0.45 * aside - 0.9 * inStyle.sight, inStyle.up);
+  const ZORMathVector head = inPoint + (kPin * size) * way;
+  ioMesh.AddCone(inPoint, 0.3 * kLine * size, head, kLine * size);
+  ioMesh.AddBall(head, kPinHead * size);
+}
+
+/// Arrow heads inside the line where there is room, else outside of it.
+void AddDimension(const ZORMathVector& inFrom, const ZORMathVector& inTo, double inSize,
+                  MarkerMesh& ioMesh) {
+  const ZORMathVector way = Direction(inTo - inFrom, {0, 0, 1});
+  const bool hasRoom = Length(inTo - inFrom) > 3 * kArrowLength * inSize;
+  const ZORMathVector arrow = (hasRoom ? kArrowLength : -kArrowLength) * inSize * way;
+  const ZORMathVector tail = hasRoom ? ZORMathVector() : 2.5 * arrow;
+  ioMesh.AddCone(inFrom + tail, kLine * inSize, inTo - tail, kLine * inSize);
+  ioMesh.AddCone(inFrom + arrow, kArrow * inSize, inFrom, 0);
+  ioMesh.AddCone(inTo - arrow, kArrow * inSize, inTo, 0);
+}
+
+std::shared_ptr<const PartMesh> MakeMarkers(const std::vector<ZORMathVector>& inPoints,
+                                            const MarkerStyle& inStyle) {
+  MarkerMesh mesh(inPoints.front());
+  const bool isDimension = inStyle.isDimension && inPoints.size() == 2;
+  if (isDimension)
+    AddDimension(inPoints[0], inPoints[1], inStyle.viewRadius, mesh);
+  else
+    for (const ZORMathVector& point : inPoints) mesh.AddBall(point, kBall * inStyle.viewRadius);
+  if (isDimension)
+    AddPin(0.5 * (inPoints[0] + inPoints[1]), inStyle, mesh);
+  else if (inPoints.size() <= kMostPins)
+    for (const ZORMathVector& point : inPoints) AddPin(point, inStyle, mesh);
+  return mesh.Take();
+}
+
+}  // namespace
+
+InterferenceRep::InterferenceRep(const std::vector<ZORMathVector>& inPoints,
+                                 const MarkerStyle& inStyle, const ZOR3DBoundingSphere& inFramed)
+    : markers_(new PlacedMeshRep(MakeMarkers(inPoints, inStyle), ZORMathTransformation(),
+                                 &kMarkerColour)),
+      framed_(inFramed) {
+  markers_->SetInheritanceMode(kOwnColour | kImposeColour);
+}
+
+}  // namespace ZORDefault

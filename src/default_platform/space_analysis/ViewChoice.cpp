@@ -1,0 +1,158 @@
+#include "default_platform/space_analysis/ViewChoice.h"
+
+#include <algorithm>
+#include <cstdint>
+#include <memory>
+
+#include "default_platform/space_analysis/InterferenceRep.h"
+#include "default_platform/space_analysis/Vectors.h"
+#include "default_platform/visualisation/PictureCamera.h"
+#include "default_platform/visualisation/PictureDrawing.h"
+#include "platform/visualisation/ZOR3DBagRep.h"
+
+namespace ZORDefault {
+namespace {
+
+/// The pictures that directions are tried on: a sixth of those in reports.
+constexpr int kWidth = 126;
+constexpr int kHeight = 84;
+/// Of each product, in those pixels: enough to take a direction without trying others, and too few
+/// to be content with the part that is framed.
+constexpr int kPlenty = 500;
+constexpr int kTooFew = 80;
+constexpr int kPlentyOfMarkers = 8;
+
+struct Destroyer {
+  void operator()(ZORRep* inRep) const { inRep->Destroy(); }
+};
+typedef std::unique_ptr<ZOR3DBagRep, Destroyer> OwnBag;
+
+/// The middle of the points' box, and the farthest point from there.
+ZOR3DBoundingSphere SphereOf(const std::vector<ZORMathVector>& inPoints) {
+  ZORMathVector low = inPoints.front(), high = low;
+  for (const ZORMathVector& point : inPoints) {
+    low = {std::min(low.x, point.x), std::min(low.y, point.y), std::min(low.z, point.z)};
+    high = {std::max(high.x, point.x), std::max(high.y, point.y), std::max(high.z, point.z)};
+  }
+  ZOR3DBoundingSphere sphere(0.5 * (low + high), 0);
+  for (const ZORMathVector& point : inPoints)
+    sphere.radius = std::max(sphere.radius, Length(point - sphere.centre));
+  return sphere;
+}
+
+/// The default direction, the other corners from above, the sides, the corners from below, and
+/// along the axes.
+const std::vector<ZORMathVector>& Directions() {
+  static const std::vector<ZORMathVector> directions = [] {
+    std::vector<ZORMathVector> all;
+    for (const ZORMathVector& way : std::initializer_list<ZORMathVector>{
+             {-1, -1, -1}, {1, -1, -1}, {-1, 1, -1}, {1, 1, -1},  {-2, -1, -1}, {-1, -2, -1},
+             {2, -1, -1},  {1, -2, -1}, {-2, 1, -1}, {-1, 2, -1}, {2, 1, -1},   {1, 2, -1},
+             {-1, -1, -3}, {1, 1, -3},  {-1, -1, 1}, {1, -1, 1},  {-1, 1, 1},   {1, 1, 1},
+             {-1, -1, 3},  {1, 1, 3},   {-1, 0, 0},  {1, 0, 0},   {0, -1, 0},   {0, 1, 0},
+             {0, 0, -1},   {0, 0, 1}})
+      all.push_back(Direction(way, DefaultSight()));
+    return all;
+  }();
+  return directions;
+}
+
+class ViewTrial {
+ public:
+  ViewTrial(const std::array<const ZOR3DRep*, 2>& inProducts,
+            const std::vector<ZORMathVector>& inPoints, bool inIsDimension)
+      : products_(inProducts), points_(inPoints), isDimension_(inIsDimension) {
+    for (std::size_t i = 0; i < 2; ++i)
+      meshCounts_[i] = products_[i] ? CollectDrawnMeshes(*products_[i]).size() : 0;
+  }
+
+  /// How well both products are seen: pixels of the one that is seen less.
+  int Score(const ZORMathVector& inSight, const ZOR3DBoundingSphere& inFramed) const {
+    const ZORMathVector up = UpFor(inSight);
+    const std::unique_ptr<InterferenceRep, Destroyer> markers(
+        new InterferenceRep(points_, {inFramed.radius, inSight, up, isDimension_}, inFramed));
+    const OwnBag scene(new ZOR3DBagRep);
+    // The scene does not change what it shows.
+    for (const ZOR3DRep* const product : products_) scene->AddChild(const_cast<ZOR3DRep*>(product));
+    scene->AddChild(markers.get());
+    ZOR3DViewpoint viewpoint;
+    viewpoint.sight = inSight;
+    viewpoint.up = up;
+    viewpoint.Reframe(kWidth, kHeight, 1, 1, inFramed);
+    return ScoreOf(SeePixels(*scene, viewpoint, kWidth, kHeight));
+  }
+
+ private:
+  int ScoreOf(const std::optional<std::vector<SeenPixel>>& inPixels) const {
+    if (!inPixels) return 0;
+    int first = 0, second = 0, markers = 0;
+    for (const SeenPixel& pixel : *inPixels) {
+      if (pixel.mesh == SeenPixel::kNothing) continue;
+      if (pixel.mesh < meshCounts_[0])
+        ++first;
+      else if (pixel.mesh < meshCounts_[0] + meshCounts_[1])
+        ++second;
+      else
+        ++markers;
+    }
+    const int products = std::min({first, second, kPlenty});
+    return markers >= kPlentyOfMarkers ? products : products / 4;
+  }
+
+  std::array<const ZOR3DRep*, 2> products_;
+  const std::vector<ZORMathVector>& points_;
+  bool isDimension_;
+  std::array<std::size_t, 2> meshCounts_{};
+};
+
+/// Radii to frame around the points, the preferred one first, the last one around all.
+std::vector<double> RadiiAround(const ZOR3DBoundingSphere& inPoints,
+                                const std::array<const ZOR3DRep*, 2>& inProducts) {
+  double smallest = 0, all = 0;
+  for (const ZOR3DRep* const product : inProducts) {
+    if (!product) continue;
+    const ZOR3DBoundingSphere sphere = product->GetShowBoundingElement();
+    if (sphere.IsEmpty()) continue;
+    smallest = smallest > 0 ? std::min(smallest, sphere.radius) : sphere.radius;
+    all = std::max(all, Length(sphere.centre - inPoints.centre) + sphere.radius);
+  }
+  constexpr double kAnything = 10;  // millimetres, where there is no product
+  const double preferred =
+      std::max({1.3 * inPoints.radius, 1.1 * smallest, 0.02 * all, all > 0 ? 0 : kAnything});
+  std::vector<double> radii = {preferred};
+  for (double radius = 2.5 * preferred; radius < all; radius *= 2.5) radii.push_back(radius);
+  if (all > preferred) radii.push_back(all);
+  return radii;
+}
+
+}  // namespace
+
+ZORMathVector UpFor(const ZORMathVector& inSight) {
+  const ZORMathVector axis =
+      std::fabs(inSight.z) < 0.999 ? ZORMathVector(0, 0, 1) : ZORMathVector(0, 1, 0);
+  return Direction(axis - Dot(axis, inSight) * inSight, axis);
+}
+
+ChosenView ChooseView(const std::array<const ZOR3DRep*, 2>& inProducts,
+                      const std::vector<ZORMathVector>& inPoints, bool inIsDimension) {
+  const ZOR3DBoundingSphere points = SphereOf(inPoints);
+  const std::vector<double> radii = RadiiAround(points, inProducts);
+  ChosenView best{DefaultSight(), UpFor(DefaultSight()), {points.centre, radii.front()}};
+  if (!inProducts[0] || !inProducts[1]) return best;
+  const ViewTrial trial(inProducts, inPoints, inIsDimension);
+  int bestScore = 0;
+  for (const double radius : radii) {
+    for (const ZORMathVector& sight : Directions()) {
+      const ZOR3DBoundingSphere framed(points.centre, radius);
+      const int score = trial.Score(sight, framed);
+      if (score <= bestScore) continue;
+      bestScore = score;
+      best = {sight, UpFor(sight), framed};
+      if (score >= kPlenty) return best;
+    }
+    if (bestScore >= kTooFew) return best;
+  }
+  return best;
+}
+
+}  // namespace ZORDefault
