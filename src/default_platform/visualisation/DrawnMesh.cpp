@@ -33,8 +33,8 @@ class MeshCollector final : public ZOR3DSceneVisitor {
  public:
   void VisitMesh(const PlacedMeshRep& inMesh) override {
     const InheritedColour colour = Below(above_.back(), inMesh);
-    meshes_.push_back(
-        {inMesh.GetMesh(), inMesh.GetRootFromPart(), colour.colour, colour.isImposed});
+    meshes_.push_back({inMesh.GetMesh(), inMesh.GetRootFromPart(), colour.colour, colour.isImposed,
+                       inMesh.IsDrawnOver()});
   }
   bool EnterBag(const ZOR3DBagRep& inBag) override {
     above_.push_back(Below(above_.back(), inBag));

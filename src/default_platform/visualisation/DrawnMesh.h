@@ -17,6 +17,7 @@ struct DrawnMesh {
   /// Of the triangles without a colour of their own; of all when it is imposed.
   PartColour colour{210, 210, 210, 255};
   bool isColourImposed = false;
+  bool isDrawnOver = false;  ///< over all meshes that are not
 };
 
 /// The meshes that a node shows, in the order of the tree. A node above that imposes its colour

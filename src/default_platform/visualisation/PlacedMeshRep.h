@@ -18,6 +18,10 @@ class ZOR_PLATFORM_EXPORT PlacedMeshRep : public ZOR3DRep {
                 const PartColour* inOwnColour);
   const std::shared_ptr<const PartMesh>& GetMesh() const { return mesh_; }
   const ZORMathTransformation& GetRootFromPart() const { return rootFromPart_; }
+  /// Whether the mesh is drawn over all that is not, as markers are, whatever lies between it and
+  /// the eye; not at first. Has no effect in a view with a near plane.
+  void SetDrawnOver(bool inIsDrawnOver) { isDrawnOver_ = inIsDrawnOver; }
+  bool IsDrawnOver() const { return isDrawnOver_; }
   ZOR3DBoundingSphere GetShowBoundingElement() const override;
   void Accept(ZOR3DSceneVisitor& ioVisitor) const override;
 
@@ -27,6 +31,7 @@ class ZOR_PLATFORM_EXPORT PlacedMeshRep : public ZOR3DRep {
  private:
   std::shared_ptr<const PartMesh> mesh_;
   ZORMathTransformation rootFromPart_;
+  bool isDrawnOver_ = false;
 };
 
 #endif

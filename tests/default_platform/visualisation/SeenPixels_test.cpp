@@ -180,4 +180,23 @@ TEST(SeenPixels, FarFromTheOriginAgreesWithAllTriangles) {
   CompareSampled(scene, Framing(scene, ZOR3DViewpoint::kConic), 10000);
 }
 
+TEST(SeenPixels, DepthOfWhatIsDrawnOverIsItsReal) {
+  for (const auto projection : {ZOR3DViewpoint::kConic, ZOR3DViewpoint::kCylindric}) {
+    MeshScene scene;
+    scene.Add(support::MakeSphere(5, 40), support::MovedBy(0, 30, 0), {255, 0, 0, 255})
+        ->SetDrawnOver(true);
+    scene.Add(support::MakeBox(20, 4, 20), support::MovedBy(0, 0, 0), {0, 0, 255, 255});
+    ZOR3DViewpoint viewpoint;
+    viewpoint.projection = projection;
+    viewpoint.sight = {0, 1, 0};
+    viewpoint.up = {0, 0, 1};
+    viewpoint.origin = {0, -100, 0};
+    const auto seen = ZORDefault::SeePixels(*scene.Bag(), viewpoint, kWidth, kHeight);
+    ASSERT_TRUE(seen);
+    const SeenPixel& middle = (*seen)[kHeight / 2 * kWidth + kWidth / 2];
+    EXPECT_EQ(middle.mesh, 0u);
+    EXPECT_NEAR(middle.depth, 125, 0.05);
+  }
+}
+
 }  // namespace

@@ -240,6 +240,28 @@ TEST(ZORPrint3DRepImage, FlushFacesShowTheFirstProductEverywhere) {
   }
 }
 
+TEST(ZORPrint3DRepImage, WhatIsDrawnOverIsSeenBehindSurfaces) {
+  for (const bool isConic : {true, false}) {
+    MeshScene scene;
+    scene.Add(MakeBox(60, 10, 60), MovedBy(0, 0, 0), kBlue);
+    PlacedMeshRep* const marker = scene.Add(MakeSphere(8, 24), MovedBy(0, 40, 0), kRed);
+    scene.Add(MakeBox(60, 10, 60), MovedBy(0, -80, 0), kBlue);
+    const auto draw = [&] {
+      return Draw(scene.Bag(), 100, 100, [&](ZORPrint3DRepImage& ioImage) {
+        FromFront(1)(ioImage);
+        if (isConic) ioImage.GetViewpoint()->projection = ZOR3DViewpoint::kConic;
+        ioImage.GetViewpoint()->Reframe(100, 100, 1, 1);
+      });
+    };
+    const Picture hidden = draw();
+    EXPECT_FALSE(IsRed(hidden.At(50, 50)));
+    marker->SetDrawnOver(true);
+    const Picture over = draw();
+    EXPECT_TRUE(IsRed(over.At(50, 50)));
+    EXPECT_EQ(over.At(30, 50), hidden.At(30, 50));
+  }
+}
+
 TEST(ZORPrint3DRepImage, BackFacesAreShadedLikeFrontFaces) {
   MeshScene scene;
   auto inside = MakeBox(60, 60, 60);

@@ -89,17 +89,25 @@ DrawnItem MakeItem(const DrawnMesh& inMesh, const Placement& inPlacement, std::u
   if (showsOwnColours)
     for (const PartColour& colour : item.mesh->colours)
       item.colours.push_back(ToSurfaceColour(colour));
+  item.isDrawnOver = inMesh.isDrawnOver;
   item.number = inNumber;
   return item;
 }
 
-/// By how much the eye of a cylindric view moves forwards (backwards when negative) so that all
-/// lies in front of it.
-double MoveToScene(const std::vector<Placement>& inPlacements, const std::vector<double>& inRadii) {
-  double nearest = std::numeric_limits<double>::max();
-  for (std::size_t i = 0; i < inPlacements.size(); ++i)
-    nearest = std::min(nearest, inPlacements[i].translation.z - inRadii[i]);
-  return inPlacements.empty() || !std::isfinite(nearest) ? 0 : nearest;
+/// The depths between which all lies.
+struct DepthRange {
+  double low = 0;
+  double high = 0;
+};
+
+DepthRange DepthsOf(const std::vector<Placement>& inPlacements,
+                    const std::vector<double>& inRadii) {
+  DepthRange range{std::numeric_limits<double>::max(), std::numeric_limits<double>::lowest()};
+  for (std::size_t i = 0; i < inPlacements.size(); ++i) {
+    range.low = std::min(range.low, inPlacements[i].translation.z - inRadii[i]);
+    range.high = std::max(range.high, inPlacements[i].translation.z + inRadii[i]);
+  }
+  return inPlacements.empty() || !std::isfinite(range.high - range.low) ? DepthRange() : range;
 }
 
 double RadiusAround(const DrawnMesh& inMesh, const Placement& inPlacement) {
@@ -168,13 +176,20 @@ DrawnScene::DrawnScene(const ZORDefault::PictureRequest& inRequest) {
     radii.push_back(RadiusAround(mesh, placement));
     numbers.push_back(i);
   }
-  const double offset = inRequest.camera.isConic ? 0 : MoveToScene(placements, radii);
+  // The eye of a cylindric view moves so that all lies in front of it, with room for what is drawn
+  // over all else.
+  const DepthRange depths = DepthsOf(placements, radii);
+  const bool hasOverlay = std::ranges::any_of(inRequest.meshes, &DrawnMesh::isDrawnOver) &&
+                          inRequest.camera.nearPlane <= 0;
+  const double overlayDepth = hasOverlay ? depths.high - depths.low : 0;
+  const double offset = inRequest.camera.isConic ? 0 : depths.low - overlayDepth;
   view_ = MakeView(inRequest, offset);
+  view_.overlayDepth = static_cast<float>(overlayDepth);
   items_.reserve(placements.size());
   for (std::size_t i = 0; i < placements.size(); ++i) {
     placements[i].translation.z -= offset;
     items_.push_back(MakeItem(inRequest.meshes[numbers[i]], placements[i], numbers[i]));
-    MoveBack(items_.back(), i);
+    MoveAlongRays(items_.back(), i);
   }
   scene_ = Device() ? rtcNewScene(Device()) : nullptr;
   if (!scene_) throw std::bad_alloc();
@@ -182,22 +197,29 @@ DrawnScene::DrawnScene(const ZORDefault::PictureRequest& inRequest) {
   AttachInstances();
 }
 
+/// Moves an item in depth. On the picture nothing moves, since it is moved along its rays.
 /// Products often lie flush, one face on another. Each item is moved back by a hair, less than a
 /// thirtieth of a pixel's depth, so that rounding does not decide which one is seen: the first is.
-/// On the picture nothing moves, since it is moved along its rays.
-void DrawnScene::MoveBack(DrawnItem& ioItem, std::size_t inPlace) const {
+/// What is drawn over all else is moved in front of it.
+void DrawnScene::MoveAlongRays(DrawnItem& ioItem, std::size_t inPlace) const {
   constexpr std::size_t kSteps = 32;
-  constexpr float kStep = 1e-6F;
-  const float share = kStep * static_cast<float>(inPlace % kSteps);
+  constexpr float kStep = 1e-6F, kNearTheEye = 1e-4F;
+  const float hair = kStep * static_cast<float>(inPlace % kSteps);
   if (!view_.isConic) {
     const float pictureHeight = view_.pixelSize * static_cast<float>(view_.height);
-    ioItem.depthChange = share * std::max(pictureHeight, std::fabs(ioItem.centre.z));
+    ioItem.depthChange = hair * std::max(pictureHeight, std::fabs(ioItem.centre.z)) -
+                         (ioItem.isDrawnOver ? view_.overlayDepth : 0);
     ioItem.cameraFromMesh.translation.z += ioItem.depthChange;
+    ioItem.centre.z += ioItem.depthChange;
     return;
   }
-  ioItem.depthChange = 1 + share;
-  for (Vec3& column : ioItem.cameraFromMesh.linear.columns) column = (1 + share) * column;
-  ioItem.cameraFromMesh.translation = (1 + share) * ioItem.cameraFromMesh.translation;
+  const bool isOver = ioItem.isDrawnOver && view_.nearest <= 0;
+  const float scale = (1 + hair) * (isOver ? kNearTheEye : 1);
+  ioItem.depthChange = scale;
+  for (Vec3& column : ioItem.cameraFromMesh.linear.columns) column = scale * column;
+  ioItem.cameraFromMesh.translation = scale * ioItem.cameraFromMesh.translation;
+  ioItem.centre = scale * ioItem.centre;
+  ioItem.radius *= scale;
 }
 
 double DrawnScene::RealDepth(const DrawnItem& inItem, float inDepth) const {

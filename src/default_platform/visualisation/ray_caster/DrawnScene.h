@@ -27,6 +27,7 @@ struct View {
   float pixelSize = 0;
   float nearest = 0;       ///< what is nearer is not seen
   float farthest = 0;      ///< what is farther is not seen
+  float overlayDepth = 0;  ///< cylindric: how far what is drawn over all moves towards the eye
   double depthOffset = 0;  ///< add it to a depth to have the distance from the given eye
 
   /// The ray through a point is start + depth * direction.
@@ -74,8 +75,9 @@ struct DrawnItem {
   SurfaceColour colour;                ///< of triangles without their own
   std::vector<SurfaceColour> colours;  ///< of PartMesh::colours; empty when none is shown
   std::uint32_t number = 0;            ///< place in the request
+  bool isDrawnOver = false;
   /// Conic: depths are this many times the real ones. Cylindric: larger than the real ones by this
-  /// much. See MoveBack.
+  /// much. See MoveAlongRays.
   float depthChange = 0;
 
   const SurfaceColour& ColourOf(std::uint32_t inTriangle) const;
@@ -120,7 +122,7 @@ class DrawnScene {
  private:
   void AttachInstances();
   PictureBox BoxOfItems() const;
-  void MoveBack(DrawnItem& ioItem, std::size_t inPlace) const;
+  void MoveAlongRays(DrawnItem& ioItem, std::size_t inPlace) const;
 
   View view_;
   std::vector<DrawnItem> items_;
