@@ -25,8 +25,10 @@ Refinement::Refinement(const SurfacePass& inPass, const View& inView, const Samp
                        int inThreadCount)
     : view_(inView),
       pixels_(inPixels),
+      changes_(static_cast<std::size_t>(inView.width) * static_cast<std::size_t>(inView.height)),
       firstSamples_(static_cast<std::size_t>(inView.width) *
                     static_cast<std::size_t>(inView.height)) {
+  ForEach(inThreadCount, view_.height, [&](int inY) { FindChanges(inY); });
   std::vector<std::int32_t> rowStarts(static_cast<std::size_t>(view_.height) + 1, 0);
   ForEach(inThreadCount, view_.height, [&](int inY) { MarkRow(inY, rowStarts); });
   for (std::size_t i = 1; i < rowStarts.size(); ++i) rowStarts[i] += rowStarts[i - 1];
@@ -51,19 +53,32 @@ void Refinement::MarkRow(int inY, std::vector<std::int32_t>& outRowCounts) {
   outRowCounts[static_cast<std::size_t>(inY) + 1] = count;
 }
 
+void Refinement::FindChanges(int inY) {
+  const bool hasNextRow = inY + 1 < view_.height;
+  for (int x = 0; x < view_.width; ++x) {
+    const Sample* const here = pixels_ + Place(x, inY);
+    const bool toRight = x + 1 < view_.width && Differ(*here, here[1], 1, 0);
+    const bool downwards = hasNextRow && Differ(*here, here[view_.width], 0, 1);
+    changes_[Place(x, inY)] =
+        static_cast<std::uint8_t>((toRight ? kToRight : 0) | (downwards ? kDownwards : 0));
+  }
+}
+
 bool Refinement::IsNearChange(int inX, int inY) const {
-  const Sample* const here = pixels_ + Place(inX, inY);
-  return (inX > 0 && Differ(*here, here[-1], -1, 0)) ||
-         (inX + 1 < view_.width && Differ(*here, here[1], 1, 0)) ||
-         (inY > 0 && Differ(*here, here[-view_.width], 0, -1)) ||
-         (inY + 1 < view_.height && Differ(*here, here[view_.width], 0, 1));
+  const std::uint8_t* const here = changes_.data() + Place(inX, inY);
+  return *here != 0 || (inX > 0 && (here[-1] & kToRight) != 0) ||
+         (inY > 0 && (here[-view_.width] & kDownwards) != 0);
 }
 
 bool Refinement::Differ(const Sample& inA, const Sample& inB, float inDx, float inDy) const {
   if (inA.item != inB.item) return true;
   if (inA.item == Hit::kNothing) return false;
-  return LargestDifference(inA.light, inB.light) > kLightStep || IsInFront(inA, inB, inDx, inDy) ||
-         IsInFront(inB, inA, -inDx, -inDy);
+  if (LargestDifference(inA.light, inB.light) > kLightStep) return true;
+  // Closer than any break can be, which is so nearly everywhere.
+  const float gap = std::fabs(inA.nearness - inB.nearness);
+  const float nearness = view_.isConic ? std::min(inA.nearness, inB.nearness) : 1;
+  if (gap <= kDepthBreak * view_.NearnessOfPixel(nearness)) return false;
+  return IsInFront(inA, inB, inDx, inDy) || IsInFront(inB, inA, -inDx, -inDy);
 }
 
 /// Whether a sample's surface ends before the other sample, whose surface lies behind it.

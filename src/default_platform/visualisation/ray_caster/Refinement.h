@@ -31,7 +31,11 @@ class Refinement {
   static constexpr int kSide = 2;  // samples along a pixel's side
   static constexpr int kSamples = kSide * kSide;
   static constexpr std::int32_t kNotRefined = -1;
+  // Where something changes from a pixel to its neighbour.
+  static constexpr std::uint8_t kToRight = 1;
+  static constexpr std::uint8_t kDownwards = 2;
 
+  void FindChanges(int inY);
   bool IsNearChange(int inX, int inY) const;
   bool Differ(const Sample& inA, const Sample& inB, float inDx, float inDy) const;
   void MarkRow(int inY, std::vector<std::int32_t>& outRowCounts);
@@ -46,6 +50,7 @@ class Refinement {
 
   const View& view_;
   const Sample* pixels_;
+  std::vector<std::uint8_t> changes_;       // kToRight and kDownwards of each pixel
   std::vector<std::int32_t> firstSamples_;  // of each pixel, or kNotRefined
   std::unique_ptr<Sample[]> samples_;
 };
