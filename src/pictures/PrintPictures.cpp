@@ -6,8 +6,8 @@
 #include <vector>
 
 #include "BuildPath.h"
+#include "RepCapture.h"
 #include "pictures/ProductList.h"
-#include "pictures/RepCapture.h"
 #include "platform/space_analysis/ZORISiSubInterference.h"
 #include "platform/system/ZORGetEnv.h"
 #include "platform/system/ZORSysSettingRepository.h"

@@ -1,6 +1,6 @@
 // Pictures of representations for reports.
+#include "RepCapture.h"
 #include "ZORLyraXMLServices.h"
-#include "pictures/RepCapture.h"
 
 namespace {
 

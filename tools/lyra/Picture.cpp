@@ -7,10 +7,11 @@
 #include <memory>
 #include <string_view>
 
+#include "PrintPictures.h"
 #include "ZORLyraXMLServices.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/DocumentText.h"
-#include "platform/visualisation/ZORPrint3DRepImage.h"
+#include "platform/visualisation/ZOR3DViewpoint.h"
 
 namespace lyra {
 namespace {
@@ -45,28 +46,18 @@ int PixelCount(std::string_view inText) {
 struct Releaser {
   void operator()(ZORBaseUnknown* inComponent) const { inComponent->Release(); }
 };
+using OwnedViewpoint = std::unique_ptr<ZOR3DViewpoint, Releaser>;
 
-void LookAlong(const PictureView& inView, const PictureSize& inSize, ZOR3DViewpoint& ioViewpoint) {
-  ioViewpoint.projection = ZOR3DViewpoint::kCylindric;
-  ioViewpoint.sight = inView.sight;
-  ioViewpoint.up = inView.up;
-  ioViewpoint.Reframe(static_cast<float>(inSize.width), static_cast<float>(inSize.height), 1, 1);
-}
-
-// What the library's picture of a representation cannot be asked for: other formats, or a view and
-// a size together. The same drawing otherwise.
-void TakeOtherPicture(ZOR3DRep& inRep, const PictureWishes& inWishes, const ZORString& inPath) {
-  const std::unique_ptr<ZORPrint3DRepImage, Releaser> image(
-      new ZORPrint3DRepImage(&inRep, inWishes.size.width, inWishes.size.height));
-  ZORSupport& support = *image->GetSupport();
-  if (!inWishes.keepsBackground) support.SetBackgroundColor(1, 1, 1);
-  support.SetViewMode(ZORSupport::kShading, 1);
-  support.SetViewMode(ZORSupport::kHiddenEdges, 0);
-  if (inWishes.view) LookAlong(*inWishes.view, inWishes.size, *image->GetViewpoint());
-  const std::unique_ptr<ZORPixelImage, Releaser> pixels(image->Rasterize());
-  if (!pixels) return;
-  pixels->Prepare(2);
-  pixels->Write(inWishes.format == PictureFormat::kPng ? "PNG" : "JPEG", inPath);
+/// A camera that looks in the direction of a view and has all of a representation in the picture.
+OwnedViewpoint ViewpointOf(const PictureView& inView, const PictureSize& inSize,
+                           const ZOR3DRep& inRep) {
+  OwnedViewpoint viewpoint(new ZOR3DViewpoint);
+  viewpoint->projection = ZOR3DViewpoint::kCylindric;
+  viewpoint->sight = inView.sight;
+  viewpoint->up = inView.up;
+  viewpoint->Reframe(static_cast<float>(inSize.width), static_cast<float>(inSize.height), 1, 1,
+                     inRep.GetShowBoundingElement());
+  return viewpoint;
 }
 
 }  // namespace
@@ -104,12 +95,19 @@ std::optional<PictureView> ViewOf(const std::string& inWord) {
 }
 
 void TakePicture(ZOR3DRep& inRep, const PictureWishes& inWishes, const std::string& inPath) {
+  constexpr int kPlainModes = 1;
   const auto [width, height] = inWishes.size;
-  if (inWishes.format == PictureFormat::kJpeg && !inWishes.view)
-    ZORLyraXMLServices::TakeRepImage(&inRep, FromUtf8(inPath), width, height, 1,
-                                     inWishes.keepsBackground ? 1 : 0);
+  const int keepsBackground = inWishes.keepsBackground ? 1 : 0;
+  const ZORUnicodeString path = FromUtf8(inPath);
+  const char* const format = inWishes.format == PictureFormat::kPng ? "PNG" : "JPEG";
+  if (inWishes.view)
+    PrintPictures::TakeRepImage(&inRep, path,
+                                ViewpointOf(*inWishes.view, inWishes.size, inRep).get(), format,
+                                width, height, kPlainModes, keepsBackground);
+  else if (inWishes.format == PictureFormat::kPng)
+    PrintPictures::TakeRepImage(&inRep, path, format, width, height, kPlainModes, keepsBackground);
   else
-    TakeOtherPicture(inRep, inWishes, inPath.c_str());
+    ZORLyraXMLServices::TakeRepImage(&inRep, path, width, height, kPlainModes, keepsBackground);
 }
 
 }  // namespace lyra

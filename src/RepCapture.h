@@ -1,6 +1,6 @@
 // The steps that all pictures of representations share.
-#ifndef ZOR_PICTURES_REP_CAPTURE_H
-#define ZOR_PICTURES_REP_CAPTURE_H
+#ifndef ZOR_REP_CAPTURE_H
+#define ZOR_REP_CAPTURE_H
 
 #include "platform/system/ZORUnicodeString.h"
 #include "platform/visualisation/ZORPrint3DRepImage.h"

@@ -1,4 +1,4 @@
-#include "pictures/RepCapture.h"
+#include "RepCapture.h"
 
 void SetUpSupport(ZORSupport* ioSupport, bool inKeepsBackground, bool inSetsViewModes) {
   if (!ioSupport) return;
