@@ -16,7 +16,9 @@
 namespace ZORDefault {
 
 struct InterferenceScene {
-  /// The first and the second product; empty where the model has none of that path.
+  /// The first and the second product, as ones that stand by themselves: a picture changes nothing
+  /// of the model. Where both are shown in nearly the same colour, another one is imposed on the
+  /// second. Empty where the model has none of that path.
   std::array<ZORIProduct_var, 2> products;
   /// The alias path by which each was found; of a missing one, the text that says which it is.
   std::array<ZORUnicodeString, 2> paths;

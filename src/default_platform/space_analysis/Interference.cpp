@@ -1,9 +1,7 @@
 #include "default_platform/space_analysis/Interference.h"
 
 #include <algorithm>
-#include <cmath>
 
-#include "default_platform/visualisation/PictureCamera.h"
 #include "platform/space_analysis/ZORISiSubInterference.h"
 
 namespace ZORDefault {
@@ -112,21 +110,23 @@ unsigned int Interference::ReleaseReference() {
   return left;
 }
 
-const ChosenView& Interference::GetChosenView() {
-  if (!chosenView_)
-    chosenView_ = ChooseView({RepOf(products_[0]), RepOf(products_[1])}, element_.points,
-                             element_.isClearance);
-  return *chosenView_;
+const ChosenView& Interference::GetView() {
+  if (!view_)
+    view_ = element_.viewpoint ? StoredView()
+                               : ChooseView({RepOf(products_[0]), RepOf(products_[1])},
+                                            element_.points, element_.isClearance);
+  return *view_;
 }
 
-/// Sized for the picture that is going to be taken.
-MarkerStyle Interference::StyleOf() {
-  if (const auto& stored = element_.viewpoint; stored && stored->focusDistance > 0) {
-    const double radius = stored->focusDistance * std::tan(ZOR3DViewpoint().viewAngle / 2);
-    return {radius, stored->sight, UpFor(stored->sight), element_.isClearance};
-  }
-  const ChosenView& view = GetChosenView();
-  return {view.framed.radius, view.sight, view.up, element_.isClearance};
+ChosenView Interference::StoredView() const {
+  ZOR3DViewpoint viewpoint;
+  element_.viewpoint->Fill(viewpoint);
+  const double radius = viewpoint.viewHeight / 2;
+  ChosenView view{{radius, viewpoint.sight, viewpoint.up, element_.isClearance},
+                  {element_.points.front(), radius}};
+  LengthenPins({RepOf(products_[0]), RepOf(products_[1])}, element_.points, viewpoint,
+               view.markers);
+  return view;
 }
 
 ZORRep* Interference::MakeRep() {
@@ -134,21 +134,18 @@ ZORRep* Interference::MakeRep() {
   for (std::size_t i = 0; i < element_.points.size(); ++i)
     if (flags_[i] != 0 && flags_.back() != 0) shown.push_back(element_.points[i]);
   if (shown.empty()) return nullptr;
-  const MarkerStyle style = StyleOf();
-  const ZOR3DBoundingSphere framed =
-      chosenView_ ? chosenView_->framed : ZOR3DBoundingSphere(shown.front(), style.viewRadius);
-  return new InterferenceRep(shown, style, framed);
+  return new InterferenceRep(shown, GetView().markers, GetView().framed);
 }
 
 void Interference::FillPointViewpoint(std::size_t inPoint, ZOR3DViewpoint& ioViewpoint) {
   // Of a picture that is wider than high, the height decides.
   constexpr float kWidth = 3, kHeight = 2;
   constexpr double kCloser = 0.5;
-  const MarkerStyle style = StyleOf();
-  ioViewpoint.sight = style.sight;
-  ioViewpoint.up = style.up;
+  const MarkerStyle& markers = GetView().markers;
+  ioViewpoint.sight = markers.sight;
+  ioViewpoint.up = markers.up;
   ioViewpoint.Reframe(kWidth, kHeight, 1, 1,
-                      {element_.points[inPoint], kCloser * style.viewRadius});
+                      {element_.points[inPoint], kCloser * markers.viewRadius});
 }
 
 int* Interference::InterferenceFacet::GetFlags() {
@@ -164,19 +161,12 @@ void Interference::InterferenceFacet::SetFlags(const int* inFlags) {
 int Interference::InterferenceFacet::FillViewpoint(ZOR3DViewpoint* ioViewpoint) {
   if (!ioViewpoint) return 0;
   if (const auto& stored = self_.element_.viewpoint) {
-    ioViewpoint->projection = stored->projection;
-    ioViewpoint->origin = stored->origin;
-    ioViewpoint->sight = stored->sight;
-    ioViewpoint->up = UpFor(stored->sight);
-    ioViewpoint->focusDistance = PositiveOr(stored->focusDistance, ioViewpoint->focusDistance);
-    ioViewpoint->viewHeight = 2 * ioViewpoint->focusDistance * std::tan(ioViewpoint->viewAngle / 2);
-    ioViewpoint->nearPlane = std::max(stored->nearPlane, 0.0);
-    ioViewpoint->farPlane = stored->farPlane > stored->nearPlane ? stored->farPlane : 0;
+    stored->Fill(*ioViewpoint);
     return 1;
   }
   if (self_.element_.points.empty()) return 0;
-  ioViewpoint->sight = self_.GetChosenView().sight;
-  ioViewpoint->up = self_.GetChosenView().up;
+  ioViewpoint->sight = self_.GetView().markers.sight;
+  ioViewpoint->up = self_.GetView().markers.up;
   return 0;
 }
 

@@ -71,14 +71,15 @@ class Interference final : public FacetedComponent, private CountedObject<Interf
   };
 
   ~Interference() = default;
-  const ChosenView& GetChosenView();
-  MarkerStyle StyleOf();
+  /// Of the stored viewpoint when there is one, else chosen; worked out when it is first needed.
+  const ChosenView& GetView();
+  ChosenView StoredView() const;
 
   unsigned int referenceCount_ = 0;
   InterferenceElement element_;
   std::array<ZORIProduct_var, 2> products_;
   std::vector<int> flags_;
-  std::optional<ChosenView> chosenView_;  // worked out when it is first needed
+  std::optional<ChosenView> view_;
   InterferenceFacet interference_;
   GeoVisuFacet geoVisu_;
   SpecObjectFacet specObject_;

@@ -5,6 +5,8 @@
 #include <string_view>
 
 #include "default_platform/space_analysis/Vectors.h"
+#include "default_platform/space_analysis/ViewChoice.h"
+#include "default_platform/visualisation/PictureCamera.h"
 #include "platform/system/ZORMsgCatalog.h"
 #include "platform/xml/DOMString.h"
 #include "platform/xml/DOM_NamedNodeMap.h"
@@ -117,6 +119,24 @@ ZORUnicodeString AttributeOf(const DOM_Node& inElement, const char* inName) {
   const DOM_Node attribute = inElement.getAttributes().getNamedItem(inName);
   return attribute.isNull() ? ZORUnicodeString()
                             : attribute.getNodeValue().DOMStringToZORUnicodeString();
+}
+
+void StoredViewpoint::Fill(ZOR3DViewpoint& outViewpoint) const {
+  const ZOR3DViewpoint usual;
+  outViewpoint.projection = projection;
+  outViewpoint.origin = origin;
+  outViewpoint.sight = sight;
+  outViewpoint.up = UpFor(sight);
+  outViewpoint.focusDistance = PositiveOr(focusDistance, usual.focusDistance);
+  outViewpoint.viewAngle = usual.viewAngle;
+  outViewpoint.viewHeight = 2 * outViewpoint.focusDistance * std::tan(usual.viewAngle / 2);
+  // Right before the eye a near plane cuts nothing that matters, but would keep markers from being
+  // drawn over all else.
+  constexpr double kRightBefore = 0.02;
+  const bool cutsNothing = projection == ZOR3DViewpoint::kConic &&
+                           nearPlane <= kRightBefore * outViewpoint.focusDistance;
+  outViewpoint.nearPlane = cutsNothing ? 0 : std::max(nearPlane, 0.0);
+  outViewpoint.farPlane = farPlane > nearPlane ? farPlane : 0;
 }
 
 InterferenceElement::InterferenceElement(const DOM_Node& inInterference)

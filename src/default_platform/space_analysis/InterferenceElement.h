@@ -20,6 +20,9 @@ struct StoredViewpoint {
   double focusDistance = 0;
   double nearPlane = 0;
   double farPlane = 0;
+
+  /// Sets all of a viewpoint; a cylindric one shows as much as a conic one at its focus.
+  void Fill(ZOR3DViewpoint& outViewpoint) const;
 };
 
 /// Numbers are read with a decimal point or a decimal comma.

@@ -10,24 +10,23 @@ namespace ZORDefault {
 namespace {
 
 // Shares of MarkerStyle::viewRadius.
-constexpr double kBall = 0.022;
-constexpr double kLine = 0.006;
-constexpr double kArrow = 0.018;
+constexpr double kBall = 0.035;
+constexpr double kLine = 0.008;
+constexpr double kArrow = 0.025;
 constexpr double kArrowLength = 0.06;
-constexpr double kPin = 0.40;
-constexpr double kPinHead = 0.035;
+constexpr double kPinHead = 0.04;
 /// With more points than this they show the place by themselves.
 constexpr std::size_t kMostPins = 3;
 
 constexpr PartColour kMarkerColour = {255, 0, 140, 255};
 
-/// A needle from the point upwards and towards the eye: where surfaces hide the point, its head
-/// still stands out of them.
+/// A needle from the point upwards and towards the eye, whose head stands out of the surfaces that
+/// hide the point.
 void AddPin(const ZORMathVector& inPoint, const MarkerStyle& inStyle, MarkerMesh& ioMesh) {
   const double size = inStyle.viewRadius;
   const ZORMathVector aside = Cross(inStyle.sight, inStyle.up);
   const ZORMathVector way = Direction(inStyle.up + 0.45 * aside - 0.9 * inStyle.sight, inStyle.up);
-  const ZORMathVector head = inPoint + (kPin * size) * way;
+  const ZORMathVector head = inPoint + (inStyle.pinLength * size) * way;
   ioMesh.AddCone(inPoint, 0.3 * kLine * size, head, kLine * size);
   ioMesh.AddBall(head, kPinHead * size);
 }
@@ -52,6 +51,7 @@ std::shared_ptr<const PartMesh> MakeMarkers(const std::vector<ZORMathVector>& in
     AddDimension(inPoints[0], inPoints[1], inStyle.viewRadius, mesh);
   else
     for (const ZORMathVector& point : inPoints) mesh.AddBall(point, kBall * inStyle.viewRadius);
+  if (inStyle.pinLength <= 0) return mesh.Take();
   if (isDimension)
     AddPin(0.5 * (inPoints[0] + inPoints[1]), inStyle, mesh);
   else if (inPoints.size() <= kMostPins)
@@ -67,6 +67,7 @@ InterferenceRep::InterferenceRep(const std::vector<ZORMathVector>& inPoints,
                                  &kMarkerColour)),
       framed_(inFramed) {
   markers_->SetInheritanceMode(kOwnColour | kImposeColour);
+  markers_->SetDrawnOver(true);
 }
 
 }  // namespace ZORDefault

@@ -15,10 +15,11 @@ struct MarkerStyle {
   double viewRadius = 1;     ///< half of what the picture's height shows; sizes go by it
   ZORMathVector sight;       ///< unit
   ZORMathVector up;          ///< unit
-  bool isDimension = false;  ///< a line with arrow heads joins the first two points
+  bool isDimension = false;  ///< a line with arrow heads joins the two points
+  double pinLength = 0;      ///< as a share of viewRadius; 0: without pins
 };
 
-/// Markers at some points, and the sphere to frame when the interference is shown alone: it holds
+/// Markers at some points, drawn over all else, and the sphere to frame when the interference is shown alone: it holds
 /// what is needed of the surroundings to recognise the place.
 class InterferenceRep final : public ZOR3DRep, private CountedObject<InterferenceRep> {
  public:

@@ -1,5 +1,7 @@
 #include "default_platform/InterferenceScene.h"
 
+#include <cstdlib>
+
 #include "default_platform/OpenModel.h"
 #include "default_platform/space_analysis/Interference.h"
 #include "default_platform/space_analysis/StandingProduct.h"
@@ -29,6 +31,35 @@ std::string WhyNoneIsTrusted(const InterferenceElement& inElement,
   return {};
 }
 
+/// Two parts of nearly one colour could not be told apart.
+bool AreAlike(const PartColour& inA, const PartColour& inB) {
+  constexpr int kAlike = 90;
+  int difference = 0;
+  for (std::size_t i = 0; i < 3; ++i) difference += std::abs(inA[i] - inB[i]);
+  return difference < kAlike;
+}
+
+/// Of those that stand out from every other colour here, markers' included.
+PartColour ContrastTo(const PartColour& inColour) {
+  constexpr PartColour kOrange = {240, 150, 30, 255}, kBlue = {70, 130, 220, 255};
+  return AreAlike(inColour, kOrange) ? kBlue : kOrange;
+}
+
+/// Each product as one that stands by itself, so that a picture leaves the model's alone.
+void Place(const std::optional<ResultPlacements>& inPlacements, InterferenceScene& ioScene) {
+  const PartColour first = MeanColourOf(ioScene.products[0]);
+  const bool areBoth = !ioScene.products[0].IsNull() && !ioScene.products[1].IsNull();
+  const bool isAlike = areBoth && AreAlike(first, MeanColourOf(ioScene.products[1]));
+  const PartColour contrast = ContrastTo(first);
+  for (std::size_t i = 0; i < ioScene.products.size(); ++i) {
+    ProductFacts facts;
+    if (!GetProductFacts(ioScene.products[i].GetInterface(), facts)) continue;
+    const PartColour* const imposed = i == 1 && isAlike ? &contrast : nullptr;
+    ioScene.products[i] = StandAt(
+        ioScene.products[i], inPlacements ? (*inPlacements)[i] : facts.rootFromProduct, imposed);
+  }
+}
+
 }  // namespace
 
 InterferenceScene MakeInterferenceScene(const ZORIProduct_var& inRoot,
@@ -39,10 +70,7 @@ InterferenceScene MakeInterferenceScene(const ZORIProduct_var& inRoot,
   for (std::size_t i = 0; i < scene.products.size() && i < element.products.size(); ++i)
     Find(inRoot, element.products[i], scene.products[i], scene.paths[i]);
   if (inPlacements) scene.whyAsInModel = WhyNoneIsTrusted(element, *inPlacements, scene);
-  if (inPlacements && scene.whyAsInModel.empty())
-    for (std::size_t i = 0; i < scene.products.size(); ++i)
-      if (!scene.products[i].IsNull())
-        scene.products[i] = StandAt(scene.products[i], (*inPlacements)[i]);
+  Place(scene.whyAsInModel.empty() ? inPlacements : std::nullopt, scene);
   scene.interference =
       ZORISiInterference_var((new Interference(element, scene.products))->GetInterface());
   return scene;

@@ -28,8 +28,17 @@ class StandingProduct final : public FacetedComponent, private CountedObject<Sta
  public:
   static const char* CountedName() { return "StandingProduct"; }
 
-  StandingProduct(Product& inProduct, const ZORMathTransformation& rootFromProduct)
-      : original_(inProduct.GetInterface()), product_(*this), geoVisu_(*this) {
+  StandingProduct(Product& inProduct, const ZORMathTransformation& rootFromProduct,
+                  const PartColour* inColour)
+      : original_(inProduct.GetInterface()),
+        properties_(inProduct.GetProperties()),
+        product_(*this),
+        geoVisu_(*this),
+        visProperties_(*this) {
+    if (inColour) {
+      properties_.SetColor((*inColour)[0], (*inColour)[1], (*inColour)[2]);
+      properties_.SetInheritance(ZORVisPropertiesValues::kColour, 1);
+    }
     if (const ZOR3DRep* const rep = inProduct.GetRep())
       MakeRep(*rep, rootFromProduct * Inverse(inProduct.GetRootFromProduct()));
   }
@@ -39,7 +48,8 @@ class StandingProduct final : public FacetedComponent, private CountedObject<Sta
   ZORBaseUnknown* FindFacet(const IID& inInterface) override {
     if (inInterface == ZORBaseUnknown::ClassId() || inInterface == ZORIProduct::ClassId())
       return &product_;
-    return inInterface == ZORI3DGeoVisu::ClassId() ? &geoVisu_ : nullptr;
+    if (inInterface == ZORI3DGeoVisu::ClassId()) return &geoVisu_;
+    return inInterface == ZORIVisProperties::ClassId() ? &visProperties_ : nullptr;
   }
   ZORMetaClass* GetClass() const override { return original_->GetMetaObject(); }
   unsigned int AddReference() override { return ++referenceCount_; }
@@ -51,7 +61,7 @@ class StandingProduct final : public FacetedComponent, private CountedObject<Sta
   ZORIProduct* GetInterface() { return &product_; }
 
  private:
-  /// All interfaces but the representation's are the model's product's.
+  /// All interfaces but those of what is shown are the model's product's.
   template <class Interface>
   class StandingFacet : public Facet<Interface> {
    public:
@@ -80,6 +90,23 @@ class StandingProduct final : public FacetedComponent, private CountedObject<Sta
     ZORRep* GetRep() override { return self_.rep_; }
   };
 
+  class VisPropertiesFacet final : public StandingFacet<ZORIVisProperties> {
+   public:
+    using StandingFacet::StandingFacet;
+    HRESULT GetPropertiesAtt(ZORVisPropertiesValues& outValues, int inProperties, int inGeometry,
+                             int inReserved, int inAlsoReserved) override {
+      const HRESULT result =
+          ZORIVisProperties_var(self_.original_)
+              ->GetPropertiesAtt(outValues, inProperties, inGeometry, inReserved, inAlsoReserved);
+      if (SUCCEEDED(result)) outValues = self_.properties_;
+      return result;
+    }
+    HRESULT SetPropertiesAtt(const ZORVisPropertiesValues& inValues) override {
+      self_.properties_ = inValues;
+      return S_OK;
+    }
+  };
+
   ~StandingProduct() {
     if (rep_) rep_->Destroy();
     for (PlacedMeshRep* const mesh : meshes_) mesh->Destroy();
@@ -97,20 +124,45 @@ class StandingProduct final : public FacetedComponent, private CountedObject<Sta
 
   unsigned int referenceCount_ = 0;
   ZORIProduct_var original_;
+  ZORVisPropertiesValues properties_;
   ZOR3DBagRep* rep_ = nullptr;
   std::vector<PlacedMeshRep*> meshes_;
   ProductFacet product_;
   GeoVisuFacet geoVisu_;
+  VisPropertiesFacet visProperties_;
 };
 
 }  // namespace
 
 ZORIProduct_var StandAt(const ZORIProduct_var& inProduct,
-                        const ZORMathTransformation& rootFromProduct) {
-  const ZORInterfaceHandle<ProductIdentity> product = inProduct;
-  if (product.IsNull()) return {};
-  return ZORIProduct_var(
-      (new StandingProduct(product->GetProduct(), rootFromProduct))->GetInterface());
+                        const ZORMathTransformation& rootFromProduct, const PartColour* inColour) {
+  const ZORInterfaceHandle<ProductIdentity> identity = inProduct;
+  if (identity.IsNull()) return {};
+  auto* const standing = new StandingProduct(identity->GetProduct(), rootFromProduct, inColour);
+  return ZORIProduct_var(standing->GetInterface());
+}
+
+PartColour MeanColourOf(const ZORIProduct_var& inProduct) {
+  const ZORI3DGeoVisu_var visualised = inProduct;
+  const auto* const rep =
+      visualised.IsNull() ? nullptr : dynamic_cast<const ZOR3DRep*>(visualised->GetRep());
+  double sums[4] = {}, count = 0;
+  const auto add = [&](const PartColour& inColour, double inCount) {
+    for (std::size_t i = 0; i < 4; ++i) sums[i] += inCount * inColour[i];
+    count += inCount;
+  };
+  for (const DrawnMesh& drawn : rep ? CollectDrawnMeshes(*rep) : std::vector<DrawnMesh>()) {
+    const PartMesh& mesh = *drawn.mesh;
+    if (drawn.isColourImposed || mesh.triangleColours.empty())
+      add(drawn.colour, static_cast<double>(mesh.triangles.size()));
+    else
+      for (const std::uint16_t own : mesh.triangleColours)
+        add(own < mesh.colours.size() ? mesh.colours[own] : drawn.colour, 1);
+  }
+  PartColour mean{210, 210, 210, 255};
+  if (count > 0)
+    for (std::size_t i = 0; i < 4; ++i) mean[i] = static_cast<std::uint8_t>(sums[i] / count + 0.5);
+  return mean;
 }
 
 }  // namespace ZORDefault

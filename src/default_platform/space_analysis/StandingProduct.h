@@ -2,18 +2,23 @@
 #ifndef ZOR_DEFAULT_PLATFORM_SPACE_ANALYSIS_STANDINGPRODUCT_H
 #define ZOR_DEFAULT_PLATFORM_SPACE_ANALYSIS_STANDINGPRODUCT_H
 
+#include "default_platform/visualisation/PartMesh.h"
 #include "platform/mathematics/ZORMathTransformation.h"
 #include "platform/product_structure/ZORIProduct.h"
 
 namespace ZORDefault {
 
-/// The same product with a representation of its own at another place. In all else it is the
+/// The same product with a representation of its own at a place of its own. In all else it is the
 /// model's product.
 /// @param inProduct       of an opened model.
 /// @param rootFromProduct where it stands.
+/// @param inColour        imposed on all of it; null: the model's colours.
 /// @return empty for a product that is none of an opened model.
 ZORIProduct_var StandAt(const ZORIProduct_var& inProduct,
-                        const ZORMathTransformation& rootFromProduct);
+                        const ZORMathTransformation& rootFromProduct, const PartColour* inColour);
+
+/// The mean colour in which a product is shown, by triangles.
+PartColour MeanColourOf(const ZORIProduct_var& inProduct);
 
 }  // namespace ZORDefault
 

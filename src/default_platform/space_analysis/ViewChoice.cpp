@@ -20,7 +20,7 @@ constexpr int kHeight = 84;
 /// to be content with the part that is framed.
 constexpr int kPlenty = 500;
 constexpr int kTooFew = 80;
-constexpr int kPlentyOfMarkers = 8;
+constexpr int kPlentyOfMarkers = 3;
 
 struct Destroyer {
   void operator()(ZORRep* inRep) const { inRep->Destroy(); }
@@ -57,57 +57,68 @@ const std::vector<ZORMathVector>& Directions() {
   return directions;
 }
 
+/// How many pixels show each product and the markers.
+struct SeenThings {
+  int products[2] = {0, 0};
+  int markers = 0;
+};
+
 class ViewTrial {
  public:
-  ViewTrial(const std::array<const ZOR3DRep*, 2>& inProducts,
-            const std::vector<ZORMathVector>& inPoints, bool inIsDimension)
-      : products_(inProducts), points_(inPoints), isDimension_(inIsDimension) {
+  ViewTrial(const ShownProducts& inProducts, const std::vector<ZORMathVector>& inPoints)
+      : products_(inProducts), points_(inPoints) {
     for (std::size_t i = 0; i < 2; ++i)
       meshCounts_[i] = products_[i] ? CollectDrawnMeshes(*products_[i]).size() : 0;
   }
 
-  /// How well both products are seen: pixels of the one that is seen less.
-  int Score(const ZORMathVector& inSight, const ZOR3DBoundingSphere& inFramed) const {
-    const ZORMathVector up = UpFor(inSight);
+  SeenThings See(const MarkerStyle& inStyle, const ZOR3DViewpoint& inViewpoint) const {
     const std::unique_ptr<InterferenceRep, Destroyer> markers(
-        new InterferenceRep(points_, {inFramed.radius, inSight, up, isDimension_}, inFramed));
+        new InterferenceRep(points_, inStyle, {}));
     const OwnBag scene(new ZOR3DBagRep);
     // The scene does not change what it shows.
     for (const ZOR3DRep* const product : products_) scene->AddChild(const_cast<ZOR3DRep*>(product));
     scene->AddChild(markers.get());
-    ZOR3DViewpoint viewpoint;
-    viewpoint.sight = inSight;
-    viewpoint.up = up;
-    viewpoint.Reframe(kWidth, kHeight, 1, 1, inFramed);
-    return ScoreOf(SeePixels(*scene, viewpoint, kWidth, kHeight));
+    return Count(SeePixels(*scene, inViewpoint, kWidth, kHeight));
   }
 
  private:
-  int ScoreOf(const std::optional<std::vector<SeenPixel>>& inPixels) const {
-    if (!inPixels) return 0;
-    int first = 0, second = 0, markers = 0;
+  SeenThings Count(const std::optional<std::vector<SeenPixel>>& inPixels) const {
+    SeenThings seen;
+    if (!inPixels) return seen;
     for (const SeenPixel& pixel : *inPixels) {
       if (pixel.mesh == SeenPixel::kNothing) continue;
       if (pixel.mesh < meshCounts_[0])
-        ++first;
+        ++seen.products[0];
       else if (pixel.mesh < meshCounts_[0] + meshCounts_[1])
-        ++second;
+        ++seen.products[1];
       else
-        ++markers;
+        ++seen.markers;
     }
-    const int products = std::min({first, second, kPlenty});
-    return markers >= kPlentyOfMarkers ? products : products / 4;
+    return seen;
   }
 
-  std::array<const ZOR3DRep*, 2> products_;
+  ShownProducts products_;
   const std::vector<ZORMathVector>& points_;
-  bool isDimension_;
   std::array<std::size_t, 2> meshCounts_{};
 };
 
+/// Pixels of the product that is seen less; hidden markers count against a direction.
+int ScoreOf(const SeenThings& inSeen) {
+  const int products = std::min({inSeen.products[0], inSeen.products[1], kPlenty});
+  return inSeen.markers >= kPlentyOfMarkers ? products : products / 2;
+}
+
+ZOR3DViewpoint Framing(const MarkerStyle& inStyle, const ZOR3DBoundingSphere& inFramed) {
+  ZOR3DViewpoint viewpoint;
+  viewpoint.sight = inStyle.sight;
+  viewpoint.up = inStyle.up;
+  viewpoint.Reframe(kWidth, kHeight, 1, 1, inFramed);
+  return viewpoint;
+}
+
 /// Radii to frame around the points, the preferred one first, the last one around all.
 std::vector<double> RadiiAround(const ZOR3DBoundingSphere& inPoints,
-                                const std::array<const ZOR3DRep*, 2>& inProducts) {
+                                const ShownProducts& inProducts) {
   double smallest = 0, all = 0;
   for (const ZOR3DRep* const product : inProducts) {
     if (!product) continue;
@@ -133,26 +144,46 @@ ZORMathVector UpFor(const ZORMathVector& inSight) {
   return Direction(axis - Dot(axis, inSight) * inSight, axis);
 }
 
-ChosenView ChooseView(const std::array<const ZOR3DRep*, 2>& inProducts,
-                      const std::vector<ZORMathVector>& inPoints, bool inIsDimension) {
+ChosenView ChooseView(const ShownProducts& inProducts, const std::vector<ZORMathVector>& inPoints,
+                      bool inIsDimension) {
   const ZOR3DBoundingSphere points = SphereOf(inPoints);
   const std::vector<double> radii = RadiiAround(points, inProducts);
-  ChosenView best{DefaultSight(), UpFor(DefaultSight()), {points.centre, radii.front()}};
+  const auto view = [&](const ZORMathVector& inSight, double inRadius) {
+    return ChosenView{{inRadius, inSight, UpFor(inSight), inIsDimension},
+                      {points.centre, inRadius}};
+  };
+  ChosenView best = view(DefaultSight(), radii.front());
   if (!inProducts[0] || !inProducts[1]) return best;
-  const ViewTrial trial(inProducts, inPoints, inIsDimension);
+  const ViewTrial trial(inProducts, inPoints);
   int bestScore = 0;
   for (const double radius : radii) {
     for (const ZORMathVector& sight : Directions()) {
-      const ZOR3DBoundingSphere framed(points.centre, radius);
-      const int score = trial.Score(sight, framed);
+      const ChosenView tried = view(sight, radius);
+      const int score = ScoreOf(trial.See(tried.markers, Framing(tried.markers, tried.framed)));
       if (score <= bestScore) continue;
       bestScore = score;
-      best = {sight, UpFor(sight), framed};
+      best = tried;
       if (score >= kPlenty) return best;
     }
-    if (bestScore >= kTooFew) return best;
+    if (bestScore >= kTooFew) break;
   }
+  LengthenPins(inProducts, inPoints, Framing(best.markers, best.framed), best.markers);
   return best;
+}
+
+void LengthenPins(const ShownProducts& inProducts, const std::vector<ZORMathVector>& inPoints,
+                  const ZOR3DViewpoint& inViewpoint, MarkerStyle& ioStyle) {
+  const ViewTrial trial(inProducts, inPoints);
+  int mostSeen = -1;
+  MarkerStyle tried = ioStyle;
+  for (const double length : {0.0, 0.4, 0.7, 1.0}) {
+    tried.pinLength = length;
+    const int seen = trial.See(tried, inViewpoint).markers;
+    if (seen <= mostSeen) continue;
+    mostSeen = seen;
+    ioStyle = tried;
+    if (seen >= kPlentyOfMarkers) return;
+  }
 }
 
 }  // namespace ZORDefault

@@ -5,14 +5,17 @@
 #include <array>
 #include <vector>
 
+#include "default_platform/space_analysis/InterferenceRep.h"
 #include "platform/visualisation/ZOR3DRep.h"
 #include "platform/visualisation/ZOR3DViewpoint.h"
 
 namespace ZORDefault {
 
+/// Representations, null where a product is missing.
+typedef std::array<const ZOR3DRep*, 2> ShownProducts;
+
 struct ChosenView {
-  ZORMathVector sight;         ///< unit
-  ZORMathVector up;            ///< unit, at a right angle to sight
+  MarkerStyle markers;
   ZOR3DBoundingSphere framed;  ///< around the interference, with something of its surroundings
 };
 
@@ -22,10 +25,14 @@ ZORMathVector UpFor(const ZORMathVector& inSight);
 /// Looks for a direction in which both products and the markers are seen when the interference is
 /// framed: the default one where that shows them well, else the best of those around; where a
 /// product is hidden from all, more of the surroundings is framed.
-/// @param inProducts representations, null where a product is missing.
-/// @param inPoints   at least one.
-ChosenView ChooseView(const std::array<const ZOR3DRep*, 2>& inProducts,
-                      const std::vector<ZORMathVector>& inPoints, bool inIsDimension);
+/// @param inPoints at least one.
+ChosenView ChooseView(const ShownProducts& inProducts, const std::vector<ZORMathVector>& inPoints,
+                      bool inIsDimension);
+
+/// Gives the markers pins as long as it takes to see them through a viewpoint. None are needed but
+/// with a near plane, which keeps markers from being drawn over all else.
+void LengthenPins(const ShownProducts& inProducts, const std::vector<ZORMathVector>& inPoints,
+                  const ZOR3DViewpoint& inViewpoint, MarkerStyle& ioStyle);
 
 }  // namespace ZORDefault
 
