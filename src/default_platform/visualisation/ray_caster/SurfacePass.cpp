@@ -45,7 +45,7 @@ void SurfacePass::CastTile(int inTile, Sample* outPixels) const {
 }
 
 void SurfacePass::CastBlock(const PictureBox& inBlock, Sample* outPixels) const {
-  PicturePoint points[DrawnScene::kPacket];
+  PicturePoint points[DrawnScene::kPacket] = {};  // a compiler cannot see that blocks are never empty
   Sample* targets[DrawnScene::kPacket];
   int count = 0;
   for (int y = inBlock.top; y < inBlock.bottom; ++y) {
