@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <limits>
+#include <thread>
 
 #include "default_platform/system/ObjectCounters.h"
 #include "default_platform/visualisation/Pictures.h"
@@ -110,6 +111,17 @@ TEST(ZORPrint3DRepImage, RasterizeWithSeveralThreadsGivesTheSameBytes) {
     const support::ScopedVariable variable("ZOR_PICTURE_THREADS", count);
     EXPECT_EQ(Draw(scene.Bag(), 200, 150).pixels, one.pixels) << count;
   }
+}
+
+TEST(ZORPrint3DRepImage, RasterizeOfOneSceneInSeveralThreadsAtOnceGivesTheSameBytes) {
+  MixedScene scene;
+  std::vector<Picture> drawn(4);
+  std::vector<std::thread> threads;
+  for (Picture& picture : drawn)
+    threads.emplace_back([&] { picture = Draw(scene.Bag(), 120, 90); });
+  for (std::thread& thread : threads) thread.join();
+  for (const Picture& picture : drawn) EXPECT_EQ(picture.pixels, drawn[0].pixels);
+  EXPECT_FALSE(drawn[0].pixels.empty());
 }
 
 TEST(ZORPrint3DRepImage, RasterizeFarFromTheOriginShowsTheSamePicture) {
