@@ -1,7 +1,9 @@
 #include "default_platform/space_analysis/Interference.h"
 
 #include <algorithm>
+#include <cstdlib>
 
+#include "default_platform/space_analysis/StandingProduct.h"
 #include "platform/space_analysis/ZORISiSubInterference.h"
 
 namespace ZORDefault {
@@ -81,6 +83,28 @@ const ZOR3DRep* RepOf(const ZORIProduct_var& inProduct) {
   return visualised.IsNull() ? nullptr : dynamic_cast<const ZOR3DRep*>(visualised->GetRep());
 }
 
+int Difference(const PartColour& inA, const PartColour& inB) {
+  int difference = 0;
+  for (std::size_t i = 0; i < 3; ++i) difference += std::abs(inA[i] - inB[i]);
+  return difference;
+}
+
+/// The first of these that stands out from both products, else the one that does so best.
+PartColour MarkerColourFor(const std::array<ZORIProduct_var, 2>& inProducts) {
+  constexpr PartColour kColours[] = {{255, 0, 140, 255}, {0, 190, 255, 255}, {255, 220, 0, 255}};
+  constexpr int kClear = 230;
+  PartColour best = kColours[0];
+  int most = -1;
+  for (const PartColour& colour : kColours) {
+    const int least = std::min(Difference(colour, MeanColourOf(inProducts[0])),
+                               Difference(colour, MeanColourOf(inProducts[1])));
+    if (least > most) best = colour;
+    most = std::max(most, least);
+    if (least >= kClear) break;
+  }
+  return best;
+}
+
 }  // namespace
 
 Interference::Interference(const InterferenceElement& inElement,
@@ -111,10 +135,11 @@ unsigned int Interference::ReleaseReference() {
 }
 
 const ChosenView& Interference::GetView() {
-  if (!view_)
-    view_ = element_.viewpoint ? StoredView()
-                               : ChooseView({RepOf(products_[0]), RepOf(products_[1])},
-                                            element_.points, element_.isClearance);
+  if (view_) return *view_;
+  view_ = element_.viewpoint ? StoredView()
+                             : ChooseView({RepOf(products_[0]), RepOf(products_[1])},
+                                          element_.points, element_.isClearance);
+  view_->markers.colour = MarkerColourFor(products_);
   return *view_;
 }
 

@@ -18,8 +18,6 @@ constexpr double kPinHead = 0.04;
 /// With more points than this they show the place by themselves.
 constexpr std::size_t kMostPins = 3;
 
-constexpr PartColour kMarkerColour = {255, 0, 140, 255};
-
 /// A needle from the point upwards and towards the eye, whose head stands out of the surfaces that
 /// hide the point.
 void AddPin(const ZORMathVector& inPoint, const MarkerStyle& inStyle, MarkerMesh& ioMesh) {
@@ -64,7 +62,7 @@ std::shared_ptr<const PartMesh> MakeMarkers(const std::vector<ZORMathVector>& in
 InterferenceRep::InterferenceRep(const std::vector<ZORMathVector>& inPoints,
                                  const MarkerStyle& inStyle, const ZOR3DBoundingSphere& inFramed)
     : markers_(new PlacedMeshRep(MakeMarkers(inPoints, inStyle), ZORMathTransformation(),
-                                 &kMarkerColour)),
+                                 &inStyle.colour)),
       framed_(inFramed) {
   markers_->SetInheritanceMode(kOwnColour | kImposeColour);
   markers_->SetDrawnOver(true);

@@ -16,7 +16,8 @@ struct MarkerStyle {
   ZORMathVector sight;       ///< unit
   ZORMathVector up;          ///< unit
   bool isDimension = false;  ///< a line with arrow heads joins the two points
-  double pinLength = 0;      ///< as a share of viewRadius; 0: without pins
+  PartColour colour{255, 0, 140, 255};
+  double pinLength = 0;  ///< as a share of viewRadius; 0: without pins
 };
 
 /// Markers at some points, drawn over all else, and the sphere to frame when the interference is shown alone: it holds

@@ -132,6 +132,17 @@ class StandingProduct final : public FacetedComponent, private CountedObject<Sta
   VisPropertiesFacet visProperties_;
 };
 
+std::optional<PartColour> ImposedColourOf(const ZORIVisProperties_var& inProperties) {
+  ZORVisPropertiesValues values;
+  unsigned int isImposed = 0, red = 0, green = 0, blue = 0;
+  if (inProperties.IsNull() || FAILED(inProperties->GetPropertiesAtt(values, 11, 5))) return {};
+  if (FAILED(values.GetInheritance(ZORVisPropertiesValues::kColour, isImposed)) || !isImposed ||
+      FAILED(values.GetColor(red, green, blue)))
+    return {};
+  return PartColour{static_cast<std::uint8_t>(red), static_cast<std::uint8_t>(green),
+                    static_cast<std::uint8_t>(blue), 255};
+}
+
 }  // namespace
 
 ZORIProduct_var StandAt(const ZORIProduct_var& inProduct,
@@ -143,6 +154,7 @@ ZORIProduct_var StandAt(const ZORIProduct_var& inProduct,
 }
 
 PartColour MeanColourOf(const ZORIProduct_var& inProduct) {
+  if (const auto imposed = ImposedColourOf(inProduct)) return *imposed;
   const ZORI3DGeoVisu_var visualised = inProduct;
   const auto* const rep =
       visualised.IsNull() ? nullptr : dynamic_cast<const ZOR3DRep*>(visualised->GetRep());

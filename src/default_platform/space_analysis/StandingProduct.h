@@ -17,7 +17,8 @@ namespace ZORDefault {
 ZORIProduct_var StandAt(const ZORIProduct_var& inProduct,
                         const ZORMathTransformation& rootFromProduct, const PartColour* inColour);
 
-/// The mean colour in which a product is shown, by triangles.
+/// The colour that is imposed on a product, else the mean of those in which it is shown, by
+/// triangles.
 PartColour MeanColourOf(const ZORIProduct_var& inProduct);
 
 }  // namespace ZORDefault

@@ -1,0 +1,187 @@
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <memory>
+
+#include "default_platform/space_analysis/Assembly.h"
+#include "default_platform/system/ObjectCounters.h"
+#include "default_platform/visualisation/DrawnMesh.h"
+#include "default_platform/visualisation/PictureDrawing.h"
+#include "platform/space_analysis/ZORISiSubInterference.h"
+#include "platform/visualisation/ZOR3DBagRep.h"
+#include "support/ScopedVariable.h"
+
+namespace {
+
+using assembly::NutAndRod;
+using assembly::RepOf;
+using ZORDefault::InterferenceScene;
+
+constexpr char kTwoPoints[] = "<Point Ux='178' Uy='75' Uz='65'/><Point Ux='178' Uy='75' Uz='55'/>";
+constexpr char kStored[] =
+    "<Point Ux='1' Uy='2' Uz='3'/>"
+    "<Viewpoint FocusDistance='200' NearPlane='30' FarPlane='2000' ProjectionType='Cylindrique'>"
+    "<Point Ux='10,5' Uy='20' Uz='30'/>"
+    "<Vector CorrespondingData='Sight' Vx='0' Vy='2' Vz='0'/></Viewpoint>";
+
+struct Destroyer {
+  void operator()(ZORRep* inRep) const { inRep->Destroy(); }
+};
+typedef std::unique_ptr<ZOR3DRep, Destroyer> OwnRep;
+
+std::size_t TrianglesOf(const InterferenceScene& inScene) {
+  const OwnRep rep(RepOf(inScene.interference));
+  return rep ? ZORDefault::CollectDrawnMeshes(*rep).front().mesh->triangles.size() : 0;
+}
+
+TEST(Interference, ElementsAreThePointsThatDiffer) {
+  EXPECT_EQ(
+      1,
+      NutAndRod(std::string(assembly::kPoint) + assembly::kPoint).interference->GetElementCount());
+  EXPECT_EQ(2, NutAndRod(kTwoPoints).interference->GetElementCount());
+  EXPECT_EQ(0, NutAndRod("").interference->GetElementCount());
+}
+
+TEST(Interference, GeometryHoldsTheCoordinates) {
+  const auto scene = NutAndRod("<Point Ux='1,5' Uy='2' Uz='-3e1'/>");
+  const std::unique_ptr<double[]> geometry(scene.interference->GetGeometricResult());
+  ASSERT_TRUE(geometry);
+  EXPECT_EQ(1.5, geometry[0]);
+  EXPECT_EQ(2, geometry[1]);
+  EXPECT_EQ(-30, geometry[2]);
+}
+
+TEST(Interference, PointWithoutANumberIsNone) {
+  const auto scene = NutAndRod("<Point Ux='1' Uy='' Uz='3'/><Point Ux='1' Uy='nan' Uz='3'/>");
+  EXPECT_EQ(nullptr, scene.interference->GetGeometricResult());
+  EXPECT_EQ(0, scene.interference->GetElementCount());
+}
+
+TEST(Interference, WithoutPointsThereIsNothingToShow) {
+  const auto scene = NutAndRod("");
+  EXPECT_EQ(nullptr, scene.interference->GetGeometricResult());
+  EXPECT_EQ(nullptr, RepOf(scene.interference));
+  ZOR3DViewpoint viewpoint;
+  EXPECT_NE(1, scene.interference->FillViewpoint(&viewpoint));
+}
+
+TEST(Interference, FlagsSayWhichElementsAreShown) {
+  const auto scene = NutAndRod(kTwoPoints);
+  const std::unique_ptr<int[]> flags(scene.interference->GetFlags());
+  EXPECT_EQ(1, flags[0]);
+  EXPECT_EQ(1, flags[2]);
+  const std::size_t both = TrianglesOf(scene);
+  flags[1] = 0;
+  scene.interference->SetFlags(flags.get());
+  EXPECT_EQ(both, 2 * TrianglesOf(scene));
+  flags[2] = 0;  // that of the interference as a whole
+  scene.interference->SetFlags(flags.get());
+  EXPECT_EQ(0u, TrianglesOf(scene));
+  scene.interference->SetFlags(nullptr);
+  EXPECT_EQ(0u, TrianglesOf(scene));
+}
+
+TEST(Interference, RepresentationIsANewOneEachTime) {
+  const auto scene = NutAndRod();
+  const ZORDefault::ObjectCounts before = ZORDefault::CountsOf("InterferenceRep");
+  { const OwnRep first(RepOf(scene.interference)), second(RepOf(scene.interference)); }
+  const ZORDefault::ObjectCounts after = ZORDefault::CountsOf("InterferenceRep");
+  EXPECT_EQ(after.built - before.built, after.released - before.released);
+  EXPECT_GE(after.built - before.built, 2);
+}
+
+TEST(Interference, ClearanceOfTwoPointsHasADimensionLineInAnyLanguage) {
+  const std::size_t balls = TrianglesOf(NutAndRod(kTwoPoints));
+  for (const char* const word : {"Clearance", "Jeu", "Abstand", "Gioco", "Holgura", "クリアランス"})
+    EXPECT_NE(balls, TrianglesOf(NutAndRod(kTwoPoints, word))) << word;
+  EXPECT_EQ(balls, TrianglesOf(NutAndRod(kTwoPoints, "Clash")));
+}
+
+TEST(Interference, MarkersAreDrawnOverProducts) {
+  const auto scene = NutAndRod();
+  const OwnRep rep(RepOf(scene.interference));
+  EXPECT_TRUE(ZORDefault::CollectDrawnMeshes(*rep).front().isDrawnOver);
+}
+
+TEST(Interference, StoredViewpointIsFilledIn) {
+  const auto scene = NutAndRod(kStored);
+  ZOR3DViewpoint viewpoint;
+  ASSERT_EQ(1, scene.interference->FillViewpoint(&viewpoint));
+  EXPECT_EQ(ZOR3DViewpoint::kCylindric, viewpoint.projection);
+  EXPECT_EQ(10.5, viewpoint.origin.x);
+  EXPECT_EQ(1, viewpoint.sight.y);
+  EXPECT_EQ(1, viewpoint.up.z);
+  EXPECT_EQ(200, viewpoint.focusDistance);
+  EXPECT_EQ(30, viewpoint.nearPlane);
+  EXPECT_EQ(2000, viewpoint.farPlane);
+  EXPECT_NEAR(2 * 200 * std::tan(viewpoint.viewAngle / 2), viewpoint.viewHeight, 1e-9);
+}
+
+TEST(Interference, SightStraightDownHasAnotherUp) {
+  std::string text = kStored;
+  text.replace(text.find("Vy='2' Vz='0'"), 13, "Vy='0' Vz='-1'");
+  ZOR3DViewpoint viewpoint;
+  ASSERT_EQ(1, NutAndRod(text).interference->FillViewpoint(&viewpoint));
+  EXPECT_EQ(1, viewpoint.up.y);
+}
+
+TEST(Interference, ViewpointWithoutSightOrPointIsNone) {
+  std::string withoutSight = kStored;
+  withoutSight.replace(withoutSight.find("Vy='2'"), 6, "Vy='0'");
+  std::string withoutPoint = kStored;
+  withoutPoint.replace(withoutPoint.find("Uy='20'"), 7, "");
+  ZOR3DViewpoint viewpoint;
+  EXPECT_NE(1, NutAndRod(withoutSight).interference->FillViewpoint(&viewpoint));
+  EXPECT_NE(1, NutAndRod(withoutPoint).interference->FillViewpoint(&viewpoint));
+}
+
+TEST(Interference, NearPlaneRightBeforeTheEyeOfAConicViewIsLeftOut) {
+  std::string text = kStored;
+  text.replace(text.find("Cylindrique"), 11, "Conique");
+  ZOR3DViewpoint viewpoint;
+  ASSERT_EQ(1, NutAndRod(text).interference->FillViewpoint(&viewpoint));
+  EXPECT_EQ(30, viewpoint.nearPlane);
+  text.replace(text.find("NearPlane='30'"), 14, "NearPlane='1'");
+  ASSERT_EQ(1, NutAndRod(text).interference->FillViewpoint(&viewpoint));
+  EXPECT_EQ(0, viewpoint.nearPlane);
+}
+
+TEST(Interference, SubInterferencesAreClosePicturesOfThePoints) {
+  const auto scene = NutAndRod(kTwoPoints);
+  ZORListValZORISpecObject_var list;
+  scene.interference->GetSubInterferences(list);
+  ASSERT_EQ(2, list.Size());
+  EXPECT_EQ(2, scene.interference->GetSubInterferenceCount());
+  ZOR3DViewpoint first, second;
+  EXPECT_NE(0, ZORISiSubInterference_var(list[1])->FillViewpoint(&first));
+  EXPECT_NE(0, ZORISiSubInterference_var(list[2])->FillViewpoint(&second));
+  EXPECT_NEAR(10, first.origin.z - second.origin.z, 1e-9);
+  EXPECT_NEAR(0, first.origin.x - second.origin.x, 1e-9);
+}
+
+TEST(Interference, SubInterferenceKnowsAndKeepsItsFather) {
+  const ZORDefault::ObjectCounts before = ZORDefault::CountsOf("Interference");
+  ZORListValZORISpecObject_var list;
+  NutAndRod().interference->GetSubInterferences(list);
+  EXPECT_EQ(before.released, ZORDefault::CountsOf("Interference").released);
+  ZORISpecObject* const father = list[1]->GetFather();
+  ASSERT_NE(nullptr, father);
+  EXPECT_FALSE(ZORISiInterference_var(ZORISpecObject_var(father)).IsNull());
+  father->Release();
+  list.RemoveAll();
+  EXPECT_EQ(before.released + 1, ZORDefault::CountsOf("Interference").released);
+}
+
+TEST(Interference, WithoutProductsItIsFramedFromTheDefaultDirection) {
+  const auto scene = ZORDefault::MakeInterferenceScene(
+      assembly::Root(), assembly::Interference(assembly::GeometryText(assembly::kPoint)),
+      std::nullopt);
+  ZOR3DViewpoint usual, viewpoint;
+  EXPECT_NE(1, scene.interference->FillViewpoint(&viewpoint));
+  EXPECT_NEAR(usual.sight.x, viewpoint.sight.x, 1e-12);
+  const OwnRep rep(RepOf(scene.interference));
+  EXPECT_NEAR(178, rep->GetShowBoundingElement().centre.x, 1e-9);
+  EXPECT_GT(rep->GetShowBoundingElement().radius, 0);
+}
+
+}  // namespace
