@@ -5,7 +5,9 @@
 #include <limits>
 #include <random>
 
+#include "default_platform/OpenModel.h"
 #include "default_platform/visualisation/PictureDrawing.h"
+#include "platform/visualisation/ZORI3DGeoVisu.h"
 #include "support/MeshScenes.h"
 
 namespace {
@@ -128,11 +130,11 @@ void Fill(MeshScene& ioScene, double inOffset) {
 
 /// Where a ray passes within a hair of a border, or two meshes lie at one depth, either answer is
 /// right; elsewhere the answers must agree.
-void CompareSampled(const MeshScene& inScene, const ZOR3DViewpoint& inViewpoint, int inCount) {
+void CompareSampled(const ZOR3DRep& inRep, const ZOR3DViewpoint& inViewpoint, int inCount) {
   constexpr double kHair = 1e-4, kDepthShare = 5e-5;
   const PictureRequest request =
-      ZORDefault::MakePictureRequest(*inScene.Bag(), inViewpoint, kWidth, kHeight, nullptr);
-  const auto seen = ZORDefault::SeePixels(*inScene.Bag(), inViewpoint, kWidth, kHeight);
+      ZORDefault::MakePictureRequest(inRep, inViewpoint, kWidth, kHeight, nullptr);
+  const auto seen = ZORDefault::SeePixels(inRep, inViewpoint, kWidth, kHeight);
   ASSERT_TRUE(seen);
   const std::vector<Triangle> triangles = AllTriangles(request);
   std::mt19937 random(11);
@@ -155,29 +157,39 @@ void CompareSampled(const MeshScene& inScene, const ZOR3DViewpoint& inViewpoint,
   EXPECT_GT(hits, inCount / 5);
 }
 
-ZOR3DViewpoint Framing(const MeshScene& inScene, ZOR3DViewpoint::Projection inProjection) {
+ZOR3DViewpoint Framing(const ZOR3DRep& inRep, ZOR3DViewpoint::Projection inProjection) {
   ZOR3DViewpoint viewpoint;
   viewpoint.projection = inProjection;
-  viewpoint.Reframe(kWidth, kHeight, 1.6F, 1.6F, inScene.Bag()->GetShowBoundingElement());
+  viewpoint.Reframe(kWidth, kHeight, 1.6F, 1.6F, inRep.GetShowBoundingElement());
   return viewpoint;
 }
 
 TEST(SeenPixels, ConicViewAgreesWithAllTriangles) {
   MeshScene scene;
   Fill(scene, 0);
-  CompareSampled(scene, Framing(scene, ZOR3DViewpoint::kConic), 10000);
+  CompareSampled(*scene.Bag(), Framing(*scene.Bag(), ZOR3DViewpoint::kConic), 10000);
 }
 
 TEST(SeenPixels, CylindricViewAgreesWithAllTriangles) {
   MeshScene scene;
   Fill(scene, 0);
-  CompareSampled(scene, Framing(scene, ZOR3DViewpoint::kCylindric), 10000);
+  CompareSampled(*scene.Bag(), Framing(*scene.Bag(), ZOR3DViewpoint::kCylindric), 10000);
 }
 
 TEST(SeenPixels, FarFromTheOriginAgreesWithAllTriangles) {
   MeshScene scene;
   Fill(scene, 1e7);
-  CompareSampled(scene, Framing(scene, ZOR3DViewpoint::kConic), 10000);
+  CompareSampled(*scene.Bag(), Framing(*scene.Bag(), ZOR3DViewpoint::kConic), 10000);
+}
+
+TEST(SeenPixels, ModelAgreesWithAllTriangles) {
+  ZORDefault::ModelOptions options;
+  options.useCache = false;
+  const auto model =
+      ZORDefault::OpenModel(std::string(ZOR_SOURCE_DIR) + "/samples/as1-oc-214.stp", options);
+  const ZORI3DGeoVisu_var shown = model.root;
+  const auto& rep = dynamic_cast<const ZOR3DRep&>(*shown->GetRep());
+  CompareSampled(rep, Framing(rep, ZOR3DViewpoint::kConic), 10000);
 }
 
 TEST(SeenPixels, DepthOfWhatIsDrawnOverIsItsReal) {
