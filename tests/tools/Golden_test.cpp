@@ -28,6 +28,7 @@ std::vector<GoldenCase> Cases() {
       {"help_federate", {"federate", "--help"}},
       {"help_links", {"links", "--help"}},
       {"help_report", {"report", "--help"}},
+      {"help_publish", {"publish", "--help"}},
       {"help_tree", {"tree", "--help"}},
       {"help_render", {"render", "--help"}},
       {"help_path", {"path", "--help"}},

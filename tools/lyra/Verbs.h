@@ -32,6 +32,7 @@ VerbAction DeclareConvert(Arguments& ioArguments);
 VerbAction DeclareMerge(Arguments& ioArguments);
 VerbAction DeclareFederate(Arguments& ioArguments);
 VerbAction DeclareReport(Arguments& ioArguments);
+VerbAction DeclarePublish(Arguments& ioArguments);
 VerbAction DeclareTree(Arguments& ioArguments);
 VerbAction DeclareRender(Arguments& ioArguments);
 VerbAction DeclarePath(Arguments& ioArguments);

@@ -1,0 +1,406 @@
+// Publications: pages that hold everything and nothing dangerous, pictures that are whole.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <regex>
+
+#include "lyra/publish/DrawingProgress.h"
+#include "tools/Command.h"
+
+using testing::EndsWith;
+using testing::HasSubstr;
+using testing::Not;
+using testing::StartsWith;
+
+namespace fs = std::filesystem;
+
+namespace {
+
+const std::string kResult = "samples/as1.clash.xml";
+const std::string kModel = "samples/as1-oc-214.stp";
+constexpr const char* kStyleSheetStart =
+    "<xsl:stylesheet version='1.0' xmlns:xsl='http://www.w3.org/1999/XSL/Transform'"
+    " xmlns:page='urn:zorlyra:page'>";
+
+std::size_t Occurrences(const std::string& inText, const std::string& inPart) {
+  std::size_t count = 0;
+  for (auto at = inText.find(inPart); at != std::string::npos; at = inText.find(inPart, at + 1))
+    ++count;
+  return count;
+}
+
+std::string InOneSet(const std::string& inInterferences) {
+  return "<ClashElement Version='1.2' ZORDocument='d'><ClashResult Name='r' NbInterf='1'>" +
+         inInterferences + "</ClashResult></ClashElement>";
+}
+
+class Publish : public testing::Test {
+ protected:
+  CommandResult Run(std::vector<std::string> inArguments, const std::string& inInput = {}) {
+    inArguments.insert(inArguments.begin(), {"publish", "-o", folder_});
+    return RunCommand(inArguments, inInput);
+  }
+  CommandResult RunSmall(std::vector<std::string> inMore = {}) {
+    inMore.insert(inMore.end(), {kResult, "--model", kModel, "--size", "90x60"});
+    return Run(inMore);
+  }
+  /// The page of a document; fails the test when there is none.
+  std::string PageOf(const std::string& inDocument) {
+    const CommandResult result = Run({"-"}, inDocument);
+    EXPECT_EQ(result.code, 0) << result.error;
+    return Page();
+  }
+  std::string Page() const { return ReadFile(folder_ + "/index.html"); }
+  std::string Report() const { return ReadFile(folder_ + "/report.xml"); }
+  std::string Picture(const std::string& inName) const { return folder_ + "/pictures/" + inName; }
+  CommandResult RunWithStyleSheet(const std::string& inTemplates) {
+    return Run({kResult, "--xsl",
+                directory_.Write("own.xsl", kStyleSheetStart + inTemplates + "</xsl:stylesheet>")});
+  }
+
+  TemporaryDirectory directory_;
+  std::string folder_ = directory_.Path("out");
+};
+
+}  // namespace
+
+TEST_F(Publish, PageHasARowAndASectionForEachInterference) {
+  const CommandResult result = Run({kResult});
+  EXPECT_EQ(result.code, 0) << result.error;
+  EXPECT_EQ(result.out, folder_ + "/index.html: 32 interferences, 0 with a picture\n");
+  EXPECT_EQ(Occurrences(Page(), "<tr data-n="), 32u);
+  EXPECT_EQ(Occurrences(Page(), "<section id="), 32u);
+  EXPECT_THAT(Page(), StartsWith("<!DOCTYPE html"));
+}
+
+TEST_F(Publish, PageStandsAlone) {
+  Run({kResult});
+  const std::string page = Page();
+  const std::regex reference("(src|href)=\"([^\"#][^\"]*)\"");
+  for (std::sregex_iterator found(page.begin(), page.end(), reference), end; found != end; ++found)
+    EXPECT_EQ((*found)[2], "data:,");
+  EXPECT_THAT(page, Not(HasSubstr("@import")));
+  EXPECT_THAT(page, Not(HasSubstr("url(")));
+  EXPECT_THAT(page, Not(HasSubstr("xmlns:")));
+}
+
+TEST_F(Publish, SummaryCountsTypesAndStatuses) {
+  const std::string page =
+      PageOf(InOneSet("<Interference ResultType='Clash' Status='Relevant'/>"
+                      "<Interference ResultType='Clash' Status='Relevant'/>"
+                      "<Interference ResultType='Contact'/>"));
+  EXPECT_THAT(page, HasSubstr("<span class=\"clash\" style=\"flex-grow:2\">"));
+  EXPECT_THAT(page, HasSubstr("<strong>1</strong> <bdi>Contact</bdi>"));
+  EXPECT_THAT(page, HasSubstr("<strong>2</strong> <bdi>Relevant</bdi>"));
+  EXPECT_THAT(page, HasSubstr("<strong>1</strong> <bdi>Not stated</bdi>"));
+}
+
+TEST_F(Publish, ResultWithoutInterferencesHasAPage) {
+  EXPECT_THAT(PageOf("<ClashElement ZORDocument='empty'/>"),
+              HasSubstr("There is no interference to show."));
+}
+
+TEST_F(Publish, SingleInterferenceDocumentHasAPage) {
+  EXPECT_EQ(Run({"tests/golden/inputs/single.xml"}).code, 0);
+  EXPECT_EQ(Occurrences(Page(), "<section id="), 1u);
+}
+
+TEST_F(Publish, ReportLiesWithItsStyleSheetAndType) {
+  Run({kResult});
+  EXPECT_THAT(Report(), HasSubstr("href=\"clash-report.xsl\""));
+  EXPECT_EQ(RunShell("cd " + folder_ + " && xmllint --nonet --noout --valid report.xml").error, "");
+  EXPECT_EQ(ReadFile(folder_ + "/clash-report.xsl"),
+            ReadFile(ZOR_SOURCE_DIR "/resources/clash-report.xsl"));
+}
+
+TEST_F(Publish, ComponentListIsRefused) {
+  EXPECT_EQ(Run({"tests/golden/inputs/components.xml"}).code, 1);
+  EXPECT_FALSE(fs::exists(folder_));
+}
+
+TEST_F(Publish, FolderThatCannotBeMadeIsRefused) {
+  directory_.Write("out", "a file");
+  const CommandResult result = Run({kResult});
+  EXPECT_EQ(result.code, 1);
+  EXPECT_THAT(result.error, StartsWith("lyra: " + folder_ + ": "));
+}
+
+TEST_F(Publish, WrongWordsAreWrongUsage) {
+  for (const char* option :
+       {"--only=type", "--only=kind=clash", "--only=type=crash", "--only=result=a,result=b",
+        "--size=0x1", "--format=gif", "--zoom=far", "--jobs=0", "--jobs=257"})
+    EXPECT_EQ(Run({kResult, option}).code, 2) << option;
+}
+
+// Hostile documents
+
+TEST_F(Publish, MarkupInEveryFieldIsText) {
+  const std::string evil = "&quot;&apos;&gt;&lt;/bdi&gt;&lt;script&gt;evil()&lt;/script&gt;";
+  const auto with = [&](const std::string& inNames) {
+    std::string attributes;
+    for (std::size_t at = 0; at < inNames.size();) {
+      const std::size_t end = std::min(inNames.find(' ', at), inNames.size());
+      attributes += " " + inNames.substr(at, end - at) + "=\"" + evil + "\"";
+      at = end + 1;
+    }
+    return attributes;
+  };
+  const std::string page =
+      PageOf("<ClashElement Version='1.2'" + with("ZORDocument Responsible PRCName") + "><Date" +
+             with("Day Month Year") + "/><ClashSpec" + with("Name Type Clearance") +
+             "/><ClashResult" + with("Name ComputationCase") + "><Interference" +
+             with("Name Value ResultType Status DistanceClearance RetrieveInf") + "><ViolatedRule" +
+             with("Name Severity Clearance") + "/><Product" +
+             with("DescriptionID Alias ShapeName Preview") + "/><Product" + with("DescriptionID") +
+             "/><GeometricAspect" + with("IntersectCurveLength ExtractOrDistValue") + "><Point" +
+             with("Ux Uy Uz") + "/></GeometricAspect><Comment" + with("Value") + "/><Picture" +
+             with("HRef") + "/></Interference></ClashResult></ClashElement>");
+  EXPECT_EQ(Occurrences(page, "<script"), 1u);
+  EXPECT_EQ(Occurrences(page, "<script>evil"), 0u);
+  EXPECT_GT(Occurrences(page, "&lt;script&gt;evil()"), 15u);
+  EXPECT_EQ(Occurrences(page, "=\"\"'>"), 0u);
+}
+
+TEST_F(Publish, DirectionsAreNeverTurned) {
+  const std::string page =
+      PageOf(InOneSet("<Interference><Product Alias='a&#x202e;gnp.exe'/>"
+                      "<Product Alias='&#x2066;b'/></Interference>"));
+  EXPECT_THAT(page, HasSubstr("<bdi>a\\u{202E}gnp.exe</bdi>"));
+  EXPECT_THAT(page, HasSubstr("<bdi>\\u{2066}b</bdi>"));
+  EXPECT_THAT(Report(), HasSubstr("a\u202egnp.exe"));
+}
+
+TEST_F(Publish, LongCommentIsCutInTheTableAlone) {
+  const std::string comment(1 << 20, 'x');
+  const std::string page =
+      PageOf(InOneSet("<Interference><Comment Value='" + comment + "'/></Interference>"));
+  EXPECT_EQ(Occurrences(page, comment), 1u);
+  EXPECT_THAT(page, HasSubstr("<bdi>" + std::string(120, 'x') + "</bdi>…"));
+}
+
+TEST_F(Publish, ManyPointsAreCounted) {
+  std::string points;
+  for (int i = 0; i < 10000; ++i) points += "<Point Ux='" + std::to_string(i) + "' Uy='1' Uz='2'/>";
+  const std::string page = PageOf(
+      InOneSet("<Interference><GeometricAspect>" + points + "</GeometricAspect></Interference>"));
+  EXPECT_THAT(page, HasSubstr("10000 points"));
+  EXPECT_THAT(page, HasSubstr("The other 9900 are in report.xml."));
+  EXPECT_EQ(Occurrences(page, "<li><bdi>"), 100u);
+}
+
+TEST_F(Publish, InterferencesWithoutProductsAreShown) {
+  const std::string page = PageOf(
+      InOneSet("<Interference Name='a'/><Interference><Product Alias='one'/></Interference>"));
+  EXPECT_THAT(page, HasSubstr("The document names no product."));
+  EXPECT_EQ(Occurrences(page, "<bdi>one</bdi>"), 2u);
+}
+
+TEST_F(Publish, PicturesOutsideAreNeverReferredTo) {
+  const std::string page =
+      PageOf(InOneSet("<Interference><Product Alias='a' Preview='../../b.jpg'/>"
+                      "<Picture HRef='../../../etc/passwd'/><Picture HRef='file:///x'/>"
+                      "</Interference>"));
+  for (const std::string& text : {page, Report()}) {
+    EXPECT_THAT(text, Not(HasSubstr("../")));
+    EXPECT_THAT(text, Not(HasSubstr("file:///")));
+  }
+}
+
+TEST_F(Publish, FiveThousandInterferencesMakeAPage) {
+  std::string all;
+  for (int i = 0; i < 5000; ++i)
+    all += "<Interference Name='i" + std::to_string(i) + "' ResultType='Clash'/>";
+  EXPECT_EQ(Occurrences(PageOf(InOneSet(all)), "<tr data-n="), 5000u);
+}
+
+// Pictures
+
+TEST_F(Publish, EachInterferenceHasItsPictureAndItsPreviews) {
+  const CommandResult result = RunSmall();
+  ASSERT_EQ(result.code, 0) << result.error;
+  EXPECT_EQ(result.error, "");
+  EXPECT_THAT(result.out, EndsWith("32 interferences, 32 with a picture\n"));
+  for (const char* name : {"interference_1.jpg", "interference_32.jpg",
+                           "interference_7_product_1.jpg", "interference_7_product_2.jpg"}) {
+    EXPECT_EQ(ReadFile(Picture(name)).substr(0, 2), "\xFF\xD8") << name;
+    EXPECT_THAT(Page(), HasSubstr(std::string("src=\"pictures/") + name + "\"")) << name;
+  }
+  EXPECT_THAT(Report(), HasSubstr("<Picture HRef=\"pictures/interference_32.jpg\""));
+  EXPECT_THAT(Report(), HasSubstr("Preview=\"pictures/interference_32_product_2.jpg\""));
+  EXPECT_EQ(Occurrences(Page(), "class=\"swatch\" style=\"background:#"), 4 * 32u);
+}
+
+TEST_F(Publish, FormatAndSizeAreAsAsked) {
+  ASSERT_EQ(Run({kResult, "--model", kModel, "--only", "product=plate", "--format", "png", "--size",
+                 "31x23"})
+                .code,
+            0);
+  const auto picture = fs::directory_iterator(folder_ + "/pictures");
+  std::string bytes;
+  for (const fs::directory_entry& entry : picture)
+    if (entry.path().extension() == ".png" &&
+        entry.path().string().find("product") == std::string::npos)
+      bytes = ReadFile(entry.path().string());
+  EXPECT_EQ(bytes.substr(1, 3), "PNG");
+  EXPECT_EQ(bytes.substr(16, 8), std::string("\0\0\0\x1F\0\0\0\x17", 8));
+}
+
+TEST_F(Publish, ZoomFramesTheProductsToo) {
+  ASSERT_EQ(RunSmall({"--zoom", "interference"}).code, 0);
+  const std::string close = ReadFile(Picture("interference_1.jpg"));
+  ASSERT_EQ(RunSmall({"--zoom", "products"}).code, 0);
+  EXPECT_NE(ReadFile(Picture("interference_1.jpg")), close);
+}
+
+TEST_F(Publish, SeveralProcessesDrawTheSameBytes) {
+  ASSERT_EQ(RunSmall({"--jobs", "1"}).code, 0);
+  const std::string one = directory_.Path("one");
+  fs::rename(folder_, one);
+  ASSERT_EQ(RunSmall({"--jobs", "3"}).code, 0);
+  const CommandResult difference = RunShell("diff -r " + one + " " + folder_);
+  EXPECT_EQ(difference.code, 0) << difference.out;
+}
+
+TEST_F(Publish, ResumeDrawsOnlyWhatIsNotThere) {
+  ASSERT_EQ(RunSmall().code, 0);
+  const std::string drawn = ReadFile(Picture("interference_5.jpg"));
+  fs::remove(Picture("interference_5.jpg"));
+  directory_.Write("out/pictures/interference_6.jpg", "kept");
+  ASSERT_EQ(RunSmall({"--resume"}).code, 0);
+  EXPECT_EQ(ReadFile(Picture("interference_5.jpg")), drawn);
+  EXPECT_EQ(ReadFile(Picture("interference_6.jpg")), "kept");
+}
+
+TEST_F(Publish, ResumeOfOtherPicturesDrawsAll) {
+  ASSERT_EQ(RunSmall().code, 0);
+  directory_.Write("out/pictures/interference_6.jpg", "stale");
+  const CommandResult result = RunSmall({"--resume", "--format", "jpeg", "--zoom", "products"});
+  EXPECT_EQ(result.error,
+            "lyra: warning: the pictures that are there show something else: all are drawn\n");
+  EXPECT_NE(ReadFile(Picture("interference_6.jpg")), "stale");
+}
+
+TEST_F(Publish, WithoutResumeAllIsDrawnAnew) {
+  ASSERT_EQ(RunSmall().code, 0);
+  directory_.Write("out/pictures/interference_6.jpg", "stale");
+  directory_.Write("out/pictures/mine.jpg", "mine");
+  ASSERT_EQ(RunSmall().code, 0);
+  EXPECT_NE(ReadFile(Picture("interference_6.jpg")), "stale");
+  EXPECT_EQ(ReadFile(Picture("mine.jpg")), "mine");
+}
+
+TEST_F(Publish, KilledRunGoesOn) {
+  ASSERT_EQ(RunSmall().code, 0);
+  const std::string whole = directory_.Path("whole");
+  fs::rename(folder_, whole);
+  // Ended as soon as the first picture is there.
+  RunShell("$LYRA publish --jobs 1 --model " + kModel + " --size 90x60 -o " + folder_ + " " +
+           kResult + " & for i in {1..1000}; do ls " + folder_ +
+           "/pictures/*.jpg && break; sleep 0.01; done; kill -9 $!");
+  EXPECT_EQ(RunSmall({"--resume"}).code, 0);
+  const CommandResult difference = RunShell("diff -r -x '.picture-*' " + whole + " " + folder_);
+  EXPECT_EQ(difference.code, 0) << difference.out;
+}
+
+TEST_F(Publish, ProductsThatTheModelLacksAreMarkedAndCounted) {
+  const CommandResult result =
+      Run({"-", "--model", kModel, "--size", "60x40"},
+          InOneSet("<Interference><Product DescriptionID='plate_1' Alias='plate_1'/>"
+                   "<Product DescriptionID='gone'/></Interference>"
+                   "<Interference><Product DescriptionID='gone'/><Product DescriptionID='lost'/>"
+                   "</Interference>"));
+  EXPECT_EQ(result.code, 0);
+  EXPECT_THAT(result.error, HasSubstr("the model lacks 2 products of 2 interferences: \"gone\", "
+                                      "\"lost\"\n"));
+  EXPECT_THAT(result.out, EndsWith("2 interferences, 1 with a picture\n"));
+  EXPECT_THAT(Page(), HasSubstr("<strong>2</strong> of 2 interferences name a product"));
+  EXPECT_EQ(Occurrences(Page(), "</bdi> <span class=\"missing\">") +
+                Occurrences(Page(), "</strong> <span class=\"missing\">"),
+            6u);
+}
+
+TEST_F(Publish, OnlySomeKeepTheirNumbers) {
+  ASSERT_EQ(Run({"tests/golden/inputs/two_sets.xml", "--only", "type=contact"}).code, 0);
+  EXPECT_EQ(Occurrences(Page(), "<tr data-n="), 1u);
+  EXPECT_THAT(Page(), HasSubstr("<section id=\"i2\""));
+  EXPECT_THAT(Report(), HasSubstr("NbInterf=\"1\""));
+  EXPECT_THAT(Report(), HasSubstr("NbInterf=\"0\""));
+}
+
+// Style sheets
+
+TEST_F(Publish, OwnStyleSheetMakesThePage) {
+  const CommandResult result = RunWithStyleSheet(
+      "<xsl:output method='text'/><xsl:template match='/'>"
+      "<xsl:value-of select='count(//Interference[@page:number])'/></xsl:template>");
+  EXPECT_EQ(result.code, 0) << result.error;
+  EXPECT_EQ(Page(), "32");
+  EXPECT_THAT(Report(), HasSubstr("href=\"own.xsl\""));
+  EXPECT_TRUE(fs::exists(folder_ + "/own.xsl"));
+}
+
+TEST_F(Publish, StyleSheetComesFromTheSettings) {
+  directory_.Write("house.xsl", std::string(kStyleSheetStart) +
+                                    "<xsl:output method='text'/><xsl:template match='/'>house"
+                                    "</xsl:template></xsl:stylesheet>");
+  directory_.Write("ClashPublish.toml", "XslTemplate = \"" + directory_.Path("house.xsl") + "\"\n");
+  const CommandResult result = RunShell("ZOR_SETTINGS_PATH=" + directory_.Path("") +
+                                        " $LYRA publish " + kResult + " -o " + folder_);
+  EXPECT_EQ(result.code, 0) << result.error;
+  EXPECT_EQ(Page(), "house");
+}
+
+TEST_F(Publish, BrokenStyleSheetIsRefusedBeforeAnythingIsWritten) {
+  const CommandResult result = RunWithStyleSheet("<xsl:template>");
+  EXPECT_EQ(result.code, 1);
+  EXPECT_THAT(result.error, StartsWith("lyra: " + directory_.Path("own.xsl") + ": "));
+  EXPECT_FALSE(fs::exists(folder_));
+}
+
+TEST_F(Publish, MissingStyleSheetIsRefused) {
+  EXPECT_EQ(Run({kResult, "--xsl", "no/such.xsl"}).code, 1);
+}
+
+TEST_F(Publish, StyleSheetReadsNoFile) {
+  const std::string secret = directory_.Write("secret.xml", "<a>SECRET</a>");
+  RunWithStyleSheet("<xsl:template match='/'><p>page<xsl:value-of select=\"document('" + secret +
+                    "')\"/></p></xsl:template>");
+  if (fs::exists(folder_ + "/index.html")) {
+    EXPECT_THAT(Page(), Not(HasSubstr("SECRET")));
+  }
+  const CommandResult included = RunWithStyleSheet("<xsl:include href='" + secret + "'/>");
+  EXPECT_EQ(included.code, 1) << included.error;
+}
+
+TEST_F(Publish, StyleSheetGetsNoEntityOfAFile) {
+  const std::string secret = directory_.Write("secret.txt", "SECRET");
+  const std::string sheet = directory_.Write(
+      "own.xsl", "<!DOCTYPE x [<!ENTITY e SYSTEM '" + secret + "'>]>" + kStyleSheetStart +
+                     "<xsl:template match='/'><p>&e;</p></xsl:template></xsl:stylesheet>");
+  Run({kResult, "--xsl", sheet});
+  if (fs::exists(folder_ + "/index.html")) {
+    EXPECT_THAT(Page(), Not(HasSubstr("SECRET")));
+  }
+}
+
+TEST_F(Publish, StyleSheetWritesNoFile) {
+  RunWithStyleSheet("<xsl:template match='/'><xsl:document href='" + directory_.Path("written") +
+                    "'><a/></xsl:document></xsl:template>");
+  EXPECT_FALSE(fs::exists(directory_.Path("written")));
+}
+
+TEST_F(Publish, OtherVerbsLoadNoStyleSheetLibrary) {
+  const CommandResult result = RunShell("ldd $LYRA");
+  EXPECT_THAT(result.out, HasSubstr("libZORLyra.so"));
+  EXPECT_THAT(result.out, Not(HasSubstr("xslt")));
+}
+
+TEST(DrawingText, SaysRateAndRemainingTime) {
+  EXPECT_EQ(lyra::DrawingText(0, 400, 0), "drawing 0 of 400 interferences");
+  EXPECT_EQ(lyra::DrawingText(50, 400, 10),
+            "drawing 50 of 400 interferences, 5.0 a second, 70 s left");
+  EXPECT_EQ(lyra::DrawingText(1, 5000, 1),
+            "drawing 1 of 5000 interferences, 1.0 a second, 83 min left");
+}

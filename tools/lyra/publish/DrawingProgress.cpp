@@ -1,0 +1,47 @@
+#include "lyra/publish/DrawingProgress.h"
+
+#include <unistd.h>
+
+#include <cstdio>
+
+namespace lyra {
+namespace {
+
+std::string Duration(double inSeconds) {
+  const long long seconds = static_cast<long long>(inSeconds + 0.5);
+  if (seconds < 100) return std::to_string(seconds) + " s";
+  if (seconds < 6000) return std::to_string((seconds + 30) / 60) + " min";
+  return std::to_string((seconds + 1800) / 3600) + " h";
+}
+
+}  // namespace
+
+std::string DrawingText(std::size_t inDone, std::size_t inAll, double inSeconds) {
+  const std::string text =
+      "drawing " + std::to_string(inDone) + " of " + std::to_string(inAll) + " interferences";
+  if (inDone == 0 || !(inSeconds > 0)) return text;
+  const double rate = static_cast<double>(inDone) / inSeconds;
+  char perSecond[32];
+  std::snprintf(perSecond, sizeof perSecond, "%.1f", rate);
+  return text + ", " + perSecond + " a second, " +
+         Duration(static_cast<double>(inAll - inDone) / rate) + " left";
+}
+
+DrawingProgress::DrawingProgress(std::size_t inAll)
+    : all_(inAll), isTerminal_(isatty(STDERR_FILENO) == 1) {}
+
+DrawingProgress::~DrawingProgress() {
+  if (width_ != 0) std::fprintf(stderr, "\r%*s\r", static_cast<int>(width_), "");
+}
+
+void DrawingProgress::Show(std::size_t inDone) {
+  const Clock::time_point now = Clock::now();
+  if (!isTerminal_ || now - shown_ < std::chrono::milliseconds(100)) return;
+  shown_ = now;
+  const std::string text =
+      DrawingText(inDone, all_, std::chrono::duration<double>(now - start_).count());
+  std::fprintf(stderr, "\r%-*s", static_cast<int>(width_), text.c_str());
+  width_ = text.size();
+}
+
+}  // namespace lyra

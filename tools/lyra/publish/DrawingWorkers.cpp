@@ -1,0 +1,135 @@
+#include "lyra/publish/DrawingWorkers.h"
+
+#include <fcntl.h>
+#include <sys/mman.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <atomic>
+#include <cerrno>
+#include <cstring>
+#include <exception>
+#include <new>
+#include <string>
+#include <vector>
+
+#include "lyra/CommandErrors.h"
+
+namespace lyra {
+namespace {
+
+[[noreturn]] void FailToStart() {
+  throw InputError(std::string("no process can be started to draw: ") + std::strerror(errno));
+}
+
+/// A number that all processes count up together.
+class SharedCounter {
+ public:
+  SharedCounter()
+      : memory_(mmap(nullptr, sizeof(Number), PROT_READ | PROT_WRITE, MAP_SHARED | MAP_ANONYMOUS,
+                     -1, 0)) {
+    if (memory_ == MAP_FAILED) FailToStart();
+    number_ = new (memory_) Number(0);
+  }
+  ~SharedCounter() { munmap(memory_, sizeof(Number)); }
+  SharedCounter(const SharedCounter&) = delete;
+  SharedCounter& operator=(const SharedCounter&) = delete;
+
+  std::size_t Next() { return number_->fetch_add(1); }
+  std::size_t Current() const { return *number_; }
+
+ private:
+  using Number = std::atomic<std::size_t>;
+  static_assert(Number::is_always_lock_free);
+
+  void* memory_;
+  Number* number_ = nullptr;
+};
+
+/// Each process writes a byte for each picture that it drew.
+struct Pipe {
+  Pipe() {
+    int ends[2];
+    if (pipe2(ends, O_CLOEXEC) != 0) FailToStart();
+    reader = ends[0];
+    writer = ends[1];
+  }
+  ~Pipe() {
+    close(reader);
+    CloseWriter();
+  }
+  Pipe(const Pipe&) = delete;
+  Pipe& operator=(const Pipe&) = delete;
+
+  void CloseWriter() {
+    if (writer >= 0) close(writer);
+    writer = -1;
+  }
+
+  int reader, writer;
+};
+
+// When nobody reads any more the command has ended, so there is nothing to draw for.
+[[noreturn]] void Work(const DrawingWork& inWork, SharedCounter& ioNext, const Pipe& inPipe) {
+  int code = 0;
+  try {
+    close(inPipe.reader);
+    bool isBegun = false;
+    for (std::size_t i = ioNext.Next(); i < inWork.count; i = ioNext.Next()) {
+      if (!isBegun) inWork.begin();
+      isBegun = true;
+      inWork.draw(i);
+      if (write(inPipe.writer, "", 1) != 1) break;
+    }
+  } catch (const std::exception&) {
+    code = 1;
+  }
+  _exit(code);  // what this process shares with its parent is the parent's to write and to remove
+}
+
+void Follow(const DrawingWork& inWork, const Pipe& inPipe, std::size_t& ioDone) {
+  char bytes[256];
+  for (;;) {
+    const ssize_t count = read(inPipe.reader, bytes, sizeof bytes);
+    if (count < 0 && errno == EINTR) continue;
+    if (count <= 0) return;
+    ioDone += static_cast<std::size_t>(count);
+    inWork.isDone(ioDone);
+  }
+}
+
+bool EndedWell(pid_t inProcess) {
+  int status = 0;
+  while (waitpid(inProcess, &status, 0) < 0)
+    if (errno != EINTR) return false;
+  return WIFEXITED(status) && WEXITSTATUS(status) == 0;
+}
+
+/// @return how many of the processes failed.
+int DrawOnce(int inProcesses, const DrawingWork& inWork, SharedCounter& ioNext,
+             std::size_t& ioDone) {
+  Pipe pipe;
+  std::vector<pid_t> processes;
+  for (int i = 0; i < inProcesses; ++i) {
+    const pid_t process = fork();
+    if (process == 0) Work(inWork, ioNext, pipe);
+    if (process > 0) processes.push_back(process);
+  }
+  if (processes.empty()) FailToStart();
+  pipe.CloseWriter();
+  Follow(inWork, pipe, ioDone);
+  int failures = 0;
+  for (const pid_t process : processes) failures += EndedWell(process) ? 0 : 1;
+  return failures;
+}
+
+}  // namespace
+
+// What a process that crashed was drawing is given up; what was not begun yet is not.
+void DrawInProcesses(int inProcesses, const DrawingWork& inWork) {
+  SharedCounter next;
+  std::size_t done = 0;
+  while (DrawOnce(inProcesses, inWork, next, done) > 0 && next.Current() < inWork.count) continue;
+}
+
+}  // namespace lyra

@@ -1,0 +1,24 @@
+// Drawing in several processes.
+#ifndef ZOR_TOOLS_LYRA_PUBLISH_DRAWINGWORKERS_H
+#define ZOR_TOOLS_LYRA_PUBLISH_DRAWINGWORKERS_H
+
+#include <cstddef>
+#include <functional>
+
+namespace lyra {
+
+struct DrawingWork {
+  std::size_t count = 0;
+  std::function<void()> begin;              ///< in each process, before its first drawing
+  std::function<void(std::size_t)> draw;    ///< in one of the processes, for each of the count
+  std::function<void(std::size_t)> isDone;  ///< here, with how many are drawn
+};
+
+/// Shares the work among processes that start as copies of this one, which should have drawn nothing
+/// yet and run no other thread. Nothing is drawn here, so that a drawing that crashes is the only one
+/// that is lost. Raises InputError when no process can be started.
+void DrawInProcesses(int inProcesses, const DrawingWork& inWork);
+
+}  // namespace lyra
+
+#endif

@@ -1,0 +1,306 @@
+#include "lyra/publish/Publication.h"
+
+#include <cstdio>
+#include <cstdlib>
+#include <filesystem>
+#include <set>
+
+#include "PrintPictures.h"
+#include "default_platform/OpenModel.h"
+#include "lyra/DocumentText.h"
+#include "lyra/InterferenceWalk.h"
+#include "lyra/RecordsJson.h"
+#include "lyra/SafeText.h"
+#include "lyra/publish/DrawingProgress.h"
+#include "lyra/publish/DrawingWorkers.h"
+#include "lyra/publish/ZoomSetting.h"
+#include "platform/visualisation/ZORIVisProperties.h"
+
+namespace fs = std::filesystem;
+
+namespace lyra {
+namespace {
+
+constexpr char kPlainGrey[] = "#d2d2d2";  // of parts without a colour
+
+/// The 64-bit hash of Fowler, Noll and Vo (FNV-1a), continued.
+std::uint64_t Hashed(std::uint64_t inHash, const std::string& inText) {
+  for (const char byte : inText) {
+    inHash ^= static_cast<unsigned char>(byte);
+    inHash *= 0x100000001b3;
+  }
+  return inHash;
+}
+
+void Warn(const std::string& inText) {
+  std::fprintf(stderr, "lyra: warning: %s\n", Printable(inText).c_str());
+}
+
+/// The first and the last of the other products, which are those that a reader keeps.
+std::array<DOM_Node, 2> ProductsOf(const DOM_Node& inInterference) {
+  std::array<DOM_Node, 2> products;
+  ForEachElement(inInterference, "Product", [&](const DOM_Node& inProduct) {
+    (products[0].isNull() ? products[0] : products[1]) = inProduct;
+  });
+  return products;
+}
+
+ZORMathTransformation Transformation(const Placement& inPlacement) {
+  const auto vector = [&](std::size_t inFirst) {
+    return ZORMathVector(inPlacement[inFirst], inPlacement[inFirst + 1], inPlacement[inFirst + 2]);
+  };
+  ZORMathTransformation transformation;
+  transformation.SetMatrix(ZORMath3x3Matrix(vector(0), vector(3), vector(6)));
+  transformation.SetVector(vector(9));
+  return transformation;
+}
+
+std::optional<ZORDefault::ResultPlacements> PlacementsOf(const InterferenceRecord& inRecord) {
+  const auto& [first, second] = inRecord.products;
+  if (!first.position || !second.position) return std::nullopt;
+  return ZORDefault::ResultPlacements{Transformation(*first.position),
+                                      Transformation(*second.position)};
+}
+
+/// A word that the reader could not understand is shown as the document has it.
+std::string ShownWord(const std::string& inWord, const DOM_Node& inElement, const char* inName) {
+  if (!inWord.empty() && CaseFolded(inWord) != "error") return inWord;
+  const std::string own = AttributeText(inElement, inName);
+  return own.empty() ? "Not stated" : own;
+}
+
+Entry MakeEntry(const PlacedInterference& inPlaced, const InterferenceRecord& inRecord) {
+  Entry entry;
+  entry.element = inPlaced.element;
+  entry.products = ProductsOf(inPlaced.element);
+  entry.placements = PlacementsOf(inRecord);
+  entry.facts.number = inPlaced.number;
+  entry.facts.type = ShownWord(inRecord.type, inPlaced.element, "ResultType");
+  entry.facts.status = ShownWord(inRecord.status, inPlaced.element, "Status");
+  return entry;
+}
+
+std::string ColourText(unsigned inRed, unsigned inGreen, unsigned inBlue) {
+  char text[8];
+  std::snprintf(text, sizeof text, "#%02x%02x%02x", inRed & 0xFF, inGreen & 0xFF, inBlue & 0xFF);
+  return text;
+}
+
+/// The colour that the highest ancestor imposes; else empty.
+std::string ImposedColour(const ZORIProduct_var& inProduct) {
+  std::string colour;
+  for (ZORIProduct_var product = inProduct; !product.IsNull();
+       product = product->GetFatherProduct()) {
+    const ZORIVisProperties_var properties = product;
+    ZORVisPropertiesValues values;
+    unsigned isImposed = 0, red = 0, green = 0, blue = 0;
+    if (properties.IsNull() || FAILED(properties->GetPropertiesAtt(values, 11, 5)) ||
+        FAILED(values.GetInheritance(ZORVisPropertiesValues::kColour, isImposed)) ||
+        isImposed == 0 || FAILED(values.GetColor(red, green, blue)))
+      continue;
+    colour = ColourText(red, green, blue);
+  }
+  return colour;
+}
+
+/// What a product is drawn in; empty for an assembly of many colours.
+/// @param inShown   the product as the picture shows it.
+/// @param inOfModel the same one in the model.
+std::string ColourOf(const ZORIProduct_var& inShown, const ZORIProduct_var& inOfModel) {
+  const std::string imposed = ImposedColour(inShown);
+  ZORDefault::ProductFacts facts;
+  if (!imposed.empty() || !ZORDefault::GetProductFacts(inOfModel.GetInterface(), facts))
+    return imposed;
+  if (!facts.colour) return facts.triangles > 0 ? kPlainGrey : "";
+  return ColourText((*facts.colour)[0], (*facts.colour)[1], (*facts.colour)[2]);
+}
+
+/// Which of a set of texts there are: the first few and how many more.
+std::string Listed(const std::set<std::string>& inTexts) {
+  constexpr std::size_t kShown = 3;
+  std::string list;
+  std::size_t shown = 0;
+  for (const std::string& text : inTexts) {
+    if (++shown > kShown) return list + " and " + std::to_string(inTexts.size() - kShown) + " more";
+    list += (shown == 1 ? "\"" : ", \"") + text + "\"";
+  }
+  return list;
+}
+
+/// Draws in the folder of the pictures, which is the current one: no text has to carry its path.
+class EntryDrawing {
+ public:
+  EntryDrawing(const Entry& inEntry, const ZORIProduct_var& inRoot, const PictureStore& inStore,
+               const PictureStyle& inStyle)
+      : scene_(ZORDefault::MakeInterferenceScene(inRoot, inEntry.element, inEntry.placements)),
+        number_(inEntry.facts.number),
+        store_(inStore),
+        style_(inStyle),
+        format_(inStyle.format == PictureFormat::kPng ? "PNG" : "JPEG") {}
+
+  void Draw() {
+    for (std::size_t i = 0; i < 2; ++i) DrawPreview(i);
+    const std::string name = store_.PictureName(number_);
+    if (store_.Has(name)) return;
+    const auto& [first, second] = scene_.products;
+    if (first.IsNull() && second.IsNull()) return;
+    PrintPictures::PrintListVisuToFile(first, scene_.paths[0], second, scene_.paths[1],
+                                       scene_.interference, FromUtf8(name), format_,
+                                       style_.size.width, style_.size.height, 1, 0);
+  }
+
+ private:
+  void DrawPreview(std::size_t inProduct) {
+    const std::string name = store_.PreviewName(number_, inProduct);
+    if (scene_.products[inProduct].IsNull() || store_.Has(name)) return;
+    PrintPictures::PrintListVisuToFilePreview(
+        scene_.products[inProduct], scene_.paths[inProduct], FromUtf8(name), format_,
+        std::max(1, style_.size.width / 2), std::max(1, style_.size.height / 2), 1, 0);
+  }
+
+  ZORDefault::InterferenceScene scene_;
+  int number_;
+  const PictureStore& store_;
+  const PictureStyle& style_;
+  ZORUnicodeString format_;
+};
+
+void ReferToPicture(ClashResultFile& ioResult, const Entry& inEntry) {
+  DOM_Node element = inEntry.element;
+  for (DOM_Node old = FirstElement(element, "Picture"); !old.isNull();
+       old = FirstElement(element, "Picture"))
+    element.removeChild(old);
+  if (inEntry.facts.picture.empty()) return;
+  DOM_Element picture = ioResult.Document().createElement("Picture");
+  picture.setAttribute("HRef", inEntry.facts.picture.c_str());
+  element.appendChild(picture);
+}
+
+void ReferToPreview(const DOM_Node& inProduct, const std::string& inPreview) {
+  DOM_Element product(inProduct);
+  if (inPreview.empty())
+    product.removeAttribute("Preview");
+  else
+    product.setAttribute("Preview", inPreview.c_str());
+}
+
+void RecountSets(ClashResultFile& ioResult) {
+  if (ioResult.Kind() != DocumentKind::kClash) return;
+  ForEachElement(ioResult.Root(), "ClashResult", [](const DOM_Node& inSet) {
+    int count = 0;
+    ForEachElement(inSet, "Interference", [&](const DOM_Node&) { ++count; });
+    DOM_Element(inSet).setAttribute("NbInterf", std::to_string(count).c_str());
+  });
+}
+
+}  // namespace
+
+Publication::Publication(ClashResultFile& ioResult, const ListFilter& inFilter)
+    : hash_(0xcbf29ce484222325) {
+  ForEachInterference(ioResult, [&](const PlacedInterference& inPlaced) {
+    const InterferenceRecord record = ReadInterference(ioResult, inPlaced);
+    hash_ = Hashed(hash_, JsonText(record));
+    if (inFilter.Accepts(record))
+      entries_.push_back(MakeEntry(inPlaced, record));
+    else
+      others_.push_back(inPlaced.element);
+  });
+}
+
+std::string Publication::Fingerprint() const {
+  char text[17];
+  std::snprintf(text, sizeof text, "%016llx", static_cast<unsigned long long>(hash_));
+  return text;
+}
+
+void Publication::LookUp(const ZORIProduct_var& inRoot) {
+  std::set<std::string> missing;
+  std::size_t incomplete = 0, movedBack = 0;
+  std::string whyMovedBack;
+  for (Entry& entry : entries_) {
+    const ZORDefault::InterferenceScene scene =
+        ZORDefault::MakeInterferenceScene(inRoot, entry.element, entry.placements);
+    bool isComplete = true;
+    for (std::size_t i = 0; i < 2; ++i) {
+      if (entry.products[i].isNull()) continue;
+      PublishedProduct& product = entry.facts.products[i];
+      product.isMissing = scene.products[i].IsNull();
+      if (product.isMissing) missing.insert(Utf8(scene.paths[i]));
+      isComplete = isComplete && !product.isMissing;
+      if (!product.isMissing)
+        product.colour =
+            ColourOf(scene.products[i], ZORDefault::FindProduct(inRoot, scene.paths[i]));
+    }
+    incomplete += isComplete ? 0 : 1;
+    if (!scene.whyAsInModel.empty() && movedBack++ == 0)
+      whyMovedBack = std::to_string(entry.facts.number) + ": " + scene.whyAsInModel;
+  }
+  if (incomplete > 0)
+    Warn("the model lacks " + std::to_string(missing.size()) + " products of " +
+         std::to_string(incomplete) + " interferences: " + Listed(missing));
+  if (movedBack > 0)
+    Warn("the products of " + std::to_string(movedBack) +
+         " interferences are drawn where they stand in the model; interference " + whyMovedBack);
+}
+
+bool Publication::HasProduct(const Entry& inEntry) const {
+  for (std::size_t i = 0; i < 2; ++i)
+    if (!inEntry.products[i].isNull() && !inEntry.facts.products[i].isMissing) return true;
+  return false;
+}
+
+std::size_t Publication::TakeReferences(const PictureStore& inStore) {
+  std::size_t lacking = 0;
+  for (Entry& entry : entries_) {
+    PublishedInterference& facts = entry.facts;
+    if (!HasProduct(entry)) continue;
+    facts.picture = inStore.Reference(inStore.PictureName(facts.number));
+    if (facts.picture.empty()) ++lacking;
+    for (const std::string& name : inStore.ThumbnailNames(facts.number))
+      facts.thumbnails.push_back(inStore.Reference(name));
+    for (std::size_t i = 0; i < 2; ++i)
+      if (!facts.products[i].isMissing)
+        facts.products[i].preview = inStore.Reference(inStore.PreviewName(facts.number, i));
+  }
+  return lacking;
+}
+
+std::size_t Publication::Draw(const ZORIProduct_var& inRoot, const PictureStore& inStore,
+                              const PictureStyle& inStyle, int inProcesses) {
+  std::vector<const Entry*> wanted;
+  for (const Entry& entry : entries_)
+    if (HasProduct(entry)) wanted.push_back(&entry);
+  if (!wanted.empty()) {
+    const ZoomSetting zoom(inStyle.zoom);
+    DrawingProgress progress(wanted.size());
+    DrawingWork work;
+    work.count = wanted.size();
+    work.begin = [&] {
+      fs::current_path(inStore.Folder());
+      zoom.Apply();
+    };
+    work.draw = [&](std::size_t inWanted) {
+      try {
+        EntryDrawing(*wanted[inWanted], inRoot, inStore, inStyle).Draw();
+      } catch (const std::exception&) {
+        // Its picture is not there, which is what is looked for at the end.
+      }
+    };
+    work.isDone = [&](std::size_t inDone) { progress.Show(inDone); };
+    DrawInProcesses(inProcesses, work);
+  }
+  return TakeReferences(inStore);
+}
+
+void Publication::Finish(ClashResultFile& ioResult) {
+  for (DOM_Node& other : others_) other.getParentNode().removeChild(other);
+  if (!others_.empty()) RecountSets(ioResult);
+  for (const Entry& entry : entries_) {
+    ReferToPicture(ioResult, entry);
+    for (std::size_t i = 0; i < 2; ++i)
+      if (!entry.products[i].isNull())
+        ReferToPreview(entry.products[i], entry.facts.products[i].preview);
+  }
+}
+
+}  // namespace lyra
