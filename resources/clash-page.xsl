@@ -466,7 +466,8 @@ dialog::backdrop { background:#000c }
   :root { --ink:#000; --soft:#444; --line:#bbb; --paper:#fff; --panel:#f3f3f3; --accent:#000; --clash:#b3261e; --contact:#9a6200; --clearance:#1f6f9f; --relevant:#7a4fa3; --irrelevant:#8b959e; --open:#3d7a5a; --other:#6f7780 }
   body { max-width:none; padding:0; font-size:10pt; print-color-adjust:exact; -webkit-print-color-adjust:exact }
   .filters,.filters[hidden] { display:none } .wide { overflow:visible } thead { display:table-header-group } tr,.card,.picture { break-inside:avoid }
-  td.products,td.comment { min-width:0 }
+  table { font-size:8pt } .thumb img { width:60px; height:40px } td.products { min-width:0; width:45% } td.comment { min-width:0 }
+  .body { grid-template-columns:minmax(0,3fr) minmax(0,2fr) } .status { margin-left:auto }
   .interference { content-visibility:visible; break-inside:avoid } blockquote,details ol { max-height:none; overflow:visible }
 }
     </style>
