@@ -446,7 +446,8 @@ td:nth-last-child(4) { min-width:8.5rem } td:nth-last-child(2) { min-width:5rem 
 img { background:#fff; border-radius:.3rem }
 .thumb img,.card img { display:block; width:96px; height:64px; object-fit:cover; border:1px solid var(--line) }
 .swatch { display:inline-block; width:.75rem; height:.75rem; border-radius:.2rem; margin-right:.4rem; vertical-align:-.05rem; border:1px solid #0003; box-shadow:0 0 0 1px #fff3 }
-.interference { margin-top:2.5rem; padding-top:1.2rem; border-top:1px solid var(--line); content-visibility:auto; contain-intrinsic-size:auto 30rem; scroll-margin-top:1rem }
+.interference { margin-top:2.5rem; padding-top:1.2rem; border-top:1px solid var(--line); scroll-margin-top:1rem }
+@media screen { .interference { content-visibility:auto; contain-intrinsic-size:auto 30rem } }
 h2 { display:flex; flex-wrap:wrap; align-items:baseline; gap:.3rem .9rem; margin:0 0 1rem; font-size:1.15rem; font-weight:600 }
 .back { font-variant-numeric:tabular-nums; color:var(--soft) } .value { font-variant-numeric:tabular-nums }
 .status { margin-left:auto; color:var(--soft); font-size:.85rem; font-weight:400 }
@@ -467,8 +468,9 @@ dialog::backdrop { background:#000c }
   body { max-width:none; padding:0; font-size:10pt; print-color-adjust:exact; -webkit-print-color-adjust:exact }
   .filters,.filters[hidden] { display:none } .wide { overflow:visible } thead { display:table-header-group } tr,.card,.picture { break-inside:avoid }
   table { font-size:8pt } .thumb img { width:60px; height:40px } td.products { min-width:0; width:45% } td.comment { min-width:0 }
-  .body { grid-template-columns:minmax(0,3fr) minmax(0,2fr) } .status { margin-left:auto }
-  .interference { content-visibility:visible; break-inside:avoid } blockquote,details ol { max-height:none; overflow:visible }
+  .body { grid-template-columns:minmax(0,1fr) minmax(0,1fr) } .status { margin-left:auto }
+  .interference { break-inside:avoid; margin-top:1rem; padding-top:.7rem } h2 { margin-bottom:.6rem }
+  blockquote,details ol { max-height:none; overflow:visible }
 }
     </style>
   </xsl:template>
