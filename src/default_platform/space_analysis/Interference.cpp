@@ -1,7 +1,6 @@
 #include "default_platform/space_analysis/Interference.h"
 
 #include <algorithm>
-#include <cstdlib>
 
 #include "default_platform/space_analysis/StandingProduct.h"
 #include "platform/space_analysis/ZORISiSubInterference.h"
@@ -83,12 +82,6 @@ const ZOR3DRep* RepOf(const ZORIProduct_var& inProduct) {
   return visualised.IsNull() ? nullptr : dynamic_cast<const ZOR3DRep*>(visualised->GetRep());
 }
 
-int Difference(const PartColour& inA, const PartColour& inB) {
-  int difference = 0;
-  for (std::size_t i = 0; i < 3; ++i) difference += std::abs(inA[i] - inB[i]);
-  return difference;
-}
-
 /// The first of these that stands out from both products, else the one that does so best.
 PartColour MarkerColourFor(const std::array<ZORIProduct_var, 2>& inProducts) {
   constexpr PartColour kColours[] = {{255, 0, 140, 255}, {0, 190, 255, 255}, {255, 220, 0, 255}};
@@ -96,8 +89,8 @@ PartColour MarkerColourFor(const std::array<ZORIProduct_var, 2>& inProducts) {
   PartColour best = kColours[0];
   int most = -1;
   for (const PartColour& colour : kColours) {
-    const int least = std::min(Difference(colour, MeanColourOf(inProducts[0])),
-                               Difference(colour, MeanColourOf(inProducts[1])));
+    const int least = std::min(ColourDifference(colour, MeanColourOf(inProducts[0])),
+                               ColourDifference(colour, MeanColourOf(inProducts[1])));
     if (least > most) best = colour;
     most = std::max(most, least);
     if (least >= kClear) break;

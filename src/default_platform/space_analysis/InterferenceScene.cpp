@@ -1,7 +1,5 @@
 #include "default_platform/InterferenceScene.h"
 
-#include <cstdlib>
-
 #include "default_platform/OpenModel.h"
 #include "default_platform/space_analysis/Interference.h"
 #include "default_platform/space_analysis/StandingProduct.h"
@@ -34,9 +32,7 @@ std::string WhyNoneIsTrusted(const InterferenceElement& inElement,
 /// Two parts of nearly one colour could not be told apart.
 bool AreAlike(const PartColour& inA, const PartColour& inB) {
   constexpr int kAlike = 90;
-  int difference = 0;
-  for (std::size_t i = 0; i < 3; ++i) difference += std::abs(inA[i] - inB[i]);
-  return difference < kAlike;
+  return ColourDifference(inA, inB) < kAlike;
 }
 
 /// Of those that stand out from every other colour here, markers' included.

@@ -1,5 +1,7 @@
 #include "default_platform/space_analysis/StandingProduct.h"
 
+#include <cstdlib>
+#include <optional>
 #include <vector>
 
 #include "default_platform/product_structure/Product.h"
@@ -135,7 +137,10 @@ class StandingProduct final : public FacetedComponent, private CountedObject<Sta
 std::optional<PartColour> ImposedColourOf(const ZORIVisProperties_var& inProperties) {
   ZORVisPropertiesValues values;
   unsigned int isImposed = 0, red = 0, green = 0, blue = 0;
-  if (inProperties.IsNull() || FAILED(inProperties->GetPropertiesAtt(values, 11, 5))) return {};
+  constexpr int kAllProperties = 11, kWholeGeometry = 5;
+  if (inProperties.IsNull() ||
+      FAILED(inProperties->GetPropertiesAtt(values, kAllProperties, kWholeGeometry)))
+    return {};
   if (FAILED(values.GetInheritance(ZORVisPropertiesValues::kColour, isImposed)) || !isImposed ||
       FAILED(values.GetColor(red, green, blue)))
     return {};
@@ -175,6 +180,12 @@ PartColour MeanColourOf(const ZORIProduct_var& inProduct) {
   if (count > 0)
     for (std::size_t i = 0; i < 4; ++i) mean[i] = static_cast<std::uint8_t>(sums[i] / count + 0.5);
   return mean;
+}
+
+int ColourDifference(const PartColour& inA, const PartColour& inB) {
+  int difference = 0;
+  for (std::size_t i = 0; i < 3; ++i) difference += std::abs(inA[i] - inB[i]);
+  return difference;
 }
 
 }  // namespace ZORDefault

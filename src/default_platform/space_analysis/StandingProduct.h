@@ -21,6 +21,9 @@ ZORIProduct_var StandAt(const ZORIProduct_var& inProduct,
 /// triangles.
 PartColour MeanColourOf(const ZORIProduct_var& inProduct);
 
+/// How far two colours lie apart: the sum over red, green and blue.
+int ColourDifference(const PartColour& inA, const PartColour& inB);
+
 }  // namespace ZORDefault
 
 #endif
