@@ -1,6 +1,7 @@
 <?xml version="1.0" encoding="UTF-8"?>
 <!-- Turns a report of a clash result into the page that "lyra publish" writes. Beside what a report
-     holds, that command gives to the root: page:model; to each interference: page:number, page:type,
+     holds, that command gives to the root: page:model, a page:Type for each type and a page:Status
+     for each status, with page:word and page:count; to each interference: page:number, page:type,
      page:status, page:picture and page:Thumbnail elements; to each of its two products: page:colour,
      page:preview and page:missing. Texts of the document are isolated (bdi), so that none can change
      the direction of what stands around it. -->
@@ -9,11 +10,9 @@
   <xsl:output method="html" version="5" encoding="UTF-8" indent="no"
               doctype-system="about:legacy-compat"/>
 
-  <xsl:key name="type" match="Interference[@page:number]" use="@page:type"/>
-  <xsl:key name="status" match="Interference[@page:number]" use="@page:status"/>
   <xsl:variable name="interferences"
                 select="/ClashElement/ClashResult/Interference | /InterferenceElement/Interference[1]"/>
-  <xsl:variable name="hasPictures" select="$interferences/@page:picture"/>
+  <xsl:variable name="hasPictures" select="boolean($interferences/@page:picture)"/>
   <xsl:variable name="mostPoints" select="100"/>
 
   <xsl:variable name="title">
@@ -65,13 +64,11 @@
         <div class="charts">
           <xsl:call-template name="chart">
             <xsl:with-param name="name">Type</xsl:with-param>
-            <xsl:with-param name="key">type</xsl:with-param>
-            <xsl:with-param name="firsts" select="$interferences[generate-id() = generate-id(key('type', @page:type)[1])]"/>
+            <xsl:with-param name="counts" select="page:Type"/>
           </xsl:call-template>
           <xsl:call-template name="chart">
             <xsl:with-param name="name">Status</xsl:with-param>
-            <xsl:with-param name="key">status</xsl:with-param>
-            <xsl:with-param name="firsts" select="$interferences[generate-id() = generate-id(key('status', @page:status)[1])]"/>
+            <xsl:with-param name="counts" select="page:Status"/>
           </xsl:call-template>
         </div>
       </xsl:if>
@@ -142,38 +139,27 @@
   <!-- A bar whose parts are as long as their counts, and what they mean. -->
   <xsl:template name="chart">
     <xsl:param name="name"/>
-    <xsl:param name="key"/>
-    <xsl:param name="firsts"/>
+    <xsl:param name="counts"/>
     <figure class="chart">
       <figcaption><xsl:value-of select="$name"/></figcaption>
       <div class="bar" aria-hidden="true">
-        <xsl:for-each select="$firsts">
-          <xsl:variable name="word"><xsl:call-template name="word"><xsl:with-param name="key" select="$key"/></xsl:call-template></xsl:variable>
-          <xsl:variable name="class"><xsl:call-template name="class"><xsl:with-param name="word" select="$word"/></xsl:call-template></xsl:variable>
-          <span class="{$class}" style="flex-grow:{count(key($key, $word))}"></span>
+        <xsl:for-each select="$counts">
+          <xsl:variable name="class"><xsl:call-template name="class"><xsl:with-param name="word" select="@page:word"/></xsl:call-template></xsl:variable>
+          <span class="{$class}" style="flex-grow:{@page:count}"></span>
         </xsl:for-each>
       </div>
       <ul>
-        <xsl:for-each select="$firsts">
-          <xsl:variable name="word"><xsl:call-template name="word"><xsl:with-param name="key" select="$key"/></xsl:call-template></xsl:variable>
-          <xsl:variable name="class"><xsl:call-template name="class"><xsl:with-param name="word" select="$word"/></xsl:call-template></xsl:variable>
+        <xsl:for-each select="$counts">
+          <xsl:variable name="class"><xsl:call-template name="class"><xsl:with-param name="word" select="@page:word"/></xsl:call-template></xsl:variable>
           <li>
             <span class="dot {$class}"></span>
-            <strong><xsl:value-of select="count(key($key, $word))"/></strong>
+            <strong><xsl:value-of select="@page:count"/></strong>
             <xsl:text> </xsl:text>
-            <bdi><xsl:value-of select="$word"/></bdi>
+            <bdi><xsl:value-of select="@page:word"/></bdi>
           </li>
         </xsl:for-each>
       </ul>
     </figure>
-  </xsl:template>
-
-  <xsl:template name="word">
-    <xsl:param name="key"/>
-    <xsl:choose>
-      <xsl:when test="$key = 'type'"><xsl:value-of select="@page:type"/></xsl:when>
-      <xsl:otherwise><xsl:value-of select="@page:status"/></xsl:otherwise>
-    </xsl:choose>
   </xsl:template>
 
   <!-- Only known words become classes. -->
@@ -467,7 +453,7 @@ dialog::backdrop { background:#000c }
   :root { --ink:#000; --soft:#444; --line:#bbb; --paper:#fff; --panel:#f3f3f3; --accent:#000; --clash:#b3261e; --contact:#9a6200; --clearance:#1f6f9f; --relevant:#7a4fa3; --irrelevant:#8b959e; --open:#3d7a5a; --other:#6f7780 }
   body { max-width:none; padding:0; font-size:10pt; print-color-adjust:exact; -webkit-print-color-adjust:exact }
   .filters,.filters[hidden] { display:none } .wide { overflow:visible } thead { display:table-header-group } tr,.card,.picture { break-inside:avoid }
-  table { font-size:8pt } .thumb img { width:60px; height:40px } td.products { min-width:0; width:45% } td.comment { min-width:0 }
+  th button { display:contents } table { font-size:8pt } .thumb img { width:60px; height:40px } td.products { min-width:0; width:45% } td.comment { min-width:0 }
   .body { grid-template-columns:minmax(0,1fr) minmax(0,1fr) } .status { margin-left:auto }
   .interference { break-inside:avoid; margin-top:1rem; padding-top:.7rem } h2 { margin-bottom:.6rem }
   blockquote,details ol { max-height:none; overflow:visible }

@@ -1,8 +1,8 @@
 // lyra publish RESULT --model MODEL -o DIR
 #include <algorithm>
 #include <fstream>
-#include <iterator>
 #include <memory>
+#include <sstream>
 #include <thread>
 
 #include "lyra/CommandErrors.h"
@@ -47,9 +47,10 @@ struct OtherStyleSheet {
 
 std::string ReadWhole(const std::string& inPath) {
   std::ifstream stream(inPath, std::ios::binary);
-  std::string bytes{std::istreambuf_iterator<char>(stream), {}};
+  std::ostringstream bytes;
+  bytes << stream.rdbuf();
   if (!fs::is_regular_file(inPath) || !stream) throw InputError(inPath + ": cannot be read");
-  return bytes;
+  return bytes.str();
 }
 
 /// A reference may be written with backslashes, as on other systems.

@@ -8,10 +8,13 @@
 #include <libxslt/xsltInternals.h>
 #include <libxslt/xsltutils.h>
 
+#include <algorithm>
 #include <cstdarg>
 #include <cstdio>
+#include <map>
 #include <memory>
 #include <string_view>
+#include <utility>
 
 #include "lyra/publish/ShippedTexts.h"
 
@@ -115,6 +118,8 @@ class FactWriter {
 
   void Add(const PageRequest& inRequest) {
     Set(root_, "model", inRequest.model);
+    Count(inRequest, "Type", &PublishedInterference::type);
+    Count(inRequest, "Status", &PublishedInterference::status);
     std::size_t next = 0;
     const auto add = [&](xmlNode* ioInterference) {
       if (next < inRequest.interferences.size())
@@ -128,6 +133,21 @@ class FactWriter {
  private:
   void Set(xmlNode* ioElement, const char* inName, const std::string& inValue) {
     if (!inValue.empty()) xmlNewNsProp(ioElement, space_, Xml(inName), Xml(inValue));
+  }
+
+  // Style sheets can count only slowly. The most frequent words first.
+  void Count(const PageRequest& inRequest, const char* inName,
+             std::string PublishedInterference::*inWord) {
+    std::map<std::string, std::size_t> counts;
+    for (const PublishedInterference& facts : inRequest.interferences) ++counts[facts.*inWord];
+    std::vector<std::pair<std::string, std::size_t>> words(counts.begin(), counts.end());
+    std::stable_sort(words.begin(), words.end(),
+                     [](const auto& inA, const auto& inB) { return inA.second > inB.second; });
+    for (const auto& [word, count] : words) {
+      xmlNode* const element = xmlNewChild(root_, space_, Xml(inName), nullptr);
+      Set(element, "word", word);
+      Set(element, "count", std::to_string(count));
+    }
   }
 
   void Add(xmlNode* ioInterference, const PublishedInterference& inFacts) {
