@@ -412,7 +412,7 @@ h1 { margin:.1rem 0 1rem; font-size:1.9rem; line-height:1.2; font-weight:650 }
 .dot { display:inline-block; width:.6rem; height:.6rem; border-radius:50%; background:var(--c); margin-right:.2rem }
 .clash { --c:var(--clash) } .contact { --c:var(--contact) } .clearance { --c:var(--clearance) } .other { --c:var(--other) }
 .relevant { --c:var(--relevant) } .irrelevant { --c:var(--irrelevant) } .open { --c:var(--open) }
-.type { color:var(--c); font-weight:600; white-space:nowrap }
+.type { color:var(--c); font-weight:600 }
 .notice { background:var(--panel); border-left:3px solid var(--contact); padding:.6rem .9rem; border-radius:.25rem }
 .missing { color:var(--contact); border:1px solid currentColor; border-radius:.25rem; font-size:.72rem; padding:0 .3rem; white-space:nowrap }
 .filters { display:flex; flex-wrap:wrap; gap:.6rem 1.2rem; align-items:center; margin:2rem 0 .6rem; color:var(--soft); font-size:.85rem }
@@ -427,8 +427,8 @@ th button { all:unset; cursor:pointer; color:inherit } th button:hover { color:v
 th button:focus-visible { outline:2px solid var(--accent) }
 th[aria-sort=ascending] button::after { content:" ↑" } th[aria-sort=descending] button::after { content:" ↓" }
 tbody tr:hover { background:var(--panel) }
-.number { text-align:right; font-variant-numeric:tabular-nums; white-space:nowrap }
-td:nth-last-child(4) { min-width:8.5rem } td:nth-last-child(2) { min-width:5rem } td.products { min-width:15rem } td.comment { min-width:9rem; max-width:18rem; color:var(--soft) }
+.number { text-align:right; font-variant-numeric:tabular-nums } td:nth-child(n+3).number { min-width:5.5rem }
+td:nth-last-child(6) { min-width:6.5rem } td:nth-last-child(4) { min-width:8.5rem } td:nth-last-child(2) { min-width:5rem } td.products { min-width:15rem } td.comment { min-width:9rem; max-width:18rem; color:var(--soft) }
 img { background:#fff; border-radius:.3rem }
 .thumb img,.card img { display:block; width:96px; height:64px; object-fit:cover; border:1px solid var(--line) }
 .swatch { display:inline-block; width:.75rem; height:.75rem; border-radius:.2rem; margin-right:.4rem; vertical-align:-.05rem; border:1px solid #0003; box-shadow:0 0 0 1px #fff3 }

@@ -165,10 +165,11 @@ TEST_F(Publish, MarkupInEveryFieldIsText) {
 
 TEST_F(Publish, DirectionsAreNeverTurned) {
   const std::string page =
-      PageOf(InOneSet("<Interference><Product Alias='a&#x202e;gnp.exe'/>"
+      PageOf(InOneSet("<Interference Status='&#x202d;c'><Product Alias='a&#x202e;gnp.exe'/>"
                       "<Product Alias='&#x2066;b'/></Interference>"));
   EXPECT_THAT(page, HasSubstr("<bdi>a\\u{202E}gnp.exe</bdi>"));
   EXPECT_THAT(page, HasSubstr("<bdi>\\u{2066}b</bdi>"));
+  for (const char* bytes : {"\u202d", "\u202e", "\u2066"}) EXPECT_THAT(page, Not(HasSubstr(bytes)));
   EXPECT_THAT(Report(), HasSubstr("a\u202egnp.exe"));
 }
 

@@ -78,21 +78,21 @@ bool TurnsDirection(std::string_view inBytes) {
 }
 
 // They can stand in values only, so the text stays well-formed.
-std::string WithVisibleDirections(const std::string& inReport) {
-  std::string text;
-  text.reserve(inReport.size());
-  for (std::size_t i = 0; i < inReport.size(); ++i) {
-    if (!TurnsDirection(std::string_view(inReport).substr(i, 3))) {
-      text += inReport[i];
+std::string WithVisibleDirections(const std::string& inText) {
+  std::string visible;
+  visible.reserve(inText.size());
+  for (std::size_t i = 0; i < inText.size(); ++i) {
+    if (!TurnsDirection(std::string_view(inText).substr(i, 3))) {
+      visible += inText[i];
       continue;
     }
-    const int code = 0x2000 + ((inReport[i + 1] & 0x3F) << 6) + (inReport[i + 2] & 0x3F);
+    const int code = 0x2000 + ((inText[i + 1] & 0x3F) << 6) + (inText[i + 2] & 0x3F);
     char escape[16];
     std::snprintf(escape, sizeof escape, "\\u{%X}", static_cast<unsigned>(code));
-    text += escape;
+    visible += escape;
     i += 2;
   }
-  return text;
+  return visible;
 }
 
 xmlDocPtr Parse(const std::string& inBytes, const char* inName, int inOptions) {
@@ -132,7 +132,8 @@ class FactWriter {
 
  private:
   void Set(xmlNode* ioElement, const char* inName, const std::string& inValue) {
-    if (!inValue.empty()) xmlNewNsProp(ioElement, space_, Xml(inName), Xml(inValue));
+    if (!inValue.empty())
+      xmlNewNsProp(ioElement, space_, Xml(inName), Xml(WithVisibleDirections(inValue)));
   }
 
   // Style sheets can count only slowly. The most frequent words first.

@@ -115,6 +115,11 @@ std::string ColourOf(const ZORIProduct_var& inShown, const ZORIProduct_var& inOf
   return ColourText((*facts.colour)[0], (*facts.colour)[1], (*facts.colour)[2]);
 }
 
+/// "1 product", "2 products".
+std::string Counted(std::size_t inCount, const std::string& inThing) {
+  return std::to_string(inCount) + " " + inThing + (inCount == 1 ? "" : "s");
+}
+
 /// Which of a set of texts there are: the first few and how many more.
 std::string Listed(const std::set<std::string>& inTexts) {
   constexpr std::size_t kShown = 3;
@@ -236,11 +241,11 @@ void Publication::LookUp(const ZORIProduct_var& inRoot) {
       whyMovedBack = std::to_string(entry.facts.number) + ": " + scene.whyAsInModel;
   }
   if (incomplete > 0)
-    Warn("the model lacks " + std::to_string(missing.size()) + " products of " +
-         std::to_string(incomplete) + " interferences: " + Listed(missing));
+    Warn("the model lacks " + Counted(missing.size(), "product") + " of " +
+         Counted(incomplete, "interference") + ": " + Listed(missing));
   if (movedBack > 0)
-    Warn("the products of " + std::to_string(movedBack) +
-         " interferences are drawn where they stand in the model; interference " + whyMovedBack);
+    Warn("the products of " + Counted(movedBack, "interference") +
+         " are drawn where they stand in the model; interference " + whyMovedBack);
 }
 
 bool Publication::HasProduct(const Entry& inEntry) const {
