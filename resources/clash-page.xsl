@@ -427,7 +427,7 @@ th button { all:unset; cursor:pointer; color:inherit } th button:hover { color:v
 th button:focus-visible { outline:2px solid var(--accent) }
 th[aria-sort=ascending] button::after { content:" ↑" } th[aria-sort=descending] button::after { content:" ↓" }
 tbody tr:hover { background:var(--panel) }
-.number { text-align:right; font-variant-numeric:tabular-nums } td:nth-child(n+3).number { min-width:5.5rem }
+.number { text-align:right; font-variant-numeric:tabular-nums } td:nth-child(n+3).number { min-width:5.5rem } .number:first-child { white-space:nowrap }
 td:nth-last-child(6) { min-width:6.5rem } td:nth-last-child(4) { min-width:8.5rem } td:nth-last-child(2) { min-width:5rem } td.products { min-width:15rem } td.comment { min-width:9rem; max-width:18rem; color:var(--soft) }
 img { background:#fff; border-radius:.3rem }
 .thumb img,.card img { display:block; width:96px; height:64px; object-fit:cover; border:1px solid var(--line) }

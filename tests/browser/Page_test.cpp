@@ -160,6 +160,25 @@ TEST_F(Page, EveryPictureLoads) {
       "128");
 }
 
+TEST_F(Page, MarkupOfADocumentDoesNothing) {
+  const std::string evil =
+      "&quot;&gt;&lt;img src=x onerror=evil()&gt;&lt;script&gt;window.evil=1&lt;/script&gt;";
+  ASSERT_EQ(RunCommand({"publish", "-", "-o", PathOf("hostile")},
+                       "<ClashElement ZORDocument='" + evil + "'><ClashResult Name='" + evil +
+                           "'><Interference Value='" + evil + "' Status='" + evil +
+                           "'><Product Alias='" + evil + "'/><Comment Value='" + evil +
+                           "'/></Interference></ClashResult></ClashElement>")
+                .code,
+            0);
+  EXPECT_EQ(After("hostile",
+                  "choose('status', document.querySelector('tbody tr').dataset.status);\n"
+                  "say([numbers(), document.images.length - 1, "
+                  "document.querySelectorAll('main script').length, typeof window.evil, "
+                  "document.querySelector('h1').textContent.startsWith('\">"
+                  "<img')].join(' '));"),
+            "1 0 0 undefined true");  // the one image is that of the dialog
+}
+
 TEST_F(Page, PrintHoldsEachInterference) {
   const std::string text = Printed(PathOf("as1/index.html"));
   for (int i = 1; i <= 32; ++i)
