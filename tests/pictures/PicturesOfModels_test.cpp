@@ -2,81 +2,31 @@
 #include <gtest/gtest.h>
 
 #include <array>
-#include <memory>
-#include <optional>
 #include <string>
 #include <vector>
 
 #include "PrintPictures.h"
-#include "ZORClashParsing.h"
-#include "default_platform/InterferenceScene.h"
-#include "default_platform/OpenModel.h"
 #include "default_platform/system/ObjectCounters.h"
-#include "default_platform/visualisation/PictureDrawing.h"
-#include "platform/visualisation/ZOR3DBagRep.h"
-#include "platform/visualisation/ZORI3DGeoVisu.h"
 #include "support/PlatformFolder.h"
+#include "support/ResultOnModel.h"
 #include "support/ScopedVariable.h"
 
 namespace {
 
+using support::ResultOnModel;
 using ZORDefault::InterferenceScene;
-using ZORDefault::SeenPixel;
 
-/// A model, and the interferences of a result on it.
-class Sample {
- public:
-  Sample(const std::string& inModel, const std::string& inResult)
-      : model(ZORDefault::OpenModel(ZOR_SOURCE_DIR "/samples/" + inModel, WithoutCache())),
-        path_(ZOR_SOURCE_DIR "/samples/" + inResult),
-        reader_(path_.data()) {
-    ZORUnicodeString kind, reference, version;
-    reader_.LoadSequence(kind, reference, version);
-    ZORListValZORUnicodeString aliases, identifiers;
-    ZORMathTransformation* placements = nullptr;
-    reader_.GetReBuildSessionInfos(aliases, identifiers, placements);
-    placements_.reset(placements);
-    Collect(reader_.GetNodeList().item(0).getParentNode());
-  }
-  std::size_t Count() const { return elements_.size(); }
-  InterferenceScene Scene(std::size_t inIndex) const {
-    return ZORDefault::MakeInterferenceScene(
-        model.root, elements_[inIndex],
-        ZORDefault::ResultPlacements{placements_[2 * inIndex], placements_[2 * inIndex + 1]});
-  }
+constexpr char kSamples[] = ZOR_SOURCE_DIR "/samples/";
 
-  ZORDefault::OpenedModel model;
-
- private:
-  static ZORDefault::ModelOptions WithoutCache() {
-    ZORDefault::ModelOptions options;
-    options.useCache = false;
-    return options;
-  }
-  void Collect(const DOM_Node& inNode) {
-    for (DOM_Node node = inNode.getFirstChild(); !node.isNull(); node = node.getNextSibling()) {
-      if (node.getNodeName().equals("Interference")) elements_.push_back(node);
-      if (node.getNodeName().equals("ClashResult")) Collect(node);
-    }
-  }
-
-  std::string path_;
-  ZORClashParsing reader_;
-  std::unique_ptr<ZORMathTransformation[]> placements_;
-  std::vector<DOM_Node> elements_;
-};
-
-const Sample& Assembly() {
-  static const Sample sample("as1-oc-214.stp", "as1.clash.xml");
+const ResultOnModel& Assembly() {
+  static const ResultOnModel sample(kSamples + std::string("as1-oc-214.stp"),
+                                    kSamples + std::string("as1.clash.xml"));
   return sample;
 }
-const Sample& FrenchResult() {
-  static const Sample sample("dissonance_assembly.step", "dissonance.clash.xml");
+const ResultOnModel& FrenchResult() {
+  static const ResultOnModel sample(kSamples + std::string("dissonance_assembly.step"),
+                                    kSamples + std::string("dissonance.clash.xml"));
   return sample;
-}
-
-ZOR3DRep* RepOf(const ZORI3DGeoVisu_var& inObject) {
-  return inObject.IsNull() ? nullptr : dynamic_cast<ZOR3DRep*>(inObject->GetRep());
 }
 
 /// A third of the pictures of reports each way, for speed.
@@ -84,35 +34,12 @@ constexpr int kWidth = 252, kHeight = 168;
 /// What makes 200 pixels of a product, and 50 of markers, in reports.
 constexpr int kEnoughOfProduct = 23, kEnoughOfMarkers = 6;
 
-/// Pixels of the first product, the second one and the markers in a picture that frames the
-/// interference; nothing when it has a stored viewpoint.
-std::optional<std::array<int, 3>> SeenIn(const InterferenceScene& inScene) {
-  ZOR3DViewpoint viewpoint;
-  if (inScene.interference->FillViewpoint(&viewpoint) == 1) return std::nullopt;
-  ZOR3DRep* const things[3] = {RepOf(inScene.products[0]), RepOf(inScene.products[1]),
-                               RepOf(inScene.interference)};
-  auto* const all = new ZOR3DBagRep;
-  std::vector<std::size_t> owners;
-  for (std::size_t i = 0; i < 3; ++i) {
-    all->AddChild(things[i]);
-    owners.resize(owners.size() + ZORDefault::CollectDrawnMeshes(*things[i]).size(), i);
-  }
-  viewpoint.Reframe(kWidth, kHeight, 1, 1, things[2]->GetShowBoundingElement());
-  std::array<int, 3> counts{};
-  const auto pixels = ZORDefault::SeePixels(*all, viewpoint, kWidth, kHeight);
-  for (const SeenPixel& pixel : pixels.value())
-    if (pixel.mesh != SeenPixel::kNothing) ++counts[owners.at(pixel.mesh)];
-  things[2]->Destroy();
-  all->Destroy();
-  return counts;
-}
-
 /// @return how many pictures are framed; outGood: how many of them show all three things.
-int CountFramed(const Sample& inSample, int& outGood) {
+int CountFramed(const ResultOnModel& inSample, int& outGood) {
   int framed = 0;
   outGood = 0;
   for (std::size_t i = 0; i < inSample.Count(); ++i) {
-    const auto seen = SeenIn(inSample.Scene(i));
+    const auto seen = support::SeenWhereFramed(inSample.Scene(i), kWidth, kHeight);
     if (!seen) continue;
     ++framed;
     const auto& [first, second, markers] = *seen;
