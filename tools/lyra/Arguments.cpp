@@ -50,6 +50,11 @@ void Arguments::Number(const char* inNames, const char* inValue,
 void Arguments::Language(std::string& outLanguage) {
   Text("--lang", "LANG", outLanguage,
        "Language of the document's words, such as en or fr (default: that of the system)");
+  Words("--lang", kLanguages);
+}
+
+void Arguments::Words(const char* inName, std::span<const char* const> inWords) {
+  words_[app_.get_option(inName)] = {inWords.begin(), inWords.end()};
 }
 
 }  // namespace lyra

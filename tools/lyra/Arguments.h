@@ -2,21 +2,30 @@
 #ifndef ZOR_TOOLS_LYRA_ARGUMENTS_H
 #define ZOR_TOOLS_LYRA_ARGUMENTS_H
 
+#include <map>
 #include <optional>
+#include <span>
 #include <string>
 #include <vector>
 
 namespace CLI {
 class App;
-}
+class Option;
+}  // namespace CLI
 
 namespace lyra {
+
+/// The words that are worth offering for an option's value; what is read does not depend on them.
+using OptionWords = std::map<const CLI::Option*, std::vector<std::string>>;
+
+/// The languages that there are message catalogues of.
+inline constexpr const char* kLanguages[] = {"de", "en", "es", "fr", "it", "ja"};
 
 /// Declares the arguments of one verb. The variables are filled when the command line is read and
 /// must live until then; what is not given leaves its variable as it is.
 class Arguments {
  public:
-  explicit Arguments(CLI::App& ioApp) : app_(ioApp) {}
+  Arguments(CLI::App& ioApp, OptionWords& ioWords) : app_(ioApp), words_(ioWords) {}
 
   // Required, by position
   void Positional(const char* inName, std::string& outText, const char* inHelp);
@@ -37,8 +46,12 @@ class Arguments {
   /// The language of the message catalogues, for verbs that translate words of documents.
   void Language(std::string& outLanguage);
 
+  /// The words that an option takes, which is declared already: "--type".
+  void Words(const char* inName, std::span<const char* const> inWords);
+
  private:
   CLI::App& app_;
+  OptionWords& words_;
 };
 
 }  // namespace lyra

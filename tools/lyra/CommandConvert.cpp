@@ -1,4 +1,5 @@
 // lyra convert FILE --to json
+#include <array>
 #include <memory>
 
 #include "lyra/CommandErrors.h"
@@ -54,6 +55,7 @@ VerbAction DeclareConvert(Arguments& ioArguments) {
   const auto options = std::make_shared<ConvertOptions>();
   ioArguments.Positional("FILE", options->file, "Any clash result, or - for standard input");
   ioArguments.RequiredText("--to", "FORMAT", options->format, "json: all of it in one document");
+  ioArguments.Words("--to", std::array{"json"});
   ioArguments.Language(options->language);
   return [options](Output& ioOutput) { return Convert(*options, ioOutput); };
 }

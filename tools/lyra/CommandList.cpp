@@ -109,8 +109,10 @@ VerbAction DeclareList(Arguments& ioArguments) {
   ioArguments.Positional("FILE", options->file, "A clash result, or - for standard input");
   ioArguments.Texts("--type", "TYPE", options->types,
                     "Only clash, contact, clearance or error; may be given several times");
+  ioArguments.Words("--type", kTypeWords);
   ioArguments.Texts("--status", "STATUS", options->statuses,
                     "Only relevant, irrelevant, not-inspected or error; likewise");
+  ioArguments.Words("--status", kStatusWords);
   ioArguments.Text("--result", "NAME", options->result, "Only the result set of this name");
   ioArguments.Text("--product", "TEXT", options->product,
                    "Only with a product whose alias, identifier, instance or label holds TEXT");

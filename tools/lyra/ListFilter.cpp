@@ -1,6 +1,7 @@
 #include "lyra/ListFilter.h"
 
 #include <algorithm>
+#include <span>
 
 #include "lyra/CommandErrors.h"
 #include "lyra/SafeText.h"
@@ -17,7 +18,7 @@ std::string WordKey(const std::string& inWord) {
 }
 
 std::vector<std::string> KnownKeys(const std::vector<std::string>& inWords, const char* inOption,
-                                   const std::vector<const char*>& inKnown) {
+                                   std::span<const char* const> inKnown) {
   std::vector<std::string> keys;
   for (const std::string& word : inWords) {
     const std::string key = WordKey(word);
@@ -47,11 +48,11 @@ bool Holds(const ProductRecord& inProduct, const std::string& inFolded) {
 }  // namespace
 
 void ListFilter::SetTypes(const std::vector<std::string>& inWords) {
-  types_ = KnownKeys(inWords, "--type", {"clash", "contact", "clearance", "error"});
+  types_ = KnownKeys(inWords, "--type", kTypeWords);
 }
 
 void ListFilter::SetStatuses(const std::vector<std::string>& inWords) {
-  statuses_ = KnownKeys(inWords, "--status", {"relevant", "irrelevant", "not-inspected", "error"});
+  statuses_ = KnownKeys(inWords, "--status", kStatusWords);
 }
 
 void ListFilter::SetProduct(const std::string& inText) { product_ = CaseFolded(inText); }

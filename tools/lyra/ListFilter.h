@@ -10,6 +10,9 @@
 
 namespace lyra {
 
+inline constexpr const char* kTypeWords[] = {"clash", "contact", "clearance", "error"};
+inline constexpr const char* kStatusWords[] = {"relevant", "irrelevant", "not-inspected", "error"};
+
 /// All conditions must hold; an absent one always holds.
 class ListFilter {
  public:

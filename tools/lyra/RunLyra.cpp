@@ -1,18 +1,16 @@
 #include "lyra/RunLyra.h"
 
-#include <CLI/CLI.hpp>
 #include <csignal>
 #include <cstdio>
 #include <exception>
 #include <new>
 #include <string>
-#include <utility>
 #include <vector>
 
 #include "lyra/CommandErrors.h"
+#include "lyra/CommandLine.h"
 #include "lyra/Language.h"
 #include "lyra/SafeText.h"
-#include "lyra/Verbs.h"
 
 namespace lyra {
 namespace {
@@ -29,24 +27,6 @@ int ComplainOfUsage(const std::string& inReason) {
   Complain(inReason);
   std::fputs("see lyra --help\n", stderr);
   return kWrongUsage;
-}
-
-/// A verb's arguments as they are read, and what is then done with them.
-struct DeclaredVerb {
-  CLI::App* app;
-  VerbAction act;
-};
-
-std::vector<DeclaredVerb> DeclareVerbs(CLI::App& ioApp) {
-  std::vector<DeclaredVerb> declared;
-  for (const Verb& verb : Verbs()) {
-    CLI::App* app = ioApp.add_subcommand(verb.name, verb.summary);
-    app->set_help_flag("-h,--help", "Print this help");
-    app->group("Verbs");
-    Arguments arguments(*app);
-    declared.push_back({app, verb.declare(arguments)});
-  }
-  return declared;
 }
 
 // The parser calls a word that is no verb a missing subcommand.
@@ -66,21 +46,8 @@ int Act(const std::vector<DeclaredVerb>& inVerbs, Output& ioOutput) {
 }
 
 int ParseAndAct(int inCount, char** inArguments, Output& ioOutput) {
-  CLI::App app("Reads and shows the XML results of clash analyses.", "lyra");
-  app.set_help_flag("-h,--help", "Print this help");
-  app.set_version_flag("--version", "lyra " LYRA_VERSION, "Print the version");
-  std::string language;
-  app.add_option("--lang", language, "Language of the documents' words, before or after the verb")
-      ->type_name("LANG");
-  app.fallthrough();
-  app.require_subcommand(1);
-  app.get_formatter()->label("SUBCOMMAND", "VERB");
-  app.get_formatter()->label("REQUIRED", "");
-  app.get_formatter()->column_width(20);
-  app.footer(
-      "A FILE named \"-\" is standard input. \"lyra VERB --help\" explains a verb.\n"
-      "Exit code: 0 done, 1 the input or output cannot be used, 2 wrong usage.");
-  const std::vector<DeclaredVerb> verbs = DeclareVerbs(app);
+  CommandLine line;
+  CLI::App& app = line.app;
   try {
     app.parse(inCount, inArguments);
   } catch (const CLI::CallForHelp&) {
@@ -92,8 +59,8 @@ int ParseAndAct(int inCount, char** inArguments, Output& ioOutput) {
   } catch (const CLI::ParseError& error) {
     return ComplainOfUsage(UsageReason(app, error));
   }
-  ChooseLanguage(language);
-  return Act(verbs, ioOutput);
+  ChooseLanguage(line.language);
+  return Act(line.verbs, ioOutput);
 }
 
 }  // namespace

@@ -1,5 +1,6 @@
 // lyra publish RESULT --model MODEL -o DIR
 #include <algorithm>
+#include <array>
 #include <fstream>
 #include <memory>
 #include <sstream>
@@ -217,9 +218,11 @@ VerbAction DeclarePublish(Arguments& ioArguments) {
   ioArguments.Text("--size", "WxH", options->size,
                    "Width and height of a picture in pixels (default: 756x506)");
   ioArguments.Text("--format", "FORMAT", options->format, "jpeg (default) or png");
+  ioArguments.Words("--format", std::array{"jpeg", "png"});
   ioArguments.Text("--zoom", "WHAT", options->zoom,
                    "What pictures are framed on: interference or products (default: the setting "
                    "PictureZoom)");
+  ioArguments.Words("--zoom", std::array{"interference", "products"});
   ioArguments.Text("--xsl", "FILE", options->styleSheet,
                    "A style sheet of your own for the page (default: the setting XslTemplate)");
   ioArguments.Number("--jobs", "N", options->jobs,
