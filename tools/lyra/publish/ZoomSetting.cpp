@@ -29,8 +29,8 @@ ZoomSetting::~ZoomSetting() {
 void ZoomSetting::Apply() const {
   if (folder_.empty()) return;
   const char* const others = std::getenv("ZOR_SETTINGS_PATH");
-  const std::string path =
-      folder_.string() + (others != nullptr ? ":" + std::string(others) : std::string());
+  std::string path = folder_.string();
+  if (others != nullptr) path.append(1, ':').append(others);
   setenv("ZOR_SETTINGS_PATH", path.c_str(), 1);
 }
 
