@@ -6,6 +6,7 @@
 #include <filesystem>
 #include <regex>
 #include <set>
+#include <sstream>
 
 #include "tools/Command.h"
 
@@ -14,6 +15,7 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::IsSupersetOf;
+using testing::Not;
 
 namespace {
 
@@ -91,6 +93,13 @@ Words InBash(const Words& inWords) {
   const CommandResult result = RunShell(line);
   EXPECT_EQ(result.error, "");
   return Lines(result.out);
+}
+
+/// What bash offers for the value of an option, which is known to be something.
+Words WordsOf(const std::string& inVerb, const std::string& inOption) {
+  const Words words = InBash({"lyra", inVerb, inOption, ""});
+  EXPECT_THAT(words, Not(IsEmpty())) << inVerb << " " << inOption;
+  return words;
 }
 
 /// What fish offers at the end of a line, without what it says of each.
@@ -261,14 +270,14 @@ TEST(FishCompletion, OffersFilesOnlyWhereTheyAreWanted) {
 TEST(OptionWords, AreKnownToTheirVerbs) {
   const std::string file = "samples/as1.clash.xml";
   for (const char* option : {"--type", "--status"})
-    for (const std::string& word : InBash({"lyra", "list", option, ""}))
+    for (const std::string& word : WordsOf("list", option))
       EXPECT_EQ(RunCommand({"list", file, option, word}).code, 0) << option << word;
   // No such file, but no wrong usage.
-  for (const std::string& word : InBash({"lyra", "render", "--view", ""}))
+  for (const std::string& word : WordsOf("render", "--view"))
     EXPECT_EQ(RunCommand({"render", "none.stp", "-o", "/dev/null/a.png", "--view", word}).code, 1)
         << word;
   for (const char* option : {"--format", "--zoom"})
-    for (const std::string& word : InBash({"lyra", "publish", option, ""}))
+    for (const std::string& word : WordsOf("publish", option))
       EXPECT_EQ(RunCommand({"publish", "none.xml", "-o", "/dev/null/a", option, word}).code, 1)
           << option << word;
 }
