@@ -1,26 +1,16 @@
 #include "default_platform/product_structure/ReaderLibrary.h"
 
-#include <dlfcn.h>
-
 #include <mutex>
 
-#include "default_platform/system/SystemFiles.h"
+#include "default_platform/NeighbourLibrary.h"
 
 namespace ZORDefault {
 namespace {
 
-constexpr char kLibraryName[] = "libZORModelReader.so";
-
-/// Never unloaded: its own libraries keep state until the process ends.
 ReadModelFunction* LoadReader(std::string& outReason) {
-  const std::string path = LibraryDirectory() + '/' + kLibraryName;
-  void* const library = dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
-  void* const function = library ? dlsym(library, kReadModelName) : nullptr;
-  if (!function) {
-    const char* const error = dlerror();
-    outReason = std::string("cannot be read without the model reader: ") +
-                (error ? error : "it has no entry");
-  }
+  std::string reason;
+  void* const function = FindInNeighbourLibrary("libZORModelReader.so", kReadModelName, reason);
+  if (function == nullptr) outReason = "cannot be read without the model reader: " + reason;
   return reinterpret_cast<ReadModelFunction*>(function);
 }
 

@@ -1,21 +1,15 @@
 #include "default_platform/visualisation/RayCasterLibrary.h"
 
-#include <dlfcn.h>
-
 #include <mutex>
 
-#include "default_platform/system/SystemFiles.h"
+#include "default_platform/NeighbourLibrary.h"
 
 namespace ZORDefault {
 namespace {
 
-constexpr char kLibraryName[] = "libZORRayCaster.so";
-
-/// Never unloaded: meshes hold structures that its code frees.
 const RayCaster* LoadRayCaster() {
-  const std::string path = LibraryDirectory() + '/' + kLibraryName;
-  void* const library = dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
-  void* const function = library ? dlsym(library, kGetRayCasterName) : nullptr;
+  std::string reason;
+  void* const function = FindInNeighbourLibrary("libZORRayCaster.so", kGetRayCasterName, reason);
   return function ? reinterpret_cast<GetRayCasterFunction*>(function)() : nullptr;
 }
 

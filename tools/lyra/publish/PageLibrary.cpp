@@ -1,28 +1,28 @@
 #include "lyra/publish/PageLibrary.h"
 
-#include <dlfcn.h>
-
 #include <cstdio>
 
+#include "default_platform/NeighbourLibrary.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/SafeText.h"
 
 namespace lyra {
+namespace {
 
-PageLibrary::PageLibrary() : library_(dlopen("libZORPage.so", RTLD_NOW | RTLD_LOCAL)) {
-  if (library_ == nullptr)
-    throw InputError(std::string("the library that makes pages cannot be loaded: ") + dlerror());
+template <typename Function>
+Function* FindFunction(const char* inName) {
+  std::string reason;
+  void* const function = ZORDefault::FindInNeighbourLibrary("libZORPage.so", inName, reason);
+  if (function == nullptr)
+    throw InputError("the library that makes pages cannot be loaded: " + reason);
+  return reinterpret_cast<Function*>(function);
 }
 
-void* PageLibrary::Function(const char* inName) const {
-  void* const function = dlsym(library_, inName);
-  if (function == nullptr) throw InputError(std::string("libZORPage.so has no ") + inName);
-  return function;
-}
+}  // namespace
 
 std::string PageLibrary::MakePage(const PageRequest& inRequest) const {
   Page page;
-  if (!reinterpret_cast<MakePageFunction*>(Function(kMakePageName))(inRequest, page))
+  if (!FindFunction<MakePageFunction>(kMakePageName)(inRequest, page))
     throw InputError(inRequest.styleSheetName + ": " + page.reason);
   if (!page.messages.empty())
     std::fprintf(stderr, "lyra: warning: %s: %s\n", Printable(inRequest.styleSheetName).c_str(),
@@ -31,11 +31,11 @@ std::string PageLibrary::MakePage(const PageRequest& inRequest) const {
 }
 
 const char* PageLibrary::ReportStyleSheet() const {
-  return reinterpret_cast<ShippedTextFunction*>(Function(kReportStyleSheetName))();
+  return FindFunction<ShippedTextFunction>(kReportStyleSheetName)();
 }
 
 const char* PageLibrary::ReportType() const {
-  return reinterpret_cast<ShippedTextFunction*>(Function(kReportTypeName))();
+  return FindFunction<ShippedTextFunction>(kReportTypeName)();
 }
 
 }  // namespace lyra

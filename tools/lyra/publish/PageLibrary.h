@@ -6,20 +6,13 @@
 
 namespace lyra {
 
-/// Raises InputError when the library is not there.
+/// All raise InputError when the library is not there.
 class PageLibrary {
  public:
-  PageLibrary();
-
   /// @return the page. Raises InputError with the reason when there is none.
   std::string MakePage(const PageRequest& inRequest) const;
   const char* ReportStyleSheet() const;
   const char* ReportType() const;
-
- private:
-  void* Function(const char* inName) const;
-
-  void* library_;  // never unloaded: libxml2 keeps hold of what it was given
 };
 
 }  // namespace lyra
