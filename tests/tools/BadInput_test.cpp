@@ -179,9 +179,9 @@ TEST(BadInput, DocumentBeyondTheMemoryIsRefused) {
   const std::string path = directory.Write(
       "big.xml", "<ClashElement Responsible=\"" + std::string(100 << 20, 'x') + "\"/>");
   // The sanitizers reserve far more address space than they use.
-  if (RunShell("ulimit -v 250000; $LYRA info samples/as1.clash.xml").code != 0)
+  if (RunShell("ulimit -v 250000; lyra info samples/as1.clash.xml").code != 0)
     GTEST_SKIP() << "the address space cannot be limited here";
-  ExpectRefused(RunShell("ulimit -v 250000; $LYRA info " + path), "lyra: " + path + ": ");
+  ExpectRefused(RunShell("ulimit -v 250000; lyra info " + path), "lyra: " + path + ": ");
 }
 
 // A document of another kind says what it is.

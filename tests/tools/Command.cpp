@@ -54,8 +54,7 @@ CommandResult RunCommand(const std::vector<std::string>& inArguments,
 }
 
 CommandResult RunShell(const std::string& inLine) {
-  setenv("LYRA", kProgram.c_str(), 1);
-  return Run({"/bin/bash", "-c", inLine}, {});
+  return Run({"/bin/bash", "-c", "PATH='" ZOR_BINARY_DIR "/bin':$PATH; " + inLine}, {});
 }
 
 TemporaryDirectory::TemporaryDirectory() {

@@ -14,7 +14,7 @@ struct CommandResult {
 /// Runs the built command in the source directory, with the tests' environment.
 CommandResult RunCommand(const std::vector<std::string>& inArguments,
                          const std::string& inStandardInput = {});
-/// Runs a shell command line there; $LYRA is the command.
+/// Runs a shell command line there; "lyra" is the command.
 CommandResult RunShell(const std::string& inLine);
 
 /// A directory of the test's own that goes with this object.

@@ -20,7 +20,7 @@ struct Project : TemporaryDirectory {
     Write("results/push.xml", ReadFile(ZOR_SOURCE_DIR "/samples/pushdevice.clash.xml"));
   }
   CommandResult In(const std::string& inCommand) const {
-    return RunShell("cd " + Path("") + " && $LYRA " + inCommand);
+    return RunShell("cd " + Path("") + " && lyra " + inCommand);
   }
   /// What a check says of each link of a federator document.
   std::vector<std::string> Check(const std::string& inFederator, int inCode) const {
@@ -137,7 +137,7 @@ TEST(Path, ReferenceIsResolvedByTheTableOfLocations) {
   const TemporaryDirectory directory;
   directory.Write("DLNames.toml", "Reports = \"/srv/${LYRA_TEST_PLACE}/reports\"\n");
   const std::string run =
-      "ZOR_SETTINGS_PATH=" + directory.Path("") + " LYRA_TEST_PLACE=x $LYRA path ";
+      "ZOR_SETTINGS_PATH=" + directory.Path("") + " LYRA_TEST_PLACE=x lyra path ";
   EXPECT_EQ(RunShell(run + "'ZORDLN://Reports\\a\\b.xsl'").out, "/srv/x/reports\\a\\b.xsl\n");
   EXPECT_EQ(RunShell(run + "Reports").out, "/srv/x/reports\n");
 }
@@ -151,7 +151,7 @@ TEST(Path, UnknownReferenceFails) {
 TEST(Path, DirectoryThatCannotBeExpandedFails) {
   const TemporaryDirectory directory;
   directory.Write("DLNames.toml", "Reports = \"/srv/${LYRA_TEST_ABSENT}\"\n");
-  const std::string run = "ZOR_SETTINGS_PATH=" + directory.Path("") + " $LYRA path ";
+  const std::string run = "ZOR_SETTINGS_PATH=" + directory.Path("") + " lyra path ";
   EXPECT_EQ(RunShell(run + "'ZORDLN://Reports\\a'").code, 1);
   EXPECT_EQ(RunShell(run + "Reports").code, 1);
 }

@@ -118,14 +118,14 @@ TEST(ListFilters, UnknownTypeIsWrongUsageAndNamesTheKnown) {
   const CommandResult result = RunCommand({"list", kTwoSets, "--type", "crash"});
   EXPECT_EQ(result.code, 2);
   EXPECT_EQ(result.out, "");
-  EXPECT_THAT(result.error, HasSubstr("\"crash\"; known are clash contact clearance error\n"));
+  EXPECT_THAT(result.error, HasSubstr("\"crash\"; known are clash, contact, clearance, error\n"));
 }
 
 TEST(ListFilters, UnknownStatusIsWrongUsageAndNamesTheKnown) {
   const CommandResult result = RunCommand({"list", kTwoSets, "--status", "open"});
   EXPECT_EQ(result.code, 2);
   EXPECT_THAT(result.error,
-              HasSubstr("\"open\"; known are relevant irrelevant not-inspected error\n"));
+              HasSubstr("\"open\"; known are relevant, irrelevant, not-inspected, error\n"));
 }
 
 TEST(ListOfSingleInterference, IsThatOne) {

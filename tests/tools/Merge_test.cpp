@@ -191,7 +191,7 @@ TEST(Outputs, FailedWriteLeavesTheOldFileAndNothingElse) {
   for (const std::string& command : std::vector<std::string>{
            "merge " + kAs1 + " " + kAs1, "report " + kAs1, "federate " + kAs1}) {
     const std::string limit = command.starts_with("federate") ? "0" : "16";
-    const CommandResult result = RunShell("(ulimit -f " + limit + "; $LYRA " + command + " -o " +
+    const CommandResult result = RunShell("(ulimit -f " + limit + "; lyra " + command + " -o " +
                                           out + ") 2>&1 | cat >&2; exit ${PIPESTATUS[0]}");
     EXPECT_EQ(result.code, 1) << command;
     EXPECT_THAT(result.error, StartsWith("lyra: " + out + ": "));
@@ -241,7 +241,7 @@ TEST(Outputs, NewFileHasTheUsualPermissions) {
   namespace fs = std::filesystem;
   const TemporaryDirectory directory;
   const std::string out = directory.Path("new.xml");
-  ASSERT_EQ(RunShell("umask 027; $LYRA report " + kAs1 + " -o " + out).code, 0);
+  ASSERT_EQ(RunShell("umask 027; lyra report " + kAs1 + " -o " + out).code, 0);
   EXPECT_EQ(static_cast<int>(fs::status(out).permissions()), 0640);
 }
 

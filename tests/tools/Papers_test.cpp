@@ -104,9 +104,9 @@ Words WordsOf(const std::string& inVerb, const std::string& inOption) {
 
 /// What fish offers at the end of a line, without what it says of each.
 Words InFish(const std::string& inLine) {
-  const CommandResult result =
-      RunShell("cd resources && HOME=/nonexistent fish --no-config -c " +
-               Quoted("source " + kFish + "; complete -C \"" + inLine + "\"") + " | cut -f1");
+  const CommandResult result = RunShell(
+      "cd resources && HOME=/nonexistent fish --no-config -c " +
+      Quoted("source " + Quoted(kFish) + "; complete -C \"" + inLine + "\"") + " | cut -f1");
   EXPECT_EQ(result.code, 0);
   Words words = Lines(result.out);
   std::sort(words.begin(), words.end());

@@ -297,7 +297,7 @@ TEST_F(Publish, KilledRunGoesOn) {
   const std::string whole = directory_.Path("whole");
   fs::rename(folder_, whole);
   // Ended as soon as the first picture is there.
-  RunShell("$LYRA publish --jobs 1 --model " + kModel + " --size 90x60 -o " + folder_ + " " +
+  RunShell("lyra publish --jobs 1 --model " + kModel + " --size 90x60 -o " + folder_ + " " +
            kResult + " & for i in {1..1000}; do ls " + folder_ +
            "/pictures/*.jpg && break; sleep 0.01; done; kill -9 $!");
   EXPECT_EQ(RunSmall({"--resume"}).code, 0);
@@ -348,7 +348,7 @@ TEST_F(Publish, StyleSheetComesFromTheSettings) {
                                     "</xsl:template></xsl:stylesheet>");
   directory_.Write("ClashPublish.toml", "XslTemplate = \"" + directory_.Path("house.xsl") + "\"\n");
   const CommandResult result = RunShell("ZOR_SETTINGS_PATH=" + directory_.Path("") +
-                                        " $LYRA publish " + kResult + " -o " + folder_);
+                                        " lyra publish " + kResult + " -o " + folder_);
   EXPECT_EQ(result.code, 0) << result.error;
   EXPECT_EQ(Page(), "house");
 }
@@ -393,7 +393,7 @@ TEST_F(Publish, StyleSheetWritesNoFile) {
 }
 
 TEST_F(Publish, OtherVerbsLoadNoStyleSheetLibrary) {
-  const CommandResult result = RunShell("ldd $LYRA");
+  const CommandResult result = RunShell("ldd \"$(command -v lyra)\"");
   EXPECT_THAT(result.out, HasSubstr("libZORLyra.so"));
   EXPECT_THAT(result.out, Not(HasSubstr("xslt")));
 }

@@ -332,9 +332,10 @@ TEST_F(Render, MissingModelIsRefusedAndNothingWritten) {
 
 TEST_F(Render, WithoutTheDrawingLibraryNothingIsWritten) {
   const std::string line =
-      "mkdir " + directory.Path("lib") + " && cp -P $(dirname $LYRA)/../lib/lib*.so* " +
-      directory.Path("lib") + " && rm " + directory.Path("lib/libZORRayCaster.so") +
-      " && LD_LIBRARY_PATH=" + directory.Path("lib") + " $LYRA render " + kModel + " -o ";
+      "mkdir " + directory.Path("lib") +
+      " && cp -P \"$(dirname \"$(command -v lyra)\")\"/../lib/lib*.so* " + directory.Path("lib") +
+      " && rm " + directory.Path("lib/libZORRayCaster.so") +
+      " && LD_LIBRARY_PATH=" + directory.Path("lib") + " lyra render " + kModel + " -o ";
   for (const char* name : {"a.png", "a.jpg"}) {
     const CommandResult result = RunShell(line + directory.Path(name));
     EXPECT_EQ(result.code, 1) << result.error;

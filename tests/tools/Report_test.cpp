@@ -175,7 +175,7 @@ TEST(Report, StyleSheetComesFromTheSettings) {
   directory.Write("ClashPublish.toml", "XslTemplate = \"house.xsl\"\n");
   const std::string path = directory.Path("report.xml");
   ASSERT_EQ(RunShell("ZOR_SETTINGS_PATH=" + directory.Path("") +
-                     " $LYRA report samples/as1.clash.xml -o " + path)
+                     " lyra report samples/as1.clash.xml -o " + path)
                 .code,
             0);
   EXPECT_THAT(ReadFile(path), HasSubstr("href=\"house.xsl\""));

@@ -68,32 +68,32 @@ TEST(Streams, StandardInputIsReadForADash) {
 }
 
 TEST(Streams, PipeOnStandardInputIsReadForADash) {
-  const CommandResult piped = RunShell("cat samples/stamp_c6lora.clash.xml | $LYRA list --csv -");
+  const CommandResult piped = RunShell("cat samples/stamp_c6lora.clash.xml | lyra list --csv -");
   EXPECT_EQ(piped.code, 0) << piped.error;
   EXPECT_EQ(piped.out, RunCommand({"list", "--csv", "samples/stamp_c6lora.clash.xml"}).out);
 }
 
 TEST(Streams, ReaderThatLeavesEndsTheCommandQuietly) {
   const CommandResult result =
-      RunShell("set -o pipefail; $LYRA list --json samples/stamp_c6lora.clash.xml | head -n 1");
+      RunShell("set -o pipefail; lyra list --json samples/stamp_c6lora.clash.xml | head -n 1");
   EXPECT_EQ(result.code, 0);
   EXPECT_EQ(result.out, "[\n");
   EXPECT_EQ(result.error, "");
 }
 
 TEST(Streams, FullDiskIsReported) {
-  const CommandResult result = RunShell("$LYRA list samples/as1.clash.xml >/dev/full");
+  const CommandResult result = RunShell("lyra list samples/as1.clash.xml >/dev/full");
   EXPECT_EQ(result.code, 1);
   EXPECT_EQ(result.error, "lyra: standard output: No space left on device\n");
 }
 
 TEST(Streams, FullDiskIsReportedForAShortAnswerToo) {
-  EXPECT_EQ(RunShell("$LYRA --version >/dev/full").code, 1);
-  EXPECT_EQ(RunShell("$LYRA --help >/dev/full").code, 1);
+  EXPECT_EQ(RunShell("lyra --version >/dev/full").code, 1);
+  EXPECT_EQ(RunShell("lyra --help >/dev/full").code, 1);
 }
 
 TEST(Streams, ClosedStandardOutputIsReported) {
-  EXPECT_EQ(RunShell("$LYRA info samples/as1.clash.xml >&-").code, 1);
+  EXPECT_EQ(RunShell("lyra info samples/as1.clash.xml >&-").code, 1);
 }
 
 TEST(InfoOfSeveral, GoesOnAfterOneThatFails) {
@@ -135,7 +135,7 @@ TEST(InfoCounts, DeclaredAndFoundAreTold) {
 
 TEST(Terminal, TableIsCutToTheColumnsAndItsHeaderIsBold) {
   const CommandResult result = RunShell(
-      "COLUMNS=60 script -qec \"$LYRA list samples/as1.clash.xml\" /dev/null | tr -d '\\r'");
+      "COLUMNS=60 script -qec \"lyra list samples/as1.clash.xml\" /dev/null | tr -d '\\r'");
   ASSERT_EQ(result.code, 0) << result.error;
   EXPECT_THAT(result.out, StartsWith("\033[1m"));
   EXPECT_THAT(result.out, HasSubstr("…"));
@@ -144,20 +144,20 @@ TEST(Terminal, TableIsCutToTheColumnsAndItsHeaderIsBold) {
 
 TEST(Terminal, NoColorKeepsTheHeaderPlain) {
   const CommandResult result =
-      RunShell("NO_COLOR=1 COLUMNS=200 script -qec \"$LYRA list samples/as1.clash.xml\" /dev/null");
+      RunShell("NO_COLOR=1 COLUMNS=200 script -qec \"lyra list samples/as1.clash.xml\" /dev/null");
   ASSERT_EQ(result.code, 0) << result.error;
   EXPECT_EQ(result.out.find('\033'), std::string::npos);
 }
 
 TEST(Terminal, NothingIsCutOrBoldInAFile) {
-  const CommandResult result = RunShell("COLUMNS=20 $LYRA list samples/as1.clash.xml");
+  const CommandResult result = RunShell("COLUMNS=20 lyra list samples/as1.clash.xml");
   EXPECT_EQ(result.out.find('\033'), std::string::npos);
   EXPECT_EQ(result.out.find("…"), std::string::npos);
 }
 
 TEST(Terminal, CsvOfADocumentCannotDriveIt) {
   const CommandResult result =
-      RunShell("script -qec \"$LYRA list --csv tests/golden/inputs/hostile.xml\" /dev/null");
+      RunShell("script -qec \"lyra list --csv tests/golden/inputs/hostile.xml\" /dev/null");
   EXPECT_THAT(result.out, HasSubstr("\\u{9B}2J"));
   EXPECT_EQ(result.out.find("\xC2\x9B"), std::string::npos);
 }

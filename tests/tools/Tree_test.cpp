@@ -208,7 +208,7 @@ TEST(Tree, StandardInputIsRefused) {
 TEST(Tree, ProgressIsShownOnATerminalAndTakenBack) {
   const TemporaryDirectory cache;
   const CommandResult result =
-      RunShell("XDG_CACHE_HOME=" + cache.Path("") + " script -qec \"$LYRA tree " + kModel +
+      RunShell("XDG_CACHE_HOME=" + cache.Path("") + " script -qec \"lyra tree " + kModel +
                " >/dev/null\" /dev/null");
   EXPECT_EQ(result.code, 0);
   EXPECT_THAT(result.out, HasSubstr("\rreading " + kModel + " 100%"));
@@ -217,7 +217,7 @@ TEST(Tree, ProgressIsShownOnATerminalAndTakenBack) {
 
 /// The libraries that a run of the command loads.
 std::string LibrariesOf(const std::string& inArguments) {
-  return RunShell("LD_DEBUG=files $LYRA " + inArguments + " 2>&1 >/dev/null").out;
+  return RunShell("LD_DEBUG=files lyra " + inArguments + " 2>&1 >/dev/null").out;
 }
 
 TEST(HeavyLibraries, OtherVerbsLoadNone) {
