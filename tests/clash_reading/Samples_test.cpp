@@ -85,14 +85,19 @@ TEST(Sample, DissonanceHasFrenchWordsAndDecimalCommas) {
   EXPECT_EQ("1.2", Text(loaded.version));
   SharedReader reader(support::ReadFile(kFrenchSample));
   support::ClashInfos infos;
-  infos.Read(*reader, "1.2", 1);
+  infos.Read(*reader, "1.2", 12);
   EXPECT_EQ("dissonance.Result.1", Text(infos.resultName));
   EXPECT_EQ("Clash", infos[1]);
-  EXPECT_EQ("Not inspected", infos[3]);
+  EXPECT_EQ("Relevant", infos[3]);
   EXPECT_EQ("New", infos[5]);
-  EXPECT_EQ("Part 1.1", infos[8]);
+  EXPECT_EQ("Assembly 2 <1> --++-- CONNECTOR,JST PH SERIES,FEMALE_02 (PHR-2).1", infos[8]);
+  EXPECT_EQ("7.57681", infos[25]);
+  EXPECT_EQ("-13.97/38.6472/8.98/-13.97/38.6472/8.98", infos[28]);
+  EXPECT_EQ("Cylindric", infos[32]);
+  infos.Read(*reader, "1.2", 1);
+  EXPECT_EQ("Clash", infos[1]);
+  EXPECT_EQ("Not inspected", infos[3]);
   EXPECT_EQ("154.643", infos[25]);
-  EXPECT_EQ("-2.10819/-0.270597/76/-2.10819/-0.270597/76", infos[28]);
   EXPECT_EQ("NOVIEWPOINT", infos[32]);
 }
 
