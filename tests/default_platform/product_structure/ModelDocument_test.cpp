@@ -65,9 +65,9 @@ TEST(ModelDocument, ProviderIsKeptUntilTheEnd) {
 }
 
 TEST(ModelDocument, ProviderIsTakenOnceForAnInterface) {
+  ZORBaseUnknown provider;  // must outlive the document, which keeps it
   const auto model = OpenSample();
   const ZORIProviders_var providers = model.document;
-  ZORBaseUnknown provider;
   EXPECT_EQ(providers->AddProvider(ZORIAlias::ClassId(), &provider), S_OK);
   EXPECT_EQ(providers->AddProvider(ZORIAlias::ClassId(), &provider), E_FAIL);
   EXPECT_EQ(providers->AddProvider(ZORIProduct::ClassId(), &provider), S_OK);
