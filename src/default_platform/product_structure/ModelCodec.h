@@ -10,7 +10,7 @@
 namespace ZORDefault {
 
 /// Counts up with every change of the bytes or of what a reading gives.
-inline constexpr std::uint32_t kModelCodecVersion = 2;
+inline constexpr std::uint32_t kModelCodecVersion = 3;
 
 /// In the machine's own byte order: entries are not moved between machines.
 std::string EncodeModel(const ModelData& inModel);

@@ -16,6 +16,7 @@
 #include <XCAFDoc_DocumentTool.hxx>
 #include <XCAFDoc_ShapeTool.hxx>
 #include <XCAFPrs_DocumentExplorer.hxx>
+#include <algorithm>
 #include <map>
 #include <stdexcept>
 
@@ -84,6 +85,8 @@ Count CountIndependently(const std::string& inPath) {
     if (isNew) known->second = AreaOf(XCAFDoc_ShapeTool::GetShape(part));
     ++count.leaves;
     count.area += known->second;
+    const gp_XYZ place = explorer.Current().Location.Transformation().TranslationPart();
+    count.farthest = std::max(count.farthest, place.Modulus());
   }
   count.parts = areas.size();
   return count;

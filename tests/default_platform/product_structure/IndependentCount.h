@@ -10,7 +10,8 @@ namespace products {
 struct Count {
   std::size_t leaves = 0;
   std::size_t parts = 0;
-  double area = 0;  ///< of all leaves, square millimetres
+  double area = 0;      ///< of all leaves, square millimetres
+  double farthest = 0;  ///< of the leaves' origins from the root's, millimetres
 };
 
 /// Of a STEP or GLB file, by the geometry kernel's own walk through the document and, for surfaces,

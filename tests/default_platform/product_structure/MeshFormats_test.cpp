@@ -46,10 +46,41 @@ std::string Gltf(const std::string& inNodes, const std::string& inRoots) {
 
 const std::vector<float> kTriangle = {0, 0, 0, 1, 0, 0, 0, 2, 0};
 
+std::string LittleEndian32(std::size_t inNumber) {
+  std::string bytes;
+  for (int shift = 0; shift < 32; shift += 8) bytes += static_cast<char>(inNumber >> shift & 0xFF);
+  return bytes;
+}
+
+/// The same scene in one binary file, points included.
+std::string Glb(const std::string& inNodes, const std::string& inRoots) {
+  std::string text = Gltf(inNodes, inRoots);
+  const std::string reference = R"("uri":"points.bin",)";
+  text.erase(text.find(reference), reference.size());
+  text.resize((text.size() + 3) / 4 * 4, ' ');
+  const std::string points = Floats(kTriangle);
+  const std::string chunks = LittleEndian32(text.size()) + "JSON" + text +
+                             LittleEndian32(points.size()) + std::string("BIN\0", 4) + points;
+  return "glTF" + LittleEndian32(2) + LittleEndian32(12 + chunks.size()) + chunks;
+}
+
+/// Two squares of 10 by 10, of different materials, as two objects.
+const char kTwoObjects[] =
+    "mtllib a.mtl\nv 0 0 0\nv 10 0 0\nv 10 10 0\nv 0 10 0\nv 0 0 5\nv 10 0 5\nv 10 10 5\nv 0 10 "
+    "5\no low\nusemtl red\nf 1 2 3 4\no high\nusemtl green\nf 5 6 7\nf 5 7 8\n";
+
 const ZORIProduct_var OnlyLeaf(const ZORDefault::OpenedModel& inModel) {
   const auto leaves = products::Leaves(inModel.root);
   EXPECT_EQ(leaves.size(), 1u);
   return leaves.at(0);
+}
+
+/// The colour in which all of a product is shown, wherever the file has it.
+PartColour ColourOf(const ZORIProduct_var& inProduct) {
+  const auto facts = FactsOf(inProduct);
+  if (facts.mesh->colours.empty()) return facts.colour.value_or(PartColour());
+  EXPECT_EQ(facts.mesh->colours.size(), 1u);
+  return facts.mesh->colours[0];
 }
 }  // namespace
 
@@ -65,6 +96,23 @@ TEST(MeshFormats, ObjCubeHasItsFacesAndSharpEdges) {
   EXPECT_NEAR(facts.mesh->origin.x, 5, 1e-6);
   EXPECT_NEAR(facts.mesh->origin.z, 5, 1e-6);
   EXPECT_NEAR(facts.mesh->sphere.radius, std::sqrt(75.0), 1e-4);
+}
+
+TEST(MeshFormats, ObjObjectsArePartsWithTheirNamesAndColours) {
+  const Folder folder;
+  folder.Write("a.mtl", "newmtl red\nKd 1 0 0\nnewmtl green\nKd 0 1 0\n");
+  const auto model = products::OpenAnew(folder.Write("pair.obj", kTwoObjects));
+  EXPECT_EQ(products::AliasOf(model.root), "pair");
+  const auto leaves = products::Leaves(model.root);
+  ASSERT_EQ(leaves.size(), 2u);
+  EXPECT_EQ(products::AliasOf(leaves[0]), "low");
+  EXPECT_EQ(products::AliasOf(leaves[1]), "high");
+  for (const auto& leaf : leaves) {
+    EXPECT_EQ(FactsOf(leaf).triangles, 2u);
+    EXPECT_NEAR(FactsOf(leaf).area, 100, 1e-4);  // the numbers are millimetres
+  }
+  EXPECT_EQ(ColourOf(leaves[0]), (PartColour{255, 0, 0, 255}));
+  EXPECT_EQ(ColourOf(leaves[1]), (PartColour{0, 255, 0, 255}));
 }
 
 TEST(MeshFormats, RootWithoutNameTakesTheFileName) {
@@ -125,12 +173,7 @@ TEST(MeshFormats, GltfMaterialGivesTheColour) {
   folder.Write("points.bin", Floats(kTriangle));
   const auto model =
       products::OpenAnew(folder.Write("a.gltf", Gltf(R"([{"name":"leaf","mesh":0}])", "[0]")));
-  const auto facts = FactsOf(OnlyLeaf(model));
-  const PartColour expected = {255, 0, 0, 128};
-  if (facts.colour)
-    EXPECT_EQ(*facts.colour, expected);
-  else
-    EXPECT_THAT(facts.mesh->colours, testing::ElementsAre(expected));
+  EXPECT_EQ(ColourOf(OnlyLeaf(model)), (PartColour{255, 0, 0, 128}));
 }
 
 TEST(MeshFormats, GltfNodesShareTheirMeshAndKeepTheirNames) {
@@ -149,6 +192,22 @@ TEST(MeshFormats, GltfNodesShareTheirMeshAndKeepTheirNames) {
   EXPECT_NEAR(moved.x, 1000, 1e-3);
   EXPECT_NEAR(moved.y, -3000, 1e-3);
   EXPECT_NEAR(moved.z, 2000, 1e-3);
+}
+
+TEST(MeshFormats, GlbBecomesMillimetresWithZUpwards) {
+  const Folder folder;
+  const auto model = products::OpenAnew(
+      folder.Write("a.glb", Glb(R"([{"name":"top","children":[1,2]},{"name":"one","mesh":0},
+                       {"name":"two","mesh":0,"translation":[0,3,0]}])",
+                                "[0]")));
+  const auto leaves = products::Leaves(model.root);
+  ASSERT_EQ(leaves.size(), 2u);
+  EXPECT_EQ(FactsOf(leaves[0]).mesh, FactsOf(leaves[1]).mesh);
+  EXPECT_EQ(FactsOf(leaves[0]).triangles, 1u);
+  EXPECT_NEAR(FactsOf(leaves[0]).area, 1e6, 1);
+  const ZORMathVector place = FactsOf(leaves[1]).rootFromProduct.GetVector();
+  EXPECT_NEAR(place.x, 0, 1e-3);
+  EXPECT_NEAR(place.z, 3000, 1e-3);
 }
 
 TEST(MeshFormats, GltfWithSeveralRootsGetsOneAbove) {

@@ -21,6 +21,16 @@ namespace fs = std::filesystem;
 namespace {
 const std::string kSample = products::Sample("as1-oc-214.stp");
 
+/// A model that is opened at once.
+class TinyModel {
+ public:
+  const std::string& GetPath() const { return path_; }
+
+ private:
+  Folder folder_;
+  std::string path_ = folder_.Write("tiny.obj", "v 0 0 0\nv 1 0 0\nv 0 1 0\nf 1 2 3\n");
+};
+
 /// Opens with warnings collected.
 OpenedModel OpenWarned(const std::string& inPath, std::vector<std::string>& outWarnings) {
   ModelOptions options;
@@ -38,9 +48,10 @@ void Damage(const std::string& inPath, std::streamoff inPosition) {
 }  // namespace
 
 TEST(ModelCache, SecondOpeningComesFromIt) {
+  const TinyModel tiny;
   const OwnCache cache;
-  EXPECT_FALSE(OpenModel(kSample).isFromCache);
-  EXPECT_TRUE(OpenModel(kSample).isFromCache);
+  EXPECT_FALSE(OpenModel(tiny.GetPath()).isFromCache);
+  EXPECT_TRUE(OpenModel(tiny.GetPath()).isFromCache);
 }
 
 TEST(ModelCache, SecondOpeningGivesTheSame) {
@@ -92,22 +103,25 @@ TEST(ModelCache, OtherBytesAreAnotherModel) {
 }
 
 TEST(ModelCache, OtherDeflectionIsAnotherModel) {
+  const TinyModel tiny;
   const OwnCache cache;
-  OpenModel(kSample);
+  OpenModel(tiny.GetPath());
   ModelOptions options;
   options.deflection = 0.01;
-  EXPECT_FALSE(OpenModel(kSample, options).isFromCache);
+  EXPECT_FALSE(OpenModel(tiny.GetPath(), options).isFromCache);
 }
 
 TEST(ModelCache, SwitchedOffWritesNothing) {
+  const TinyModel tiny;
   const OwnCache cache;
-  products::OpenAnew(kSample);
+  products::OpenAnew(tiny.GetPath());
   EXPECT_FALSE(fs::exists(cache.GetDirectory()));
 }
 
 TEST(ModelCache, DamagedEntryIsNoticedAndMadeAnew) {
+  const TinyModel tiny;
   const OwnCache cache;
-  OpenModel(kSample);
+  OpenModel(tiny.GetPath());
   const std::string entry = cache.GetOnlyEntry(), whole = products::ReadAll(entry);
   ASSERT_FALSE(whole.empty());
   const auto size = static_cast<std::streamoff>(whole.size());
@@ -115,43 +129,47 @@ TEST(ModelCache, DamagedEntryIsNoticedAndMadeAnew) {
                                         std::streamoff{25}, size / 2, size - 1}) {
     Damage(entry, position);
     std::vector<std::string> warnings;
-    EXPECT_FALSE(OpenWarned(kSample, warnings).isFromCache) << position;
-    EXPECT_THAT(warnings,
-                ElementsAre(kSample + ": its entry in the cache was damaged and is made anew"));
+    EXPECT_FALSE(OpenWarned(tiny.GetPath(), warnings).isFromCache) << position;
+    EXPECT_THAT(warnings, ElementsAre(tiny.GetPath() +
+                                      ": its entry in the cache was damaged and is made anew"));
     EXPECT_EQ(products::ReadAll(entry), whole) << position;
   }
 }
 
 TEST(ModelCache, CutEntryIsNoticedAndMadeAnew) {
+  const TinyModel tiny;
   const OwnCache cache;
-  OpenModel(kSample);
+  OpenModel(tiny.GetPath());
   const std::string entry = cache.GetOnlyEntry(), whole = products::ReadAll(entry);
   for (const std::size_t length : {std::size_t{0}, std::size_t{10}, whole.size() / 2}) {
     std::ofstream(entry, std::ios::binary) << whole.substr(0, length);
-    EXPECT_FALSE(OpenModel(kSample).isFromCache) << length;
+    EXPECT_FALSE(OpenModel(tiny.GetPath()).isFromCache) << length;
     EXPECT_EQ(products::ReadAll(entry), whole) << length;
   }
 }
 
 TEST(ModelCache, UnwritableDirectoryIsNoFailure) {
+  const TinyModel tiny;
   const Folder folder;
   const support::ScopedVariable variable("XDG_CACHE_HOME", folder.Write("file", "in the way"));
-  EXPECT_FALSE(OpenModel(kSample).isFromCache);
-  EXPECT_FALSE(OpenModel(kSample).isFromCache);
+  EXPECT_FALSE(OpenModel(tiny.GetPath()).isFromCache);
+  EXPECT_FALSE(OpenModel(tiny.GetPath()).isFromCache);
 }
 
 TEST(ModelCache, StandsBelowHomeWithoutItsOwnVariable) {
+  const TinyModel tiny;
   const Folder folder;
   const support::ScopedVariable cache("XDG_CACHE_HOME", "");
   const support::ScopedVariable home("HOME", folder.GetPath());
-  OpenModel(kSample);
+  OpenModel(tiny.GetPath());
   EXPECT_TRUE(fs::exists(folder.GetPath() + "/.cache/zorlyra"));
-  EXPECT_TRUE(OpenModel(kSample).isFromCache);
+  EXPECT_TRUE(OpenModel(tiny.GetPath()).isFromCache);
 }
 
 TEST(ModelCache, LeavesNothingBesideItsEntry) {
+  const TinyModel tiny;
   const OwnCache cache;
-  OpenModel(kSample);
+  OpenModel(tiny.GetPath());
   EXPECT_THAT(cache.GetOnlyEntry(), testing::EndsWith(".model"));
 }
 

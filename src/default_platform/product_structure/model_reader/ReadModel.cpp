@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <exception>
 #include <filesystem>
+#include <vector>
 
 #include "default_platform/product_structure/ModelReaderEntry.h"
 #include "default_platform/product_structure/model_reader/DocumentReading.h"
@@ -43,6 +44,10 @@ void MeshParts(const std::vector<TDF_Label>& inLabels, double inDeflection,
     if (!ioModel.parts[i].isAssembly) MeshPart(inLabels[i], inDeflection, ioModel.parts[i]);
 }
 
+std::string Counted(std::size_t inCount, const char* inOne, const char* inSeveral) {
+  return std::to_string(inCount) + ' ' + (inCount == 1 ? inOne : inSeveral);
+}
+
 void WarnOfMissingTriangles(ModelData& ioModel) {
   std::size_t parts = 0, faces = 0;
   for (const ModelPart& part : ioModel.parts) {
@@ -50,15 +55,39 @@ void WarnOfMissingTriangles(ModelData& ioModel) {
     faces += part.facesWithoutTriangles;
   }
   if (parts > 0)
-    ioModel.warnings.push_back(std::to_string(parts) + " parts could not be tessellated");
-  if (faces > 0) ioModel.warnings.push_back(std::to_string(faces) + " faces have no triangles");
+    ioModel.warnings.push_back(Counted(parts, "part", "parts") + " could not be tessellated");
+  if (faces > 0)
+    ioModel.warnings.push_back(Counted(faces, "face has", "faces have") + " no triangles");
 }
 
 void WarnOfScaledNodes(const ModelRequest& inRequest, ModelData& ioModel) {
   if (inRequest.format != ModelFormat::kGltf && inRequest.format != ModelFormat::kGlb) return;
   const std::size_t nodes = CountScaledNodes(inRequest.path);
   if (nodes > 0)
-    ioModel.warnings.push_back(std::to_string(nodes) + " scaled nodes are shown without scale");
+    ioModel.warnings.push_back(Counted(nodes, "scaled node is", "scaled nodes are") +
+                               " shown without scale");
+}
+
+/// Messages of the kernel may have several lines.
+std::string OneLine(const char* inMessage) {
+  std::string line = inMessage ? inMessage : "";
+  std::ranges::replace_if(
+      line, [](unsigned char byte) { return byte < 0x20; }, ' ');
+  return line;
+}
+
+/// "" when all are there.
+std::string TellMissingFiles(const ModelRequest& inRequest, const ModelData& inModel) {
+  const auto folder = std::filesystem::path(inRequest.path).parent_path();
+  std::vector<std::string> missing = inModel.otherFiles;
+  std::erase_if(missing, [&](const std::string& file) {
+    std::error_code error;
+    return std::filesystem::exists(folder / file, error);
+  });
+  if (missing.empty()) return "";
+  if (missing.size() == 1) return "its file " + missing[0] + " is missing";
+  return "its file " + missing[0] + " and " + std::to_string(missing.size() - 1) +
+         " more are missing";
 }
 
 /// Readers of meshes call a root without name as the file, but the file may be renamed.
@@ -86,17 +115,13 @@ bool Read(const ModelRequest& inRequest, ModelData& outModel, std::string& outRe
   ForgetFileName(inRequest, outModel);
   WarnOfMissingTriangles(outModel);
   WarnOfScaledNodes(inRequest, outModel);
-  if (HasGeometry(outModel)) return true;
-  outReason = "holds no geometry";
-  return false;
-}
-
-/// Messages of the kernel may have several lines.
-std::string OneLine(const char* inMessage) {
-  std::string line = inMessage ? inMessage : "";
-  std::ranges::replace_if(
-      line, [](unsigned char byte) { return byte < 0x20; }, ' ');
-  return line;
+  const std::string missingFiles = OneLine(TellMissingFiles(inRequest, outModel).c_str());
+  if (!HasGeometry(outModel)) {
+    outReason = missingFiles.empty() ? "holds no geometry" : "holds no geometry; " + missingFiles;
+    return false;
+  }
+  if (!missingFiles.empty()) outModel.warnings.push_back(missingFiles);
+  return true;
 }
 
 }  // namespace
