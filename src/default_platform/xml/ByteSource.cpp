@@ -31,6 +31,11 @@ std::size_t ByteReader::Read(unsigned char* outBytes, std::size_t inMost) {
   return count;
 }
 
+void ByteReader::Rewind() {
+  DoRewind();
+  given_ = 0;
+}
+
 namespace {
 
 #ifdef _WIN32
@@ -41,6 +46,7 @@ int StatusOf(int inFile, FileStatus* outStatus) { return _fstat64(inFile, outSta
 std::ptrdiff_t ReadSome(int inFile, void* outBytes, std::size_t inMost) {
   return _read(inFile, outBytes, static_cast<unsigned int>(inMost));
 }
+bool SeekStart(int inFile) { return _lseeki64(inFile, 0, SEEK_SET) == 0; }
 void CloseDescriptor(int inFile) { _close(inFile); }
 bool IsDirectory(const FileStatus& inStatus) { return (inStatus.st_mode & _S_IFMT) == _S_IFDIR; }
 bool IsRegular(const FileStatus& inStatus) { return (inStatus.st_mode & _S_IFMT) == _S_IFREG; }
@@ -53,6 +59,7 @@ int StatusOf(int inFile, FileStatus* outStatus) { return fstat(inFile, outStatus
 std::ptrdiff_t ReadSome(int inFile, void* outBytes, std::size_t inMost) {
   return read(inFile, outBytes, inMost);
 }
+bool SeekStart(int inFile) { return lseek(inFile, 0, SEEK_SET) == 0; }
 void CloseDescriptor(int inFile) { close(inFile); }
 bool IsDirectory(const FileStatus& inStatus) { return S_ISDIR(inStatus.st_mode); }
 bool IsRegular(const FileStatus& inStatus) { return S_ISREG(inStatus.st_mode); }
@@ -88,6 +95,12 @@ class FileReader : public ByteReader {
     return 1 + FromFile(outBytes + 1, inMost - 1);
   }
 
+  void DoRewind() override {
+    if (!SeekStart(file_)) FailWithErrno();
+    hasFirst_ = false;
+    isFirstGiven_ = false;
+  }
+
   std::size_t FromFile(unsigned char* outBytes, std::size_t inMost) {
     std::ptrdiff_t count = 0;
     do {
@@ -116,19 +129,21 @@ class FileReader : public ByteReader {
 
 class MemoryReader : public ByteReader {
  public:
-  MemoryReader(const unsigned char* inBytes, std::size_t inCount) : at_(inBytes), left_(inCount) {}
-  bool IsEmpty() override { return left_ == 0 && Given() == 0; }
+  MemoryReader(const unsigned char* inBytes, std::size_t inCount)
+      : bytes_(inBytes), count_(inCount), left_(inCount) {}
+  bool IsEmpty() override { return count_ == 0; }
 
  private:
   std::size_t DoRead(unsigned char* outBytes, std::size_t inMost) override {
     const std::size_t count = std::min(inMost, left_);
-    if (count != 0) std::memcpy(outBytes, at_, count);
-    at_ += count;
+    if (count != 0) std::memcpy(outBytes, bytes_ + (count_ - left_), count);
     left_ -= count;
     return count;
   }
+  void DoRewind() override { left_ = count_; }
 
-  const unsigned char* at_;
+  const unsigned char* bytes_;
+  std::size_t count_;
   std::size_t left_;
 };
 
@@ -154,6 +169,13 @@ std::unique_ptr<ByteReader> OpenFile(const char* inPath) {
 
 std::unique_ptr<ByteReader> OpenMemory(const MemorySource& inSource) {
   return std::make_unique<MemoryReader>(inSource.Bytes(), inSource.Count());
+}
+
+ReaderEntity::ReaderEntity(ByteReader& ioReader, const std::string& inName) : reader_(ioReader) {
+  const ZORUnicodeString name(inName.c_str());
+  const std::u16string terminated(name.ConvertToUCChar(),
+                                  static_cast<std::size_t>(name.GetLengthInChar()));
+  setSystemId(terminated.c_str());
 }
 
 xercesc::BinInputStream* ReaderEntity::makeStream() const { return new ReaderStream(reader_); }

@@ -41,9 +41,12 @@ class ByteReader {
   std::uint64_t Given() const { return given_; }
   /// Whether there is nothing to read at all.
   virtual bool IsEmpty() = 0;
+  /// Begins again.
+  void Rewind();
 
  private:
   virtual std::size_t DoRead(unsigned char* outBytes, std::size_t inMost) = 0;
+  virtual void DoRewind() = 0;
   std::uint64_t given_ = 0;
 };
 
@@ -55,7 +58,8 @@ std::unique_ptr<ByteReader> OpenMemory(const MemorySource& inSource);
 /// Gives a reader to the XML library as its one and only entity.
 class ReaderEntity : public xercesc::InputSource {
  public:
-  explicit ReaderEntity(ByteReader& ioReader) : reader_(ioReader) {}
+  /// @param inName what the library calls the entity by in its messages.
+  ReaderEntity(ByteReader& ioReader, const std::string& inName);
   xercesc::BinInputStream* makeStream() const override;
 
  private:

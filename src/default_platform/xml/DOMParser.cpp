@@ -9,12 +9,28 @@
 
 namespace {
 
+// The short way; null for a document that must go the long one. That one alone tells what is wrong
+// with a document, and where.
+DOM_Document ScanPlainDocument(ByteReader& ioReader) {
+  try {
+    ScannerMemory memory;
+    return DocumentScanner(memory, ioReader, DocumentScanner::kPlain).Scan("");
+  } catch (const NotPlain&) {
+    return DOM_Document();
+  } catch (const ScanFailure&) {
+    return DOM_Document();
+  }
+}
+
 DOM_Document ScanDocument(ByteReader& ioReader, const std::string& inName) {
   if (FAILED(ZORXMLParser::Initialize()))
     throw ZORXMLParseError(inName, 0, 0, "the XML library cannot be prepared");
+  const DOM_Document plain = ScanPlainDocument(ioReader);
+  if (!plain.isNull()) return plain;
   try {
+    ioReader.Rewind();
     ScannerMemory memory;
-    return DocumentScanner(memory, ioReader).Scan();
+    return DocumentScanner(memory, ioReader, DocumentScanner::kAny).Scan(inName);
   } catch (const ScanFailure& failure) {
     throw ZORXMLParseError(inName, failure.line, failure.column, failure.reason);
   }

@@ -119,6 +119,9 @@ class DOM_Tree {
   // Making parts; a node made here has no parent
   Name InternName(std::u16string_view inName) { return names_.Intern(inName); }
   const DOM_Text* AddText(std::u16string_view inText) { return texts_.Add(inText); }
+  const DOM_Text* AddText(std::u16string_view inText, TextSeries& ioSeries) {
+    return texts_.Add(inText, ioSeries);
+  }
   Node NewDetached(int inKind, Name inName, const DOM_Text* inText);
   /// A detached copy of a node of this or another tree.
   Node Copy(const DOM_Tree& inSource, Node inNode, bool inDeep);

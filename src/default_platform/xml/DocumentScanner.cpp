@@ -37,11 +37,14 @@ bool IsSame(std::u16string_view inKnown, const char16_t* inText) {
 
 }  // namespace
 
-DocumentScanner::DocumentScanner(ScannerMemory& ioMemory, ByteReader& ioReader)
+DocumentScanner::DocumentScanner(ScannerMemory& ioMemory, ByteReader& ioReader, Kind inKind)
     : xercesc::SAXParser(nullptr, &ioMemory),
       reader_(ioReader),
+      kind_(inKind),
+      plainText_(ioReader),
       document_(DOM_Document::createDocument()),
       tree_(DOM_HandleAccess::TreeOf(document_)) {
+  if (kind_ == kPlain) useScanner(xercesc::XMLUni::fgWFXMLScanner);
   setValidationScheme(Val_Never);
   setDoNamespaces(false);
   setDoSchema(false);
@@ -61,19 +64,22 @@ DocumentScanner::DocumentScanner(ScannerMemory& ioMemory, ByteReader& ioReader)
 
 DocumentScanner::~DocumentScanner() = default;
 
-DOM_Document DocumentScanner::Scan() {
+DOM_Document DocumentScanner::Scan(const std::string& inName) {
   if (reader_.IsEmpty()) return document_;
   try {
-    RunScanner();
+    RunScanner(inName);
   } catch (const EmptyDocument&) {
     return DOM_Document::createDocument();
   }
   return document_;
 }
 
-void DocumentScanner::RunScanner() {
+void DocumentScanner::RunScanner(const std::string& inName) {
   try {
-    parse(ReaderEntity(reader_));
+    if (kind_ == kPlain)
+      parse(PlainEntity(plainText_));
+    else
+      parse(ReaderEntity(reader_, inName));
   } catch (const ScannerMemoryExhausted& failure) {
     throw ScanFailure{failure.line, failure.column,
                       "a name, value or text is too large, or there are too many names"};
@@ -103,13 +109,19 @@ void DocumentScanner::Charge(std::uint64_t inUnits) {
 
 // ---- content
 
+// The plain scanner passes over a document type.
+void DocumentScanner::CheckProlog() const {
+  if (kind_ == kPlain && plainText_.MayHaveDoctype()) throw NotPlain();
+}
+
 void DocumentScanner::startElement(const xercesc::XMLElementDecl& inElement, const unsigned int,
                                    const XMLCh* const, const AttributeList& inAttributes,
-                                   const XMLSize_t inCount, const bool inIsEmpty, const bool) {
+                                   const XMLSize_t inCount, const bool inIsEmpty,
+                                   const bool inIsRoot) {
+  if (inIsRoot) CheckProlog();
   FlushText();
   Charge(kUnitsOfNode);
-  ElementShape& shape = shapes_[&inElement];
-  if (shape.name == 0) shape.name = tree_->InternName(View(inElement.getFullName()));
+  ElementShape& shape = ShapeOf(inElement);
   const DOM_Tree::Node element =
       tree_->AppendNew(current_, DOM_Node::ELEMENT_NODE, shape.name, nullptr);
   AddAttributes(element, shape, inAttributes, inCount);
@@ -118,26 +130,32 @@ void DocumentScanner::startElement(const xercesc::XMLElementDecl& inElement, con
   current_ = element;
 }
 
+// Kinds that a document type declares are numbered apart from the others.
+DocumentScanner::ElementShape& DocumentScanner::ShapeOf(const xercesc::XMLElementDecl& inElement) {
+  const XMLSize_t number = inElement.getId();
+  if (number < shapes_.size() && shapes_[number].kind == &inElement) return shapes_[number];
+  if (number == shapes_.size()) shapes_.emplace_back();
+  const bool isFree = number < shapes_.size() && shapes_[number].kind == nullptr;
+  ElementShape& shape = isFree ? shapes_[number] : otherShapes_[&inElement];
+  if (shape.kind == nullptr)
+    shape = {&inElement, tree_->InternName(View(inElement.getFullName())), {}};
+  return shape;
+}
+
 void DocumentScanner::AddAttributes(DOM_Tree::Node inElement, ElementShape& ioShape,
                                     const AttributeList& inAttributes, XMLSize_t inCount) {
+  if (ioShape.attributes.size() < inCount) ioShape.attributes.resize(inCount);
   DOM_Tree::Attribute last = 0;
   for (XMLSize_t position = 0; position < inCount; ++position) {
     const xercesc::XMLAttr& attribute = *inAttributes.elementAt(position);
+    AttributeShape& shape = ioShape.attributes[position];
+    if (shape.name == 0 || !IsSame(tree_->NameText(shape.name)->View(), attribute.getName()))
+      shape = {tree_->InternName(View(attribute.getName())), {}};
     const std::u16string_view value = View(attribute.getValue());
     Charge(kUnitsOfAttribute + value.size());
-    last = tree_->AppendNewAttribute(inElement, last,
-                                     AttributeName(ioShape, position, attribute.getName()),
-                                     tree_->AddText(value));
+    last =
+        tree_->AppendNewAttribute(inElement, last, shape.name, tree_->AddText(value, shape.values));
   }
-}
-
-DOM_Tree::Name DocumentScanner::AttributeName(ElementShape& ioShape, std::size_t inPosition,
-                                              const XMLCh* inName) {
-  if (inPosition >= ioShape.attributes.size()) ioShape.attributes.resize(inPosition + 1);
-  DOM_Tree::Name& name = ioShape.attributes[inPosition];
-  if (name == 0 || !IsSame(tree_->NameText(name)->View(), inName))
-    name = tree_->InternName(View(inName));
-  return name;
 }
 
 void DocumentScanner::endElement(const xercesc::XMLElementDecl&, const unsigned int, const bool,

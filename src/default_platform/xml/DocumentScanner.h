@@ -12,6 +12,7 @@
 #include "default_platform/xml/ByteSource.h"
 #include "default_platform/xml/DOM_HandleAccess.h"
 #include "default_platform/xml/DoctypeRecorder.h"
+#include "default_platform/xml/PlainText.h"
 #include "default_platform/xml/ScannerMemory.h"
 
 /// Where and why a scan ended; the line is 0 when there is no place.
@@ -25,21 +26,31 @@ struct ScanFailure {
 /// tree takes five times the time and the memory. One object reads one document.
 class DocumentScanner : private xercesc::SAXParser {
  public:
-  DocumentScanner(ScannerMemory& ioMemory, ByteReader& ioReader);
+  /// kPlain: only UTF-8 without a document type, for which the library has a faster scanner. Of such
+  /// documents both give the same tree.
+  enum Kind { kPlain, kAny };
+
+  DocumentScanner(ScannerMemory& ioMemory, ByteReader& ioReader, Kind inKind);
   ~DocumentScanner() override;
 
-  /// @return the document; without root when the text is empty. Raises ScanFailure, or
-  /// ZORXMLParseError when the bytes cannot be read.
-  DOM_Document Scan();
+  /// @param inName what the library's messages may call the text by.
+  /// @return the document; without root when the text is empty. Raises ScanFailure; NotPlain for a
+  /// document of another kind; ZORXMLParseError when the bytes cannot be read.
+  DOM_Document Scan(const std::string& inName);
 
  private:
   using AttributeList = xercesc::RefVectorOf<xercesc::XMLAttr>;
 
-  // The names of a kind of element and of the attributes of the last one of that kind: the next
-  // one very likely has the same in the same order.
-  struct ElementShape {
+  struct AttributeShape {
     DOM_Tree::Name name = 0;
-    std::vector<DOM_Tree::Name> attributes;
+    TextSeries values;
+  };
+  // A kind of element, and the attributes of the last one of that kind: the next one very likely
+  // has the same in the same order.
+  struct ElementShape {
+    const xercesc::XMLElementDecl* kind = nullptr;
+    DOM_Tree::Name name = 0;
+    std::vector<AttributeShape> attributes;
   };
 
   // What the scanner reports
@@ -85,15 +96,18 @@ class DocumentScanner : private xercesc::SAXParser {
   xercesc::InputSource* resolveEntity(xercesc::XMLResourceIdentifier* inResource) override;
 
   // Filling the tree
+  void CheckProlog() const;
   void AddAttributes(DOM_Tree::Node inElement, ElementShape& ioShape,
                      const AttributeList& inAttributes, XMLSize_t inCount);
-  DOM_Tree::Name AttributeName(ElementShape& ioShape, std::size_t inPosition, const XMLCh* inName);
+  ElementShape& ShapeOf(const xercesc::XMLElementDecl& inElement);
   void FlushText();
   void Charge(std::uint64_t inUnits);
-  void RunScanner();
+  void RunScanner(const std::string& inName);
   [[noreturn]] void FailHere(const std::string& inReason) const;
 
   ByteReader& reader_;
+  const Kind kind_;
+  PlainText plainText_;
   xercesc::HandlerBase unused_;
   xercesc::SecurityManager limits_;
 
@@ -103,7 +117,8 @@ class DocumentScanner : private xercesc::SAXParser {
   std::uint32_t depth_ = 0;
   std::u16string text_;  // of the text node that is being read
   std::uint64_t charged_ = 0;
-  std::unordered_map<const xercesc::XMLElementDecl*, ElementShape> shapes_;
+  std::vector<ElementShape> shapes_;  // by the scanner's number of the kind
+  std::unordered_map<const xercesc::XMLElementDecl*, ElementShape> otherShapes_;
 
   DocumentType doctype_;
   DoctypeRecorder subset_;

@@ -8,6 +8,7 @@ namespace {
 constexpr std::size_t kFirstBlock = std::size_t{4} * 1024;
 constexpr std::size_t kLargestBlock = std::size_t{1024} * 1024;
 constexpr std::size_t kFirstSlots = 64;
+constexpr std::uint32_t kNewForLong = 100;
 }  // namespace
 
 TextStore::TextStore() : nextBlock_(kFirstBlock), shared_(new Shared[kSharedSlots]()) {}
@@ -21,6 +22,18 @@ const DOM_Text* TextStore::Add(std::u16string_view inText) {
   return slot.text;
 }
 
+const DOM_Text* TextStore::Add(std::u16string_view inText, TextSeries& ioSeries) {
+  if (ioSeries.last != nullptr && ioSeries.last->View() == inText) {
+    ioSeries.newInARow = 0;
+    return ioSeries.last;
+  }
+  if (ioSeries.newInARow == kNewForLong) return ioSeries.last = AddUnshared(inText);
+  const char* const before = free_;
+  ioSeries.last = Add(inText);
+  ioSeries.newInARow = free_ == before ? 0 : ioSeries.newInARow + 1;
+  return ioSeries.last;
+}
+
 const DOM_Text* TextStore::AddUnshared(std::u16string_view inText) {
   if (inText.size() > std::numeric_limits<std::uint32_t>::max())
     throw std::length_error("a text is longer than 4,294,967,295 units");
@@ -32,11 +45,13 @@ const DOM_Text* TextStore::AddUnshared(std::u16string_view inText) {
 }
 
 char* TextStore::Allocate(std::size_t inBytes) {
-  if (static_cast<std::size_t>(end_ - free_) >= inBytes) {
-    char* const place = free_;
-    free_ += inBytes;
-    return place;
-  }
+  if (static_cast<std::size_t>(end_ - free_) < inBytes) return AllocateBlock(inBytes);
+  char* const place = free_;
+  free_ += inBytes;
+  return place;
+}
+
+char* TextStore::AllocateBlock(std::size_t inBytes) {
   if (inBytes > nextBlock_ / 4) {  // a block of its own; the current one stays in use
     blocks_.emplace_back(new char[inBytes]);
     return blocks_.back().get();

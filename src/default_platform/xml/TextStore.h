@@ -9,12 +9,21 @@
 
 #include "default_platform/xml/DOM_Text.h"
 
+/// What was met of the texts that come from one place, such as one attribute of one kind of element.
+struct TextSeries {
+  const DOM_Text* last = nullptr;
+  std::uint32_t newInARow = 0;
+};
+
 /// Keeps texts in a few large blocks until it ends. Short texts that were met lately are kept once:
 /// documents repeat their indentation, "NO", "0" and the like.
 class TextStore {
  public:
   TextStore();
   const DOM_Text* Add(std::u16string_view inText);
+  /// As Add. An equal text is no longer looked for, except the last one, where the texts of the
+  /// series were all different for long: numbers mostly are.
+  const DOM_Text* Add(std::u16string_view inText, TextSeries& ioSeries);
   /// As Add, without looking for an equal text.
   const DOM_Text* AddUnshared(std::u16string_view inText);
 
@@ -25,6 +34,7 @@ class TextStore {
     const DOM_Text* text;
   };
   char* Allocate(std::size_t inBytes);
+  char* AllocateBlock(std::size_t inBytes);
 
   static constexpr std::size_t kSharedSlots = 4096;
   static constexpr std::size_t kLongestShared = 64;

@@ -2,17 +2,14 @@
 
 #include <algorithm>
 #include <array>
-#include <limits>
 #include <string_view>
 #include <vector>
 
 #include "default_platform/xml/DOM_HandleAccess.h"
+#include "default_platform/xml/WrittenText.h"
 #include "default_platform/xml/XMLNames.h"
 
 namespace {
-
-/// Raised within this file only, for what no XML text can carry.
-struct NotWritable {};
 
 /// What is to be done with a code unit.
 enum Treatment : unsigned char { kCopy, kEscape, kRefuse };
@@ -35,69 +32,51 @@ constexpr AsciiTreatments kInSection = Treatments(u"\r", false);
 // A reader turns a carriage return into a line feed, and nothing can be escaped here.
 constexpr AsciiTreatments kVerbatim = Treatments(u"", true);
 
-std::u16string_view EscapeOf(char16_t inUnit) {
+std::string_view EscapeOf(char16_t inUnit) {
   switch (inUnit) {
     case u'&':
-      return u"&amp;";
+      return "&amp;";
     case u'<':
-      return u"&lt;";
+      return "&lt;";
     case u'>':
-      return u"&gt;";
+      return "&gt;";
     case u'"':
-      return u"&quot;";
+      return "&quot;";
     case u'\t':
-      return u"&#9;";
+      return "&#9;";
     case u'\n':
-      return u"&#10;";
+      return "&#10;";
     default:
-      return u"&#13;";
+      return "&#13;";
   }
 }
 
-/// A text that grows; becomes a string without being copied.
-class TextBuffer {
- public:
-  TextBuffer() : text_(NewOwnedText(kFirst)), at_(text_->Units()), end_(at_ + kFirst) {}
-  ~TextBuffer() {
-    if (text_ != nullptr) ReleaseOwnedText(text_);
-  }
-  TextBuffer(const TextBuffer&) = delete;
-  TextBuffer& operator=(const TextBuffer&) = delete;
+constexpr std::size_t kBlock = 8;
 
-  /// Makes room for inCount more units.
-  char16_t* Reserve(std::size_t inCount) {
-    if (static_cast<std::size_t>(end_ - at_) < inCount) Grow(inCount);
-    return at_;
+// Whether eight units are ASCII that stays as it is everywhere. Without branches, so that compilers
+// make vector instructions of it.
+bool IsPlainBlock(const char16_t* inUnits) {
+  unsigned int hits = 0;
+  for (std::size_t i = 0; i < kBlock; ++i) {
+    const char16_t unit = inUnits[i];
+    hits |= static_cast<unsigned int>(unit < 0x20) | static_cast<unsigned int>(unit >= 0x80) |
+            static_cast<unsigned int>(unit == u'&') | static_cast<unsigned int>(unit == u'<') |
+            static_cast<unsigned int>(unit == u'>') | static_cast<unsigned int>(unit == u'"');
   }
-  void SetEnd(char16_t* inEnd) { at_ = inEnd; }
-  void Append(std::u16string_view inText) {
-    at_ = std::copy(inText.begin(), inText.end(), Reserve(inText.size()));
-  }
-  DOMString Finish() {
-    DOM_Text* const text = ResizeOwnedText(text_, static_cast<std::uint32_t>(Used()));
-    text_ = nullptr;
-    return DOM_HandleAccess::Adopt(text);
-  }
+  return hits == 0;
+}
 
- private:
-  static constexpr std::uint32_t kFirst = 1024;
-  static constexpr std::size_t kMost = std::numeric_limits<std::uint32_t>::max();
+// Takes a character beyond ASCII.
+char32_t TakeCharacter(const char16_t*& ioFrom, const char16_t* inEnd) {
+  const char16_t unit = *ioFrom++;
+  if (unit < 0xD800 || (unit >= 0xE000 && unit < 0xFFFE)) return unit;
+  const bool isPair = unit < 0xDC00 && ioFrom != inEnd && *ioFrom >= 0xDC00 && *ioFrom < 0xE000;
+  if (!isPair) throw NotWritable();
+  return 0x10000 + ((unit - char32_t{0xD800}) << 10) + (*ioFrom++ - char32_t{0xDC00});
+}
 
-  std::size_t Used() const { return static_cast<std::size_t>(at_ - text_->Units()); }
-  void Grow(std::size_t inCount) {
-    const std::size_t used = Used();
-    if (inCount > kMost - used) throw NotWritable();
-    const std::size_t room = std::min(kMost, std::max(used + inCount, used * 2));
-    text_ = ResizeOwnedText(text_, static_cast<std::uint32_t>(room));
-    at_ = text_->Units() + used;
-    end_ = text_->Units() + room;
-  }
-
-  DOM_Text* text_;
-  char16_t* at_;
-  char16_t* end_;
-};
-
+/// Writes into a WideText or a Utf8Parts.
+template <class Buffer>
 class TreeWriter {
  public:
   explicit TreeWriter(const DOM_Tree& inTree)
@@ -105,7 +84,7 @@ class TreeWriter {
 
   void WriteNodes(DOM_Tree::Node inRoot);
   void WriteAttribute(const DOM_Tree::AttributeRecord& inAttribute);
-  DOMString Finish() { return buffer_.Finish(); }
+  auto Finish() { return buffer_.Finish(); }
 
  private:
   void Start(DOM_Tree::Node inNode);
@@ -117,14 +96,16 @@ class TreeWriter {
   void WriteDoctype(const DOM_Tree::NodeRecord& inRecord);
   void WriteIdLiteral(const DOM_Text& inText);
   void WriteName(DOM_Tree::Name inName);
+  void WriteMarkup(std::string_view inAscii);
   void WriteEscaped(std::u16string_view inText, const AsciiTreatments& inTreatments);
 
   const DOM_Tree& tree_;
-  TextBuffer buffer_;
+  Buffer buffer_;
   std::vector<bool> isNameKnown_;  // whether a name was found to be one of XML 1.0
 };
 
-void TreeWriter::WriteNodes(DOM_Tree::Node inRoot) {
+template <class Buffer>
+void TreeWriter<Buffer>::WriteNodes(DOM_Tree::Node inRoot) {
   DOM_Tree::Node at = inRoot;
   while (true) {
     Start(at);
@@ -142,7 +123,8 @@ void TreeWriter::WriteNodes(DOM_Tree::Node inRoot) {
   }
 }
 
-void TreeWriter::Start(DOM_Tree::Node inNode) {
+template <class Buffer>
+void TreeWriter<Buffer>::Start(DOM_Tree::Node inNode) {
   const DOM_Tree::NodeRecord& record = tree_.At(inNode);
   switch (record.kind) {
     case DOM_Node::ELEMENT_NODE:
@@ -162,135 +144,151 @@ void TreeWriter::Start(DOM_Tree::Node inNode) {
   }
 }
 
-void TreeWriter::StartElement(DOM_Tree::Node inNode) {
+template <class Buffer>
+void TreeWriter<Buffer>::StartElement(DOM_Tree::Node inNode) {
   const DOM_Tree::NodeRecord& record = tree_.At(inNode);
-  buffer_.Append(u"<");
+  WriteMarkup("<");
   WriteName(record.name);
   for (DOM_Tree::Attribute at = record.firstAttribute; at != 0; at = tree_.AttributeAt(at).next) {
-    buffer_.Append(u" ");
+    WriteMarkup(" ");
     WriteAttribute(tree_.AttributeAt(at));
   }
-  buffer_.Append(tree_.FirstChild(inNode) == 0 ? u"/>" : u">");
+  WriteMarkup(tree_.FirstChild(inNode) == 0 ? "/>" : ">");
 }
 
-void TreeWriter::End(DOM_Tree::Node inNode) {
+template <class Buffer>
+void TreeWriter<Buffer>::End(DOM_Tree::Node inNode) {
   if (tree_.At(inNode).kind != DOM_Node::ELEMENT_NODE) return;
-  buffer_.Append(u"</");
+  WriteMarkup("</");
   WriteName(tree_.At(inNode).name);
-  buffer_.Append(u">");
+  WriteMarkup(">");
 }
 
-void TreeWriter::WriteAttribute(const DOM_Tree::AttributeRecord& inAttribute) {
+template <class Buffer>
+void TreeWriter<Buffer>::WriteAttribute(const DOM_Tree::AttributeRecord& inAttribute) {
   WriteName(inAttribute.name);
-  buffer_.Append(u"=\"");
+  WriteMarkup("=\"");
   WriteEscaped(inAttribute.value->View(), kInAttribute);
-  buffer_.Append(u"\"");
+  WriteMarkup("\"");
 }
 
 // A document of XML 1.1 may have names that the text, which declares no version, cannot carry.
-void TreeWriter::WriteName(DOM_Tree::Name inName) {
+template <class Buffer>
+void TreeWriter<Buffer>::WriteName(DOM_Tree::Name inName) {
   const std::u16string_view name = tree_.NameText(inName)->View();
   if (!isNameKnown_[inName]) {
     if (!IsXMLName(name)) throw NotWritable();
     isNameKnown_[inName] = true;
   }
-  buffer_.Append(name);
+  WriteEscaped(name, kVerbatim);
 }
 
-void TreeWriter::WriteEscaped(std::u16string_view inText, const AsciiTreatments& inTreatments) {
+template <class Buffer>
+void TreeWriter<Buffer>::WriteMarkup(std::string_view inAscii) {
+  buffer_.SetEnd(std::copy(inAscii.begin(), inAscii.end(), buffer_.Reserve(inAscii.size())));
+}
+
+template <class Buffer>
+void TreeWriter<Buffer>::WriteEscaped(std::u16string_view inText,
+                                      const AsciiTreatments& inTreatments) {
+  using Unit = typename Buffer::Unit;
   const char16_t* from = inText.data();
   const char16_t* const end = from + inText.size();
-  char16_t* to = buffer_.Reserve(inText.size());
+  Unit* to = buffer_.Reserve(inText.size());
   while (from != end) {
-    const char16_t unit = *from;
-    if (unit < 0x80 ? inTreatments[unit] == kCopy : unit < 0xD800) {
-      *to++ = unit;
-      ++from;
+    if (end - from >= static_cast<std::ptrdiff_t>(kBlock) && IsPlainBlock(from)) {
+      for (std::size_t i = 0; i < kBlock; ++i) to[i] = static_cast<Unit>(from[i]);
+      from += kBlock;
+      to += kBlock;
       continue;
     }
-    if (unit >= 0x80) {
-      const bool isPair = unit < 0xDC00 && from + 1 != end && from[1] >= 0xDC00 && from[1] < 0xE000;
-      if (unit >= 0xFFFE || (unit < 0xE000 && !isPair)) throw NotWritable();
-      *to++ = unit;
-      ++from;
-      if (isPair) *to++ = *from++;
-      continue;
+    const char16_t* const pause = from + std::min<std::ptrdiff_t>(kBlock, end - from);
+    while (from < pause) {
+      if (*from >= 0x80) {
+        to = Buffer::Put(TakeCharacter(from, end), to);
+      } else if (inTreatments[*from] == kCopy) {
+        *to++ = static_cast<Unit>(*from++);
+      } else {
+        if (inTreatments[*from] == kRefuse) throw NotWritable();
+        buffer_.SetEnd(to);
+        WriteMarkup(EscapeOf(*from++));
+        to = buffer_.Reserve(static_cast<std::size_t>(end - from));
+      }
     }
-    if (inTreatments[unit] == kRefuse) throw NotWritable();
-    buffer_.SetEnd(to);
-    buffer_.Append(EscapeOf(unit));
-    ++from;
-    to = buffer_.Reserve(static_cast<std::size_t>(end - from));
   }
   buffer_.SetEnd(to);
 }
 
 // What a section cannot hold stands between two sections.
-void TreeWriter::WriteSection(std::u16string_view inText) {
-  constexpr std::u16string_view kStart = u"<![CDATA[";
-  constexpr std::u16string_view kEnd = u"]]>";
-  buffer_.Append(kStart);
+template <class Buffer>
+void TreeWriter<Buffer>::WriteSection(std::u16string_view inText) {
+  constexpr std::string_view kStart = "<![CDATA[";
+  constexpr std::string_view kEnd = "]]>";
+  WriteMarkup(kStart);
   while (true) {
-    const std::size_t stop = std::min(inText.find(kEnd), inText.find(u'\r'));
+    const std::size_t stop = std::min(inText.find(u"]]>"), inText.find(u'\r'));
     if (stop == std::u16string_view::npos) break;
     const bool isEnd = inText[stop] == u']';
     const std::size_t count = stop + (isEnd ? 2 : 0);
     WriteEscaped(inText.substr(0, count), kInSection);
-    buffer_.Append(kEnd);
-    if (!isEnd) buffer_.Append(EscapeOf(u'\r'));
-    buffer_.Append(kStart);
+    WriteMarkup(kEnd);
+    if (!isEnd) WriteMarkup(EscapeOf(u'\r'));
+    WriteMarkup(kStart);
     inText.remove_prefix(isEnd ? count : count + 1);
   }
   WriteEscaped(inText, kInSection);
-  buffer_.Append(kEnd);
+  WriteMarkup(kEnd);
 }
 
-void TreeWriter::WriteComment(std::u16string_view inText) {
+template <class Buffer>
+void TreeWriter<Buffer>::WriteComment(std::u16string_view inText) {
   if (inText.find(u"--") != std::u16string_view::npos || inText.ends_with(u'-'))
     throw NotWritable();
-  buffer_.Append(u"<!--");
+  WriteMarkup("<!--");
   WriteEscaped(inText, kVerbatim);
-  buffer_.Append(u"-->");
+  WriteMarkup("-->");
 }
 
-void TreeWriter::WriteInstruction(const DOM_Tree::NodeRecord& inRecord) {
+template <class Buffer>
+void TreeWriter<Buffer>::WriteInstruction(const DOM_Tree::NodeRecord& inRecord) {
   const std::u16string_view data = inRecord.text->View();
   // A reader takes white space before the data as the separator.
   if (data.find(u"?>") != std::u16string_view::npos || data.find_first_of(u" \t\n") == 0)
     throw NotWritable();
-  buffer_.Append(u"<?");
+  WriteMarkup("<?");
   WriteName(inRecord.name);
-  if (!data.empty()) buffer_.Append(u" ");
+  if (!data.empty()) WriteMarkup(" ");
   WriteEscaped(data, kVerbatim);
-  buffer_.Append(u"?>");
+  WriteMarkup("?>");
 }
 
-void TreeWriter::WriteDoctype(const DOM_Tree::NodeRecord& inRecord) {
+template <class Buffer>
+void TreeWriter<Buffer>::WriteDoctype(const DOM_Tree::NodeRecord& inRecord) {
   const DocumentType& doctype = tree_.Doctype();
-  buffer_.Append(u"<!DOCTYPE ");
+  WriteMarkup("<!DOCTYPE ");
   WriteName(inRecord.name);
   if (doctype.publicId != nullptr) {
-    buffer_.Append(u" PUBLIC ");
+    WriteMarkup(" PUBLIC ");
     WriteIdLiteral(*doctype.publicId);
-    buffer_.Append(u" ");
+    WriteMarkup(" ");
   } else if (doctype.systemId != nullptr) {
-    buffer_.Append(u" SYSTEM ");
+    WriteMarkup(" SYSTEM ");
   }
   if (doctype.systemId != nullptr) WriteIdLiteral(*doctype.systemId);
   if (doctype.internalSubset != nullptr) {
-    buffer_.Append(u" [");
+    WriteMarkup(" [");
     WriteEscaped(doctype.internalSubset->View(), kVerbatim);
-    buffer_.Append(u"]");
+    WriteMarkup("]");
   }
-  buffer_.Append(u">");
+  WriteMarkup(">");
 }
 
-void TreeWriter::WriteIdLiteral(const DOM_Text& inText) {
-  const std::u16string_view quote =
-      inText.View().find(u'"') == std::u16string_view::npos ? u"\"" : u"'";
-  buffer_.Append(quote);
+template <class Buffer>
+void TreeWriter<Buffer>::WriteIdLiteral(const DOM_Text& inText) {
+  const std::string_view quote = inText.View().find(u'"') == std::u16string_view::npos ? "\"" : "'";
+  WriteMarkup(quote);
   WriteEscaped(inText.View(), kVerbatim);
-  buffer_.Append(quote);
+  WriteMarkup(quote);
 }
 
 }  // namespace
@@ -303,16 +301,32 @@ bool IsWritableEncoding(const ZORUnicodeString& inName) {
   return std::find(std::begin(kKnown), std::end(kKnown), name) != std::end(kKnown);
 }
 
-bool WriteTree(const DOM_Node& inNode, DOMString& outText) {
+namespace {
+template <class Buffer>
+auto Written(const DOM_Node& inNode) {
   const DOM_Tree& tree = *DOM_HandleAccess::TreeOf(inNode);
+  TreeWriter<Buffer> writer(tree);
+  const DOM_Tree::Attribute attribute = DOM_HandleAccess::AttributeOf(inNode);
+  if (attribute != 0)
+    writer.WriteAttribute(tree.AttributeAt(attribute));
+  else
+    writer.WriteNodes(DOM_HandleAccess::NodeOf(inNode));
+  return writer.Finish();
+}
+}  // namespace
+
+bool WriteTree(const DOM_Node& inNode, DOMString& outText) {
   try {
-    TreeWriter writer(tree);
-    const DOM_Tree::Attribute attribute = DOM_HandleAccess::AttributeOf(inNode);
-    if (attribute != 0)
-      writer.WriteAttribute(tree.AttributeAt(attribute));
-    else
-      writer.WriteNodes(DOM_HandleAccess::NodeOf(inNode));
-    outText = writer.Finish();
+    outText = Written<WideText>(inNode);
+    return true;
+  } catch (const NotWritable&) {
+    return false;
+  }
+}
+
+bool WriteTree(const DOM_Node& inNode, std::vector<std::string>& outParts) {
+  try {
+    outParts = Written<Utf8Parts>(inNode);
     return true;
   } catch (const NotWritable&) {
     return false;

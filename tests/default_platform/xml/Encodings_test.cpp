@@ -1,34 +1,17 @@
 // Every encoding, with and without byte-order mark.
 #include <gtest/gtest.h>
-#include <iconv.h>
 
 #include <string>
 
+#include "support/EncodedText.h"
 #include "support/XMLText.h"
 
+using support::Encoded;
 using support::Narrow;
 using support::ParseErrorOf;
 using support::RootOf;
 
 namespace {
-
-/// UTF-8 text in another encoding; "" when it cannot be told in it.
-std::string Encoded(const std::string& inText, const std::string& inEncoding) {
-  const iconv_t converter = iconv_open(inEncoding.c_str(), "UTF-8");
-  if (converter == iconv_t(-1)) return "";
-  std::string from = inText;
-  std::string to(inText.size() * 8 + 64, '\0');
-  char* fromAt = from.data();
-  char* toAt = to.data();
-  std::size_t fromLeft = from.size();
-  std::size_t toLeft = to.size();
-  const std::size_t result = iconv(converter, &fromAt, &fromLeft, &toAt, &toLeft);
-  iconv(converter, nullptr, nullptr, &toAt, &toLeft);
-  iconv_close(converter);
-  if (result == std::size_t(-1)) return "";
-  to.resize(to.size() - toLeft);
-  return to;
-}
 
 void ExpectRead(const std::string& inBytes, const std::string& inValue) {
   ASSERT_FALSE(inBytes.empty());
