@@ -86,11 +86,11 @@ const ZOR3DRep* RepOf(const ZORIProduct_var& inProduct) {
 PartColour MarkerColourFor(const std::array<ZORIProduct_var, 2>& inProducts) {
   constexpr PartColour kColours[] = {{255, 0, 140, 255}, {0, 190, 255, 255}, {255, 220, 0, 255}};
   constexpr int kClear = 230;
+  const PartColour first = MeanColourOf(inProducts[0]), second = MeanColourOf(inProducts[1]);
   PartColour best = kColours[0];
   int most = -1;
   for (const PartColour& colour : kColours) {
-    const int least = std::min(ColourDifference(colour, MeanColourOf(inProducts[0])),
-                               ColourDifference(colour, MeanColourOf(inProducts[1])));
+    const int least = std::min(ColourDifference(colour, first), ColourDifference(colour, second));
     if (least > most) best = colour;
     most = std::max(most, least);
     if (least >= kClear) break;

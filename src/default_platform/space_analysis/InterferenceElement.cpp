@@ -1,7 +1,9 @@
 #include "default_platform/space_analysis/InterferenceElement.h"
 
 #include <algorithm>
+#include <array>
 #include <cctype>
+#include <set>
 #include <string_view>
 
 #include "default_platform/space_analysis/Vectors.h"
@@ -75,12 +77,18 @@ bool IsClearance(const DOM_Node& inInterference) {
   return IsClearanceWord(isNeutral ? neutral : AttributeOf(inInterference, "ResultType").Strip());
 }
 
-void AddDistinct(const ZORMathVector& inPoint, std::vector<ZORMathVector>& ioPoints) {
-  const bool isKnown = std::ranges::any_of(ioPoints, [&](const ZORMathVector& inKnown) {
-    return inKnown.x == inPoint.x && inKnown.y == inPoint.y && inKnown.z == inPoint.z;
-  });
-  if (!isKnown) ioPoints.push_back(inPoint);
-}
+/// Points that differ, in the order in which they first occur.
+class DistinctPoints {
+ public:
+  explicit DistinctPoints(std::vector<ZORMathVector>& outPoints) : points_(outPoints) {}
+  void Add(const ZORMathVector& inPoint) {
+    if (known_.insert({inPoint.x, inPoint.y, inPoint.z}).second) points_.push_back(inPoint);
+  }
+
+ private:
+  std::vector<ZORMathVector>& points_;
+  std::set<std::array<double, 3>> known_;
+};
 
 /// What makes a matrix' numbers other than they were written.
 std::string WhyMisread(const DOM_Node& inMatrix) {
@@ -143,9 +151,10 @@ InterferenceElement::InterferenceElement(const DOM_Node& inInterference)
     : isClearance(IsClearance(inInterference)) {
   ForEachChild(inInterference, "Product",
                [&](const DOM_Node& inProduct) { products.push_back(inProduct); });
+  DistinctPoints distinct(points);
   ForEachChild(inInterference, "GeometricAspect", [&](const DOM_Node& inAspect) {
     ForEachChild(inAspect, "Point", [&](const DOM_Node& inPoint) {
-      if (const auto point = PointOf(inPoint)) AddDistinct(*point, points);
+      if (const auto point = PointOf(inPoint)) distinct.Add(*point);
     });
     ForEachChild(inAspect, "Viewpoint",
                  [&](const DOM_Node& inViewpoint) { viewpoint = ViewpointOf(inViewpoint); });

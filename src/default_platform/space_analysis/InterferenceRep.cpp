@@ -1,6 +1,8 @@
 #include "default_platform/space_analysis/InterferenceRep.h"
 
 #include <algorithm>
+#include <array>
+#include <set>
 
 #include "default_platform/space_analysis/MarkerMesh.h"
 #include "default_platform/space_analysis/Vectors.h"
@@ -17,6 +19,10 @@ constexpr double kArrowLength = 0.06;
 constexpr double kPinHead = 0.04;
 /// With more points than this they show the place by themselves.
 constexpr std::size_t kMostPins = 3;
+/// What a picture can show apart.
+constexpr std::size_t kMostBalls = 1000;
+/// With more balls than this nobody looks at one.
+constexpr std::size_t kMostFineBalls = 100;
 
 /// A needle from the point upwards and towards the eye, whose head stands out of the surfaces that
 /// hide the point.
@@ -41,6 +47,31 @@ void AddDimension(const ZORMathVector& inFrom, const ZORMathVector& inTo, double
   ioMesh.AddCone(inTo - arrow, kArrow * inSize, inTo, 0);
 }
 
+/// The first point of each cell of a grid, in order.
+std::vector<ZORMathVector> OneACell(const std::vector<ZORMathVector>& inPoints, double inCell) {
+  const auto step = [&](double inDistance) {
+    const double steps = std::floor(inDistance / inCell);
+    return std::isfinite(steps) ? steps : 0;
+  };
+  std::set<std::array<double, 3>> cells;
+  std::vector<ZORMathVector> firsts;
+  for (const ZORMathVector& point : inPoints) {
+    const ZORMathVector way = point - inPoints.front();
+    if (cells.insert({step(way.x), step(way.y), step(way.z)}).second) firsts.push_back(point);
+  }
+  return firsts;
+}
+
+/// Of balls that nearly coincide one is enough, and of very many a sample.
+void AddBalls(const std::vector<ZORMathVector>& inPoints, double inRadius, MarkerMesh& ioMesh) {
+  double cell = inRadius / 4;
+  std::vector<ZORMathVector> centres = OneACell(inPoints, cell);
+  while (centres.size() > kMostBalls) centres = OneACell(centres, cell *= 2);
+  const bool areFine = centres.size() <= kMostFineBalls;
+  for (const ZORMathVector& centre : centres)
+    areFine ? ioMesh.AddBall(centre, inRadius) : ioMesh.AddCoarseBall(centre, inRadius);
+}
+
 std::shared_ptr<const PartMesh> MakeMarkers(const std::vector<ZORMathVector>& inPoints,
                                             const MarkerStyle& inStyle) {
   MarkerMesh mesh(inPoints.front());
@@ -48,7 +79,7 @@ std::shared_ptr<const PartMesh> MakeMarkers(const std::vector<ZORMathVector>& in
   if (isDimension)
     AddDimension(inPoints[0], inPoints[1], inStyle.viewRadius, mesh);
   else
-    for (const ZORMathVector& point : inPoints) mesh.AddBall(point, kBall * inStyle.viewRadius);
+    AddBalls(inPoints, kBall * inStyle.viewRadius, mesh);
   if (inStyle.pinLength <= 0) return mesh.Take();
   if (isDimension)
     AddPin(0.5 * (inPoints[0] + inPoints[1]), inStyle, mesh);

@@ -9,8 +9,6 @@ namespace ZORDefault {
 namespace {
 
 constexpr double kPi = 3.14159265358979323846;
-constexpr int kSides = 16;
-constexpr int kSlices = 8;
 
 std::array<float, 3> Rounded(const ZORMathVector& inVector) {
   return {static_cast<float>(inVector.x), static_cast<float>(inVector.y),
@@ -23,15 +21,16 @@ MarkerMesh::MarkerMesh(const ZORMathVector& inMiddle) : mesh_(std::make_shared<P
   mesh_->origin = inMiddle;
 }
 
-void MarkerMesh::AddBall(const ZORMathVector& inCentre, double inRadius) {
+void MarkerMesh::AddSphere(const ZORMathVector& inCentre, double inRadius, std::uint32_t inSides,
+                           std::uint32_t inSlices) {
   const ZORMathVector axis(0, 0, 1);
   std::vector<Ring> rings;
-  for (int i = 0; i <= kSlices; ++i) {
-    const double angle = kPi * i / kSlices;
+  for (std::uint32_t i = 0; i <= inSlices; ++i) {
+    const double angle = kPi * i / inSlices;
     const double along = -std::cos(angle);
     rings.push_back({inCentre + (along * inRadius) * axis, inRadius * std::sin(angle), along});
   }
-  AddRings(axis, rings);
+  AddRings(axis, rings, inSides);
 }
 
 void MarkerMesh::AddCone(const ZORMathVector& inFrom, double inFromRadius,
@@ -40,10 +39,12 @@ void MarkerMesh::AddCone(const ZORMathVector& inFrom, double inFromRadius,
   const double length = Length(way);
   const double fall = inFromRadius - inToRadius;
   const double along = fall / std::hypot(fall, length);
-  AddRings(Direction(way, {0, 0, 1}), {{inFrom, inFromRadius, along}, {inTo, inToRadius, along}});
+  AddRings(Direction(way, {0, 0, 1}), {{inFrom, inFromRadius, along}, {inTo, inToRadius, along}},
+           kSides);
 }
 
-void MarkerMesh::AddRings(const ZORMathVector& inAxis, const std::vector<Ring>& inRings) {
+void MarkerMesh::AddRings(const ZORMathVector& inAxis, const std::vector<Ring>& inRings,
+                          std::uint32_t inSides) {
   const ZORMathVector aside =
       std::fabs(inAxis.z) < 0.9 ? ZORMathVector(0, 0, 1) : ZORMathVector(1, 0, 0);
   const ZORMathVector u = Direction(Cross(aside, inAxis), {1, 0, 0});
@@ -51,19 +52,19 @@ void MarkerMesh::AddRings(const ZORMathVector& inAxis, const std::vector<Ring>& 
   const auto first = static_cast<std::uint32_t>(mesh_->points.size());
   for (const Ring& ring : inRings) {
     const double outwards = std::sqrt(std::max(0.0, 1 - ring.normalAlong * ring.normalAlong));
-    for (int side = 0; side < kSides; ++side) {
-      const double angle = 2 * kPi * side / kSides;
+    for (std::uint32_t side = 0; side < inSides; ++side) {
+      const double angle = 2 * kPi * side / inSides;
       const ZORMathVector out = std::cos(angle) * u + std::sin(angle) * v;
       mesh_->points.push_back(Rounded(ring.centre + ring.radius * out - mesh_->origin));
       mesh_->normals.push_back(Rounded(outwards * out + ring.normalAlong * inAxis));
     }
   }
   for (std::uint32_t ring = 0; ring + 1 < inRings.size(); ++ring)
-    for (std::uint32_t side = 0; side < kSides; ++side) {
-      const std::uint32_t a = first + ring * kSides + side;
-      const std::uint32_t b = first + ring * kSides + (side + 1) % kSides;
-      mesh_->triangles.push_back({a, b, b + kSides});
-      mesh_->triangles.push_back({a, b + kSides, a + kSides});
+    for (std::uint32_t side = 0; side < inSides; ++side) {
+      const std::uint32_t a = first + ring * inSides + side;
+      const std::uint32_t b = first + ring * inSides + (side + 1) % inSides;
+      mesh_->triangles.push_back({a, b, b + inSides});
+      mesh_->triangles.push_back({a, b + inSides, a + inSides});
     }
 }
 

@@ -13,13 +13,14 @@
 namespace ZORDefault {
 namespace {
 
-/// The pictures that directions are tried on: a sixth of those in reports.
-constexpr int kWidth = 126;
-constexpr int kHeight = 84;
+/// The pictures that directions are tried on: a twelfth of those in reports.
+constexpr int kWidth = 63;
+constexpr int kHeight = 42;
 /// Of each product, in those pixels: enough to take a direction without trying others, and too few
 /// to be content with the part that is framed.
-constexpr int kPlenty = 500;
-constexpr int kTooFew = 80;
+constexpr int kPlenty = 125;
+constexpr int kTooFew = 20;
+/// Markers are small: in the pixels of pictures of twice the width and height.
 constexpr int kPlentyOfMarkers = 3;
 
 struct Destroyer {
@@ -57,28 +58,33 @@ const std::vector<ZORMathVector>& Directions() {
   return directions;
 }
 
-/// How many pixels show each product and the markers.
+/// How many pixels show each product and all else.
 struct SeenThings {
   int products[2] = {0, 0};
   int markers = 0;
 };
 
+/// Small pictures of the products.
 class ViewTrial {
  public:
-  ViewTrial(const ShownProducts& inProducts, const std::vector<ZORMathVector>& inPoints)
-      : products_(inProducts), points_(inPoints) {
-    for (std::size_t i = 0; i < 2; ++i)
-      meshCounts_[i] = products_[i] ? CollectDrawnMeshes(*products_[i]).size() : 0;
+  ViewTrial(const ShownProducts& inProducts, int inWidth, int inHeight)
+      : scene_(new ZOR3DBagRep), width_(inWidth), height_(inHeight) {
+    for (std::size_t i = 0; i < 2; ++i) {
+      if (!inProducts[i]) continue;
+      meshCounts_[i] = CollectDrawnMeshes(*inProducts[i]).size();
+      // The scene does not change what it shows.
+      scene_->AddChild(const_cast<ZOR3DRep*>(inProducts[i]));
+    }
   }
 
-  SeenThings See(const MarkerStyle& inStyle, const ZOR3DViewpoint& inViewpoint) const {
-    const std::unique_ptr<InterferenceRep, Destroyer> markers(
-        new InterferenceRep(points_, inStyle, {}));
-    const OwnBag scene(new ZOR3DBagRep);
-    // The scene does not change what it shows.
-    for (const ZOR3DRep* const product : products_) scene->AddChild(const_cast<ZOR3DRep*>(product));
-    scene->AddChild(markers.get());
-    return Count(SeePixels(*scene, inViewpoint, kWidth, kHeight));
+  SeenThings See(const ZOR3DViewpoint& inViewpoint) const {
+    return Count(SeePixels(*scene_, inViewpoint, width_, height_));
+  }
+  SeenThings SeeWith(InterferenceRep& inMarkers, const ZOR3DViewpoint& inViewpoint) const {
+    scene_->AddChild(&inMarkers);
+    const SeenThings seen = See(inViewpoint);
+    scene_->RemoveChild(&inMarkers);
+    return seen;
   }
 
  private:
@@ -97,15 +103,14 @@ class ViewTrial {
     return seen;
   }
 
-  ShownProducts products_;
-  const std::vector<ZORMathVector>& points_;
+  OwnBag scene_;
+  int width_, height_;
   std::array<std::size_t, 2> meshCounts_{};
 };
 
-/// Pixels of the product that is seen less; hidden markers count against a direction.
+/// Pixels of the product that is seen less. Markers do not count: they are drawn over all else.
 int ScoreOf(const SeenThings& inSeen) {
-  const int products = std::min({inSeen.products[0], inSeen.products[1], kPlenty});
-  return inSeen.markers >= kPlentyOfMarkers ? products : products / 2;
+  return std::min({inSeen.products[0], inSeen.products[1], kPlenty});
 }
 
 ZOR3DViewpoint Framing(const MarkerStyle& inStyle, const ZOR3DBoundingSphere& inFramed) {
@@ -154,12 +159,12 @@ ChosenView ChooseView(const ShownProducts& inProducts, const std::vector<ZORMath
   };
   ChosenView best = view(DefaultSight(), radii.front());
   if (!inProducts[0] || !inProducts[1]) return best;
-  const ViewTrial trial(inProducts, inPoints);
+  const ViewTrial trial(inProducts, kWidth, kHeight);
   int bestScore = 0;
   for (const double radius : radii) {
     for (const ZORMathVector& sight : Directions()) {
       const ChosenView tried = view(sight, radius);
-      const int score = ScoreOf(trial.See(tried.markers, Framing(tried.markers, tried.framed)));
+      const int score = ScoreOf(trial.See(Framing(tried.markers, tried.framed)));
       if (score <= bestScore) continue;
       bestScore = score;
       best = tried;
@@ -167,18 +172,20 @@ ChosenView ChooseView(const ShownProducts& inProducts, const std::vector<ZORMath
     }
     if (bestScore >= kTooFew) break;
   }
-  LengthenPins(inProducts, inPoints, Framing(best.markers, best.framed), best.markers);
   return best;
 }
 
 void LengthenPins(const ShownProducts& inProducts, const std::vector<ZORMathVector>& inPoints,
                   const ZOR3DViewpoint& inViewpoint, MarkerStyle& ioStyle) {
-  const ViewTrial trial(inProducts, inPoints);
+  if (inViewpoint.nearPlane <= 0) return;
+  const ViewTrial trial(inProducts, 2 * kWidth, 2 * kHeight);
   int mostSeen = -1;
   MarkerStyle tried = ioStyle;
   for (const double length : {0.0, 0.4, 0.7, 1.0}) {
     tried.pinLength = length;
-    const int seen = trial.See(tried, inViewpoint).markers;
+    const std::unique_ptr<InterferenceRep, Destroyer> markers(
+        new InterferenceRep(inPoints, tried, {}));
+    const int seen = trial.SeeWith(*markers, inViewpoint).markers;
     if (seen <= mostSeen) continue;
     mostSeen = seen;
     ioStyle = tried;

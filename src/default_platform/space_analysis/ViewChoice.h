@@ -22,9 +22,9 @@ struct ChosenView {
 /// The direction upwards in a picture with this sight: of z as much as can be, else of y.
 ZORMathVector UpFor(const ZORMathVector& inSight);
 
-/// Looks for a direction in which both products and the markers are seen when the interference is
-/// framed: the default one where that shows them well, else the best of those around; where a
-/// product is hidden from all, more of the surroundings is framed.
+/// Looks for a direction in which both products are seen when the interference is framed: the
+/// default one where that shows them well, else the best of those around; where a product is hidden
+/// from all, more of the surroundings is framed.
 /// @param inPoints at least one.
 ChosenView ChooseView(const ShownProducts& inProducts, const std::vector<ZORMathVector>& inPoints,
                       bool inIsDimension);

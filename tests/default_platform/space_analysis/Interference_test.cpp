@@ -81,6 +81,29 @@ TEST(Interference, FlagsSayWhichElementsAreShown) {
   EXPECT_EQ(0u, TrianglesOf(scene));
 }
 
+TEST(Interference, PointsThatNearlyCoincideAreOneBall) {
+  const std::string one = "<Point Ux='178' Uy='75' Uz='65'/>";
+  const std::string beside = "<Point Ux='178.0001' Uy='75' Uz='65'/>";
+  EXPECT_EQ(2, NutAndRod(one + beside).interference->GetElementCount());
+  EXPECT_EQ(TrianglesOf(NutAndRod(one)), TrianglesOf(NutAndRod(one + beside)));
+}
+
+TEST(Interference, VeryManyPointsAreShownByASample) {
+  std::string points;
+  constexpr int kCount = 20000;
+  for (int i = 0; i < kCount; ++i)
+    points += "<Point Ux='" + std::to_string(i % 25) + "' Uy='" + std::to_string(i / 25 % 25) +
+              "' Uz='" + std::to_string(i / 625) + "'/>";
+  const auto scene = NutAndRod(points);
+  EXPECT_EQ(kCount, scene.interference->GetElementCount());
+  const OwnRep rep(RepOf(scene.interference));
+  const auto mesh = ZORDefault::CollectDrawnMeshes(*rep).front().mesh;
+  EXPECT_GT(mesh->triangles.size(), 64u * 100);
+  EXPECT_LE(mesh->triangles.size(), 64u * 1000);
+  // They reach about as far as the points: the last one is 46 from the first.
+  EXPECT_GT(mesh->sphere.radius, 40);
+}
+
 TEST(Interference, RepresentationIsANewOneEachTime) {
   const auto scene = NutAndRod();
   const ZORDefault::ObjectCounts before = ZORDefault::CountsOf("InterferenceRep");

@@ -91,6 +91,28 @@ class Composition {
   const LineCoverage& lines_;
 };
 
+/// What the pixels of a row show between the sides of a box.
+void SeeRow(const DrawnScene& inScene, const PictureBox& inBox, int inY,
+            std::vector<ZORDefault::SeenPixel>& ioSeen) {
+  constexpr int kPacket = DrawnScene::kPacket;
+  const std::size_t row =
+      static_cast<std::size_t>(inY) * static_cast<std::size_t>(inScene.GetView().width);
+  for (int x = inBox.left; x < inBox.right; x += kPacket) {
+    const int count = std::min(kPacket, inBox.right - x);
+    PicturePoint middles[kPacket];
+    for (int i = 0; i < count; ++i)
+      middles[i] = {static_cast<float>(x + i) + 0.5F, static_cast<float>(inY) + 0.5F};
+    Hit hits[kPacket];
+    if (!inScene.Cast(middles, count, hits)) continue;
+    for (int i = 0; i < count; ++i) {
+      if (hits[i].item == Hit::kNothing) continue;
+      const DrawnItem& item = inScene.GetItems()[hits[i].item];
+      ioSeen[row + static_cast<std::size_t>(x + i)] = {
+          item.number, static_cast<float>(inScene.RealDepth(item, hits[i].depth))};
+    }
+  }
+}
+
 }  // namespace
 
 std::vector<std::uint8_t> DrawPicture(const PictureRequest& inRequest) {
@@ -115,21 +137,10 @@ std::vector<std::uint8_t> DrawPicture(const PictureRequest& inRequest) {
 
 std::vector<ZORDefault::SeenPixel> SeePicture(const PictureRequest& inRequest) {
   const DrawnScene scene(inRequest);
-  std::vector<ZORDefault::SeenPixel> seen;
-  seen.reserve(static_cast<std::size_t>(inRequest.width) *
-               static_cast<std::size_t>(inRequest.height));
-  for (int y = 0; y < inRequest.height; ++y) {
-    for (int x = 0; x < inRequest.width; ++x) {
-      const PicturePoint middle{static_cast<float>(x) + 0.5F, static_cast<float>(y) + 0.5F};
-      Hit hit;
-      if (!scene.Cast(&middle, 1, &hit) || hit.item == Hit::kNothing) {
-        seen.emplace_back();
-        continue;
-      }
-      const DrawnItem& item = scene.GetItems()[hit.item];
-      seen.push_back({item.number, static_cast<float>(scene.RealDepth(item, hit.depth))});
-    }
-  }
+  std::vector<ZORDefault::SeenPixel> seen(static_cast<std::size_t>(inRequest.width) *
+                                          static_cast<std::size_t>(inRequest.height));
+  const PictureBox& box = scene.GetBox();
+  for (int y = box.top; y < box.bottom; ++y) SeeRow(scene, box, y, seen);
   return seen;
 }
 
