@@ -2,8 +2,9 @@
 <!-- Turns a report of a clash result into the page that "lyra publish" writes. Beside what a report
      holds, that command gives to the root: page:model, a page:Type for each type and a page:Status
      for each status, with page:word and page:count; to each interference: page:number, page:type,
-     page:status, page:picture and page:Thumbnail elements; to each of its two products: page:colour,
-     page:preview and page:missing. Texts of the document are isolated (bdi), so that none can change
+     page:status, page:picture, page:asInModel (why the picture does not have the result's placements)
+     and page:Thumbnail elements; to each of its two products: page:colour, page:preview and
+     page:missing. page:asInModel at the root says that no picture has them, as was asked for. Texts of the document are isolated (bdi), so that none can change
      the direction of what stands around it. -->
 <xsl:stylesheet version="1.0" xmlns:xsl="http://www.w3.org/1999/XSL/Transform"
                 xmlns:page="urn:zorlyra:page" exclude-result-prefixes="page">
@@ -71,6 +72,17 @@
             <xsl:with-param name="counts" select="page:Status"/>
           </xsl:call-template>
         </div>
+      </xsl:if>
+      <xsl:if test="@page:asInModel">
+        <p class="note">The pictures show the products where they stand in the model.</p>
+      </xsl:if>
+      <xsl:if test="$interferences/@page:asInModel">
+        <p class="notice">
+          <strong><xsl:value-of select="count($interferences[@page:asInModel])"/></strong>
+          <xsl:text> of </xsl:text>
+          <xsl:value-of select="count($interferences)"/>
+          <xsl:text> interferences are drawn with the products where they stand in the model, since the placements of the result cannot be used.</xsl:text>
+        </p>
       </xsl:if>
       <xsl:if test="$interferences/Product/@page:missing">
         <p class="notice">
@@ -155,7 +167,7 @@
             <span class="dot {$class}"></span>
             <strong><xsl:value-of select="@page:count"/></strong>
             <xsl:text> </xsl:text>
-            <bdi><xsl:value-of select="@page:word"/></bdi>
+            <xsl:call-template name="short"><xsl:with-param name="text" select="@page:word"/></xsl:call-template>
           </li>
         </xsl:for-each>
       </ul>
@@ -178,7 +190,17 @@
 
   <xsl:template name="type">
     <xsl:variable name="class"><xsl:call-template name="class"><xsl:with-param name="word" select="@page:type"/></xsl:call-template></xsl:variable>
-    <span class="type {$class}"><bdi><xsl:value-of select="@page:type"/></bdi></span>
+    <span class="type {$class}">
+      <xsl:call-template name="short"><xsl:with-param name="text" select="@page:type"/></xsl:call-template>
+    </span>
+  </xsl:template>
+
+  <!-- Where many stand together, the beginning of a text is enough; the section has all of it. -->
+  <xsl:template name="short">
+    <xsl:param name="text"/>
+    <xsl:param name="most" select="120"/>
+    <bdi><xsl:value-of select="substring($text, 1, $most)"/></bdi>
+    <xsl:if test="string-length($text) > $most">…</xsl:if>
   </xsl:template>
 
   <!-- Table -->
@@ -219,36 +241,35 @@
         </td>
       </xsl:if>
       <td><xsl:call-template name="type"/></td>
-      <td class="number"><bdi><xsl:value-of select="@Value"/></bdi></td>
-      <td><bdi><xsl:value-of select="@page:status"/></bdi></td>
+      <td class="number"><xsl:call-template name="short"><xsl:with-param name="text" select="@Value"/></xsl:call-template></td>
+      <td><xsl:call-template name="short"><xsl:with-param name="text" select="@page:status"/></xsl:call-template></td>
       <td class="products">
         <xsl:apply-templates select="Product[1]" mode="name"/>
         <xsl:apply-templates select="Product[position() > 1][last()]" mode="name"/>
       </td>
-      <td><bdi><xsl:value-of select="ViolatedRule[last()]/@Name"/></bdi></td>
-      <td class="comment">
-        <bdi><xsl:value-of select="substring(Comment[last()]/@Value, 1, 120)"/></bdi>
-        <xsl:if test="string-length(Comment[last()]/@Value) > 120">…</xsl:if>
-      </td>
+      <td><xsl:call-template name="short"><xsl:with-param name="text" select="ViolatedRule[last()]/@Name"/></xsl:call-template></td>
+      <td class="comment"><xsl:call-template name="short"><xsl:with-param name="text" select="Comment[last()]/@Value"/></xsl:call-template></td>
     </tr>
   </xsl:template>
 
   <xsl:template match="Product" mode="name">
     <div class="product">
       <xsl:call-template name="swatch"/>
-      <xsl:call-template name="productName"/>
+      <xsl:variable name="name"><xsl:call-template name="productName"/></xsl:variable>
+      <xsl:call-template name="short">
+        <xsl:with-param name="text" select="$name"/>
+        <xsl:with-param name="most" select="240"/>
+      </xsl:call-template>
       <xsl:if test="@page:missing"><xsl:text> </xsl:text><span class="missing">not in the model</span></xsl:if>
     </div>
   </xsl:template>
 
   <xsl:template name="productName">
-    <bdi>
-      <xsl:choose>
-        <xsl:when test="@Alias != ''"><xsl:value-of select="@Alias"/></xsl:when>
-        <xsl:when test="@DescriptionID != ''"><xsl:value-of select="@DescriptionID"/></xsl:when>
-        <xsl:otherwise>(no name)</xsl:otherwise>
-      </xsl:choose>
-    </bdi>
+    <xsl:choose>
+      <xsl:when test="@Alias != ''"><xsl:value-of select="@Alias"/></xsl:when>
+      <xsl:when test="@DescriptionID != ''"><xsl:value-of select="@DescriptionID"/></xsl:when>
+      <xsl:otherwise>(no name)</xsl:otherwise>
+    </xsl:choose>
   </xsl:template>
 
   <xsl:template name="swatch">
@@ -274,10 +295,13 @@
             <a class="zoom" href="{@page:picture}"><img src="{@page:picture}" alt="Picture of interference {@page:number}" loading="lazy" decoding="async"/></a>
             <xsl:if test="page:Thumbnail">
               <div class="thumbnails">
-                <xsl:for-each select="page:Thumbnail">
-                  <a class="zoom" href="{@href}"><img src="{@href}" alt="" loading="lazy"/></a>
+                <xsl:for-each select="page:Thumbnail[position() &lt;= $mostPoints]">
+                  <a class="zoom" href="{@href}"><img src="{@href}" alt="Point {position()}" loading="lazy" decoding="async" width="72" height="50"/></a>
                 </xsl:for-each>
               </div>
+            </xsl:if>
+            <xsl:if test="@page:asInModel">
+              <figcaption class="note">As in the model: <bdi><xsl:value-of select="@page:asInModel"/></bdi></figcaption>
             </xsl:if>
           </figure>
         </xsl:if>
@@ -328,7 +352,7 @@
       <div>
         <div class="product">
           <xsl:call-template name="swatch"/>
-          <strong><xsl:call-template name="productName"/></strong>
+          <strong><bdi><xsl:call-template name="productName"/></bdi></strong>
           <xsl:if test="@page:missing"><xsl:text> </xsl:text><span class="missing">not in the model</span></xsl:if>
         </div>
         <xsl:if test="@DescriptionID != '' and @Alias != '' and @DescriptionID != @Alias">
@@ -417,11 +441,12 @@ h1 { margin:.1rem 0 1rem; font-size:1.9rem; line-height:1.2; font-weight:650 }
 .missing { color:var(--contact); border:1px solid currentColor; border-radius:.25rem; font-size:.72rem; padding:0 .3rem; white-space:nowrap }
 .filters { display:flex; flex-wrap:wrap; gap:.6rem 1.2rem; align-items:center; margin:2rem 0 .6rem; color:var(--soft); font-size:.85rem }
 .filters[hidden] { display:none }
-.filters input,.filters select { font:inherit; color:var(--ink); background:var(--panel); border:1px solid var(--line); border-radius:.35rem; padding:.3rem .5rem; margin-left:.3rem }
+.filters input,.filters select { font:inherit; color:var(--ink); background:var(--panel); border:1px solid var(--line); border-radius:.35rem; padding:.3rem .5rem; margin-left:.3rem; max-width:16rem }
+@media screen { h1,.facts dd,h2 > *,.card strong,.card .note,figcaption { max-height:9em; overflow:auto } h1 { max-height:7.2em } .card strong { display:inline-block; vertical-align:top } }
 .filters output { margin-left:auto }
 .wide { overflow-x:auto; margin-top:1rem }
 table { border-collapse:collapse; width:100%; font-size:.9rem }
-th,td { text-align:start; vertical-align:top; padding:.5rem .7rem; border-bottom:1px solid var(--line) }
+th,td { text-align:start; vertical-align:top; padding:.5rem .7rem; border-bottom:1px solid var(--line); overflow:clip }
 th { color:var(--soft); font-weight:600; font-size:.8rem; white-space:nowrap }
 th button { all:unset; cursor:pointer; color:inherit } th button:hover { color:var(--ink) }
 th button:focus-visible { outline:2px solid var(--accent) }

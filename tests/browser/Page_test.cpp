@@ -146,6 +146,25 @@ TEST_F(Page, ClickOnAPictureShowsItLarge) {
             "true interference_3.jpg");
 }
 
+TEST_F(Page, SmallPicturesLoadAndShowLargeByAClick) {
+  fs::create_directories(PathOf("system"));
+  directory_->Write("system/Clash.toml", "ModeOfSubInterf = 1\n");
+  const CommandResult result =
+      RunShell("TRX_VELD_SUBINTERF=TRUE ZOR_SETTINGS_PATH=" + PathOf("") +
+               " lyra publish samples/as1.clash.xml --model samples/as1-oc-214.stp --only "
+               "type=contact,product=nut_1 --size 120x80 --format png -o " +
+               PathOf("small"));
+  ASSERT_EQ(result.code, 0) << result.error;
+  EXPECT_EQ(After("small",
+                  "const first = document.querySelector('.thumbnails a');\n"
+                  "const probe = new Image();\n"
+                  "probe.onload = () => { first.click();\n"
+                  "say(probe.naturalWidth + 'x' + probe.naturalHeight + ' ' + "
+                  "document.querySelector('dialog img').src.split('/').pop()); };\n"
+                  "probe.src = first.href;"),
+            "72x50 interference_1_SubItf_1.png");
+}
+
 TEST_F(Page, EveryPictureLoads) {
   EXPECT_EQ(
       After("as1",
@@ -177,6 +196,25 @@ TEST_F(Page, MarkupOfADocumentDoesNothing) {
                   "document.querySelector('h1').textContent.startsWith('\">"
                   "<img')].join(' '));"),
             "1 0 0 undefined true");  // the one image is that of the dialog
+}
+
+TEST_F(Page, NothingIsWiderThanThePage) {
+  const std::string word(3000, 'W');
+  std::string products;
+  for (int i = 0; i < 2; ++i)
+    products += "<Product Alias='" + word + "' DescriptionID='x" + word + "'/>";
+  ASSERT_EQ(RunCommand({"publish", "-", "-o", PathOf("wide")},
+                       "<ClashElement ZORDocument='" + word + "' Responsible='" + word +
+                           "'><ClashResult Name='" + word + "'><Interference Name='" + word +
+                           "' Value='" + word + "' ResultType='" + word + "' Status='" + word +
+                           "'>" + products + "<Comment Value='" + word +
+                           "'/></Interference></ClashResult></ClashElement>")
+                .code,
+            0);
+  EXPECT_EQ(After("wide",
+                  "say(document.documentElement.scrollWidth <= "
+                  "document.documentElement.clientWidth);"),
+            "true");
 }
 
 TEST_F(Page, PrintHoldsEachInterference) {

@@ -1,14 +1,15 @@
 // lyra convert FILE --to json
-#include <array>
 #include <memory>
 
-#include "lyra/CommandErrors.h"
 #include "lyra/Language.h"
+#include "lyra/OptionWord.h"
 #include "lyra/RecordsJson.h"
 #include "lyra/Verbs.h"
 
 namespace lyra {
 namespace {
+
+constexpr const char* kFormats[] = {"json"};
 
 struct ConvertOptions {
   std::string file, format, language;
@@ -36,8 +37,7 @@ void WriteInterferences(ClashResultFile& ioFile, Output& ioOutput) {
 }
 
 int Convert(const ConvertOptions& inOptions, Output& ioOutput) {
-  if (inOptions.format != "json")
-    throw UsageError("--to: unknown word \"" + inOptions.format + "\"; known are json");
+  ChosenWord("--to", inOptions.format, kFormats);
   ChooseLanguage(inOptions.language);
   ClashResultFile file(inOptions.file);
   ioOutput.Write("{\"info\":" + JsonText(ReadGeneral(file)));
@@ -55,7 +55,7 @@ VerbAction DeclareConvert(Arguments& ioArguments) {
   const auto options = std::make_shared<ConvertOptions>();
   ioArguments.Positional("FILE", options->file, "Any clash result, or - for standard input");
   ioArguments.RequiredText("--to", "FORMAT", options->format, "json: all of it in one document");
-  ioArguments.Words("--to", std::array{"json"});
+  ioArguments.Words("--to", kFormats);
   ioArguments.Language(options->language);
   return [options](Output& ioOutput) { return Convert(*options, ioOutput); };
 }

@@ -1,5 +1,4 @@
 // lyra render MODEL -o PICTURE
-#include <array>
 #include <filesystem>
 #include <memory>
 
@@ -133,7 +132,7 @@ VerbAction DeclareRender(Arguments& ioArguments) {
   ioArguments.Text("--size", "WxH", options->size, "Width and height in pixels (default: 756x506)");
   ioArguments.Text("--view", "VIEW", options->view,
                    "iso (default), front, back, left, right, top or bottom");
-  ioArguments.Words("--view", std::array{"iso", "front", "back", "left", "right", "top", "bottom"});
+  ioArguments.Words("--view", kViewWords);
   ioArguments.Flag("--keep-background", options->keepBackground,
                    "A soft gradient behind the products instead of white");
   return [options](Output& ioOutput) { return Render(*options, ioOutput); };

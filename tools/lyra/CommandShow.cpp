@@ -42,15 +42,15 @@ void AddPlacement(const Placement& inPlacement, Facts& ioFacts) {
 void AddProduct(const char* inGroup, const ProductRecord& inProduct, Facts& ioFacts) {
   if (!inProduct.position) return;
   ioFacts.AddGroup(inGroup);
-  ioFacts.Add("Alias", inProduct.alias);
-  ioFacts.Add("Identifier", inProduct.id);
-  ioFacts.Add("Instance", inProduct.instance);
-  ioFacts.Add("Label", inProduct.label);
-  ioFacts.Add("Shape", inProduct.shape);
-  ioFacts.Add("Shape source", inProduct.shapeSource);
-  ioFacts.Add("Alien", inProduct.alien);
-  ioFacts.Add("Process mode", inProduct.processMode);
-  ioFacts.Add("Preview", inProduct.preview);
+  ioFacts.Add({{"Alias", inProduct.alias},
+               {"Identifier", inProduct.id},
+               {"Instance", inProduct.instance},
+               {"Label", inProduct.label},
+               {"Shape", inProduct.shape},
+               {"Shape source", inProduct.shapeSource},
+               {"Alien", inProduct.alien},
+               {"Process mode", inProduct.processMode},
+               {"Preview", inProduct.preview}});
   AddPlacement(*inProduct.position, ioFacts);
 }
 
@@ -59,10 +59,10 @@ void AddRule(const RuleRecord& inRule, Facts& ioFacts) {
       inRule.penetrationCandidate.empty())
     return;
   ioFacts.AddGroup("Violated rule");
-  ioFacts.Add("Name", inRule.name);
-  ioFacts.Add("Clearance", inRule.clearance);
-  ioFacts.Add("Severity", inRule.severity);
-  ioFacts.Add("Penetration candidate", inRule.penetrationCandidate);
+  ioFacts.Add({{"Name", inRule.name},
+               {"Clearance", inRule.clearance},
+               {"Severity", inRule.severity},
+               {"Penetration candidate", inRule.penetrationCandidate}});
 }
 
 void AddGeometry(const InterferenceRecord& inRecord, Facts& ioFacts) {
@@ -75,10 +75,10 @@ void AddGeometry(const InterferenceRecord& inRecord, Facts& ioFacts) {
 
 void AddViewpoint(const ViewpointRecord& inViewpoint, Facts& ioFacts) {
   ioFacts.AddGroup("Viewpoint");
-  ioFacts.Add("Projection", inViewpoint.projection);
-  ioFacts.Add("Focus distance", inViewpoint.focusDistance);
-  ioFacts.Add("Near plane", inViewpoint.nearPlane);
-  ioFacts.Add("Far plane", inViewpoint.farPlane);
+  ioFacts.Add({{"Projection", inViewpoint.projection},
+               {"Focus distance", inViewpoint.focusDistance},
+               {"Near plane", inViewpoint.nearPlane},
+               {"Far plane", inViewpoint.farPlane}});
   ioFacts.Add("Point", Joined(inViewpoint.point));
   ioFacts.Add("Sight", Joined(inViewpoint.sight));
 }
@@ -86,15 +86,15 @@ void AddViewpoint(const ViewpointRecord& inViewpoint, Facts& ioFacts) {
 void PrintText(const InterferenceRecord& inRecord, Output& ioOutput) {
   Facts facts("Interference " + std::to_string(inRecord.index) +
               (inRecord.name.empty() ? "" : ": " + inRecord.name));
-  facts.Add("Result", inRecord.result);
-  facts.Add("Type", inRecord.type);
-  facts.Add("Value", inRecord.value);
-  facts.Add("Clearance", inRecord.clearance);
-  facts.Add("Status", inRecord.status);
-  facts.Add("Computation case", inRecord.computationCase);
-  facts.Add("Retrieve", inRecord.retrieve);
-  facts.Add("Comment", inRecord.comment);
-  facts.Add("Picture", inRecord.picture);
+  facts.Add({{"Result", inRecord.result},
+             {"Type", inRecord.type},
+             {"Value", inRecord.value},
+             {"Clearance", inRecord.clearance},
+             {"Status", inRecord.status},
+             {"Computation case", inRecord.computationCase},
+             {"Retrieve", inRecord.retrieve},
+             {"Comment", inRecord.comment},
+             {"Picture", inRecord.picture}});
   AddRule(inRecord.rule, facts);
   AddProduct("First product", inRecord.products[0], facts);
   AddProduct("Second product", inRecord.products[1], facts);

@@ -12,6 +12,10 @@ void Facts::Add(const std::string& inName, const std::string& inValue) {
   if (!inValue.empty()) facts_.emplace_back(inName, Printable(inValue));
 }
 
+void Facts::Add(std::initializer_list<std::pair<const char*, const std::string&>> inFacts) {
+  for (const auto& [name, value] : inFacts) Add(name, value);
+}
+
 void Facts::AddGroup(const std::string& inName) { facts_.emplace_back(inName, ""); }
 
 void Facts::Print(Output& ioOutput) const {

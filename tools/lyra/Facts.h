@@ -2,6 +2,7 @@
 #ifndef ZOR_TOOLS_LYRA_FACTS_H
 #define ZOR_TOOLS_LYRA_FACTS_H
 
+#include <initializer_list>
 #include <string>
 #include <utility>
 #include <vector>
@@ -17,6 +18,7 @@ class Facts {
   explicit Facts(const std::string& inHeading);
   /// A fact whose value is empty is left out.
   void Add(const std::string& inName, const std::string& inValue);
+  void Add(std::initializer_list<std::pair<const char*, const std::string&>> inFacts);
   /// A line of its own for a group of the facts that follow.
   void AddGroup(const std::string& inName);
   void Print(Output& ioOutput) const;

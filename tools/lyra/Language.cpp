@@ -2,10 +2,17 @@
 
 #include <cstdlib>
 
+#include "lyra/Arguments.h"
+#include "lyra/OptionWord.h"
+#include "lyra/SafeText.h"
+
 namespace lyra {
 
 void ChooseLanguage(const std::string& inLanguage) {
-  if (!inLanguage.empty()) setenv("ZOR_LANG", inLanguage.c_str(), 1);
+  if (inLanguage.empty()) return;
+  const std::string language = CaseFolded(inLanguage.substr(0, inLanguage.find_first_of("_-.@")));
+  ChosenWord("--lang", language, kLanguages);
+  setenv("ZOR_LANG", language.c_str(), 1);
 }
 
 }  // namespace lyra

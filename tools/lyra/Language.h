@@ -7,7 +7,8 @@
 namespace lyra {
 
 /// Makes a language that of the message catalogues for the rest of the process; the empty text
-/// leaves it as the environment has it.
+/// leaves it as the environment has it. A locale such as "fr_CA.UTF-8" is a language too. Raises
+/// UsageError for a language that there are no catalogues of.
 void ChooseLanguage(const std::string& inLanguage);
 
 }  // namespace lyra

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <span>
 
-#include "lyra/CommandErrors.h"
+#include "lyra/OptionWord.h"
 #include "lyra/SafeText.h"
 
 namespace lyra {
@@ -24,11 +24,7 @@ std::vector<std::string> KnownKeys(const std::vector<std::string>& inWords, cons
     const std::string key = WordKey(word);
     const bool isKnown = std::any_of(inKnown.begin(), inKnown.end(),
                                      [&](const char* inWord) { return WordKey(inWord) == key; });
-    if (!isKnown) {
-      std::string message = std::string(inOption) + ": unknown word \"" + word + "\"; known are";
-      for (const char* known : inKnown) message += std::string(" ") + known;
-      throw UsageError(message);
-    }
+    if (!isKnown) throw UnknownWord(inOption, word, inKnown);
     keys.push_back(key);
   }
   return keys;

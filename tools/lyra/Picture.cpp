@@ -1,7 +1,6 @@
 #include "lyra/Picture.h"
 
 #include <algorithm>
-#include <array>
 #include <cctype>
 #include <charconv>
 #include <memory>
@@ -11,6 +10,7 @@
 #include "ZORLyraXMLServices.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/DocumentText.h"
+#include "lyra/OptionWord.h"
 #include "platform/visualisation/ZOR3DViewpoint.h"
 
 namespace lyra {
@@ -18,22 +18,10 @@ namespace {
 
 constexpr int kLargestSize = 16384;
 
-struct NamedView {
-  std::string_view word;
-  PictureView view;
-};
-
-const std::array<NamedView, 6>& NamedViews() {
-  static const std::array<NamedView, 6> views = {{
-      {"front", {{0, 1, 0}, {0, 0, 1}}},
-      {"back", {{0, -1, 0}, {0, 0, 1}}},
-      {"left", {{1, 0, 0}, {0, 0, 1}}},
-      {"right", {{-1, 0, 0}, {0, 0, 1}}},
-      {"top", {{0, 0, -1}, {0, 1, 0}}},
-      {"bottom", {{0, 0, 1}, {0, -1, 0}}},
-  }};
-  return views;
-}
+/// Of the view words after "iso".
+const PictureView kViews[] = {{{0, 1, 0}, {0, 0, 1}},  {{0, -1, 0}, {0, 0, 1}},
+                              {{1, 0, 0}, {0, 0, 1}},  {{-1, 0, 0}, {0, 0, 1}},
+                              {{0, 0, -1}, {0, 1, 0}}, {{0, 0, 1}, {0, -1, 0}}};
 
 /// @return 0 for what is no whole number or out of range.
 int PixelCount(std::string_view inText) {
@@ -85,13 +73,9 @@ PictureSize SizeOf(const std::string& inText) {
 }
 
 std::optional<PictureView> ViewOf(const std::string& inWord) {
-  if (inWord == "iso") return std::nullopt;
-  std::string known = "iso";
-  for (const NamedView& named : NamedViews()) {
-    if (named.word == inWord) return named.view;
-    known += ", " + std::string(named.word);
-  }
-  throw UsageError("--view: unknown word \"" + inWord + "\"; known are " + known);
+  const std::size_t place = ChosenWord("--view", inWord, kViewWords);
+  if (place == 0) return std::nullopt;
+  return kViews[place - 1];
 }
 
 void TakePicture(ZOR3DRep& inRep, const PictureWishes& inWishes, const std::string& inPath) {

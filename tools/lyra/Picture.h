@@ -35,8 +35,10 @@ struct PictureWishes {
 PictureFormat FormatOfPicture(const std::string& inPath);
 /// "WxH", 1 to 16384 each.
 PictureSize SizeOf(const std::string& inText);
-/// "iso", which is none, "front", "back", "left", "right", "top" or "bottom". The front is seen in
-/// the direction of the y axis, z upwards; the top with the y axis upwards.
+inline constexpr const char* kViewWords[] = {"iso",   "front", "back",  "left",
+                                             "right", "top",   "bottom"};
+/// One of these words; "iso" is none. The front is seen in the direction of the y axis, z upwards;
+/// the top with the y axis upwards.
 std::optional<PictureView> ViewOf(const std::string& inWord);
 
 /// Writes a picture with all of a representation framed; no file when it cannot be drawn.

@@ -64,6 +64,7 @@ ReplacedFile::ReplacedFile(const std::string& inPath) : path_(inPath) {
 ReplacedFile::~ReplacedFile() {
   if (descriptor_ >= 0) close(descriptor_);
   if (!temporary_.empty()) unlink(temporary_.c_str());
+  removedAtSignal_.reset();  // while the name is still there
 }
 
 void ReplacedFile::Fail(int inErrorNumber) const {
@@ -75,6 +76,7 @@ void ReplacedFile::MakeTemporary(const std::string& inDirectory, unsigned int in
   descriptor_ = mkostemp(pattern.data(), O_CLOEXEC);
   if (descriptor_ < 0) Fail(errno);
   temporary_ = pattern;
+  removedAtSignal_.emplace(temporary_.c_str());
   // A path goes through the library as text, which bytes that are no text do not survive.
   writtenPath_ =
       Utf8(FromUtf8(pattern)) == pattern ? pattern : "/proc/self/fd/" + std::to_string(descriptor_);
@@ -121,6 +123,7 @@ void ReplacedFile::Finish(Output& ioOutput) {
   }
   Synchronise();
   if (std::rename(temporary_.c_str(), target_.c_str()) != 0) Fail(errno);
+  removedAtSignal_.reset();
   temporary_.clear();
 }
 

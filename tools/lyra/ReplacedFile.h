@@ -2,15 +2,18 @@
 #ifndef ZOR_TOOLS_LYRA_REPLACED_FILE_H
 #define ZOR_TOOLS_LYRA_REPLACED_FILE_H
 
+#include <optional>
 #include <string>
 
+#include "lyra/EndingSignals.h"
 #include "lyra/Output.h"
 #include "platform/system/ZORResult.h"
 
 namespace lyra {
 
 /// A new file beside the place where it is to be. Whatever happens before Finish, what stands in
-/// that place stays as it is. A link is followed; a device or a pipe, which cannot be replaced, and
+/// that place stays as it is, and nothing is left of the new file unless the process is killed. A
+/// link is followed; a device or a pipe, which cannot be replaced, and
 /// standard output ("-") get the bytes at the end. Raises InputError with the reason.
 class ReplacedFile {
  public:
@@ -35,6 +38,7 @@ class ReplacedFile {
   std::string path_;       // as the user gave it
   std::string target_;     // what is replaced; empty when the bytes are copied
   std::string temporary_;  // empty when it is gone
+  std::optional<RemovedAtSignal> removedAtSignal_;
   std::string writtenPath_;
   int descriptor_ = -1;  // of the temporary file, as long as this lives
 };

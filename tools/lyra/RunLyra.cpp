@@ -9,6 +9,7 @@
 
 #include "lyra/CommandErrors.h"
 #include "lyra/CommandLine.h"
+#include "lyra/EndingSignals.h"
 #include "lyra/Language.h"
 #include "lyra/SafeText.h"
 
@@ -78,6 +79,8 @@ int RunLyra(int inCount, char** inArguments) {
     return 0;
   } catch (const UsageError& error) {
     return ComplainOfUsage(error.what());
+  } catch (const Interrupted& interrupted) {
+    EndBy(interrupted.signal);
   } catch (const std::bad_alloc&) {
     Complain("there is not enough memory");
   } catch (const std::exception& error) {

@@ -1,6 +1,5 @@
 // lyra publish RESULT --model MODEL -o DIR
 #include <algorithm>
-#include <array>
 #include <fstream>
 #include <memory>
 #include <sstream>
@@ -10,6 +9,7 @@
 #include "lyra/DocumentText.h"
 #include "lyra/Language.h"
 #include "lyra/ModelFile.h"
+#include "lyra/OptionWord.h"
 #include "lyra/ReplacedFile.h"
 #include "lyra/ReportWriter.h"
 #include "lyra/Verbs.h"
@@ -17,6 +17,7 @@
 #include "lyra/publish/PageLibrary.h"
 #include "lyra/publish/Publication.h"
 #include "platform/system/ZORSettingRepository.h"
+#include "platform/system/ZORSysSettingRepository.h"
 
 namespace fs = std::filesystem;
 
@@ -28,9 +29,13 @@ constexpr char kPage[] = "index.html";
 constexpr char kReportStyleSheet[] = "clash-report.xsl";
 constexpr char kReportType[] = "clash-report.dtd";
 constexpr long long kMostProcesses = 256;
+constexpr const char* kFormats[] = {"jpeg", "png"};
+constexpr const char* kZooms[] = {"interference", "products"};  // by the setting's value
+constexpr const char* kPositions[] = {"result", "model"};
 
 struct PublishOptions {
-  std::string file, model, directory, styleSheet, size, format = "jpeg", zoom, language;
+  std::string file, model, directory, styleSheet, size, format = "jpeg", zoom, positions = "result",
+                                                        language;
   std::vector<std::string> only;
   std::optional<long long> jobs;
   bool resume = false;
@@ -72,25 +77,26 @@ OtherStyleSheet ChosenStyleSheet(const PublishOptions& inOptions) {
   const std::string name = sheet.Name();
   if (name == kReport || name == kPage || name == kReportType)
     throw InputError(sheet.path + ": a style sheet of this name would take the place of another");
-  PageLibrary().MakePage(
-      {{}, sheet.text, sheet.path, {}, {}});  // says what is wrong before drawing
+  PageRequest reading;  // says what is wrong before drawing
+  reading.styleSheet = sheet.text;
+  reading.styleSheetName = sheet.path;
+  PageLibrary().MakePage(reading);
   return sheet;
 }
 
 PictureStyle StyleOf(const PublishOptions& inOptions) {
   PictureStyle style;
-  if (inOptions.format != "jpeg" && inOptions.format != "png")
-    throw UsageError("--format: unknown word \"" + inOptions.format + "\"; known are jpeg, png");
-  if (inOptions.format == "png") style.format = PictureFormat::kPng;
+  const bool isPng = ChosenWord("--format", inOptions.format, kFormats) == 1;
+  style.format = isPng ? PictureFormat::kPng : PictureFormat::kJpeg;
   if (!inOptions.size.empty()) style.size = SizeOf(inOptions.size);
-  if (inOptions.zoom == "products")
-    style.zoom = 1;
-  else if (inOptions.zoom == "interference")
-    style.zoom = 0;
-  else if (!inOptions.zoom.empty())
-    throw UsageError("--zoom: unknown word \"" + inOptions.zoom +
-                     "\"; known are interference, products");
+  if (!inOptions.zoom.empty())
+    style.zoom = static_cast<int>(ChosenWord("--zoom", inOptions.zoom, kZooms));
   return style;
+}
+
+ProductPlaces PlacesOf(const PublishOptions& inOptions) {
+  const bool areModels = ChosenWord("--positions", inOptions.positions, kPositions) == 1;
+  return areModels ? ProductPlaces::kModel : ProductPlaces::kResult;
 }
 
 int ProcessCount(const PublishOptions& inOptions) {
@@ -100,17 +106,29 @@ int ProcessCount(const PublishOptions& inOptions) {
   return static_cast<int>(*inOptions.jobs);
 }
 
+/// The settings by which pictures differ.
+std::string PictureSettings(const PictureStyle& inStyle) {
+  int zoom = inStyle.zoom.value_or(0), subInterferences = 0;
+  if (auto* const settings = ZORSettingRepository::GetRepository("ClashPublish");
+      settings != nullptr && !inStyle.zoom)
+    settings->ReadSetting("PictureZoom", &zoom, 1);
+  if (auto* const settings = ZORSysSettingRepository::GetRepository("Clash"))
+    settings->ReadAttr("ModeOfSubInterf", &subInterferences);
+  const char* const switchedOn = std::getenv("TRX_VELD_SUBINTERF");
+  return std::to_string(zoom) + " " + std::to_string(subInterferences) + " " +
+         (switchedOn != nullptr ? switchedOn : "");
+}
+
 /// What the pictures are made from.
 std::string StampOf(const PublishOptions& inOptions, const Publication& inPublication,
                     const PictureStyle& inStyle) {
   const auto time = fs::last_write_time(inOptions.model).time_since_epoch().count();
-  const char* const subPictures = std::getenv("TRX_VELD_SUBINTERF");
   return "result " + inPublication.Fingerprint() + "\nmodel " +
          fs::canonical(inOptions.model).string() + " " +
          std::to_string(fs::file_size(inOptions.model)) + " " + std::to_string(time) +
          "\npictures " + inOptions.format + " " + std::to_string(inStyle.size.width) + "x" +
-         std::to_string(inStyle.size.height) + " " + inOptions.zoom + " " +
-         (subPictures != nullptr ? subPictures : "") + "\n";
+         std::to_string(inStyle.size.height) + " " + inOptions.positions + " " +
+         PictureSettings(inStyle) + "\n";
 }
 
 struct Drawn {
@@ -161,6 +179,7 @@ PageRequest RequestOf(const PublishOptions& inOptions, const OtherStyleSheet& in
   request.styleSheet = inSheet.text;
   request.styleSheetName = inSheet.path.empty() ? "clash-page.xsl" : inSheet.path;
   request.model = Utf8(FromUtf8(fs::path(inOptions.model).filename().string()));
+  request.isAsInModel = !inOptions.model.empty() && PlacesOf(inOptions) == ProductPlaces::kModel;
   for (const Entry& entry : inPublication.Entries()) request.interferences.push_back(entry.facts);
   return request;
 }
@@ -180,15 +199,17 @@ void WriteAll(const PublishOptions& inOptions, const OtherStyleSheet& inSheet,
 int Publish(const PublishOptions& inOptions, Output& ioOutput) {
   const ListFilter filter = ParseOnly(inOptions.only);
   const PictureStyle style = StyleOf(inOptions);
+  const ProductPlaces places = PlacesOf(inOptions);
   ProcessCount(inOptions);
   ChooseLanguage(inOptions.language);
   ClashResultFile file(inOptions.file);
   file.Require({DocumentKind::kClash, DocumentKind::kInterference}, "interferences");
   const OtherStyleSheet sheet = ChosenStyleSheet(inOptions);
-  Publication publication(file, filter);
+  Publication publication(file, filter, places);
   Drawn drawn;
   try {
     fs::create_directories(inOptions.directory);
+    RemoveUnfinishedFiles(inOptions.directory);
     if (!inOptions.model.empty()) drawn = DrawPictures(inOptions, style, publication);
   } catch (const fs::filesystem_error& error) {
     throw InputError(error.path1().string() + ": " + error.code().message());
@@ -218,11 +239,14 @@ VerbAction DeclarePublish(Arguments& ioArguments) {
   ioArguments.Text("--size", "WxH", options->size,
                    "Width and height of a picture in pixels (default: 756x506)");
   ioArguments.Text("--format", "FORMAT", options->format, "jpeg (default) or png");
-  ioArguments.Words("--format", std::array{"jpeg", "png"});
+  ioArguments.Words("--format", kFormats);
   ioArguments.Text("--zoom", "WHAT", options->zoom,
                    "What pictures are framed on: interference or products (default: the setting "
                    "PictureZoom)");
-  ioArguments.Words("--zoom", std::array{"interference", "products"});
+  ioArguments.Words("--zoom", kZooms);
+  ioArguments.Text("--positions", "WHOSE", options->positions,
+                   "Where products stand in pictures: as the result (default) or the model says");
+  ioArguments.Words("--positions", kPositions);
   ioArguments.Text("--xsl", "FILE", options->styleSheet,
                    "A style sheet of your own for the page (default: the setting XslTemplate)");
   ioArguments.Number("--jobs", "N", options->jobs,

@@ -14,6 +14,7 @@
 #include <vector>
 
 #include "lyra/CommandErrors.h"
+#include "lyra/EndingSignals.h"
 
 namespace lyra {
 namespace {
@@ -36,6 +37,7 @@ class SharedCounter {
   SharedCounter& operator=(const SharedCounter&) = delete;
 
   std::size_t Next() { return number_->fetch_add(1); }
+  void Set(std::size_t inNumber) { *number_ = inNumber; }
   std::size_t Current() const { return *number_; }
 
  private:
@@ -70,7 +72,8 @@ struct Pipe {
 };
 
 // When nobody reads any more the command has ended, so there is nothing to draw for.
-[[noreturn]] void Work(const DrawingWork& inWork, SharedCounter& ioNext, const Pipe& inPipe) {
+[[noreturn]] void Work(const DrawingWork& inWork, const StopRequest& inStop, SharedCounter& ioNext,
+                       const Pipe& inPipe) {
   int code = 0;
   try {
     close(inPipe.reader);
@@ -79,7 +82,7 @@ struct Pipe {
       if (!isBegun) inWork.begin();
       isBegun = true;
       inWork.draw(i);
-      if (write(inPipe.writer, "", 1) != 1) break;
+      if (write(inPipe.writer, "", 1) != 1 || inStop.IsMade()) break;
     }
   } catch (const std::exception&) {
     code = 1;
@@ -87,7 +90,8 @@ struct Pipe {
   _exit(code);  // what this process shares with its parent is the parent's to write and to remove
 }
 
-void Follow(const DrawingWork& inWork, const Pipe& inPipe, std::size_t& ioDone) {
+void Follow(const DrawingWork& inWork, const StopRequest& inStop, const Pipe& inPipe,
+            SharedCounter& ioNext, std::size_t& ioDone) {
   char bytes[256];
   for (;;) {
     const ssize_t count = read(inPipe.reader, bytes, sizeof bytes);
@@ -95,6 +99,7 @@ void Follow(const DrawingWork& inWork, const Pipe& inPipe, std::size_t& ioDone) 
     if (count <= 0) return;
     ioDone += static_cast<std::size_t>(count);
     inWork.isDone(ioDone);
+    if (inStop.IsMade()) ioNext.Set(inWork.count);  // leaves nothing to begin
   }
 }
 
@@ -106,18 +111,18 @@ bool EndedWell(pid_t inProcess) {
 }
 
 /// @return how many of the processes failed.
-int DrawOnce(int inProcesses, const DrawingWork& inWork, SharedCounter& ioNext,
-             std::size_t& ioDone) {
+int DrawOnce(int inProcesses, const DrawingWork& inWork, const StopRequest& inStop,
+             SharedCounter& ioNext, std::size_t& ioDone) {
   Pipe pipe;
   std::vector<pid_t> processes;
   for (int i = 0; i < inProcesses; ++i) {
     const pid_t process = fork();
-    if (process == 0) Work(inWork, ioNext, pipe);
+    if (process == 0) Work(inWork, inStop, ioNext, pipe);
     if (process > 0) processes.push_back(process);
   }
   if (processes.empty()) FailToStart();
   pipe.CloseWriter();
-  Follow(inWork, pipe, ioDone);
+  Follow(inWork, inStop, pipe, ioNext, ioDone);
   int failures = 0;
   for (const pid_t process : processes) failures += EndedWell(process) ? 0 : 1;
   return failures;
@@ -127,9 +132,13 @@ int DrawOnce(int inProcesses, const DrawingWork& inWork, SharedCounter& ioNext,
 
 // What a process that crashed was drawing is given up; what was not begun yet is not.
 void DrawInProcesses(int inProcesses, const DrawingWork& inWork) {
+  const StopRequest stop;
   SharedCounter next;
   std::size_t done = 0;
-  while (DrawOnce(inProcesses, inWork, next, done) > 0 && next.Current() < inWork.count) continue;
+  while (DrawOnce(inProcesses, inWork, stop, next, done) > 0 && !stop.IsMade() &&
+         next.Current() < inWork.count)
+    continue;
+  stop.Check();
 }
 
 }  // namespace lyra

@@ -118,6 +118,7 @@ class FactWriter {
 
   void Add(const PageRequest& inRequest) {
     Set(root_, "model", inRequest.model);
+    if (inRequest.isAsInModel) Set(root_, "asInModel", "yes");
     Count(inRequest, "Type", &PublishedInterference::type);
     Count(inRequest, "Status", &PublishedInterference::status);
     std::size_t next = 0;
@@ -156,6 +157,7 @@ class FactWriter {
     Set(ioInterference, "type", inFacts.type);
     Set(ioInterference, "status", inFacts.status);
     Set(ioInterference, "picture", inFacts.picture);
+    Set(ioInterference, "asInModel", inFacts.whyAsInModel);
     for (const std::string& thumbnail : inFacts.thumbnails)
       xmlNewProp(xmlNewChild(ioInterference, space_, Xml("Thumbnail"), nullptr), Xml("href"),
                  Xml(thumbnail));

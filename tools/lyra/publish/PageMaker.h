@@ -14,6 +14,7 @@ struct PageRequest {
   std::string styleSheet;      // the text of a style sheet; empty: the page's own
   std::string styleSheetName;  // what errors call it
   std::string model;           // name of the model; empty for none
+  bool isAsInModel = false;    // all pictures have the model's placements, as was asked for
   std::vector<PublishedInterference> interferences;  // of the report, in its order
 };
 

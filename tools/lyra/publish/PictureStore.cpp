@@ -19,24 +19,34 @@ std::string BytesOf(const fs::path& inPath) {
   return {std::istreambuf_iterator<char>(stream), {}};
 }
 
-// Also what a drawing that was killed left unfinished.
-bool IsOurs(const std::string& inName) {
-  static const std::regex pattern(
-      R"(interference_\d+(_product_[12]|_SubItf_\d+)?\.(jpg|png|jpg\.png)|\.picture-[0-9a-f]{16})");
-  return std::regex_match(inName, pattern);
+const std::regex& FinishedNames() {
+  static const std::regex names(
+      R"(interference_\d+(_product_[12]|_SubItf_\d+)?\.(jpg|png|jpg\.png))");
+  return names;
 }
+
+/// Of pictures that are being drawn, and of those and other files that are being written.
+const std::regex& UnfinishedNames() {
+  static const std::regex names(
+      R"(\.drawing_\d+(_SubItf_\d+)?\.(jpg|png|jpg\.png)|\.picture-[0-9a-f]{16}|\.lyra-[A-Za-z0-9]{6})");
+  return names;
+}
+
+void RemoveMatching(const fs::path& inFolder, const std::regex& inNames) {
+  std::vector<fs::path> matching;
+  for (const fs::directory_entry& entry : fs::directory_iterator(inFolder))
+    if (std::regex_match(entry.path().filename().string(), inNames))
+      matching.push_back(entry.path());
+  for (const fs::path& path : matching) fs::remove(path);
+}
+
+std::string FinishedStem(int inNumber) { return "interference_" + std::to_string(inNumber); }
+std::string UnfinishedStem(int inNumber) { return ".drawing_" + std::to_string(inNumber); }
 
 }  // namespace
 
 PictureStore::PictureStore(const fs::path& inPublication, const std::string& inEnding)
     : folder_(fs::absolute(inPublication / kFolder)), ending_(inEnding) {}
-
-void PictureStore::RemovePictures() const {
-  std::vector<fs::path> ours;
-  for (const fs::directory_entry& entry : fs::directory_iterator(folder_))
-    if (IsOurs(entry.path().filename().string())) ours.push_back(entry.path());
-  for (const fs::path& path : ours) fs::remove(path);
-}
 
 bool PictureStore::Prepare(const std::string& inStamp, bool inGoesOn) const {
   fs::create_directories(folder_);
@@ -44,7 +54,7 @@ bool PictureStore::Prepare(const std::string& inStamp, bool inGoesOn) const {
   const bool isSame = BytesOf(stampFile) == inStamp;
   if (inGoesOn && isSame) return true;
   const bool hadStamp = fs::remove(stampFile);
-  RemovePictures();
+  RemoveMatching(folder_, FinishedNames());
   std::ofstream stream(stampFile, std::ios::binary);
   stream << inStamp;
   if (!stream.flush()) throw InputError(stampFile.string() + ": cannot be written");
@@ -52,31 +62,46 @@ bool PictureStore::Prepare(const std::string& inStamp, bool inGoesOn) const {
 }
 
 std::string PictureStore::PictureName(int inNumber) const {
-  return "interference_" + std::to_string(inNumber) + ending_;
+  return FinishedStem(inNumber) + ending_;
 }
 
 std::string PictureStore::PreviewName(int inNumber, std::size_t inProduct) const {
-  return "interference_" + std::to_string(inNumber) + "_product_" + std::to_string(inProduct + 1) +
-         ending_;
+  return FinishedStem(inNumber) + "_product_" + std::to_string(inProduct + 1) + ending_;
+}
+
+std::string PictureStore::UnfinishedName(int inNumber) const {
+  return UnfinishedStem(inNumber) + ending_;
+}
+
+std::vector<std::string> PictureStore::ThumbnailNames(int inNumber) const {
+  return ThumbnailsBeside(FinishedStem(inNumber));
 }
 
 // The names follow from that of the main picture: one name for all unless that ends in ".png".
-std::vector<std::string> PictureStore::ThumbnailNames(int inNumber) const {
+std::vector<std::string> PictureStore::ThumbnailsBeside(const std::string& inStem) const {
   std::vector<std::string> names;
   if (ending_ != ".png") {
-    const std::string only = PictureName(inNumber) + ".png";
+    const std::string only = inStem + ending_ + ".png";
     if (Has(only)) names.push_back(only);
     return names;
   }
-  const std::string prefix = "interference_" + std::to_string(inNumber) + "_SubItf_";
   // A sub-interference without a viewpoint leaves a gap.
   constexpr int kWidestGap = 16;
   for (int i = 1, gap = 0; gap < kWidestGap; ++i) {
-    const std::string name = prefix + std::to_string(i) + ".png";
+    const std::string name = inStem + "_SubItf_" + std::to_string(i) + ".png";
     gap = Has(name) ? 0 : gap + 1;
     if (gap == 0) names.push_back(name);
   }
   return names;
+}
+
+void PictureStore::Finish(int inNumber) const {
+  const std::string stem = UnfinishedStem(inNumber);
+  const auto finish = [&](const std::string& inName) {
+    fs::rename(folder_ / inName, folder_ / (FinishedStem(inNumber) + inName.substr(stem.size())));
+  };
+  for (const std::string& thumbnail : ThumbnailsBeside(stem)) finish(thumbnail);
+  if (Has(UnfinishedName(inNumber))) finish(UnfinishedName(inNumber));
 }
 
 bool PictureStore::Has(const std::string& inName) const {
@@ -86,6 +111,12 @@ bool PictureStore::Has(const std::string& inName) const {
 
 std::string PictureStore::Reference(const std::string& inName) const {
   return Has(inName) ? std::string(kFolder) + "/" + inName : "";
+}
+
+void RemoveUnfinishedFiles(const fs::path& inPublication) {
+  RemoveMatching(inPublication, UnfinishedNames());
+  const fs::path pictures = inPublication / kFolder;
+  if (fs::is_directory(pictures)) RemoveMatching(pictures, UnfinishedNames());
 }
 
 }  // namespace lyra

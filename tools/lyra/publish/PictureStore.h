@@ -8,7 +8,8 @@
 
 namespace lyra {
 
-/// Pictures appear whole or not at all, so one that is there is done. A stamp beside them says what
+/// Pictures appear whole or not at all, and a main one after its small ones, so one that is there is
+/// done. A stamp beside them says what
 /// they were drawn from. Raises std::filesystem::filesystem_error for what cannot be read or made.
 class PictureStore {
  public:
@@ -29,16 +30,24 @@ class PictureStore {
   /// The small pictures that are there beside a main one, in their order.
   std::vector<std::string> ThumbnailNames(int inNumber) const;
 
+  /// The name under which a main picture is drawn, and the small ones beside it.
+  std::string UnfinishedName(int inNumber) const;
+  /// Gives what was drawn its names.
+  void Finish(int inNumber) const;
+
   bool Has(const std::string& inName) const;
   /// The name if there is such a picture, as the page refers to it; else empty.
   std::string Reference(const std::string& inName) const;
 
  private:
-  void RemovePictures() const;
+  std::vector<std::string> ThumbnailsBeside(const std::string& inStem) const;
 
   std::filesystem::path folder_;
   std::string ending_;
 };
+
+/// Removes what runs that were killed left unfinished in a publication's folder and its pictures'.
+void RemoveUnfinishedFiles(const std::filesystem::path& inPublication);
 
 }  // namespace lyra
 

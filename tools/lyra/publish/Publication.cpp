@@ -69,11 +69,12 @@ std::string ShownWord(const std::string& inWord, const DOM_Node& inElement, cons
   return own.empty() ? "Not stated" : own;
 }
 
-Entry MakeEntry(const PlacedInterference& inPlaced, const InterferenceRecord& inRecord) {
+Entry MakeEntry(const PlacedInterference& inPlaced, const InterferenceRecord& inRecord,
+                ProductPlaces inPlaces) {
   Entry entry;
   entry.element = inPlaced.element;
   entry.products = ProductsOf(inPlaced.element);
-  entry.placements = PlacementsOf(inRecord);
+  if (inPlaces == ProductPlaces::kResult) entry.placements = PlacementsOf(inRecord);
   entry.facts.number = inPlaced.number;
   entry.facts.type = ShownWord(inRecord.type, inPlaced.element, "ResultType");
   entry.facts.status = ShownWord(inRecord.status, inPlaced.element, "Status");
@@ -120,6 +121,20 @@ std::string Counted(std::size_t inCount, const std::string& inThing) {
   return std::to_string(inCount) + " " + inThing + (inCount == 1 ? "" : "s");
 }
 
+std::string NameOf(const ZORUnicodeString& inPath) {
+  const std::string path = Utf8(inPath);
+  return path.empty() ? "(no name)" : path;
+}
+
+/// A text of UTF-8 for one line among others.
+std::string Shortened(const std::string& inText) {
+  constexpr std::size_t kMost = 160;
+  if (inText.size() <= kMost) return inText;
+  std::size_t end = kMost;
+  while (end > 0 && (inText[end] & 0xC0) == 0x80) --end;
+  return inText.substr(0, end) + "…";
+}
+
 /// Which of a set of texts there are: the first few and how many more.
 std::string Listed(const std::set<std::string>& inTexts) {
   constexpr std::size_t kShown = 3;
@@ -127,7 +142,7 @@ std::string Listed(const std::set<std::string>& inTexts) {
   std::size_t shown = 0;
   for (const std::string& text : inTexts) {
     if (++shown > kShown) return list + " and " + std::to_string(inTexts.size() - kShown) + " more";
-    list += (shown == 1 ? "\"" : ", \"") + text + "\"";
+    list += (shown == 1 ? "\"" : ", \"") + Shortened(text) + "\"";
   }
   return list;
 }
@@ -145,13 +160,14 @@ class EntryDrawing {
 
   void Draw() {
     for (std::size_t i = 0; i < 2; ++i) DrawPreview(i);
-    const std::string name = store_.PictureName(number_);
-    if (store_.Has(name)) return;
+    if (store_.Has(store_.PictureName(number_))) return;
     const auto& [first, second] = scene_.products;
     if (first.IsNull() && second.IsNull()) return;
     PrintPictures::PrintListVisuToFile(first, scene_.paths[0], second, scene_.paths[1],
-                                       scene_.interference, FromUtf8(name), format_,
+                                       scene_.interference,
+                                       FromUtf8(store_.UnfinishedName(number_)), format_,
                                        style_.size.width, style_.size.height, 1, 0);
+    store_.Finish(number_);
   }
 
  private:
@@ -200,13 +216,14 @@ void RecountSets(ClashResultFile& ioResult) {
 
 }  // namespace
 
-Publication::Publication(ClashResultFile& ioResult, const ListFilter& inFilter)
+Publication::Publication(ClashResultFile& ioResult, const ListFilter& inFilter,
+                         ProductPlaces inPlaces)
     : hash_(0xcbf29ce484222325) {
   ForEachInterference(ioResult, [&](const PlacedInterference& inPlaced) {
     const InterferenceRecord record = ReadInterference(ioResult, inPlaced);
     hash_ = Hashed(hash_, JsonText(record));
     if (inFilter.Accepts(record))
-      entries_.push_back(MakeEntry(inPlaced, record));
+      entries_.push_back(MakeEntry(inPlaced, record, inPlaces));
     else
       others_.push_back(inPlaced.element);
   });
@@ -230,15 +247,17 @@ void Publication::LookUp(const ZORIProduct_var& inRoot) {
       if (entry.products[i].isNull()) continue;
       PublishedProduct& product = entry.facts.products[i];
       product.isMissing = scene.products[i].IsNull();
-      if (product.isMissing) missing.insert(Utf8(scene.paths[i]));
+      if (product.isMissing) missing.insert(NameOf(scene.paths[i]));
       isComplete = isComplete && !product.isMissing;
       if (!product.isMissing)
         product.colour =
             ColourOf(scene.products[i], ZORDefault::FindProduct(inRoot, scene.paths[i]));
     }
     incomplete += isComplete ? 0 : 1;
+    if (!HasProduct(entry)) continue;
+    entry.facts.whyAsInModel = scene.whyAsInModel;
     if (!scene.whyAsInModel.empty() && movedBack++ == 0)
-      whyMovedBack = std::to_string(entry.facts.number) + ": " + scene.whyAsInModel;
+      whyMovedBack = std::to_string(entry.facts.number) + ": " + Shortened(scene.whyAsInModel);
   }
   if (incomplete > 0)
     Warn("the model lacks " + Counted(missing.size(), "product") + " of " +

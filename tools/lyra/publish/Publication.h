@@ -25,6 +25,9 @@ struct Entry {
   PublishedInterference facts;
 };
 
+/// Where the products stand that pictures show.
+enum class ProductPlaces { kResult, kModel };
+
 struct PictureStyle {
   PictureFormat format = PictureFormat::kJpeg;
   PictureSize size;
@@ -36,7 +39,7 @@ struct PictureStyle {
 /// publication.
 class Publication {
  public:
-  Publication(ClashResultFile& ioResult, const ListFilter& inFilter);
+  Publication(ClashResultFile& ioResult, const ListFilter& inFilter, ProductPlaces inPlaces);
 
   const std::vector<Entry>& Entries() const { return entries_; }
   /// A number that differs when what the result says of any interference does.

@@ -20,6 +20,7 @@ struct PublishedInterference {
   std::string type, status;
   std::string picture;  // relative to the page; empty when there is none
   std::vector<std::string> thumbnails;
+  std::string whyAsInModel;  // why the picture does not have the result's placements; else empty
   std::array<PublishedProduct, 2> products;
 };
 
