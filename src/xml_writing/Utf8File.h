@@ -6,6 +6,7 @@
 #include <cstdlib>
 #include <memory>
 #include <string>
+#include <string_view>
 
 #include "platform/system/ZORResult.h"
 #include "platform/system/ZORUnicodeString.h"
@@ -35,12 +36,31 @@ class OutputFile {
 
   /// Makes or empties the file. Each of the three passes the platform's code up.
   HRESULT Open(const ZORUnicodeString& inPath);
-  HRESULT Write(const Utf8Bytes& inText);
+  HRESULT Write(const char* inBytes, std::size_t inCount);
   HRESULT Close();
 
  private:
   bool isOpen_ = false;
   int descriptor_ = 0;
+};
+
+/// Writes UTF-16 text into a file as UTF-8, a slice at a time: of a text of gigabytes there is no
+/// second one in memory. What is shorter than a slice is written at once.
+class Utf8Encoder {
+ public:
+  explicit Utf8Encoder(OutputFile& ioFile) : file_(ioFile) {}
+  void Add(std::u16string_view inText);
+  /// Writes what is left.
+  /// @return the platform's code of the first writing that failed, behind which none was tried.
+  HRESULT Finish();
+
+ private:
+  void WriteSlice();
+
+  OutputFile& file_;
+  ZORUnicodeString slice_;
+  std::string bytes_;
+  HRESULT result_ = S_OK;
 };
 
 #endif

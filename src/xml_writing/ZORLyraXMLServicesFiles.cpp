@@ -1,6 +1,7 @@
 // The writer's operations on files.
 #include <fstream>
 #include <string_view>
+#include <vector>
 
 #include "ZORLyraXMLServices.h"
 #include "platform/system/ZORFile.h"
@@ -29,37 +30,25 @@ ZORUnicodeString InsertedLines() {
   return lines;
 }
 
-// The pieces are joined once: a document can be hundreds of megabytes, and inserting would move it.
-ZORUnicodeString JoinDocument(const ZORUnicodeString& inDeclaration,
-                              const ZORUnicodeString& inLines, std::u16string_view inBody) {
-  const std::u16string_view head = Units(inDeclaration);
-  const std::size_t afterInHead = head.find(u'>') + 1;  // 0 where there is none
+// What a file is made of, in order. The lines go behind the first ">", or first where there is none.
+std::vector<std::u16string_view> PiecesOfDocument(std::u16string_view inHead,
+                                                  std::u16string_view inLines,
+                                                  std::u16string_view inBody) {
+  const std::size_t afterInHead = inHead.find(u'>') + 1;  // 0 where there is none
   const std::size_t afterInBody = afterInHead > 0 ? 0 : inBody.find(u'>') + 1;
-  const std::u16string_view lines = Units(inLines);
-
-  ZORUnicodeString document;
-  document.Reserve(head.size() + lines.size() + inBody.size());
-  const auto append = [&document](std::u16string_view inPart) {
-    document.AppendUTF16(inPart.data(), inPart.size());
-  };
-  if (afterInBody > 0) {
-    append(head);
-    append(inBody.substr(0, afterInBody));
-    append(lines);
-    append(inBody.substr(afterInBody));
-  } else {
-    append(head.substr(0, afterInHead));
-    append(lines);
-    append(head.substr(afterInHead));
-    append(inBody);
-  }
-  return document;
+  if (afterInBody > 0)
+    return {inHead, inBody.substr(0, afterInBody), inLines, inBody.substr(afterInBody)};
+  return {inHead.substr(0, afterInHead), inLines, inHead.substr(afterInHead), inBody};
 }
 
-HRESULT WriteUtf8(const ZORUnicodeString& inPath, const Utf8Bytes& inText) {
+HRESULT WriteFile(const ZORUnicodeString& inPath,
+                  const std::vector<std::u16string_view>& inPieces) {
   OutputFile file;
   const HRESULT opened = file.Open(inPath);
-  return FAILED(opened) ? opened : file.Write(inText);
+  if (FAILED(opened)) return opened;
+  Utf8Encoder encoder(file);
+  for (const std::u16string_view piece : inPieces) encoder.Add(piece);
+  return encoder.Finish();
 }
 }  // namespace
 
@@ -82,7 +71,8 @@ int ZORLyraXMLServices::DumpDocument(ZORUnicodeString inPath) {
   OutputFile file;
   const HRESULT opened = file.Open(inPath);
   if (FAILED(opened)) return opened;
-  const HRESULT written = file.Write(ToUtf8(text_));
+  const Utf8Bytes text = ToUtf8(text_);
+  const HRESULT written = file.Write(text.bytes.get(), text.count);
   const HRESULT closed = file.Close();
   return FAILED(written) ? written : closed;
 }
@@ -98,12 +88,9 @@ HRESULT ZORLyraXMLServices::DumpDocument(DOM_Node inNode, ZORUnicodeString inPat
 
   ZORUnicodeString declaration;
   if (inPrologue == 1) declaration.Append(XMLDeclaration()).Append("\n");
-  ZORUnicodeString document =
-      JoinDocument(declaration, InsertedLines(), {body.rawBuffer(), body.length()});
-  body = DOMString();  // the largest texts are not all held at once
-  const Utf8Bytes bytes = ToUtf8(document);
-  document = ZORUnicodeString();
-  return WriteUtf8(inPath, bytes);
+  const ZORUnicodeString lines = InsertedLines();
+  return WriteFile(inPath, PiecesOfDocument(Units(declaration), Units(lines),
+                                            {body.rawBuffer(), body.length()}));
 }
 
 HRESULT ZORLyraXMLServices::CopyFile(const char* inFileName, ZORUnicodeString inSourceDirectory,

@@ -243,6 +243,16 @@ TEST_F(TreeDump, WithoutPrologueInsertsBehindTheFirstConstruct) {
             "<A>\n" + kStyleSheet + "\n" + kDocumentType + "text<B/></A>");
 }
 
+// Long texts are encoded in slices; a character of two units may lie where one ends.
+TEST_F(TreeDump, OfALongTextIsTheSerialisedNode) {
+  for (const std::string shift : {"", "x"}) {
+    std::string text = "<a k='" + shift;
+    for (int i = 0; i < 100'000; ++i) text += "\xF0\x9F\x98\x80\xC3\xA9z";
+    const DOM_Document document = Parsed(text + "'/>");
+    EXPECT_TRUE(DumpText(document, "", "", 0) == Serialised(document)) << shift;
+  }
+}
+
 TEST_F(TreeDump, WithoutAnythingIsTheSerialisedNode) {
   const DOM_Document document = Parsed("<A x='1'><B/>t\u00e9xt</A>");
   EXPECT_EQ(DumpText(document, "", "", 0), Serialised(document));

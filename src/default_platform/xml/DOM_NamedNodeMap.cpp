@@ -1,5 +1,7 @@
 #include "platform/xml/DOM_NamedNodeMap.h"
 
+#include <iterator>
+
 #include "default_platform/xml/DOM_HandleAccess.h"
 
 DOM_NamedNodeMap::DOM_NamedNodeMap() = default;
@@ -26,4 +28,18 @@ DOM_Node DOM_NamedNodeMap::getNamedItem(const DOMString& inName) const {
   const DOM_Tree::Node element = DOM_HandleAccess::NodeOf(element_);
   return DOM_HandleAccess::Handle(tree, element,
                                   tree->FindAttribute(element, DOM_HandleAccess::View(inName)));
+}
+
+DOM_Node DOM_NamedNodeMap::getNamedItem(const char* inName) const {
+  char16_t units[64];
+  std::size_t count = 0;
+  for (; inName != nullptr && inName[count] != 0; ++count) {
+    const auto byte = static_cast<unsigned char>(inName[count]);
+    if (byte >= 0x80 || count == std::size(units)) return getNamedItem(DOMString(inName));
+    units[count] = byte;
+  }
+  if (isNull()) return DOM_Node();
+  DOM_Tree* const tree = DOM_HandleAccess::TreeOf(element_);
+  const DOM_Tree::Node element = DOM_HandleAccess::NodeOf(element_);
+  return DOM_HandleAccess::Handle(tree, element, tree->FindAttribute(element, {units, count}));
 }

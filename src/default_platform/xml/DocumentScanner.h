@@ -2,6 +2,7 @@
 #ifndef ZOR_DEFAULT_PLATFORM_XML_DOCUMENTSCANNER_H
 #define ZOR_DEFAULT_PLATFORM_XML_DOCUMENTSCANNER_H
 
+#include <array>
 #include <string>
 #include <unordered_map>
 #include <vector>
@@ -48,9 +49,12 @@ class DocumentScanner : private xercesc::SAXParser {
   // A kind of element, and the attributes of the last one of that kind: the next one very likely
   // has the same in the same order.
   struct ElementShape {
-    const xercesc::XMLElementDecl* kind = nullptr;
     DOM_Tree::Name name = 0;
     std::vector<AttributeShape> attributes;
+  };
+  struct RecentShape {
+    const xercesc::XMLElementDecl* kind = nullptr;
+    ElementShape* shape = nullptr;
   };
 
   // What the scanner reports
@@ -117,8 +121,8 @@ class DocumentScanner : private xercesc::SAXParser {
   std::uint32_t depth_ = 0;
   std::u16string text_;  // of the text node that is being read
   std::uint64_t charged_ = 0;
-  std::vector<ElementShape> shapes_;  // by the scanner's number of the kind
-  std::unordered_map<const xercesc::XMLElementDecl*, ElementShape> otherShapes_;
+  std::unordered_map<const xercesc::XMLElementDecl*, ElementShape> shapes_;
+  std::array<RecentShape, 64> recent_;  // of shapes_, found without a search
 
   DocumentType doctype_;
   DoctypeRecorder subset_;

@@ -2,14 +2,17 @@
 
 #include <algorithm>
 #include <array>
+#include <limits>
 #include <string_view>
 #include <vector>
 
 #include "default_platform/xml/DOM_HandleAccess.h"
-#include "default_platform/xml/WrittenText.h"
 #include "default_platform/xml/XMLNames.h"
 
 namespace {
+
+/// Raised within this file only, for what no XML text can carry.
+struct NotWritable {};
 
 /// What is to be done with a code unit.
 enum Treatment : unsigned char { kCopy, kEscape, kRefuse };
@@ -32,51 +35,69 @@ constexpr AsciiTreatments kInSection = Treatments(u"\r", false);
 // A reader turns a carriage return into a line feed, and nothing can be escaped here.
 constexpr AsciiTreatments kVerbatim = Treatments(u"", true);
 
-std::string_view EscapeOf(char16_t inUnit) {
+std::u16string_view EscapeOf(char16_t inUnit) {
   switch (inUnit) {
     case u'&':
-      return "&amp;";
+      return u"&amp;";
     case u'<':
-      return "&lt;";
+      return u"&lt;";
     case u'>':
-      return "&gt;";
+      return u"&gt;";
     case u'"':
-      return "&quot;";
+      return u"&quot;";
     case u'\t':
-      return "&#9;";
+      return u"&#9;";
     case u'\n':
-      return "&#10;";
+      return u"&#10;";
     default:
-      return "&#13;";
+      return u"&#13;";
   }
 }
 
-constexpr std::size_t kBlock = 8;
-
-// Whether eight units are ASCII that stays as it is everywhere. Without branches, so that compilers
-// make vector instructions of it.
-bool IsPlainBlock(const char16_t* inUnits) {
-  unsigned int hits = 0;
-  for (std::size_t i = 0; i < kBlock; ++i) {
-    const char16_t unit = inUnits[i];
-    hits |= static_cast<unsigned int>(unit < 0x20) | static_cast<unsigned int>(unit >= 0x80) |
-            static_cast<unsigned int>(unit == u'&') | static_cast<unsigned int>(unit == u'<') |
-            static_cast<unsigned int>(unit == u'>') | static_cast<unsigned int>(unit == u'"');
+/// A text that grows; becomes a string without being copied.
+class TextBuffer {
+ public:
+  TextBuffer() : text_(NewOwnedText(kFirst)), at_(text_->Units()), end_(at_ + kFirst) {}
+  ~TextBuffer() {
+    if (text_ != nullptr) ReleaseOwnedText(text_);
   }
-  return hits == 0;
-}
+  TextBuffer(const TextBuffer&) = delete;
+  TextBuffer& operator=(const TextBuffer&) = delete;
 
-// Takes a character beyond ASCII.
-char32_t TakeCharacter(const char16_t*& ioFrom, const char16_t* inEnd) {
-  const char16_t unit = *ioFrom++;
-  if (unit < 0xD800 || (unit >= 0xE000 && unit < 0xFFFE)) return unit;
-  const bool isPair = unit < 0xDC00 && ioFrom != inEnd && *ioFrom >= 0xDC00 && *ioFrom < 0xE000;
-  if (!isPair) throw NotWritable();
-  return 0x10000 + ((unit - char32_t{0xD800}) << 10) + (*ioFrom++ - char32_t{0xDC00});
-}
+  /// Makes room for inCount more units.
+  char16_t* Reserve(std::size_t inCount) {
+    if (static_cast<std::size_t>(end_ - at_) < inCount) Grow(inCount);
+    return at_;
+  }
+  void SetEnd(char16_t* inEnd) { at_ = inEnd; }
+  void Append(std::u16string_view inText) {
+    at_ = std::copy(inText.begin(), inText.end(), Reserve(inText.size()));
+  }
+  DOMString Finish() {
+    DOM_Text* const text = ResizeOwnedText(text_, static_cast<std::uint32_t>(Used()));
+    text_ = nullptr;
+    return DOM_HandleAccess::Adopt(text);
+  }
 
-/// Writes into a WideText or a Utf8Parts.
-template <class Buffer>
+ private:
+  static constexpr std::uint32_t kFirst = 1024;
+  static constexpr std::size_t kMost = std::numeric_limits<std::uint32_t>::max();
+
+  std::size_t Used() const { return static_cast<std::size_t>(at_ - text_->Units()); }
+  void Grow(std::size_t inCount) {
+    const std::size_t used = Used();
+    if (inCount > kMost - used) throw NotWritable();
+    const std::size_t room = std::min(kMost, std::max(used + inCount, used * 2));
+    text_ = ResizeOwnedText(text_, static_cast<std::uint32_t>(room));
+    at_ = text_->Units() + used;
+    end_ = text_->Units() + room;
+  }
+
+  DOM_Text* text_;
+  char16_t* at_;
+  char16_t* end_;
+};
+
 class TreeWriter {
  public:
   explicit TreeWriter(const DOM_Tree& inTree)
@@ -84,7 +105,7 @@ class TreeWriter {
 
   void WriteNodes(DOM_Tree::Node inRoot);
   void WriteAttribute(const DOM_Tree::AttributeRecord& inAttribute);
-  auto Finish() { return buffer_.Finish(); }
+  DOMString Finish() { return buffer_.Finish(); }
 
  private:
   void Start(DOM_Tree::Node inNode);
@@ -96,16 +117,14 @@ class TreeWriter {
   void WriteDoctype(const DOM_Tree::NodeRecord& inRecord);
   void WriteIdLiteral(const DOM_Text& inText);
   void WriteName(DOM_Tree::Name inName);
-  void WriteMarkup(std::string_view inAscii);
   void WriteEscaped(std::u16string_view inText, const AsciiTreatments& inTreatments);
 
   const DOM_Tree& tree_;
-  Buffer buffer_;
+  TextBuffer buffer_;
   std::vector<bool> isNameKnown_;  // whether a name was found to be one of XML 1.0
 };
 
-template <class Buffer>
-void TreeWriter<Buffer>::WriteNodes(DOM_Tree::Node inRoot) {
+void TreeWriter::WriteNodes(DOM_Tree::Node inRoot) {
   DOM_Tree::Node at = inRoot;
   while (true) {
     Start(at);
@@ -123,8 +142,7 @@ void TreeWriter<Buffer>::WriteNodes(DOM_Tree::Node inRoot) {
   }
 }
 
-template <class Buffer>
-void TreeWriter<Buffer>::Start(DOM_Tree::Node inNode) {
+void TreeWriter::Start(DOM_Tree::Node inNode) {
   const DOM_Tree::NodeRecord& record = tree_.At(inNode);
   switch (record.kind) {
     case DOM_Node::ELEMENT_NODE:
@@ -144,74 +162,84 @@ void TreeWriter<Buffer>::Start(DOM_Tree::Node inNode) {
   }
 }
 
-template <class Buffer>
-void TreeWriter<Buffer>::StartElement(DOM_Tree::Node inNode) {
+void TreeWriter::StartElement(DOM_Tree::Node inNode) {
   const DOM_Tree::NodeRecord& record = tree_.At(inNode);
-  WriteMarkup("<");
+  buffer_.Append(u"<");
   WriteName(record.name);
   for (DOM_Tree::Attribute at = record.firstAttribute; at != 0; at = tree_.AttributeAt(at).next) {
-    WriteMarkup(" ");
+    buffer_.Append(u" ");
     WriteAttribute(tree_.AttributeAt(at));
   }
-  WriteMarkup(tree_.FirstChild(inNode) == 0 ? "/>" : ">");
+  buffer_.Append(tree_.FirstChild(inNode) == 0 ? u"/>" : u">");
 }
 
-template <class Buffer>
-void TreeWriter<Buffer>::End(DOM_Tree::Node inNode) {
+void TreeWriter::End(DOM_Tree::Node inNode) {
   if (tree_.At(inNode).kind != DOM_Node::ELEMENT_NODE) return;
-  WriteMarkup("</");
+  buffer_.Append(u"</");
   WriteName(tree_.At(inNode).name);
-  WriteMarkup(">");
+  buffer_.Append(u">");
 }
 
-template <class Buffer>
-void TreeWriter<Buffer>::WriteAttribute(const DOM_Tree::AttributeRecord& inAttribute) {
+void TreeWriter::WriteAttribute(const DOM_Tree::AttributeRecord& inAttribute) {
   WriteName(inAttribute.name);
-  WriteMarkup("=\"");
+  buffer_.Append(u"=\"");
   WriteEscaped(inAttribute.value->View(), kInAttribute);
-  WriteMarkup("\"");
+  buffer_.Append(u"\"");
 }
 
 // A document of XML 1.1 may have names that the text, which declares no version, cannot carry.
-template <class Buffer>
-void TreeWriter<Buffer>::WriteName(DOM_Tree::Name inName) {
+void TreeWriter::WriteName(DOM_Tree::Name inName) {
   const std::u16string_view name = tree_.NameText(inName)->View();
   if (!isNameKnown_[inName]) {
     if (!IsXMLName(name)) throw NotWritable();
     isNameKnown_[inName] = true;
   }
-  WriteEscaped(name, kVerbatim);
+  buffer_.Append(name);
 }
 
-template <class Buffer>
-void TreeWriter<Buffer>::WriteMarkup(std::string_view inAscii) {
-  buffer_.SetEnd(std::copy(inAscii.begin(), inAscii.end(), buffer_.Reserve(inAscii.size())));
+constexpr std::size_t kBlock = 8;
+
+// Whether eight units are ASCII that stays as it is everywhere. Without branches, so that compilers
+// make vector instructions of it.
+bool IsPlainBlock(const char16_t* inUnits) {
+  unsigned int hits = 0;
+  for (std::size_t i = 0; i < kBlock; ++i) {
+    const char16_t unit = inUnits[i];
+    hits |= static_cast<unsigned int>(unit < 0x20) | static_cast<unsigned int>(unit >= 0x80) |
+            static_cast<unsigned int>(unit == u'&') | static_cast<unsigned int>(unit == u'<') |
+            static_cast<unsigned int>(unit == u'>') | static_cast<unsigned int>(unit == u'"');
+  }
+  return hits == 0;
 }
 
-template <class Buffer>
-void TreeWriter<Buffer>::WriteEscaped(std::u16string_view inText,
-                                      const AsciiTreatments& inTreatments) {
-  using Unit = typename Buffer::Unit;
+void TreeWriter::WriteEscaped(std::u16string_view inText, const AsciiTreatments& inTreatments) {
   const char16_t* from = inText.data();
   const char16_t* const end = from + inText.size();
-  Unit* to = buffer_.Reserve(inText.size());
+  char16_t* to = buffer_.Reserve(inText.size());
   while (from != end) {
     if (end - from >= static_cast<std::ptrdiff_t>(kBlock) && IsPlainBlock(from)) {
-      for (std::size_t i = 0; i < kBlock; ++i) to[i] = static_cast<Unit>(from[i]);
+      to = std::copy(from, from + kBlock, to);
       from += kBlock;
-      to += kBlock;
       continue;
     }
     const char16_t* const pause = from + std::min<std::ptrdiff_t>(kBlock, end - from);
     while (from < pause) {
-      if (*from >= 0x80) {
-        to = Buffer::Put(TakeCharacter(from, end), to);
-      } else if (inTreatments[*from] == kCopy) {
-        *to++ = static_cast<Unit>(*from++);
+      const char16_t unit = *from;
+      if (unit < 0x80 ? inTreatments[unit] == kCopy : unit < 0xD800) {
+        *to++ = unit;
+        ++from;
+      } else if (unit >= 0x80) {
+        const bool isPair =
+            unit < 0xDC00 && from + 1 != end && from[1] >= 0xDC00 && from[1] < 0xE000;
+        if (unit >= 0xFFFE || (unit < 0xE000 && !isPair)) throw NotWritable();
+        *to++ = unit;
+        ++from;
+        if (isPair) *to++ = *from++;
       } else {
-        if (inTreatments[*from] == kRefuse) throw NotWritable();
+        if (inTreatments[unit] == kRefuse) throw NotWritable();
         buffer_.SetEnd(to);
-        WriteMarkup(EscapeOf(*from++));
+        buffer_.Append(EscapeOf(unit));
+        ++from;
         to = buffer_.Reserve(static_cast<std::size_t>(end - from));
       }
     }
@@ -220,75 +248,71 @@ void TreeWriter<Buffer>::WriteEscaped(std::u16string_view inText,
 }
 
 // What a section cannot hold stands between two sections.
-template <class Buffer>
-void TreeWriter<Buffer>::WriteSection(std::u16string_view inText) {
-  constexpr std::string_view kStart = "<![CDATA[";
-  constexpr std::string_view kEnd = "]]>";
-  WriteMarkup(kStart);
+void TreeWriter::WriteSection(std::u16string_view inText) {
+  constexpr std::u16string_view kStart = u"<![CDATA[";
+  constexpr std::u16string_view kEnd = u"]]>";
+  buffer_.Append(kStart);
   while (true) {
-    const std::size_t stop = std::min(inText.find(u"]]>"), inText.find(u'\r'));
+    const std::size_t stop = std::min(inText.find(kEnd), inText.find(u'\r'));
     if (stop == std::u16string_view::npos) break;
     const bool isEnd = inText[stop] == u']';
     const std::size_t count = stop + (isEnd ? 2 : 0);
     WriteEscaped(inText.substr(0, count), kInSection);
-    WriteMarkup(kEnd);
-    if (!isEnd) WriteMarkup(EscapeOf(u'\r'));
-    WriteMarkup(kStart);
+    buffer_.Append(kEnd);
+    if (!isEnd) buffer_.Append(EscapeOf(u'\r'));
+    buffer_.Append(kStart);
     inText.remove_prefix(isEnd ? count : count + 1);
   }
   WriteEscaped(inText, kInSection);
-  WriteMarkup(kEnd);
+  buffer_.Append(kEnd);
 }
 
-template <class Buffer>
-void TreeWriter<Buffer>::WriteComment(std::u16string_view inText) {
+void TreeWriter::WriteComment(std::u16string_view inText) {
   if (inText.find(u"--") != std::u16string_view::npos || inText.ends_with(u'-'))
     throw NotWritable();
-  WriteMarkup("<!--");
+  buffer_.Append(u"<!--");
   WriteEscaped(inText, kVerbatim);
-  WriteMarkup("-->");
+  buffer_.Append(u"-->");
 }
 
-template <class Buffer>
-void TreeWriter<Buffer>::WriteInstruction(const DOM_Tree::NodeRecord& inRecord) {
+void TreeWriter::WriteInstruction(const DOM_Tree::NodeRecord& inRecord) {
   const std::u16string_view data = inRecord.text->View();
   // A reader takes white space before the data as the separator.
   if (data.find(u"?>") != std::u16string_view::npos || data.find_first_of(u" \t\n") == 0)
     throw NotWritable();
-  WriteMarkup("<?");
+  buffer_.Append(u"<?");
   WriteName(inRecord.name);
-  if (!data.empty()) WriteMarkup(" ");
+  if (!data.empty()) buffer_.Append(u" ");
   WriteEscaped(data, kVerbatim);
-  WriteMarkup("?>");
+  buffer_.Append(u"?>");
 }
 
-template <class Buffer>
-void TreeWriter<Buffer>::WriteDoctype(const DOM_Tree::NodeRecord& inRecord) {
+void TreeWriter::WriteDoctype(const DOM_Tree::NodeRecord& inRecord) {
   const DocumentType& doctype = tree_.Doctype();
-  WriteMarkup("<!DOCTYPE ");
+  buffer_.Append(u"<!DOCTYPE ");
   WriteName(inRecord.name);
   if (doctype.publicId != nullptr) {
-    WriteMarkup(" PUBLIC ");
+    buffer_.Append(u" PUBLIC ");
     WriteIdLiteral(*doctype.publicId);
-    WriteMarkup(" ");
+    buffer_.Append(u" ");
   } else if (doctype.systemId != nullptr) {
-    WriteMarkup(" SYSTEM ");
+    buffer_.Append(u" SYSTEM ");
   }
   if (doctype.systemId != nullptr) WriteIdLiteral(*doctype.systemId);
   if (doctype.internalSubset != nullptr) {
-    WriteMarkup(" [");
+    buffer_.Append(u" [");
     WriteEscaped(doctype.internalSubset->View(), kVerbatim);
-    WriteMarkup("]");
+    buffer_.Append(u"]");
   }
-  WriteMarkup(">");
+  buffer_.Append(u">");
 }
 
-template <class Buffer>
-void TreeWriter<Buffer>::WriteIdLiteral(const DOM_Text& inText) {
-  const std::string_view quote = inText.View().find(u'"') == std::u16string_view::npos ? "\"" : "'";
-  WriteMarkup(quote);
+void TreeWriter::WriteIdLiteral(const DOM_Text& inText) {
+  const std::u16string_view quote =
+      inText.View().find(u'"') == std::u16string_view::npos ? u"\"" : u"'";
+  buffer_.Append(quote);
   WriteEscaped(inText.View(), kVerbatim);
-  WriteMarkup(quote);
+  buffer_.Append(quote);
 }
 
 }  // namespace
@@ -301,32 +325,16 @@ bool IsWritableEncoding(const ZORUnicodeString& inName) {
   return std::find(std::begin(kKnown), std::end(kKnown), name) != std::end(kKnown);
 }
 
-namespace {
-template <class Buffer>
-auto Written(const DOM_Node& inNode) {
-  const DOM_Tree& tree = *DOM_HandleAccess::TreeOf(inNode);
-  TreeWriter<Buffer> writer(tree);
-  const DOM_Tree::Attribute attribute = DOM_HandleAccess::AttributeOf(inNode);
-  if (attribute != 0)
-    writer.WriteAttribute(tree.AttributeAt(attribute));
-  else
-    writer.WriteNodes(DOM_HandleAccess::NodeOf(inNode));
-  return writer.Finish();
-}
-}  // namespace
-
 bool WriteTree(const DOM_Node& inNode, DOMString& outText) {
+  const DOM_Tree& tree = *DOM_HandleAccess::TreeOf(inNode);
   try {
-    outText = Written<WideText>(inNode);
-    return true;
-  } catch (const NotWritable&) {
-    return false;
-  }
-}
-
-bool WriteTree(const DOM_Node& inNode, std::vector<std::string>& outParts) {
-  try {
-    outParts = Written<Utf8Parts>(inNode);
+    TreeWriter writer(tree);
+    const DOM_Tree::Attribute attribute = DOM_HandleAccess::AttributeOf(inNode);
+    if (attribute != 0)
+      writer.WriteAttribute(tree.AttributeAt(attribute));
+    else
+      writer.WriteNodes(DOM_HandleAccess::NodeOf(inNode));
+    outText = writer.Finish();
     return true;
   } catch (const NotWritable&) {
     return false;

@@ -2,9 +2,6 @@
 #ifndef ZOR_DEFAULT_PLATFORM_XML_TREEWRITER_H
 #define ZOR_DEFAULT_PLATFORM_XML_TREEWRITER_H
 
-#include <string>
-#include <vector>
-
 #include "platform/xml/DOM_Node.h"
 
 /// Whether a name is "UTF-8" or "UTF-16", in any case.
@@ -12,7 +9,5 @@ bool IsWritableEncoding(const ZORUnicodeString& inName);
 /// Writes a node and all below it.
 /// @return false, with outText unchanged, for a tree that no XML text can carry.
 bool WriteTree(const DOM_Node& inNode, DOMString& outText);
-/// The same as UTF-8 in parts.
-bool WriteTree(const DOM_Node& inNode, std::vector<std::string>& outParts);
 
 #endif

@@ -40,8 +40,3 @@ HRESULT ZORXMLParser::WriteXML(const DOM_Node& inNode, const ZORUnicodeString& i
   if (inNode.isNull() || !IsWritableEncoding(inEncoding)) return E_INVALIDARG;
   return WriteTree(inNode, outText) ? S_OK : E_FAIL;
 }
-
-HRESULT ZORXMLParser::WriteUTF8(const DOM_Node& inNode, std::vector<std::string>& outParts) {
-  if (inNode.isNull()) return E_INVALIDARG;
-  return WriteTree(inNode, outParts) ? S_OK : E_FAIL;
-}

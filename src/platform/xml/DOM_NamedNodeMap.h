@@ -14,6 +14,9 @@ class ZOR_PLATFORM_EXPORT DOM_NamedNodeMap {
   DOM_Node item(unsigned int inPosition) const;
   /// @return the attribute of a name, null when there is none.
   DOM_Node getNamedItem(const DOMString& inName) const;
+  /// The same without making a string of the name, which is what readers ask most.
+  /// @param inName zero-terminated narrow text; null for no name.
+  DOM_Node getNamedItem(const char* inName) const;
 
  private:
   friend class DOM_Node;

@@ -2,9 +2,6 @@
 #ifndef ZOR_PLATFORM_XML_ZORXMLPARSER_H
 #define ZOR_PLATFORM_XML_ZORXMLPARSER_H
 
-#include <string>
-#include <vector>
-
 #include "ZORPlatformExport.h"
 #include "platform/system/ZORResult.h"
 #include "platform/system/ZORUnicodeString.h"
@@ -39,12 +36,6 @@ class ZOR_PLATFORM_EXPORT ZORXMLParser {
   /// text can carry (a control character, half a surrogate pair, "--" in a comment).
   static HRESULT WriteXML(const DOM_Node& inNode, const ZORUnicodeString& inEncoding,
                           DOMString& outText);
-
-  /// As WriteXML, as UTF-8 and of any length: half the memory of one text, which a large document's
-  /// may not fit into.
-  /// @param outParts the text in order, in parts of about a megabyte; unchanged on failure.
-  /// @return S_OK; E_INVALIDARG for a null node; E_FAIL as above.
-  static HRESULT WriteUTF8(const DOM_Node& inNode, std::vector<std::string>& outParts);
 };
 
 #endif
