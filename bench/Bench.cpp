@@ -19,19 +19,25 @@ namespace {
 namespace fs = std::filesystem;
 
 constexpr std::size_t kSmallDocument = 32;
+// Past this the other libraries' trees need more memory than most machines have.
+constexpr std::size_t kMostForPeers = 200'000;
 
 struct Options {
   std::vector<std::size_t> sizes = {1000, 10'000, 100'000};
-  std::vector<std::string> benchmarks = {"load", "loop",   "merge", "report",
-                                         "dump", "escape", "start"};
+  std::vector<std::string> benchmarks = {"load",  "loop", "merge",  "report", "dump",
+                                         "whole", "list", "escape", "start"};
   std::size_t escapedCharacters = 100'000'000;
   int repeats = 5;
   std::string csv;
 };
 
+// Whether a subject makes a tree of several times a document's size.
+enum Memory { kModest, kPeersTree };
+
 struct Subject {
   const char* name;
   const char* measurement;
+  Memory memory = kModest;
 };
 
 // A directory of our own, gone at the end.
@@ -113,29 +119,46 @@ class Bench {
     if (IsWanted("load"))
       Compare("load", inSize,
               {{"ZORLyra", "load-zorlyra"},
-               {"Xerces-C DOM", "load-xerces"},
-               {"libxml2", "load-libxml2"},
+               {"Xerces-C SAX2 scan", "scan-xerces"},
+               {"Xerces-C DOM", "load-xerces", kPeersTree},
+               {"libxml2", "load-libxml2", kPeersTree},
                {"pugixml", "load-pugixml"}},
               {clashes});
     if (IsWanted("loop"))
       Compare("loop", inSize, {{"ZORLyra", "loop-zorlyra"}, {"pugixml by hand", "loop-pugixml"}},
               {clashes, Document("components.xml", inSize / 10, 2, WriteComponentsDocument)});
     if (IsWanted("merge"))
-      Compare("merge", inSize, {{"ZORLyra", "merge-zorlyra"}, {"Xerces-C DOM", "merge-xerces"}},
+      Compare("merge", inSize,
+              {{"ZORLyra", "merge-zorlyra"}, {"Xerces-C DOM", "merge-xerces", kPeersTree}},
               {Document("first.xml", inSize / 2, 3, WriteClashDocument),
                Document("second.xml", inSize / 2, 4, WriteClashDocument)});
     if (IsWanted("report"))
       Compare("report", inSize, {{"ZORLyra", "report-zorlyra"}, {"std::string", "report-plain"}},
               {clashes, output});
     if (IsWanted("dump"))
-      Compare("dump", inSize, {{"ZORLyra", "dump-zorlyra"}, {"Xerces-C DOM", "dump-xerces"}},
+      Compare("dump", inSize,
+              {{"ZORLyra", "dump-zorlyra"}, {"Xerces-C DOM", "dump-xerces", kPeersTree}},
               {clashes, output});
+    if (IsWanted("whole"))
+      Compare("whole", inSize, {{"ZORLyra", "whole-zorlyra"}},
+              {clashes, Document("more.xml", inSize / 100, 5, WriteClashDocument), output});
+    if (IsWanted("list") && HasCommand())
+      Compare("list", inSize, {{"lyra list --csv", "list-lyra"}, {"ZORLyra", "load-zorlyra"}},
+              {clashes});
+  }
+
+  bool HasCommand() const {
+    if (fs::exists(LyraBesideUs())) return true;
+    std::cerr << "zor_bench: the command is not built; what it does is not measured\n";
+    return false;
   }
 
   // Runs all subjects in turn, each time another one first, so that what the machine does meanwhile
   // meets all of them.
-  void Compare(const std::string& inBenchmark, std::size_t inSize,
-               const std::vector<Subject>& inSubjects, const Arguments& inArguments) {
+  void Compare(const std::string& inBenchmark, std::size_t inSize, std::vector<Subject> inSubjects,
+               const Arguments& inArguments) {
+    if (inSize > kMostForPeers)
+      std::erase_if(inSubjects, [](const Subject& inOne) { return inOne.memory == kPeersTree; });
     const int repeats = inSize <= 10'000 ? 3 * options_.repeats : options_.repeats;
     std::vector<std::vector<Steps>> measured(inSubjects.size());
     for (int repeat = 0; repeat < repeats; ++repeat)
@@ -158,13 +181,9 @@ class Bench {
   }
 
   void TimeStarts() {
-    const std::string lyra = (fs::path(program_).parent_path() / "lyra").string();
-    if (!fs::exists(lyra)) {
-      std::cerr << "zor_bench: the command is not built; its start is not measured\n";
-      return;
-    }
+    if (!HasCommand()) return;
     const std::string document = Document("small.xml", kSmallDocument, 1, WriteClashDocument);
-    const std::vector<std::string> info = {lyra, "info", document};
+    const std::vector<std::string> info = {LyraBesideUs(), "info", document};
     const auto times =
         TimeCommands({info, {"xmllint", "--noout", document}}, 20 * options_.repeats);
     results_.Add("start", "lyra info", kSmallDocument, times[0]);
@@ -193,6 +212,7 @@ class Bench {
   void PrintTargets() const {
     std::cout << "\nTargets, at " << options_.sizes.back() << '\n';
     PrintGrowth();
+    PrintLoadRatios();
     PrintRatios();
     if (startMeasured_) PrintStartTarget();
   }
@@ -201,10 +221,11 @@ class Bench {
   void PrintGrowth() const {
     const std::size_t least = options_.sizes.front();
     const std::size_t most = options_.sizes.back();
-    const auto print = [&](const std::string& inWhat, double inMost, double inLeast) {
+    const auto print = [&](const std::string& inWhat, double inMost, double inLeast,
+                           double inLimit = 1.5) {
       PrintTarget(inWhat + ", time each there / at " + std::to_string(least),
                   inMost / inLeast * static_cast<double>(least) / static_cast<double>(most),
-                  "at most", 1.5);
+                  "at most", inLimit);
     };
     print("reading loop", results_.AllMilliseconds("loop", "ZORLyra", most),
           results_.AllMilliseconds("loop", "ZORLyra", least));
@@ -212,6 +233,30 @@ class Bench {
           results_.Milliseconds("merge", "ZORLyra", least, "merge"));
     print("report, write", results_.Milliseconds("report", "ZORLyra", most, "write"),
           results_.Milliseconds("report", "ZORLyra", least, "write"));
+    print("load, read, merge and dump", results_.AllMilliseconds("whole", "ZORLyra", most),
+          results_.AllMilliseconds("whole", "ZORLyra", least), 1.3);
+  }
+
+  void PrintLoadRatios() const {
+    const std::size_t most = options_.sizes.back();
+    const auto against = [&](const char* inPeer) {
+      return Ratio("load", most, "ZORLyra", "load", inPeer, "load");
+    };
+    PrintTarget("load / Xerces-C's DOM", against("Xerces-C DOM"), "at most", 0.25);
+    PrintTarget("load / Xerces-C's DOM, peak memory",
+                results_.Megabytes("load", "ZORLyra", most, "load") /
+                    results_.Megabytes("load", "Xerces-C DOM", most, "load"),
+                "at most", 0.25);
+    PrintTarget("load / Xerces-C's bare scan", against("Xerces-C SAX2 scan"), "at most", 1.6);
+    PrintTarget("load / libxml2", against("libxml2"), "at most", 0.8);
+    PrintTarget("load and the reading loop / libxml2's load",
+                results_.AllMilliseconds("loop", "ZORLyra", most) /
+                    results_.Milliseconds("load", "libxml2", most, "load"),
+                "at most", 1);
+    PrintTarget("dump / load", Ratio("dump", most, "ZORLyra", "dump", "ZORLyra", "load"), "at most",
+                1.0 / 3);
+    PrintTarget("lyra list --csv / load",
+                Ratio("list", most, "lyra list --csv", "run", "ZORLyra", "load"), "at most", 1.5);
   }
 
   void PrintRatios() const {

@@ -2,6 +2,7 @@
 
 #include <fcntl.h>
 #include <spawn.h>
+#include <sys/resource.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -15,6 +16,10 @@ std::string ReadToEnd(int inDescriptor) {
   for (ssize_t count = 0; (count = read(inDescriptor, buffer, sizeof buffer)) > 0;)
     text.append(buffer, static_cast<std::size_t>(count));
   return text;
+}
+
+double Milliseconds(const timeval& inTime) {
+  return 1e3 * static_cast<double>(inTime.tv_sec) + 1e-3 * static_cast<double>(inTime.tv_usec);
 }
 
 pid_t Start(const std::vector<std::string>& inCommand, int inOutput) {
@@ -46,9 +51,12 @@ ChildOutcome RunChild(const std::vector<std::string>& inCommand) {
   outcome.output = ReadToEnd(ends[0]);
   close(ends[0]);
   int status = 0;
-  waitpid(child, &status, 0);
+  rusage usage{};
+  wait4(child, &status, 0, &usage);
   outcome.milliseconds =
       std::chrono::duration<double, std::milli>(std::chrono::steady_clock::now() - start).count();
+  outcome.processorMilliseconds = Milliseconds(usage.ru_utime) + Milliseconds(usage.ru_stime);
+  outcome.peakMegabytes = static_cast<double>(usage.ru_maxrss) / 1024;
   outcome.exitCode = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
   return outcome;
 }

@@ -9,6 +9,8 @@ struct ChildOutcome {
   int exitCode;         ///< 128 and the signal's number when one ended the command
   std::string output;   ///< what it wrote to its standard output
   double milliseconds;  ///< from before its start until its end was known
+  double processorMilliseconds;
+  double peakMegabytes;
 };
 
 /// Runs a command (its path and arguments, no shell) with an empty standard input and waits for its

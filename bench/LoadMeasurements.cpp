@@ -6,6 +6,7 @@
 
 #include "Measurement.h"
 #include "PugixmlTree.h"
+#include "SaxScan.h"
 #include "XercesTree.h"
 #include "ZORDocument.h"
 #include "ZORTree.h"
@@ -55,6 +56,16 @@ Steps LoadWithXerces(const Arguments& inArguments) {
     parser = ParseWithXerces(inArguments.at(0));
   });
   steps[0].hash = HashOf(*parser->getDocument());
+  return steps;
+}
+
+Steps ScanWithXerces(const Arguments& inArguments) {
+  Steps steps;
+  TimeStep("load", steps, [&] {
+    InitializeXerces();
+    ScanWithSax(inArguments.at(0));
+  });
+  steps[0].hash = HashOfSaxScan(inArguments.at(0));
   return steps;
 }
 

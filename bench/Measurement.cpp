@@ -17,12 +17,13 @@ Measurement FindMeasurement(const std::string& inName) {
   static const std::map<std::string, Measurement> kMeasurements = {
       {"load-zorlyra", LoadWithZORLyra},     {"load-xerces", LoadWithXerces},
       {"load-libxml2", LoadWithLibxml2},     {"load-pugixml", LoadWithPugixml},
-      {"loop-zorlyra", LoopWithZORLyra},     {"loop-pugixml", LoopWithPugixml},
-      {"merge-zorlyra", MergeWithZORLyra},   {"merge-xerces", MergeWithXerces},
-      {"report-zorlyra", ReportWithZORLyra}, {"report-plain", ReportWithPlainText},
-      {"dump-zorlyra", DumpWithZORLyra},     {"dump-xerces", DumpWithXerces},
-      {"escape-zorlyra", EscapeWithZORLyra}, {"escape-append", EscapeByCharacter},
-      {"escape-push-back", EscapeByPushBack}};
+      {"scan-xerces", ScanWithXerces},       {"whole-zorlyra", WholeWithZORLyra},
+      {"list-lyra", ListWithLyra},           {"loop-zorlyra", LoopWithZORLyra},
+      {"loop-pugixml", LoopWithPugixml},     {"merge-zorlyra", MergeWithZORLyra},
+      {"merge-xerces", MergeWithXerces},     {"report-zorlyra", ReportWithZORLyra},
+      {"report-plain", ReportWithPlainText}, {"dump-zorlyra", DumpWithZORLyra},
+      {"dump-xerces", DumpWithXerces},       {"escape-zorlyra", EscapeWithZORLyra},
+      {"escape-append", EscapeByCharacter},  {"escape-push-back", EscapeByPushBack}};
   const auto found = kMeasurements.find(inName);
   return found == kMeasurements.end() ? nullptr : found->second;
 }

@@ -45,6 +45,8 @@ void TimeStep(const std::string& inName, Steps& ioSteps, const Work& inWork) {
 // The measurements by subject. Arguments are paths of documents, outputs last.
 Steps LoadWithZORLyra(const Arguments& inArguments);
 Steps LoadWithXerces(const Arguments& inArguments);
+/// No tree: what it costs Xerces-C to read the text.
+Steps ScanWithXerces(const Arguments& inArguments);
 Steps LoadWithLibxml2(const Arguments& inArguments);
 Steps LoadWithPugixml(const Arguments& inArguments);
 /// Steps "load", "short", "full", "copy", "specifications", "load components", "components" of a
@@ -57,7 +59,12 @@ Steps MergeWithXerces(const Arguments& inArguments);
 /// Steps "load" and "write", of a report of all interferences into a file.
 Steps ReportWithZORLyra(const Arguments& inArguments);
 Steps ReportWithPlainText(const Arguments& inArguments);
-/// Step "dump", of a document into a file.
+/// Steps "load", "read in full", "merge" (the loading of the second document included) and "dump",
+/// of a document and a smaller one.
+Steps WholeWithZORLyra(const Arguments& inArguments);
+/// Step "run": the command `lyra list --csv` on a document.
+Steps ListWithLyra(const Arguments& inArguments);
+/// Steps "load" and "dump", of a document into a file.
 Steps DumpWithZORLyra(const Arguments& inArguments);
 Steps DumpWithXerces(const Arguments& inArguments);
 /// Steps "one text" and "many texts", of so many characters in all.

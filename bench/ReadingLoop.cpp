@@ -7,6 +7,7 @@
 
 #include "Measurement.h"
 #include "ZORClashParsing.h"
+#include "ZORLyraXMLServices.h"
 #include "ZORTree.h"
 
 namespace {
@@ -161,5 +162,32 @@ Steps LoopWithZORLyra(const Arguments& inArguments) {
   std::size_t step = 1;
   for (const Loop& loop : kClashLoops) steps[step++].hash = loop.hashed(clashes, count);
   steps.back().hash = kComponentLoop.hashed(components, 0);
+  return steps;
+}
+
+Steps WholeWithZORLyra(const Arguments& inArguments) {
+  std::string path = inArguments.at(0), morePath = inArguments.at(1);
+  const std::string& output = inArguments.at(2);
+  Steps steps;
+  ZORClashParsing reader(path.data()), more(morePath.data());
+  DOM_Document document, moreDocument;
+  ZORUnicodeString kind, trace;
+  const auto require = [](HRESULT inResult) {
+    if (FAILED(inResult)) throw std::runtime_error("the document could not be worked on");
+  };
+  TimeStep("load", steps, [&] { require(reader.LoadSequence(document, kind)); });
+  const int count = DeclaredCount(reader);
+  TimeStep("read in full", steps, [&] {
+    for (const Loop& loop : kClashLoops) loop.timed(reader, count);
+  });
+  TimeStep("merge", steps, [&] {
+    require(more.LoadSequence(moreDocument, kind));
+    require(reader.MergeDocuments(document, moreDocument, trace));
+  });
+  TimeStep("dump", steps, [&] {
+    ZORLyraXMLServices writer;
+    require(writer.DumpDocument(document, output.c_str(), "", "", "", 0, 0));
+  });
+  steps.back().hash = HashOfBytes(output);
   return steps;
 }

@@ -1,7 +1,6 @@
 // Writing a report of all interferences by markers, and the same text by plain appends.
 #include <array>
 #include <fstream>
-#include <iterator>
 #include <stdexcept>
 
 #include "BuildPath.h"
@@ -32,14 +31,6 @@ std::vector<Row> LoadRows(const std::string& inPath, Steps& ioSteps) {
     reader.GetClashInfos(static_cast<int>(i) + 1, row[0], row[1], row[2], row[3], row[4]);
   }
   return rows;
-}
-
-std::uint64_t HashOfBytes(const std::string& inPath) {
-  std::ifstream file(inPath, std::ios::binary);
-  const std::string bytes((std::istreambuf_iterator<char>(file)), std::istreambuf_iterator<char>());
-  ResultHash hash;
-  hash.Add(std::string_view(bytes));
-  return hash.Value();
 }
 
 void WriteByMarkers(std::vector<Row>& ioRows, const std::string& inPath) {

@@ -1,13 +1,21 @@
 #include "ResultHash.h"
 
+#include <fstream>
+#include <stdexcept>
+#include <vector>
+
 namespace {
 constexpr unsigned char kEndOfText = 0xFF;
 
 bool IsHighSurrogate(char16_t inUnit) { return (inUnit & 0xFC00) == 0xD800; }
 }  // namespace
 
-void ResultHash::Add(std::string_view inUtf8) {
+void ResultHash::AddPart(std::string_view inUtf8) {
   for (char byte : inUtf8) AddByte(static_cast<unsigned char>(byte));
+}
+
+void ResultHash::Add(std::string_view inUtf8) {
+  AddPart(inUtf8);
   AddByte(kEndOfText);
 }
 
@@ -46,4 +54,15 @@ void ResultHash::AddCharacter(char32_t inCharacter) {
     tail(6);
   }
   tail(0);
+}
+
+std::uint64_t HashOfBytes(const std::string& inPath) {
+  std::ifstream file(inPath, std::ios::binary);
+  if (!file) throw std::runtime_error("cannot read " + inPath);
+  ResultHash hash;
+  std::vector<char> part(std::size_t{1} << 20);
+  while (file.read(part.data(), static_cast<std::streamsize>(part.size())), file.gcount() > 0)
+    hash.AddPart({part.data(), static_cast<std::size_t>(file.gcount())});
+  hash.Add(std::string_view());
+  return hash.Value();
 }

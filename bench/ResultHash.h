@@ -4,6 +4,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <string>
 #include <string_view>
 
 /// FNV-1a, 64 bits (Fowler, Noll, Vo), over texts as UTF-8, whatever form they come in, each ended
@@ -13,6 +14,8 @@ class ResultHash {
   void Add(std::string_view inUtf8);
   void Add(std::u16string_view inUtf16);
   void Add(std::uint64_t inNumber);
+  /// Part of a text, which the next Add ends.
+  void AddPart(std::string_view inUtf8);
   std::uint64_t Value() const { return value_; }
 
  private:
@@ -21,6 +24,9 @@ class ResultHash {
 
   std::uint64_t value_ = 0xCBF29CE484222325u;
 };
+
+/// The hash of a file's bytes; raises when it cannot be read.
+std::uint64_t HashOfBytes(const std::string& inPath);
 
 /// Takes what a ResultHash takes and only counts its length: what a loop that is timed does with
 /// the answers that it gets.

@@ -40,13 +40,25 @@ void Results::Add(const std::string& inBenchmark, const std::string& inSubject, 
   }
 }
 
-double Results::Milliseconds(const std::string& inBenchmark, const std::string& inSubject,
-                             std::size_t inSize, const std::string& inStep) const {
+const Step* Results::Find(const std::string& inBenchmark, const std::string& inSubject,
+                          std::size_t inSize, const std::string& inStep) const {
   for (const ResultRow& row : rows_)
     if (row.benchmark == inBenchmark && row.subject == inSubject && row.size == inSize &&
         row.step.name == inStep)
-      return row.step.milliseconds;
-  return std::numeric_limits<double>::quiet_NaN();
+      return &row.step;
+  return nullptr;
+}
+
+double Results::Milliseconds(const std::string& inBenchmark, const std::string& inSubject,
+                             std::size_t inSize, const std::string& inStep) const {
+  const Step* const step = Find(inBenchmark, inSubject, inSize, inStep);
+  return step == nullptr ? std::numeric_limits<double>::quiet_NaN() : step->milliseconds;
+}
+
+double Results::Megabytes(const std::string& inBenchmark, const std::string& inSubject,
+                          std::size_t inSize, const std::string& inStep) const {
+  const Step* const step = Find(inBenchmark, inSubject, inSize, inStep);
+  return step == nullptr ? std::numeric_limits<double>::quiet_NaN() : step->peakMegabytes;
 }
 
 double Results::AllMilliseconds(const std::string& inBenchmark, const std::string& inSubject,

@@ -25,6 +25,9 @@ class Results {
   /// The time of a step; not a number when it was not measured.
   double Milliseconds(const std::string& inBenchmark, const std::string& inSubject,
                       std::size_t inSize, const std::string& inStep) const;
+  /// The peak memory up to the end of a step; not a number when it was not measured.
+  double Megabytes(const std::string& inBenchmark, const std::string& inSubject, std::size_t inSize,
+                   const std::string& inStep) const;
   /// The time of all steps of a subject.
   double AllMilliseconds(const std::string& inBenchmark, const std::string& inSubject,
                          std::size_t inSize) const;
@@ -39,6 +42,9 @@ class Results {
   void WriteCsv(std::ostream& ioOut) const;
 
  private:
+  const Step* Find(const std::string& inBenchmark, const std::string& inSubject, std::size_t inSize,
+                   const std::string& inStep) const;
+
   std::vector<ResultRow> rows_;
   std::vector<std::string> disagreements_;
 };

@@ -6,6 +6,7 @@
 #include <stdexcept>
 
 #include "ChildProcess.h"
+#include "ResultHash.h"
 
 namespace {
 double MillisecondsOf(const std::vector<std::string>& inCommand) {
@@ -25,6 +26,18 @@ std::vector<std::vector<Steps>> TimeCommands(
       times[turn].push_back({{"run", MillisecondsOf(inCommands[turn]), 0, 0}});
     }
   return times;
+}
+
+std::string LyraBesideUs() {
+  return std::filesystem::read_symlink("/proc/self/exe").parent_path() / "lyra";
+}
+
+Steps ListWithLyra(const Arguments& inArguments) {
+  const ChildOutcome outcome = RunChild({LyraBesideUs(), "list", "--csv", inArguments.at(0)});
+  if (outcome.exitCode != 0) throw std::runtime_error("lyra list failed");
+  ResultHash hash;
+  hash.Add(std::string_view(outcome.output));
+  return {{"run", outcome.processorMilliseconds, outcome.peakMegabytes, hash.Value()}};
 }
 
 // The dynamic loader notes every library that it initialises, those opened while running too.

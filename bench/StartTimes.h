@@ -1,4 +1,4 @@
-// What it costs to start a command on a small file.
+// What whole runs of commands cost.
 #ifndef ZOR_BENCH_START_TIMES_H
 #define ZOR_BENCH_START_TIMES_H
 
@@ -7,6 +7,9 @@
 #include <vector>
 
 #include "Measurement.h"
+
+/// The path of the command, which is built into our folder.
+std::string LyraBesideUs();
 
 /// Wall times of whole runs of commands, in alternating order.
 /// @return for each command one Steps a repeat, with the one step "run". Raises when a run fails.
