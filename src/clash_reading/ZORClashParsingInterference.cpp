@@ -1,4 +1,6 @@
 // Everything about one "Interference" element.
+#include <string_view>
+
 #include "ZORClashParsing.h"
 #include "ZORLyraGeneralServices.h"
 #include "clash_reading/ElementWalk.h"
@@ -9,14 +11,18 @@
 
 namespace {
 
-constexpr const char* kPathSeparator = " --++-- ";
+constexpr std::u16string_view kPathSeparator = u" --++-- ";
 constexpr const char* kManagedByPdm = "KORVAPDM";
+
+std::u16string_view UnitsOf(const ZORUnicodeString& inText) {
+  return {inText.ConvertToUCChar(), static_cast<std::size_t>(inText.GetLengthInChar())};
+}
 
 // An attribute that holds a number, with its decimal comma made a point. Only the first comma is
 // one.
 ZORUnicodeString NumberText(const DOM_Node& inNode, const char* inName) {
   ZORUnicodeString text = ZORLyraGeneralServices::GetAttrOnNode(inNode, inName);
-  text.ReplaceSubString(",", ".");
+  if (UnitsOf(text).find(u',') != std::u16string_view::npos) text.ReplaceSubString(",", ".");
   return text;
 }
 
@@ -29,9 +35,21 @@ void AppendPoint(const DOM_Node& inPoint, ZORUnicodeString& ioPoints) {
   ioPoints += NumberText(inPoint, "Uz");
 }
 
+// The last segment of a path; empty where a segment is empty or holds a line feed, since there the
+// platform's tokenizer decides.
+std::u16string_view LastPlainSegment(std::u16string_view inPath) {
+  if (inPath.find(u'\n') != std::u16string_view::npos) return {};
+  for (std::size_t end = 0; (end = inPath.find(kPathSeparator)) != std::u16string_view::npos;) {
+    if (end == 0) return {};
+    inPath.remove_prefix(end + kPathSeparator.size());
+  }
+  return inPath;
+}
+
 // Replaces every separator by a line feed, in one pass: texts may hold many.
 ZORUnicodeString SegmentsAsLines(const ZORUnicodeString& inIdentifier) {
-  const ZORUnicodeString separator(kPathSeparator);
+  ZORUnicodeString separator;
+  separator.BuildFromUTF16(kPathSeparator.data(), kPathSeparator.size());
   ZORUnicodeString lines;
   int from = 0;
   for (int at = inIdentifier.SearchSubString(separator); at >= 0;
@@ -311,8 +329,13 @@ void ZORClashParsing::GetInterferenceData(DOM_Node inInterference, ZORUnicodeStr
 }
 
 ZORUnicodeString ZORClashParsing::GetInstanceNameFromDID(ZORUnicodeString inDescriptionId) {
-  ZORToken segments(SegmentsAsLines(inDescriptionId));
   ZORUnicodeString last;
+  if (const std::u16string_view plain = LastPlainSegment(UnitsOf(inDescriptionId));
+      !plain.empty()) {
+    last.BuildFromUTF16(plain.data(), plain.size());
+    return last;
+  }
+  ZORToken segments(SegmentsAsLines(inDescriptionId));
   for (ZORUnicodeString segment = segments.GetNextToken("\n"); segment.GetLengthInChar() != 0;
        segment = segments.GetNextToken("\n"))
     last = segment;

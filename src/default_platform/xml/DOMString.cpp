@@ -115,7 +115,7 @@ unsigned int DOMString::length() const { return text_ == nullptr ? 0 : text_->le
 const ZORUC2Bytes* DOMString::rawBuffer() const { return length() == 0 ? nullptr : text_->Units(); }
 
 bool DOMString::equals(const DOMString& inOther) const {
-  return DOM_HandleAccess::View(*this) == DOM_HandleAccess::View(inOther);
+  return IsSameText(DOM_HandleAccess::View(*this), DOM_HandleAccess::View(inOther));
 }
 
 bool DOMString::equals(const char* inAscii) const {

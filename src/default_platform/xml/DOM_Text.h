@@ -16,6 +16,12 @@ struct DOM_Text {
   std::u16string_view View() const { return {Units(), length}; }
 };
 
+/// As ==, which the standard library does unit by unit.
+inline bool IsSameText(std::u16string_view inA, std::u16string_view inB) {
+  return inA.size() == inB.size() &&
+         (inA.empty() || std::memcmp(inA.data(), inB.data(), inA.size() * sizeof(char16_t)) == 0);
+}
+
 /// A fast hash of UTF-16 text, eight bytes at a time.
 inline std::uint64_t HashOfText(std::u16string_view inText) {
   constexpr std::uint64_t kFactor = 0x9E3779B97F4A7C15u;

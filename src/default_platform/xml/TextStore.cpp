@@ -17,13 +17,13 @@ const DOM_Text* TextStore::Add(std::u16string_view inText) {
   if (inText.size() > kLongestShared) return AddUnshared(inText);
   const std::uint64_t hash = HashOfText(inText);
   Shared& slot = shared_[hash % kSharedSlots];
-  if (slot.hash != hash || slot.text == nullptr || slot.text->View() != inText)
+  if (slot.hash != hash || slot.text == nullptr || !IsSameText(slot.text->View(), inText))
     slot = {hash, AddUnshared(inText)};
   return slot.text;
 }
 
 const DOM_Text* TextStore::Add(std::u16string_view inText, TextSeries& ioSeries) {
-  if (ioSeries.last != nullptr && ioSeries.last->View() == inText) {
+  if (ioSeries.last != nullptr && IsSameText(ioSeries.last->View(), inText)) {
     ioSeries.newInARow = 0;
     return ioSeries.last;
   }
@@ -70,7 +70,8 @@ NameTable::NameTable(TextStore& ioTexts) : texts_(ioTexts), names_(1), slots_(kF
 std::size_t NameTable::SlotOf(std::u16string_view inName) const {
   const std::size_t mask = slots_.size() - 1;
   std::size_t slot = HashOfText(inName) & mask;
-  while (slots_[slot] != 0 && names_[slots_[slot]]->View() != inName) slot = (slot + 1) & mask;
+  while (slots_[slot] != 0 && !IsSameText(names_[slots_[slot]]->View(), inName))
+    slot = (slot + 1) & mask;
   return slot;
 }
 
