@@ -3,6 +3,7 @@
 #include <vtkActor.h>
 #include <vtkCamera.h>
 #include <vtkCellArray.h>
+#include <vtkCellData.h>
 #include <vtkFloatArray.h>
 #include <vtkImageData.h>
 #include <vtkMapper.h>
@@ -36,7 +37,22 @@ vtkSmartPointer<vtkPoints> ToPoints(const std::vector<std::array<float, 3>>& inP
   return points;
 }
 
-vtkSmartPointer<vtkPolyData> SurfaceOf(const PartMesh& inMesh) {
+vtkSmartPointer<vtkUnsignedCharArray> ColoursOf(const PartMesh& inMesh,
+                                                const unsigned int* inColour) {
+  auto colours = vtkSmartPointer<vtkUnsignedCharArray>::New();
+  colours->SetNumberOfComponents(3);
+  for (const std::uint16_t number : inMesh.triangleColours) {
+    const bool isOwn = number < inMesh.colours.size();
+    unsigned char colour[3];
+    for (std::size_t i = 0; i < 3; ++i)
+      colour[i] = isOwn ? inMesh.colours[number][i] : static_cast<unsigned char>(inColour[i]);
+    colours->InsertNextTypedTuple(colour);
+  }
+  return colours;
+}
+
+/// @param inColour of triangles that have none of their own.
+vtkSmartPointer<vtkPolyData> SurfaceOf(const PartMesh& inMesh, const unsigned int* inColour) {
   auto surface = vtkSmartPointer<vtkPolyData>::New();
   surface->SetPoints(ToPoints(inMesh.points));
   vtkNew<vtkFloatArray> normals;
@@ -48,6 +64,8 @@ vtkSmartPointer<vtkPolyData> SurfaceOf(const PartMesh& inMesh) {
     triangles->InsertNextCell(
         {vtkIdType{triangle[0]}, vtkIdType{triangle[1]}, vtkIdType{triangle[2]}});
   surface->SetPolys(triangles);
+  if (!inMesh.triangleColours.empty())
+    surface->GetCellData()->SetScalars(ColoursOf(inMesh, inColour));
   return surface;
 }
 
@@ -69,8 +87,16 @@ vtkSmartPointer<vtkActor> MakeActor(vtkPolyData* inData, const PlacedMeshRep& in
   mapper->SetInputData(inData);
   auto actor = vtkSmartPointer<vtkActor>::New();
   actor->SetMapper(mapper);
-  const ZORMathVector& move = inRep.GetRootFromPart().GetVector();
-  actor->SetPosition(move.x, move.y, move.z);
+  const ZORMathTransformation placement = RootFromPoints(inRep);
+  vtkNew<vtkMatrix4x4> matrix;
+  for (int i = 0; i < 4; ++i) {
+    const ZORMathVector& column =
+        i < 3 ? placement.GetMatrix().GetColumn(i) : placement.GetVector();
+    matrix->SetElement(0, i, column.x);
+    matrix->SetElement(1, i, column.y);
+    matrix->SetElement(2, i, column.z);
+  }
+  actor->SetUserMatrix(matrix);
   return actor;
 }
 
@@ -78,9 +104,9 @@ struct ToolkitScene {
   explicit ToolkitScene(const support::MeshScene& inScene) {
     for (const auto* const child : inScene.Bag()->GetChildren()) {
       const auto& rep = dynamic_cast<const PlacedMeshRep&>(*child);
-      auto surface = MakeActor(SurfaceOf(*rep.GetMesh()), rep);
       unsigned int colour[4];
       rep.GetColorRGBA(colour);
+      auto surface = MakeActor(SurfaceOf(*rep.GetMesh(), colour), rep);
       surface->GetProperty()->SetColor(colour[0] / 255.0, colour[1] / 255.0, colour[2] / 255.0);
       surface->GetProperty()->SetInterpolationToGouraud();
       auto lines = MakeActor(LinesOf(*rep.GetMesh()), rep);
@@ -103,18 +129,31 @@ vtkSmartPointer<vtkRenderWindow> MakeWindow(ToolkitScene& inScene) {
   return window;
 }
 
-void DrawOne(ToolkitScene& inScene, vtkRenderWindow& ioWindow, int inNumber) {
-  vtkCamera* const camera = inScene.renderer->GetActiveCamera();
-  const double angle = 0.4 + 0.07 * inNumber;
-  camera->SetFocalPoint(0, 0, 0);
-  camera->SetPosition(std::cos(angle), std::sin(angle), 0.6);
-  camera->SetViewUp(0, 0, 1);
-  inScene.renderer->ResetCamera();
+/// From where the other side sees the scene too.
+void PlaceCamera(vtkRenderer& ioRenderer, const ZOR3DRep& inScene, int inNumber) {
+  ZOR3DViewpoint viewpoint;
+  SetViewpoint(inScene, inNumber, viewpoint);
+  const ZORMathVector& eye = viewpoint.origin;
+  const ZORMathVector& sight = viewpoint.sight;
+  const double distance = viewpoint.focusDistance;
+  vtkCamera* const camera = ioRenderer.GetActiveCamera();
+  camera->SetPosition(eye.x, eye.y, eye.z);
+  camera->SetFocalPoint(eye.x + distance * sight.x, eye.y + distance * sight.y,
+                        eye.z + distance * sight.z);
+  camera->SetViewUp(viewpoint.up.x, viewpoint.up.y, viewpoint.up.z);
+  camera->SetViewAngle(viewpoint.viewAngle * 180 / support::kPi);
+  ioRenderer.ResetCameraClippingRange();
+}
+
+vtkSmartPointer<vtkUnsignedCharArray> DrawOne(const ZOR3DRep& inScene, ToolkitScene& ioToolkit,
+                                              vtkRenderWindow& ioWindow, int inNumber) {
+  PlaceCamera(*ioToolkit.renderer, inScene, inNumber);
   ioWindow.Render();
-  vtkNew<vtkUnsignedCharArray> pixels;
+  auto pixels = vtkSmartPointer<vtkUnsignedCharArray>::New();
   ioWindow.GetPixelData(0, 0, kPictureWidth - 1, kPictureHeight - 1, 1, pixels);
   if (pixels->GetNumberOfTuples() != vtkIdType{kPictureWidth} * kPictureHeight)
     throw std::runtime_error("no picture was drawn");
+  return pixels;
 }
 
 void TimeScene(const std::string& inName) {
@@ -126,15 +165,17 @@ void TimeScene(const std::string& inName) {
     PrintMedian("first", 1, [&](int) {
       toolkit = std::make_unique<ToolkitScene>(scene);
       window = MakeWindow(*toolkit);
-      DrawOne(*toolkit, *window, 0);
+      DrawOne(*scene.Bag(), *toolkit, *window, 0);
     });
-    PrintMedian("next", kPictures, [&](int inNumber) { DrawOne(*toolkit, *window, inNumber); });
+    PrintMedian("next", kPictures,
+                [&](int inNumber) { DrawOne(*scene.Bag(), *toolkit, *window, inNumber); });
+    PrintCovered(DrawOne(*scene.Bag(), *toolkit, *window, 0)->GetPointer(0));
     window->Finalize();
   }
   ToolkitScene toolkit(scene);
   PrintMedian("window", kPictures, [&](int inNumber) {
     const auto window = MakeWindow(toolkit);
-    DrawOne(toolkit, *window, inNumber);
+    DrawOne(*scene.Bag(), toolkit, *window, inNumber);
     window->RemoveRenderer(toolkit.renderer);
     window->Finalize();
   });

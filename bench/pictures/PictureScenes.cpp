@@ -3,8 +3,11 @@
 #include <algorithm>
 #include <cmath>
 #include <cstdio>
+#include <filesystem>
 #include <stdexcept>
 #include <utility>
+
+#include "default_platform/OpenModel.h"
 
 namespace {
 
@@ -44,6 +47,17 @@ std::shared_ptr<PartMesh> MakeWavyBall(double inRadius, std::uint32_t inTriangle
 
 constexpr PartColour kRed{200, 60, 50, 255};
 constexpr PartColour kBlue{60, 110, 200, 255};
+constexpr PartColour kGrey{210, 210, 210, 255};
+
+void AddProducts(const ZORIProduct_var& inProduct, support::MeshScene& ioScene) {
+  ZORDefault::ProductFacts facts;
+  ZORDefault::GetProductFacts(inProduct.GetInterface(), facts);
+  if (facts.mesh) ioScene.Add(facts.mesh, facts.rootFromProduct, facts.colour.value_or(kGrey));
+  const std::unique_ptr<ZORListValZORBaseUnknown_var> children(
+      inProduct->GetChildren("ZORIProduct"));
+  for (int i = 1; children && i <= children->Size(); ++i)
+    AddProducts(ZORIProduct_var((*children)[i]), ioScene);
+}
 
 }  // namespace
 
@@ -58,9 +72,32 @@ void FillScene(const std::string& inName, support::MeshScene& ioScene) {
       ioScene.Add(MakeWavyBall(30 + i, 250'000),
                   support::MovedBy(70 * (i % 4), 70 * (i / 4), 8 * (i % 3)),
                   i % 2 == 0 ? kRed : kBlue);
+  } else if (std::filesystem::is_regular_file(inName)) {
+    AddProducts(ZORDefault::OpenModel(inName).root, ioScene);
   } else {
     throw std::invalid_argument("unknown scene: " + inName);
   }
+}
+
+ZORMathTransformation RootFromPoints(const PlacedMeshRep& inRep) {
+  ZORMathTransformation placement = inRep.GetRootFromPart();
+  placement.SetVector(placement * inRep.GetMesh()->origin);
+  return placement;
+}
+
+void SetViewpoint(const ZOR3DRep& inScene, int inNumber, ZOR3DViewpoint& ioViewpoint) {
+  const double angle = 0.4 + 0.07 * inNumber;
+  ioViewpoint.sight = {-std::cos(angle), -std::sin(angle), -0.6};
+  ioViewpoint.up = {0, 0, 1};
+  ioViewpoint.Reframe(kPictureWidth, kPictureHeight, 1, 1, inScene.GetShowBoundingElement());
+}
+
+void PrintCovered(const std::uint8_t* inPixels) {
+  constexpr int kPixels = kPictureWidth * kPictureHeight;
+  int covered = 0;
+  for (int i = 0; i < kPixels; ++i, inPixels += 3)
+    covered += std::all_of(inPixels, inPixels + 3, [](std::uint8_t b) { return b == 255; }) ? 0 : 1;
+  std::printf("covered %.3f 0\n", 100.0 * covered / kPixels);
 }
 
 void PrintTimes(const std::string& inName, std::vector<Times> inTimes) {

@@ -4,19 +4,31 @@
 
 #include <chrono>
 #include <cstddef>
+#include <cstdint>
 #include <ctime>
 #include <memory>
 #include <string>
 #include <vector>
 
+#include "platform/visualisation/ZOR3DViewpoint.h"
 #include "support/MeshScenes.h"
 
 inline constexpr int kPictureWidth = 756;
 inline constexpr int kPictureHeight = 506;
 
 /// Fills a scene: "two-products" (10,000 triangles), "one-part" (250,000), "whole" (2,500,000, of
-/// ten parts). Raises std::invalid_argument for another name.
+/// ten parts), or all products of the model file of that name. Raises std::invalid_argument for
+/// another name, ModelError for a file that is no model.
 void FillScene(const std::string& inName, support::MeshScene& ioScene);
+
+/// Where the points of a mesh, which are relative to its origin, lie in the scene.
+ZORMathTransformation RootFromPoints(const PlacedMeshRep& inRep);
+
+/// Where a scene's picture 0, 1, 2, … is seen from, with all in it.
+void SetViewpoint(const ZOR3DRep& inScene, int inNumber, ZOR3DViewpoint& ioViewpoint);
+
+/// Prints "covered SHARE 0": the share of a picture on white that shows something, in percent.
+void PrintCovered(const std::uint8_t* inPixels);
 
 /// Wall time, and processor time of all threads, in milliseconds.
 struct Times {

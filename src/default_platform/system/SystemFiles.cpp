@@ -50,6 +50,8 @@ bool ReadFile(const std::string& inPath, std::string& outContent, FileStamp& out
   bool read = fstat(descriptor, &status) == 0 && S_ISREG(status.st_mode);
   if (read) {
     outStamp = StampOf(status);
+    // Growing step by step would copy large files several times.
+    outContent.reserve(static_cast<std::size_t>(status.st_size));
     read = ReadAll(descriptor, outContent);
   }
   close(descriptor);
