@@ -1,5 +1,6 @@
 #include "platform/xml/DOM_NamedNodeMap.h"
 
+#include <cstring>
 #include <iterator>
 
 #include "default_platform/xml/DOM_HandleAccess.h"
@@ -32,12 +33,11 @@ DOM_Node DOM_NamedNodeMap::getNamedItem(const DOMString& inName) const {
 
 DOM_Node DOM_NamedNodeMap::getNamedItem(const char* inName) const {
   char16_t units[64];
-  std::size_t count = 0;
-  for (; inName != nullptr && inName[count] != 0; ++count) {
-    const auto byte = static_cast<unsigned char>(inName[count]);
-    if (byte >= 0x80 || count == std::size(units)) return getNamedItem(DOMString(inName));
-    units[count] = byte;
-  }
+  const std::size_t count = inName == nullptr ? 0 : std::strlen(inName);
+  if (count > std::size(units)) return getNamedItem(DOMString(inName));
+  char16_t all = 0;
+  for (std::size_t i = 0; i < count; ++i) all |= units[i] = static_cast<unsigned char>(inName[i]);
+  if (all >= 0x80) return getNamedItem(DOMString(inName));
   if (isNull()) return DOM_Node();
   DOM_Tree* const tree = DOM_HandleAccess::TreeOf(element_);
   const DOM_Tree::Node element = DOM_HandleAccess::NodeOf(element_);

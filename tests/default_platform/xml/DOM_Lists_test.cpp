@@ -161,6 +161,34 @@ TEST(DOM_NamedNodeMap, AttributesInDocumentOrderAndByName) {
   EXPECT_TRUE(map.getNamedItem(DOMString()).isNull());
 }
 
+TEST(DOM_NamedNodeMap, NarrowNamesOfAnyKindAreFound) {
+  const std::string longName(80, 'n');
+  const DOM_Element root =
+      RootOf("<a k='1' \xC3\xA9='2' " + longName + "='3' " + longName.substr(0, 64) + "='4'/>");
+  const DOM_NamedNodeMap map = root.getAttributes();
+  EXPECT_TRUE(map.getNamedItem("k").getNodeValue().equals("1"));
+  EXPECT_TRUE(map.getNamedItem("\xC3\xA9").getNodeValue().equals("2"));
+  EXPECT_TRUE(map.getNamedItem(longName.c_str()).getNodeValue().equals("3"));
+  EXPECT_TRUE(map.getNamedItem(longName.substr(0, 64).c_str()).getNodeValue().equals("4"));
+  EXPECT_TRUE(map.getNamedItem("K").isNull());
+  EXPECT_TRUE(map.getNamedItem("").isNull());
+  const char* const none = nullptr;
+  EXPECT_TRUE(map.getNamedItem(none).isNull());
+}
+
+// Those that a document type adds stand last.
+TEST(DOM_NamedNodeMap, DefaultAttributesStandBehindTheOthers) {
+  const DOM_Element root =
+      RootOf("<!DOCTYPE a [<!ATTLIST a b CDATA 'x' c CDATA 'y'>]><a z='1' c='2' k='3'/>");
+  const DOM_NamedNodeMap map = root.getAttributes();
+  ASSERT_EQ(map.getLength(), 4u);
+  EXPECT_TRUE(map.item(0).getNodeName().equals("z"));
+  EXPECT_TRUE(map.item(1).getNodeName().equals("c"));
+  EXPECT_TRUE(map.item(1).getNodeValue().equals("2"));
+  EXPECT_TRUE(map.item(2).getNodeName().equals("k"));
+  EXPECT_TRUE(map.item(3).getNodeName().equals("b"));
+}
+
 TEST(DOM_NamedNodeMap, ElementWithoutAttributesHasAnEmptyMap) {
   const DOM_NamedNodeMap map = RootOf("<a/>").getAttributes();
   EXPECT_FALSE(map.isNull());
