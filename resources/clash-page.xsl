@@ -15,6 +15,10 @@
                 select="/ClashElement/ClashResult/Interference | /InterferenceElement/Interference[1]"/>
   <xsl:variable name="hasPictures" select="boolean($interferences/@page:picture)"/>
   <xsl:variable name="mostPoints" select="100"/>
+  <!-- With more interferences than this, a script puts pictures in where they are seen: browsers take long
+       over tens of thousands of lazy ones. -->
+  <xsl:variable name="mostLazy" select="1000"/>
+  <xsl:variable name="areMany" select="count($interferences) > $mostLazy"/>
 
   <xsl:variable name="title">
     <xsl:choose>
@@ -213,6 +217,7 @@
     </form>
     <div class="wide">
       <table id="interferences">
+        <xsl:if test="$hasPictures"><xsl:attribute name="class">pictured</xsl:attribute></xsl:if>
         <thead>
           <tr>
             <th class="number" scope="col">N</th>
@@ -236,7 +241,9 @@
       <xsl:if test="$hasPictures">
         <td class="thumb">
           <xsl:if test="@page:picture">
-            <a href="#i{@page:number}"><img src="{@page:picture}" alt="" loading="lazy" decoding="async" width="96" height="64"/></a>
+            <a href="#i{@page:number}">
+              <xsl:call-template name="image"><xsl:with-param name="path" select="@page:picture"/></xsl:call-template>
+            </a>
           </xsl:if>
         </td>
       </xsl:if>
@@ -292,11 +299,21 @@
       <div class="body">
         <xsl:if test="@page:picture">
           <figure class="picture">
-            <a class="zoom" href="{@page:picture}"><img src="{@page:picture}" alt="Picture of interference {@page:number}" loading="lazy" decoding="async"/></a>
+            <a class="zoom" href="{@page:picture}">
+              <xsl:call-template name="image">
+                <xsl:with-param name="path" select="@page:picture"/>
+                <xsl:with-param name="meaning" select="concat('Picture of interference ', @page:number)"/>
+              </xsl:call-template>
+            </a>
             <xsl:if test="page:Thumbnail">
               <div class="thumbnails">
                 <xsl:for-each select="page:Thumbnail[position() &lt;= $mostPoints]">
-                  <a class="zoom" href="{@href}"><img src="{@href}" alt="Point {position()}" loading="lazy" decoding="async" width="72" height="50"/></a>
+                  <a class="zoom" href="{@href}">
+                    <xsl:call-template name="image">
+                      <xsl:with-param name="path" select="@href"/>
+                      <xsl:with-param name="meaning" select="concat('Point ', position())"/>
+                    </xsl:call-template>
+                  </a>
                 </xsl:for-each>
               </div>
             </xsl:if>
@@ -344,10 +361,23 @@
     </section>
   </xsl:template>
 
+  <xsl:template name="image">
+    <xsl:param name="path"/>
+    <xsl:param name="meaning"/>
+    <xsl:choose>
+      <xsl:when test="$areMany">
+        <noscript class="later"><img src="{$path}" alt="{$meaning}" loading="lazy" decoding="async"/></noscript>
+      </xsl:when>
+      <xsl:otherwise><img src="{$path}" alt="{$meaning}" loading="lazy" decoding="async"/></xsl:otherwise>
+    </xsl:choose>
+  </xsl:template>
+
   <xsl:template match="Product" mode="card">
     <div class="card">
       <xsl:if test="@page:preview">
-        <a class="zoom" href="{@page:preview}"><img src="{@page:preview}" alt="" loading="lazy" decoding="async" width="96" height="64"/></a>
+        <a class="zoom" href="{@page:preview}">
+          <xsl:call-template name="image"><xsl:with-param name="path" select="@page:preview"/></xsl:call-template>
+        </a>
       </xsl:if>
       <div>
         <div class="product">
@@ -452,10 +482,17 @@ th button { all:unset; cursor:pointer; color:inherit } th button:hover { color:v
 th button:focus-visible { outline:2px solid var(--accent) }
 th[aria-sort=ascending] button::after { content:" ↑" } th[aria-sort=descending] button::after { content:" ↓" }
 tbody tr:hover { background:var(--panel) }
-.number { text-align:right; font-variant-numeric:tabular-nums } td:nth-child(n+3).number { min-width:5.5rem } .number:first-child { white-space:nowrap }
-td:nth-last-child(6) { min-width:6.5rem } td:nth-last-child(4) { min-width:8.5rem } td:nth-last-child(2) { min-width:5rem } td.products { min-width:15rem } td.comment { min-width:9rem; max-width:18rem; color:var(--soft) }
+.number { text-align:right; font-variant-numeric:tabular-nums } .number:first-child { white-space:nowrap } td.comment { color:var(--soft) }
+/* Rows of fixed columns, so that of thousands only those are laid out that are seen. */
+@media screen {
+  table,thead,tbody { display:block } table { min-width:60rem }
+  tr { display:grid; grid-template-columns:var(--columns); --columns:3.5rem 7rem 6.8rem 8.5rem minmax(15rem,2fr) minmax(5rem,.6fr) minmax(9rem,1fr) }
+  .pictured tr { --columns:3.5rem 7.5rem 7rem 6.8rem 8.5rem minmax(15rem,2fr) minmax(5rem,.6fr) minmax(9rem,1fr) }
+  th,td { border:0 } tr { border-bottom:1px solid var(--line) } tr[hidden] { display:none }
+  tbody tr { content-visibility:auto; contain-intrinsic-size:auto 2.5rem } .pictured tbody tr { contain-intrinsic-size:auto 5.1rem }
+}
 img { background:#fff; border-radius:.3rem }
-.thumb img,.card img { display:block; width:96px; height:64px; object-fit:cover; border:1px solid var(--line) }
+.thumb a,.card a { min-height:64px } .thumb img,.card img { display:block; width:96px; height:64px; object-fit:cover; border:1px solid var(--line) }
 .swatch { display:inline-block; width:.75rem; height:.75rem; border-radius:.2rem; margin-right:.4rem; vertical-align:-.05rem; border:1px solid #0003; box-shadow:0 0 0 1px #fff3 }
 .interference { margin-top:2.5rem; padding-top:1.2rem; border-top:1px solid var(--line); scroll-margin-top:1rem }
 @media screen { .interference { content-visibility:auto; contain-intrinsic-size:auto 30rem } }
@@ -465,7 +502,7 @@ h2 { display:flex; flex-wrap:wrap; align-items:baseline; gap:.3rem .9rem; margin
 .body { display:grid; grid-template-columns:minmax(0,3fr) minmax(0,2fr); gap:1.8rem }
 .details:first-child { grid-column:1/-1 }
 .picture { margin:0 } .picture > a img { display:block; width:100%; height:auto; aspect-ratio:756/506; object-fit:contain; border:1px solid var(--line) }
-.thumbnails { display:flex; flex-wrap:wrap; gap:.4rem; margin-top:.4rem }
+.thumbnails { display:flex; flex-wrap:wrap; gap:.4rem; margin-top:.4rem } .thumbnails img { display:block; width:72px; height:50px; border:1px solid var(--line) }
 .card { display:flex; gap:.9rem; align-items:flex-start; margin-bottom:1rem } .card a { flex:none }
 .note { color:var(--soft); font-size:.85rem }
 details { margin-top:1rem; font-size:.85rem } summary { cursor:pointer; color:var(--soft) }
@@ -478,7 +515,7 @@ dialog::backdrop { background:#000c }
   :root { --ink:#000; --soft:#444; --line:#bbb; --paper:#fff; --panel:#f3f3f3; --accent:#000; --clash:#b3261e; --contact:#9a6200; --clearance:#1f6f9f; --relevant:#7a4fa3; --irrelevant:#8b959e; --open:#3d7a5a; --other:#6f7780 }
   body { max-width:none; padding:0; font-size:10pt; print-color-adjust:exact; -webkit-print-color-adjust:exact }
   .filters,.filters[hidden] { display:none } .wide { overflow:visible } thead { display:table-header-group } tr,.card,.picture { break-inside:avoid }
-  th button { display:contents } table { font-size:8pt } .thumb img { width:60px; height:40px } td.products { min-width:0; width:45% } td.comment { min-width:0 }
+  th button { display:contents } table { font-size:8pt } .thumb img { width:60px; height:40px } td.products { width:40% }
   .body { grid-template-columns:minmax(0,1fr) minmax(0,1fr) } .status { margin-left:auto }
   .interference { break-inside:avoid; margin-top:1rem; padding-top:.7rem } h2 { margin-bottom:.6rem }
   blockquote,details ol { max-height:none; overflow:visible }
@@ -550,26 +587,45 @@ dialog::backdrop { background:#000c }
     header.replaceChildren(button);
   });
 
+  // Each row and section says when it comes near to being seen; those that are there already said so before.
+  const putIn = place => {
+    for (const later of place.querySelectorAll('noscript.later'))
+      later.replaceWith(new DOMParser().parseFromString(later.textContent, 'text/html').body.firstChild);
+  };
+  if ('oncontentvisibilityautostatechange' in document) {
+    const places = rows.flatMap(({ row, section }) => [row, section]);
+    const putInWhatIsNear = () => {
+      for (const place of places) {
+        const { top, bottom } = place.getBoundingClientRect();
+        if (bottom > -innerHeight &amp;&amp; top &lt; 2 * innerHeight) putIn(place);
+      }
+    };
+    for (const place of places)
+      place.addEventListener('contentvisibilityautostatechange', event => { if (!event.skipped) putIn(place); });
+    putInWhatIsNear();
+    addEventListener('load', putInWhatIsNear);
+    addEventListener('beforeprint', () => putIn(document));
+  } else putIn(document);
+
   const dialog = document.createElement('dialog');
   const large = document.createElement('img');
-  let current = 0;
+  let current = null, all = null;
   const links = () => Array.from(document.querySelectorAll('a.zoom')).filter(link => !link.closest('[hidden]'));
-  const show = link => { large.src = link.href; large.alt = link.firstElementChild.alt; };
+  const show = link => { current = link; large.src = link.href; large.alt = link.firstElementChild.alt || ''; };
   dialog.append(large);
   dialog.addEventListener('click', () => dialog.close());
   dialog.addEventListener('keydown', event => {
     const step = { ArrowRight: 1, ArrowLeft: -1 }[event.key];
     if (!step) return;
-    const all = links();
-    current = (current + step + all.length) % all.length;
-    show(all[current]);
+    all ??= links();
+    show(all[(all.indexOf(current) + step + all.length) % all.length]);
   });
   document.body.append(dialog);
   document.addEventListener('click', event => {
     const link = event.target.closest('a.zoom');
     if (!link || event.ctrlKey || event.metaKey || event.shiftKey || event.button) return;
     event.preventDefault();
-    current = links().indexOf(link);
+    all = null;
     show(link);
     dialog.showModal();
   });

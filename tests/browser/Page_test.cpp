@@ -165,6 +165,27 @@ TEST_F(Page, SmallPicturesLoadAndShowLargeByAClick) {
             "72x50 interference_1_SubItf_1.png");
 }
 
+TEST_F(Page, PicturesOfManyArePutInWhereTheyAreSeen) {
+  std::string sheet = ReadFile(ZOR_SOURCE_DIR "/resources/clash-page.xsl");
+  const std::string limit = "name=\"mostLazy\" select=\"1000\"";
+  ASSERT_NE(sheet.find(limit), std::string::npos);
+  sheet.replace(sheet.find(limit), limit.size(), "name=\"mostLazy\" select=\"10\"");
+  ASSERT_EQ(
+      RunCommand({"publish", "samples/as1.clash.xml", "--model", "samples/as1-oc-214.stp", "--size",
+                  "60x40", "--xsl", directory_->Write("many.xsl", sheet), "-o", PathOf("many")})
+          .code,
+      0);
+  EXPECT_EQ(
+      After("many",
+            "const last = document.querySelector('#i32');\n"
+            "const first = () => document.querySelectorAll('tbody tr:first-child img').length;\n"
+            "const state = () => last.querySelectorAll('img').length + ' ' + "
+            "(document.querySelectorAll('main img').length < 128);\n"
+            "setTimeout(() => { const before = state(); last.scrollIntoView();\n"
+            "setTimeout(() => say([first(), before, state()]), 1000); }, 1000);"),
+      "1,0 true,3 true");
+}
+
 TEST_F(Page, EveryPictureLoads) {
   EXPECT_EQ(
       After("as1",
