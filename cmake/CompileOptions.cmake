@@ -10,3 +10,9 @@ if(ZOR_SANITIZE)
   # The sanitizers' own code makes the compiler see uninitialised values in the standard library. The other builds warn.
   target_compile_options(zor_compile_options INTERFACE -Wno-maybe-uninitialized)
 endif()
+
+# zor_compile_lightly(file…): what runs once and takes long to compile, such as the reading of a command line, is not
+# optimised to the last.
+function(zor_compile_lightly)
+  set_source_files_properties(${ARGN} PROPERTIES COMPILE_OPTIONS "$<$<CONFIG:Release>:-O1>")
+endfunction()
