@@ -472,7 +472,7 @@ h1 { margin:.1rem 0 1rem; font-size:1.9rem; line-height:1.2; font-weight:650 }
 .filters { display:flex; flex-wrap:wrap; gap:.6rem 1.2rem; align-items:center; margin:2rem 0 .6rem; color:var(--soft); font-size:.85rem }
 .filters[hidden] { display:none }
 .filters input,.filters select { font:inherit; color:var(--ink); background:var(--panel); border:1px solid var(--line); border-radius:.35rem; padding:.3rem .5rem; margin-left:.3rem; max-width:16rem }
-@media screen { h1,.facts dd,h2 > *,.card strong,.card .note,figcaption { max-height:9em; overflow:auto } h1 { max-height:7.2em } .card strong { display:inline-block; vertical-align:top } }
+@media screen { h1,.facts dd,h2 > *,.card strong,.card .note,figcaption { max-height:9em; overflow:auto } h1 { max-height:7.2em } }
 .filters output { margin-left:auto }
 .wide { overflow-x:auto; margin-top:1rem }
 table { border-collapse:collapse; width:100%; font-size:.9rem }
@@ -503,6 +503,7 @@ h2 { display:flex; flex-wrap:wrap; align-items:baseline; gap:.3rem .9rem; margin
 .details:first-child { grid-column:1/-1 }
 .picture { margin:0 } .picture > a img { display:block; width:100%; height:auto; aspect-ratio:756/506; object-fit:contain; border:1px solid var(--line) }
 .thumbnails { display:flex; flex-wrap:wrap; gap:.4rem; margin-top:.4rem } .thumbnails img { display:block; width:72px; height:50px; border:1px solid var(--line) }
+.card .product { display:flex; gap:.4rem; align-items:baseline } .card .swatch,.card .missing { flex:none; margin:0 } .card strong { min-width:0 }
 .card { display:flex; gap:.9rem; align-items:flex-start; margin-bottom:1rem } .card a { flex:none }
 .note { color:var(--soft); font-size:.85rem }
 details { margin-top:1rem; font-size:.85rem } summary { cursor:pointer; color:var(--soft) }
@@ -587,25 +588,22 @@ dialog::backdrop { background:#000c }
     header.replaceChildren(button);
   });
 
-  // Each row and section says when it comes near to being seen; those that are there already said so before.
+  // Pictures of many are put in when their row or section comes near to being seen.
   const putIn = place => {
     for (const later of place.querySelectorAll('noscript.later'))
       later.replaceWith(new DOMParser().parseFromString(later.textContent, 'text/html').body.firstChild);
   };
-  if ('oncontentvisibilityautostatechange' in document) {
-    const places = rows.flatMap(({ row, section }) => [row, section]);
-    const putInWhatIsNear = () => {
-      for (const place of places) {
-        const { top, bottom } = place.getBoundingClientRect();
-        if (bottom > -innerHeight &amp;&amp; top &lt; 2 * innerHeight) putIn(place);
+  if (document.querySelector('noscript.later')) {
+    const near = new IntersectionObserver(entries => {
+      for (const { isIntersecting, target } of entries) {
+        if (!isIntersecting) continue;
+        putIn(target);
+        near.unobserve(target);
       }
-    };
-    for (const place of places)
-      place.addEventListener('contentvisibilityautostatechange', event => { if (!event.skipped) putIn(place); });
-    putInWhatIsNear();
-    addEventListener('load', putInWhatIsNear);
+    }, { rootMargin: '100%' });
+    for (const { row, section } of rows) for (const place of [row, section]) near.observe(place);
     addEventListener('beforeprint', () => putIn(document));
-  } else putIn(document);
+  }
 
   const dialog = document.createElement('dialog');
   const large = document.createElement('img');
