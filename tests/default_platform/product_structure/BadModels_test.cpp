@@ -1,5 +1,6 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include <filesystem>
 
@@ -117,6 +118,22 @@ TEST(BadModels, GltfWithoutGeometry) {
 TEST(BadModels, ObjWithoutFaces) {
   const Folder folder;
   EXPECT_NE(ReasonOf(folder.Write("a.obj", "hello\n")), "");
+}
+
+TEST(BadModels, ObjWithAPipeForItsMaterials) {
+  const Folder folder;
+  ASSERT_EQ(mkfifo((folder.GetPath() + "/pipe").c_str(), 0600), 0);
+  const std::string path =
+      folder.Write("a.obj", "v 0 0 0\nv 1 0 0\nv 0 1 0\nmtllib  pipe \nf 1 2 3\n");
+  EXPECT_EQ(ReasonOf(path), "names pipe, which is no file");
+}
+
+TEST(BadModels, GltfWithAPipeForItsBuffer) {
+  const Folder folder;
+  ASSERT_EQ(mkfifo((folder.GetPath() + "/pipe").c_str(), 0600), 0);
+  EXPECT_EQ(ReasonOf(folder.Write("a.gltf", R"({"asset":{"version":"2.0"},
+      "buffers":[{"uri":"p\u0069pe","byteLength":36}]})")),
+            "names pipe, which is no file");
 }
 
 TEST(BadModels, StlCutOff) {

@@ -1,6 +1,7 @@
 // Surface formats in all their variants, written by the geometry kernel and opened again.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include <cmath>
 #include <filesystem>
@@ -237,6 +238,15 @@ TEST(SplitStep, MissingOtherFileIsWarnedOf) {
   EXPECT_THAT(WarningsOf(path), testing::IsEmpty());
   fs::remove(folder.GetPath() + "/ball.stp");
   EXPECT_THAT(WarningsOf(path), ElementsAre(path + ": its file ball.stp is missing"));
+}
+
+TEST(SplitStep, PipeInPlaceOfAnotherFileIsRefused) {
+  const Folder folder;
+  const std::string path = folder.GetPath() + "/frame.step";
+  products::WriteStep(path, {.isSplit = true});
+  fs::remove(folder.GetPath() + "/ball.stp");
+  ASSERT_EQ(mkfifo((folder.GetPath() + "/ball.stp").c_str(), 0600), 0);
+  EXPECT_EQ(products::ReasonOf(path), "names ball.stp, which is no file");
 }
 
 TEST_P(IgesUnits, BecomeMillimetres) {

@@ -1,27 +1,14 @@
 #include "default_platform/product_structure/model_reader/GltfScales.h"
 
 #include <cmath>
-#include <cstdint>
-#include <cstring>
-#include <fstream>
-#include <iterator>
 #include <nlohmann/json.hpp>
+
+#include "default_platform/product_structure/model_reader/GltfScene.h"
 
 namespace ZORDefault {
 namespace {
 
 constexpr double kTolerance = 1e-5;
-
-/// The scene's text: the whole file, or the first chunk of a binary one.
-std::string ReadScene(const std::string& inPath) {
-  constexpr std::size_t kLengthAt = 12, kTextAt = 20;
-  std::ifstream file(inPath, std::ios::binary);
-  std::string bytes((std::istreambuf_iterator<char>(file)), {});
-  if (!bytes.starts_with("glTF") || bytes.size() < kTextAt) return bytes;
-  std::uint32_t length = 0;
-  std::memcpy(&length, bytes.data() + kLengthAt, sizeof length);
-  return bytes.substr(kTextAt, length);
-}
 
 bool IsOne(double inScale) { return std::abs(inScale - 1) < kTolerance; }
 
@@ -52,7 +39,7 @@ bool IsScaled(const nlohmann::json& inNode) {
 std::size_t CountScaledNodes(const std::string& inPath) {
   std::size_t count = 0;
   try {
-    const auto scene = nlohmann::json::parse(ReadScene(inPath));
+    const auto scene = nlohmann::json::parse(ReadGltfScene(inPath));
     for (const auto& node : scene.value("nodes", nlohmann::json::array()))
       count += IsScaled(node) ? 1 : 0;
   } catch (const nlohmann::json::exception&) {

@@ -10,6 +10,7 @@
 #include "default_platform/product_structure/ModelReaderEntry.h"
 #include "default_platform/product_structure/model_reader/DocumentReading.h"
 #include "default_platform/product_structure/model_reader/GltfScales.h"
+#include "default_platform/product_structure/model_reader/NamedFiles.h"
 #include "default_platform/product_structure/model_reader/PartMeshing.h"
 #include "default_platform/product_structure/model_reader/TreeWalk.h"
 
@@ -104,6 +105,10 @@ bool HasGeometry(const ModelData& inModel) {
 }
 
 bool Read(const ModelRequest& inRequest, ModelData& outModel, std::string& outReason) {
+  if (const std::string file = FindEndlessFile(inRequest); !file.empty()) {
+    outReason = OneLine(("names " + file + ", which is no file").c_str());
+    return false;
+  }
   PrepareReaders();
   Handle(Progress) progress = new Progress(inRequest.progress);
   Message_ProgressScope scope(progress->Start(), nullptr, kReadingShare + kMeshingShare);
