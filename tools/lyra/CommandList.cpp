@@ -48,17 +48,23 @@ ListFilter FilterOf(const ListOptions& inOptions) {
   return filter;
 }
 
+/// What a row needs.
+RecordPart PartFor(const ListFilter& inFilter) {
+  return inFilter.NeedsLabels() ? RecordPart::kAll : RecordPart::kRow;
+}
+
 template <class Visit>
-void ForEachAccepted(ClashResultFile& ioFile, const ListFilter& inFilter, const Visit& inVisit) {
+void ForEachAccepted(ClashResultFile& ioFile, const ListFilter& inFilter, RecordPart inPart,
+                     const Visit& inVisit) {
   ForEachInterference(ioFile, [&](const PlacedInterference& inPlaced) {
-    const InterferenceRecord record = ReadInterference(ioFile, inPlaced);
+    const InterferenceRecord record = ReadInterference(ioFile, inPlaced, inPart);
     if (inFilter.Accepts(record)) inVisit(record);
   });
 }
 
 void PrintJson(ClashResultFile& ioFile, const ListFilter& inFilter, Output& ioOutput) {
   JsonArray array(ioOutput);
-  ForEachAccepted(ioFile, inFilter,
+  ForEachAccepted(ioFile, inFilter, RecordPart::kAll,
                   [&](const InterferenceRecord& inRecord) { array.Add(inRecord); });
   array.Finish();
   ioOutput.Write("\n");
@@ -66,7 +72,7 @@ void PrintJson(ClashResultFile& ioFile, const ListFilter& inFilter, Output& ioOu
 
 void PrintCsv(ClashResultFile& ioFile, const ListFilter& inFilter, Output& ioOutput) {
   ioOutput.Write(CsvRow(Headers()));
-  ForEachAccepted(ioFile, inFilter, [&](const InterferenceRecord& inRecord) {
+  ForEachAccepted(ioFile, inFilter, PartFor(inFilter), [&](const InterferenceRecord& inRecord) {
     std::vector<std::string> cells = Cells(inRecord);
     // On its way to a program a text stays as it is; a terminal must not be driven by it.
     if (ioOutput.IsTerminal())
@@ -81,7 +87,7 @@ void PrintTable(ClashResultFile& ioFile, const ListFilter& inFilter, Output& ioO
   columns[0].align = columns[2].align = TableColumn::Align::kRight;
   columns[5].cut = columns[6].cut = Cut::kStart;  // what tells products apart is at their ends
   Table table(columns);
-  ForEachAccepted(ioFile, inFilter,
+  ForEachAccepted(ioFile, inFilter, PartFor(inFilter),
                   [&](const InterferenceRecord& inRecord) { table.Add(Cells(inRecord)); });
   table.Print(ioOutput);
 }

@@ -122,9 +122,24 @@ std::optional<ViewpointRecord> ViewpointOf(const ReaderTexts& inTexts) {
   return viewpoint;
 }
 
+// What is read from the document itself, beside the reader's texts.
+void ReadTheRest(ClashResultFile& ioFile, const PlacedInterference& inPlaced,
+                 const std::array<DOM_Node, 2>& inProducts, InterferenceRecord& ioRecord) {
+  const std::array<ZORUnicodeString, 2> labels = Labels(ioFile.Reader(), inPlaced);
+  for (std::size_t i = 0; i < 2; ++i) {
+    if (inProducts[i].isNull()) continue;
+    ioRecord.products[i].label = Utf8(labels[i]);
+    ioRecord.products[i].preview = AttributeText(inProducts[i], "Preview");
+    ioRecord.products[i].position = ReadPlacement(inProducts[i]);
+  }
+  ioRecord.picture = AttributeText(FirstElement(inPlaced.element, "Picture"), "HRef");
+  ioRecord.points = ReadPoints(inPlaced.element);
+}
+
 }  // namespace
 
-InterferenceRecord ReadInterference(ClashResultFile& ioFile, const PlacedInterference& inPlaced) {
+InterferenceRecord ReadInterference(ClashResultFile& ioFile, const PlacedInterference& inPlaced,
+                                    RecordPart inPart) {
   ReaderTexts texts;
   // A violated rule's computation type replaces that of the result set.
   texts.computationType = FromUtf8(AttributeText(inPlaced.set, "ComputationCase"));
@@ -144,26 +159,25 @@ InterferenceRecord ReadInterference(ClashResultFile& ioFile, const PlacedInterfe
   record.retrieve = Utf8(texts.retrieve);
 
   const std::array<DOM_Node, 2> products = ProductElements(inPlaced.element);
-  const std::array<ZORUnicodeString, 2> labels = Labels(ioFile.Reader(), inPlaced);
   for (std::size_t i = 0; i < 2; ++i) {
     if (products[i].isNull()) continue;
     record.products[i] = {Utf8(texts.id[i]),
                           AttributeText(products[i], "Alias"),
                           Utf8(texts.instance[i]),
-                          Utf8(labels[i]),
+                          "",
                           Utf8(texts.alien[i]),
                           Utf8(texts.processMode[i]),
                           Utf8(texts.shape[i]),
                           Utf8(texts.source[i]),
-                          AttributeText(products[i], "Preview"),
-                          ReadPlacement(products[i])};
+                          "",
+                          std::nullopt};
   }
   record.comment = Utf8(texts.comment);
-  record.picture = AttributeText(FirstElement(inPlaced.element, "Picture"), "HRef");
+  if (inPart == RecordPart::kRow) return record;
   record.curveLength = Utf8(texts.curveLength);
   record.distance = Utf8(texts.distance);
-  record.points = ReadPoints(inPlaced.element);
   record.viewpoint = ViewpointOf(texts);
+  ReadTheRest(ioFile, inPlaced, products, record);
   return record;
 }
 

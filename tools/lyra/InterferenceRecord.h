@@ -41,7 +41,12 @@ struct InterferenceRecord {
   std::optional<ViewpointRecord> viewpoint;
 };
 
-InterferenceRecord ReadInterference(ClashResultFile& ioFile, const PlacedInterference& inPlaced);
+/// kRow: what a row of a list shows and is chosen by; labels, previews, placements, points, viewpoint
+/// and picture stay empty, which saves a third of the reading.
+enum class RecordPart { kAll, kRow };
+
+InterferenceRecord ReadInterference(ClashResultFile& ioFile, const PlacedInterference& inPlaced,
+                                    RecordPart inPart = RecordPart::kAll);
 
 }  // namespace lyra
 

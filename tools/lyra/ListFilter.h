@@ -25,6 +25,8 @@ class ListFilter {
   /// A text that the alias, id, instance or label of one of the products holds in any letter case.
   void SetProduct(const std::string& inText);
 
+  /// Whether Accepts looks at the products' labels.
+  bool NeedsLabels() const { return product_.has_value(); }
   bool Accepts(const InterferenceRecord& inRecord) const;
 
  private:
