@@ -18,11 +18,6 @@ namespace {
 
 constexpr int kLargestSize = 16384;
 
-/// Of the view words after "iso".
-const PictureView kViews[] = {{{0, 1, 0}, {0, 0, 1}},  {{0, -1, 0}, {0, 0, 1}},
-                              {{1, 0, 0}, {0, 0, 1}},  {{-1, 0, 0}, {0, 0, 1}},
-                              {{0, 0, -1}, {0, 1, 0}}, {{0, 0, 1}, {0, -1, 0}}};
-
 /// @return 0 for what is no whole number or out of range.
 int PixelCount(std::string_view inText) {
   int count = 0;
@@ -75,7 +70,10 @@ PictureSize SizeOf(const std::string& inText) {
 std::optional<PictureView> ViewOf(const std::string& inWord) {
   const std::size_t place = ChosenWord("--view", inWord, kViewWords);
   if (place == 0) return std::nullopt;
-  return kViews[place - 1];
+  static const PictureView views[] = {{{0, 1, 0}, {0, 0, 1}},  {{0, -1, 0}, {0, 0, 1}},
+                                      {{1, 0, 0}, {0, 0, 1}},  {{-1, 0, 0}, {0, 0, 1}},
+                                      {{0, 0, -1}, {0, 1, 0}}, {{0, 0, 1}, {0, -1, 0}}};
+  return views[place - 1];
 }
 
 void TakePicture(ZOR3DRep& inRep, const PictureWishes& inWishes, const std::string& inPath) {

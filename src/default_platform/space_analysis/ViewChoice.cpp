@@ -2,7 +2,9 @@
 
 #include <algorithm>
 #include <cstdint>
+#include <functional>
 #include <memory>
+#include <utility>
 
 #include "default_platform/space_analysis/InterferenceRep.h"
 #include "default_platform/space_analysis/Vectors.h"
@@ -58,11 +60,36 @@ const std::vector<ZORMathVector>& Directions() {
   return directions;
 }
 
+/// All around, evenly: on a spiral from pole to pole by the golden angle.
+std::vector<ZORMathVector> ManyDirections() {
+  constexpr int kCount = 100;
+  constexpr double kGoldenAngle = 2.39996322972865332;
+  std::vector<ZORMathVector> all;
+  for (int i = 0; i < kCount; ++i) {
+    const double z = 1 - (2 * i + 1.0) / kCount, r = std::sqrt(1 - z * z);
+    all.push_back({r * std::cos(kGoldenAngle * i), r * std::sin(kGoldenAngle * i), z});
+  }
+  return all;
+}
+
 /// How many pixels show each product and all else.
 struct SeenThings {
   int products[2] = {0, 0};
   int markers = 0;
 };
+
+ChosenView ViewFrom(const ZORMathVector& inSight, const ZORMathVector& inCentre, double inRadius,
+                    bool inIsDimension) {
+  return {{inRadius, inSight, UpFor(inSight), inIsDimension}, {inCentre, inRadius}};
+}
+
+ZOR3DViewpoint Framing(const MarkerStyle& inStyle, const ZOR3DBoundingSphere& inFramed) {
+  ZOR3DViewpoint viewpoint;
+  viewpoint.sight = inStyle.sight;
+  viewpoint.up = inStyle.up;
+  viewpoint.Reframe(kWidth, kHeight, 1, 1, inFramed);
+  return viewpoint;
+}
 
 /// Small pictures of the products.
 class ViewTrial {
@@ -77,6 +104,11 @@ class ViewTrial {
     }
   }
 
+  /// Pixels of the product that is seen less. Markers do not count: they are drawn over all else.
+  int ScoreOf(const ChosenView& inView) const {
+    const SeenThings seen = See(Framing(inView.markers, inView.framed));
+    return std::min(seen.products[0], seen.products[1]);
+  }
   SeenThings See(const ZOR3DViewpoint& inViewpoint) const {
     return Count(SeePixels(*scene_, inViewpoint, width_, height_));
   }
@@ -108,19 +140,6 @@ class ViewTrial {
   std::array<std::size_t, 2> meshCounts_{};
 };
 
-/// Pixels of the product that is seen less. Markers do not count: they are drawn over all else.
-int ScoreOf(const SeenThings& inSeen) {
-  return std::min({inSeen.products[0], inSeen.products[1], kPlenty});
-}
-
-ZOR3DViewpoint Framing(const MarkerStyle& inStyle, const ZOR3DBoundingSphere& inFramed) {
-  ZOR3DViewpoint viewpoint;
-  viewpoint.sight = inStyle.sight;
-  viewpoint.up = inStyle.up;
-  viewpoint.Reframe(kWidth, kHeight, 1, 1, inFramed);
-  return viewpoint;
-}
-
 /// Radii to frame around the points, the preferred one first, the last one around all.
 std::vector<double> RadiiAround(const ZOR3DBoundingSphere& inPoints,
                                 const ShownProducts& inProducts) {
@@ -141,6 +160,30 @@ std::vector<double> RadiiAround(const ZOR3DBoundingSphere& inPoints,
   return radii;
 }
 
+/// Where a product is hidden nearly everywhere: more directions in larger pictures, and closer from
+/// where it is seen most.
+ChosenView LookClosely(const ShownProducts& inProducts, const ChosenView& inBest, double inRadius) {
+  const ViewTrial trial(inProducts, 2 * kWidth, 2 * kHeight);
+  ChosenView best = inBest;
+  int bestScore = trial.ScoreOf(best);
+  const auto look = [&](const ZORMathVector& inSight, double inShare) {
+    const ChosenView tried =
+        ViewFrom(inSight, inBest.framed.centre, inShare * inRadius, inBest.markers.isDimension);
+    const int score = trial.ScoreOf(tried);
+    if (score > bestScore) best = tried;
+    bestScore = std::max(bestScore, score);
+    return score;
+  };
+  std::vector<std::pair<int, ZORMathVector>> sights;
+  for (const ZORMathVector& sight : ManyDirections()) sights.emplace_back(look(sight, 1), sight);
+  constexpr std::size_t kMost = 8;
+  std::ranges::partial_sort(sights, sights.begin() + kMost, std::ranges::greater(),
+                            &std::pair<int, ZORMathVector>::first);
+  for (std::size_t i = 0; i < kMost; ++i)
+    for (const double share : {0.5, 0.25, 0.125}) look(sights[i].second, share);
+  return best;
+}
+
 }  // namespace
 
 ZORMathVector UpFor(const ZORMathVector& inSight) {
@@ -153,26 +196,22 @@ ChosenView ChooseView(const ShownProducts& inProducts, const std::vector<ZORMath
                       bool inIsDimension) {
   const ZOR3DBoundingSphere points = SphereOf(inPoints);
   const std::vector<double> radii = RadiiAround(points, inProducts);
-  const auto view = [&](const ZORMathVector& inSight, double inRadius) {
-    return ChosenView{{inRadius, inSight, UpFor(inSight), inIsDimension},
-                      {points.centre, inRadius}};
-  };
-  ChosenView best = view(DefaultSight(), radii.front());
+  ChosenView best = ViewFrom(DefaultSight(), points.centre, radii.front(), inIsDimension);
   if (!inProducts[0] || !inProducts[1]) return best;
   const ViewTrial trial(inProducts, kWidth, kHeight);
   int bestScore = 0;
   for (const double radius : radii) {
     for (const ZORMathVector& sight : Directions()) {
-      const ChosenView tried = view(sight, radius);
-      const int score = ScoreOf(trial.See(Framing(tried.markers, tried.framed)));
+      const ChosenView tried = ViewFrom(sight, points.centre, radius, inIsDimension);
+      const int score = trial.ScoreOf(tried);
       if (score <= bestScore) continue;
       bestScore = score;
       best = tried;
       if (score >= kPlenty) return best;
     }
-    if (bestScore >= kTooFew) break;
+    if (bestScore >= kTooFew) return best;
   }
-  return best;
+  return LookClosely(inProducts, best, radii.front());
 }
 
 void LengthenPins(const ShownProducts& inProducts, const std::vector<ZORMathVector>& inPoints,
