@@ -517,6 +517,7 @@ dialog::backdrop { background:#000c }
   body { max-width:none; padding:0; font-size:10pt; print-color-adjust:exact; -webkit-print-color-adjust:exact }
   .filters,.filters[hidden] { display:none } .wide { overflow:visible } thead { display:table-header-group } tr,.card,.picture { break-inside:avoid }
   th button { display:contents } table { font-size:8pt } .thumb img { width:60px; height:40px } td.products { width:40% }
+  td:nth-last-child(6) { min-width:6.5em } td:nth-last-child(4) { min-width:8em } td:nth-last-child(2) { min-width:5.5em }
   .body { grid-template-columns:minmax(0,1fr) minmax(0,1fr) } .status { margin-left:auto }
   .interference { break-inside:avoid; margin-top:1rem; padding-top:.7rem } h2 { margin-bottom:.6rem }
   blockquote,details ol { max-height:none; overflow:visible }
