@@ -4,6 +4,8 @@
 #include <sys/stat.h>
 #ifdef _WIN32
 #include <io.h>
+
+#include <cstdio>
 #else
 #include <unistd.h>
 #endif

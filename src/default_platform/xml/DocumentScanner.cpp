@@ -53,7 +53,8 @@ DocumentScanner::DocumentScanner(ScannerMemory& ioMemory, ByteReader& ioReader, 
   setDisableDefaultEntityResolution(true);
   setExitOnFirstFatalError(true);
   limits_.setEntityExpansionLimit(kMostExpansions);
-  setSecurityManager(&limits_);
+  // The plain scanner knows no entities but "&amp;" and its like, yet would count these.
+  if (kind_ == kAny) setSecurityManager(&limits_);
   // The handlers are never called, since this class answers first; they make the scanner report.
   setDocumentHandler(&unused_);
   setDTDHandler(&unused_);
