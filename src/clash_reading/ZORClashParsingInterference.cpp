@@ -8,6 +8,7 @@
 #include "clash_reading/NamedConstants.h"
 #include "clash_reading/ZORClashDocumentIndex.h"
 #include "platform/system/ZORToken.h"
+#include "platform/xml/DOM_NamedNodeMap.h"
 
 namespace {
 
@@ -18,21 +19,38 @@ std::u16string_view UnitsOf(const ZORUnicodeString& inText) {
   return {inText.ConvertToUCChar(), static_cast<std::size_t>(inText.GetLengthInChar())};
 }
 
-// An attribute that holds a number, with its decimal comma made a point. Only the first comma is
-// one.
-ZORUnicodeString NumberText(const DOM_Node& inNode, const char* inName) {
-  ZORUnicodeString text = ZORLyraGeneralServices::GetAttrOnNode(inNode, inName);
-  if (UnitsOf(text).find(u',') != std::u16string_view::npos) text.ReplaceSubString(",", ".");
-  return text;
-}
+// What an element says in its attributes, asked for once for all that are read of it.
+class ElementAttributes {
+ public:
+  explicit ElementAttributes(const DOM_Node& inElement) : attributes_(inElement.getAttributes()) {}
+
+  // Empty where the attribute is missing.
+  ZORUnicodeString Text(const char* inName) const {
+    return ZORLyraGeneralServices::GetDOMName(attributes_.getNamedItem(inName).getNodeValue());
+  }
+  ZORUnicodeString Text(const ZORUnicodeString& inName) const {
+    return Text(inName.ConvertToChar());
+  }
+  // An attribute that holds a number, with its decimal comma made a point. Only the first comma is
+  // one.
+  ZORUnicodeString Number(const char* inName) const {
+    ZORUnicodeString text = Text(inName);
+    if (UnitsOf(text).find(u',') != std::u16string_view::npos) text.ReplaceSubString(",", ".");
+    return text;
+  }
+
+ private:
+  DOM_NamedNodeMap attributes_;
+};
 
 void AppendPoint(const DOM_Node& inPoint, ZORUnicodeString& ioPoints) {
+  const ElementAttributes attributes(inPoint);
   if (ioPoints.GetLengthInChar() != 0) ioPoints += "/";
-  ioPoints += NumberText(inPoint, "Ux");
+  ioPoints += attributes.Number("Ux");
   ioPoints += "/";
-  ioPoints += NumberText(inPoint, "Uy");
+  ioPoints += attributes.Number("Uy");
   ioPoints += "/";
-  ioPoints += NumberText(inPoint, "Uz");
+  ioPoints += attributes.Number("Uz");
 }
 
 // The last segment of a path; empty where a segment is empty or holds a line feed, since there the
@@ -171,60 +189,66 @@ void ZORClashParsing::GetInterferenceDataV12(
     ZORUnicodeString& outSightY, ZORUnicodeString& outSightZ, ZORUnicodeString&, ZORUnicodeString&,
     ZORUnicodeString&) {
   const InterferenceWords words;
+  const ElementAttributes interference(inInterference);
   outResultType = words.ResultType(inInterference);
-  outClearance = NumberText(inInterference, "DistanceClearance");
-  outStatus = words.Status(GetAttrOnNode(inInterference, "Status"));
-  outRetrieve = words.Retrieve(GetAttrOnNode(inInterference, "RetrieveInf"));
+  outClearance = interference.Number("DistanceClearance");
+  outStatus = words.Status(interference.Text("Status"));
+  outRetrieve = words.Retrieve(interference.Text("RetrieveInf"));
   outPoints = ZORUnicodeString();
   outProjection = "NOVIEWPOINT";
 
   const auto readRule = [&](const DOM_Node& inRule) {
-    outRuleName = GetAttrOnNode(inRule, names::Name.ConvertToChar());
-    outRuleClearance = NumberText(inRule, "Clearance");
-    outComputationType = GetAttrOnNode(inRule, "TypeCalc");
-    outSeverity = GetAttrOnNode(inRule, "Severity");
-    outPenetrationCandidate = GetAttrOnNode(inRule, "PenetrationCandidate");
+    const ElementAttributes rule(inRule);
+    outRuleName = rule.Text(names::Name);
+    outRuleClearance = rule.Number("Clearance");
+    outComputationType = rule.Text("TypeCalc");
+    outSeverity = rule.Text("Severity");
+    outPenetrationCandidate = rule.Text("PenetrationCandidate");
   };
   // The first product leaves its Alien flag filled, and that is how the second is told from it.
   const auto readProduct = [&](const DOM_Node& inProduct) {
+    const ElementAttributes product(inProduct);
     const bool first = ioFirstAlien.GetLengthInChar() == 0;
-    const ZORUnicodeString identifier = GetAttrOnNode(inProduct, "DescriptionID");
-    ZORUnicodeString alien = GetAttrOnNode(inProduct, names::Alien.ConvertToChar());
+    const ZORUnicodeString identifier = product.Text("DescriptionID");
+    ZORUnicodeString alien = product.Text(names::Alien);
     if (alien.GetLengthInChar() == 0) alien = "YES";
-    const ZORUnicodeString processMode = GetAttrOnNode(inProduct, "ProcessMode");
-    (first ? outFirstInstance : outSecondInstance) =
-        processMode == kManagedByPdm ? GetAttrOnNode(inProduct, names::Alias.ConvertToChar())
-                                     : GetInstanceNameFromDID(identifier);
+    const ZORUnicodeString processMode = product.Text("ProcessMode");
+    (first ? outFirstInstance : outSecondInstance) = processMode == kManagedByPdm
+                                                         ? product.Text(names::Alias)
+                                                         : GetInstanceNameFromDID(identifier);
     (first ? outFirstDescriptionId : outSecondDescriptionId) = identifier;
     (first ? ioFirstAlien : outSecondAlien) = alien;
-    (first ? outFirstShapeSource : outSecondShapeSource) = GetAttrOnNode(inProduct, "ShapeSource");
+    (first ? outFirstShapeSource : outSecondShapeSource) = product.Text("ShapeSource");
     (first ? outFirstDescriptionIdAgain : outSecondDescriptionIdAgain) = identifier;
     (first ? outFirstProcessMode : outSecondProcessMode) = processMode;
-    (first ? outFirstShapeName : outSecondShapeName) =
-        GetAttrOnNode(inProduct, names::ShapeName.ConvertToChar());
+    (first ? outFirstShapeName : outSecondShapeName) = product.Text(names::ShapeName);
   };
   const auto readViewpoint = [&](const DOM_Node& inViewpoint) {
-    outFocusDistance = GetAttrOnNode(inViewpoint, "FocusDistance");  // its comma stays
-    outNearPlane = NumberText(inViewpoint, "NearPlane");
-    outFarPlane = NumberText(inViewpoint, "FarPlane");
-    outProjection = NumberText(inViewpoint, "ProjectionType");
+    const ElementAttributes viewpoint(inViewpoint);
+    outFocusDistance = viewpoint.Text("FocusDistance");  // its comma stays
+    outNearPlane = viewpoint.Number("NearPlane");
+    outFarPlane = viewpoint.Number("FarPlane");
+    outProjection = viewpoint.Number("ProjectionType");
     ForEachElement(inViewpoint, "Point", [&](const DOM_Node& inPoint) {
-      outViewpointX = NumberText(inPoint, "Ux");
-      outViewpointY = NumberText(inPoint, "Uy");
-      outViewpointZ = NumberText(inPoint, "Uz");
+      const ElementAttributes point(inPoint);
+      outViewpointX = point.Number("Ux");
+      outViewpointY = point.Number("Uy");
+      outViewpointZ = point.Number("Uz");
     });
     // No document carries a second vector under another name: the last three outputs stay the
     // caller's.
     ForEachElement(inViewpoint, "Vector", [&](const DOM_Node& inVector) {
-      if (GetAttrOnNode(inVector, "CorrespondingData") != "Sight") return;
-      outSightX = NumberText(inVector, "Vx");
-      outSightY = NumberText(inVector, "Vy");
-      outSightZ = NumberText(inVector, "Vz");
+      const ElementAttributes vector(inVector);
+      if (vector.Text("CorrespondingData") != "Sight") return;
+      outSightX = vector.Number("Vx");
+      outSightY = vector.Number("Vy");
+      outSightZ = vector.Number("Vz");
     });
   };
   const auto readGeometry = [&](const DOM_Node& inGeometry) {
-    outCurveLength = NumberText(inGeometry, "IntersectCurveLength");
-    outDistance = NumberText(inGeometry, "ExtractOrDistValue");
+    const ElementAttributes geometry(inGeometry);
+    outCurveLength = geometry.Number("IntersectCurveLength");
+    outDistance = geometry.Number("ExtractOrDistValue");
     outReserved = ZORUnicodeString();
     ForEachChild(inGeometry, [&](const DOM_Node& inChild) {
       if (IsElementNamed(inChild, "Point"))
@@ -253,8 +277,9 @@ void ZORClashParsing::GetInterferenceData(DOM_Node inInterference, ZORUnicodeStr
                                           ZORUnicodeString& outRuleName,
                                           ZORUnicodeString& ioFirstAlias,
                                           ZORUnicodeString& outSecondAlias) {
-  outValue = GetAttrOnNode(inInterference, "Value");
-  outResultType = GetAttrOnNode(inInterference, "ResultType");
+  const ElementAttributes interference(inInterference);
+  outValue = interference.Text("Value");
+  outResultType = interference.Text("ResultType");
   ForEachChild(inInterference, [&](const DOM_Node& inChild) {
     if (IsElementNamed(inChild, "ViolatedRule"))
       outRuleName = GetAttrOnNode(inChild, names::Name.ConvertToChar());
@@ -269,13 +294,13 @@ void ZORClashParsing::GetInterferenceData(DOM_Node inInterference, ZORUnicodeStr
                                           ZORUnicodeString& outFirstPreview,
                                           ZORUnicodeString& outSecondPreview) {
   ForEachElement(inInterference, "Product", [&](const DOM_Node& inProduct) {
+    const ElementAttributes product(inProduct);
     const bool first = ioFirstLabel.GetLengthInChar() == 0;
-    ZORUnicodeString label =
-        GetInstanceNameFromDID(GetAttrOnNode(inProduct, names::Alias.ConvertToChar()));
+    ZORUnicodeString label = GetInstanceNameFromDID(product.Text(names::Alias));
     label += " -- ";
-    label += GetAttrOnNode(inProduct, names::ShapeName.ConvertToChar());
+    label += product.Text(names::ShapeName);
     (first ? ioFirstLabel : outSecondLabel) = label;
-    (first ? outFirstPreview : outSecondPreview) = GetAttrOnNode(inProduct, "Preview");
+    (first ? outFirstPreview : outSecondPreview) = product.Text("Preview");
   });
 }
 

@@ -2,6 +2,7 @@
 #ifndef ZOR_DEFAULT_PLATFORM_SYSTEM_UTF8_H
 #define ZOR_DEFAULT_PLATFORM_SYSTEM_UTF8_H
 
+#include <algorithm>
 #include <cstddef>
 #include <string_view>
 
@@ -12,6 +13,11 @@ inline constexpr char16_t kReplacementCharacter = 0xFFFD;
 
 inline bool IsHighSurrogate(char32_t inUnit) { return inUnit >= 0xD800 && inUnit <= 0xDBFF; }
 inline bool IsLowSurrogate(char32_t inUnit) { return inUnit >= 0xDC00 && inUnit <= 0xDFFF; }
+
+inline bool IsAscii(std::string_view inBytes) {
+  return std::all_of(inBytes.begin(), inBytes.end(),
+                     [](char inByte) { return static_cast<unsigned char>(inByte) < 0x80; });
+}
 
 /// Writes UTF-8 as UTF-16; each maximal part of an ill-formed sequence becomes one U+FFFD.
 /// @param outUnits room for one unit a byte.

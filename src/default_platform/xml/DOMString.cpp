@@ -9,6 +9,7 @@
 #include <stdexcept>
 #include <utility>
 
+#include "default_platform/system/Utf8.h"
 #include "default_platform/xml/DOM_HandleAccess.h"
 
 namespace {
@@ -25,11 +26,6 @@ std::size_t OwnedBytes(std::uint32_t inCount) {
 
 OwnedHead* HeadOf(const DOM_Text* inText) {
   return reinterpret_cast<OwnedHead*>(const_cast<DOM_Text*>(inText)) - 1;
-}
-
-bool IsAscii(const char* inText, std::size_t inCount) {
-  return std::all_of(inText, inText + inCount,
-                     [](char inByte) { return static_cast<unsigned char>(inByte) < 0x80; });
 }
 
 DOM_Text* OwnedCopy(const ZORUC2Bytes* inUnits, std::size_t inCount) {
@@ -67,7 +63,7 @@ DOMString::DOMString() : text_(nullptr), tree_(nullptr) {}
 DOMString::DOMString(const char* inNarrow) : DOMString() {
   if (inNarrow == nullptr) return;
   const std::size_t count = std::strlen(inNarrow);
-  if (!IsAscii(inNarrow, count)) {
+  if (!ZORDefault::IsAscii({inNarrow, count})) {
     const ZORUnicodeString text(inNarrow);
     text_ = OwnedCopy(text.ConvertToUCChar(), static_cast<std::size_t>(text.GetLengthInChar()));
     return;
@@ -119,12 +115,8 @@ bool DOMString::equals(const DOMString& inOther) const {
 }
 
 bool DOMString::equals(const char* inAscii) const {
-  const std::u16string_view text = DOM_HandleAccess::View(*this);
-  const std::size_t count = inAscii == nullptr ? 0 : std::strlen(inAscii);
-  return text.size() == count &&
-         std::equal(text.begin(), text.end(), inAscii, [](char16_t inUnit, char inByte) {
-           return inUnit == static_cast<unsigned char>(inByte);
-         });
+  return IsSameText(DOM_HandleAccess::View(*this),
+                    inAscii == nullptr ? std::string_view() : inAscii);
 }
 
 ZORUnicodeString DOMString::DOMStringToZORUnicodeString() const {

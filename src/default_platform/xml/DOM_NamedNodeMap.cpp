@@ -1,8 +1,6 @@
 #include "platform/xml/DOM_NamedNodeMap.h"
 
-#include <cstring>
-#include <iterator>
-
+#include "default_platform/system/Utf8.h"
 #include "default_platform/xml/DOM_HandleAccess.h"
 
 DOM_NamedNodeMap::DOM_NamedNodeMap() = default;
@@ -32,14 +30,10 @@ DOM_Node DOM_NamedNodeMap::getNamedItem(const DOMString& inName) const {
 }
 
 DOM_Node DOM_NamedNodeMap::getNamedItem(const char* inName) const {
-  char16_t units[64];
-  const std::size_t count = inName == nullptr ? 0 : std::strlen(inName);
-  if (count > std::size(units)) return getNamedItem(DOMString(inName));
-  char16_t all = 0;
-  for (std::size_t i = 0; i < count; ++i) all |= units[i] = static_cast<unsigned char>(inName[i]);
-  if (all >= 0x80) return getNamedItem(DOMString(inName));
+  const std::string_view name = inName == nullptr ? std::string_view() : inName;
+  if (!ZORDefault::IsAscii(name)) return getNamedItem(DOMString(inName));
   if (isNull()) return DOM_Node();
   DOM_Tree* const tree = DOM_HandleAccess::TreeOf(element_);
   const DOM_Tree::Node element = DOM_HandleAccess::NodeOf(element_);
-  return DOM_HandleAccess::Handle(tree, element, tree->FindAttribute(element, {units, count}));
+  return DOM_HandleAccess::Handle(tree, element, tree->FindAttribute(element, name));
 }

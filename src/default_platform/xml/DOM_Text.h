@@ -22,6 +22,14 @@ inline bool IsSameText(std::u16string_view inA, std::u16string_view inB) {
          (inA.empty() || std::memcmp(inA.data(), inB.data(), inA.size() * sizeof(char16_t)) == 0);
 }
 
+/// The same of a text and an ASCII one; a byte beyond ASCII stands for the unit of its number.
+inline bool IsSameText(std::u16string_view inText, std::string_view inAscii) {
+  if (inText.size() != inAscii.size()) return false;
+  for (std::size_t i = 0; i < inAscii.size(); ++i)
+    if (inText[i] != static_cast<unsigned char>(inAscii[i])) return false;
+  return true;
+}
+
 /// A fast hash of UTF-16 text, eight bytes at a time.
 inline std::uint64_t HashOfText(std::u16string_view inText) {
   constexpr std::uint64_t kFactor = 0x9E3779B97F4A7C15u;

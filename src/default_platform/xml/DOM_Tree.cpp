@@ -94,6 +94,13 @@ DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, std::u16string_view 
   return attribute;
 }
 
+DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, std::string_view inName) const {
+  Attribute attribute = At(inElement).firstAttribute;
+  while (attribute != 0 && !IsSameText(NameText(attributes_[attribute].name)->View(), inName))
+    attribute = attributes_[attribute].next;
+  return attribute;
+}
+
 // ---- making
 
 DOM_Tree::Node DOM_Tree::TakeNode() {

@@ -108,6 +108,9 @@ class DOM_Tree {
   std::uint32_t AttributeCount(Node inElement);
   Attribute AttributeAtPosition(Node inElement, std::uint32_t inPosition);
   Attribute FindAttribute(Node inElement, std::u16string_view inName) const;
+  /// The same for an ASCII name, which is what readers ask most: elements have few attributes, and
+  /// to compare their names costs less than to look up the number of the name.
+  Attribute FindAttribute(Node inElement, std::string_view inName) const;
   Node FirstChildOfKind(Node inParent, int inKind) const;
   const DOM_Text* NameText(Name inName) const { return names_.TextOf(inName); }
   Name NameEnd() const { return names_.End(); }
