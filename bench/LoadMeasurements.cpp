@@ -38,6 +38,17 @@ void HashTree(const xmlNode& inNode, std::size_t inDepth, TreeHash& ioHash) {
   for (const xmlNode* child = inNode.children; child != nullptr; child = child->next)
     HashTree(*child, inDepth + 1, ioHash);
 }
+
+typedef std::unique_ptr<xmlDoc, decltype(&xmlFreeDoc)> Libxml2Document;
+
+Libxml2Document ReadWithLibxml2(const std::string& inPath, Steps& ioSteps) {
+  Libxml2Document document(nullptr, &xmlFreeDoc);
+  TimeStep("load", ioSteps, [&] {
+    document.reset(xmlReadFile(inPath.c_str(), nullptr, XML_PARSE_NONET | XML_PARSE_HUGE));
+  });
+  if (!document) throw std::runtime_error("libxml2 refused the document");
+  return document;
+}
 }  // namespace
 
 Steps LoadWithZORLyra(const Arguments& inArguments) {
@@ -71,15 +82,16 @@ Steps ScanWithXerces(const Arguments& inArguments) {
 
 Steps LoadWithLibxml2(const Arguments& inArguments) {
   Steps steps;
-  std::unique_ptr<xmlDoc, decltype(&xmlFreeDoc)> document(nullptr, &xmlFreeDoc);
-  TimeStep("load", steps, [&] {
-    document.reset(
-        xmlReadFile(inArguments.at(0).c_str(), nullptr, XML_PARSE_NONET | XML_PARSE_HUGE));
-  });
-  if (!document) throw std::runtime_error("libxml2 refused the document");
+  const Libxml2Document document = ReadWithLibxml2(inArguments.at(0), steps);
   TreeHash hash;
   HashTree(*xmlDocGetRootElement(document.get()), 1, hash);
   steps[0].hash = hash.Value();
+  return steps;
+}
+
+Steps LoadAloneWithLibxml2(const Arguments& inArguments) {
+  Steps steps;
+  ReadWithLibxml2(inArguments.at(0), steps);
   return steps;
 }
 

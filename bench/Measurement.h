@@ -48,6 +48,8 @@ Steps LoadWithXerces(const Arguments& inArguments);
 /// No tree: what it costs Xerces-C to read the text.
 Steps ScanWithXerces(const Arguments& inArguments);
 Steps LoadWithLibxml2(const Arguments& inArguments);
+/// Without a hash of the tree, beside the reading loop.
+Steps LoadAloneWithLibxml2(const Arguments& inArguments);
 Steps LoadWithPugixml(const Arguments& inArguments);
 /// Steps "load", "short", "full", "copy", "specifications", "load components", "components" of a
 /// clash document and a document of components.

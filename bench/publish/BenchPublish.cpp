@@ -87,7 +87,10 @@ Run Publish(const Options& inOptions, const fs::path& inFolder) {
   const fs::path times = inFolder / "times";
   std::ofstream(times, std::ios::binary) << std::string(sizeof(PhaseTimes), '\0');
   setenv(kPhaseTimesVariable, times.c_str(), 1);
-  setenv("LD_PRELOAD", ZOR_BENCH_PHASE_TIMES_LIBRARY, 1);
+  // The linker splits the list of these libraries at blanks, which the path of the build may hold.
+  const fs::path library = inFolder / "phase-times.so";
+  fs::create_symlink(ZOR_BENCH_PHASE_TIMES_LIBRARY, library);
+  setenv("LD_PRELOAD", library.c_str(), 1);
   const std::string lyra = (fs::read_symlink("/proc/self/exe").parent_path() / "lyra").string();
   const double before = ProcessorTimeOfChildren();
   const ChildOutcome outcome =

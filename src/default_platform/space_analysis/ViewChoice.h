@@ -20,14 +20,15 @@ struct ChosenView {
 };
 
 /// The direction upwards in a picture with this sight: of z as much as can be, else of y.
-ZORMathVector UpFor(const ZORMathVector& inSight);
+ZOR_PLATFORM_EXPORT ZORMathVector UpFor(const ZORMathVector& inSight);
 
 /// Looks for a direction in which both products are seen when the interference is framed: the
 /// default one where that shows them well, else the best of those around; where a product is hidden
 /// from all, more of the surroundings is framed.
 /// @param inPoints at least one.
-ChosenView ChooseView(const ShownProducts& inProducts, const std::vector<ZORMathVector>& inPoints,
-                      bool inIsDimension);
+ZOR_PLATFORM_EXPORT ChosenView ChooseView(const ShownProducts& inProducts,
+                                          const std::vector<ZORMathVector>& inPoints,
+                                          bool inIsDimension);
 
 /// Gives the markers pins as long as it takes to see them through a viewpoint. None are needed but
 /// with a near plane, which keeps markers from being drawn over all else.
