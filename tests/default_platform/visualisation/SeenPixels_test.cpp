@@ -19,13 +19,7 @@ using ZORDefault::PictureRequest;
 using ZORDefault::SeenPixel;
 
 constexpr int kWidth = 400, kHeight = 300;
-
-// The sanitizers make the search among all triangles three times as slow, and look for other things.
-#if defined(__SANITIZE_ADDRESS__)
-constexpr int kSampledPixels = 1'000;
-#else
 constexpr int kSampledPixels = 10'000;
-#endif
 
 ZORMathVector operator+(const ZORMathVector& inA, const ZORMathVector& inB) {
   return {inA.x + inB.x, inA.y + inB.y, inA.z + inB.z};
