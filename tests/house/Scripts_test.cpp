@@ -60,40 +60,61 @@ TEST(TestCounts, RefuseAnEmptyReport) {
 }
 
 namespace {
-/// What `install-packages format` asks for on a system where `dpkg-query` answers inState for every
-/// package and the user has this number; the last line is the exit code.
-std::vector<std::string> Install(const std::string& inState, int inUser) {
+/// What `install-packages format` prints on a system where `dpkg-query` answers inState for every
+/// package, the user has this number and `apt-get` is this script; the last line is the exit code.
+std::vector<std::string> Install(const std::string& inState, int inUser,
+                                 const std::string& inAptGet = "echo apt-get \"$@\"") {
+  const std::string user = std::to_string(inUser);
   return house::LinesOf(
       "dir=$(mktemp -d) && cd \"$dir\" && "
       "printf '#!/bin/sh\\necho " +
       inState +
       "\\n' >dpkg-query && "
       "printf '#!/bin/sh\\necho " +
-      std::to_string(inUser) +
+      user +
       "\\n' >id && "
-      "printf '#!/bin/sh\\necho apt-get \"$@\"\\n' >apt-get && "
+      "printf '#!/bin/sh\\n%s\\n' '" +
+      inAptGet +
+      "' >apt-get && "
       "printf '#!/bin/sh\\necho sudo; exec \"$@\"\\n' >sudo && "
-      "chmod +x dpkg-query id apt-get sudo && "
+      "printf '#!/bin/sh\\necho sleep \"$@\"\\n' >sleep && "
+      "chmod +x dpkg-query id apt-get sudo sleep && "
       "PATH=\"$dir:$PATH\" bash '" ZOR_SOURCE_DIR
       "/scripts/install-packages' format 2>&1; "
       "echo code $?; rm -r \"$dir\"");
 }
+
+const std::string kInstalling = "Installing git clang-format clang-tidy";
+const std::string kUpdate = "apt-get -o DPkg::Lock::Timeout=600 update -qq";
+const std::string kInstall =
+    "apt-get -o DPkg::Lock::Timeout=600 install -y -qq --no-install-recommends "
+    "git clang-format clang-tidy";
 }  // namespace
 
-TEST(InstallPackages, AskNothingWhenAllAreThere) {
+TEST(InstallPackages, AskNothingWhenAllAreInstalled) {
   EXPECT_THAT(Install("installed", 0), ElementsAre("code 0"));
 }
 
 TEST(InstallPackages, InstallWhatIsMissing) {
-  EXPECT_THAT(
-      Install("not-installed", 0),
-      ElementsAre("Installing git clang-format", "apt-get update -qq",
-                  "apt-get install -y -qq --no-install-recommends git clang-format", "code 0"));
+  EXPECT_THAT(Install("not-installed", 0), ElementsAre(kInstalling, kUpdate, kInstall, "code 0"));
 }
 
 TEST(InstallPackages, BecomeRootBySudo) {
+  EXPECT_THAT(Install("not-installed", 1000),
+              ElementsAre(kInstalling, "sudo", kUpdate, "sudo", kInstall, "code 0"));
+}
+
+TEST(InstallPackages, WaitWhileTheListsAreLocked) {
   EXPECT_THAT(
-      Install("not-installed", 1000),
-      ElementsAre("Installing git clang-format", "sudo", "apt-get update -qq", "sudo",
-                  "apt-get install -y -qq --no-install-recommends git clang-format", "code 0"));
+      Install("not-installed", 0,
+              "if mkdir locked 2>/dev/null; then echo E: Could not get lock x >&2; exit 100; "
+              "fi; echo done"),
+      ElementsAre(kInstalling, "E: Could not get lock x",
+                  "install-packages: waiting for another package manager", "sleep 5", "done",
+                  "done", "code 0"));
+}
+
+TEST(InstallPackages, FailWhenAPackageCannotBeInstalled) {
+  EXPECT_THAT(Install("not-installed", 0, "echo E: no such package >&2; exit 100"),
+              ElementsAre(kInstalling, "E: no such package", "code 100"));
 }

@@ -17,9 +17,6 @@ std::vector<SourceFile> ReadTree(const std::filesystem::path& inRoot);
 
 /// The lines that include what their file must not see, as "path:line: reason".
 std::vector<std::string> FindWrongIncludes(const std::vector<SourceFile>& inTree);
-
-/// The lines that speak of something outside the project, as "path:line: text".
-std::vector<std::string> FindForeignWords(const std::vector<SourceFile>& inTree);
 }  // namespace house
 
 #endif

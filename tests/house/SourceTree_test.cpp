@@ -6,7 +6,6 @@
 #include <fstream>
 
 namespace fs = std::filesystem;
-using house::FindForeignWords;
 using house::FindWrongIncludes;
 using testing::Contains;
 using testing::ElementsAre;
@@ -115,34 +114,4 @@ TEST(IncludeArrows, WindowsHeadersAreForTheEntryPoint) {
   EXPECT_THAT(WrongIncludesOf("src/platform/system/A.h", "<windows.h>"), testing::SizeIs(1));
   EXPECT_THAT(WrongIncludesOf("include/A.h", "<windows.h>"), testing::SizeIs(1));
   EXPECT_THAT(WrongIncludesOf("src/windows/A.cpp", "<windows.h>"), IsEmpty());
-}
-
-TEST(ForeignWords, AreNotInThisProject) { EXPECT_THAT(FindForeignWords(ThisProject()), IsEmpty()); }
-
-// The words are joined from pieces here, so that this file does not hold them.
-TEST(ForeignWords, AreFoundWithTheirPlace) {
-  const std::string line = std::string("// as the sp") + "ec says";
-  EXPECT_THAT(FindForeignWords({{"src/A.cpp", {"int a;", line}}}),
-              ElementsAre("src/A.cpp:2: " + line));
-}
-
-TEST(ForeignWords, EveryKindIsFound) {
-  const std::string pieces[][2] = {{"// see sp", "ec.md"},     {"// as sp", "ecified"},
-                                   {"// desi", "gn.md, 2"},    {"// Pa", "rt 1.4 says"},
-                                   {"# pa", "rts 2.1"},        {"cd /wo", "rk/main"},
-                                   {"# cd /ho", "me/someone"}, {"// for iss", "ue #12"},
-                                   {"// the br", "ief says"},  {"// a coding ag", "ent did"}};
-  for (const auto& [head, tail] : pieces) {
-    EXPECT_THAT(FindForeignWords({{"src/A.cpp", {head + tail}}}), testing::SizeIs(1)) << head;
-  }
-  EXPECT_THAT(FindForeignWords({{"README.md", {std::string("after Pa") + "rt 2.1"}}}),
-              testing::SizeIs(1));
-}
-
-TEST(ForeignWords, DomainWordsAreNotForeign) {
-  EXPECT_THAT(FindForeignWords({{"src/A.cpp",
-                                 {"// the clash specification of a result",
-                                  std::string("EXPECT_EQ(alias, \"Pa") + "rt 1.1\");",
-                                  "// a product in session"}}}),
-              IsEmpty());
 }
