@@ -2,13 +2,7 @@
 
 #include <fcntl.h>
 #include <sys/stat.h>
-#ifdef _WIN32
-#include <io.h>
-
-#include <cstdio>
-#else
 #include <unistd.h>
-#endif
 
 #include <algorithm>
 #include <cerrno>
@@ -27,56 +21,32 @@ MemorySource::~MemorySource() {
   if (adopted_) delete[] bytes_;
 }
 
-std::size_t ByteReader::Read(unsigned char* outBytes, std::size_t inMost) {
-  const std::size_t count = DoRead(outBytes, inMost);
-  given_ += count;
+std::size_t ByteReader::Read(unsigned char* outBytes, std::size_t inMax) {
+  const std::size_t count = DoRead(outBytes, inMax);
+  bytesRead_ += count;
   return count;
 }
 
 void ByteReader::Rewind() {
   DoRewind();
-  given_ = 0;
+  bytesRead_ = 0;
 }
 
 namespace {
 
-#ifdef _WIN32
-constexpr int kOpenFlags = _O_RDONLY | _O_BINARY;
-using FileStatus = struct _stat64;
-int OpenDescriptor(const char* inPath) { return _open(inPath, kOpenFlags); }
-int StatusOf(int inFile, FileStatus* outStatus) { return _fstat64(inFile, outStatus); }
-std::ptrdiff_t ReadSome(int inFile, void* outBytes, std::size_t inMost) {
-  return _read(inFile, outBytes, static_cast<unsigned int>(inMost));
-}
-bool SeekStart(int inFile) { return _lseeki64(inFile, 0, SEEK_SET) == 0; }
-void CloseDescriptor(int inFile) { _close(inFile); }
-bool IsDirectory(const FileStatus& inStatus) { return (inStatus.st_mode & _S_IFMT) == _S_IFDIR; }
-bool IsRegular(const FileStatus& inStatus) { return (inStatus.st_mode & _S_IFMT) == _S_IFREG; }
-#else
 // Without O_NONBLOCK, opening a pipe would wait for its writer.
 constexpr int kOpenFlags = O_RDONLY | O_NONBLOCK | O_CLOEXEC | O_NOCTTY;
-using FileStatus = struct stat;
-int OpenDescriptor(const char* inPath) { return open(inPath, kOpenFlags); }
-int StatusOf(int inFile, FileStatus* outStatus) { return fstat(inFile, outStatus); }
-std::ptrdiff_t ReadSome(int inFile, void* outBytes, std::size_t inMost) {
-  return read(inFile, outBytes, inMost);
-}
-bool SeekStart(int inFile) { return lseek(inFile, 0, SEEK_SET) == 0; }
-void CloseDescriptor(int inFile) { close(inFile); }
-bool IsDirectory(const FileStatus& inStatus) { return S_ISDIR(inStatus.st_mode); }
-bool IsRegular(const FileStatus& inStatus) { return S_ISREG(inStatus.st_mode); }
-#endif
 
 class FileReader : public ByteReader {
  public:
-  explicit FileReader(const char* inPath) : path_(inPath), file_(OpenDescriptor(inPath)) {
+  explicit FileReader(const char* inPath) : path_(inPath), file_(open(inPath, kOpenFlags)) {
     if (file_ < 0) FailWithErrno();
-    FileStatus status;
-    if (StatusOf(file_, &status) != 0) CloseAndFail(std::generic_category().message(errno));
-    if (IsDirectory(status)) CloseAndFail("is a directory");
-    if (!IsRegular(status)) CloseAndFail("is not a regular file");
+    struct stat status;
+    if (fstat(file_, &status) != 0) CloseAndFail(std::generic_category().message(errno));
+    if (S_ISDIR(status.st_mode)) CloseAndFail("is a directory");
+    if (!S_ISREG(status.st_mode)) CloseAndFail("is not a regular file");
   }
-  ~FileReader() override { CloseDescriptor(file_); }
+  ~FileReader() override { close(file_); }
   FileReader(const FileReader&) = delete;
   FileReader& operator=(const FileReader&) = delete;
 
@@ -89,24 +59,24 @@ class FileReader : public ByteReader {
   }
 
  private:
-  std::size_t DoRead(unsigned char* outBytes, std::size_t inMost) override {
-    if (IsEmpty() || inMost == 0) return 0;
-    if (isFirstGiven_) return FromFile(outBytes, inMost);
-    isFirstGiven_ = true;
+  std::size_t DoRead(unsigned char* outBytes, std::size_t inMax) override {
+    if (IsEmpty() || inMax == 0) return 0;
+    if (isFirstDelivered_) return FromFile(outBytes, inMax);
+    isFirstDelivered_ = true;
     outBytes[0] = first_;
-    return 1 + FromFile(outBytes + 1, inMost - 1);
+    return 1 + FromFile(outBytes + 1, inMax - 1);
   }
 
   void DoRewind() override {
-    if (!SeekStart(file_)) FailWithErrno();
+    if (lseek(file_, 0, SEEK_SET) != 0) FailWithErrno();
     hasFirst_ = false;
-    isFirstGiven_ = false;
+    isFirstDelivered_ = false;
   }
 
-  std::size_t FromFile(unsigned char* outBytes, std::size_t inMost) {
+  std::size_t FromFile(unsigned char* outBytes, std::size_t inMax) {
     std::ptrdiff_t count = 0;
     do {
-      count = ReadSome(file_, outBytes, inMost);
+      count = read(file_, outBytes, inMax);
     } while (count < 0 && errno == EINTR);
     if (count < 0) FailWithErrno();
     return static_cast<std::size_t>(count);
@@ -116,7 +86,7 @@ class FileReader : public ByteReader {
     throw ZORXMLParseError(path_, 0, 0, std::generic_category().message(errno));
   }
   [[noreturn]] void CloseAndFail(const std::string& inReason) const {
-    CloseDescriptor(file_);
+    close(file_);
     throw ZORXMLParseError(path_, 0, 0, inReason);
   }
 
@@ -125,7 +95,7 @@ class FileReader : public ByteReader {
   // One byte read ahead tells an empty file from others; its stated size may be a lie.
   unsigned char first_ = 0;
   bool hasFirst_ = false;
-  bool isFirstGiven_ = false;
+  bool isFirstDelivered_ = false;
   bool isEmpty_ = false;
 };
 
@@ -136,8 +106,8 @@ class MemoryReader : public ByteReader {
   bool IsEmpty() override { return count_ == 0; }
 
  private:
-  std::size_t DoRead(unsigned char* outBytes, std::size_t inMost) override {
-    const std::size_t count = std::min(inMost, left_);
+  std::size_t DoRead(unsigned char* outBytes, std::size_t inMax) override {
+    const std::size_t count = std::min(inMax, left_);
     if (count != 0) std::memcpy(outBytes, bytes_ + (count_ - left_), count);
     left_ -= count;
     return count;
@@ -152,9 +122,9 @@ class MemoryReader : public ByteReader {
 class ReaderStream : public xercesc::BinInputStream {
  public:
   explicit ReaderStream(ByteReader& ioReader) : reader_(ioReader) {}
-  XMLFilePos curPos() const override { return reader_.Given(); }
-  XMLSize_t readBytes(XMLByte* const outBytes, const XMLSize_t inMost) override {
-    return reader_.Read(outBytes, inMost);
+  XMLFilePos curPos() const override { return reader_.BytesRead(); }
+  XMLSize_t readBytes(XMLByte* const outBytes, const XMLSize_t inMax) override {
+    return reader_.Read(outBytes, inMax);
   }
   const XMLCh* getContentType() const override { return nullptr; }
 

@@ -36,18 +36,17 @@ class ByteReader {
  public:
   virtual ~ByteReader() = default;
   /// @return the number of bytes put to outBytes; 0 at the end only.
-  std::size_t Read(unsigned char* outBytes, std::size_t inMost);
-  /// Bytes given so far.
-  std::uint64_t Given() const { return given_; }
+  std::size_t Read(unsigned char* outBytes, std::size_t inMax);
+  std::uint64_t BytesRead() const { return bytesRead_; }
   /// Whether there is nothing to read at all.
   virtual bool IsEmpty() = 0;
   /// Begins again.
   void Rewind();
 
  private:
-  virtual std::size_t DoRead(unsigned char* outBytes, std::size_t inMost) = 0;
+  virtual std::size_t DoRead(unsigned char* outBytes, std::size_t inMax) = 0;
   virtual void DoRewind() = 0;
-  std::uint64_t given_ = 0;
+  std::uint64_t bytesRead_ = 0;
 };
 
 /// A regular file. Raises ZORXMLParseError for anything else: a pipe could keep the reader waiting

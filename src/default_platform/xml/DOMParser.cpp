@@ -9,13 +9,13 @@
 
 namespace {
 
-// The short way; null for a document that must go the long one. That one alone tells what is wrong
-// with a document, and where.
-DOM_Document ScanPlainDocument(ByteReader& ioReader) {
+// Null for a document that the full scanner must read, which alone says what is wrong with one, and
+// where.
+DOM_Document ScanUtf8(ByteReader& ioReader) {
   try {
     ScannerMemory memory;
-    return DocumentScanner(memory, ioReader, DocumentScanner::kPlain).Scan("");
-  } catch (const NotPlain&) {
+    return DocumentScanner(memory, ioReader, DocumentScanner::kUtf8).Scan("");
+  } catch (const NeedsFullScanner&) {
     return DOM_Document();
   } catch (const ScanFailure&) {
     return DOM_Document();
@@ -25,8 +25,8 @@ DOM_Document ScanPlainDocument(ByteReader& ioReader) {
 DOM_Document ScanDocument(ByteReader& ioReader, const std::string& inName) {
   if (FAILED(ZORXMLParser::Initialize()))
     throw ZORXMLParseError(inName, 0, 0, "the XML library cannot be prepared");
-  const DOM_Document plain = ScanPlainDocument(ioReader);
-  if (!plain.isNull()) return plain;
+  const DOM_Document document = ScanUtf8(ioReader);
+  if (!document.isNull()) return document;
   try {
     ioReader.Rewind();
     ScannerMemory memory;
@@ -34,6 +34,14 @@ DOM_Document ScanDocument(ByteReader& ioReader, const std::string& inName) {
   } catch (const ScanFailure& failure) {
     throw ZORXMLParseError(inName, failure.line, failure.column, failure.reason);
   }
+}
+
+std::string Message(const std::string& inSource, std::uint64_t inLine, std::uint64_t inColumn,
+                    const std::string& inReason) {
+  std::string place = inSource;
+  if (inLine != 0) place.append(":").append(std::to_string(inLine));
+  if (inColumn != 0) place.append(":").append(std::to_string(inColumn));
+  return place.append(": ").append(inReason);
 }
 
 }  // namespace
@@ -56,3 +64,13 @@ void DOMParser::parse(const InputSource& inSource) {
 }
 
 DOM_Document DOMParser::getDocument() const { return document_; }
+
+ZORXMLParseError::ZORXMLParseError(const std::string& inSource, std::uint64_t inLine,
+                                   std::uint64_t inColumn, const std::string& inReason)
+    : std::runtime_error(Message(inSource, inLine, inColumn, inReason)),
+      source(inSource),
+      line(inLine),
+      column(inColumn),
+      reason(inReason) {}
+
+ZORXMLParseError::~ZORXMLParseError() = default;

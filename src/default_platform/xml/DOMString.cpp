@@ -14,7 +14,7 @@
 
 namespace {
 
-// What stands before a text that strings own themselves. Counted atomically: such a string may be a
+// The head of a text that strings own themselves. Counted atomically: such a string may be a
 // constant of the process that several threads copy.
 struct OwnedHead {
   std::atomic<std::uint32_t> handles;

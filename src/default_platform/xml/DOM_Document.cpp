@@ -6,10 +6,10 @@
 
 namespace {
 
-DOM_Tree& TreeToChange(const DOM_Node& inDocument) {
-  if (inDocument.isNull())
-    throw DOM_DOMException(DOM_DOMException::NULL_HANDLE_ERR, "a node made by a null document");
-  return *DOM_HandleAccess::TreeOf(inDocument);
+DOM_Tree& TreeToChange(const DOM_Node& inHandle) {
+  if (inHandle.isNull())
+    throw DOM_DOMException(DOM_DOMException::NULL_HANDLE_ERR, "a change through a null handle");
+  return *DOM_HandleAccess::TreeOf(inHandle);
 }
 
 DOM_Node NewNode(const DOM_Node& inDocument, int inKind, const DOMString& inText) {
@@ -87,4 +87,32 @@ DOM_Node DOM_Document::importNode(const DOM_Node& inNode, bool inDeep) {
                            "a document, document type or attribute cannot be imported");
   return DOM_HandleAccess::Handle(&tree, tree.Copy(*DOM_HandleAccess::TreeOf(inNode),
                                                    DOM_HandleAccess::NodeOf(inNode), inDeep));
+}
+
+// ---- elements
+
+DOM_Element::DOM_Element() = default;
+
+DOM_Element::DOM_Element(const DOM_Node& inNode)
+    : DOM_Node(inNode.getNodeType() == ELEMENT_NODE ? inNode : DOM_Node()) {}
+
+DOMString DOM_Element::getTagName() const { return getNodeName(); }
+
+DOMString DOM_Element::getAttribute(const DOMString& inName) const {
+  static const DOMString* const empty = new DOMString("");
+  if (isNull()) return *empty;
+  const DOM_Tree::Attribute attribute = tree_->FindAttribute(node_, DOM_HandleAccess::View(inName));
+  if (attribute == 0) return *empty;
+  return DOM_HandleAccess::String(tree_, tree_->AttributeAt(attribute).value);
+}
+
+void DOM_Element::setAttribute(const DOMString& inName, const DOMString& inValue) {
+  DOM_Tree& tree = TreeToChange(*this);
+  const std::u16string_view name = DOM_HandleAccess::View(inName);
+  RequireXMLName(name);
+  tree.SetAttribute(node_, name, DOM_HandleAccess::TextFor(tree, inValue));
+}
+
+void DOM_Element::removeAttribute(const DOMString& inName) {
+  TreeToChange(*this).RemoveAttribute(node_, DOM_HandleAccess::View(inName));
 }

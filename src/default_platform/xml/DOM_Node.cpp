@@ -2,6 +2,7 @@
 
 #include <utility>
 
+#include "default_platform/system/Utf8.h"
 #include "default_platform/xml/DOM_HandleAccess.h"
 #include "platform/xml/DOM_DOMException.h"
 #include "platform/xml/DOM_NamedNodeMap.h"
@@ -33,6 +34,82 @@ const DOMString& KindName(int inKind) {
 
 [[noreturn]] void RefuseNull() {
   throw DOM_DOMException(DOM_DOMException::NULL_HANDLE_ERR, "a change through a null handle");
+}
+
+// ---- where a node may go
+
+[[noreturn]] void RefusePlace(const char* inReason) {
+  throw DOM_DOMException(DOM_DOMException::HIERARCHY_REQUEST_ERR, inReason);
+}
+
+bool IsWithin(const DOM_Tree& inTree, DOM_Tree::Node inNode, DOM_Tree::Node inRoot) {
+  while (inNode != 0 && inNode != inRoot) inNode = inTree.At(inNode).parent;
+  return inNode != 0;
+}
+
+void CheckKinds(const DOM_Tree& inTree, DOM_Tree::Node inParent, DOM_Tree::Node inChild) {
+  const int child = inTree.At(inChild).kind;
+  const bool inDocument = inParent == DOM_Tree::kDocument;
+  switch (child) {
+    case DOM_Node::ELEMENT_NODE:
+    case DOM_Node::COMMENT_NODE:
+    case DOM_Node::PROCESSING_INSTRUCTION_NODE:
+      return;
+    case DOM_Node::TEXT_NODE:
+    case DOM_Node::CDATA_SECTION_NODE:
+      if (inDocument) RefusePlace("a document takes no text");
+      return;
+    case DOM_Node::DOCUMENT_TYPE_NODE:
+      if (!inDocument) RefusePlace("only a document takes a document type");
+      return;
+    default:
+      RefusePlace("a node of this kind cannot be a child");
+  }
+}
+
+void CheckDocumentChildren(const DOM_Tree& inTree, DOM_Tree::Node inChild, DOM_Tree::Node inBefore,
+                           DOM_Tree::Node inReplaced) {
+  const int kind = inTree.At(inChild).kind;
+  if (kind != DOM_Node::ELEMENT_NODE && kind != DOM_Node::DOCUMENT_TYPE_NODE) return;
+  bool isAfter = false;  // whether the children met come after the new one
+  for (DOM_Tree::Node at = inTree.FirstChild(DOM_Tree::kDocument); at != 0;
+       at = inTree.At(at).next) {
+    isAfter = isAfter || at == inBefore;
+    if (at == inChild || at == inReplaced) continue;
+    if (inTree.At(at).kind == kind) RefusePlace("a document has only one of these");
+    if (kind == DOM_Node::ELEMENT_NODE && inTree.At(at).kind == DOM_Node::DOCUMENT_TYPE_NODE &&
+        isAfter)
+      RefusePlace("the root cannot stand before the document type");
+    if (kind == DOM_Node::DOCUMENT_TYPE_NODE && inTree.At(at).kind == DOM_Node::ELEMENT_NODE &&
+        !isAfter)
+      RefusePlace("the document type cannot stand behind the root");
+  }
+}
+
+void CheckInsertion(const DOM_Tree& inTree, DOM_Tree::Node inParent, DOM_Tree::Node inChild,
+                    DOM_Tree::Node inBefore, DOM_Tree::Node inReplaced) {
+  if (!DOM_Tree::MayHaveChildren(inTree.At(inParent).kind))
+    RefusePlace("this node takes no children");
+  if (inTree.At(inChild).kind != DOM_Node::DOCUMENT_FRAGMENT_NODE) {
+    CheckKinds(inTree, inParent, inChild);
+    if (inParent == DOM_Tree::kDocument)
+      CheckDocumentChildren(inTree, inChild, inBefore, inReplaced);
+  } else {
+    unsigned int elements = 0;
+    for (DOM_Tree::Node at = inTree.FirstChild(inChild); at != 0; at = inTree.At(at).next) {
+      CheckKinds(inTree, inParent, at);
+      if (inParent == DOM_Tree::kDocument) CheckDocumentChildren(inTree, at, inBefore, inReplaced);
+      if (inTree.At(at).kind == DOM_Node::ELEMENT_NODE) ++elements;
+    }
+    if (inParent == DOM_Tree::kDocument && elements > 1)
+      RefusePlace("a document has only one root");
+  }
+  // A node without children can contain the parent only by being the parent.
+  if (inChild == inParent ||
+      (inTree.FirstChild(inChild) != 0 && IsWithin(inTree, inParent, inChild)))
+    RefusePlace("a node cannot be put into itself");
+  if (inBefore != 0 && inTree.At(inBefore).parent != inParent)
+    throw DOM_DOMException(DOM_DOMException::NOT_FOUND_ERR, "not a child of this node");
 }
 
 }  // namespace
@@ -166,6 +243,7 @@ DOM_Node DOM_Node::insertBefore(const DOM_Node& inChild, const DOM_Node& inBefor
   if (!inBefore.isNull() && (inBefore.tree_ != tree_ || inBefore.attribute_ != 0))
     throw DOM_DOMException(DOM_DOMException::NOT_FOUND_ERR, "not a child of this node");
   const DOM_Node child(inChild);  // inChild may be what keeps a node alive that moves
+  CheckInsertion(*tree_, node_, child.node_, inBefore.node_, 0);
   tree_->Insert(node_, child.node_, inBefore.node_);
   return child;
 }
@@ -181,7 +259,8 @@ DOM_Node DOM_Node::replaceChild(const DOM_Node& inNew, const DOM_Node& inOld) {
     throw DOM_DOMException(DOM_DOMException::NOT_FOUND_ERR, "not a child of this node");
   const DOM_Node old(inOld);
   if (inNew == old) return old;
-  tree_->Insert(node_, inNew.node_, old.node_, old.node_);
+  CheckInsertion(*tree_, node_, inNew.node_, old.node_, old.node_);
+  tree_->Insert(node_, inNew.node_, old.node_);
   tree_->Remove(old.node_);
   return old;
 }
@@ -204,3 +283,65 @@ DOM_Node DOM_Node::cloneNode(bool inDeep) const {
                            "a document, document type or attribute cannot be copied");
   return DOM_HandleAccess::Handle(tree_, tree_->Copy(*tree_, node_, inDeep));
 }
+
+// ---- lists
+
+DOM_NodeList::DOM_NodeList() = default;
+
+DOM_NodeList::DOM_NodeList(const DOM_Node& inParent) : parent_(inParent) {}
+
+bool DOM_NodeList::isNull() const { return parent_.isNull(); }
+
+unsigned int DOM_NodeList::getLength() const {
+  if (isNull()) return 0;
+  return DOM_HandleAccess::TreeOf(parent_)->ChildCount(DOM_HandleAccess::NodeOf(parent_));
+}
+
+DOM_Node DOM_NodeList::item(unsigned int inPosition) const {
+  if (isNull()) return DOM_Node();
+  DOM_Tree* const tree = DOM_HandleAccess::TreeOf(parent_);
+  return DOM_HandleAccess::Handle(tree,
+                                  tree->ChildAt(DOM_HandleAccess::NodeOf(parent_), inPosition));
+}
+
+DOM_NamedNodeMap::DOM_NamedNodeMap() = default;
+
+DOM_NamedNodeMap::DOM_NamedNodeMap(const DOM_Node& inElement) : element_(inElement) {}
+
+bool DOM_NamedNodeMap::isNull() const { return element_.isNull(); }
+
+unsigned int DOM_NamedNodeMap::getLength() const {
+  if (isNull()) return 0;
+  return DOM_HandleAccess::TreeOf(element_)->AttributeCount(DOM_HandleAccess::NodeOf(element_));
+}
+
+DOM_Node DOM_NamedNodeMap::item(unsigned int inPosition) const {
+  if (isNull()) return DOM_Node();
+  DOM_Tree* const tree = DOM_HandleAccess::TreeOf(element_);
+  const DOM_Tree::Node element = DOM_HandleAccess::NodeOf(element_);
+  return DOM_HandleAccess::Handle(tree, element, tree->AttributeAtPosition(element, inPosition));
+}
+
+DOM_Node DOM_NamedNodeMap::getNamedItem(const DOMString& inName) const {
+  if (isNull()) return DOM_Node();
+  DOM_Tree* const tree = DOM_HandleAccess::TreeOf(element_);
+  const DOM_Tree::Node element = DOM_HandleAccess::NodeOf(element_);
+  return DOM_HandleAccess::Handle(tree, element,
+                                  tree->FindAttribute(element, DOM_HandleAccess::View(inName)));
+}
+
+DOM_Node DOM_NamedNodeMap::getNamedItem(const char* inName) const {
+  const std::string_view name = inName == nullptr ? std::string_view() : inName;
+  if (!ZORDefault::IsAscii(name)) return getNamedItem(DOMString(inName));
+  if (isNull()) return DOM_Node();
+  DOM_Tree* const tree = DOM_HandleAccess::TreeOf(element_);
+  const DOM_Tree::Node element = DOM_HandleAccess::NodeOf(element_);
+  return DOM_HandleAccess::Handle(tree, element, tree->FindAttribute(element, name));
+}
+
+// ---- refusals
+
+DOM_DOMException::DOM_DOMException(ExceptionCode inCode, const std::string& inReason)
+    : std::runtime_error(inReason), code(inCode) {}
+
+DOM_DOMException::~DOM_DOMException() = default;

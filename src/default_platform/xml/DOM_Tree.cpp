@@ -10,7 +10,7 @@ std::uint64_t NextSerial() {
 }
 
 // Shorter lists are walked each time, which costs less than an index of them.
-constexpr std::uint32_t kLongestWalk = 24;
+constexpr std::uint32_t kMaxWalk = 24;
 }  // namespace
 
 DOM_Tree::DOM_Tree() : serial_(NextSerial()), names_(texts_) {
@@ -36,7 +36,7 @@ const PositionIndexes::Children* DOM_Tree::IndexOf(Node inParent) {
   const PositionIndexes::Children* const known = indexes_.Find(inParent);
   if (known != nullptr) return known;
   Node child = FirstChild(inParent);
-  for (std::uint32_t steps = 0; child != 0 && steps < kLongestWalk; ++steps) child = At(child).next;
+  for (std::uint32_t steps = 0; child != 0 && steps < kMaxWalk; ++steps) child = At(child).next;
   if (child == 0) return nullptr;
   PositionIndexes::Children children;
   for (child = FirstChild(inParent); child != 0; child = At(child).next) children.push_back(child);
@@ -107,7 +107,6 @@ DOM_Tree::Node DOM_Tree::TakeNode() {
   if (freeNode_ == 0) return nodes_.Add();
   const Node node = freeNode_;
   freeNode_ = nodes_[node].next;
-  --freeNodeCount_;
   return node;
 }
 
@@ -211,4 +210,97 @@ DOM_Tree::Node DOM_Tree::Copy(const DOM_Tree& inSource, Node inNode, bool inDeep
     from = from == inNode ? 0 : inSource.At(from).next;
   }
   return root;
+}
+
+// ---- links
+
+void DOM_Tree::LinkLast(Node inParent, Node inChild) {
+  NodeRecord& parent = nodes_[inParent];
+  NodeRecord& child = nodes_[inChild];
+  child.parent = inParent;
+  child.previous = parent.children.last;
+  child.next = 0;
+  (parent.children.last == 0 ? parent.children.first : nodes_[parent.children.last].next) = inChild;
+  parent.children.last = inChild;
+  indexes_.Append(inParent, inChild);
+}
+
+void DOM_Tree::LinkBefore(Node inParent, Node inChild, Node inBefore) {
+  if (inBefore == 0) return LinkLast(inParent, inChild);
+  NodeRecord& child = nodes_[inChild];
+  NodeRecord& after = nodes_[inBefore];
+  child.parent = inParent;
+  child.previous = after.previous;
+  child.next = inBefore;
+  (after.previous == 0 ? nodes_[inParent].children.first : nodes_[after.previous].next) = inChild;
+  after.previous = inChild;
+  indexes_.Drop(inParent);
+}
+
+void DOM_Tree::Unlink(Node inChild) {
+  NodeRecord& child = nodes_[inChild];
+  NodeRecord& parent = nodes_[child.parent];
+  (child.previous == 0 ? parent.children.first : nodes_[child.previous].next) = child.next;
+  (child.next == 0 ? parent.children.last : nodes_[child.next].previous) = child.previous;
+  indexes_.Drop(child.parent);
+  child.parent = 0;
+  child.previous = 0;
+  child.next = 0;
+}
+
+// ---- changes
+
+void DOM_Tree::InsertOne(Node inParent, Node inChild, Node inBefore) {
+  if (inBefore == inChild) inBefore = At(inChild).next;
+  if (At(inChild).parent != 0) Remove(inChild);
+  Join(inParent, inChild);
+  LinkBefore(inParent, inChild, inBefore);
+  NoteChange(inParent);
+}
+
+void DOM_Tree::Insert(Node inParent, Node inChild, Node inBefore) {
+  if (At(inChild).kind != DOM_Node::DOCUMENT_FRAGMENT_NODE)
+    return InsertOne(inParent, inChild, inBefore);
+  for (Node at = FirstChild(inChild); at != 0; at = FirstChild(inChild))
+    InsertOne(inParent, at, inBefore);
+}
+
+void DOM_Tree::Remove(Node inChild) {
+  NodeRecord& child = nodes_[inChild];
+  NoteChange(child.parent);
+  // What leaves a detached tree stays in its group, from which it can no longer be reached.
+  if ((child.flags & kDetached) && !(child.flags & kListedRoot))
+    ListRoot(inChild, detached_.GroupOf(inChild));
+  Unlink(inChild);
+}
+
+void DOM_Tree::SetText(Node inNode, const DOM_Text* inText) {
+  nodes_[inNode].text = inText;
+  NoteChange(inNode);
+}
+
+void DOM_Tree::SetAttributeValue(Node inElement, Attribute inAttribute, const DOM_Text* inValue) {
+  attributes_[inAttribute].value = inValue;
+  NoteChange(inElement);
+}
+
+void DOM_Tree::SetAttribute(Node inElement, std::u16string_view inName, const DOM_Text* inValue) {
+  const Attribute known = FindAttribute(inElement, inName);
+  if (known != 0) return SetAttributeValue(inElement, known, inValue);
+  Attribute last = At(inElement).firstAttribute;
+  while (last != 0 && attributes_[last].next != 0) last = attributes_[last].next;
+  AppendNewAttribute(inElement, last, InternName(inName), inValue);
+  if (cursor_.element == inElement) cursor_ = AttributeCursor();
+  NoteChange(inElement);
+}
+
+void DOM_Tree::RemoveAttribute(Node inElement, std::u16string_view inName) {
+  const Attribute attribute = FindAttribute(inElement, inName);
+  if (attribute == 0) return;
+  Attribute* link = &nodes_[inElement].firstAttribute;
+  while (*link != attribute) link = &attributes_[*link].next;
+  *link = attributes_[attribute].next;
+  attributes_[attribute].next = 0;  // kept for the handles on it, until the document ends
+  if (cursor_.element == inElement) cursor_ = AttributeCursor();
+  NoteChange(inElement);
 }

@@ -3,13 +3,45 @@
 #define ZOR_DEFAULT_PLATFORM_XML_DOM_TREE_H
 
 #include <cstdint>
+#include <limits>
+#include <memory>
+#include <stdexcept>
 #include <vector>
 
-#include "default_platform/xml/ChunkedRecords.h"
 #include "default_platform/xml/DetachedNodes.h"
 #include "default_platform/xml/PositionIndexes.h"
 #include "default_platform/xml/TextStore.h"
 #include "platform/xml/DOM_Node.h"
+
+/// A growing array of records addressed by 32-bit numbers from 1. References stay valid while it
+/// grows, and growing copies nothing.
+template <typename Record>
+class ChunkedRecords {
+ public:
+  static constexpr std::uint32_t kChunkBits = 12;
+  static constexpr std::uint32_t kChunkSize = 1u << kChunkBits;
+
+  Record& operator[](std::uint32_t inNumber) {
+    return chunks_[inNumber >> kChunkBits][inNumber & (kChunkSize - 1)];
+  }
+  const Record& operator[](std::uint32_t inNumber) const {
+    return chunks_[inNumber >> kChunkBits][inNumber & (kChunkSize - 1)];
+  }
+  /// The number of a new record; its content is undefined.
+  std::uint32_t Add() {
+    if ((end_ >> kChunkBits) >= chunks_.size()) {
+      if (end_ > std::numeric_limits<std::uint32_t>::max() - kChunkSize)
+        throw std::length_error("a document has more than 4,294,000,000 nodes or attributes");
+      chunks_.emplace_back(new Record[kChunkSize]);
+    }
+    return end_++;
+  }
+  std::uint32_t End() const { return end_; }
+
+ private:
+  std::vector<std::unique_ptr<Record[]>> chunks_;
+  std::uint32_t end_ = 1;  // 0 means none
+};
 
 /// What a document type declaration says; null parts are not there.
 struct DocumentType {
@@ -26,7 +58,7 @@ struct DocumentType {
 /// as the document. A node that was only made is detached: it goes with the last handle on the nodes
 /// that can be reached from it (see DetachedNodes).
 ///
-/// Operations trust their arguments unless they say what they raise; nothing here recurses.
+/// Operations trust their arguments; the handles check them. Nothing here recurses.
 class DOM_Tree {
  public:
   using Node = std::uint32_t;
@@ -113,11 +145,10 @@ class DOM_Tree {
   Attribute FindAttribute(Node inElement, std::string_view inName) const;
   Node FirstChildOfKind(Node inParent, int inKind) const;
   const DOM_Text* NameText(Name inName) const { return names_.TextOf(inName); }
-  Name NameEnd() const { return names_.End(); }
+  Name NameEnd() const { return names_.End(); }  ///< one more than the largest
+  Node NodeEnd() const { return nodes_.End(); }
   const DocumentType& Doctype() const { return doctype_; }
   std::uint64_t ChangeCount() const { return changes_; }
-  /// Nodes in use, attached or not, the document node included.
-  std::uint32_t LiveNodes() const { return nodes_.End() - 1 - freeNodeCount_; }
 
   // Making parts; a node made here has no parent
   Name InternName(std::u16string_view inName) { return names_.Intern(inName); }
@@ -134,14 +165,11 @@ class DOM_Tree {
   /// @param inLast the element's last attribute so far, 0 for none.
   Attribute AppendNewAttribute(Node inElement, Attribute inLast, Name inName,
                                const DOM_Text* inValue);
-  void ReplaceText(Node inNode, const DOM_Text* inText) { nodes_[inNode].text = inText; }
   void SetDoctype(const DocumentType& inDoctype) { doctype_ = inDoctype; }
 
   // Changing
-  /// Puts a node (or a fragment's children) before inBefore, or last when that is 0; inReplaced is a
-  /// child that will leave at once and therefore does not count in the checks. Raises
-  /// DOM_DOMException.
-  void Insert(Node inParent, Node inChild, Node inBefore, Node inReplaced = 0);
+  /// Puts a node (or a fragment's children) before inBefore, or last when that is 0.
+  void Insert(Node inParent, Node inChild, Node inBefore);
   /// Takes a node away from its parent.
   void Remove(Node inChild);
   void SetText(Node inNode, const DOM_Text* inText);
@@ -179,11 +207,6 @@ class DOM_Tree {
     if (!(nodes_[inNode].flags & kDetached)) ++changes_;
   }
 
-  void CheckInsertion(Node inParent, Node inChild, Node inBefore, Node inReplaced) const;
-  void CheckKinds(Node inParent, Node inChild) const;
-  void CheckDocumentChildren(Node inChild, Node inBefore, Node inReplaced) const;
-  bool IsWithin(Node inNode, Node inRoot) const;
-
   std::uint32_t CountOf(Node inParent);
   const PositionIndexes::Children* IndexOf(Node inParent);
 
@@ -203,7 +226,6 @@ class DOM_Tree {
   ChunkedRecords<NodeRecord> nodes_;
   ChunkedRecords<AttributeRecord> attributes_;
   Node freeNode_ = 0;  // chained by next
-  std::uint32_t freeNodeCount_ = 0;
   Attribute freeAttribute_ = 0;  // chained by next
   DocumentType doctype_;
   DetachedNodes detached_;

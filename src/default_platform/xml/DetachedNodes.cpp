@@ -2,6 +2,8 @@
 
 #include <utility>
 
+#include "default_platform/xml/DOM_Tree.h"
+
 DetachedNodes::Group DetachedNodes::NewGroup() {
   if (freeGroups_.empty()) {
     groups_.emplace_back();
@@ -53,4 +55,111 @@ DetachedNodes::Chunk& DetachedNodes::ChunkFor(Node inNode) {
 void DetachedNodes::LeaveChunk(Node inNode) {
   std::unique_ptr<Chunk>& chunk = chunks_[inNode >> kChunkBits];
   if (--chunk->used == 0) spare_ = std::move(chunk);
+}
+
+// ---- what the tree does with them
+
+void DOM_Tree::AttachSubtree(Node inRoot) {
+  for (Node at = inRoot; at != 0; at = NextWithin(at, inRoot)) {
+    if (!(nodes_[at].flags & kDetached)) continue;
+    nodes_[at].flags = 0;
+    detached_.RemoveNode(at);
+  }
+}
+
+// A root of a group may since have been put into another tree of the group, or have been attached.
+bool DOM_Tree::IsRootOf(Node inNode, DetachedNodes::Group inGroup) const {
+  return (At(inNode).flags & kListedRoot) && detached_.GroupOf(inNode) == inGroup;
+}
+
+void DOM_Tree::ListRoot(Node inNode, DetachedNodes::Group inGroup) {
+  std::vector<Node>& roots = detached_.RootsOf(inGroup);
+  if (roots.size() > 2 * std::size_t{detached_.SizeOf(inGroup)} + 16)
+    std::erase_if(roots, [&](Node inRoot) { return !IsRootOf(inRoot, inGroup); });
+  roots.push_back(inNode);
+  nodes_[inNode].flags |= kListedRoot;
+}
+
+std::vector<DOM_Tree::Node> DOM_Tree::ParentlessRoots(DetachedNodes::Group inGroup) const {
+  std::vector<Node> roots;
+  for (const Node root : detached_.RootsOf(inGroup))
+    if (IsRootOf(root, inGroup) && At(root).parent == 0) roots.push_back(root);
+  return roots;
+}
+
+void DOM_Tree::AttachGroup(DetachedNodes::Group inGroup) {
+  for (const Node root : ParentlessRoots(inGroup)) AttachSubtree(root);
+}
+
+void DOM_Tree::EndGroupWhenUnused(DetachedNodes::Group inGroup) {
+  if (detached_.SizeOf(inGroup) == 0)
+    detached_.FreeGroup(inGroup);
+  else if (detached_.HandlesOf(inGroup) == 0)
+    Reclaim(inGroup);
+}
+
+void DOM_Tree::MergeGroups(Node inParent, Node inChild) {
+  DetachedNodes::Group stays = detached_.GroupOf(inParent);
+  DetachedNodes::Group goes = detached_.GroupOf(inChild);
+  if (stays == goes) return;
+  // Moving the smaller one keeps the sum of all moves at n log n.
+  if (detached_.SizeOf(stays) < detached_.SizeOf(goes)) std::swap(stays, goes);
+  for (const Node root : detached_.RootsOf(goes))
+    if (IsRootOf(root, goes)) ListRoot(root, stays);
+  for (const Node root : ParentlessRoots(goes))
+    for (Node at = root; at != 0; at = NextWithin(at, root)) detached_.MoveNode(at, stays);
+  detached_.FreeGroup(goes);
+}
+
+void DOM_Tree::Join(Node inParent, Node inChild) {
+  const bool isParentDetached = nodes_[inParent].flags & kDetached;
+  const bool isChildDetached = nodes_[inChild].flags & kDetached;
+  if (isParentDetached && isChildDetached) return MergeGroups(inParent, inChild);
+  if (!isParentDetached && !isChildDetached) return;
+  // Handles on attached nodes are not counted one by one, so where both meet all become attached.
+  const DetachedNodes::Group group = detached_.GroupOf(isChildDetached ? inChild : inParent);
+  if (isChildDetached)
+    AttachSubtree(inChild);
+  else
+    AttachGroup(group);
+  EndGroupWhenUnused(group);
+}
+
+void DOM_Tree::Reclaim(DetachedNodes::Group inGroup) {
+  for (const Node root : ParentlessRoots(inGroup)) FreeSubtree(root);
+  detached_.FreeGroup(inGroup);
+}
+
+void DOM_Tree::FreeSubtree(Node inRoot) {
+  Node at = inRoot;
+  while (at != 0) {
+    // Children first: a node goes when it has none left.
+    const Node child = FirstChild(at);
+    if (child != 0) {
+      nodes_[at].children.first = nodes_[child].next;
+      at = child;
+      continue;
+    }
+    const Node parent = at == inRoot ? 0 : nodes_[at].parent;
+    FreeOne(at);
+    at = parent;
+  }
+}
+
+void DOM_Tree::FreeOne(Node inNode) {
+  NodeRecord& record = nodes_[inNode];
+  Attribute attribute = record.firstAttribute;
+  while (attribute != 0) {
+    const Attribute next = attributes_[attribute].next;
+    attributes_[attribute].next = freeAttribute_;
+    freeAttribute_ = attribute;
+    attribute = next;
+  }
+  if (cursor_.element == inNode) cursor_ = AttributeCursor();
+  indexes_.Drop(inNode);
+  detached_.RemoveNode(inNode);
+  record = NodeRecord();
+  record.flags = kFree;
+  record.next = freeNode_;
+  freeNode_ = inNode;
 }

@@ -6,8 +6,6 @@
 #include <memory>
 #include <vector>
 
-#include "default_platform/xml/ChunkedRecords.h"
-
 /// Nodes that were made but not yet put into the document's tree are kept in groups: the nodes that
 /// can be reached from one another, and what was taken out of them. A group counts its handles;
 /// when the last one goes, its nodes can be used again. Each node counts its handles too, so that a

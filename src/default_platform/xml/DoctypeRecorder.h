@@ -15,7 +15,7 @@ class DoctypeRecorder {
  public:
   void AddComment(const char16_t* inText);
   void AddProcessingInstruction(const char16_t* inTarget, const char16_t* inData);
-  /// White space between declarations; what stands within one is written anew.
+  /// White space between declarations; that within one is not kept.
   void AddWhitespace(const char16_t* inText, std::size_t inCount);
   void AddElement(const xercesc::DTDElementDecl& inElement);
   void StartAttributes(const xercesc::DTDElementDecl& inElement);

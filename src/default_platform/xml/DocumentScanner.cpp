@@ -8,20 +8,21 @@
 #include <xercesc/util/OutOfMemoryException.hpp>
 #include <xercesc/util/XMLUniDefs.hpp>
 
-#include "default_platform/xml/OneLineReason.h"
 #include "platform/xml/ZORXMLParseError.h"
 
 namespace {
 
-constexpr std::uint32_t kDeepest = 1'000'000;
-constexpr std::uint64_t kMostTextUnits = std::uint64_t{128} * 1024 * 1024;
-constexpr XMLSize_t kMostExpansions = 50'000;
+constexpr std::uint32_t kMaxDepth = 1'000'000;
+constexpr std::uint64_t kMaxTextUnits = std::uint64_t{128} * 1024 * 1024;
+constexpr XMLSize_t kMaxExpansions = 50'000;
 
-// A document holds no more text than its bytes have, unless entities or default attributes multiply
-// it. So much may come from there.
-constexpr std::uint64_t kMostMultiplied = std::uint64_t{8} * 1024 * 1024;
+// Entities and default attributes may add so much to the text that the bytes hold.
+constexpr std::uint64_t kMaxMultiplied = std::uint64_t{8} * 1024 * 1024;
 constexpr std::uint64_t kUnitsOfNode = 4;  // "<a/>"
 constexpr std::uint64_t kUnitsOfAttribute = 4;
+
+constexpr std::size_t kMaxReason = 400;  // a name in a message may be as long as the document
+constexpr std::u16string_view kWrapper = u"Message:";
 
 struct EmptyDocument {};
 
@@ -35,16 +36,33 @@ bool IsSame(std::u16string_view inKnown, const char16_t* inText) {
   return *inText == 0;
 }
 
+/// A reason of the library as one line of narrow text.
+std::string OneLineReason(const char16_t* inText) {
+  std::u16string text = inText == nullptr ? u"" : inText;
+  // The library wraps its own exceptions as "An exception occurred! Type:…, Message:…".
+  const std::size_t wrapped = text.find(kWrapper);
+  if (wrapped != std::u16string::npos && text.starts_with(u"An exception occurred"))
+    text.erase(0, wrapped + kWrapper.size());
+  if (text.size() > kMaxReason) text = text.substr(0, kMaxReason) + u"…";
+  for (char16_t& unit : text)
+    if (unit < u' ' || unit == 0x7F || unit == 0x85 || unit == 0x2028 || unit == 0x2029)
+      unit = u' ';
+  if (text.empty()) return "the XML library gives no reason";
+  ZORUnicodeString reason;
+  reason.BuildFromUTF16(text.data(), text.size());
+  return reason.ConvertToChar();
+}
+
 }  // namespace
 
 DocumentScanner::DocumentScanner(ScannerMemory& ioMemory, ByteReader& ioReader, Kind inKind)
     : xercesc::SAXParser(nullptr, &ioMemory),
       reader_(ioReader),
       kind_(inKind),
-      plainText_(ioReader),
+      utf8Text_(ioReader),
       document_(DOM_Document::createDocument()),
       tree_(DOM_HandleAccess::TreeOf(document_)) {
-  if (kind_ == kPlain) useScanner(xercesc::XMLUni::fgWFXMLScanner);
+  if (kind_ == kUtf8) useScanner(xercesc::XMLUni::fgWFXMLScanner);
   setValidationScheme(Val_Never);
   setDoNamespaces(false);
   setDoSchema(false);
@@ -52,8 +70,9 @@ DocumentScanner::DocumentScanner(ScannerMemory& ioMemory, ByteReader& ioReader, 
   setLoadSchema(false);
   setDisableDefaultEntityResolution(true);
   setExitOnFirstFatalError(true);
-  limits_.setEntityExpansionLimit(kMostExpansions);
-  // The plain scanner knows no entities but "&amp;" and its like, yet would count these.
+  limits_.setEntityExpansionLimit(kMaxExpansions);
+  // The scanner for well-formed text knows no entities but "&amp;" and its like, yet would count
+  // them.
   if (kind_ == kAny) setSecurityManager(&limits_);
   // The handlers are never called, since this class answers first; they make the scanner report.
   setDocumentHandler(&unused_);
@@ -77,8 +96,8 @@ DOM_Document DocumentScanner::Scan(const std::string& inName) {
 
 void DocumentScanner::RunScanner(const std::string& inName) {
   try {
-    if (kind_ == kPlain)
-      parse(PlainEntity(plainText_));
+    if (kind_ == kUtf8)
+      parse(Utf8Entity(utf8Text_));
     else
       parse(ReaderEntity(reader_, inName));
   } catch (const ScannerMemoryExhausted& failure) {
@@ -104,15 +123,15 @@ void DocumentScanner::FailHere(const std::string& inReason) const {
 
 void DocumentScanner::Charge(std::uint64_t inUnits) {
   charged_ += inUnits;
-  if (charged_ > reader_.Given() + kMostMultiplied)
+  if (charged_ > reader_.BytesRead() + kMaxMultiplied)
     FailHere("entities or default attributes expand to too much text");
 }
 
 // ---- content
 
-// The plain scanner passes over a document type.
+// The scanner for well-formed text skips a document type.
 void DocumentScanner::CheckProlog() const {
-  if (kind_ == kPlain && plainText_.MayHaveDoctype()) throw NotPlain();
+  if (kind_ == kUtf8 && utf8Text_.MayHaveDoctype()) throw NeedsFullScanner();
 }
 
 void DocumentScanner::startElement(const xercesc::XMLElementDecl& inElement, const unsigned int,
@@ -127,12 +146,12 @@ void DocumentScanner::startElement(const xercesc::XMLElementDecl& inElement, con
       tree_->AppendNew(current_, DOM_Node::ELEMENT_NODE, shape.name, nullptr);
   AddAttributes(element, shape, inAttributes, inCount);
   if (inIsEmpty) return;
-  if (++depth_ > kDeepest) FailHere("elements are nested deeper than 1,000,000");
+  if (++depth_ > kMaxDepth) FailHere("elements are nested deeper than 1,000,000");
   current_ = element;
 }
 
 DocumentScanner::ElementShape& DocumentScanner::ShapeOf(const xercesc::XMLElementDecl& inElement) {
-  // Kinds lie in memory a few hundred bytes apart.
+  // Declarations lie a few hundred bytes apart.
   const auto place = reinterpret_cast<std::uintptr_t>(&inElement);
   RecentShape& recent = recent_[((place >> 5) ^ (place >> 11)) % recent_.size()];
   if (recent.kind == &inElement) return *recent.shape;
@@ -174,7 +193,7 @@ void DocumentScanner::docCharacters(const XMLCh* const inText, const XMLSize_t i
     tree_->AppendNew(current_, DOM_Node::CDATA_SECTION_NODE, 0, tree_->AddText({inText, inCount}));
     return;
   }
-  if (text_.size() + inCount > kMostTextUnits) FailHere("a text is too large");
+  if (text_.size() + inCount > kMaxTextUnits) FailHere("a text is too large");
   text_.append(inText, inCount);
 }
 
@@ -204,7 +223,7 @@ void DocumentScanner::docPI(const XMLCh* const inTarget, const XMLCh* const inDa
                    tree_->InternName(View(inTarget)), tree_->AddText(data));
 }
 
-// The scanner takes whatever begins with "1." for a version.
+// The scanner accepts any version that begins with "1.".
 void DocumentScanner::XMLDecl(const XMLCh* const inVersion, const XMLCh* const, const XMLCh* const,
                               const XMLCh* const) {
   const std::u16string_view version = View(inVersion);

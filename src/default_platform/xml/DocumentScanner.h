@@ -13,8 +13,8 @@
 #include "default_platform/xml/ByteSource.h"
 #include "default_platform/xml/DOM_HandleAccess.h"
 #include "default_platform/xml/DoctypeRecorder.h"
-#include "default_platform/xml/PlainText.h"
 #include "default_platform/xml/ScannerMemory.h"
+#include "default_platform/xml/Utf8FastPath.h"
 
 /// Where and why a scan ended; the line is 0 when there is no place.
 struct ScanFailure {
@@ -27,15 +27,15 @@ struct ScanFailure {
 /// tree takes five times the time and the memory. One object reads one document.
 class DocumentScanner : private xercesc::SAXParser {
  public:
-  /// kPlain: only UTF-8 without a document type, for which the library has a faster scanner. Of such
-  /// documents both give the same tree.
-  enum Kind { kPlain, kAny };
+  /// kUtf8: only UTF-8 without a document type, for which the library has a faster scanner. Both give
+  /// the same tree of such documents.
+  enum Kind { kUtf8, kAny };
 
   DocumentScanner(ScannerMemory& ioMemory, ByteReader& ioReader, Kind inKind);
   ~DocumentScanner() override;
 
   /// @param inName what the library's messages may call the text by.
-  /// @return the document; without root when the text is empty. Raises ScanFailure; NotPlain for a
+  /// @return the document; without root when the text is empty. Raises ScanFailure; NeedsFullScanner for a
   /// document of another kind; ZORXMLParseError when the bytes cannot be read.
   DOM_Document Scan(const std::string& inName);
 
@@ -46,8 +46,8 @@ class DocumentScanner : private xercesc::SAXParser {
     DOM_Tree::Name name = 0;
     TextSeries values;
   };
-  // A kind of element, and the attributes of the last one of that kind: the next one very likely
-  // has the same in the same order.
+  // The attributes of the last element of a kind: the next one very likely has the same ones in the
+  // same order.
   struct ElementShape {
     DOM_Tree::Name name = 0;
     std::vector<AttributeShape> attributes;
@@ -111,7 +111,7 @@ class DocumentScanner : private xercesc::SAXParser {
 
   ByteReader& reader_;
   const Kind kind_;
-  PlainText plainText_;
+  Utf8FastPath utf8Text_;
   xercesc::HandlerBase unused_;
   xercesc::SecurityManager limits_;
 

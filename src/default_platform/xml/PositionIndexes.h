@@ -2,8 +2,10 @@
 #ifndef ZOR_DEFAULT_PLATFORM_XML_POSITIONINDEXES_H
 #define ZOR_DEFAULT_PLATFORM_XML_POSITIONINDEXES_H
 
+#include <algorithm>
 #include <array>
 #include <cstdint>
+#include <utility>
 #include <vector>
 
 /// The children of a few parents as arrays. A host that walks by position asks for the length and
@@ -35,5 +37,42 @@ class PositionIndexes {
   std::uint64_t age_ = 0;
   bool any_ = false;
 };
+
+inline PositionIndexes::Index* PositionIndexes::Of(std::uint32_t inParent) {
+  if (!any_) return nullptr;
+  for (Index& index : indexes_)
+    if (index.parent == inParent) return &index;
+  return nullptr;
+}
+
+inline const PositionIndexes::Children* PositionIndexes::Find(std::uint32_t inParent) {
+  Index* const index = Of(inParent);
+  if (index == nullptr) return nullptr;
+  index->worth = age_ + index->children.size();
+  return &index->children;
+}
+
+inline const PositionIndexes::Children& PositionIndexes::Keep(std::uint32_t inParent,
+                                                              Children inChildren) {
+  Index& cheapest =
+      *std::min_element(indexes_.begin(), indexes_.end(),
+                        [](const Index& inA, const Index& inB) { return inA.worth < inB.worth; });
+  age_ = std::max(age_, cheapest.worth);
+  cheapest.parent = inParent;
+  cheapest.children = std::move(inChildren);
+  cheapest.worth = age_ + cheapest.children.size();
+  any_ = true;
+  return cheapest.children;
+}
+
+inline void PositionIndexes::Drop(std::uint32_t inParent) {
+  Index* const index = Of(inParent);
+  if (index != nullptr) *index = Index();
+}
+
+inline void PositionIndexes::Append(std::uint32_t inParent, std::uint32_t inChild) {
+  Index* const index = Of(inParent);
+  if (index != nullptr) index->children.push_back(inChild);
+}
 
 #endif

@@ -10,31 +10,31 @@
 #include <xercesc/sax/Locator.hpp>
 #include <xercesc/util/PlatformUtils.hpp>
 
-/// Raised where a scanner's memory is used up; the scanner lets it pass.
+/// Raised when the limit is reached; the scanner lets it pass.
 struct ScannerMemoryExhausted {
   std::uint64_t line;
   std::uint64_t column;
 };
 
-/// Gives a scanner memory up to a limit. A scanner keeps little between two events, so that only a
-/// single name, value or text without end, or an entity that grows inside a value, comes near it, and documents with a million different names.
+/// Gives a scanner memory up to a limit. A scanner keeps little between two events: only a huge name,
+/// value or text, an entity that grows inside a value, or a million different names come near it.
 class ScannerMemory : public xercesc::MemoryManager {
  public:
   ScannerMemory() = default;
-  /// Frees what the scanner forgot, as it does after some errors in a document type.
+  /// Frees what the scanner leaks after some errors in a document type.
   ~ScannerMemory() override {
     while (blocks_.next != &blocks_) Free(blocks_.next);
   }
   ScannerMemory(const ScannerMemory&) = delete;
   ScannerMemory& operator=(const ScannerMemory&) = delete;
 
-  static constexpr std::size_t kMost = std::size_t{400} * 1024 * 1024;
+  static constexpr std::size_t kMaxBytes = std::size_t{400} * 1024 * 1024;
 
   /// @param inPlace where the scanner is, for errors; null for nowhere. Lives as long as the scanner.
   void SetPlace(const xercesc::Locator* inPlace) { place_ = inPlace; }
 
   void* allocate(XMLSize_t inBytes) override {
-    if (inBytes > kMost - used_) Fail();
+    if (inBytes > kMaxBytes - used_) Fail();
     void* const block = std::malloc(sizeof(Head) + inBytes);
     if (block == nullptr) throw std::bad_alloc();
     used_ += inBytes;

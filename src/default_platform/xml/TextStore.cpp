@@ -6,15 +6,15 @@
 
 namespace {
 constexpr std::size_t kFirstBlock = std::size_t{4} * 1024;
-constexpr std::size_t kLargestBlock = std::size_t{1024} * 1024;
+constexpr std::size_t kMaxBlock = std::size_t{1024} * 1024;
 constexpr std::size_t kFirstSlots = 64;
-constexpr std::uint32_t kNewForLong = 100;
+constexpr std::uint32_t kMaxNewInARow = 100;
 }  // namespace
 
 TextStore::TextStore() : nextBlock_(kFirstBlock), shared_(new Shared[kSharedSlots]()) {}
 
 const DOM_Text* TextStore::Add(std::u16string_view inText) {
-  if (inText.size() > kLongestShared) return AddUnshared(inText);
+  if (inText.size() > kMaxShared) return AddUnshared(inText);
   const std::uint64_t hash = HashOfText(inText);
   Shared& slot = shared_[hash % kSharedSlots];
   if (slot.hash != hash || slot.text == nullptr || !IsSameText(slot.text->View(), inText))
@@ -27,7 +27,7 @@ const DOM_Text* TextStore::Add(std::u16string_view inText, TextSeries& ioSeries)
     ioSeries.newInARow = 0;
     return ioSeries.last;
   }
-  if (ioSeries.newInARow == kNewForLong) return ioSeries.last = AddUnshared(inText);
+  if (ioSeries.newInARow == kMaxNewInARow) return ioSeries.last = AddUnshared(inText);
   const char* const before = free_;
   ioSeries.last = Add(inText);
   ioSeries.newInARow = free_ == before ? 0 : ioSeries.newInARow + 1;
@@ -59,7 +59,7 @@ char* TextStore::AllocateBlock(std::size_t inBytes) {
   blocks_.emplace_back(new char[nextBlock_]);
   free_ = blocks_.back().get();
   end_ = free_ + nextBlock_;
-  nextBlock_ = std::min(nextBlock_ * 2, kLargestBlock);
+  nextBlock_ = std::min(nextBlock_ * 2, kMaxBlock);
   return Allocate(inBytes);
 }
 

@@ -2,33 +2,76 @@
 #ifndef ZOR_DEFAULT_PLATFORM_XML_TEXTSTORE_H
 #define ZOR_DEFAULT_PLATFORM_XML_TEXTSTORE_H
 
-#include <array>
 #include <cstddef>
+#include <cstdint>
+#include <cstring>
 #include <memory>
+#include <string_view>
 #include <vector>
 
-#include "default_platform/xml/DOM_Text.h"
+/// An immutable UTF-16 text: this head, then the code units. It lies in the arena of a tree, or in a
+/// counted block of its own (see OwnedText in DOMString.cpp).
+struct DOM_Text {
+  std::uint32_t length;
 
-/// What was met of the texts that come from one place, such as one attribute of one kind of element.
+  const char16_t* Units() const { return reinterpret_cast<const char16_t*>(this + 1); }
+  char16_t* Units() { return reinterpret_cast<char16_t*>(this + 1); }
+  std::u16string_view View() const { return {Units(), length}; }
+};
+
+/// As ==, which the standard library does unit by unit.
+inline bool IsSameText(std::u16string_view inA, std::u16string_view inB) {
+  return inA.size() == inB.size() &&
+         (inA.empty() || std::memcmp(inA.data(), inB.data(), inA.size() * sizeof(char16_t)) == 0);
+}
+
+/// The same for an ASCII text; bytes beyond ASCII are taken as Latin-1.
+inline bool IsSameText(std::u16string_view inText, std::string_view inAscii) {
+  if (inText.size() != inAscii.size()) return false;
+  for (std::size_t i = 0; i < inAscii.size(); ++i)
+    if (inText[i] != static_cast<unsigned char>(inAscii[i])) return false;
+  return true;
+}
+
+/// A fast hash of UTF-16 text, eight bytes at a time.
+inline std::uint64_t HashOfText(std::u16string_view inText) {
+  constexpr std::uint64_t kFactor = 0x9E3779B97F4A7C15u;
+  std::uint64_t hash = inText.size() * kFactor;
+  const char16_t* at = inText.data();
+  std::size_t left = inText.size() * sizeof(char16_t);
+  for (; left >= 8; left -= 8, at += 4) {
+    std::uint64_t part;
+    std::memcpy(&part, at, 8);
+    hash = (hash ^ part) * kFactor;
+    hash ^= hash >> 29;
+  }
+  if (left > 0) {
+    std::uint64_t part = 0;
+    std::memcpy(&part, at, left);
+    hash = (hash ^ part) * kFactor;
+  }
+  return hash ^ (hash >> 32);
+}
+
+/// The recent texts of one source, such as one attribute of one kind of element.
 struct TextSeries {
   const DOM_Text* last = nullptr;
   std::uint32_t newInARow = 0;
 };
 
-/// Keeps texts in a few large blocks until it ends. Short texts that were met lately are kept once:
-/// documents repeat their indentation, "NO", "0" and the like.
+/// An arena of texts. Short recent ones are stored once: documents repeat their indentation, "NO",
+/// "0" and the like.
 class TextStore {
  public:
   TextStore();
   const DOM_Text* Add(std::u16string_view inText);
-  /// As Add. An equal text is no longer looked for, except the last one, where the texts of the
-  /// series were all different for long: numbers mostly are.
+  /// As Add. After a long run of different texts, as of numbers, only the last one is compared.
   const DOM_Text* Add(std::u16string_view inText, TextSeries& ioSeries);
   /// As Add, without looking for an equal text.
   const DOM_Text* AddUnshared(std::u16string_view inText);
 
  private:
-  /// A text met lately, with its hash, so that most others are told apart without being read.
+  /// A recent text with its hash, so that most others need not be compared.
   struct Shared {
     std::uint64_t hash;
     const DOM_Text* text;
@@ -37,7 +80,7 @@ class TextStore {
   char* AllocateBlock(std::size_t inBytes);
 
   static constexpr std::size_t kSharedSlots = 4096;
-  static constexpr std::size_t kLongestShared = 64;
+  static constexpr std::size_t kMaxShared = 64;
 
   std::vector<std::unique_ptr<char[]>> blocks_;
   char* free_ = nullptr;

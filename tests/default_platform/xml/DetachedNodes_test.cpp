@@ -16,7 +16,11 @@ using support::WrittenText;
 
 namespace {
 std::uint32_t LiveNodes(const DOM_Node& inNode) {
-  return DOM_HandleAccess::TreeOf(inNode)->LiveNodes();
+  const DOM_Tree& tree = *DOM_HandleAccess::TreeOf(inNode);
+  std::uint32_t live = 0;
+  for (DOM_Tree::Node node = DOM_Tree::kDocument; node < tree.NodeEnd(); ++node)
+    live += (tree.At(node).flags & DOM_Tree::kFree) == 0;
+  return live;
 }
 }  // namespace
 

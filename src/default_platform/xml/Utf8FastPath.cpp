@@ -1,4 +1,4 @@
-#include "default_platform/xml/PlainText.h"
+#include "default_platform/xml/Utf8FastPath.h"
 
 #include <algorithm>
 #include <bit>
@@ -56,47 +56,47 @@ bool HasReplacement(std::u16string_view inText) {
   return inText.find(ZORDefault::kReplacementCharacter) != std::u16string_view::npos;
 }
 
-class PlainStream : public xercesc::BinInputStream {
+class Utf8Stream : public xercesc::BinInputStream {
  public:
-  explicit PlainStream(PlainText& ioText) : text_(ioText) {}
-  XMLFilePos curPos() const override { return given_; }
-  XMLSize_t readBytes(XMLByte* const outBytes, const XMLSize_t inMost) override {
+  explicit Utf8Stream(Utf8FastPath& ioText) : text_(ioText) {}
+  XMLFilePos curPos() const override { return bytesRead_; }
+  XMLSize_t readBytes(XMLByte* const outBytes, const XMLSize_t inMax) override {
     const XMLSize_t count =
-        text_.Read(reinterpret_cast<char16_t*>(outBytes), inMost / sizeof(char16_t)) *
+        text_.Read(reinterpret_cast<char16_t*>(outBytes), inMax / sizeof(char16_t)) *
         sizeof(char16_t);
-    given_ += count;
+    bytesRead_ += count;
     return count;
   }
   const XMLCh* getContentType() const override { return nullptr; }
 
  private:
-  PlainText& text_;
-  XMLFilePos given_ = 0;
+  Utf8FastPath& text_;
+  XMLFilePos bytesRead_ = 0;
 };
 
 }  // namespace
 
-PlainText::PlainText(ByteReader& ioReader) : reader_(ioReader), bytes_(new char[kMostBytes]) {}
+Utf8FastPath::Utf8FastPath(ByteReader& ioReader) : reader_(ioReader), bytes_(new char[kMaxBytes]) {}
 
-std::size_t PlainText::Read(char16_t* outUnits, std::size_t inMost) {
-  std::string_view bytes = NextBytes(std::min(inMost, kMostBytes));
+std::size_t Utf8FastPath::Read(char16_t* outUnits, std::size_t inMax) {
+  std::string_view bytes = NextBytes(std::min(inMax, kMaxBytes));
   if (bytes.empty()) return 0;
   if (++reads_ == 1) bytes = WithoutMark(bytes);
   last_ = bytes;
   const std::size_t count = ZORDefault::DecodeUtf8(bytes, outUnits);
-  if (HasReplacement({outUnits, count})) throw NotPlain();
+  if (HasReplacement({outUnits, count})) throw NeedsFullScanner();
   return count;
 }
 
 // Whole characters only; the start of one whose end has not been read stays for the next time.
-std::string_view PlainText::NextBytes(std::size_t inMost) {
+std::string_view Utf8FastPath::NextBytes(std::size_t inMax) {
   std::size_t count = filled_ - used_;
   std::memmove(bytes_.get(), bytes_.get() + used_, count);
   std::size_t unfinished = 0;
   do {
     const std::size_t added =
-        reader_.Read(reinterpret_cast<unsigned char*>(bytes_.get()) + count, inMost - count);
-    if (added == 0 && count != 0) throw NotPlain();  // ends within a character
+        reader_.Read(reinterpret_cast<unsigned char*>(bytes_.get()) + count, inMax - count);
+    if (added == 0 && count != 0) throw NeedsFullScanner();  // ends within a character
     count += added;
     unfinished = UnfinishedBytes({bytes_.get(), count});
   } while (count != 0 && unfinished == count);
@@ -105,20 +105,20 @@ std::string_view PlainText::NextBytes(std::size_t inMost) {
   return {bytes_.get(), used_};
 }
 
-std::string_view PlainText::WithoutMark(std::string_view inText) {
+std::string_view Utf8FastPath::WithoutMark(std::string_view inText) {
   if (inText.starts_with(kByteOrderMark)) inText.remove_prefix(kByteOrderMark.size());
   const bool isText = !inText.empty() && kFirstBytes.find(inText[0]) != std::string_view::npos;
-  if (!isText || !DeclaresUtf8(inText)) throw NotPlain();
+  if (!isText || !DeclaresUtf8(inText)) throw NeedsFullScanner();
   return inText;
 }
 
-bool PlainText::MayHaveDoctype() const {
+bool Utf8FastPath::MayHaveDoctype() const {
   return reads_ != 1 || last_.find("<!DOCTYPE") != std::string_view::npos;
 }
 
-PlainEntity::PlainEntity(PlainText& ioText) : text_(ioText) {
+Utf8Entity::Utf8Entity(Utf8FastPath& ioText) : text_(ioText) {
   setEncoding(std::endian::native == std::endian::little ? xercesc::XMLUni::fgUTF16LEncodingString
                                                          : xercesc::XMLUni::fgUTF16BEncodingString);
 }
 
-xercesc::BinInputStream* PlainEntity::makeStream() const { return new PlainStream(text_); }
+xercesc::BinInputStream* Utf8Entity::makeStream() const { return new Utf8Stream(text_); }
