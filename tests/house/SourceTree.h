@@ -17,6 +17,10 @@ std::vector<SourceFile> ReadTree(const std::filesystem::path& inRoot);
 
 /// The lines that include what their file must not see, as "path:line: reason".
 std::vector<std::string> FindWrongIncludes(const std::vector<SourceFile>& inTree);
+
+/// The lines below inFolder that hold a match of a regular expression, as "path:line: text".
+std::vector<std::string> FindLines(const std::vector<SourceFile>& inTree,
+                                   const std::string& inFolder, const std::string& inPattern);
 }  // namespace house
 
 #endif

@@ -4,6 +4,8 @@
 #include <gtest/gtest.h>
 
 #include <fstream>
+#include <regex>
+#include <set>
 
 namespace fs = std::filesystem;
 using house::FindWrongIncludes;
@@ -16,18 +18,33 @@ using testing::StartsWith;
 namespace {
 std::vector<house::SourceFile> ThisProject() { return house::ReadTree(ZOR_SOURCE_DIR); }
 
-/// The wrong includes of one file that stands beside one header of each kind.
-std::vector<std::string> WrongIncludesOf(const std::string& inPath, const std::string& inInclude) {
-  return FindWrongIncludes({
+/// Whether a file may have this `#include`, in a tree with one header of each kind.
+bool MayInclude(const std::string& inPath, const std::string& inInclude) {
+  const auto wrong = FindWrongIncludes({
       {"include/ZORReader.h", {}},
       {"src/StaticOrder.h", {}},
       {"src/clash_reading/Walk.h", {}},
       {"src/default_platform/Front.h", {}},
       {"src/default_platform/xml/Tree.h", {}},
+      {"src/foundation/Hash.h", {}},
       {"src/platform/xml/DOM_Node.h", {}},
+      {"src/toolkit/records/Record.h", {}},
+      {"tools/lyra/Verbs.h", {}},
       {inPath, {"// first line", "#include " + inInclude}},
   });
+  return wrong.empty();
 }
+
+constexpr const char* kPublic = "\"ZORReader.h\"";
+constexpr const char* kPlatform = "\"platform/xml/DOM_Node.h\"";
+constexpr const char* kGroup = "\"clash_reading/Walk.h\"";
+constexpr const char* kFoundation = "\"foundation/Hash.h\"";
+constexpr const char* kDefaultPlatform = "\"default_platform/xml/Tree.h\"";
+constexpr const char* kFront = "\"default_platform/Front.h\"";
+constexpr const char* kToolkit = "\"toolkit/records/Record.h\"";
+constexpr const char* kTool = "\"lyra/Verbs.h\"";
+constexpr const char* kThirdParty = "<xercesc/dom/DOM.hpp>";
+constexpr const char* kSystem = "<unistd.h>";
 }  // namespace
 
 TEST(SourceTree, ReadFindsThisProjectWithoutBuildAndSamples) {
@@ -54,64 +71,137 @@ TEST(SourceTree, ReadGivesPathsAndLines) {
 
 TEST(IncludeArrows, HoldInThisProject) { EXPECT_THAT(FindWrongIncludes(ThisProject()), IsEmpty()); }
 
-TEST(IncludeArrows, LibraryMayNotSeeTheDefaultPlatform) {
-  EXPECT_THAT(WrongIncludesOf("src/clash_reading/A.cpp", "\"default_platform/xml/Tree.h\""),
-              ElementsAre("src/clash_reading/A.cpp:2: must not include "
-                          "default_platform/xml/Tree.h"));
-  EXPECT_THAT(WrongIncludesOf("src/clash_reading/A.cpp", "\"default_platform/Front.h\""),
-              testing::SizeIs(1));
+TEST(IncludeArrows, AnswerNamesTheLine) {
+  EXPECT_THAT(
+      FindWrongIncludes({{"src/clash_reading/A.cpp", {"#include <vector>", "#include <x/y.h>"}}}),
+      ElementsAre("src/clash_reading/A.cpp:2: must not include x/y.h"));
 }
 
-TEST(IncludeArrows, LibraryMayNotSeeThirdPartiesOrTheSystem) {
-  EXPECT_THAT(WrongIncludesOf("src/path_text/A.cpp", "<xercesc/dom/DOM.hpp>"), testing::SizeIs(1));
-  EXPECT_THAT(WrongIncludesOf("src/path_text/A.cpp", "<unistd.h>"), testing::SizeIs(1));
-  EXPECT_THAT(WrongIncludesOf("src/path_text/A.cpp", "<windows.h>"), testing::SizeIs(1));
-}
-
-TEST(IncludeArrows, LibraryMayNotSeeAnotherGroup) {
-  EXPECT_THAT(WrongIncludesOf("src/path_text/A.cpp", "\"clash_reading/Walk.h\""),
-              testing::SizeIs(1));
-}
-
-TEST(IncludeArrows, LibraryMaySeeItsOwnGroupPublicHeadersAndThePlatform) {
-  for (const char* include : {"\"clash_reading/Walk.h\"", "\"ZORReader.h\"", "\"StaticOrder.h\"",
-                              "\"platform/xml/DOM_Node.h\"", "<vector>"}) {
-    EXPECT_THAT(WrongIncludesOf("src/clash_reading/A.cpp", include), IsEmpty()) << include;
+TEST(IncludeArrows, LibrarySeesItsOwnGroupPublicHeadersAndThePlatform) {
+  for (const char* include : {kGroup, kPublic, kPlatform, "\"StaticOrder.h\"", "<vector>"}) {
+    EXPECT_TRUE(MayInclude("src/clash_reading/A.cpp", include)) << include;
   }
+  for (const char* include : {kDefaultPlatform, kFront, kFoundation, kToolkit, kTool, kThirdParty,
+                              kSystem, "<windows.h>"}) {
+    EXPECT_FALSE(MayInclude("src/clash_reading/A.cpp", include)) << include;
+  }
+  EXPECT_FALSE(MayInclude("src/path_text/A.cpp", kGroup));
 }
 
 TEST(IncludeArrows, PublicHeadersSeeThePlatformAlone) {
-  EXPECT_THAT(WrongIncludesOf("include/A.h", "\"platform/xml/DOM_Node.h\""), IsEmpty());
-  EXPECT_THAT(WrongIncludesOf("include/A.h", "\"ZORLyraExport.h\""), IsEmpty());
-  EXPECT_THAT(WrongIncludesOf("include/A.h", "\"clash_reading/Walk.h\""), testing::SizeIs(1));
-  EXPECT_THAT(WrongIncludesOf("include/A.h", "\"StaticOrder.h\""), testing::SizeIs(1));
-  EXPECT_THAT(WrongIncludesOf("include/A.h", "<fmt/format.h>"), testing::SizeIs(1));
+  for (const char* include : {kPublic, kPlatform, "\"ZORLyraExport.h\""}) {
+    EXPECT_TRUE(MayInclude("include/A.h", include)) << include;
+  }
+  for (const char* include :
+       {kGroup, kFront, kFoundation, kToolkit, kThirdParty, "\"StaticOrder.h\"", "<windows.h>"}) {
+    EXPECT_FALSE(MayInclude("include/A.h", include)) << include;
+  }
 }
 
-TEST(IncludeArrows, PlatformDeclarationsSeeNeitherLibraryNorThirdParties) {
-  EXPECT_THAT(WrongIncludesOf("src/platform/xml/A.h", "\"platform/xml/DOM_Node.h\""), IsEmpty());
-  EXPECT_THAT(WrongIncludesOf("src/platform/xml/A.h", "\"ZORPlatformExport.h\""), IsEmpty());
-  EXPECT_THAT(WrongIncludesOf("src/platform/xml/A.h", "\"ZORReader.h\""), testing::SizeIs(1));
-  EXPECT_THAT(WrongIncludesOf("src/platform/xml/A.h", "<toml++/toml.h>"), testing::SizeIs(1));
+TEST(IncludeArrows, PlatformDeclarationsSeeNothingElse) {
+  for (const char* include : {kPlatform, "\"ZORPlatformExport.h\"", "<guiddef.h>"}) {
+    EXPECT_TRUE(MayInclude("src/platform/xml/A.h", include)) << include;
+  }
+  for (const char* include :
+       {kPublic, kGroup, kFront, kFoundation, kToolkit, kThirdParty, "<windows.h>"}) {
+    EXPECT_FALSE(MayInclude("src/platform/xml/A.h", include)) << include;
+  }
 }
 
-TEST(IncludeArrows, DefaultPlatformSeesThirdPartiesButNotTheLibrary) {
-  EXPECT_THAT(WrongIncludesOf("src/default_platform/xml/A.cpp", "<xercesc/dom/DOM.hpp>"),
-              IsEmpty());
-  EXPECT_THAT(WrongIncludesOf("src/default_platform/xml/A.cpp", "\"ZORReader.h\""),
-              testing::SizeIs(1));
-  EXPECT_THAT(WrongIncludesOf("src/default_platform/xml/A.cpp", "\"clash_reading/Walk.h\""),
-              testing::SizeIs(1));
+TEST(IncludeArrows, FoundationSeesNothingOfOurs) {
+  for (const char* include : {kFoundation, kThirdParty, kSystem}) {
+    EXPECT_TRUE(MayInclude("src/foundation/A.cpp", include)) << include;
+  }
+  for (const char* include :
+       {kPublic, kPlatform, kGroup, kDefaultPlatform, kFront, kToolkit, kTool}) {
+    EXPECT_FALSE(MayInclude("src/foundation/A.cpp", include)) << include;
+  }
+  EXPECT_FALSE(MayInclude("src/foundation/A.h", kThirdParty));
 }
 
-TEST(IncludeArrows, ToolsSeeTheFrontOfTheDefaultPlatformAlone) {
-  EXPECT_THAT(WrongIncludesOf("tools/lyra/A.cpp", "\"default_platform/Front.h\""), IsEmpty());
-  EXPECT_THAT(WrongIncludesOf("tools/lyra/A.cpp", "\"default_platform/xml/Tree.h\""),
-              testing::SizeIs(1));
+TEST(IncludeArrows, DefaultPlatformSeesDeclarationsFoundationAndThirdParties) {
+  for (const char* include :
+       {kPlatform, kDefaultPlatform, kFront, kFoundation, kThirdParty, kSystem}) {
+    EXPECT_TRUE(MayInclude("src/default_platform/xml/A.cpp", include)) << include;
+  }
+  for (const char* include : {kPublic, kGroup, kToolkit, kTool}) {
+    EXPECT_FALSE(MayInclude("src/default_platform/xml/A.cpp", include)) << include;
+  }
+  EXPECT_FALSE(MayInclude("src/default_platform/A.h", kThirdParty));
+}
+
+TEST(IncludeArrows, ToolkitSeesLibraryPlatformFrontHeadersAndFoundation) {
+  for (const char* include : {kPublic, kPlatform, kFront, kFoundation, kToolkit, kThirdParty}) {
+    EXPECT_TRUE(MayInclude("src/toolkit/scenes/A.cpp", include)) << include;
+  }
+  for (const char* include : {kGroup, kDefaultPlatform, kTool, "\"StaticOrder.h\""}) {
+    EXPECT_FALSE(MayInclude("src/toolkit/scenes/A.cpp", include)) << include;
+  }
+}
+
+TEST(IncludeArrows, CommandSeesTheToolkitAndWhatItStandsOn) {
+  for (const char* include : {kTool, kToolkit, kPublic, kFront, kFoundation, kThirdParty}) {
+    EXPECT_TRUE(MayInclude("tools/lyra/A.cpp", include)) << include;
+  }
+  for (const char* include : {kGroup, kDefaultPlatform}) {
+    EXPECT_FALSE(MayInclude("tools/lyra/A.cpp", include)) << include;
+  }
 }
 
 TEST(IncludeArrows, WindowsHeadersAreForTheEntryPoint) {
-  EXPECT_THAT(WrongIncludesOf("src/platform/system/A.h", "<windows.h>"), testing::SizeIs(1));
-  EXPECT_THAT(WrongIncludesOf("include/A.h", "<windows.h>"), testing::SizeIs(1));
-  EXPECT_THAT(WrongIncludesOf("src/windows/A.cpp", "<windows.h>"), IsEmpty());
+  EXPECT_TRUE(MayInclude("src/windows/A.cpp", "<windows.h>"));
+}
+
+TEST(SourceTree, FindLinesLooksBelowTheFolderAlone) {
+  EXPECT_THAT(house::FindLines(
+                  {{"tools/A.cpp", {"DOM_Node node;"}}, {"src/A.cpp", {"", "x", "DOM_Node node;"}}},
+                  "src/", R"(\bDOM_\w)"),
+              ElementsAre("src/A.cpp:3: DOM_Node node;"));
+}
+
+namespace {
+/// The versions of CMake that the files ask for, each once.
+std::set<std::string> CMakeVersions(const std::vector<house::SourceFile>& inTree) {
+  static const std::regex kVersion(
+      R"re(^cmake_minimum_required\(VERSION ([0-9]+)\.([0-9]+)\)|"cmakeMinimumRequired": \{ "major": ([0-9]+), "minor": ([0-9]+))re");
+  std::set<std::string> versions;
+  for (const house::SourceFile& file : inTree) {
+    if (file.path.ends_with(".cpp")) continue;
+    for (const std::string& line : file.lines) {
+      std::smatch match;
+      if (!std::regex_search(line, match, kVersion)) continue;
+      versions.insert(match.str(1) + match.str(3) + "." + match.str(2) + match.str(4));
+    }
+  }
+  return versions;
+}
+
+std::vector<std::string> FilesLongerThan(std::size_t inMax,
+                                         const std::vector<house::SourceFile>& inTree) {
+  std::vector<std::string> files;
+  for (const house::SourceFile& file : inTree) {
+    const bool isOurs = file.path.starts_with("src/") || file.path.starts_with("tools/");
+    if (isOurs && file.lines.size() > inMax) files.push_back(file.path);
+  }
+  return files;
+}
+}  // namespace
+
+TEST(Build, AsksForOneVersionOfCMake) {
+  EXPECT_THAT(CMakeVersions(ThisProject()), testing::SizeIs(1));
+}
+
+TEST(Build, AnotherVersionOfCMakeIsNoticed) {
+  EXPECT_THAT(CMakeVersions({{"a/CMakeLists.txt", {"cmake_minimum_required(VERSION 3.25)"}},
+                             {"CMakePresets.json",
+                              {R"(  "cmakeMinimumRequired": { "major": 3, "minor": 23 })"}}}),
+              ElementsAre("3.23", "3.25"));
+}
+
+TEST(Files, HaveAtMost600Lines) { EXPECT_THAT(FilesLongerThan(600, ThisProject()), IsEmpty()); }
+
+TEST(Files, ALongerOneIsNoticed) {
+  const std::vector<std::string> two(2);
+  EXPECT_THAT(FilesLongerThan(1, {{"src/A.cpp", two}, {"src/B.cpp", {""}}, {"docs/C.md", two}}),
+              ElementsAre("src/A.cpp"));
 }

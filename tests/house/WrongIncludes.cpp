@@ -1,7 +1,5 @@
-// Who may include whom: the library sees the public headers and the platform's declarations, the
-// default platform sees those declarations and the libraries it stands on, and nothing else.
-#include <algorithm>
-#include <map>
+// Who may include whom.
+#include <array>
 #include <regex>
 #include <set>
 
@@ -9,86 +7,61 @@
 
 namespace house {
 namespace {
-enum class Side { kPublic, kPlatform, kLibrary, kDefaultPlatform, kTool, kFree };
-enum class Seen {
-  kStandard,
-  kPlatform,
-  kPlatformExport,
-  kLyraExport,
-  kPublic,
-  kOwnGroup,
-  kOtherGroup,
-  kSharedLibrary,
-  kDefaultPlatform,
-  kFrontOfDefaultPlatform,
-  kWindows,
-  kWindowsTypes,
-  kThirdParty
+struct Part {
+  std::regex files;
+  std::regex sees;  ///< besides the standard library and the files of the same part
 };
 
-/// The first inCount folders of a path, with a trailing slash.
-std::string Folders(const std::string& inPath, int inCount) {
-  std::size_t end = 0;
-  for (int i = 0; i < inCount; ++i) {
-    end = inPath.find('/', end);
-    if (end == std::string::npos) return {};
-    ++end;
+std::regex Pattern(const char* inText) { return std::regex(inText, std::regex::optimize); }
+
+/// The first that matches a file holds; a file that none matches may include anything. What is not
+/// in the tree has a name without a folder, as below; "src/<own>/" is the file's own folder there.
+const Part* PartOf(const std::string& inPath) {
+  static const std::array kParts = {
+      Part{Pattern("include/.*"), Pattern("src/platform/.*|ZORLyraExport")},
+      // Types that Windows has itself must be Windows' own there.
+      Part{Pattern("src/platform/.*"), Pattern("ZORPlatformExport|windows-types")},
+      Part{Pattern("src/foundation/.*\\.h"), Pattern("ZORFoundationExport")},
+      Part{Pattern("src/foundation/.*"), Pattern("ZORFoundationExport|third-party")},
+      Part{Pattern("src/default_platform/[^/]*\\.h"),
+           Pattern("src/(platform|foundation)/.*|ZORPlatformExport")},
+      Part{Pattern("src/default_platform/.*"),
+           Pattern("src/(platform|foundation)/.*|ZORPlatformExport|third-party")},
+      Part{Pattern("src/toolkit/.*"),
+           Pattern("include/.*|src/(platform|foundation)/.*|src/default_platform/[^/]*|"
+                   "ZORToolkitExport|third-party")},
+      Part{Pattern("src/windows/.*"), Pattern("include/.*|src/platform/.*|windows")},
+      Part{Pattern("src/.*"), Pattern("include/.*|src/platform/.*|src/[^/]*|ZORLyraExport")},
+      Part{Pattern("tools/.*"),
+           Pattern("include/.*|src/(platform|foundation|toolkit)/.*|src/default_platform/[^/]*|"
+                   "third-party")},
+  };
+  for (const Part& part : kParts) {
+    if (std::regex_match(inPath, part.files)) return &part;
   }
-  return inPath.substr(0, end);
+  return nullptr;
 }
 
-Side SideOf(const std::string& inPath) {
-  if (inPath.starts_with("include/")) return Side::kPublic;
-  if (inPath.starts_with("src/platform/")) return Side::kPlatform;
-  if (inPath.starts_with("src/default_platform/")) return Side::kDefaultPlatform;
-  if (inPath.starts_with("src/")) return Side::kLibrary;
-  if (inPath.starts_with("tools/")) return Side::kTool;
-  return Side::kFree;
+/// The folder whose files see each other: `src/<name>/`, or the uppermost one elsewhere.
+std::string OwnFolder(const std::string& inPath) {
+  const std::size_t start = inPath.starts_with("src/") ? 4 : 0;
+  const std::size_t end = inPath.find('/', start);
+  return end == std::string::npos ? inPath : inPath.substr(0, end + 1);
 }
 
-Seen SeenInSource(const std::string& inName, const std::string& inFile) {
-  if (inName.starts_with("platform/")) return Seen::kPlatform;
-  if (inName.starts_with("default_platform/")) {
-    return Folders(inName, 2).empty() ? Seen::kFrontOfDefaultPlatform : Seen::kDefaultPlatform;
-  }
-  const std::string group = Folders(inName, 1);
-  if (group.empty()) return Seen::kSharedLibrary;
-  return "src/" + group == Folders(inFile, 2) ? Seen::kOwnGroup : Seen::kOtherGroup;
-}
-
-Seen WhatIsSeen(bool inAngled, const std::string& inName, const std::string& inFile,
-                const std::set<std::string>& inPaths) {
-  if (inName == "ZORPlatformExport.h") return Seen::kPlatformExport;
-  if (inName == "ZORLyraExport.h") return Seen::kLyraExport;
-  if (inName == "windows.h") return Seen::kWindows;
-  if (inName == "guiddef.h") return Seen::kWindowsTypes;
-  if (inAngled) {
-    const bool isStandard = inName.find_first_of("./") == std::string::npos;
-    return isStandard ? Seen::kStandard : Seen::kThirdParty;
+/// The path of what is included, or a name for what is not in the tree; empty for the standard
+/// library.
+std::string Included(const std::string& inName, bool inIsAngled, const std::string& inFile,
+                     const std::set<std::string>& inPaths) {
+  if (inName == "windows.h") return "windows";
+  if (inName == "guiddef.h") return "windows-types";
+  if (inName.ends_with("Export.h")) return inName.substr(0, inName.size() - 2);
+  if (inIsAngled) return inName.find_first_of("./") == std::string::npos ? "" : "third-party";
+  for (const char* folder : {"include/", "src/", "tools/"}) {
+    if (inPaths.contains(folder + inName)) return folder + inName;
   }
   const std::string beside = inFile.substr(0, inFile.rfind('/') + 1) + inName;
-  if (inPaths.contains("include/" + inName)) return Seen::kPublic;
-  if (inPaths.contains("src/" + inName)) return SeenInSource(inName, inFile);
-  if (inPaths.contains(beside) || inPaths.contains("tools/" + inName)) return Seen::kOwnGroup;
-  return Seen::kThirdParty;
-}
-
-bool MaySee(Side inSide, Seen inSeen) {
-  static const std::map<Side, std::set<Seen>> kAllowed = {
-      // Types that Windows has itself must be Windows' own there.
-      {Side::kPlatform,
-       {Seen::kPlatform, Seen::kPlatformExport, Seen::kOwnGroup, Seen::kWindowsTypes}},
-      {Side::kPublic, {Seen::kPlatform, Seen::kPublic, Seen::kLyraExport}},
-      {Side::kLibrary,
-       {Seen::kPlatform, Seen::kPublic, Seen::kOwnGroup, Seen::kSharedLibrary, Seen::kLyraExport}},
-      {Side::kDefaultPlatform,
-       {Seen::kPlatform, Seen::kPlatformExport, Seen::kOwnGroup, Seen::kDefaultPlatform,
-        Seen::kFrontOfDefaultPlatform, Seen::kWindows, Seen::kThirdParty}},
-      {Side::kTool,
-       {Seen::kPlatform, Seen::kPublic, Seen::kOwnGroup, Seen::kFrontOfDefaultPlatform,
-        Seen::kThirdParty}},
-  };
-  return inSide == Side::kFree || inSeen == Seen::kStandard || kAllowed.at(inSide).contains(inSeen);
+  return inPaths.contains(beside) ? beside : "third-party";
 }
 }  // namespace
 
@@ -99,17 +72,33 @@ std::vector<std::string> FindWrongIncludes(const std::vector<SourceFile>& inTree
 
   std::vector<std::string> wrong;
   for (const SourceFile& file : inTree) {
-    if (SideOf(file.path) == Side::kFree) continue;
-    const bool isEntryPoint = file.path.starts_with("src/windows/");
-    for (std::size_t i = 0; i < file.lines.size(); ++i) {
+    const Part* part = PartOf(file.path);
+    for (std::size_t i = 0; part != nullptr && i < file.lines.size(); ++i) {
       std::smatch match;
       if (!std::regex_search(file.lines[i], match, kInclude)) continue;
-      const Seen seen = WhatIsSeen(match[1] == "<", match[2], file.path, paths);
-      if (MaySee(SideOf(file.path), seen) || (isEntryPoint && seen == Seen::kWindows)) continue;
+      const std::string seen = Included(match[2], match[1] == "<", file.path, paths);
+      if (seen.empty() || seen.starts_with(OwnFolder(file.path)) ||
+          std::regex_match(seen, part->sees)) {
+        continue;
+      }
       wrong.push_back(file.path + ":" + std::to_string(i + 1) + ": must not include " +
                       match[2].str());
     }
   }
   return wrong;
+}
+
+std::vector<std::string> FindLines(const std::vector<SourceFile>& inTree,
+                                   const std::string& inFolder, const std::string& inPattern) {
+  const std::regex pattern(inPattern, std::regex::optimize);
+  std::vector<std::string> found;
+  for (const SourceFile& file : inTree) {
+    if (!file.path.starts_with(inFolder)) continue;
+    for (std::size_t i = 0; i < file.lines.size(); ++i) {
+      if (!std::regex_search(file.lines[i], pattern)) continue;
+      found.push_back(file.path + ":" + std::to_string(i + 1) + ": " + file.lines[i]);
+    }
+  }
+  return found;
 }
 }  // namespace house
