@@ -12,7 +12,7 @@
 #include <ctime>
 
 #include "default_platform/OpenModel.h"
-#include "default_platform/visualisation/PictureDrawing.h"
+#include "default_platform/visualisation/Rendering.h"
 #include "platform/visualisation/ZORPrint3DRepImage.h"
 #include "publish/PhaseTimes.h"
 
@@ -79,12 +79,12 @@ OpenedModel OpenModel(const std::string& inPath, const ModelOptions& inOptions) 
   return next(inPath, inOptions);
 }
 
-std::optional<std::vector<SeenPixel>> SeePixels(const ZOR3DRep& inRep,
-                                                const ZOR3DViewpoint& inViewpoint, int inWidth,
-                                                int inHeight) {
-  static auto* const next =
-      Next<std::optional<std::vector<SeenPixel>>(const ZOR3DRep&, const ZOR3DViewpoint&, int, int)>(
-          "_ZN10ZORDefault9SeePixelsERK8ZOR3DRepRK14ZOR3DViewpointii");
+std::optional<std::vector<IdBufferPixel>> RenderIdBuffer(const ZOR3DRep& inRep,
+                                                         const ZOR3DViewpoint& inViewpoint,
+                                                         int inWidth, int inHeight) {
+  static auto* const next = Next<std::optional<std::vector<IdBufferPixel>>(
+      const ZOR3DRep&, const ZOR3DViewpoint&, int, int)>(
+      "_ZN10ZORDefault14RenderIdBufferERK8ZOR3DRepRK14ZOR3DViewpointii");
   const PhaseWatch watch(kTryViews);
   return next(inRep, inViewpoint, inWidth, inHeight);
 }

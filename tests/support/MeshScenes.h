@@ -8,7 +8,7 @@
 #include <memory>
 #include <vector>
 
-#include "default_platform/visualisation/PlacedMeshRep.h"
+#include "default_platform/visualisation/SceneGraph.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
 
 namespace support {

@@ -11,7 +11,7 @@
 #include "ZORClashParsing.h"
 #include "default_platform/InterferenceScene.h"
 #include "default_platform/OpenModel.h"
-#include "default_platform/visualisation/PictureDrawing.h"
+#include "default_platform/visualisation/Rendering.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
 #include "platform/visualisation/ZORI3DGeoVisu.h"
 
@@ -80,14 +80,14 @@ inline std::optional<std::array<int, 3>> SeenWhereFramed(
   std::vector<std::size_t> owners;
   for (std::size_t i = 0; i < 3; ++i) {
     all->AddChild(things[i]);
-    owners.resize(owners.size() + ZORDefault::CollectDrawnMeshes(*things[i]).size(), i);
+    owners.resize(owners.size() + ZORDefault::CollectMeshInstances(*things[i]).size(), i);
   }
   viewpoint.Reframe(static_cast<float>(inWidth), static_cast<float>(inHeight), 1, 1,
                     things[2]->GetShowBoundingElement());
   std::array<int, 3> counts{};
-  const auto pixels = ZORDefault::SeePixels(*all, viewpoint, inWidth, inHeight);
-  for (const ZORDefault::SeenPixel& pixel : pixels.value())
-    if (pixel.mesh != ZORDefault::SeenPixel::kNothing) ++counts[owners.at(pixel.mesh)];
+  const auto pixels = ZORDefault::RenderIdBuffer(*all, viewpoint, inWidth, inHeight);
+  for (const ZORDefault::IdBufferPixel& pixel : pixels.value())
+    if (pixel.mesh != ZORDefault::IdBufferPixel::kNone) ++counts[owners.at(pixel.mesh)];
   things[2]->Destroy();
   all->Destroy();
   return counts;

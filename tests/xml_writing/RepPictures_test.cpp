@@ -12,7 +12,7 @@
 
 #include "ZORLyraXMLServices.h"
 #include "default_platform/system/ObjectCounters.h"
-#include "default_platform/visualisation/PlacedMeshRep.h"
+#include "default_platform/visualisation/SceneGraph.h"
 #include "platform/visualisation/ZOR3DViewpoint.h"
 // After <cstdio>, which it needs.
 #include <jpeglib.h>

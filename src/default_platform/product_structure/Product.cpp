@@ -1,7 +1,7 @@
 #include "default_platform/product_structure/Product.h"
 
 #include "default_platform/product_structure/ModelDocument.h"
-#include "default_platform/visualisation/PlacedMeshRep.h"
+#include "default_platform/visualisation/SceneGraph.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
 
 namespace ZORDefault {

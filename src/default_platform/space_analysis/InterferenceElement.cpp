@@ -8,7 +8,7 @@
 
 #include "default_platform/space_analysis/Vectors.h"
 #include "default_platform/space_analysis/ViewChoice.h"
-#include "default_platform/visualisation/PictureCamera.h"
+#include "default_platform/visualisation/Rendering.h"
 #include "platform/system/ZORMsgCatalog.h"
 #include "platform/xml/DOMString.h"
 #include "platform/xml/DOM_NamedNodeMap.h"

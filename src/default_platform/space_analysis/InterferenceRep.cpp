@@ -6,7 +6,7 @@
 
 #include "default_platform/space_analysis/MarkerMesh.h"
 #include "default_platform/space_analysis/Vectors.h"
-#include "default_platform/visualisation/PictureCamera.h"
+#include "default_platform/visualisation/Rendering.h"
 
 namespace ZORDefault {
 namespace {
@@ -29,7 +29,8 @@ constexpr std::size_t kMostFineBalls = 100;
 void AddPin(const ZORMathVector& inPoint, const MarkerStyle& inStyle, MarkerMesh& ioMesh) {
   const double size = inStyle.viewRadius;
   const ZORMathVector aside = Cross(inStyle.sight, inStyle.up);
-  const ZORMathVector way = Direction(inStyle.up + 0.45 * aside - 0.9 * inStyle.sight, inStyle.up);
+  const ZORMathVector way =
+      NormalizeOr(inStyle.up + 0.45 * aside - 0.9 * inStyle.sight, inStyle.up);
   const ZORMathVector head = inPoint + (inStyle.pinLength * size) * way;
   ioMesh.AddCone(inPoint, 0.3 * kLine * size, head, kLine * size);
   ioMesh.AddBall(head, kPinHead * size);
@@ -38,7 +39,7 @@ void AddPin(const ZORMathVector& inPoint, const MarkerStyle& inStyle, MarkerMesh
 /// Arrow heads inside the line where there is room, else outside of it.
 void AddDimension(const ZORMathVector& inFrom, const ZORMathVector& inTo, double inSize,
                   MarkerMesh& ioMesh) {
-  const ZORMathVector way = Direction(inTo - inFrom, {0, 0, 1});
+  const ZORMathVector way = NormalizeOr(inTo - inFrom, {0, 0, 1});
   const bool hasRoom = Length(inTo - inFrom) > 3 * kArrowLength * inSize;
   const ZORMathVector arrow = (hasRoom ? kArrowLength : -kArrowLength) * inSize * way;
   const ZORMathVector tail = hasRoom ? ZORMathVector() : 2.5 * arrow;
@@ -96,7 +97,7 @@ InterferenceRep::InterferenceRep(const std::vector<ZORMathVector>& inPoints,
                                  &inStyle.colour)),
       framed_(inFramed) {
   markers_->SetInheritanceMode(kOwnColour | kImposeColour);
-  markers_->SetDrawnOver(true);
+  markers_->SetOverlay(true);
 }
 
 }  // namespace ZORDefault

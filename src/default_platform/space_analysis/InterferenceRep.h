@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "default_platform/system/ObjectCounters.h"
-#include "default_platform/visualisation/PlacedMeshRep.h"
+#include "default_platform/visualisation/SceneGraph.h"
 
 namespace ZORDefault {
 

@@ -3,7 +3,7 @@
 #include <algorithm>
 
 #include "default_platform/space_analysis/Vectors.h"
-#include "default_platform/visualisation/PictureCamera.h"
+#include "default_platform/visualisation/Rendering.h"
 
 namespace ZORDefault {
 namespace {
@@ -39,7 +39,7 @@ void MarkerMesh::AddCone(const ZORMathVector& inFrom, double inFromRadius,
   const double length = Length(way);
   const double fall = inFromRadius - inToRadius;
   const double along = fall / std::hypot(fall, length);
-  AddRings(Direction(way, {0, 0, 1}), {{inFrom, inFromRadius, along}, {inTo, inToRadius, along}},
+  AddRings(NormalizeOr(way, {0, 0, 1}), {{inFrom, inFromRadius, along}, {inTo, inToRadius, along}},
            kSides);
 }
 
@@ -47,7 +47,7 @@ void MarkerMesh::AddRings(const ZORMathVector& inAxis, const std::vector<Ring>& 
                           std::uint32_t inSides) {
   const ZORMathVector aside =
       std::fabs(inAxis.z) < 0.9 ? ZORMathVector(0, 0, 1) : ZORMathVector(1, 0, 0);
-  const ZORMathVector u = Direction(Cross(aside, inAxis), {1, 0, 0});
+  const ZORMathVector u = NormalizeOr(Cross(aside, inAxis), {1, 0, 0});
   const ZORMathVector v = Cross(inAxis, u);
   const auto first = static_cast<std::uint32_t>(mesh_->points.size());
   for (const Ring& ring : inRings) {

@@ -6,8 +6,7 @@
 
 #include "default_platform/product_structure/Product.h"
 #include "default_platform/space_analysis/Vectors.h"
-#include "default_platform/visualisation/DrawnMesh.h"
-#include "default_platform/visualisation/PlacedMeshRep.h"
+#include "default_platform/visualisation/SceneGraph.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
 
 namespace ZORDefault {
@@ -115,7 +114,7 @@ class StandingProduct final : public FacetedComponent, private CountedObject<Sta
   }
   void MakeRep(const ZOR3DRep& inRep, const ZORMathTransformation& standingFromModel) {
     rep_ = new ZOR3DBagRep();
-    for (const DrawnMesh& drawn : CollectDrawnMeshes(inRep)) {
+    for (const MeshInstance& drawn : CollectMeshInstances(inRep)) {
       meshes_.push_back(
           new PlacedMeshRep(drawn.mesh, standingFromModel * drawn.rootFromPart, &drawn.colour));
       if (drawn.isColourImposed)
@@ -168,7 +167,7 @@ PartColour MeanColourOf(const ZORIProduct_var& inProduct) {
     for (std::size_t i = 0; i < 4; ++i) sums[i] += inCount * inColour[i];
     count += inCount;
   };
-  for (const DrawnMesh& drawn : rep ? CollectDrawnMeshes(*rep) : std::vector<DrawnMesh>()) {
+  for (const MeshInstance& drawn : rep ? CollectMeshInstances(*rep) : std::vector<MeshInstance>()) {
     const PartMesh& mesh = *drawn.mesh;
     if (drawn.isColourImposed || mesh.triangleColours.empty())
       add(drawn.colour, static_cast<double>(mesh.triangles.size()));

@@ -8,8 +8,7 @@
 
 #include "default_platform/space_analysis/InterferenceRep.h"
 #include "default_platform/space_analysis/Vectors.h"
-#include "default_platform/visualisation/PictureCamera.h"
-#include "default_platform/visualisation/PictureDrawing.h"
+#include "default_platform/visualisation/Rendering.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
 
 namespace ZORDefault {
@@ -54,7 +53,7 @@ const std::vector<ZORMathVector>& Directions() {
              {-1, -1, -3}, {1, 1, -3},  {-1, -1, 1}, {1, -1, 1},  {-1, 1, 1},   {1, 1, 1},
              {-1, -1, 3},  {1, 1, 3},   {-1, 0, 0},  {1, 0, 0},   {0, -1, 0},   {0, 1, 0},
              {0, 0, -1},   {0, 0, 1}})
-      all.push_back(Direction(way, DefaultSight()));
+      all.push_back(NormalizeOr(way, DefaultSightDirection()));
     return all;
   }();
   return directions;
@@ -98,7 +97,7 @@ class ViewTrial {
       : scene_(new ZOR3DBagRep), width_(inWidth), height_(inHeight) {
     for (std::size_t i = 0; i < 2; ++i) {
       if (!inProducts[i]) continue;
-      meshCounts_[i] = CollectDrawnMeshes(*inProducts[i]).size();
+      meshCounts_[i] = CollectMeshInstances(*inProducts[i]).size();
       // The scene does not change what it shows.
       scene_->AddChild(const_cast<ZOR3DRep*>(inProducts[i]));
     }
@@ -110,7 +109,7 @@ class ViewTrial {
     return std::min(seen.products[0], seen.products[1]);
   }
   SeenThings See(const ZOR3DViewpoint& inViewpoint) const {
-    return Count(SeePixels(*scene_, inViewpoint, width_, height_));
+    return Count(RenderIdBuffer(*scene_, inViewpoint, width_, height_));
   }
   SeenThings SeeWith(InterferenceRep& inMarkers, const ZOR3DViewpoint& inViewpoint) const {
     scene_->AddChild(&inMarkers);
@@ -120,11 +119,11 @@ class ViewTrial {
   }
 
  private:
-  SeenThings Count(const std::optional<std::vector<SeenPixel>>& inPixels) const {
+  SeenThings Count(const std::optional<std::vector<IdBufferPixel>>& inPixels) const {
     SeenThings seen;
     if (!inPixels) return seen;
-    for (const SeenPixel& pixel : *inPixels) {
-      if (pixel.mesh == SeenPixel::kNothing) continue;
+    for (const IdBufferPixel& pixel : *inPixels) {
+      if (pixel.mesh == IdBufferPixel::kNone) continue;
       if (pixel.mesh < meshCounts_[0])
         ++seen.products[0];
       else if (pixel.mesh < meshCounts_[0] + meshCounts_[1])
@@ -189,14 +188,14 @@ ChosenView LookClosely(const ShownProducts& inProducts, const ChosenView& inBest
 ZORMathVector UpFor(const ZORMathVector& inSight) {
   const ZORMathVector axis =
       std::fabs(inSight.z) < 0.999 ? ZORMathVector(0, 0, 1) : ZORMathVector(0, 1, 0);
-  return Direction(axis - Dot(axis, inSight) * inSight, axis);
+  return NormalizeOr(axis - Dot(axis, inSight) * inSight, axis);
 }
 
 ChosenView ChooseView(const ShownProducts& inProducts, const std::vector<ZORMathVector>& inPoints,
                       bool inIsDimension) {
   const ZOR3DBoundingSphere points = SphereOf(inPoints);
   const std::vector<double> radii = RadiiAround(points, inProducts);
-  ChosenView best = ViewFrom(DefaultSight(), points.centre, radii.front(), inIsDimension);
+  ChosenView best = ViewFrom(DefaultSightDirection(), points.centre, radii.front(), inIsDimension);
   if (!inProducts[0] || !inProducts[1]) return best;
   const ViewTrial trial(inProducts, kWidth, kHeight);
   int bestScore = 0;

@@ -5,15 +5,35 @@
 #include <array>
 #include <cstdint>
 #include <memory>
+#include <optional>
 #include <vector>
 
-#include "default_platform/visualisation/DrawingStructure.h"
 #include "platform/mathematics/ZORMathTransformation.h"
 #include "platform/visualisation/ZOR3DBoundingSphere.h"
 #include "platform/visualisation/ZOR3DRep.h"
 
 /// 8-bit red, green, blue, alpha.
 typedef std::array<std::uint8_t, 4> PartColour;
+
+/// An axis-aligned bounding box of a mesh's points, relative to its origin.
+struct Aabb {
+  std::array<float, 3> low;
+  std::array<float, 3> high;
+};
+
+/// What the renderer derives from a mesh when it first needs it; freed with the mesh. A copy of the
+/// mesh starts without, since the copy may be changed.
+struct RenderCache {
+  RenderCache() = default;
+  RenderCache(const RenderCache&) {}
+  RenderCache& operator=(const RenderCache&) {
+    bvh.reset();
+    bounds.reset();
+    return *this;
+  }
+  std::shared_ptr<const void> bvh;
+  std::optional<Aabb> bounds;
+};
 
 /// Triangles and edge polylines of one part, shared by all its instances. Positions are single
 /// precision relative to `origin`, which lies in the middle of the part, so that a part far from
@@ -33,8 +53,8 @@ struct PartMesh {
   /// lineStarts[i + 1].
   std::vector<std::array<float, 3>> edgePoints;
   std::vector<std::uint32_t> lineStarts;
-  ZOR3DBoundingSphere sphere;        ///< in the part's space
-  mutable DrawingStructure drawing;  ///< kept by the renderer; nobody else touches it
+  ZOR3DBoundingSphere sphere;       ///< in the part's space
+  mutable RenderCache renderCache;  ///< owned by the renderer; nobody else touches it
 };
 
 #endif

@@ -4,7 +4,7 @@
 #include <cmath>
 
 #include "default_platform/system/ObjectCounters.h"
-#include "default_platform/visualisation/PictureCamera.h"
+#include "default_platform/visualisation/Rendering.h"
 
 using ZORDefault::PositiveOr;
 
@@ -29,12 +29,12 @@ ZOR3DBoundingSphere Framed(const ZOR3DBoundingSphere& inSphere) {
 }  // namespace
 
 ZOR3DViewpoint::ZOR3DViewpoint()
-    : sight(ZORDefault::DefaultSight()),
+    : sight(ZORDefault::DefaultSightDirection()),
       up(0, 0, 1),
       focusDistance(kDefaultDistance),
       viewAngle(kDefaultAngle),
       viewHeight(kDefaultDistance) {
-  up = ZORDefault::Direction({-1, -1, 2}, up);
+  up = ZORDefault::NormalizeOr({-1, -1, 2}, up);
   origin = {-sight.x * focusDistance, -sight.y * focusDistance, -sight.z * focusDistance};
   ++Counter().built;
 }
@@ -68,7 +68,7 @@ void ZOR3DViewpoint::Reframe(float inWidth, float inHeight, float inWidthScale, 
   const double room =
       std::min(heightScale, widthScale * PositiveOr(inWidth, 1) / PositiveOr(inHeight, 1));
 
-  sight = ZORDefault::Direction(sight, ZORDefault::DefaultSight());
+  sight = ZORDefault::NormalizeOr(sight, ZORDefault::DefaultSightDirection());
   if (projection == kCylindric) {
     viewHeight = 2 * sphere.radius / room;
     focusDistance = 2 * sphere.radius;

@@ -13,7 +13,7 @@
 
 #include "default_platform/system/ObjectCounters.h"
 #include "default_platform/system/Utf8.h"
-#include "default_platform/visualisation/RayCasterLibrary.h"
+#include "default_platform/visualisation/Rendering.h"
 #include "platform/system/ZORFile.h"
 
 namespace fs = std::filesystem;
@@ -106,7 +106,7 @@ HRESULT ZORPixelImage::Write(const ZORString& inFormat, const ZORString& inPath)
   const auto format = FormatOf(inFormat.CastToCharPtr());
   if (!format) return E_INVALIDARG;
   if (!HoldsAllPixels(width_, height_, pixels_.size())) return E_FAIL;
-  const ZORDefault::RayCaster* const rayCaster = ZORDefault::LoadedRayCaster();
+  const ZORDefault::RayCaster* const rayCaster = ZORDefault::LoadRayCaster();
   std::string bytes;
   if (!rayCaster || !rayCaster->encode(*format, width_, height_, pixels_.data(), bytes))
     return E_FAIL;

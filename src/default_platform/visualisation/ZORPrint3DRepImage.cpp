@@ -4,8 +4,7 @@
 #include <utility>
 
 #include "default_platform/system/ObjectCounters.h"
-#include "default_platform/visualisation/PictureDrawing.h"
-#include "default_platform/visualisation/RayCasterLibrary.h"
+#include "default_platform/visualisation/Rendering.h"
 
 namespace {
 
@@ -33,13 +32,37 @@ ZOR3DViewpoint* ZORPrint3DRepImage::GetViewpoint() { return viewpoint_; }
 
 ZORPixelImage* ZORPrint3DRepImage::Rasterize() try {
   if (!rep_ || !ZORDefault::IsPictureSize(width_, height_)) return nullptr;
-  const ZORDefault::RayCaster* const rayCaster = ZORDefault::LoadedRayCaster();
+  const ZORDefault::RayCaster* const rayCaster = ZORDefault::LoadRayCaster();
   if (!rayCaster) return nullptr;
   const ZORDefault::PictureRequest request =
       ZORDefault::MakePictureRequest(*rep_, *viewpoint_, width_, height_, &support_);
   std::vector<std::uint8_t> pixels;
-  if (!rayCaster->draw(request, pixels)) return nullptr;
+  if (!rayCaster->render(request, pixels)) return nullptr;
   return new ZORPixelImage(width_, height_, std::move(pixels));
 } catch (const std::bad_alloc&) {
   return nullptr;
+}
+
+ZORSupport::ZORSupport() = default;
+
+void ZORSupport::SetBackgroundColor(float inRed, float inGreen, float inBlue) {
+  hasBackground_ = true;
+  background_[0] = inRed;
+  background_[1] = inGreen;
+  background_[2] = inBlue;
+}
+
+void ZORSupport::SetViewMode(int inMode, int inValue) {
+  ++viewModeChanges_;
+  if (inMode == kShading) shading_ = inValue;
+  if (inMode == kHiddenEdges) hiddenEdges_ = inValue;
+}
+
+bool ZORSupport::HasBackgroundColor() const { return hasBackground_; }
+const float* ZORSupport::GetBackgroundColor() const { return background_; }
+int ZORSupport::GetViewModeChanges() const { return viewModeChanges_; }
+
+int ZORSupport::GetViewMode(int inMode) const {
+  if (inMode == kShading) return shading_;
+  return inMode == kHiddenEdges ? hiddenEdges_ : 0;
 }

@@ -3,7 +3,7 @@
 
 #include "default_platform/product_structure/OpenedModels.h"
 #include "default_platform/visualisation/PartMesh.h"
-#include "default_platform/visualisation/PlacedMeshRep.h"
+#include "default_platform/visualisation/SceneGraph.h"
 #include "platform/product_structure/ZORIAlias.h"
 #include "platform/product_structure/ZORILinkableObject.h"
 #include "platform/product_structure/ZORIProductInSession.h"

@@ -4,7 +4,7 @@
 
 #include "default_platform/space_analysis/Assembly.h"
 #include "default_platform/system/ObjectCounters.h"
-#include "default_platform/visualisation/DrawnMesh.h"
+#include "default_platform/visualisation/SceneGraph.h"
 #include "platform/product_structure/ZORIAlias.h"
 #include "platform/visualisation/ZORIVisProperties.h"
 
@@ -18,7 +18,7 @@ using ZORDefault::ResultPlacements;
 const ResultPlacements kGiven = {ReadMatrix(), ReadMatrix()};
 
 ZORMathVector TranslationOf(const ZORIProduct_var& inProduct) {
-  return ZORDefault::CollectDrawnMeshes(*RepOf(inProduct)).front().rootFromPart.GetVector();
+  return ZORDefault::CollectMeshInstances(*RepOf(inProduct)).front().rootFromPart.GetVector();
 }
 void ExpectAt(const ZORMathVector& inExpected, const ZORIProduct_var& inProduct) {
   const ZORMathVector found = TranslationOf(inProduct);
@@ -42,8 +42,8 @@ TEST(InterferenceScene, ProductsStandWhereTheResultSays) {
 TEST(InterferenceScene, PartsOfAnAssemblyMoveWithIt) {
   const ZORIProduct_var assembly = Product("rod-assembly_1");
   const InterferenceScene scene = Scene(ProductText("rod-assembly_1") + ProductText(kRod));
-  const auto before = ZORDefault::CollectDrawnMeshes(*RepOf(assembly));
-  const auto after = ZORDefault::CollectDrawnMeshes(*RepOf(scene.products[0]));
+  const auto before = ZORDefault::CollectMeshInstances(*RepOf(assembly));
+  const auto after = ZORDefault::CollectMeshInstances(*RepOf(scene.products[0]));
   ASSERT_EQ(3u, before.size());
   ASSERT_EQ(3u, after.size());
   // The same point of the assembly, seen from each part.

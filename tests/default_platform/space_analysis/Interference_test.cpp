@@ -5,8 +5,8 @@
 
 #include "default_platform/space_analysis/Assembly.h"
 #include "default_platform/system/ObjectCounters.h"
-#include "default_platform/visualisation/DrawnMesh.h"
-#include "default_platform/visualisation/PictureDrawing.h"
+#include "default_platform/visualisation/Rendering.h"
+#include "default_platform/visualisation/SceneGraph.h"
 #include "platform/space_analysis/ZORISiSubInterference.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
 #include "support/ScopedVariable.h"
@@ -31,7 +31,7 @@ typedef std::unique_ptr<ZOR3DRep, Destroyer> OwnRep;
 
 std::size_t TrianglesOf(const InterferenceScene& inScene) {
   const OwnRep rep(RepOf(inScene.interference));
-  return rep ? ZORDefault::CollectDrawnMeshes(*rep).front().mesh->triangles.size() : 0;
+  return rep ? ZORDefault::CollectMeshInstances(*rep).front().mesh->triangles.size() : 0;
 }
 
 TEST(Interference, ElementsAreThePointsThatDiffer) {
@@ -97,7 +97,7 @@ TEST(Interference, VeryManyPointsAreShownByASample) {
   const auto scene = NutAndRod(points);
   EXPECT_EQ(kCount, scene.interference->GetElementCount());
   const OwnRep rep(RepOf(scene.interference));
-  const auto mesh = ZORDefault::CollectDrawnMeshes(*rep).front().mesh;
+  const auto mesh = ZORDefault::CollectMeshInstances(*rep).front().mesh;
   EXPECT_GT(mesh->triangles.size(), 64u * 100);
   EXPECT_LE(mesh->triangles.size(), 64u * 1000);
   // They reach about as far as the points: the last one is 46 from the first.
@@ -123,7 +123,7 @@ TEST(Interference, ClearanceOfTwoPointsHasADimensionLineInAnyLanguage) {
 TEST(Interference, MarkersAreDrawnOverProducts) {
   const auto scene = NutAndRod();
   const OwnRep rep(RepOf(scene.interference));
-  EXPECT_TRUE(ZORDefault::CollectDrawnMeshes(*rep).front().isDrawnOver);
+  EXPECT_TRUE(ZORDefault::CollectMeshInstances(*rep).front().isOverlay);
 }
 
 TEST(Interference, StoredViewpointIsFilledIn) {

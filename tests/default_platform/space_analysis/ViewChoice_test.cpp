@@ -7,7 +7,7 @@
 #include <cmath>
 
 #include "default_platform/space_analysis/Vectors.h"
-#include "default_platform/visualisation/PictureDrawing.h"
+#include "default_platform/visualisation/Rendering.h"
 #include "support/MeshScenes.h"
 
 namespace {
@@ -15,7 +15,7 @@ namespace {
 using support::MakeBox;
 using support::MovedBy;
 using ZORDefault::ChosenView;
-using ZORDefault::SeenPixel;
+using ZORDefault::IdBufferPixel;
 
 constexpr PartColour kColour{200, 30, 30, 255};
 
@@ -31,7 +31,7 @@ class Products {
     return ZORDefault::ChooseView(shown_, {inPoint}, false);
   }
   /// The direction that is chosen where there is nothing to choose for.
-  static ZORMathVector DefaultSight() {
+  static ZORMathVector DefaultSightDirection() {
     return ZORDefault::ChooseView({nullptr, nullptr}, {{0, 0, 0}}, false).markers.sight;
   }
   /// Pixels of the product that is seen less, in a picture of a report's size.
@@ -41,9 +41,10 @@ class Products {
     viewpoint.sight = inView.markers.sight;
     viewpoint.up = inView.markers.up;
     viewpoint.Reframe(kWidth, kHeight, 1, 1, inView.framed);
-    const auto pixels = ZORDefault::SeePixels(*scene_.Bag(), viewpoint, kWidth, kHeight).value();
+    const auto pixels =
+        ZORDefault::RenderIdBuffer(*scene_.Bag(), viewpoint, kWidth, kHeight).value();
     std::array<int, 2> seen{};
-    for (const SeenPixel& pixel : pixels)
+    for (const IdBufferPixel& pixel : pixels)
       if (pixel.mesh < seen.size()) ++seen[pixel.mesh];
     return std::min(seen[0], seen[1]);
   }
@@ -79,7 +80,7 @@ TEST(ChooseView, ProductsThatAreSeenAreSeenFromTheDefaultDirection) {
   const Products products(MakeBox(10, 10, 10), MovedBy(-5, 0, 0), MakeBox(10, 10, 10),
                           MovedBy(5, 0, 0));
   const ChosenView view = products.Choose({0, 0, 5});
-  ExpectSame(view.markers.sight, Products::DefaultSight());
+  ExpectSame(view.markers.sight, Products::DefaultSightDirection());
   EXPECT_GT(products.SeenOfTheLesser(view), 10000);
 }
 
@@ -99,7 +100,7 @@ TEST(ChooseView, ProductSeenThroughOneOpeningOnlyIsLookedForClosely) {
   EXPECT_GT(products.SeenOfTheLesser(view), 1000);
 
   ChosenView usual = view;
-  usual.markers.sight = Products::DefaultSight();
+  usual.markers.sight = Products::DefaultSightDirection();
   usual.markers.up = ZORDefault::UpFor(usual.markers.sight);
   usual.framed.radius = 4;
   EXPECT_EQ(products.SeenOfTheLesser(usual), 0);
@@ -117,7 +118,7 @@ TEST(ChooseView, WithOneProductAloneNothingHasToBeChosen) {
   support::MeshScene scene;
   const ChosenView view = ZORDefault::ChooseView(
       {scene.Add(MakeBox(10, 10, 10), MovedBy(0, 0, 0), kColour), nullptr}, {{0, 0, 5}}, false);
-  ExpectSame(view.markers.sight, Products::DefaultSight());
+  ExpectSame(view.markers.sight, Products::DefaultSightDirection());
 }
 
 }  // namespace

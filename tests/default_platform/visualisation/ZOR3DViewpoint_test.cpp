@@ -6,7 +6,7 @@
 #include <limits>
 
 #include "default_platform/system/ObjectCounters.h"
-#include "default_platform/visualisation/PictureDrawing.h"
+#include "default_platform/visualisation/Rendering.h"
 #include "support/MeshScenes.h"
 
 namespace {
@@ -131,7 +131,7 @@ TEST(ZOR3DViewpoint, IsCounted) {
   EXPECT_EQ(after.released, before.released + 1);
 }
 
-TEST(PictureCamera, AxesAreAtRightAngles) {
+TEST(MakeCamera, AxesAreAtRightAngles) {
   ZOR3DViewpoint viewpoint;
   viewpoint.sight = {0, 2, 0};
   viewpoint.up = {0, 1, 1};
@@ -141,7 +141,7 @@ TEST(PictureCamera, AxesAreAtRightAngles) {
   ExpectNear(camera.down, {0, 0, -1});
 }
 
-TEST(PictureCamera, UpAlongTheSightIsMended) {
+TEST(MakeCamera, UpAlongTheSightIsReplaced) {
   ZOR3DViewpoint viewpoint;
   viewpoint.sight = {0, 0, -1};
   viewpoint.up = {0, 0, 1};
@@ -150,7 +150,7 @@ TEST(PictureCamera, UpAlongTheSightIsMended) {
   ExpectNear(camera.down, {0, -1, 0});
 }
 
-TEST(PictureCamera, MissingDirectionsAreMended) {
+TEST(MakeCamera, MissingDirectionsAreReplaced) {
   ZOR3DViewpoint viewpoint;
   viewpoint.sight = {0, 0, 0};
   viewpoint.up = {kNaN, 0, 0};
@@ -163,7 +163,7 @@ TEST(PictureCamera, MissingDirectionsAreMended) {
   EXPECT_GT(camera.pixelSize, 0);
 }
 
-TEST(PictureCamera, HugeAndTinyDirectionsKeepTheirDirection) {
+TEST(MakeCamera, HugeAndTinyDirectionsKeepTheirDirection) {
   ZOR3DViewpoint viewpoint;
   viewpoint.sight = {0, 1e300, 0};
   viewpoint.up = {0, 0, 1e-300};

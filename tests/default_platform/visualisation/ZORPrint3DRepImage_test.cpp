@@ -237,13 +237,13 @@ TEST(ZORPrint3DRepImage, TransparentSurfacesShowWhatLiesBehind) {
 }
 
 TEST(ZORPrint3DRepImage, FlushFacesShowTheFirstProductEverywhere) {
-  for (const bool isConic : {true, false}) {
+  for (const bool isPerspective : {true, false}) {
     MeshScene scene;
     scene.Add(MakeBox(50, 30, 50), support::TurnedAndMoved(0.5, 3.3, 0, 0), kRed);
     scene.Add(MakeBox(60, 30, 60), support::TurnedAndMoved(0.5, 3.3, 0, 0), kBlue);
     const Picture picture = Draw(scene.Bag(), 100, 100, [&](ZORPrint3DRepImage& ioImage) {
       FromFront(1)(ioImage);
-      if (isConic) ioImage.GetViewpoint()->projection = ZOR3DViewpoint::kConic;
+      if (isPerspective) ioImage.GetViewpoint()->projection = ZOR3DViewpoint::kConic;
       ioImage.GetViewpoint()->sight = {-0.1, 1, 0.02};
       ioImage.GetViewpoint()->Reframe(100, 100, 1.5F, 1.5F);
     });
@@ -253,7 +253,7 @@ TEST(ZORPrint3DRepImage, FlushFacesShowTheFirstProductEverywhere) {
 }
 
 TEST(ZORPrint3DRepImage, WhatIsDrawnOverIsSeenBehindSurfaces) {
-  for (const bool isConic : {true, false}) {
+  for (const bool isPerspective : {true, false}) {
     MeshScene scene;
     scene.Add(MakeBox(60, 10, 60), MovedBy(0, 0, 0), kBlue);
     PlacedMeshRep* const marker = scene.Add(MakeSphere(8, 24), MovedBy(0, 40, 0), kRed);
@@ -261,13 +261,13 @@ TEST(ZORPrint3DRepImage, WhatIsDrawnOverIsSeenBehindSurfaces) {
     const auto draw = [&] {
       return Draw(scene.Bag(), 100, 100, [&](ZORPrint3DRepImage& ioImage) {
         FromFront(1)(ioImage);
-        if (isConic) ioImage.GetViewpoint()->projection = ZOR3DViewpoint::kConic;
+        if (isPerspective) ioImage.GetViewpoint()->projection = ZOR3DViewpoint::kConic;
         ioImage.GetViewpoint()->Reframe(100, 100, 1, 1);
       });
     };
     const Picture hidden = draw();
     EXPECT_FALSE(IsRed(hidden.At(50, 50)));
-    marker->SetDrawnOver(true);
+    marker->SetOverlay(true);
     const Picture over = draw();
     EXPECT_TRUE(IsRed(over.At(50, 50)));
     EXPECT_EQ(over.At(30, 50), hidden.At(30, 50));
@@ -385,16 +385,16 @@ TEST(ZORPrint3DRepImage, AllThatIsBuiltIsReleased) {
     return CountsOf(inClass).built - CountsOf(inClass).released;
   };
   const char* const classes[] = {"ZORPrint3DRepImage", "ZORPixelImage", "ZOR3DViewpoint",
-                                 "ZOR3DBagRep", "MeshStructure"};
+                                 "ZOR3DBagRep", "MeshBvh"};
   std::vector<long> before;
   for (const char* const name : classes) before.push_back(open(name));
   {
     MixedScene scene;
-    const long structures = CountsOf("MeshStructure").built;
+    const long structures = CountsOf("MeshBvh").built;
     Draw(scene.Bag(), 40, 30);
     Draw(scene.Bag(), 40, 30);
-    EXPECT_EQ(CountsOf("MeshStructure").built, structures + 3);  // once for each mesh
-    EXPECT_EQ(open("MeshStructure"), before[4] + 3);
+    EXPECT_EQ(CountsOf("MeshBvh").built, structures + 3);  // once for each mesh
+    EXPECT_EQ(open("MeshBvh"), before[4] + 3);
   }
   for (std::size_t i = 0; i < before.size(); ++i) EXPECT_EQ(open(classes[i]), before[i]);
 }
@@ -403,9 +403,9 @@ TEST(ZORPrint3DRepImage, StructureIsSharedByAllThatShowTheMesh) {
   MeshScene scene;
   const auto box = MakeBox(10, 10, 10);
   for (int i = 0; i < 20; ++i) scene.Add(box, MovedBy(20 * i, 0, 0), kRed);
-  const long before = CountsOf("MeshStructure").built;
+  const long before = CountsOf("MeshBvh").built;
   Draw(scene.Bag(), 40, 30);
-  EXPECT_EQ(CountsOf("MeshStructure").built, before + 1);
+  EXPECT_EQ(CountsOf("MeshBvh").built, before + 1);
 }
 
 TEST(ZORPrint3DRepImage, ImageThatIsNotReleasedIsCountedAsSuch) {

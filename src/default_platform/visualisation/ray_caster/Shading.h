@@ -1,4 +1,4 @@
-// From surface colour and normal to light.
+// Colour spaces and shading.
 #ifndef ZOR_DEFAULT_PLATFORM_VISUALISATION_RAY_CASTER_SHADING_H
 #define ZOR_DEFAULT_PLATFORM_VISUALISATION_RAY_CASTER_SHADING_H
 
@@ -9,24 +9,22 @@
 
 namespace ZORRayCaster {
 
-/// A surface's colour in proportion to light.
+/// Linear RGB and opacity.
 struct SurfaceColour {
-  Vec3 light{0, 0, 0};
+  Vec3 albedo{0, 0, 0};
   float opacity = 1;
 };
 
-SurfaceColour ToSurfaceColour(const PartColour& inColour);
+SurfaceColour MakeSurfaceColour(const PartColour& inColour);
 
-/// @param inShown 0 to 1, as a screen takes it; others are brought into this range.
-float LightOf(float inShown);
+/// @param inSrgb clamped to 0 to 1.
+float LinearFromSrgb(float inSrgb);
 
-/// @return 0 to 255, as a screen takes it.
-std::uint8_t ShownByte(float inLight);
+std::uint8_t SrgbByteFromLinear(float inLinear);
 
-/// The light that comes from a point of a surface to the eye: a lamp at the eye, a fill light from
-/// above left, a little light from everywhere, a soft highlight.
+/// Ambient light, a headlight, and a fill light from above left with a soft specular highlight.
 /// @param inNormal unit, towards the eye. @param inToEye unit.
-Vec3 Lit(Vec3 inSurface, Vec3 inNormal, Vec3 inToEye);
+Vec3 Shade(Vec3 inAlbedo, Vec3 inNormal, Vec3 inToEye);
 
 }  // namespace ZORRayCaster
 

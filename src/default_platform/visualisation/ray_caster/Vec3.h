@@ -35,11 +35,11 @@ inline Vec3 Cross(Vec3 inA, Vec3 inB) {
           inA.x * inB.y - inA.y * inB.x};
 }
 /// The zero vector stays as it is.
-inline Vec3 Normalised(Vec3 inA) {
+inline Vec3 Normalize(Vec3 inA) {
   const float square = Dot(inA, inA);
   return square > 0 ? (1 / std::sqrt(square)) * inA : inA;
 }
-inline Vec3 Mix(Vec3 inA, Vec3 inB, float inShareOfB) { return inA + inShareOfB * (inB - inA); }
+inline Vec3 Lerp(Vec3 inA, Vec3 inB, float inT) { return inA + inT * (inB - inA); }
 
 /// A linear map.
 struct Linear {

@@ -1,4 +1,4 @@
-#include "default_platform/visualisation/ray_caster/MeshStructure.h"
+#include "default_platform/visualisation/ray_caster/MeshBvh.h"
 
 #include <algorithm>
 #include <mutex>
@@ -9,8 +9,7 @@
 namespace ZORRayCaster {
 namespace {
 
-/// A triangle that names a missing point becomes one without area, so that the numbers of the
-/// others stay.
+/// A triangle with an index out of range becomes degenerate, so that the others keep their indices.
 void CopyTriangles(const PartMesh& inMesh, std::uint32_t* outIndices) {
   const std::size_t pointCount = inMesh.points.size();
   for (const auto& triangle : inMesh.triangles) {
@@ -21,7 +20,7 @@ void CopyTriangles(const PartMesh& inMesh, std::uint32_t* outIndices) {
 }
 
 void AttachTriangles(RTCScene inScene, const PartMesh& inMesh) {
-  const RTCGeometry geometry = rtcNewGeometry(Device(), RTC_GEOMETRY_TYPE_TRIANGLE);
+  const RTCGeometry geometry = rtcNewGeometry(EmbreeDevice(), RTC_GEOMETRY_TYPE_TRIANGLE);
   void* const points =
       rtcSetNewGeometryBuffer(geometry, RTC_BUFFER_TYPE_VERTEX, 0, RTC_FORMAT_FLOAT3,
                               sizeof(inMesh.points[0]), inMesh.points.size());
@@ -52,7 +51,7 @@ float LengthOfLines(const PartMesh& inMesh) {
 }
 
 RTCScene NewScene() {
-  const RTCScene scene = Device() ? rtcNewScene(Device()) : nullptr;
+  const RTCScene scene = EmbreeDevice() ? rtcNewScene(EmbreeDevice()) : nullptr;
   if (!scene) throw std::bad_alloc();
   // Robust: no ray passes between two triangles that share an edge.
   rtcSetSceneFlags(scene, RTC_SCENE_FLAG_ROBUST);
@@ -61,33 +60,33 @@ RTCScene NewScene() {
 
 }  // namespace
 
-RTCDevice Device() {
+RTCDevice EmbreeDevice() {
   static const RTCDevice device = rtcNewDevice("threads=1,start_threads=0");
   return device;
 }
 
-MeshStructure::MeshStructure(const PartMesh& inMesh)
+MeshBvh::MeshBvh(const PartMesh& inMesh)
     : scene_(NewScene()),
       hasTriangles_(!inMesh.triangles.empty() && !inMesh.points.empty()),
       lineLength_(LengthOfLines(inMesh)) {
   try {
     if (hasTriangles_) AttachTriangles(scene_, inMesh);
     rtcCommitScene(scene_);
-    if (rtcGetDeviceError(Device()) != RTC_ERROR_NONE) throw std::bad_alloc();
+    if (rtcGetDeviceError(EmbreeDevice()) != RTC_ERROR_NONE) throw std::bad_alloc();
   } catch (...) {
     rtcReleaseScene(scene_);
     throw;
   }
 }
 
-MeshStructure::~MeshStructure() { rtcReleaseScene(scene_); }
+MeshBvh::~MeshBvh() { rtcReleaseScene(scene_); }
 
-const MeshStructure& StructureOf(const PartMesh& inMesh) {
+const MeshBvh& BvhOf(const PartMesh& inMesh) {
   static std::mutex mutex;
   const std::lock_guard lock(mutex);
-  std::shared_ptr<const void>& content = inMesh.drawing.content;
-  if (!content) content = std::make_shared<const MeshStructure>(inMesh);
-  return *static_cast<const MeshStructure*>(content.get());
+  std::shared_ptr<const void>& content = inMesh.renderCache.bvh;
+  if (!content) content = std::make_shared<const MeshBvh>(inMesh);
+  return *static_cast<const MeshBvh*>(content.get());
 }
 
 }  // namespace ZORRayCaster

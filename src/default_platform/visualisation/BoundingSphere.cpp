@@ -1,4 +1,4 @@
-#include "default_platform/visualisation/SphereAround.h"
+#include "default_platform/visualisation/BoundingSphere.h"
 
 #include <algorithm>
 #include <cmath>
@@ -17,14 +17,14 @@ double Distance(const ZORMathVector& inA, const ZORMathVector& inB) {
   return std::hypot(inA.x - inB.x, inA.y - inB.y, inA.z - inB.z);
 }
 
-/// From one place towards another: 0 stays, 1 is there.
-ZORMathVector Towards(const ZORMathVector& inFrom, const ZORMathVector& inTo, double inShare) {
+/// Linear interpolation; beyond 1 it extrapolates.
+ZORMathVector Lerp(const ZORMathVector& inFrom, const ZORMathVector& inTo, double inShare) {
   return {inFrom.x + inShare * (inTo.x - inFrom.x), inFrom.y + inShare * (inTo.y - inFrom.y),
           inFrom.z + inShare * (inTo.z - inFrom.z)};
 }
 
-/// By how much a transformation stretches lengths at most, for rotations with a scale of each axis.
-double LargestScale(const ZORMathTransformation& inTransformation) {
+/// The largest factor by which a rotation with a scale of each axis stretches lengths.
+double MaxScale(const ZORMathTransformation& inTransformation) {
   double largest = 0;
   for (int i = 0; i < 3; ++i) {
     const ZORMathVector& column = inTransformation.GetMatrix().GetColumn(i);
@@ -33,9 +33,9 @@ double LargestScale(const ZORMathTransformation& inTransformation) {
   return largest;
 }
 
-MeshBox MakeBox(const PartMesh& inMesh) {
+Aabb ComputeBounds(const PartMesh& inMesh) {
   constexpr float kFar = std::numeric_limits<float>::max();
-  MeshBox box{{kFar, kFar, kFar}, {-kFar, -kFar, -kFar}};
+  Aabb box{{kFar, kFar, kFar}, {-kFar, -kFar, -kFar}};
   for (const auto* const points : {&inMesh.points, &inMesh.edgePoints}) {
     for (const std::array<float, 3>& point : *points) {
       for (std::size_t i = 0; i < 3; ++i) {
@@ -47,27 +47,27 @@ MeshBox MakeBox(const PartMesh& inMesh) {
   return box;
 }
 
-/// Worked out at the first call and kept by the mesh.
-MeshBox BoxOf(const PartMesh& inMesh) {
+/// Computed at the first call and cached by the mesh.
+Aabb CachedBounds(const PartMesh& inMesh) {
   static std::mutex mutex;
   const std::lock_guard lock(mutex);
-  if (!inMesh.drawing.box) inMesh.drawing.box = MakeBox(inMesh);
-  return *inMesh.drawing.box;
+  if (!inMesh.renderCache.bounds) inMesh.renderCache.bounds = ComputeBounds(inMesh);
+  return *inMesh.renderCache.bounds;
 }
 
 }  // namespace
 
-void SphereAround::AddSphere(const ZOR3DBoundingSphere& inSphere) {
+void BoundingSphere::AddSphere(const ZOR3DBoundingSphere& inSphere) {
   if (!inSphere.IsEmpty() && IsFinite(inSphere)) pieces_.push_back({inSphere, false, {}});
 }
 
-void SphereAround::AddMesh(const PartMesh& inMesh, const ZORMathTransformation& inRootFromPart) {
+void BoundingSphere::AddMesh(const PartMesh& inMesh, const ZORMathTransformation& inRootFromPart) {
   if (inMesh.sphere.IsEmpty()) return;
   Piece piece;
   piece.sphere = {inRootFromPart * inMesh.sphere.centre,
-                  inMesh.sphere.radius * LargestScale(inRootFromPart)};
+                  inMesh.sphere.radius * MaxScale(inRootFromPart)};
   if (!IsFinite(piece.sphere)) return;
-  const MeshBox box = BoxOf(inMesh);
+  const Aabb box = CachedBounds(inMesh);
   piece.hasCorners = box.low[0] <= box.high[0];
   for (std::size_t i = 0; piece.hasCorners && i < piece.corners.size(); ++i) {
     const auto side = [&](std::size_t inAxis) {
@@ -80,11 +80,11 @@ void SphereAround::AddMesh(const PartMesh& inMesh, const ZORMathTransformation& 
   pieces_.push_back(piece);
 }
 
-ZORMathVector SphereAround::Farthest(const Piece& inPiece, const ZORMathVector& inFrom) {
+ZORMathVector BoundingSphere::FarthestPoint(const Piece& inPiece, const ZORMathVector& inFrom) {
   const ZOR3DBoundingSphere& sphere = inPiece.sphere;
   const double toCentre = Distance(inFrom, sphere.centre);
   const ZORMathVector ofSphere = toCentre > 0
-                                     ? Towards(inFrom, sphere.centre, 1 + sphere.radius / toCentre)
+                                     ? Lerp(inFrom, sphere.centre, 1 + sphere.radius / toCentre)
                                      : ZORMathVector(inFrom.x + sphere.radius, inFrom.y, inFrom.z);
   if (!inPiece.hasCorners) return ofSphere;
   const ZORMathVector ofCorners = *std::ranges::max_element(
@@ -93,7 +93,7 @@ ZORMathVector SphereAround::Farthest(const Piece& inPiece, const ZORMathVector& 
   return Distance(inFrom, ofCorners) < Distance(inFrom, ofSphere) ? ofCorners : ofSphere;
 }
 
-ZORMathVector SphereAround::MiddleOfBox() const {
+ZORMathVector BoundingSphere::BoxCentre() const {
   constexpr double kFar = std::numeric_limits<double>::max();
   ZORMathVector low(kFar, kFar, kFar), high(-kFar, -kFar, -kFar);
   for (const Piece& piece : pieces_) {
@@ -104,28 +104,28 @@ ZORMathVector SphereAround::MiddleOfBox() const {
     high = {std::max(high.x, centre.x + radius), std::max(high.y, centre.y + radius),
             std::max(high.z, centre.z + radius)};
   }
-  return Towards(low, high, 0.5);
+  return Lerp(low, high, 0.5);
 }
 
-/// The centre moves towards what is farthest, ever less (Badoiu and Clarkson, "Smaller core-sets
-/// for balls"); the best of all steps is taken.
-ZOR3DBoundingSphere SphereAround::Get() const {
+/// The centre moves towards the farthest point by ever smaller steps (Badoiu and Clarkson, "Smaller
+/// core-sets for balls", 2003); the best of all steps is returned.
+ZOR3DBoundingSphere BoundingSphere::Get() const {
   constexpr int kSteps = 48;
   ZOR3DBoundingSphere best;
   if (pieces_.empty()) return best;
-  ZORMathVector centre = MiddleOfBox();
+  ZORMathVector centre = BoxCentre();
   for (int step = 0; step < kSteps; ++step) {
     ZORMathVector farthest = centre;
     double radius = 0;
     for (const Piece& piece : pieces_) {
-      const ZORMathVector place = Farthest(piece, centre);
+      const ZORMathVector place = FarthestPoint(piece, centre);
       const double distance = Distance(centre, place);
       if (distance < radius) continue;
       radius = distance;
       farthest = place;
     }
     if (best.IsEmpty() || radius < best.radius) best = {centre, radius};
-    centre = Towards(centre, farthest, 1.0 / (step + 2));
+    centre = Lerp(centre, farthest, 1.0 / (step + 2));
   }
   return best;
 }

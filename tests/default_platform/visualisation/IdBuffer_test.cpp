@@ -6,7 +6,7 @@
 #include <random>
 
 #include "default_platform/OpenModel.h"
-#include "default_platform/visualisation/PictureDrawing.h"
+#include "default_platform/visualisation/Rendering.h"
 #include "platform/visualisation/ZORI3DGeoVisu.h"
 #include "support/MeshScenes.h"
 
@@ -14,9 +14,9 @@ namespace {
 
 using support::MeshScene;
 using ZORDefault::Camera;
-using ZORDefault::DrawnMesh;
+using ZORDefault::IdBufferPixel;
+using ZORDefault::MeshInstance;
 using ZORDefault::PictureRequest;
-using ZORDefault::SeenPixel;
 
 constexpr int kWidth = 400, kHeight = 300;
 constexpr int kSampledPixels = 10'000;
@@ -46,7 +46,7 @@ struct Triangle {
 std::vector<Triangle> AllTriangles(const PictureRequest& inRequest) {
   std::vector<Triangle> triangles;
   for (std::uint32_t number = 0; number < inRequest.meshes.size(); ++number) {
-    const DrawnMesh& drawn = inRequest.meshes[number];
+    const MeshInstance& drawn = inRequest.meshes[number];
     for (const auto& corners : drawn.mesh->triangles) {
       Triangle triangle{{}, number};
       for (std::size_t i = 0; i < 3; ++i) {
@@ -67,7 +67,7 @@ struct Ray {
 Ray RayThrough(const Camera& inCamera, int inX, int inY) {
   const ZORMathVector aside = (inX + 0.5 - kWidth / 2.0) * inCamera.pixelSize * inCamera.right +
                               (inY + 0.5 - kHeight / 2.0) * inCamera.pixelSize * inCamera.down;
-  if (inCamera.isConic) return {inCamera.eye, inCamera.forward + aside};
+  if (inCamera.isPerspective) return {inCamera.eye, inCamera.forward + aside};
   return {inCamera.eye + aside, inCamera.forward};
 }
 
@@ -90,7 +90,7 @@ double DepthOf(const Ray& inRay, const Triangle& inTriangle, double& ioMargin) {
 }
 
 struct Answer {
-  std::uint32_t mesh = SeenPixel::kNothing;
+  std::uint32_t mesh = IdBufferPixel::kNone;
   double depth = std::numeric_limits<double>::infinity();
   double second = std::numeric_limits<double>::infinity();  // of another mesh
   double margin = 1;
@@ -135,14 +135,14 @@ void CompareSampled(const ZOR3DRep& inRep, const ZOR3DViewpoint& inViewpoint) {
   constexpr double kHair = 1e-4, kDepthShare = 5e-5;
   const PictureRequest request =
       ZORDefault::MakePictureRequest(inRep, inViewpoint, kWidth, kHeight, nullptr);
-  const auto seen = ZORDefault::SeePixels(inRep, inViewpoint, kWidth, kHeight);
+  const auto seen = ZORDefault::RenderIdBuffer(inRep, inViewpoint, kWidth, kHeight);
   ASSERT_TRUE(seen);
   const std::vector<Triangle> triangles = AllTriangles(request);
   std::mt19937 random(11);
   int doubtful = 0, hits = 0;
   for (int i = 0; i < kSampledPixels; ++i) {
     const int x = static_cast<int>(random() % kWidth), y = static_cast<int>(random() % kHeight);
-    const SeenPixel& pixel = (*seen)[static_cast<std::size_t>(y * kWidth + x)];
+    const IdBufferPixel& pixel = (*seen)[static_cast<std::size_t>(y * kWidth + x)];
     const Answer answer = Search(RayThrough(request.camera, x, y), triangles);
     const double tolerance = kDepthShare * inViewpoint.focusDistance;
     if (answer.margin < kHair || answer.second - answer.depth < tolerance) {
@@ -150,7 +150,7 @@ void CompareSampled(const ZOR3DRep& inRep, const ZOR3DViewpoint& inViewpoint) {
       continue;
     }
     ASSERT_EQ(pixel.mesh, answer.mesh) << x << ' ' << y;
-    if (pixel.mesh == SeenPixel::kNothing) continue;
+    if (pixel.mesh == IdBufferPixel::kNone) continue;
     ++hits;
     ASSERT_NEAR(pixel.depth, answer.depth, tolerance) << x << ' ' << y;
   }
@@ -165,25 +165,25 @@ ZOR3DViewpoint Framing(const ZOR3DRep& inRep, ZOR3DViewpoint::Projection inProje
   return viewpoint;
 }
 
-TEST(SeenPixels, ConicViewAgreesWithAllTriangles) {
+TEST(IdBuffer, ConicViewAgreesWithAllTriangles) {
   MeshScene scene;
   Fill(scene, 0);
   CompareSampled(*scene.Bag(), Framing(*scene.Bag(), ZOR3DViewpoint::kConic));
 }
 
-TEST(SeenPixels, CylindricViewAgreesWithAllTriangles) {
+TEST(IdBuffer, CylindricViewAgreesWithAllTriangles) {
   MeshScene scene;
   Fill(scene, 0);
   CompareSampled(*scene.Bag(), Framing(*scene.Bag(), ZOR3DViewpoint::kCylindric));
 }
 
-TEST(SeenPixels, FarFromTheOriginAgreesWithAllTriangles) {
+TEST(IdBuffer, FarFromTheOriginAgreesWithAllTriangles) {
   MeshScene scene;
   Fill(scene, 1e7);
   CompareSampled(*scene.Bag(), Framing(*scene.Bag(), ZOR3DViewpoint::kConic));
 }
 
-TEST(SeenPixels, ModelAgreesWithAllTriangles) {
+TEST(IdBuffer, ModelAgreesWithAllTriangles) {
   ZORDefault::ModelOptions options;
   options.useCache = false;
   const auto model =
@@ -193,20 +193,20 @@ TEST(SeenPixels, ModelAgreesWithAllTriangles) {
   CompareSampled(rep, Framing(rep, ZOR3DViewpoint::kConic));
 }
 
-TEST(SeenPixels, DepthOfWhatIsDrawnOverIsItsReal) {
+TEST(IdBuffer, DepthOfWhatIsDrawnOverIsItsReal) {
   for (const auto projection : {ZOR3DViewpoint::kConic, ZOR3DViewpoint::kCylindric}) {
     MeshScene scene;
     scene.Add(support::MakeSphere(5, 40), support::MovedBy(0, 30, 0), {255, 0, 0, 255})
-        ->SetDrawnOver(true);
+        ->SetOverlay(true);
     scene.Add(support::MakeBox(20, 4, 20), support::MovedBy(0, 0, 0), {0, 0, 255, 255});
     ZOR3DViewpoint viewpoint;
     viewpoint.projection = projection;
     viewpoint.sight = {0, 1, 0};
     viewpoint.up = {0, 0, 1};
     viewpoint.origin = {0, -100, 0};
-    const auto seen = ZORDefault::SeePixels(*scene.Bag(), viewpoint, kWidth, kHeight);
+    const auto seen = ZORDefault::RenderIdBuffer(*scene.Bag(), viewpoint, kWidth, kHeight);
     ASSERT_TRUE(seen);
-    const SeenPixel& middle = (*seen)[kHeight / 2 * kWidth + kWidth / 2];
+    const IdBufferPixel& middle = (*seen)[kHeight / 2 * kWidth + kWidth / 2];
     EXPECT_EQ(middle.mesh, 0u);
     EXPECT_NEAR(middle.depth, 125, 0.05);
   }

@@ -1,13 +1,16 @@
+#include "default_platform/visualisation/ray_caster/ImageEncoding.h"
+
 #include <png.h>
+#include <turbojpeg.h>
 
 #include <csetjmp>
-
-#include "default_platform/visualisation/ray_caster/DrawPicture.h"
+#include <memory>
 
 namespace ZORRayCaster {
 namespace {
 
-constexpr int kCompressionLevel = 4;  // beyond it, files shrink little and take much longer
+constexpr int kJpegQuality = 92;
+constexpr int kPngLevel = 4;  // beyond it, files shrink little and take much longer
 
 void AppendBytes(png_structp inWriter, png_bytep inBytes, std::size_t inCount) {
   auto& file = *static_cast<std::string*>(png_get_io_ptr(inWriter));
@@ -18,7 +21,7 @@ bool WritePng(png_structp inWriter, png_infop inInfo, int inWidth, int inHeight,
               const std::uint8_t* inPixels, std::string& outFile) {
   if (setjmp(png_jmpbuf(inWriter)) != 0) return false;
   png_set_write_fn(inWriter, &outFile, &AppendBytes, nullptr);
-  png_set_compression_level(inWriter, kCompressionLevel);
+  png_set_compression_level(inWriter, kPngLevel);
   png_set_filter(inWriter, PNG_FILTER_TYPE_BASE, PNG_FILTER_SUB | PNG_FILTER_UP);
   png_set_IHDR(inWriter, inInfo, static_cast<png_uint_32>(inWidth),
                static_cast<png_uint_32>(inHeight), 8, PNG_COLOR_TYPE_RGB, PNG_INTERLACE_NONE,
@@ -34,7 +37,19 @@ bool WritePng(png_structp inWriter, png_infop inInfo, int inWidth, int inHeight,
 
 }  // namespace
 
-std::string PngFile(int inWidth, int inHeight, const std::uint8_t* inPixels) {
+std::string EncodeJpeg(int inWidth, int inHeight, const std::uint8_t* inPixels) {
+  const std::unique_ptr<void, int (*)(tjhandle)> compressor(tjInitCompress(), &tjDestroy);
+  unsigned char* bytes = nullptr;
+  unsigned long size = 0;
+  // Full colour resolution: thin coloured lines stay crisp.
+  const bool isEncoded =
+      compressor && tjCompress2(compressor.get(), inPixels, inWidth, 0, inHeight, TJPF_RGB, &bytes,
+                                &size, TJSAMP_444, kJpegQuality, TJFLAG_ACCURATEDCT) == 0;
+  const std::unique_ptr<unsigned char, void (*)(unsigned char*)> owner(bytes, &tjFree);
+  return isEncoded ? std::string(bytes, bytes + size) : std::string();
+}
+
+std::string EncodePng(int inWidth, int inHeight, const std::uint8_t* inPixels) {
   std::string file;
   png_structp writer = png_create_write_struct(PNG_LIBPNG_VER_STRING, nullptr, nullptr, nullptr);
   png_infop info = writer ? png_create_info_struct(writer) : nullptr;

@@ -1,4 +1,4 @@
-#include "default_platform/visualisation/DrawnMesh.h"
+#include "default_platform/visualisation/SceneGraph.h"
 
 #include <gtest/gtest.h>
 
@@ -8,8 +8,8 @@ namespace {
 
 using support::MakeBox;
 using support::MeshScene;
-using ZORDefault::CollectDrawnMeshes;
-using ZORDefault::DrawnMesh;
+using ZORDefault::CollectMeshInstances;
+using ZORDefault::MeshInstance;
 
 constexpr PartColour kGreen{0, 255, 0, 255};
 constexpr PartColour kDefault{210, 210, 210, 255};
@@ -17,10 +17,10 @@ constexpr PartColour kRed{255, 0, 0, 255};
 constexpr PartColour kBlue{0, 0, 255, 255};
 constexpr unsigned int kImposed = ZORRep::kImposeColour | ZORRep::kOwnColour;
 
-DrawnMesh OnlyMeshOf(const MeshScene& inScene) {
-  const auto meshes = CollectDrawnMeshes(*inScene.Bag());
+MeshInstance OnlyMeshOf(const MeshScene& inScene) {
+  const auto meshes = CollectMeshInstances(*inScene.Bag());
   EXPECT_EQ(meshes.size(), 1u);
-  return meshes.empty() ? DrawnMesh() : meshes[0];
+  return meshes.empty() ? MeshInstance() : meshes[0];
 }
 
 /// A bag with a green box, in another bag.
@@ -33,26 +33,26 @@ struct NestedScene {
   PlacedMeshRep* box;
 };
 
-TEST(DrawnMesh, OwnColourIsShown) {
+TEST(SceneGraph, OwnColourIsShown) {
   MeshScene scene;
   scene.Add(MakeBox(1, 1, 1), ZORMathTransformation(), kGreen);
   EXPECT_EQ(OnlyMeshOf(scene).colour, kGreen);
   EXPECT_FALSE(OnlyMeshOf(scene).isColourImposed);
 }
 
-TEST(DrawnMesh, WithoutAnyColourTheDefaultGreyIsShown) {
+TEST(SceneGraph, WithoutAnyColourTheDefaultGreyIsShown) {
   MeshScene scene;
   scene.Add(MakeBox(1, 1, 1), ZORMathTransformation(), kGreen)->SetInheritanceMode(0);
   EXPECT_EQ(OnlyMeshOf(scene).colour, kDefault);
 }
 
-TEST(DrawnMesh, ColourOfABagWithoutModeIsNotShown) {
+TEST(SceneGraph, ColourOfABagWithoutModeIsNotShown) {
   NestedScene scene;
   scene.outer.Bag()->SetColorRGBA(255, 0, 0, 255);
   EXPECT_EQ(OnlyMeshOf(scene.outer).colour, kGreen);
 }
 
-TEST(DrawnMesh, ColourOfABagIsShownWhereNothingBelowHasOne) {
+TEST(SceneGraph, ColourOfABagIsShownWhereNothingBelowHasOne) {
   NestedScene scene;
   scene.inner.Bag()->SetColorRGBA(255, 0, 0, 255);
   scene.inner.Bag()->SetInheritanceMode(ZORRep::kOwnColour);
@@ -61,7 +61,7 @@ TEST(DrawnMesh, ColourOfABagIsShownWhereNothingBelowHasOne) {
   EXPECT_EQ(OnlyMeshOf(scene.outer).colour, kRed);
 }
 
-TEST(DrawnMesh, ImposedColourWinsOverAllBelow) {
+TEST(SceneGraph, ImposedColourWinsOverAllBelow) {
   NestedScene scene;
   scene.inner.Bag()->SetColorRGBA(255, 0, 0, 255);
   scene.inner.Bag()->SetInheritanceMode(kImposed);
@@ -69,7 +69,7 @@ TEST(DrawnMesh, ImposedColourWinsOverAllBelow) {
   EXPECT_TRUE(OnlyMeshOf(scene.outer).isColourImposed);
 }
 
-TEST(DrawnMesh, TopmostImposedColourWins) {
+TEST(SceneGraph, TopmostImposedColourWins) {
   NestedScene scene;
   scene.box->SetInheritanceMode(kImposed);
   scene.inner.Bag()->SetColorRGBA(255, 0, 0, 255);
@@ -79,7 +79,7 @@ TEST(DrawnMesh, TopmostImposedColourWins) {
   EXPECT_EQ(OnlyMeshOf(scene.outer).colour, kBlue);
 }
 
-TEST(DrawnMesh, ImposingEndsWithTheBag) {
+TEST(SceneGraph, ImposingEndsWithTheBag) {
   MeshScene first, second, both;
   first.Add(MakeBox(1, 1, 1), ZORMathTransformation(), kGreen);
   second.Add(MakeBox(1, 1, 1), ZORMathTransformation(), kBlue);
@@ -87,7 +87,7 @@ TEST(DrawnMesh, ImposingEndsWithTheBag) {
   first.Bag()->SetInheritanceMode(kImposed);
   both.Bag()->AddChild(first.Bag());
   both.Bag()->AddChild(second.Bag());
-  const auto meshes = CollectDrawnMeshes(*both.Bag());
+  const auto meshes = CollectMeshInstances(*both.Bag());
   ASSERT_EQ(meshes.size(), 2u);
   EXPECT_EQ(meshes[0].colour, kRed);
   EXPECT_EQ(meshes[1].colour, kBlue);
