@@ -14,9 +14,9 @@ if(libraryParent)
 endif()
 
 file(RELATIVE_PATH binToLib /prefix/${CMAKE_INSTALL_BINDIR} /prefix/${CMAKE_INSTALL_LIBDIR})
-set_target_properties(ZORLyra ZORDefaultPlatform PROPERTIES INSTALL_RPATH "$ORIGIN")
+set_target_properties(ZORLyra ZORDefaultPlatform ZORFoundation PROPERTIES INSTALL_RPATH "$ORIGIN")
 
-install(TARGETS ZORPlatformDeclarations ZORDefaultPlatform ZORLyra EXPORT ZORLyraTargets
+install(TARGETS ZORPlatformDeclarations ZORFoundation ZORDefaultPlatform ZORLyra EXPORT ZORLyraTargets
   RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR}
   LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
   ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR})

@@ -1,0 +1,204 @@
+#include "foundation/AtomicFile.h"
+
+#include <fcntl.h>
+#include <stdio.h>
+#include <sys/random.h>
+#include <sys/stat.h>
+#include <sys/xattr.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <filesystem>
+#include <vector>
+
+#include "foundation/Descriptor.h"
+#include "foundation/Hash.h"
+#include "foundation/Utf8.h"
+
+namespace fs = std::filesystem;
+
+namespace ZORFoundation {
+namespace {
+
+constexpr std::string_view kTemporaryPrefix = ".zorlyra-";
+constexpr std::size_t kTemporaryDigits = 16;
+
+std::string FolderOf(const std::string& inPath) {
+  const std::size_t slash = inPath.rfind('/');
+  return slash == std::string::npos ? "./" : inPath.substr(0, slash + 1);
+}
+
+std::uint64_t RandomNumber() {
+  std::uint64_t number = 0;
+  if (getrandom(&number, sizeof number, GRND_NONBLOCK) != sizeof number)
+    number = Hash64Of(std::to_string(getpid()), static_cast<std::uint64_t>(clock()));
+  return number;
+}
+
+/// The path behind symbolic links, which need not lead to a file.
+std::string FollowLinks(const std::string& inPath) {
+  constexpr int kMaxLinks = 40;  // as many as Linux follows
+  fs::path path = inPath;
+  for (int i = 0; i < kMaxLinks; ++i) {
+    std::error_code error;
+    const fs::path link = fs::read_symlink(path, error);
+    if (error) return path.string();
+    path = path.parent_path() / link;
+  }
+  throw FileError(inPath, ELOOP);
+}
+
+void CopyExtendedAttributes(int inFrom, int inTo) {
+  const ssize_t size = flistxattr(inFrom, nullptr, 0);
+  if (size <= 0) return;
+  std::string names(static_cast<std::size_t>(size), '\0');
+  names.resize(static_cast<std::size_t>(
+      std::max<ssize_t>(0, flistxattr(inFrom, names.data(), names.size()))));
+  for (std::size_t start = 0; start < names.size();) {
+    const char* const name = names.data() + start;
+    start = names.find('\0', start) + 1;
+    // Rights that were given to the old bytes, not to whatever comes in their place.
+    if (std::string_view(name) == "security.capability") continue;
+    const ssize_t count = fgetxattr(inFrom, name, nullptr, 0);
+    if (count < 0) continue;
+    std::vector<char> value(static_cast<std::size_t>(count));
+    if (fgetxattr(inFrom, name, value.data(), value.size()) == count)
+      static_cast<void>(fsetxattr(inTo, name, value.data(), value.size(), 0));
+  }
+}
+
+}  // namespace
+
+TemporaryFile::TemporaryFile(const std::string& inFolder, unsigned int inMode,
+                             const std::string& inStandsFor)
+    : standsFor_(inStandsFor) {
+  const std::string folder = inFolder + (inFolder.ends_with('/') ? "" : "/");
+  do {
+    path_ = folder + std::string(kTemporaryPrefix) + HexText(RandomNumber());
+    removeOnSignal_.emplace(path_.c_str());  // before there is something to remove
+    descriptor_ = open(path_.c_str(), O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, inMode);
+  } while (descriptor_ < 0 && errno == EEXIST);
+  if (descriptor_ < 0) throw FileError(standsFor_, errno);
+}
+
+TemporaryFile::~TemporaryFile() {
+  close(descriptor_);
+  if (!path_.empty()) unlink(path_.c_str());
+}
+
+std::string TemporaryFile::Utf8Path() const {
+  return IsUtf8(path_) ? path_ : "/proc/self/fd/" + std::to_string(descriptor_);
+}
+
+void TemporaryFile::Write(std::string_view inBytes) {
+  std::size_t written = 0;
+  const int error = WriteAll(descriptor_, inBytes, written);
+  if (error != 0) throw FileError(standsFor_, error);
+}
+
+int TemporaryFile::Reopen() {
+  struct stat here {
+  }, there{};
+  if (fstat(descriptor_, &here) != 0 || stat(path_.c_str(), &there) != 0)
+    throw FileError(standsFor_, errno);
+  if (here.st_ino == there.st_ino && here.st_dev == there.st_dev) return descriptor_;
+  const int reopened = open(path_.c_str(), O_RDWR | O_CLOEXEC | O_NOFOLLOW);
+  if (reopened < 0) throw FileError(standsFor_, errno);
+  close(descriptor_);
+  return descriptor_ = reopened;
+}
+
+bool TemporaryFile::IsTemporaryName(std::string_view inName) {
+  return inName.starts_with(kTemporaryPrefix) &&
+         inName.size() == kTemporaryPrefix.size() + kTemporaryDigits &&
+         inName.find_first_not_of("0123456789abcdef", kTemporaryPrefix.size()) == inName.npos;
+}
+
+AtomicFile::AtomicFile(const std::string& inPath, const AtomicFileOptions& inOptions)
+    : path_(inPath), target_(FollowLinks(inPath)), options_(inOptions) {
+  CheckTarget();
+  constexpr unsigned int kOwnerOnly = 0600;
+  if (isStream_) {
+    std::error_code ignored;
+    const fs::path folder = fs::temp_directory_path(ignored);
+    temporary_.emplace(folder.empty() ? "/tmp" : folder.string(), kOwnerOnly, path_);
+  } else {
+    temporary_.emplace(FolderOf(target_), isNew_ ? options_.modeOfNew : kOwnerOnly, path_);
+  }
+}
+
+AtomicFile::~AtomicFile() = default;
+
+void AtomicFile::CheckTarget() {
+  struct stat status {};
+  isNew_ = stat(target_.c_str(), &status) != 0;
+  if (isNew_) {
+    if (errno != ENOENT || target_.empty()) throw FileError(path_, errno);
+    return;
+  }
+  if (!options_.mayReplace) throw FileError(path_, EEXIST);
+  if (S_ISDIR(status.st_mode)) throw FileError(path_, EISDIR);
+  if (access(target_.c_str(), W_OK) != 0) throw FileError(path_, errno);
+  isStream_ = !S_ISREG(status.st_mode);
+}
+
+void AtomicFile::KeepAttributes(int inDescriptor) const {
+  const ZORFoundation::Descriptor old(open(target_.c_str(), O_PATH | O_CLOEXEC));
+  struct stat status {};
+  if (!old.IsOpen() || fstat(old.Get(), &status) != 0 || !S_ISREG(status.st_mode)) return;
+  // Whoever may not give the file away may still give it to a group of his own.
+  bool isOwnerKept = fchown(inDescriptor, status.st_uid, status.st_gid) == 0;
+  if (!isOwnerKept)
+    isOwnerKept = fchown(inDescriptor, static_cast<uid_t>(-1), status.st_gid) == 0 &&
+                  status.st_uid == geteuid();
+  // The rights of another owner's program are not passed on to this one's.
+  if (fchmod(inDescriptor, status.st_mode & (isOwnerKept ? 07777U : 0777U)) != 0)
+    throw FileError(path_, errno);
+  const ZORFoundation::Descriptor readable(
+      open(target_.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
+  if (readable.IsOpen()) CopyExtendedAttributes(readable.Get(), inDescriptor);
+}
+
+void AtomicFile::Commit() {
+  if (isStream_) {
+    CopyIntoTarget();
+    return;
+  }
+  const int descriptor = temporary_->Reopen();
+  if (!isNew_) KeepAttributes(descriptor);
+  // Some file systems report a full disk only here.
+  if (options_.isSynchronised && fsync(descriptor) != 0) throw FileError(path_, errno);
+  Rename();
+  temporary_->Release();
+}
+
+void AtomicFile::Rename() {
+  const char* const from = temporary_->Path().c_str();
+  if (!options_.mayReplace) {
+    // There was no such file before; another process may have been quicker.
+    if (renameat2(AT_FDCWD, from, AT_FDCWD, target_.c_str(), RENAME_NOREPLACE) == 0) return;
+    if (errno != EINVAL && errno != ENOSYS) throw FileError(path_, errno);
+  }
+  if (rename(from, target_.c_str()) != 0) throw FileError(path_, errno);
+}
+
+void AtomicFile::CopyIntoTarget() const {
+  ZORFoundation::Descriptor target(open(target_.c_str(), O_WRONLY | O_CLOEXEC | O_NOCTTY));
+  if (!target.IsOpen()) throw FileError(path_, errno);
+  const ZORFoundation::Descriptor source(open(temporary_->Path().c_str(), O_RDONLY | O_CLOEXEC));
+  if (!source.IsOpen()) throw FileError(path_, errno);
+  int error = CopyBytes(source.Get(), target.Get());
+  const int closing = target.Close();
+  if (error == 0) error = closing;
+  if (error != 0) throw FileError(path_, error);
+}
+
+void WriteWholeFile(const std::string& inPath, std::string_view inBytes,
+                    const AtomicFileOptions& inOptions) {
+  AtomicFile file(inPath, inOptions);
+  file.Write(inBytes);
+  file.Commit();
+}
+
+}  // namespace ZORFoundation

@@ -1,0 +1,61 @@
+#include "foundation/Hash.h"
+
+#define XXH_INLINE_ALL
+#include <xxhash.h>
+
+#include <bit>
+#include <charconv>
+#include <new>
+
+namespace ZORFoundation {
+namespace {
+
+static_assert(std::endian::native == std::endian::little, "numbers are added as they lie");
+
+XXH3_state_t* StateIn(unsigned char* inPlace) {
+  return std::launder(reinterpret_cast<XXH3_state_t*>(inPlace));
+}
+const XXH3_state_t* StateIn(const unsigned char* inPlace) {
+  return std::launder(reinterpret_cast<const XXH3_state_t*>(inPlace));
+}
+
+}  // namespace
+
+std::uint64_t Hash64Of(std::string_view inBytes, std::uint64_t inSeed) {
+  return XXH3_64bits_withSeed(inBytes.data(), inBytes.size(), inSeed);
+}
+
+Hash128Value Hash128Of(std::string_view inBytes, std::uint64_t inSeed) {
+  const XXH128_hash_t hash = XXH3_128bits_withSeed(inBytes.data(), inBytes.size(), inSeed);
+  return {hash.high64, hash.low64};
+}
+
+std::string HexText(std::uint64_t inHash) {
+  char digits[16];
+  const char* const end = std::to_chars(digits, digits + sizeof digits, inHash, 16).ptr;
+  const std::size_t count = static_cast<std::size_t>(end - digits);
+  return std::string(sizeof digits - count, '0').append(digits, count);
+}
+
+std::string HexText(const Hash128Value& inHash) {
+  return HexText(inHash.high) + HexText(inHash.low);
+}
+
+HashState::HashState(std::uint64_t inSeed) {
+  static_assert(sizeof state_ == sizeof(XXH3_state_t) && alignof(XXH3_state_t) <= 64);
+  XXH3_64bits_reset_withSeed(new (state_) XXH3_state_t, inSeed);
+}
+
+// Both hashes are fed alike; they differ in how they end.
+void HashState::AddBytes(const void* inBytes, std::size_t inCount) {
+  if (inCount > 0) XXH3_64bits_update(StateIn(state_), inBytes, inCount);
+}
+
+std::uint64_t HashState::Digest64() const { return XXH3_64bits_digest(StateIn(state_)); }
+
+Hash128Value HashState::Digest128() const {
+  const XXH128_hash_t hash = XXH3_128bits_digest(StateIn(state_));
+  return {hash.high64, hash.low64};
+}
+
+}  // namespace ZORFoundation

@@ -1,0 +1,59 @@
+// Files that are read as a whole.
+#ifndef ZOR_FOUNDATION_READWHOLEFILE_H
+#define ZOR_FOUNDATION_READWHOLEFILE_H
+
+#include <cstdint>
+#include <limits>
+#include <optional>
+#include <string>
+
+#include "foundation/FileError.h"
+
+namespace ZORFoundation {
+
+/// What tells one content of a file from another without reading it.
+struct FileStamp {
+  std::uint64_t device = 0, inode = 0, size = 0;
+  std::int64_t modified = 0, changed = 0;  // nanoseconds since 1970
+  friend bool operator==(const FileStamp&, const FileStamp&) = default;
+};
+
+/// @return nothing when there is no such file.
+ZOR_FOUNDATION_EXPORT std::optional<FileStamp> StampOfFile(const std::string& inPath);
+
+/// @return nanoseconds since 1970, of the clock that file stamps are taken from.
+ZOR_FOUNDATION_EXPORT std::int64_t FileClockNow();
+
+struct ReadOptions {
+  std::uint64_t maxSize = std::numeric_limits<std::uint64_t>::max();  ///< in bytes
+  /// Whether devices and pipes are read too, to their end. Otherwise they are refused at once,
+  /// without waiting for whoever writes into them.
+  bool mayBeStream = false;
+};
+
+struct WholeFile {
+  std::string bytes;
+  FileStamp before, after;  ///< of the first and the last byte's reading
+  /// Whether the bytes are one state of the file, which has that stamp.
+  bool IsConsistent() const { return before == after && before.size == bytes.size(); }
+};
+
+/// Reads a file from its first byte to its last. Raises FileError: missing (ENOENT), a folder
+/// (EISDIR), a device, pipe or socket (ESPIPE), larger than allowed (EFBIG), and what the system
+/// says else; std::bad_alloc.
+ZOR_FOUNDATION_EXPORT WholeFile ReadWholeFile(const std::string& inPath,
+                                              const ReadOptions& inOptions = {});
+
+/// The same where the reason does not matter.
+ZOR_FOUNDATION_EXPORT std::optional<WholeFile> TryReadWholeFile(const std::string& inPath,
+                                                                const ReadOptions& inOptions = {});
+
+/// Reads what is left of an open file, pipe or device.
+/// @param inName stands for the path in a FileError.
+ZOR_FOUNDATION_EXPORT std::string ReadToEnd(
+    int inDescriptor, const std::string& inName,
+    std::uint64_t inMaxSize = std::numeric_limits<std::uint64_t>::max());
+
+}  // namespace ZORFoundation
+
+#endif
