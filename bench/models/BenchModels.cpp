@@ -28,8 +28,8 @@ struct Opening {
 };
 
 void AddProduct(const ZORIProduct_var& inProduct, ResultHash& ioHash) {
-  ZORDefault::ProductFacts facts;
-  ZORDefault::GetProductFacts(inProduct.GetInterface(), facts);
+  ZORDefault::ProductInfo facts;
+  ZORDefault::GetProductInfo(inProduct.GetInterface(), facts);
   double placement[12];
   facts.rootFromProduct.GetCoefficients(placement);
   for (const double number : placement) ioHash.Add(std::to_string(number));

@@ -50,8 +50,8 @@ constexpr PartColour kBlue{60, 110, 200, 255};
 constexpr PartColour kGrey{210, 210, 210, 255};
 
 void AddProducts(const ZORIProduct_var& inProduct, support::MeshScene& ioScene) {
-  ZORDefault::ProductFacts facts;
-  ZORDefault::GetProductFacts(inProduct.GetInterface(), facts);
+  ZORDefault::ProductInfo facts;
+  ZORDefault::GetProductInfo(inProduct.GetInterface(), facts);
   if (facts.mesh) ioScene.Add(facts.mesh, facts.rootFromProduct, facts.colour.value_or(kGrey));
   const std::unique_ptr<ZORListValZORBaseUnknown_var> children(
       inProduct->GetChildren("ZORIProduct"));

@@ -66,13 +66,13 @@ ZOR_PLATFORM_EXPORT OpenedModel OpenModel(const std::string& inPath,
                                           const ModelOptions& inOptions = {});
 
 /// What is known of one product of an opened model.
-struct ProductFacts {
+struct ProductInfo {
   ZORUnicodeString alias;
   ZORUnicodeString instanceName;  ///< as the file has it; may be empty
   ZORUnicodeString partName;      ///< as the file has it; may be empty
   std::size_t part = 0;           ///< the same number for all instances of one part or assembly
   bool isAssembly = false;
-  ZORMathTransformation fatherFromProduct;
+  ZORMathTransformation parentFromProduct;
   ZORMathTransformation rootFromProduct;
   std::optional<std::array<std::uint8_t, 4>>
       colour;                 ///< its own, or its part's: red, green, blue, alpha
@@ -83,8 +83,8 @@ struct ProductFacts {
   std::shared_ptr<const PartMesh> mesh;  ///< shared by all instances; null when nothing is shown
 };
 
-/// @return false when the product is none of an opened model (or null); outFacts is untouched then.
-ZOR_PLATFORM_EXPORT bool GetProductFacts(ZORIProduct* inProduct, ProductFacts& outFacts);
+/// @return false when the product is none of an opened model (or null); outInfo is untouched then.
+ZOR_PLATFORM_EXPORT bool GetProductInfo(ZORIProduct* inProduct, ProductInfo& outInfo);
 
 /// The product that an alias path leads to: the aliases from below the root down, joined by
 /// " --++-- ". A component to which its file gives no name is also found by the name "=>[0:1:1:30]"

@@ -86,8 +86,8 @@ Quaternion QuaternionOf(const double* inColumns) {
 }  // namespace
 
 ModelProductRecord ReadModelProduct(const ZORIProduct_var& inProduct) {
-  ZORDefault::ProductFacts facts;
-  ZORDefault::GetProductFacts(inProduct.GetInterface(), facts);
+  ZORDefault::ProductInfo facts;
+  ZORDefault::GetProductInfo(inProduct.GetInterface(), facts);
   ModelProductRecord record;
   record.alias = Utf8(facts.alias);
   record.part = Utf8(facts.partName);

@@ -9,7 +9,7 @@
 #include <fstream>
 #include <random>
 
-#include "default_platform/product_structure/ModelCodec.h"
+#include "default_platform/product_structure/ModelData.h"
 #include "default_platform/system/SystemFiles.h"
 #include "platform/system/ZORGetEnv.h"
 
@@ -21,9 +21,9 @@ namespace fs = std::filesystem;
 /// What an entry begins with; the model's bytes follow.
 struct EntryHeader {
   char mark[8] = {'Z', 'O', 'R', 'M', 'O', 'D', 'E', 'L'};
-  std::uint64_t size = 0;        // of the bytes that follow
-  std::uint64_t checksum = 0;    // of the bytes that follow and of otherFiles
-  std::uint64_t otherFiles = 0;  // of the content of the other files
+  std::uint64_t size = 0;             // of the bytes that follow
+  std::uint64_t checksum = 0;         // of the bytes that follow and of referencedFiles
+  std::uint64_t referencedFiles = 0;  // of the content of the other files
 };
 
 std::string CacheDirectory() {
@@ -58,8 +58,8 @@ std::uint64_t HashOfFiles(const std::string& inFolder, const std::vector<std::st
   return hash;
 }
 
-std::uint64_t ChecksumOf(std::string_view inModel, std::uint64_t inOtherFiles) {
-  return XXH3_64bits_withSeed(inModel.data(), inModel.size(), inOtherFiles);
+std::uint64_t ChecksumOf(std::string_view inModel, std::uint64_t inReferencedFiles) {
+  return XXH3_64bits_withSeed(inModel.data(), inModel.size(), inReferencedFiles);
 }
 
 bool IsWholeEntry(const std::string& inEntry, EntryHeader& outHeader) {
@@ -69,7 +69,7 @@ bool IsWholeEntry(const std::string& inEntry, EntryHeader& outHeader) {
   const std::string_view model = std::string_view(inEntry).substr(sizeof(EntryHeader));
   return std::memcmp(outHeader.mark, expected.mark, sizeof expected.mark) == 0 &&
          outHeader.size == model.size() &&
-         outHeader.checksum == ChecksumOf(model, outHeader.otherFiles);
+         outHeader.checksum == ChecksumOf(model, outHeader.referencedFiles);
 }
 
 /// Writes beside the place and renames, so that other processes see the old entry or the new one.
@@ -102,7 +102,7 @@ ModelCache::Finding ModelCache::Load(ModelData& outModel) const {
   if (!IsWholeEntry(entry, header) ||
       !DecodeModel(std::string_view(entry).substr(sizeof header), model))
     return Finding::kDamaged;
-  if (header.otherFiles != HashOfFiles(folder_, model.otherFiles)) return Finding::kNone;
+  if (header.referencedFiles != HashOfFiles(folder_, model.referencedFiles)) return Finding::kNone;
   outModel = std::move(model);
   return Finding::kFound;
 }
@@ -112,8 +112,8 @@ void ModelCache::Store(const ModelData& inModel) const {
   const std::string model = EncodeModel(inModel);
   EntryHeader header;
   header.size = model.size();
-  header.otherFiles = HashOfFiles(folder_, inModel.otherFiles);
-  header.checksum = ChecksumOf(model, header.otherFiles);
+  header.referencedFiles = HashOfFiles(folder_, inModel.referencedFiles);
+  header.checksum = ChecksumOf(model, header.referencedFiles);
   WriteEntry(path_, header, model);
 }
 

@@ -5,7 +5,7 @@
 #include <string>
 #include <string_view>
 
-#include "default_platform/product_structure/ModelReaderEntry.h"
+#include "default_platform/product_structure/ModelReader.h"
 
 namespace ZORDefault {
 

@@ -6,6 +6,7 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "default_platform/visualisation/PartMesh.h"
@@ -27,23 +28,32 @@ struct ModelPart {
 
 /// One instance in the tree.
 struct ModelProduct {
-  static constexpr std::int32_t kNoFather = -1;
+  static constexpr std::int32_t kNoParent = -1;
 
   std::u16string name;  ///< as the file has it; may be empty
-  std::int32_t father = kNoFather;
+  std::int32_t parent = kNoParent;
   std::uint32_t part = 0;
-  ZORMathTransformation fatherFromProduct;
+  ZORMathTransformation parentFromProduct;
   std::optional<PartColour> colour;
 };
 
-/// The first product is the root; a father stands before its children, which are in order.
+/// The first product is the root; a parent stands before its children, which are in order.
 struct ModelData {
   std::vector<ModelPart> parts;
   std::vector<ModelProduct> products;
   /// Files that parts of the content were taken from: relative to the model's folder, or absolute.
-  std::vector<std::string> otherFiles;
+  std::vector<std::string> referencedFiles;
   std::vector<std::string> warnings;  ///< one line each, UTF-8
 };
+
+/// Counts up with every change of the bytes or of what a reading gives.
+inline constexpr std::uint32_t kModelCodecVersion = 3;
+
+/// In the machine's own byte order: entries are not moved between machines.
+std::string EncodeModel(const ModelData& inModel);
+
+/// @return false when the bytes are no model: too short, too long, or holding impossible positions.
+bool DecodeModel(std::string_view inBytes, ModelData& outModel);
 
 }  // namespace ZORDefault
 

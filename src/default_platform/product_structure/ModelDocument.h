@@ -64,6 +64,16 @@ class ModelDocument final : public FacetedComponent, private CountedObject<Model
   ProvidersFacet providersFacet_;
 };
 
+/// The text with U+FFFD for each character that XML 1.0 cannot carry.
+ZOR_PLATFORM_EXPORT std::u16string ReplaceInvalidXmlChars(std::u16string inText);
+
+/// The alias of each product of a model, in the model's order: its own name, or its part's, or
+/// "Component"; siblings that would have the same are numbered from .1 on, passing over a number
+/// that would give the name of another sibling.
+/// @param inFileName stands for the root's name where it has none.
+ZOR_PLATFORM_EXPORT std::vector<std::u16string> AliasesOf(const ModelData& inModel,
+                                                          const std::u16string& inFileName);
+
 }  // namespace ZORDefault
 
 #endif

@@ -6,13 +6,13 @@
 #include "default_platform/product_structure/ModelCache.h"
 #include "default_platform/product_structure/ModelDocument.h"
 #include "default_platform/product_structure/ModelFormat.h"
-#include "default_platform/product_structure/ReaderLibrary.h"
+#include "default_platform/product_structure/ModelReader.h"
 #include "default_platform/system/SystemFiles.h"
 
 namespace ZORDefault {
 namespace {
 
-constexpr double kLargestDeflection = 0.1;
+constexpr double kMaxDeflection = 0.1;
 
 std::string ReadBytes(const std::string& inPath) {
   std::error_code error;
@@ -43,7 +43,7 @@ ModelRequest RequestFor(const std::string& inPath, ModelFormat inFormat,
   return {error ? inPath : path.string(), inFormat, inOptions.deflection, inOptions.progress};
 }
 
-ModelData ReadAnew(const std::string& inPath, const ModelRequest& inRequest) {
+ModelData ReadFromFile(const std::string& inPath, const ModelRequest& inRequest) {
   ModelData model;
   std::string reason;
   if (!ReadModelWithLibrary(inRequest, model, reason)) throw ModelError(inPath, reason);
@@ -56,14 +56,14 @@ ModelData ReadModel(const std::string& inPath, const std::string& inBytes,
   const ModelRequest request = RequestFor(inPath, CheckedFormat(inPath, inBytes), inOptions);
   ModelData model;
   outIsFromCache = false;
-  if (!inOptions.useCache) return ReadAnew(inPath, request);
+  if (!inOptions.useCache) return ReadFromFile(inPath, request);
   const ModelCache cache(inBytes, request);
   const ModelCache::Finding finding = cache.Load(model);
   if (finding == ModelCache::Finding::kDamaged && inOptions.warn)
     inOptions.warn(inPath + ": its entry in the cache was damaged and is made anew");
   outIsFromCache = finding == ModelCache::Finding::kFound;
   if (outIsFromCache) return model;
-  model = ReadAnew(inPath, request);
+  model = ReadFromFile(inPath, request);
   cache.Store(model);
   return model;
 }
@@ -80,7 +80,7 @@ ModelError::ModelError(const std::string& inPath, const std::string& inReason)
 ModelError::~ModelError() = default;
 
 OpenedModel OpenModel(const std::string& inPath, const ModelOptions& inOptions) {
-  if (!(inOptions.deflection > 0 && inOptions.deflection <= kLargestDeflection))
+  if (!(inOptions.deflection > 0 && inOptions.deflection <= kMaxDeflection))
     throw ModelError(inPath, "cannot be tessellated with a deflection outside 0 to 0.1");
   OpenedModel opened;
   ModelData model = ReadModel(inPath, ReadBytes(inPath), inOptions, opened.isFromCache);

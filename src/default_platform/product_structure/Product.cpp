@@ -1,7 +1,10 @@
 #include "default_platform/product_structure/Product.h"
 
+#include <cstring>
+
 #include "default_platform/product_structure/ModelDocument.h"
 #include "default_platform/visualisation/SceneGraph.h"
+#include "platform/system/ZORGetEnv.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
 
 namespace ZORDefault {
@@ -25,21 +28,21 @@ const std::optional<PartColour>& OwnColourOf(const Product& inProduct) {
 
 /// The colour in which a part is shown: its own, else that of the nearest product above it.
 const PartColour* ShownColourOf(const Product& inProduct) {
-  for (const Product* product = &inProduct; product; product = product->GetFather())
+  for (const Product* product = &inProduct; product; product = product->GetParent())
     if (const auto& colour = OwnColourOf(*product)) return &*colour;
   return nullptr;
 }
 
 /// A name may hold the separator itself, so every way to cut the path is tried.
-Product* FindBelow(const Product& inFather, const ZORUnicodeString& inPath) {
+Product* FindBelow(const Product& inParent, const ZORUnicodeString& inPath) {
   static const ZORUnicodeString kSeparator(" --++-- ");
-  for (Product* const child : inFather.GetChildren())
+  for (Product* const child : inParent.GetChildren())
     if (child->IsCalled(inPath)) return child;
   for (int end = inPath.SearchSubString(kSeparator); end >= 0;
        end = inPath.SearchSubString(kSeparator, end + 1)) {
     const ZORUnicodeString name = inPath.SubString(0, end);
     const ZORUnicodeString rest = inPath.SubString(end + kSeparator.GetLengthInChar());
-    for (Product* const child : inFather.GetChildren()) {
+    for (Product* const child : inParent.GetChildren()) {
       Product* const found = child->IsCalled(name) ? FindBelow(*child, rest) : nullptr;
       if (found) return found;
     }
@@ -54,10 +57,10 @@ const IID& ProductIdentity::ClassId() {
   return identifier;
 }
 
-Product::Product(ModelDocument& inDocument, std::size_t inIndex, Product* inFather)
+Product::Product(ModelDocument& inDocument, std::size_t inIndex, Product* inParent)
     : document_(&inDocument),
       index_(inIndex),
-      father_(inFather),
+      parent_(inParent),
       product_(*this),
       inSession_(*this),
       alias_(*this),
@@ -66,8 +69,8 @@ Product::Product(ModelDocument& inDocument, std::size_t inIndex, Product* inFath
       geoVisu_(*this),
       visProperties_(*this),
       identity_(*this) {
-  rootFromProduct_ = GetModelProduct().fatherFromProduct;
-  if (father_) rootFromProduct_ = father_->rootFromProduct_ * rootFromProduct_;
+  rootFromProduct_ = GetModelProduct().parentFromProduct;
+  if (parent_) rootFromProduct_ = parent_->rootFromProduct_ * rootFromProduct_;
   if (const auto& colour = OwnColourOf(*this))
     properties_.SetColor((*colour)[0], (*colour)[1], (*colour)[2]);
 }
@@ -106,23 +109,23 @@ const ModelPart& Product::GetPart() const {
 }
 const ZORUnicodeString& Product::GetAlias() const { return document_->GetAlias(index_); }
 
-ProductFacts Product::GetFacts() const {
+ProductInfo Product::GetInfo() const {
   const ModelPart& part = GetPart();
-  ProductFacts facts;
-  facts.alias = GetAlias();
-  facts.instanceName = ToUnicode(GetModelProduct().name);
-  facts.partName = ToUnicode(part.name);
-  facts.part = GetModelProduct().part;
-  facts.isAssembly = part.isAssembly;
-  facts.fatherFromProduct = GetModelProduct().fatherFromProduct;
-  facts.rootFromProduct = rootFromProduct_;
-  facts.colour = OwnColourOf(*this);
-  facts.triangles = part.mesh ? part.mesh->triangles.size() : 0;
-  facts.area = part.area;
-  facts.failedToTessellate = part.failedToTessellate;
-  facts.facesWithoutTriangles = part.facesWithoutTriangles;
-  facts.mesh = part.mesh;
-  return facts;
+  ProductInfo info;
+  info.alias = GetAlias();
+  info.instanceName = ToUnicode(GetModelProduct().name);
+  info.partName = ToUnicode(part.name);
+  info.part = GetModelProduct().part;
+  info.isAssembly = part.isAssembly;
+  info.parentFromProduct = GetModelProduct().parentFromProduct;
+  info.rootFromProduct = rootFromProduct_;
+  info.colour = OwnColourOf(*this);
+  info.triangles = part.mesh ? part.mesh->triangles.size() : 0;
+  info.area = part.area;
+  info.failedToTessellate = part.failedToTessellate;
+  info.facesWithoutTriangles = part.facesWithoutTriangles;
+  info.mesh = part.mesh;
+  return info;
 }
 
 bool Product::IsCalled(const ZORUnicodeString& inName) const {
@@ -178,7 +181,7 @@ ZORListValZORBaseUnknown_var* Product::ProductFacet::GetChildren(const char* inI
 }
 
 ZORIProduct_var Product::ProductFacet::GetFatherProduct() {
-  return self_.father_ ? ZORIProduct_var(&self_.father_->product_) : ZORIProduct_var();
+  return self_.parent_ ? ZORIProduct_var(&self_.parent_->product_) : ZORIProduct_var();
 }
 
 HRESULT Product::InSessionFacet::GetRepresentationName(int& outState, int inShown,
@@ -203,9 +206,9 @@ HRESULT Product::InSessionFacet::GetRepresentation(int& outState, int inShown,
 }
 
 ZORISpecObject* Product::SpecObjectFacet::GetFather() {
-  if (!self_.father_) return nullptr;
-  self_.father_->AddReference();
-  return &self_.father_->specObject_;
+  if (!self_.parent_) return nullptr;
+  self_.parent_->AddReference();
+  return &self_.parent_->specObject_;
 }
 
 ZORDocument* Product::LinkableFacet::GetDocument() { return self_.document_->GetInterface(); }
@@ -224,10 +227,10 @@ HRESULT Product::VisPropertiesFacet::SetPropertiesAtt(const ZORVisPropertiesValu
   return S_OK;
 }
 
-bool GetProductFacts(ZORIProduct* inProduct, ProductFacts& outFacts) {
+bool GetProductInfo(ZORIProduct* inProduct, ProductInfo& outInfo) {
   const ZORInterfaceHandle<ProductIdentity> product = ZORIProduct_var(inProduct);
   if (product.IsNull()) return false;
-  outFacts = product->GetProduct().GetFacts();
+  outInfo = product->GetProduct().GetInfo();
   return true;
 }
 
@@ -239,3 +242,8 @@ ZORIProduct_var FindProduct(const ZORIProduct_var& inRoot, const ZORUnicodeStrin
 }
 
 }  // namespace ZORDefault
+
+int ZORPrdNewVisuMode() {
+  const char* const mode = ZORGetEnv("ZOR_NEW_VISU_MODE");
+  return mode && std::strcmp(mode, "0") == 0 ? 0 : 1;
+}

@@ -37,7 +37,7 @@ class Product final : public FacetedComponent, private CountedObject<Product> {
   static const char* CountedName() { return "Product"; }
 
   /// @param inIndex the product's place in the document's model.
-  Product(ModelDocument& inDocument, std::size_t inIndex, Product* inFather);
+  Product(ModelDocument& inDocument, std::size_t inIndex, Product* inParent);
   ~Product();
   Product(const Product&) = delete;
   Product& operator=(const Product&) = delete;
@@ -48,7 +48,7 @@ class Product final : public FacetedComponent, private CountedObject<Product> {
   unsigned int ReleaseReference() override;
 
   ZORIProduct* GetInterface() { return &product_; }
-  Product* GetFather() const { return father_; }
+  Product* GetParent() const { return parent_; }
   const std::vector<Product*>& GetChildren() const { return children_; }
   void AddChild(Product* inChild) { children_.push_back(inChild); }
   ModelDocument& GetDocument() const { return *document_; }
@@ -56,7 +56,7 @@ class Product final : public FacetedComponent, private CountedObject<Product> {
   const ModelPart& GetPart() const;
   const ZORUnicodeString& GetAlias() const;
   const ZORMathTransformation& GetRootFromProduct() const { return rootFromProduct_; }
-  ProductFacts GetFacts() const;
+  ProductInfo GetInfo() const;
   /// Whether a name in an alias path means this product among its siblings.
   bool IsCalled(const ZORUnicodeString& inName) const;
 
@@ -142,7 +142,7 @@ class Product final : public FacetedComponent, private CountedObject<Product> {
 
   ModelDocument* document_;
   std::size_t index_;
-  Product* father_;
+  Product* parent_;
   std::vector<Product*> children_;
   ZORMathTransformation rootFromProduct_;
   ZORVisPropertiesValues properties_;

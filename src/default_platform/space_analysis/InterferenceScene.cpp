@@ -48,8 +48,8 @@ void Place(const std::optional<ResultPlacements>& inPlacements, InterferenceScen
   const bool isAlike = areBoth && AreAlike(first, MeanColourOf(ioScene.products[1]));
   const PartColour contrast = ContrastTo(first);
   for (std::size_t i = 0; i < ioScene.products.size(); ++i) {
-    ProductFacts facts;
-    if (!GetProductFacts(ioScene.products[i].GetInterface(), facts)) continue;
+    ProductInfo facts;
+    if (!GetProductInfo(ioScene.products[i].GetInterface(), facts)) continue;
     const PartColour* const imposed = i == 1 && isAlike ? &contrast : nullptr;
     ioScene.products[i] = StandAt(
         ioScene.products[i], inPlacements ? (*inPlacements)[i] : facts.rootFromProduct, imposed);

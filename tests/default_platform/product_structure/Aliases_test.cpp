@@ -1,12 +1,12 @@
-#include "default_platform/product_structure/Aliases.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "default_platform/product_structure/ModelDocument.h"
+
 using testing::ElementsAre;
 using ZORDefault::AliasesOf;
-using ZORDefault::CarriedByXml;
 using ZORDefault::ModelData;
+using ZORDefault::ReplaceInvalidXmlChars;
 
 namespace {
 /// A root with one child for each name; all children are instances of one part.
@@ -19,7 +19,7 @@ ModelData Siblings(const std::u16string& inPartName, const std::vector<std::u16s
   for (const std::u16string& name : inNames) {
     auto& product = model.products.emplace_back();
     product.name = name;
-    product.father = 0;
+    product.parent = 0;
     product.part = 1;
   }
   return model;
@@ -61,8 +61,8 @@ TEST(Aliases, NumbersPassOverASiblingsName) {
 
 TEST(Aliases, CousinsMayShareAName) {
   ModelData model = Siblings(u"bolt", {u"a", u"b", u"nut", u"nut"});
-  model.products[3].father = 1;
-  model.products[4].father = 2;
+  model.products[3].parent = 1;
+  model.products[4].parent = 2;
   EXPECT_THAT(AliasesOf(model, u"file"), ElementsAre(u"Root", u"a", u"b", u"nut", u"nut"));
 }
 
@@ -71,17 +71,17 @@ TEST(Aliases, NamesThatXmlMakesAlikeAreToldApart) {
               ElementsAre(u"Root", u"a\uFFFD.1", u"a\uFFFD.2"));
 }
 
-TEST(CarriedByXml, KeepsWhatXmlCarries) {
+TEST(ReplaceInvalidXmlChars, KeepsWhatXmlCarries) {
   const std::u16string text = u"\t\n\r <&>\"' \u00e9 \U0001F600 \uFFFD";
-  EXPECT_EQ(CarriedByXml(text), text);
+  EXPECT_EQ(ReplaceInvalidXmlChars(text), text);
 }
 
-TEST(CarriedByXml, ReplacesControlsAndNonCharacters) {
+TEST(ReplaceInvalidXmlChars, ReplacesControlsAndNonCharacters) {
   const std::u16string text = {u'a', 0, 0x1F, 0xFFFE, 0xFFFF, u'b'};
-  EXPECT_EQ(CarriedByXml(text), u"a\uFFFD\uFFFD\uFFFD\uFFFDb");
+  EXPECT_EQ(ReplaceInvalidXmlChars(text), u"a\uFFFD\uFFFD\uFFFD\uFFFDb");
 }
 
-TEST(CarriedByXml, ReplacesLoneSurrogates) {
+TEST(ReplaceInvalidXmlChars, ReplacesLoneSurrogates) {
   const std::u16string text = {0xD83D, u'a', 0xDE00, 0xD83D};
-  EXPECT_EQ(CarriedByXml(text), u"\uFFFDa\uFFFD\uFFFD");
+  EXPECT_EQ(ReplaceInvalidXmlChars(text), u"\uFFFDa\uFFFD\uFFFD");
 }

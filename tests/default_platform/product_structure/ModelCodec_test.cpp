@@ -1,7 +1,7 @@
-#include "default_platform/product_structure/ModelCodec.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+
+#include "default_platform/product_structure/ModelData.h"
 
 using testing::ElementsAre;
 using ZORDefault::DecodeModel;
@@ -31,13 +31,13 @@ ModelData TwoInstances() {
   model.parts[1].facesWithoutTriangles = 7;
   model.products.resize(3);
   for (const std::size_t i : {1u, 2u}) {
-    model.products[i].father = 0;
+    model.products[i].parent = 0;
     model.products[i].part = 1;
   }
   model.products[1].colour = PartColour{1, 2, 3, 4};
   model.products[2].name = u"second";
-  model.products[2].fatherFromProduct.SetVector({5, 6, 7});
-  model.otherFiles = {"other.bin"};
+  model.products[2].parentFromProduct.SetVector({5, 6, 7});
+  model.referencedFiles = {"other.bin"};
   model.warnings = {"a warning"};
   return model;
 }
@@ -58,12 +58,12 @@ TEST(ModelCodec, DecodeGivesAllThatWasEncoded) {
   EXPECT_EQ(model.parts[1].area, 0.5);
   EXPECT_EQ(model.parts[1].facesWithoutTriangles, 7u);
   ASSERT_EQ(model.products.size(), 3u);
-  EXPECT_EQ(model.products[0].father, -1);
+  EXPECT_EQ(model.products[0].parent, -1);
   EXPECT_EQ(model.products[1].colour, (PartColour{1, 2, 3, 4}));
   EXPECT_FALSE(model.products[2].colour.has_value());
   EXPECT_EQ(model.products[2].name, u"second");
-  EXPECT_EQ(model.products[2].fatherFromProduct.GetVector().y, 6);
-  EXPECT_THAT(model.otherFiles, ElementsAre("other.bin"));
+  EXPECT_EQ(model.products[2].parentFromProduct.GetVector().y, 6);
+  EXPECT_THAT(model.referencedFiles, ElementsAre("other.bin"));
   EXPECT_THAT(model.warnings, ElementsAre("a warning"));
 }
 
@@ -105,7 +105,7 @@ TEST(ModelCodec, DecodeRefusesATriangleWithoutPoints) {
 
 TEST(ModelCodec, DecodeRefusesAFatherThatComesLater) {
   ModelData damaged = TwoInstances();
-  damaged.products[1].father = 2;
+  damaged.products[1].parent = 2;
   ModelData model;
   EXPECT_FALSE(DecodeModel(EncodeModel(damaged), model));
 }

@@ -63,9 +63,9 @@ ZORDefault::OpenedModel OpenAnew(const std::string& inPath) {
   return ZORDefault::OpenModel(inPath, options);
 }
 
-ZORDefault::ProductFacts FactsOf(const ZORIProduct_var& inProduct) {
-  ZORDefault::ProductFacts facts;
-  if (!ZORDefault::GetProductFacts(inProduct.GetInterface(), facts))
+ZORDefault::ProductInfo FactsOf(const ZORIProduct_var& inProduct) {
+  ZORDefault::ProductInfo facts;
+  if (!ZORDefault::GetProductInfo(inProduct.GetInterface(), facts))
     throw std::logic_error("no product of a model");
   return facts;
 }

@@ -48,7 +48,7 @@ std::optional<std::string> FindModel(const std::string& inName);
 
 /// Opens without the cache.
 ZORDefault::OpenedModel OpenAnew(const std::string& inPath);
-ZORDefault::ProductFacts FactsOf(const ZORIProduct_var& inProduct);
+ZORDefault::ProductInfo FactsOf(const ZORIProduct_var& inProduct);
 std::vector<ZORIProduct_var> ChildrenOf(const ZORIProduct_var& inProduct);
 /// The product and all below it, a father before its children.
 std::vector<ZORIProduct_var> AllProducts(const ZORIProduct_var& inRoot);

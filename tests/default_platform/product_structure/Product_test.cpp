@@ -130,15 +130,15 @@ TEST_F(Product, FactsTellNamesAndPlacements) {
   EXPECT_STREQ(facts.partName.ConvertToChar(), "nut");
   EXPECT_FALSE(facts.isAssembly);
   EXPECT_NEAR(facts.rootFromProduct.GetVector().x, 175, 1e-6);
-  EXPECT_NEAR(facts.fatherFromProduct.GetVector().x, -10, 1e-6);
+  EXPECT_NEAR(facts.parentFromProduct.GetVector().x, -10, 1e-6);
   EXPECT_GT(facts.triangles, 100u);
   EXPECT_FALSE(facts.failedToTessellate);
 }
 
 TEST_F(Product, FactsOfAForeignProductAreRefused) {
-  ZORDefault::ProductFacts facts;
+  ZORDefault::ProductInfo facts;
   facts.triangles = 5;
-  EXPECT_FALSE(ZORDefault::GetProductFacts(nullptr, facts));
+  EXPECT_FALSE(ZORDefault::GetProductInfo(nullptr, facts));
   EXPECT_EQ(facts.triangles, 5u);
 }
 

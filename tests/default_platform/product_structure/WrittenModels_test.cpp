@@ -36,7 +36,7 @@ std::vector<std::string> LeafPaths(const OpenedModel& inModel) {
   return paths;
 }
 
-ZORMathVector MiddleOf(const ZORDefault::ProductFacts& inFacts) {
+ZORMathVector MiddleOf(const ZORDefault::ProductInfo& inFacts) {
   return inFacts.rootFromProduct * inFacts.mesh->origin;
 }
 

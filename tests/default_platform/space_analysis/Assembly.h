@@ -27,9 +27,9 @@ inline const ZORIProduct_var& Root() {
 inline ZORIProduct_var Product(const char* inPath) {
   return ZORDefault::FindProduct(Root(), inPath);
 }
-inline ZORDefault::ProductFacts Facts(const ZORIProduct_var& inProduct) {
-  ZORDefault::ProductFacts facts;
-  ZORDefault::GetProductFacts(inProduct.GetInterface(), facts);
+inline ZORDefault::ProductInfo Facts(const ZORIProduct_var& inProduct) {
+  ZORDefault::ProductInfo facts;
+  ZORDefault::GetProductInfo(inProduct.GetInterface(), facts);
   return facts;
 }
 

@@ -94,7 +94,7 @@ PictureStyle StyleOf(const PublishOptions& inOptions) {
   return style;
 }
 
-ProductPlaces PlacesOf(const PublishOptions& inOptions) {
+ProductPlaces WeldPoints(const PublishOptions& inOptions) {
   const bool areModels = ChosenWord("--positions", inOptions.positions, kPositions) == 1;
   return areModels ? ProductPlaces::kModel : ProductPlaces::kResult;
 }
@@ -179,7 +179,7 @@ PageRequest RequestOf(const PublishOptions& inOptions, const OtherStyleSheet& in
   request.styleSheet = inSheet.text;
   request.styleSheetName = inSheet.path.empty() ? "clash-page.xsl" : inSheet.path;
   request.model = Utf8(FromUtf8(fs::path(inOptions.model).filename().string()));
-  request.isAsInModel = !inOptions.model.empty() && PlacesOf(inOptions) == ProductPlaces::kModel;
+  request.isAsInModel = !inOptions.model.empty() && WeldPoints(inOptions) == ProductPlaces::kModel;
   for (const Entry& entry : inPublication.Entries()) request.interferences.push_back(entry.facts);
   return request;
 }
@@ -199,7 +199,7 @@ void WriteAll(const PublishOptions& inOptions, const OtherStyleSheet& inSheet,
 int Publish(const PublishOptions& inOptions, Output& ioOutput) {
   const ListFilter filter = ParseOnly(inOptions.only);
   const PictureStyle style = StyleOf(inOptions);
-  const ProductPlaces places = PlacesOf(inOptions);
+  const ProductPlaces places = WeldPoints(inOptions);
   ProcessCount(inOptions);
   ChooseLanguage(inOptions.language);
   ClashResultFile file(inOptions.file);

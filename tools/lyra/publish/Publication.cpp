@@ -109,8 +109,8 @@ std::string ImposedColour(const ZORIProduct_var& inProduct) {
 /// @param inOfModel the same one in the model.
 std::string ColourOf(const ZORIProduct_var& inShown, const ZORIProduct_var& inOfModel) {
   const std::string imposed = ImposedColour(inShown);
-  ZORDefault::ProductFacts facts;
-  if (!imposed.empty() || !ZORDefault::GetProductFacts(inOfModel.GetInterface(), facts))
+  ZORDefault::ProductInfo facts;
+  if (!imposed.empty() || !ZORDefault::GetProductInfo(inOfModel.GetInterface(), facts))
     return imposed;
   if (!facts.colour) return facts.triangles > 0 ? kPlainGrey : "";
   return ColourText((*facts.colour)[0], (*facts.colour)[1], (*facts.colour)[2]);

@@ -37,16 +37,17 @@ std::string Refused(ModelFormat inFormat) {
   return std::string("cannot be read as ") + NameOfFormat(inFormat);
 }
 
-void AddOtherFile(const TCollection_AsciiString& inFile, const std::string& inModelPath,
-                  std::vector<std::string>& outOtherFiles) {
+void AddReferencedFile(const TCollection_AsciiString& inFile, const std::string& inModelPath,
+                       std::vector<std::string>& outReferencedFiles) {
   const std::filesystem::path path(inFile.ToCString());
   const auto relative = path.lexically_relative(std::filesystem::path(inModelPath).parent_path());
-  outOtherFiles.push_back(path.is_absolute() && !relative.empty() ? relative.string()
-                                                                  : path.string());
+  outReferencedFiles.push_back(path.is_absolute() && !relative.empty() ? relative.string()
+                                                                       : path.string());
 }
 
 bool ReadStep(const ModelRequest& inRequest, Handle(TDocStd_Document) & ioDocument,
-              const Message_ProgressRange& inProgress, std::vector<std::string>& outOtherFiles) {
+              const Message_ProgressRange& inProgress,
+              std::vector<std::string>& outReferencedFiles) {
   Message_ProgressScope scope(inProgress, nullptr, kReadShare + kTransferShare);
   STEPCAFControl_Reader reader;
   reader.SetColorMode(true);
@@ -60,8 +61,9 @@ bool ReadStep(const ModelRequest& inRequest, Handle(TDocStd_Document) & ioDocume
   if (!reader.Transfer(ioDocument, scope.Next(kTransferShare))) return false;
   NCollection_DataMap<TCollection_AsciiString, Handle(STEPCAFControl_ExternFile)>::Iterator file(
       reader.ExternFiles());
-  for (; file.More(); file.Next()) AddOtherFile(file.Key(), inRequest.path, outOtherFiles);
-  std::ranges::sort(outOtherFiles);
+  for (; file.More(); file.Next())
+    AddReferencedFile(file.Key(), inRequest.path, outReferencedFiles);
+  std::ranges::sort(outReferencedFiles);
   return true;
 }
 
@@ -77,11 +79,13 @@ bool ReadIges(const ModelRequest& inRequest, Handle(TDocStd_Document) & ioDocume
 
 bool ReadMeshes(RWMesh_CafReader& ioReader, const ModelRequest& inRequest,
                 const Handle(TDocStd_Document) & inDocument,
-                const Message_ProgressRange& inProgress, std::vector<std::string>& outOtherFiles) {
+                const Message_ProgressRange& inProgress,
+                std::vector<std::string>& outReferencedFiles) {
   ioReader.SetDocument(inDocument);
   if (!ioReader.Perform(inRequest.path.c_str(), inProgress)) return false;
   NCollection_IndexedMap<TCollection_AsciiString>::Iterator file(ioReader.ExternalFiles());
-  for (; file.More(); file.Next()) AddOtherFile(file.Value(), inRequest.path, outOtherFiles);
+  for (; file.More(); file.Next())
+    AddReferencedFile(file.Value(), inRequest.path, outReferencedFiles);
   return true;
 }
 
@@ -103,18 +107,20 @@ class GltfReader : public RWGltf_CafReader {
 
 /// glTF is in metres with y upwards.
 bool ReadGltf(const ModelRequest& inRequest, const Handle(TDocStd_Document) & inDocument,
-              const Message_ProgressRange& inProgress, std::vector<std::string>& outOtherFiles) {
+              const Message_ProgressRange& inProgress,
+              std::vector<std::string>& outReferencedFiles) {
   GltfReader reader;
   reader.SetSystemLengthUnit(kMillimetre);
   reader.SetSystemCoordinateSystem(RWMesh_CoordinateSystem_Zup);
-  return ReadMeshes(reader, inRequest, inDocument, inProgress, outOtherFiles);
+  return ReadMeshes(reader, inRequest, inDocument, inProgress, outReferencedFiles);
 }
 
 /// OBJ says nothing of its unit and its upward axis: its numbers are taken as they stand.
 bool ReadObj(const ModelRequest& inRequest, const Handle(TDocStd_Document) & inDocument,
-             const Message_ProgressRange& inProgress, std::vector<std::string>& outOtherFiles) {
+             const Message_ProgressRange& inProgress,
+             std::vector<std::string>& outReferencedFiles) {
   RWObj_CafReader reader;
-  return ReadMeshes(reader, inRequest, inDocument, inProgress, outOtherFiles);
+  return ReadMeshes(reader, inRequest, inDocument, inProgress, outReferencedFiles);
 }
 
 bool ReadStl(const ModelRequest& inRequest, const Handle(TDocStd_Document) & inDocument,
@@ -128,17 +134,17 @@ bool ReadStl(const ModelRequest& inRequest, const Handle(TDocStd_Document) & inD
 }
 
 bool Read(const ModelRequest& inRequest, Handle(TDocStd_Document) & ioDocument,
-          const Message_ProgressRange& inProgress, std::vector<std::string>& outOtherFiles) {
+          const Message_ProgressRange& inProgress, std::vector<std::string>& outReferencedFiles) {
   switch (inRequest.format) {
     case ModelFormat::kStep:
-      return ReadStep(inRequest, ioDocument, inProgress, outOtherFiles);
+      return ReadStep(inRequest, ioDocument, inProgress, outReferencedFiles);
     case ModelFormat::kIges:
       return ReadIges(inRequest, ioDocument, inProgress);
     case ModelFormat::kGltf:
     case ModelFormat::kGlb:
-      return ReadGltf(inRequest, ioDocument, inProgress, outOtherFiles);
+      return ReadGltf(inRequest, ioDocument, inProgress, outReferencedFiles);
     case ModelFormat::kObj:
-      return ReadObj(inRequest, ioDocument, inProgress, outOtherFiles);
+      return ReadObj(inRequest, ioDocument, inProgress, outReferencedFiles);
     case ModelFormat::kStl:
       return ReadStl(inRequest, ioDocument, inProgress);
     case ModelFormat::kUnknown:
@@ -164,9 +170,9 @@ void PrepareReaders() {
 
 Handle(TDocStd_Document)
     ReadDocument(const ModelRequest& inRequest, const Message_ProgressRange& inProgress,
-                 std::vector<std::string>& outOtherFiles, std::string& outReason) {
+                 std::vector<std::string>& outReferencedFiles, std::string& outReason) {
   Handle(TDocStd_Document) document = NewDocument();
-  if (Read(inRequest, document, inProgress, outOtherFiles)) return document;
+  if (Read(inRequest, document, inProgress, outReferencedFiles)) return document;
   outReason = Refused(inRequest.format);
   return nullptr;
 }

@@ -7,18 +7,18 @@
 #include <string>
 #include <vector>
 
-#include "default_platform/product_structure/ModelReaderEntry.h"
+#include "default_platform/product_structure/ModelReader.h"
 
 namespace ZORDefault {
 
 /// Silences the kernel and sets what its readers take from process-wide parameters.
 void PrepareReaders();
 
-/// @param outOtherFiles the files that the model refers to, as it names them.
+/// @param outReferencedFiles the files that the model refers to, as it names them.
 /// @return null when the file cannot be read; outReason says why.
 Handle(TDocStd_Document)
     ReadDocument(const ModelRequest& inRequest, const Message_ProgressRange& inProgress,
-                 std::vector<std::string>& outOtherFiles, std::string& outReason);
+                 std::vector<std::string>& outReferencedFiles, std::string& outReason);
 
 }  // namespace ZORDefault
 

@@ -17,9 +17,8 @@
 #include <cmath>
 #include <exception>
 
-#include "default_platform/product_structure/model_reader/CreasedMesh.h"
-#include "default_platform/product_structure/model_reader/PartColours.h"
-#include "default_platform/product_structure/model_reader/SurfaceEdges.h"
+#include "default_platform/product_structure/model_reader/MeshBuilder.h"
+#include "default_platform/product_structure/model_reader/TreeWalk.h"
 
 namespace ZORDefault {
 namespace {
@@ -68,7 +67,7 @@ class FaceMesh {
     AddNormals(first, ioBuilder);
   }
 
-  void AddTo(BareMesh& ioMesh) const {
+  void AddTo(TriangleSoup& ioMesh) const {
     const auto first = static_cast<std::uint32_t>(ioMesh.points.size());
     for (int i = 1; i <= triangles_->NbNodes(); ++i) {
       ioMesh.points.push_back(PointAt(i));
@@ -191,7 +190,7 @@ void FillMesh(const TDF_Label& inLabel, const TopoDS_Shape& inShape, ModelPart& 
   TopExp::MapShapes(inShape, TopAbs_FACE, faces);
   FaceColours colours = FaceColoursOf(inLabel, faces);
   MeshBuilder builder;
-  BareMesh bareMesh;
+  TriangleSoup soup;
   std::vector<std::uint32_t> firstPoints;
   for (int i = 1; i <= faces.Extent(); ++i) {
     const auto position = static_cast<std::size_t>(i) - 1;
@@ -204,11 +203,11 @@ void FillMesh(const TDF_Label& inLabel, const TopoDS_Shape& inShape, ModelPart& 
       firstPoints.back() = static_cast<std::uint32_t>(builder.points.size());
       face.AddTo(builder);
     } else {
-      face.AddTo(bareMesh);
+      face.AddTo(soup);
     }
   }
   AddSurfaceEdges(inShape, faces, firstPoints, builder);
-  AddCreasedMesh(bareMesh, builder);
+  AddCreasedMesh(soup, builder);
   ioPart.area = AreaOf(builder);
   ioPart.failedToTessellate = !faces.IsEmpty() && builder.triangles.empty();
   if (!builder.triangles.empty() || !builder.edges.empty())

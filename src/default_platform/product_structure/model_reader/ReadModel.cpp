@@ -7,11 +7,10 @@
 #include <filesystem>
 #include <vector>
 
-#include "default_platform/product_structure/ModelReaderEntry.h"
+#include "default_platform/product_structure/ModelReader.h"
 #include "default_platform/product_structure/model_reader/DocumentReading.h"
-#include "default_platform/product_structure/model_reader/GltfScales.h"
-#include "default_platform/product_structure/model_reader/NamedFiles.h"
 #include "default_platform/product_structure/model_reader/PartMeshing.h"
+#include "default_platform/product_structure/model_reader/ReferencedFiles.h"
 #include "default_platform/product_structure/model_reader/TreeWalk.h"
 
 namespace ZORDefault {
@@ -78,9 +77,9 @@ std::string OneLine(const char* inMessage) {
 }
 
 /// "" when all are there.
-std::string TellMissingFiles(const ModelRequest& inRequest, const ModelData& inModel) {
+std::string DescribeMissingFiles(const ModelRequest& inRequest, const ModelData& inModel) {
   const auto folder = std::filesystem::path(inRequest.path).parent_path();
-  std::vector<std::string> missing = inModel.otherFiles;
+  std::vector<std::string> missing = inModel.referencedFiles;
   std::erase_if(missing, [&](const std::string& file) {
     std::error_code error;
     return std::filesystem::exists(folder / file, error);
@@ -105,7 +104,7 @@ bool HasGeometry(const ModelData& inModel) {
 }
 
 bool Read(const ModelRequest& inRequest, ModelData& outModel, std::string& outReason) {
-  if (const std::string file = FindEndlessFile(inRequest); !file.empty()) {
+  if (const std::string file = FindNonRegularFile(inRequest); !file.empty()) {
     outReason = OneLine(("names " + file + ", which is no file").c_str());
     return false;
   }
@@ -113,14 +112,14 @@ bool Read(const ModelRequest& inRequest, ModelData& outModel, std::string& outRe
   Handle(Progress) progress = new Progress(inRequest.progress);
   Message_ProgressScope scope(progress->Start(), nullptr, kReadingShare + kMeshingShare);
   const Handle(TDocStd_Document) document =
-      ReadDocument(inRequest, scope.Next(kReadingShare), outModel.otherFiles, outReason);
+      ReadDocument(inRequest, scope.Next(kReadingShare), outModel.referencedFiles, outReason);
   if (document.IsNull()) return false;
   const std::vector<TDF_Label> labels = WalkTree(document, outModel);
   MeshParts(labels, inRequest.deflection, scope.Next(kMeshingShare), outModel);
   ForgetFileName(inRequest, outModel);
   WarnOfMissingTriangles(outModel);
   WarnOfScaledNodes(inRequest, outModel);
-  const std::string missingFiles = OneLine(TellMissingFiles(inRequest, outModel).c_str());
+  const std::string missingFiles = OneLine(DescribeMissingFiles(inRequest, outModel).c_str());
   if (!HasGeometry(outModel)) {
     outReason = missingFiles.empty() ? "holds no geometry" : "holds no geometry; " + missingFiles;
     return false;

@@ -1,21 +1,44 @@
 #include "default_platform/product_structure/model_reader/TreeWalk.h"
 
 #include <NCollection_DataMap.hxx>
+#include <Quantity_ColorRGBA.hxx>
 #include <TDF_LabelMapHasher.hxx>
 #include <TDF_LabelSequence.hxx>
 #include <TDF_Tool.hxx>
 #include <TDataStd_Name.hxx>
+#include <TopExp_Explorer.hxx>
 #include <TopLoc_Location.hxx>
+#include <XCAFDoc_ColorTool.hxx>
 #include <XCAFDoc_DocumentTool.hxx>
 #include <XCAFDoc_ShapeTool.hxx>
+#include <XCAFDoc_VisMaterial.hxx>
+#include <XCAFDoc_VisMaterialTool.hxx>
+#include <algorithm>
 #include <cmath>
-
-#include "default_platform/product_structure/model_reader/PartColours.h"
 
 namespace ZORDefault {
 namespace {
 
-constexpr double kSmallestDeterminant = 1e-9;
+std::uint8_t ToByte(double inShare) {
+  return static_cast<std::uint8_t>(std::lround(std::clamp(inShare, 0.0, 1.0) * 255));
+}
+
+/// The kernel keeps colours linear; pictures are made in the usual non-linear values.
+PartColour ToPartColour(const Quantity_ColorRGBA& inColour) {
+  double red = 0, green = 0, blue = 0;
+  inColour.GetRGB().Values(red, green, blue, Quantity_TOC_sRGB);
+  return {ToByte(red), ToByte(green), ToByte(blue), ToByte(inColour.Alpha())};
+}
+
+std::uint16_t PositionOf(const PartColour& inColour, std::vector<PartColour>& ioColours) {
+  const auto found = std::ranges::find(ioColours, inColour);
+  if (found != ioColours.end()) return static_cast<std::uint16_t>(found - ioColours.begin());
+  if (ioColours.size() >= PartMesh::kNoColour) return PartMesh::kNoColour;
+  ioColours.push_back(inColour);
+  return static_cast<std::uint16_t>(ioColours.size() - 1);
+}
+
+constexpr double kMinDeterminant = 1e-9;
 
 std::u16string NameOf(const TDF_Label& inLabel) {
   Handle(TDataStd_Name) name;
@@ -44,14 +67,14 @@ bool IsSound(const ZORMathTransformation& inPlacement) {
   const double determinant = inPlacement.GetMatrix().Determinant();
   const ZORMathVector& vector = inPlacement.GetVector();
   return std::isfinite(determinant) && std::isfinite(vector.x + vector.y + vector.z) &&
-         std::abs(determinant) > kSmallestDeterminant;
+         std::abs(determinant) > kMinDeterminant;
 }
 
 class Walk {
  public:
   explicit Walk(ModelData& outModel) : model_(outModel) {}
 
-  void AddRoot(const TDF_Label& inLabel) { Add(inLabel, inLabel, ModelProduct::kNoFather, {}); }
+  void AddRoot(const TDF_Label& inLabel) { Add(inLabel, inLabel, ModelProduct::kNoParent, {}); }
 
   void AddRoots(const TDF_LabelSequence& inLabels) {
     labels_.push_back(TDF_Label());
@@ -64,12 +87,12 @@ class Walk {
 
  private:
   /// @param inInstance the label of the instance; for a root that of the part itself.
-  void Add(const TDF_Label& inInstance, const TDF_Label& inPart, std::int32_t inFather,
+  void Add(const TDF_Label& inInstance, const TDF_Label& inPart, std::int32_t inParent,
            const ZORMathTransformation& inPlacement) {
     ModelProduct product;
-    product.father = inFather;
+    product.parent = inParent;
     product.part = PartOf(inPart);
-    product.fatherFromProduct = inPlacement;
+    product.parentFromProduct = inPlacement;
     if (inInstance != inPart) {
       product.name = NameOf(inInstance);
       product.colour = ColourOf(inInstance);
@@ -79,13 +102,13 @@ class Walk {
     AddComponents(inPart, self);
   }
 
-  void AddComponents(const TDF_Label& inPart, std::int32_t inFather) {
+  void AddComponents(const TDF_Label& inPart, std::int32_t inParent) {
     TDF_LabelSequence components;
     if (!XCAFDoc_ShapeTool::GetComponents(inPart, components, false)) return;
     for (const TDF_Label& component : components) {
       TDF_Label part;
       if (!XCAFDoc_ShapeTool::GetReferredShape(component, part)) continue;
-      Add(component, part, inFather, PlacementOf(component));
+      Add(component, part, inParent, PlacementOf(component));
     }
   }
 
@@ -117,6 +140,44 @@ class Walk {
 };
 
 }  // namespace
+
+std::optional<PartColour> ColourOf(const TDF_Label& inLabel) {
+  const auto tool = XCAFDoc_DocumentTool::ColorTool(inLabel);
+  Quantity_ColorRGBA colour;
+  for (const XCAFDoc_ColorType type : {XCAFDoc_ColorSurf, XCAFDoc_ColorGen})
+    if (tool->GetColor(inLabel, type, colour)) return ToPartColour(colour);
+  const Handle(XCAFDoc_VisMaterial) material =
+      XCAFDoc_DocumentTool::VisMaterialTool(inLabel)->GetShapeMaterial(inLabel);
+  if (material.IsNull() || material->IsEmpty()) return std::nullopt;
+  return ToPartColour(material->BaseColor());
+}
+
+FaceColours FaceColoursOf(const TDF_Label& inPart, const TopTools_IndexedMapOfShape& inFaces) {
+  FaceColours result;
+  TDF_LabelSequence labels;
+  if (!XCAFDoc_ShapeTool::GetSubShapes(inPart, labels)) return result;
+  result.ofFace.assign(static_cast<std::size_t>(inFaces.Extent()), PartMesh::kNoColour);
+  struct Coloured {
+    TopoDS_Shape shape;
+    PartColour colour;
+  };
+  std::vector<Coloured> coloured;
+  for (const TDF_Label& label : labels)
+    if (const auto colour = ColourOf(label))
+      coloured.push_back({XCAFDoc_ShapeTool::GetShape(label), *colour});
+  // Larger kinds of shape come first in their enumeration: a face's own colour wins in the end.
+  std::ranges::stable_sort(coloured, {}, [](const Coloured& c) { return c.shape.ShapeType(); });
+  for (const Coloured& one : coloured) {
+    for (TopExp_Explorer face(one.shape, TopAbs_FACE); face.More(); face.Next()) {
+      const int position = inFaces.FindIndex(face.Current());
+      if (position > 0)
+        result.ofFace[static_cast<std::size_t>(position) - 1] =
+            PositionOf(one.colour, result.colours);
+    }
+  }
+  if (result.colours.empty()) result.ofFace.clear();
+  return result;
+}
 
 std::vector<TDF_Label> WalkTree(const Handle(TDocStd_Document) & inDocument, ModelData& outModel) {
   TDF_LabelSequence roots;

@@ -1,6 +1,6 @@
-// The one function of the reader library.
-#ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELREADERENTRY_H
-#define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELREADERENTRY_H
+// The plugin that reads models, loaded when the first one must be read.
+#ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELREADER_H
+#define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELREADER_H
 
 #include <functional>
 #include <string>
@@ -24,6 +24,11 @@ typedef bool ReadModelFunction(const ModelRequest& inRequest, ModelData& outMode
                                std::string& outReason);
 
 inline constexpr char kReadModelName[] = "ZORReadModel";
+
+/// Reads a model with the reader library. One model is read at a time.
+/// @param outReason why it could not be read, one line.
+bool ReadModelWithLibrary(const ModelRequest& inRequest, ModelData& outModel,
+                          std::string& outReason);
 
 }  // namespace ZORDefault
 

@@ -1,4 +1,4 @@
-#include "default_platform/product_structure/ReaderLibrary.h"
+#include "default_platform/product_structure/ModelReader.h"
 
 #include <mutex>
 

@@ -1,18 +1,30 @@
-#include "default_platform/product_structure/model_reader/NamedFiles.h"
+#include "default_platform/product_structure/model_reader/ReferencedFiles.h"
 
+#include <cmath>
+#include <cstdint>
+#include <cstring>
 #include <filesystem>
 #include <fstream>
+#include <iterator>
 #include <nlohmann/json.hpp>
 #include <set>
 #include <string_view>
 #include <vector>
 
-#include "default_platform/product_structure/model_reader/GltfScene.h"
-
 namespace ZORDefault {
 namespace {
 
 namespace fs = std::filesystem;
+
+std::string ReadGltfScene(const std::string& inPath) {
+  constexpr std::size_t kLengthAt = 12, kTextAt = 20;
+  std::ifstream file(inPath, std::ios::binary);
+  std::string bytes((std::istreambuf_iterator<char>(file)), {});
+  if (!bytes.starts_with("glTF") || bytes.size() < kTextAt) return bytes;
+  std::uint32_t length = 0;
+  std::memcpy(&length, bytes.data() + kLengthAt, sizeof length);
+  return bytes.substr(kTextAt, length);
+}
 
 std::string ReadBytes(const std::string& inPath) {
   std::error_code error;
@@ -75,13 +87,39 @@ std::vector<std::string> NamesIn(const std::string& inPath, ModelFormat inFormat
   return names;
 }
 
-bool IsEndless(const fs::file_status& inStatus) {
+bool IsNonRegular(const fs::file_status& inStatus) {
   return fs::exists(inStatus) && !fs::is_regular_file(inStatus) && !fs::is_directory(inStatus);
+}
+
+constexpr double kTolerance = 1e-5;
+
+bool IsOne(double inScale) { return std::abs(inScale - 1) < kTolerance; }
+
+/// Whether a matrix, held by columns, turns and moves only.
+bool IsRigid(const std::vector<double>& inMatrix) {
+  const auto at = [&](std::size_t row, std::size_t column) { return inMatrix[4 * column + row]; };
+  for (std::size_t column = 0; column < 3; ++column)
+    if (!IsOne(std::hypot(at(0, column), at(1, column), at(2, column)))) return false;
+  const double determinant = at(0, 0) * (at(1, 1) * at(2, 2) - at(1, 2) * at(2, 1)) -
+                             at(0, 1) * (at(1, 0) * at(2, 2) - at(1, 2) * at(2, 0)) +
+                             at(0, 2) * (at(1, 0) * at(2, 1) - at(1, 1) * at(2, 0));
+  return std::abs(determinant - 1) < 10 * kTolerance;
+}
+
+bool IsScaled(const nlohmann::json& inNode) {
+  if (const auto scale = inNode.find("scale"); scale != inNode.end())
+    for (const double factor : scale->get<std::vector<double>>())
+      if (!IsOne(factor)) return true;
+  if (const auto matrix = inNode.find("matrix"); matrix != inNode.end()) {
+    const auto values = matrix->get<std::vector<double>>();
+    return values.size() == 16 && !IsRigid(values);
+  }
+  return false;
 }
 
 }  // namespace
 
-std::string FindEndlessFile(const ModelRequest& inRequest) {
+std::string FindNonRegularFile(const ModelRequest& inRequest) {
   std::vector<std::string> waiting = {inRequest.path};
   std::set<std::string> seen(waiting.begin(), waiting.end());
   while (!waiting.empty()) {
@@ -91,13 +129,25 @@ std::string FindEndlessFile(const ModelRequest& inRequest) {
       std::error_code error;
       const std::string other = (fs::path(path).parent_path() / name).string();
       const fs::file_status status = fs::status(other, error);
-      if (IsEndless(status)) return name;
+      if (IsNonRegular(status)) return name;
       if (inRequest.format == ModelFormat::kStep && fs::is_regular_file(status) &&
           seen.insert(other).second)
         waiting.push_back(other);
     }
   }
   return "";
+}
+
+std::size_t CountScaledNodes(const std::string& inPath) {
+  std::size_t count = 0;
+  try {
+    const auto scene = nlohmann::json::parse(ReadGltfScene(inPath));
+    for (const auto& node : scene.value("nodes", nlohmann::json::array()))
+      count += IsScaled(node) ? 1 : 0;
+  } catch (const nlohmann::json::exception&) {
+    return count;  // the kernel could read the file: at least what was counted is certain
+  }
+  return count;
 }
 
 }  // namespace ZORDefault

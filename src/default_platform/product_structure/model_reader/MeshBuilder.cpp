@@ -1,5 +1,14 @@
-#include "default_platform/product_structure/model_reader/CreasedMesh.h"
+#include "default_platform/product_structure/model_reader/MeshBuilder.h"
 
+#include <BRep_Tool.hxx>
+#include <Poly_Polygon3D.hxx>
+#include <Poly_PolygonOnTriangulation.hxx>
+#include <TopExp.hxx>
+#include <TopTools_IndexedDataMapOfShapeListOfShape.hxx>
+#include <TopTools_ListOfShape.hxx>
+#include <TopoDS.hxx>
+#include <TopoDS_Edge.hxx>
+#include <TopoDS_Face.hxx>
 #include <algorithm>
 #include <cmath>
 #include <numeric>
@@ -10,7 +19,7 @@ namespace {
 constexpr double kCreaseCosine = 0.8660254037844386;  // 30 degrees
 
 /// For each point the number of its place, equal for points in the same place.
-std::vector<std::uint32_t> PlacesOf(const std::vector<gp_XYZ>& inPoints) {
+std::vector<std::uint32_t> WeldPoints(const std::vector<gp_XYZ>& inPoints) {
   const auto key = [&](std::uint32_t point) {
     const gp_XYZ& at = inPoints[point];
     return std::array<double, 3>{at.X(), at.Y(), at.Z()};
@@ -33,7 +42,7 @@ struct Corner {
   double angle;
 };
 
-double AngleAt(const BareMesh& inMesh, const Triangle& inTriangle, std::size_t inCorner) {
+double AngleAt(const TriangleSoup& inMesh, const Triangle& inTriangle, std::size_t inCorner) {
   const gp_XYZ& at = inMesh.points[inTriangle[inCorner]];
   const gp_XYZ one = UnitOf(inMesh.points[inTriangle[(inCorner + 1) % 3]] - at);
   const gp_XYZ two = UnitOf(inMesh.points[inTriangle[(inCorner + 2) % 3]] - at);
@@ -41,7 +50,8 @@ double AngleAt(const BareMesh& inMesh, const Triangle& inTriangle, std::size_t i
 }
 
 /// All corners, those of one place together.
-std::vector<Corner> CornersOf(const BareMesh& inMesh, const std::vector<std::uint32_t>& inPlaces) {
+std::vector<Corner> CornersOf(const TriangleSoup& inMesh,
+                              const std::vector<std::uint32_t>& inPlaces) {
   std::vector<Corner> corners;
   for (std::uint32_t t = 0; t < inMesh.triangles.size(); ++t)
     for (std::size_t c = 0; c < 3; ++c)
@@ -53,8 +63,8 @@ std::vector<Corner> CornersOf(const BareMesh& inMesh, const std::vector<std::uin
 
 class Creaser {
  public:
-  Creaser(const BareMesh& inMesh, MeshBuilder& ioBuilder)
-      : mesh_(inMesh), builder_(ioBuilder), places_(PlacesOf(inMesh.points)) {
+  Creaser(const TriangleSoup& inMesh, MeshBuilder& ioBuilder)
+      : mesh_(inMesh), builder_(ioBuilder), places_(WeldPoints(inMesh.points)) {
     for (const Triangle& triangle : mesh_.triangles)
       faceNormals_.push_back(UnitOf(AreaNormal(mesh_.points[triangle[0]], mesh_.points[triangle[1]],
                                                mesh_.points[triangle[2]])));
@@ -135,7 +145,7 @@ class Creaser {
     return made.back();
   }
 
-  const BareMesh& mesh_;
+  const TriangleSoup& mesh_;
   MeshBuilder& builder_;
   std::vector<std::uint32_t> places_;
   std::vector<gp_XYZ> faceNormals_;
@@ -144,12 +154,93 @@ class Creaser {
   std::vector<std::vector<std::uint32_t>> made_;  // new points, by old point
 };
 
+constexpr double kTangentCosine = 0.9990482;  // 2.5 degrees
+
+typedef std::vector<std::uint32_t> Nodes;  // positions in the builder, along the edge
+
+class EdgeDrawer {
+ public:
+  EdgeDrawer(const TopTools_IndexedMapOfShape& inFaces,
+             const std::vector<std::uint32_t>& inFirstPoints, MeshBuilder& ioBuilder)
+      : faces_(inFaces), firstPoints_(inFirstPoints), builder_(ioBuilder) {}
+
+  void Draw(const TopoDS_Edge& inEdge, const TopTools_ListOfShape& inAncestors) {
+    if (BRep_Tool::Degenerated(inEdge)) return;
+    std::vector<Nodes> lines;
+    TopTools_IndexedMapOfShape seen;
+    for (const TopoDS_Shape& face : inAncestors) {
+      if (seen.Contains(face)) continue;
+      seen.Add(face);
+      if (BRep_Tool::IsClosed(inEdge, TopoDS::Face(face))) return;
+      Nodes nodes = NodesOn(inEdge, TopoDS::Face(face));
+      if (!nodes.empty()) lines.push_back(std::move(nodes));
+    }
+    if (lines.empty() || (lines.size() == 2 && AreTangent(lines[0], lines[1]))) return;
+    Polyline line;
+    for (const std::uint32_t node : lines[0]) line.push_back(builder_.points[node]);
+    builder_.edges.push_back(std::move(line));
+  }
+
+ private:
+  Nodes NodesOn(const TopoDS_Edge& inEdge, const TopoDS_Face& inFace) const {
+    const int position = faces_.FindIndex(inFace);
+    if (position < 1) return {};
+    const std::uint32_t first = firstPoints_[static_cast<std::size_t>(position) - 1];
+    if (first == kNoPoints) return {};
+    TopLoc_Location location;
+    const Handle(Poly_Triangulation) triangles = BRep_Tool::Triangulation(inFace, location);
+    const Handle(Poly_PolygonOnTriangulation) polygon =
+        BRep_Tool::PolygonOnTriangulation(inEdge, triangles, location);
+    if (polygon.IsNull()) return {};
+    Nodes nodes;
+    for (int i = 1; i <= polygon->NbNodes(); ++i)
+      nodes.push_back(first + static_cast<std::uint32_t>(polygon->Node(i)) - 1);
+    return nodes;
+  }
+
+  /// Both faces have the edge's points in the same order.
+  bool AreTangent(const Nodes& inOne, const Nodes& inTwo) const {
+    return inOne.size() == inTwo.size() &&
+           std::ranges::equal(inOne, inTwo, [&](std::uint32_t a, std::uint32_t b) {
+             return builder_.normals[a].Dot(builder_.normals[b]) >= kTangentCosine;
+           });
+  }
+
+  const TopTools_IndexedMapOfShape& faces_;
+  const std::vector<std::uint32_t>& firstPoints_;
+  MeshBuilder& builder_;
+};
+
+void AddFreeCurve(const TopoDS_Edge& inEdge, MeshBuilder& ioBuilder) {
+  TopLoc_Location location;
+  const Handle(Poly_Polygon3D) polygon = BRep_Tool::Polygon3D(inEdge, location);
+  if (polygon.IsNull()) return;
+  Polyline line;
+  for (gp_Pnt point : polygon->Nodes())
+    line.push_back(point.Transformed(location.Transformation()).XYZ());
+  ioBuilder.edges.push_back(std::move(line));
+}
+
 }  // namespace
 
-void AddCreasedMesh(const BareMesh& inMesh, MeshBuilder& ioBuilder) {
+void AddCreasedMesh(const TriangleSoup& inMesh, MeshBuilder& ioBuilder) {
   Creaser creaser(inMesh, ioBuilder);
   creaser.AddTriangles();
   creaser.AddEdges();
+}
+
+void AddSurfaceEdges(const TopoDS_Shape& inShape, const TopTools_IndexedMapOfShape& inFaces,
+                     const std::vector<std::uint32_t>& inFirstPoints, MeshBuilder& ioBuilder) {
+  TopTools_IndexedDataMapOfShapeListOfShape edges;
+  TopExp::MapShapesAndAncestors(inShape, TopAbs_EDGE, TopAbs_FACE, edges);
+  EdgeDrawer drawer(inFaces, inFirstPoints, ioBuilder);
+  for (int i = 1; i <= edges.Extent(); ++i) {
+    const TopoDS_Edge& edge = TopoDS::Edge(edges.FindKey(i));
+    if (inFaces.IsEmpty())
+      AddFreeCurve(edge, ioBuilder);
+    else
+      drawer.Draw(edge, edges.FindFromIndex(i));
+  }
 }
 
 }  // namespace ZORDefault

@@ -1,4 +1,4 @@
-#include "default_platform/product_structure/ModelCodec.h"
+#include "default_platform/product_structure/ModelData.h"
 
 #include <algorithm>
 #include <cstring>
@@ -136,10 +136,10 @@ ModelPart GetPart(Reader& ioReader) {
 
 void PutProduct(Writer& ioWriter, const ModelProduct& inProduct) {
   ioWriter.PutAll(inProduct.name);
-  ioWriter.Put(inProduct.father);
+  ioWriter.Put(inProduct.parent);
   ioWriter.Put(inProduct.part);
   std::array<double, 12> placement;
-  inProduct.fatherFromProduct.GetCoefficients(placement.data());
+  inProduct.parentFromProduct.GetCoefficients(placement.data());
   ioWriter.Put(placement);
   PutColour(ioWriter, inProduct.colour);
 }
@@ -147,11 +147,11 @@ void PutProduct(Writer& ioWriter, const ModelProduct& inProduct) {
 ModelProduct GetProduct(Reader& ioReader) {
   ModelProduct product;
   ioReader.GetAll(product.name);
-  product.father = ioReader.Get<std::int32_t>();
+  product.parent = ioReader.Get<std::int32_t>();
   product.part = ioReader.Get<std::uint32_t>();
   const auto c = ioReader.Get<std::array<double, 12>>();
-  product.fatherFromProduct.SetMatrix({{c[0], c[1], c[2]}, {c[3], c[4], c[5]}, {c[6], c[7], c[8]}});
-  product.fatherFromProduct.SetVector({c[9], c[10], c[11]});
+  product.parentFromProduct.SetMatrix({{c[0], c[1], c[2]}, {c[3], c[4], c[5]}, {c[6], c[7], c[8]}});
+  product.parentFromProduct.SetVector({c[9], c[10], c[11]});
   product.colour = GetColour(ioReader);
   return product;
 }
@@ -178,9 +178,9 @@ bool IsSound(const ModelData& inModel) {
     if (part.mesh && !IsSound(*part.mesh)) return false;
   for (std::size_t i = 0; i < inModel.products.size(); ++i) {
     const ModelProduct& product = inModel.products[i];
-    const bool isRoot = product.father == ModelProduct::kNoFather;
+    const bool isRoot = product.parent == ModelProduct::kNoParent;
     if (isRoot != (i == 0) ||
-        (!isRoot && (product.father < 0 || static_cast<std::size_t>(product.father) >= i)))
+        (!isRoot && (product.parent < 0 || static_cast<std::size_t>(product.parent) >= i)))
       return false;
     if (product.part >= inModel.parts.size()) return false;
   }
@@ -191,8 +191,8 @@ bool IsSound(const ModelData& inModel) {
 
 std::string EncodeModel(const ModelData& inModel) {
   Writer writer;
-  writer.Put<std::uint64_t>(inModel.otherFiles.size());
-  for (const std::string& file : inModel.otherFiles) writer.PutAll(file);
+  writer.Put<std::uint64_t>(inModel.referencedFiles.size());
+  for (const std::string& file : inModel.referencedFiles) writer.PutAll(file);
   writer.Put<std::uint64_t>(inModel.warnings.size());
   for (const std::string& warning : inModel.warnings) writer.PutAll(warning);
   writer.Put<std::uint64_t>(inModel.parts.size());
@@ -205,8 +205,8 @@ std::string EncodeModel(const ModelData& inModel) {
 bool DecodeModel(std::string_view inBytes, ModelData& outModel) {
   Reader reader(inBytes);
   ModelData model;
-  model.otherFiles.resize(reader.GetCount());
-  for (std::string& file : model.otherFiles) reader.GetAll(file);
+  model.referencedFiles.resize(reader.GetCount());
+  for (std::string& file : model.referencedFiles) reader.GetAll(file);
   model.warnings.resize(reader.GetCount());
   for (std::string& warning : model.warnings) reader.GetAll(warning);
   const std::size_t parts = reader.GetCount();
