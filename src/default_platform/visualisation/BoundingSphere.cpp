@@ -5,30 +5,27 @@
 #include <limits>
 #include <mutex>
 
+#include "foundation/Vector3.h"
+
 namespace ZORDefault {
 namespace {
 
+using ZORFoundation::Length;
+using ZORFoundation::Lerp;
+using ZORFoundation::operator-;
+
 bool IsFinite(const ZOR3DBoundingSphere& inSphere) {
-  return std::isfinite(inSphere.centre.x) && std::isfinite(inSphere.centre.y) &&
-         std::isfinite(inSphere.centre.z) && std::isfinite(inSphere.radius);
+  return ZORFoundation::IsFinite(inSphere.centre) && std::isfinite(inSphere.radius);
 }
 
-double Distance(const ZORMathVector& inA, const ZORMathVector& inB) {
-  return std::hypot(inA.x - inB.x, inA.y - inB.y, inA.z - inB.z);
-}
-
-/// Linear interpolation; beyond 1 it extrapolates.
-ZORMathVector Lerp(const ZORMathVector& inFrom, const ZORMathVector& inTo, double inShare) {
-  return {inFrom.x + inShare * (inTo.x - inFrom.x), inFrom.y + inShare * (inTo.y - inFrom.y),
-          inFrom.z + inShare * (inTo.z - inFrom.z)};
-}
+double Distance(const ZORMathVector& inA, const ZORMathVector& inB) { return Length(inA - inB); }
 
 /// The largest factor by which a rotation with a scale of each axis stretches lengths.
 double MaxScale(const ZORMathTransformation& inTransformation) {
   double largest = 0;
   for (int i = 0; i < 3; ++i) {
     const ZORMathVector& column = inTransformation.GetMatrix().GetColumn(i);
-    largest = std::max(largest, std::hypot(column.x, column.y, column.z));
+    largest = std::max(largest, Length(column));
   }
   return largest;
 }

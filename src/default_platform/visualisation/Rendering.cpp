@@ -9,6 +9,7 @@
 #include <utility>
 
 #include "default_platform/NeighbourLibrary.h"
+#include "foundation/Vector3.h"
 
 namespace ZORDefault {
 namespace {
@@ -16,21 +17,15 @@ namespace {
 constexpr double kPi = 3.14159265358979323846;
 constexpr double kMaxViewAngle = 170 * kPi / 180;
 
-bool IsFinite(const ZORMathVector& inVector) {
-  return std::isfinite(inVector.x) && std::isfinite(inVector.y) && std::isfinite(inVector.z);
-}
-
-ZORMathVector Cross(const ZORMathVector& inA, const ZORMathVector& inB) {
-  return {inA.y * inB.z - inA.z * inB.y, inA.z * inB.x - inA.x * inB.z,
-          inA.x * inB.y - inA.y * inB.x};
-}
+using ZORFoundation::Cross;
+using ZORFoundation::IsFinite;
 
 ZORMathVector RightOf(const ZORMathVector& inForward, const ZORMathVector& inUp) {
   constexpr double kParallel = 1e-6;
   for (const ZORMathVector& up :
        {NormalizeOr(inUp, {0, 0, 0}), ZORMathVector(0, 0, 1), ZORMathVector(0, 1, 0)}) {
     const ZORMathVector right = Cross(inForward, up);
-    if (std::hypot(right.x, right.y, right.z) > kParallel) return NormalizeOr(right, {1, 0, 0});
+    if (ZORFoundation::Length(right) > kParallel) return NormalizeOr(right, {1, 0, 0});
   }
   return {1, 0, 0};
 }
@@ -66,7 +61,7 @@ ZORMathVector NormalizeOr(const ZORMathVector& inVector, const ZORMathVector& in
       std::max({std::fabs(inVector.x), std::fabs(inVector.y), std::fabs(inVector.z)});
   if (largest == 0) return inOtherwise;
   const ZORMathVector scaled(inVector.x / largest, inVector.y / largest, inVector.z / largest);
-  const double length = std::hypot(scaled.x, scaled.y, scaled.z);
+  const double length = ZORFoundation::Length(scaled);
   return {scaled.x / length, scaled.y / length, scaled.z / length};
 }
 

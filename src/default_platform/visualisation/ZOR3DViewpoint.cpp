@@ -5,6 +5,7 @@
 
 #include "default_platform/system/ObjectCounters.h"
 #include "default_platform/visualisation/Rendering.h"
+#include "foundation/Vector3.h"
 
 using ZORDefault::PositiveOr;
 
@@ -18,12 +19,10 @@ ZORDefault::ObjectCounter& Counter() {
   return counter;
 }
 
-/// The sphere with all that cannot be framed put right.
+/// The sphere with non-finite values replaced.
 ZOR3DBoundingSphere Framed(const ZOR3DBoundingSphere& inSphere) {
-  const ZORMathVector& centre = inSphere.centre;
-  const bool isSomewhere =
-      std::isfinite(centre.x) && std::isfinite(centre.y) && std::isfinite(centre.z);
-  return {isSomewhere ? centre : ZORMathVector(), PositiveOr(inSphere.radius, 1)};
+  return {ZORFoundation::IsFinite(inSphere.centre) ? inSphere.centre : ZORMathVector(),
+          PositiveOr(inSphere.radius, 1)};
 }
 
 }  // namespace

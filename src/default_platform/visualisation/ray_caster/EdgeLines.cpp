@@ -159,8 +159,8 @@ class EdgeRenderer {
   float Strength(const SceneInstance& inInstance) const;
   void DrawSubpixelDot(const SceneInstance& inInstance);
   void DrawPolyline(const SceneInstance& inInstance, std::size_t inStart, std::size_t inEnd);
-  void DrawSegment(Vec3 inFrom, Vec3 inTo);
-  RasterVertex Project(Vec3 inPlace) const {
+  void DrawSegment(Vector3f inFrom, Vector3f inTo);
+  RasterVertex Project(Vector3f inPlace) const {
     return {view_.Project(inPlace), view_.InverseDepth(inPlace.z)};
   }
 
@@ -216,21 +216,21 @@ void EdgeRenderer::DrawPolyline(const SceneInstance& inInstance, std::size_t inS
                                 std::size_t inEnd) {
   const auto& points = inInstance.mesh->edgePoints;
   if (inStart >= inEnd) return;
-  Vec3 from = inInstance.cameraFromMesh * ToVec3(points[inStart]);
+  Vector3f from = inInstance.cameraFromMesh * ToVector3(points[inStart]);
   for (std::size_t i = inStart + 1; i < inEnd; ++i) {
-    const Vec3 to = inInstance.cameraFromMesh * ToVec3(points[i]);
+    const Vector3f to = inInstance.cameraFromMesh * ToVector3(points[i]);
     DrawSegment(from, to);
     from = to;
   }
 }
 
-void EdgeRenderer::DrawSegment(Vec3 inFrom, Vec3 inTo) {
+void EdgeRenderer::DrawSegment(Vector3f inFrom, Vector3f inTo) {
   if (!(inFrom.z >= nearClip_ && inTo.z >= nearClip_ && inFrom.z <= view_.farClip &&
         inTo.z <= view_.farClip)) {
     float start = 0, end = 1;
     ClipInterval(inFrom.z, inTo.z - inFrom.z, nearClip_, view_.farClip, start, end);
     if (!(start <= end)) return;
-    const Vec3 from = Lerp(inFrom, inTo, start), to = Lerp(inFrom, inTo, end);
+    const Vector3f from = Lerp(inFrom, inTo, start), to = Lerp(inFrom, inTo, end);
     inFrom = from;
     inTo = to;
   }

@@ -4,7 +4,7 @@
 #include <mutex>
 #include <new>
 
-#include "default_platform/visualisation/ray_caster/Vec3.h"
+#include "foundation/Vector3.h"
 
 namespace ZORRayCaster {
 namespace {
@@ -43,7 +43,8 @@ float LengthOfLines(const PartMesh& inMesh) {
     const std::size_t end =
         std::min<std::size_t>(inMesh.lineStarts[line + 1], inMesh.edgePoints.size());
     for (std::size_t i = inMesh.lineStarts[line] + std::size_t{1}; i < end; ++i) {
-      const Vec3 step = ToVec3(inMesh.edgePoints[i]) - ToVec3(inMesh.edgePoints[i - 1]);
+      const ZORFoundation::Vector3f step = ZORFoundation::ToVector3(inMesh.edgePoints[i]) -
+                                           ZORFoundation::ToVector3(inMesh.edgePoints[i - 1]);
       length += std::sqrt(Dot(step, step));
     }
   }

@@ -21,11 +21,12 @@ constexpr float kOutlineInk = 0.60F;
 constexpr float kOutlineInkAlone = 0.90F;  // without shading
 
 /// One colour, or a soft vertical gradient from bluish grey to nearly white.
-std::vector<Vec3> BackgroundRows(const PictureRequest& inRequest) {
+std::vector<Vector3f> BackgroundRows(const PictureRequest& inRequest) {
   const auto linear = [](const float* inSrgb) {
-    return Vec3{LinearFromSrgb(inSrgb[0]), LinearFromSrgb(inSrgb[1]), LinearFromSrgb(inSrgb[2])};
+    return Vector3f{LinearFromSrgb(inSrgb[0]), LinearFromSrgb(inSrgb[1]),
+                    LinearFromSrgb(inSrgb[2])};
   };
-  std::vector<Vec3> rows(static_cast<std::size_t>(inRequest.height));
+  std::vector<Vector3f> rows(static_cast<std::size_t>(inRequest.height));
   if (inRequest.hasBackground) {
     std::fill(rows.begin(), rows.end(), linear(inRequest.background));
     return rows;
@@ -42,7 +43,7 @@ std::vector<Vec3> BackgroundRows(const PictureRequest& inRequest) {
 }
 
 /// Dark, or grey on a surface that is nearly black itself.
-Vec3 InkOn(Vec3 inRadiance) {
+Vector3f InkOn(Vector3f inRadiance) {
   constexpr float kDarkInk = 0.010F, kLightInk = 0.13F, kBlack = 0.012F, kDark = 0.04F;
   const float luminance = 0.2126F * inRadiance.x + 0.7152F * inRadiance.y + 0.0722F * inRadiance.z;
   const float share = std::clamp((kDark - luminance) / (kDark - kBlack), 0.F, 1.F);
@@ -56,7 +57,7 @@ class Compositor {
              const LineCoverage& inLines)
       : request_(inRequest), samples_(inSamples), lines_(inLines) {}
 
-  void ComposeRow(int inY, Vec3 inBackground, std::uint8_t* outBytes) const {
+  void ComposeRow(int inY, Vector3f inBackground, std::uint8_t* outBytes) const {
     const SrgbColour background = ToSrgb(inBackground);
     for (int x = 0; x < request_.width; ++x) {
       const std::size_t place =
@@ -72,12 +73,12 @@ class Compositor {
  private:
   typedef std::array<std::uint8_t, 3> SrgbColour;
 
-  static SrgbColour ToSrgb(Vec3 inRadiance) {
+  static SrgbColour ToSrgb(Vector3f inRadiance) {
     return {SrgbByteFromLinear(inRadiance.x), SrgbByteFromLinear(inRadiance.y),
             SrgbByteFromLinear(inRadiance.z)};
   }
 
-  Vec3 RadianceAt(int inX, int inY, std::size_t inPlace) const {
+  Vector3f RadianceAt(int inX, int inY, std::size_t inPlace) const {
     const ResolvedPixel pixel = samples_.Resolve(inX, inY);
     // The maximum, not the sum: an edge on a silhouette is no darker than an edge.
     float ink = (request_.isShaded ? kOutlineInk : kOutlineInkAlone) * pixel.outline;

@@ -10,13 +10,10 @@ namespace {
 
 using ZORDefault::Camera;
 using ZORDefault::MeshInstance;
+using ZORFoundation::Dot;
 
 /// Embree rejects coordinates beyond this.
 constexpr double kMaxCoordinate = 1e18;
-
-double Dot(const ZORMathVector& inA, const ZORMathVector& inB) {
-  return inA.x * inB.x + inA.y * inB.y + inA.z * inB.z;
-}
 
 /// cameraFromMesh in double precision.
 struct Placement {
@@ -48,23 +45,23 @@ bool IsRepresentable(const Placement& inPlacement) {
          std::all_of(inPlacement.columns, inPlacement.columns + 3, isNear);
 }
 
-Vec3 ToVec3(const ZORMathVector& inVector) {
+Vector3f ToFloats(const ZORMathVector& inVector) {
   return {static_cast<float>(inVector.x), static_cast<float>(inVector.y),
           static_cast<float>(inVector.z)};
 }
 
-float MaxScale(const Affine& inAffine) {
+float MaxScale(const Transform3f& inAffine) {
   float square = 0;
-  for (const Vec3& column : inAffine.linear.columns)
-    square = std::max(square, ZORRayCaster::Dot(column, column));
+  for (const Vector3f& column : inAffine.linear.columns)
+    square = std::max(square, Dot(column, column));
   return std::sqrt(square);
 }
 
 void SetBoundingSphere(const PartMesh& inMesh, SceneInstance& ioInstance) {
   const ZOR3DBoundingSphere& sphere = inMesh.sphere;
-  const Vec3 fromOrigin{static_cast<float>(sphere.centre.x - inMesh.origin.x),
-                        static_cast<float>(sphere.centre.y - inMesh.origin.y),
-                        static_cast<float>(sphere.centre.z - inMesh.origin.z)};
+  const Vector3f fromOrigin{static_cast<float>(sphere.centre.x - inMesh.origin.x),
+                            static_cast<float>(sphere.centre.y - inMesh.origin.y),
+                            static_cast<float>(sphere.centre.z - inMesh.origin.z)};
   ioInstance.centre = ioInstance.cameraFromMesh * fromOrigin;
   ioInstance.radius =
       std::max(static_cast<float>(sphere.radius), 0.F) * MaxScale(ioInstance.cameraFromMesh);
@@ -76,9 +73,9 @@ SceneInstance MakeInstance(const MeshInstance& inMesh, const Placement& inPlacem
   instance.mesh = inMesh.mesh.get();
   instance.bvh = &BvhOf(*instance.mesh);
   for (int i = 0; i < 3; ++i)
-    instance.cameraFromMesh.linear.columns[i] = ToVec3(inPlacement.columns[i]);
-  instance.cameraFromMesh.translation = ToVec3(inPlacement.translation);
-  const Vec3* const columns = instance.cameraFromMesh.linear.columns;
+    instance.cameraFromMesh.linear.columns[i] = ToFloats(inPlacement.columns[i]);
+  instance.cameraFromMesh.translation = ToFloats(inPlacement.translation);
+  const Vector3f* const columns = instance.cameraFromMesh.linear.columns;
   for (int i = 0; i < 3; ++i)
     instance.normalMatrix.columns[i] = Cross(columns[(i + 1) % 3], columns[(i + 2) % 3]);
   SetBoundingSphere(*instance.mesh, instance);
@@ -146,7 +143,7 @@ RTCIntersectContext CoherentContext() {
 
 }  // namespace
 
-RasterPoint View::Project(Vec3 inPlace) const {
+RasterPoint View::Project(Vector3f inPlace) const {
   const float scale = 1 / (isPerspective ? pixelSize * inPlace.z : pixelSize);
   return {inPlace.x * scale + 0.5F * static_cast<float>(width),
           inPlace.y * scale + 0.5F * static_cast<float>(height)};
@@ -213,7 +210,7 @@ void RenderScene::ApplyDepthBias(SceneInstance& ioInstance, std::size_t inPlace)
   const bool isOver = ioInstance.isOverlay && view_.nearClip <= 0;
   const float scale = (1 + bias) * (isOver ? kOverlayScale : 1);
   ioInstance.depthBias = scale;
-  for (Vec3& column : ioInstance.cameraFromMesh.linear.columns) column = scale * column;
+  for (Vector3f& column : ioInstance.cameraFromMesh.linear.columns) column = scale * column;
   ioInstance.cameraFromMesh.translation = scale * ioInstance.cameraFromMesh.translation;
   ioInstance.centre = scale * ioInstance.centre;
   ioInstance.radius *= scale;
@@ -253,7 +250,7 @@ PixelBounds RenderScene::BoundsOf(const SceneInstance& inInstance) const {
   const PixelBounds all{0, 0, view_.width, view_.height};
   // Enlarged a little against rounding.
   const float radius = 1.001F * inInstance.radius;
-  const Vec3 centre = inInstance.centre;
+  const Vector3f centre = inInstance.centre;
   const float nearDepth = centre.z - radius;
   if (centre.z + radius <= view_.nearClip || nearDepth > view_.farClip) return {};
   if (view_.isPerspective && !(nearDepth > 0)) return all;
@@ -290,8 +287,8 @@ bool RenderScene::Cast(const RasterPoint* inPoints, int inCount, Hit* outHits) c
   for (int i = 0; i < kPacket; ++i) {
     valid[i] = i < inCount ? -1 : 0;
     const RasterPoint point = inPoints[std::min(i, inCount - 1)];
-    const Vec3 start = view_.RayStart(point);
-    const Vec3 direction = view_.RayDirection(point);
+    const Vector3f start = view_.RayStart(point);
+    const Vector3f direction = view_.RayDirection(point);
     ray.org_x[i] = start.x;
     ray.org_y[i] = start.y;
     ray.org_z[i] = start.z;
@@ -325,8 +322,8 @@ bool RenderScene::Cast(const RasterPoint* inPoints, int inCount, Hit* outHits) c
 }
 
 Hit RenderScene::CastBeyond(RasterPoint inPoint, float inDepth) const {
-  const Vec3 start = view_.RayStart(inPoint);
-  const Vec3 direction = view_.RayDirection(inPoint);
+  const Vector3f start = view_.RayStart(inPoint);
+  const Vector3f direction = view_.RayDirection(inPoint);
   RTCRayHit ray{};
   ray.ray = {start.x,     start.y, start.z,       inDepth,    direction.x, direction.y,
              direction.z, 0,       view_.farClip, 0xFFFFFFFF, 0,           0};

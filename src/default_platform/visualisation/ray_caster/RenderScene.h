@@ -8,7 +8,6 @@
 #include "default_platform/visualisation/RayCaster.h"
 #include "default_platform/visualisation/ray_caster/MeshBvh.h"
 #include "default_platform/visualisation/ray_caster/Shading.h"
-#include "default_platform/visualisation/ray_caster/Vec3.h"
 
 namespace ZORRayCaster {
 
@@ -31,24 +30,24 @@ struct View {
   double depthOffset = 0;  ///< to be added to a depth for the distance from the original eye
 
   /// The ray through a point is start + depth * direction.
-  Vec3 RayStart(RasterPoint inPoint) const {
-    return isPerspective ? Vec3{0, 0, 0} : InPlane(inPoint, 0);
+  Vector3f RayStart(RasterPoint inPoint) const {
+    return isPerspective ? Vector3f{0, 0, 0} : InPlane(inPoint, 0);
   }
-  Vec3 RayDirection(RasterPoint inPoint) const {
-    return isPerspective ? InPlane(inPoint, 1) : Vec3{0, 0, 1};
+  Vector3f RayDirection(RasterPoint inPoint) const {
+    return isPerspective ? InPlane(inPoint, 1) : Vector3f{0, 0, 1};
   }
-  /// Perspective: 1 / depth; orthographic: -depth. Linear in raster space along lines and over planes.
+  /// Perspective: 1 / depth; orthographic: -depth. Matrix3f in raster space along lines and over planes.
   float InverseDepth(float inDepth) const { return isPerspective ? 1 / inDepth : -inDepth; }
   /// The change of inverse depth over a depth of one pixel's size.
   float InverseDepthPerPixel(float inInverseDepth) const {
     return isPerspective ? pixelSize * inInverseDepth : pixelSize;
   }
-  Vec3 InPlane(RasterPoint inPoint, float inDepth) const {
+  Vector3f InPlane(RasterPoint inPoint, float inDepth) const {
     return {(inPoint.x - 0.5F * static_cast<float>(width)) * pixelSize,
             (inPoint.y - 0.5F * static_cast<float>(height)) * pixelSize, inDepth};
   }
   /// Perspective: only of a point in front of the eye.
-  RasterPoint Project(Vec3 inPlace) const;
+  RasterPoint Project(Vector3f inPlace) const;
   /// The raster length of a length at a depth.
   float PixelLength(float inLength, float inDepth) const;
 };
@@ -67,9 +66,9 @@ struct PixelBounds {
 struct SceneInstance {
   const PartMesh* mesh = nullptr;
   const MeshBvh* bvh = nullptr;
-  Affine cameraFromMesh{};
-  Linear normalMatrix{};  ///< cameraFromMesh for normals, which it does not normalize
-  Vec3 centre{};
+  Transform3f cameraFromMesh{};
+  Matrix3f normalMatrix{};  ///< cameraFromMesh for normals, which it does not normalize
+  Vector3f centre{};
   float radius = 0;
   bool hasNormals = false;
   SurfaceColour colour;                ///< of triangles without their own
@@ -90,7 +89,7 @@ struct Hit {
   float depth;
   float u;
   float v;
-  Vec3 meshNormal;  ///< geometric, in mesh space, not normalized
+  Vector3f meshNormal;  ///< geometric, in mesh space, not normalized
 };
 
 class RenderScene {

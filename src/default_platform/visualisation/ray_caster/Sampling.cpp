@@ -27,7 +27,7 @@ constexpr float kRadianceStep = 0.035F;
 constexpr float kDepthBreak = 4;
 constexpr float kSlopeBreak = 1.5F;
 
-float MaxDifference(Vec3 inA, Vec3 inB) {
+float MaxDifference(Vector3f inA, Vector3f inB) {
   return std::max({std::fabs(inA.x - inB.x), std::fabs(inA.y - inB.y), std::fabs(inA.z - inB.z)});
 }
 
@@ -80,7 +80,7 @@ void SurfacePass::CastPoints(const RasterPoint* inPoints, int inCount, Sample* o
     outSamples[i] = meetAny ? SampleOf(inPoints[i], hits[i]) : BackgroundSample(inPoints[i]);
 }
 
-Vec3 SurfacePass::BackgroundAt(RasterPoint inPoint) const {
+Vector3f SurfacePass::BackgroundAt(RasterPoint inPoint) const {
   return background_.rows[static_cast<std::size_t>(inPoint.y)];
 }
 
@@ -89,8 +89,8 @@ Sample SurfacePass::SampleOf(RasterPoint inPoint, const Hit& inHit) const {
   const SceneInstance& instance = scene_.GetInstances()[inHit.instance];
   const SurfaceColour& colour = instance.ColourOf(inHit.triangle);
   if (colour.opacity < 1 && background_.isShaded) return SampleTransparent(inPoint, inHit);
-  const Vec3 direction = scene_.GetView().RayDirection(inPoint);
-  const Vec3 plane = instance.normalMatrix * inHit.meshNormal;
+  const Vector3f direction = scene_.GetView().RayDirection(inPoint);
+  const Vector3f plane = instance.normalMatrix * inHit.meshNormal;
   Sample sample;
   sample.instance = inHit.instance;
   SetPlane(direction, plane, inHit.depth, sample);
@@ -104,14 +104,14 @@ Sample SurfacePass::SampleOf(RasterPoint inPoint, const Hit& inHit) const {
 Sample SurfacePass::SampleTransparent(RasterPoint inPoint, Hit inHit) const {
   constexpr float kStep = 1e-6F;
   const std::uint32_t front = inHit.instance;
-  const Vec3 direction = scene_.GetView().RayDirection(inPoint);
-  Vec3 light{0, 0, 0};
+  const Vector3f direction = scene_.GetView().RayDirection(inPoint);
+  Vector3f light{0, 0, 0};
   float transmittance = 1;
   for (int layer = 0; inHit.instance != Hit::kMiss && layer < kMaxTransparentLayers; ++layer) {
     const SceneInstance& instance = scene_.GetInstances()[inHit.instance];
     const SurfaceColour& colour = instance.ColourOf(inHit.triangle);
     if (colour.opacity >= 1) break;
-    const Vec3 plane = instance.normalMatrix * inHit.meshNormal;
+    const Vector3f plane = instance.normalMatrix * inHit.meshNormal;
     light = light + transmittance * colour.opacity * ShadeHit(direction, plane, inHit, colour);
     transmittance *= 1 - colour.opacity;
     inHit = scene_.CastBeyond(inPoint, inHit.depth * (1 + kStep));
@@ -125,25 +125,26 @@ Sample SurfacePass::SampleTransparent(RasterPoint inPoint, Hit inHit) const {
 }
 
 /// @param inPlane the geometric normal in camera space.
-Vec3 SurfacePass::ShadeHit(Vec3 inDirection, Vec3 inPlane, const Hit& inHit,
-                           const SurfaceColour& inColour) const {
-  const Vec3 toEye = Normalize(-1 * inDirection);
-  const Vec3 plane = Dot(inPlane, toEye) < 0 ? -1 * inPlane : inPlane;
+Vector3f SurfacePass::ShadeHit(Vector3f inDirection, Vector3f inPlane, const Hit& inHit,
+                               const SurfaceColour& inColour) const {
+  const Vector3f toEye = Normalised(-1 * inDirection);
+  const Vector3f plane = Dot(inPlane, toEye) < 0 ? -1 * inPlane : inPlane;
   const SceneInstance& instance = scene_.GetInstances()[inHit.instance];
-  if (!instance.hasNormals) return Shade(inColour.albedo, Normalize(plane), toEye);
+  if (!instance.hasNormals) return Shade(inColour.albedo, Normalised(plane), toEye);
   const auto& corners = instance.mesh->triangles[inHit.triangle];
   const auto& normals = instance.mesh->normals;
-  const Vec3 meshNormal = (1 - inHit.u - inHit.v) * ToVec3(normals[corners[0]]) +
-                          inHit.u * ToVec3(normals[corners[1]]) +
-                          inHit.v * ToVec3(normals[corners[2]]);
-  const Vec3 smooth = Normalize(instance.normalMatrix * meshNormal);
+  const Vector3f meshNormal = (1 - inHit.u - inHit.v) * ToVector3(normals[corners[0]]) +
+                              inHit.u * ToVector3(normals[corners[1]]) +
+                              inHit.v * ToVector3(normals[corners[2]]);
+  const Vector3f smooth = Normalised(instance.normalMatrix * meshNormal);
   const float side = Dot(smooth, plane);
   // Faces the eye; a degenerate shading normal is replaced by the geometric one.
-  if (!(side < 0 || side > 0)) return Shade(inColour.albedo, Normalize(plane), toEye);
+  if (!(side < 0 || side > 0)) return Shade(inColour.albedo, Normalised(plane), toEye);
   return Shade(inColour.albedo, side < 0 ? -1 * smooth : smooth, toEye);
 }
 
-void SurfacePass::SetPlane(Vec3 inDirection, Vec3 inPlane, float inDepth, Sample& outSample) const {
+void SurfacePass::SetPlane(Vector3f inDirection, Vector3f inPlane, float inDepth,
+                           Sample& outSample) const {
   const View& view = scene_.GetView();
   outSample.inverseDepth = view.InverseDepth(inDepth);
   // On the plane n . p = c the inverse depth is n . direction / c, or (n.x x + n.y y - c) / n.z.

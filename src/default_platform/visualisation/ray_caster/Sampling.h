@@ -16,14 +16,14 @@ struct Sample {
   float slopeX;        ///< change of the inverse depth per pixel
   float slopeY;
   std::uint32_t instance;  ///< or Hit::kMiss
-  Vec3 radiance;
+  Vector3f radiance;
 
   static constexpr float kBackground = -1e30F;
 };
 
 /// The background's linear radiance in each row.
 struct Background {
-  std::vector<Vec3> rows;
+  std::vector<Vector3f> rows;
   bool isShaded = true;  ///< else surfaces take the background's colour
 };
 
@@ -43,10 +43,10 @@ class SurfacePass {
   void CastBlock(const PixelBounds& inBlock, Sample* outPixels) const;
   Sample SampleOf(RasterPoint inPoint, const Hit& inHit) const;
   Sample SampleTransparent(RasterPoint inPoint, Hit inHit) const;
-  Vec3 ShadeHit(Vec3 inDirection, Vec3 inPlane, const Hit& inHit,
-                const SurfaceColour& inColour) const;
-  void SetPlane(Vec3 inDirection, Vec3 inPlane, float inDepth, Sample& outSample) const;
-  Vec3 BackgroundAt(RasterPoint inPoint) const;
+  Vector3f ShadeHit(Vector3f inDirection, Vector3f inPlane, const Hit& inHit,
+                    const SurfaceColour& inColour) const;
+  void SetPlane(Vector3f inDirection, Vector3f inPlane, float inDepth, Sample& outSample) const;
+  Vector3f BackgroundAt(RasterPoint inPoint) const;
   Sample BackgroundSample(RasterPoint inPoint) const {
     return {Sample::kBackground, 0, 0, Hit::kMiss, BackgroundAt(inPoint)};
   }
@@ -57,7 +57,7 @@ class SurfacePass {
 
 /// A pixel resolved from its samples, without lines.
 struct ResolvedPixel {
-  Vec3 radiance;
+  Vector3f radiance;
   float outline;  ///< coverage by silhouettes, 0 to 1
 };
 

@@ -49,18 +49,18 @@ SurfaceColour MakeSurfaceColour(const PartColour& inColour) {
   return {{light(0), light(1), light(2)}, static_cast<float>(inColour[3]) / 255};
 }
 
-Vec3 Shade(Vec3 inAlbedo, Vec3 inNormal, Vec3 inToEye) {
+Vector3f Shade(Vector3f inAlbedo, Vector3f inNormal, Vector3f inToEye) {
   constexpr float kAmbient = 0.20F, kHead = 0.62F, kFill = 0.28F, kHighlight = 0.07F;
-  constexpr Vec3 kFromFill{-0.532300F, -0.725864F, -0.435518F};  // unit
+  constexpr Vector3f kFromFill{-0.532300F, -0.725864F, -0.435518F};  // unit
   const float towardsEye = std::max(Dot(inNormal, inToEye), 0.F);
   const float towardsFill = std::max(Dot(inNormal, kFromFill), 0.F);
   // The half vector of the fill light (Blinn, "Models of light reflection", 1977).
-  const float half = std::max(Dot(inNormal, Normalize(kFromFill + inToEye)), 0.F);
+  const float half = std::max(Dot(inNormal, Normalised(kFromFill + inToEye)), 0.F);
   float shine = half * half;
   for (int i = 0; i < 4; ++i) shine *= shine;
   const float diffuse = kAmbient + kHead * towardsEye + kFill * towardsFill;
   const float highlight = kHighlight * shine;
-  return diffuse * inAlbedo + Vec3{highlight, highlight, highlight};
+  return diffuse * inAlbedo + Vector3f{highlight, highlight, highlight};
 }
 
 }  // namespace ZORRayCaster

@@ -5,13 +5,19 @@
 #include <cstdint>
 
 #include "default_platform/visualisation/PartMesh.h"
-#include "default_platform/visualisation/ray_caster/Vec3.h"
+#include "foundation/Vector3.h"
 
 namespace ZORRayCaster {
 
-/// Linear RGB and opacity.
+// Camera space: x to the right, y down, z forward, the eye at the origin.
+using ZORFoundation::ToVector3;
+using ZORFoundation::Vector3f;
+using Matrix3f = ZORFoundation::Matrix3<float>;
+using Transform3f = ZORFoundation::Transform<float>;
+
+/// Matrix3f RGB and opacity.
 struct SurfaceColour {
-  Vec3 albedo{0, 0, 0};
+  Vector3f albedo{0, 0, 0};
   float opacity = 1;
 };
 
@@ -24,7 +30,7 @@ std::uint8_t SrgbByteFromLinear(float inLinear);
 
 /// Ambient light, a headlight, and a fill light from above left with a soft specular highlight.
 /// @param inNormal unit, towards the eye. @param inToEye unit.
-Vec3 Shade(Vec3 inAlbedo, Vec3 inNormal, Vec3 inToEye);
+Vector3f Shade(Vector3f inAlbedo, Vector3f inNormal, Vector3f inToEye);
 
 }  // namespace ZORRayCaster
 
