@@ -14,9 +14,9 @@ if(libraryParent)
 endif()
 
 file(RELATIVE_PATH binToLib /prefix/${CMAKE_INSTALL_BINDIR} /prefix/${CMAKE_INSTALL_LIBDIR})
-set_target_properties(ZORLyra ZORDefaultPlatform ZORFoundation PROPERTIES INSTALL_RPATH "$ORIGIN")
+set_target_properties(ZORLyra ZORDefaultPlatform ZORFoundation ZORClashToolkit PROPERTIES INSTALL_RPATH "$ORIGIN")
 
-install(TARGETS ZORPlatformDeclarations ZORFoundation ZORDefaultPlatform ZORLyra EXPORT ZORLyraTargets
+install(TARGETS ZORPlatformDeclarations ZORFoundation ZORDefaultPlatform ZORLyra ZORClashToolkit EXPORT ZORLyraTargets
   RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR}
   LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
   ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR})
@@ -33,7 +33,9 @@ endif()
 
 install(DIRECTORY include/ DESTINATION ${headerDir} FILES_MATCHING PATTERN "*.h")
 install(DIRECTORY src/platform/ DESTINATION ${headerDir}/platform FILES_MATCHING PATTERN "*.h")
+install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit FILES_MATCHING PATTERN "*.h" PATTERN "ElementWalk.h" EXCLUDE)
 install(FILES ${PROJECT_BINARY_DIR}/generated/ZORLyraExport.h ${PROJECT_BINARY_DIR}/generated/ZORPlatformExport.h
+  ${PROJECT_BINARY_DIR}/generated/ZORToolkitExport.h
   DESTINATION ${headerDir})
 install(DIRECTORY resources/ DESTINATION ${resourceDir} OPTIONAL)
 

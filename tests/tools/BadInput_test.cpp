@@ -7,9 +7,7 @@
 #include <algorithm>
 #include <random>
 
-#include "lyra/ClashResultFile.h"
-#include "lyra/CommandErrors.h"
-#include "lyra/InterferenceRecord.h"
+#include "toolkit/records/InterferenceRecord.h"
 #include "tools/Command.h"
 
 using testing::HasSubstr;
@@ -27,11 +25,10 @@ const char* const kDocument =
 /// The reason why bytes are refused; empty when they are read.
 std::string RefusalOf(const std::string& inBytes) {
   try {
-    lyra::ClashResultFile file("doc.xml", inBytes);
-    lyra::ForEachInterference(file, [&](const lyra::PlacedInterference& inPlaced) {
-      lyra::ReadInterference(file, inPlaced);
-    });
-  } catch (const lyra::InputError& error) {
+    ZORToolkit::ClashDocument document("doc.xml", inBytes);
+    ZORToolkit::ForEachInterference(document, ZORToolkit::RecordPart::kAll,
+                                    [](const ZORToolkit::InterferenceRecord&) {});
+  } catch (const ZORToolkit::Error& error) {
     return error.what();
   }
   return {};

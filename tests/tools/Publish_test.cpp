@@ -322,6 +322,21 @@ TEST_F(Publish, ProductsThatTheModelLacksAreMarkedAndCounted) {
             6u);
 }
 
+TEST_F(Publish, OfThreeProductsTheFirstAndTheLastAreShown) {
+  const CommandResult result =
+      Run({"-", "--model", kModel, "--size", "60x40"},
+          InOneSet("<Interference><Product DescriptionID='plate_1' Alias='plate_1'/>"
+                   "<Product DescriptionID='gone' Preview='dangling.jpg'/>"
+                   "<Product DescriptionID='l-bracket-assembly_1' Alias='l-bracket-assembly_1'/>"
+                   "</Interference>"));
+  EXPECT_EQ(result.code, 0);
+  EXPECT_THAT(result.error, Not(HasSubstr("lacks")));
+  EXPECT_THAT(Report(), Not(HasSubstr("dangling.jpg")));
+  EXPECT_EQ(Occurrences(Report(), "Preview="), 2u);
+  for (const char* name : {"interference_1_product_1.jpg", "interference_1_product_2.jpg"})
+    EXPECT_TRUE(fs::exists(Picture(name))) << name;
+}
+
 TEST_F(Publish, OnlySomeKeepTheirNumbers) {
   ASSERT_EQ(Run({"tests/golden/inputs/two_sets.xml", "--only", "type=contact"}).code, 0);
   EXPECT_EQ(Occurrences(Page(), "<tr data-n="), 1u);

@@ -5,7 +5,7 @@
 #include <array>
 
 #include "ZORClashParsing.h"
-#include "lyra/ReportWriter.h"
+#include "toolkit/publishing/ReportWriter.h"
 #include "tools/Command.h"
 
 using testing::HasSubstr;
@@ -45,7 +45,7 @@ std::size_t Occurrences(const std::string& inText, const std::string& inPart) {
   return count;
 }
 
-std::string Value(const char* inText) { return lyra::AttributeValue(inText).ConvertToChar(); }
+std::string Value(const char* inText) { return ZORToolkit::AttributeValue(inText).ConvertToChar(); }
 
 class ReportOfSample : public testing::TestWithParam<std::string> {
  protected:
@@ -202,5 +202,5 @@ TEST(AttributeValue, ReplacesWhatXmlCannotCarry) {
   const ZORUC2Bytes lone[] = {'a', 0xD800, 'b', 0xDC00, 0xDBFF};
   ZORUnicodeString text;
   text.BuildFromUTF16(lone, 5);
-  EXPECT_EQ(std::string(lyra::AttributeValue(text).ConvertToChar()), "a\uFFFDb\uFFFD\uFFFD");
+  EXPECT_EQ(std::string(ZORToolkit::AttributeValue(text).ConvertToChar()), "a\uFFFDb\uFFFD\uFFFD");
 }

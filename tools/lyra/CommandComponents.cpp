@@ -6,6 +6,7 @@
 #include "lyra/Verbs.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 struct ComponentsOptions {
@@ -29,7 +30,7 @@ void PrintTable(const std::vector<ComponentRecord>& inComponents, Output& ioOutp
 }
 
 int Components(const ComponentsOptions& inOptions, Output& ioOutput) {
-  ClashResultFile file(inOptions.file);
+  ClashDocument file(inOptions.file);
   file.Require({DocumentKind::kComponents}, "components");
   const std::vector<ComponentRecord> components = ReadComponents(file);
   if (inOptions.json)

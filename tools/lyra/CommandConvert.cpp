@@ -7,6 +7,7 @@
 #include "lyra/Verbs.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 constexpr const char* kFormats[] = {"json"};
@@ -23,28 +24,24 @@ void WriteArray(const char* inName, const Records& inRecords, Output& ioOutput) 
   array.Finish();
 }
 
-void WriteInterferences(ClashResultFile& ioFile, Output& ioOutput) {
+void WriteInterferences(ClashDocument& ioDocument, Output& ioOutput) {
   ioOutput.Write(",\n\"interferences\":");
   JsonArray array(ioOutput);
-  const bool has =
-      ioFile.Kind() == DocumentKind::kClash || ioFile.Kind() == DocumentKind::kInterference;
-  if (has) {
-    ForEachInterference(ioFile, [&](const PlacedInterference& inPlaced) {
-      array.Add(ReadInterference(ioFile, inPlaced));
-    });
-  }
+  if (ioDocument.HasInterferences())
+    ForEachInterference(ioDocument, RecordPart::kAll,
+                        [&](const InterferenceRecord& inRecord) { array.Add(inRecord); });
   array.Finish();
 }
 
 int Convert(const ConvertOptions& inOptions, Output& ioOutput) {
   ChosenWord("--to", inOptions.format, kFormats);
   ChooseLanguage(inOptions.language);
-  ClashResultFile file(inOptions.file);
-  ioOutput.Write("{\"info\":" + JsonText(ReadGeneral(file)));
-  WriteInterferences(file, ioOutput);
-  WriteArray("components", ReadComponents(file), ioOutput);
-  WriteArray("specifications", ReadSpecifications(file), ioOutput);
-  WriteArray("links", ReadLinks(file), ioOutput);
+  ClashDocument document(inOptions.file);
+  ioOutput.Write("{\"info\":" + JsonText(ReadDocument(document)));
+  WriteInterferences(document, ioOutput);
+  WriteArray("components", ReadComponents(document), ioOutput);
+  WriteArray("specifications", ReadSpecifications(document), ioOutput);
+  WriteArray("links", ReadLinks(document), ioOutput);
   ioOutput.Write("}\n");
   return 0;
 }

@@ -3,15 +3,13 @@
 #define ZOR_TOOLS_LYRA_COMMAND_ERRORS_H
 
 #include <stdexcept>
-#include <string>
+
+#include "toolkit/Error.h"
 
 namespace lyra {
 
 /// What was asked for cannot be done with this input or output: one line on stderr, exit code 1.
-class InputError : public std::runtime_error {
- public:
-  using std::runtime_error::runtime_error;
-};
+using InputError = ZORToolkit::Error;
 
 /// The command was called wrongly: one line on stderr, exit code 2.
 class UsageError : public std::runtime_error {

@@ -4,13 +4,14 @@
 #include <memory>
 
 #include "lyra/CommandErrors.h"
-#include "lyra/DocumentRecords.h"
 #include "lyra/Facts.h"
 #include "lyra/RecordsJson.h"
 #include "lyra/SafeText.h"
 #include "lyra/Verbs.h"
+#include "toolkit/records/DocumentRecords.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 struct InfoOptions {
@@ -57,7 +58,7 @@ std::string ResultText(const ResultSetRecord& inSet) {
   return text;
 }
 
-void AddContents(const GeneralRecord& inRecord, Facts& ioFacts) {
+void AddContents(const DocumentRecord& inRecord, Facts& ioFacts) {
   if (inRecord.kind == DocumentKind::kComponents)
     ioFacts.Add("Components", std::to_string(inRecord.components));
   if (inRecord.kind == DocumentKind::kFederator)
@@ -68,7 +69,7 @@ void AddContents(const GeneralRecord& inRecord, Facts& ioFacts) {
     ioFacts.Add("Specifications", std::to_string(inRecord.specifications));
 }
 
-void PrintText(const GeneralRecord& inRecord, Output& ioOutput) {
+void PrintText(const DocumentRecord& inRecord, Output& ioOutput) {
   Facts facts(inRecord.file);
   std::string kind = Description(inRecord.kind);
   kind = kind.substr(kind.find(' ') + 1) + " (" + RootName(inRecord.kind) + ")";
@@ -98,7 +99,7 @@ class Printer {
     if (options_.json && options_.files.size() > 1) array_ = std::make_unique<JsonArray>(output_);
   }
 
-  void Print(const GeneralRecord& inRecord) {
+  void Print(const DocumentRecord& inRecord) {
     if (array_) {
       array_->Add(inRecord);
     } else if (options_.json) {
@@ -127,10 +128,10 @@ int Info(const InfoOptions& inOptions, Output& ioOutput) {
   Printer printer(inOptions, ioOutput);
   int code = 0;
   for (const std::string& path : inOptions.files) {
-    std::optional<GeneralRecord> record;
+    std::optional<DocumentRecord> record;
     try {
-      ClashResultFile file(path);
-      record = ReadGeneral(file);
+      ClashDocument file(path);
+      record = ReadDocument(file);
     } catch (const InputError& error) {
       std::fprintf(stderr, "lyra: %s\n", Printable(error.what()).c_str());
       code = 1;

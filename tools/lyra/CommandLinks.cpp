@@ -1,12 +1,13 @@
 // lyra links FILE
 #include <memory>
 
-#include "lyra/LinkedFiles.h"
 #include "lyra/RecordsJson.h"
 #include "lyra/Table.h"
 #include "lyra/Verbs.h"
+#include "toolkit/records/LinkedFiles.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 struct LinksOptions {
@@ -42,7 +43,7 @@ bool Check(std::vector<LinkRecord>& ioLinks, const std::string& inFederator) {
 }
 
 int Links(const LinksOptions& inOptions, Output& ioOutput) {
-  ClashResultFile file(inOptions.file);
+  ClashDocument file(inOptions.file);
   file.Require({DocumentKind::kFederator}, "links");
   std::vector<LinkRecord> links = ReadLinks(file);
   const bool areAllWell = !inOptions.check || Check(links, inOptions.file);

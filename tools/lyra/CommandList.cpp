@@ -10,6 +10,7 @@
 #include "lyra/Verbs.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 struct ListOptions {
@@ -32,7 +33,7 @@ const std::string& NameOf(const ProductRecord& inProduct) {
 std::vector<std::string> Cells(const InterferenceRecord& inRecord) {
   return {std::to_string(inRecord.index),
           inRecord.type,
-          inRecord.value,
+          inRecord.value.text,
           inRecord.status,
           inRecord.rule.name,
           NameOf(inRecord.products[0]),
@@ -54,25 +55,24 @@ RecordPart PartFor(const ListFilter& inFilter) {
 }
 
 template <class Visit>
-void ForEachAccepted(ClashResultFile& ioFile, const ListFilter& inFilter, RecordPart inPart,
+void ForEachAccepted(ClashDocument& ioDocument, const ListFilter& inFilter, RecordPart inPart,
                      const Visit& inVisit) {
-  ForEachInterference(ioFile, [&](const PlacedInterference& inPlaced) {
-    const InterferenceRecord record = ReadInterference(ioFile, inPlaced, inPart);
-    if (inFilter.Accepts(record)) inVisit(record);
+  ForEachInterference(ioDocument, inPart, [&](const InterferenceRecord& inRecord) {
+    if (inFilter.Accepts(inRecord)) inVisit(inRecord);
   });
 }
 
-void PrintJson(ClashResultFile& ioFile, const ListFilter& inFilter, Output& ioOutput) {
+void PrintJson(ClashDocument& ioDocument, const ListFilter& inFilter, Output& ioOutput) {
   JsonArray array(ioOutput);
-  ForEachAccepted(ioFile, inFilter, RecordPart::kAll,
+  ForEachAccepted(ioDocument, inFilter, RecordPart::kAll,
                   [&](const InterferenceRecord& inRecord) { array.Add(inRecord); });
   array.Finish();
   ioOutput.Write("\n");
 }
 
-void PrintCsv(ClashResultFile& ioFile, const ListFilter& inFilter, Output& ioOutput) {
+void PrintCsv(ClashDocument& ioDocument, const ListFilter& inFilter, Output& ioOutput) {
   ioOutput.Write(CsvRow(Headers()));
-  ForEachAccepted(ioFile, inFilter, PartFor(inFilter), [&](const InterferenceRecord& inRecord) {
+  ForEachAccepted(ioDocument, inFilter, PartFor(inFilter), [&](const InterferenceRecord& inRecord) {
     std::vector<std::string> cells = Cells(inRecord);
     // On its way to a program a text stays as it is; a terminal must not be driven by it.
     if (ioOutput.IsTerminal())
@@ -81,13 +81,13 @@ void PrintCsv(ClashResultFile& ioFile, const ListFilter& inFilter, Output& ioOut
   });
 }
 
-void PrintTable(ClashResultFile& ioFile, const ListFilter& inFilter, Output& ioOutput) {
+void PrintTable(ClashDocument& ioDocument, const ListFilter& inFilter, Output& ioOutput) {
   std::vector<TableColumn> columns;
   for (const std::string& header : Headers()) columns.push_back({header});
   columns[0].align = columns[2].align = TableColumn::Align::kRight;
   columns[5].cut = columns[6].cut = Cut::kStart;  // what tells products apart is at their ends
   Table table(columns);
-  ForEachAccepted(ioFile, inFilter, PartFor(inFilter),
+  ForEachAccepted(ioDocument, inFilter, PartFor(inFilter),
                   [&](const InterferenceRecord& inRecord) { table.Add(Cells(inRecord)); });
   table.Print(ioOutput);
 }
@@ -97,14 +97,14 @@ int List(const ListOptions& inOptions, Output& ioOutput) {
     throw UsageError("list: --json and --csv exclude each other");
   const ListFilter filter = FilterOf(inOptions);
   ChooseLanguage(inOptions.language);
-  ClashResultFile file(inOptions.file);
-  file.Require({DocumentKind::kClash, DocumentKind::kInterference}, "interferences");
+  ClashDocument document(inOptions.file);
+  document.RequireInterferences();
   if (inOptions.json)
-    PrintJson(file, filter, ioOutput);
+    PrintJson(document, filter, ioOutput);
   else if (inOptions.csv)
-    PrintCsv(file, filter, ioOutput);
+    PrintCsv(document, filter, ioOutput);
   else
-    PrintTable(file, filter, ioOutput);
+    PrintTable(document, filter, ioOutput);
   return 0;
 }
 

@@ -4,7 +4,6 @@
 
 #include "ZORLyraGeneralServices.h"
 #include "lyra/CommandErrors.h"
-#include "lyra/DocumentText.h"
 #include "lyra/ModelFile.h"
 #include "lyra/Picture.h"
 #include "lyra/ProductWalk.h"
@@ -13,10 +12,12 @@
 #include "platform/product_structure/ZORIAlias.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
 #include "platform/visualisation/ZORI3DGeoVisu.h"
+#include "toolkit/records/DocumentText.h"
 
 namespace fs = std::filesystem;
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 struct RenderOptions {

@@ -1,39 +1,28 @@
 // lyra report FILE -o OUT
 #include <memory>
 
-#include "lyra/ClashResultFile.h"
-#include "lyra/DocumentText.h"
 #include "lyra/Prologue.h"
 #include "lyra/ReplacedFile.h"
-#include "lyra/ReportWriter.h"
 #include "lyra/Verbs.h"
+#include "toolkit/publishing/ReportWriter.h"
+#include "toolkit/records/ClashDocument.h"
+#include "toolkit/records/DocumentText.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
-
-constexpr const char* kDocumentType = "clash-report.dtd";
 
 struct ReportOptions {
   std::string file, output;
-  Prologue prologue;
+  PrologueOptions prologue;
 };
 
 int Report(const ReportOptions& inOptions, Output& ioOutput) {
   inOptions.prologue.Check();
-  ClashResultFile file(inOptions.file);
-  file.Require({DocumentKind::kClash, DocumentKind::kInterference}, "interferences");
-
-  ZORLyraXMLServices writer;
-  const ZORUnicodeString styleSheet = inOptions.prologue.styleSheet.empty()
-                                          ? AttributeValue(writer.getStyleSheetFromSetting())
-                                          : inOptions.prologue.StyleSheet();
-  const ZORUnicodeString dtd =
-      inOptions.prologue.dtd.empty() ? kDocumentType : inOptions.prologue.Dtd();
-  writer.WriteXMLHeaderTag(RootName(file.Kind()), dtd, styleSheet);
-  WriteReportElement(file.Root(), writer);
-
+  const ClashDocument document(inOptions.file);
+  document.RequireInterferences();
   ReplacedFile output(inOptions.output);
-  output.Check(writer.DumpDocument(FromUtf8(output.TemporaryPath())));
+  output.Check(WriteReport(document, inOptions.prologue, output.TemporaryPath()));
   output.Finish(ioOutput);
   return 0;
 }

@@ -8,6 +8,7 @@
 #include "lyra/Verbs.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 struct ShowOptions {
@@ -16,9 +17,10 @@ struct ShowOptions {
   bool json = false;
 };
 
-std::string Joined(const TextTriple& inTriple) {
-  const bool isEmpty = inTriple[0].empty() && inTriple[1].empty() && inTriple[2].empty();
-  return isEmpty ? "" : inTriple[0] + ", " + inTriple[1] + ", " + inTriple[2];
+std::string Joined(const NumberTriple& inTriple) {
+  const auto& [x, y, z] = inTriple;
+  const bool isEmpty = x.text.empty() && y.text.empty() && z.text.empty();
+  return isEmpty ? "" : x.text + ", " + y.text + ", " + z.text;
 }
 
 std::string NumberShown(double inNumber) {
@@ -40,7 +42,7 @@ void AddPlacement(const Placement& inPlacement, Facts& ioFacts) {
 }
 
 void AddProduct(const char* inGroup, const ProductRecord& inProduct, Facts& ioFacts) {
-  if (!inProduct.position) return;
+  if (!inProduct.exists) return;
   ioFacts.AddGroup(inGroup);
   ioFacts.Add({{"Alias", inProduct.alias},
                {"Identifier", inProduct.id},
@@ -51,34 +53,36 @@ void AddProduct(const char* inGroup, const ProductRecord& inProduct, Facts& ioFa
                {"Alien", inProduct.alien},
                {"Process mode", inProduct.processMode},
                {"Preview", inProduct.preview}});
-  AddPlacement(*inProduct.position, ioFacts);
+  AddPlacement(inProduct.placement, ioFacts);
 }
 
 void AddRule(const RuleRecord& inRule, Facts& ioFacts) {
-  if (inRule.name.empty() && inRule.clearance.empty() && inRule.severity.empty() &&
+  if (inRule.name.empty() && inRule.clearance.text.empty() && inRule.severity.empty() &&
       inRule.penetrationCandidate.empty())
     return;
   ioFacts.AddGroup("Violated rule");
   ioFacts.Add({{"Name", inRule.name},
-               {"Clearance", inRule.clearance},
+               {"Clearance", inRule.clearance.text},
                {"Severity", inRule.severity},
                {"Penetration candidate", inRule.penetrationCandidate}});
 }
 
 void AddGeometry(const InterferenceRecord& inRecord, Facts& ioFacts) {
-  if (inRecord.curveLength.empty() && inRecord.distance.empty() && inRecord.points.empty()) return;
+  if (inRecord.curveLength.text.empty() && inRecord.distance.text.empty() &&
+      inRecord.points.empty())
+    return;
   ioFacts.AddGroup("Geometry");
-  ioFacts.Add("Curve length", inRecord.curveLength);
-  ioFacts.Add("Value", inRecord.distance);
-  for (const TextTriple& point : inRecord.points) ioFacts.Add("Point", Joined(point));
+  ioFacts.Add("Curve length", inRecord.curveLength.text);
+  ioFacts.Add("Value", inRecord.distance.text);
+  for (const NumberTriple& point : inRecord.points) ioFacts.Add("Point", Joined(point));
 }
 
 void AddViewpoint(const ViewpointRecord& inViewpoint, Facts& ioFacts) {
   ioFacts.AddGroup("Viewpoint");
   ioFacts.Add({{"Projection", inViewpoint.projection},
-               {"Focus distance", inViewpoint.focusDistance},
-               {"Near plane", inViewpoint.nearPlane},
-               {"Far plane", inViewpoint.farPlane}});
+               {"Focus distance", inViewpoint.focusDistance.text},
+               {"Near plane", inViewpoint.nearPlane.text},
+               {"Far plane", inViewpoint.farPlane.text}});
   ioFacts.Add("Point", Joined(inViewpoint.point));
   ioFacts.Add("Sight", Joined(inViewpoint.sight));
 }
@@ -88,8 +92,8 @@ void PrintText(const InterferenceRecord& inRecord, Output& ioOutput) {
               (inRecord.name.empty() ? "" : ": " + inRecord.name));
   facts.Add({{"Result", inRecord.result},
              {"Type", inRecord.type},
-             {"Value", inRecord.value},
-             {"Clearance", inRecord.clearance},
+             {"Value", inRecord.value.text},
+             {"Clearance", inRecord.clearance.text},
              {"Status", inRecord.status},
              {"Computation case", inRecord.computationCase},
              {"Retrieve", inRecord.retrieve},
@@ -105,9 +109,8 @@ void PrintText(const InterferenceRecord& inRecord, Output& ioOutput) {
 
 int Show(const ShowOptions& inOptions, Output& ioOutput) {
   ChooseLanguage(inOptions.language);
-  ClashResultFile file(inOptions.file);
-  const InterferenceRecord record =
-      ReadInterference(file, FindInterference(file, inOptions.number));
+  ClashDocument document(inOptions.file);
+  const InterferenceRecord record = ReadInterference(document, inOptions.number);
   if (inOptions.json)
     ioOutput.Write(JsonText(record) + "\n");
   else

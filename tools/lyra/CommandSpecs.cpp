@@ -6,6 +6,7 @@
 #include "lyra/Verbs.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 struct SpecsOptions {
@@ -32,7 +33,7 @@ void PrintTable(const std::vector<SpecificationRecord>& inSpecifications, Output
 }
 
 int Specs(const SpecsOptions& inOptions, Output& ioOutput) {
-  ClashResultFile file(inOptions.file);
+  ClashDocument file(inOptions.file);
   file.Require({DocumentKind::kClash, DocumentKind::kInterference, DocumentKind::kFederator},
                "specifications");
   const std::vector<SpecificationRecord> specifications = ReadSpecifications(file);

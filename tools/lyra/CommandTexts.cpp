@@ -5,10 +5,11 @@
 #include "BuildPath.h"
 #include "ZORLyraGeneralServices.h"
 #include "lyra/CommandErrors.h"
-#include "lyra/DocumentText.h"
 #include "lyra/Verbs.h"
+#include "toolkit/records/DocumentText.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 struct TextOptions {

@@ -3,15 +3,16 @@
 
 #include "ZORLyraGeneralServices.h"
 #include "lyra/CommandErrors.h"
-#include "lyra/DocumentText.h"
 #include "lyra/ModelFile.h"
 #include "lyra/ModelRecords.h"
 #include "lyra/ProductWalk.h"
 #include "lyra/RecordsJson.h"
 #include "lyra/Table.h"
 #include "lyra/Verbs.h"
+#include "toolkit/records/DocumentText.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 constexpr std::size_t kDrawnLevels = 40;  // deeper ones are numbered instead

@@ -7,6 +7,7 @@
 #include "lyra/SafeText.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 /// Letter case and the sign between two words do not matter.

@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "lyra/InterferenceRecord.h"
+#include "toolkit/records/InterferenceRecord.h"
 
 namespace lyra {
 
@@ -27,7 +27,7 @@ class ListFilter {
 
   /// Whether Accepts looks at the products' labels.
   bool NeedsLabels() const { return product_.has_value(); }
-  bool Accepts(const InterferenceRecord& inRecord) const;
+  bool Accepts(const ZORToolkit::InterferenceRecord& inRecord) const;
 
  private:
   std::vector<std::string> types_, statuses_;

@@ -5,9 +5,10 @@
 #include <cstdio>
 
 #include "default_platform/OpenModel.h"
-#include "lyra/DocumentText.h"
+#include "toolkit/records/DocumentText.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 constexpr double kDegreesPerRadian = 57.29577951308232;

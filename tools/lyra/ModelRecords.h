@@ -6,8 +6,8 @@
 #include <optional>
 #include <string>
 
-#include "lyra/InterferenceRecord.h"
 #include "platform/product_structure/ZORIProduct.h"
+#include "toolkit/records/InterferenceRecord.h"
 
 namespace lyra {
 
@@ -15,7 +15,7 @@ namespace lyra {
 struct ModelProductRecord {
   std::optional<std::string> path;  ///< below the root; only where it was asked for
   std::string alias, part;
-  Placement placement;                ///< in the root's space
+  ZORToolkit::Placement placement;    ///< in the root's space
   std::size_t triangles;              ///< of the product alone
   std::optional<std::string> colour;  ///< "#rrggbb"
 };
@@ -23,10 +23,10 @@ struct ModelProductRecord {
 ModelProductRecord ReadModelProduct(const ZORIProduct_var& inProduct);
 
 /// A place such as "12.5, 0, -3", in millimetres.
-std::string PositionShown(const Placement& inPlacement);
+std::string PositionShown(const ZORToolkit::Placement& inPlacement);
 /// How a placement turns, such as "90° about 0, 0, 1"; empty when it does not; "mirrored" or
 /// "scaled" when it does more.
-std::string TurnShown(const Placement& inPlacement);
+std::string TurnShown(const ZORToolkit::Placement& inPlacement);
 
 }  // namespace lyra
 

@@ -9,11 +9,12 @@
 #include "PrintPictures.h"
 #include "ZORLyraXMLServices.h"
 #include "lyra/CommandErrors.h"
-#include "lyra/DocumentText.h"
 #include "lyra/OptionWord.h"
 #include "platform/visualisation/ZOR3DViewpoint.h"
+#include "toolkit/records/DocumentText.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 constexpr int kLargestSize = 16384;

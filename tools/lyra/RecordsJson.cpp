@@ -5,12 +5,19 @@
 #include "lyra/SafeText.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 using Json = nlohmann::ordered_json;
 
-Json PlacementJson(const std::optional<Placement>& inPlacement) {
-  return inPlacement ? Json(*inPlacement) : Json(nullptr);
+Json TextsOf(const NumberTriple& inTriple) {
+  return {inTriple[0].text, inTriple[1].text, inTriple[2].text};
+}
+
+Json PointsJson(const std::vector<NumberTriple>& inPoints) {
+  Json array = Json::array();
+  for (const NumberTriple& point : inPoints) array.push_back(TextsOf(point));
+  return array;
 }
 
 Json ToJson(const ProductRecord& inProduct) {
@@ -23,14 +30,15 @@ Json ToJson(const ProductRecord& inProduct) {
           {"shape", inProduct.shape},
           {"shapeSource", inProduct.shapeSource},
           {"preview", inProduct.preview},
-          {"position", PlacementJson(inProduct.position)}};
+          {"position", inProduct.exists ? Json(inProduct.placement) : Json(nullptr)}};
 }
 
 Json ToJson(const std::optional<ViewpointRecord>& inViewpoint) {
   if (!inViewpoint) return nullptr;
-  return {{"projection", inViewpoint->projection}, {"focusDistance", inViewpoint->focusDistance},
-          {"near", inViewpoint->nearPlane},        {"far", inViewpoint->farPlane},
-          {"point", inViewpoint->point},           {"sight", inViewpoint->sight}};
+  return {
+      {"projection", inViewpoint->projection}, {"focusDistance", inViewpoint->focusDistance.text},
+      {"near", inViewpoint->nearPlane.text},   {"far", inViewpoint->farPlane.text},
+      {"point", TextsOf(inViewpoint->point)},  {"sight", TextsOf(inViewpoint->sight)}};
 }
 
 Json ToJson(const ComponentAttributeRecord& inAttribute) {
@@ -74,28 +82,28 @@ Json ToJson(const InterferenceRecord& inRecord) {
   return {{"index", inRecord.index},
           {"result", inRecord.result},
           {"name", inRecord.name},
-          {"value", inRecord.value},
+          {"value", inRecord.value.text},
           {"type", inRecord.type},
-          {"clearance", inRecord.clearance},
+          {"clearance", inRecord.clearance.text},
           {"status", inRecord.status},
           {"computationCase", inRecord.computationCase},
           {"retrieve", inRecord.retrieve},
           {"rule",
            {{"name", inRecord.rule.name},
-            {"clearance", inRecord.rule.clearance},
+            {"clearance", inRecord.rule.clearance.text},
             {"severity", inRecord.rule.severity},
             {"penetrationCandidate", inRecord.rule.penetrationCandidate}}},
           {"products", ArrayJson(inRecord.products)},
           {"comment", inRecord.comment},
           {"picture", inRecord.picture},
           {"geometry",
-           {{"curveLength", inRecord.curveLength},
-            {"value", inRecord.distance},
-            {"points", inRecord.points}}},
+           {{"curveLength", inRecord.curveLength.text},
+            {"value", inRecord.distance.text},
+            {"points", PointsJson(inRecord.points)}}},
           {"viewpoint", ToJson(inRecord.viewpoint)}};
 }
 
-Json ToJson(const GeneralRecord& inRecord) {
+Json ToJson(const DocumentRecord& inRecord) {
   Json json = {{"file", inRecord.file}, {"kind", RootName(inRecord.kind)}};
   if (inRecord.error) {
     json["error"] = {{"id", inRecord.error->id}, {"message", inRecord.error->message}};
@@ -126,7 +134,7 @@ Json ToJson(const ComponentRecord& inRecord) {
           {"attributes", ArrayJson(inRecord.attributes)},
           {"features", ArrayJson(inRecord.features)},
           {"shapes", ArrayJson(inRecord.shapes)},
-          {"placement", PlacementJson(inRecord.placement)}};
+          {"placement", inRecord.placement ? Json(*inRecord.placement) : Json(nullptr)}};
 }
 
 Json ToJson(const SpecificationRecord& inRecord) {
@@ -157,7 +165,7 @@ std::string LineOf(const Json& inValue) {
 }  // namespace
 
 std::string JsonText(const InterferenceRecord& inRecord) { return LineOf(ToJson(inRecord)); }
-std::string JsonText(const GeneralRecord& inRecord) { return LineOf(ToJson(inRecord)); }
+std::string JsonText(const DocumentRecord& inRecord) { return LineOf(ToJson(inRecord)); }
 std::string JsonText(const ComponentRecord& inRecord) { return LineOf(ToJson(inRecord)); }
 std::string JsonText(const SpecificationRecord& inRecord) { return LineOf(ToJson(inRecord)); }
 std::string JsonText(const LinkRecord& inRecord) { return LineOf(ToJson(inRecord)); }

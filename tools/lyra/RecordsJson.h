@@ -4,19 +4,19 @@
 
 #include <string>
 
-#include "lyra/DocumentRecords.h"
 #include "lyra/ModelRecords.h"
 #include "lyra/Output.h"
+#include "toolkit/records/DocumentRecords.h"
 
 namespace lyra {
 
 /// A record as one line of UTF-8 JSON, without line feed. Characters that could drive a terminal
 /// are escaped; bytes that are no UTF-8 become U+FFFD.
-std::string JsonText(const InterferenceRecord& inRecord);
-std::string JsonText(const GeneralRecord& inRecord);
-std::string JsonText(const ComponentRecord& inRecord);
-std::string JsonText(const SpecificationRecord& inRecord);
-std::string JsonText(const LinkRecord& inRecord);
+std::string JsonText(const ZORToolkit::InterferenceRecord& inRecord);
+std::string JsonText(const ZORToolkit::DocumentRecord& inRecord);
+std::string JsonText(const ZORToolkit::ComponentRecord& inRecord);
+std::string JsonText(const ZORToolkit::SpecificationRecord& inRecord);
+std::string JsonText(const ZORToolkit::LinkRecord& inRecord);
 std::string JsonText(const ModelProductRecord& inRecord);
 
 /// Writes a JSON array record by record, one a line, so that no more than one is in memory.

@@ -12,12 +12,13 @@
 #include <vector>
 
 #include "lyra/CommandErrors.h"
-#include "lyra/DocumentText.h"
 #include "platform/system/ZORFile.h"
+#include "toolkit/records/DocumentText.h"
 
 namespace fs = std::filesystem;
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 const char* ReasonOf(HRESULT inResult) {

@@ -7,9 +7,10 @@
 #include <cwctype>
 #include <vector>
 
-#include "lyra/DocumentText.h"
+#include "toolkit/records/DocumentText.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 bool IsAscii(std::string_view inText) {

@@ -149,8 +149,10 @@ void StoredViewpoint::Fill(ZOR3DViewpoint& outViewpoint) const {
 
 InterferenceElement::InterferenceElement(const DOM_Node& inInterference)
     : isClearance(IsClearance(inInterference)) {
-  ForEachChild(inInterference, "Product",
-               [&](const DOM_Node& inProduct) { products.push_back(inProduct); });
+  ForEachChild(inInterference, "Product", [&](const DOM_Node& inProduct) {
+    if (products.size() == 2) products.pop_back();
+    products.push_back(inProduct);
+  });
   DistinctPoints distinct(points);
   ForEachChild(inInterference, "GeometricAspect", [&](const DOM_Node& inAspect) {
     ForEachChild(inAspect, "Point", [&](const DOM_Node& inPoint) {

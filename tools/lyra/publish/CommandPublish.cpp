@@ -5,23 +5,25 @@
 #include <sstream>
 #include <thread>
 
+#include "ZORLyraXMLServices.h"
 #include "lyra/CommandErrors.h"
-#include "lyra/DocumentText.h"
 #include "lyra/Language.h"
 #include "lyra/ModelFile.h"
 #include "lyra/OptionWord.h"
 #include "lyra/ReplacedFile.h"
-#include "lyra/ReportWriter.h"
 #include "lyra/Verbs.h"
 #include "lyra/publish/OnlyFilter.h"
 #include "lyra/publish/PageLibrary.h"
 #include "lyra/publish/Publication.h"
 #include "platform/system/ZORSettingRepository.h"
 #include "platform/system/ZORSysSettingRepository.h"
+#include "toolkit/publishing/ReportWriter.h"
+#include "toolkit/records/DocumentText.h"
 
 namespace fs = std::filesystem;
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 constexpr char kReport[] = "report.xml";
@@ -160,14 +162,12 @@ void WriteFile(const std::string& inPath, const std::string& inBytes, Output& io
 }
 
 /// @return the report's bytes.
-std::string WriteReport(ClashResultFile& ioResult, const std::string& inStyleSheet,
+std::string WriteReport(ClashDocument& ioResult, const std::string& inStyleSheet,
                         const std::string& inPath, Output& ioOutput) {
-  ZORLyraXMLServices writer;
-  writer.WriteXMLHeaderTag(RootName(ioResult.Kind()), kReportType,
-                           AttributeValue(FromUtf8(inStyleSheet)));
-  WriteReportElement(ioResult.Root(), writer);
   ReplacedFile file(inPath);
-  file.Check(writer.DumpDocument(FromUtf8(file.TemporaryPath())));
+  Prologue prologue;
+  prologue.styleSheet = inStyleSheet;
+  file.Check(WriteReport(ioResult, prologue, file.TemporaryPath()));
   std::string bytes = ReadWhole(file.TemporaryPath());
   file.Finish(ioOutput);
   return bytes;
@@ -185,7 +185,7 @@ PageRequest RequestOf(const PublishOptions& inOptions, const OtherStyleSheet& in
 }
 
 void WriteAll(const PublishOptions& inOptions, const OtherStyleSheet& inSheet,
-              const Publication& inPublication, ClashResultFile& ioResult, Output& ioOutput) {
+              const Publication& inPublication, ClashDocument& ioResult, Output& ioOutput) {
   const PageLibrary library;
   const std::string folder = inOptions.directory + "/";
   PageRequest request = RequestOf(inOptions, inSheet, inPublication);
@@ -202,8 +202,8 @@ int Publish(const PublishOptions& inOptions, Output& ioOutput) {
   const ProductPlaces places = WeldPoints(inOptions);
   ProcessCount(inOptions);
   ChooseLanguage(inOptions.language);
-  ClashResultFile file(inOptions.file);
-  file.Require({DocumentKind::kClash, DocumentKind::kInterference}, "interferences");
+  ClashDocument file(inOptions.file);
+  file.RequireInterferences();
   const OtherStyleSheet sheet = ChosenStyleSheet(inOptions);
   Publication publication(file, filter, places);
   Drawn drawn;

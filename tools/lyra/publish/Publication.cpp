@@ -7,18 +7,20 @@
 
 #include "PrintPictures.h"
 #include "default_platform/OpenModel.h"
-#include "lyra/DocumentText.h"
-#include "lyra/InterferenceWalk.h"
 #include "lyra/RecordsJson.h"
 #include "lyra/SafeText.h"
 #include "lyra/publish/DrawingProgress.h"
 #include "lyra/publish/DrawingWorkers.h"
 #include "lyra/publish/ZoomSetting.h"
 #include "platform/visualisation/ZORIVisProperties.h"
+#include "toolkit/records/ClashDocumentEdit.h"
+#include "toolkit/records/DocumentText.h"
+#include "toolkit/records/InterferenceRecord.h"
 
 namespace fs = std::filesystem;
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
 constexpr char kPlainGrey[] = "#d2d2d2";  // of parts without a colour
@@ -36,15 +38,6 @@ void Warn(const std::string& inText) {
   std::fprintf(stderr, "lyra: warning: %s\n", Printable(inText).c_str());
 }
 
-/// The first and the last of the other products, which are those that a reader keeps.
-std::array<DOM_Node, 2> ProductsOf(const DOM_Node& inInterference) {
-  std::array<DOM_Node, 2> products;
-  ForEachElement(inInterference, "Product", [&](const DOM_Node& inProduct) {
-    (products[0].isNull() ? products[0] : products[1]) = inProduct;
-  });
-  return products;
-}
-
 ZORMathTransformation Transformation(const Placement& inPlacement) {
   const auto vector = [&](std::size_t inFirst) {
     return ZORMathVector(inPlacement[inFirst], inPlacement[inFirst + 1], inPlacement[inFirst + 2]);
@@ -57,27 +50,24 @@ ZORMathTransformation Transformation(const Placement& inPlacement) {
 
 std::optional<ZORDefault::ResultPlacements> PlacementsOf(const InterferenceRecord& inRecord) {
   const auto& [first, second] = inRecord.products;
-  if (!first.position || !second.position) return std::nullopt;
-  return ZORDefault::ResultPlacements{Transformation(*first.position),
-                                      Transformation(*second.position)};
+  if (!first.exists || !second.exists) return std::nullopt;
+  return ZORDefault::ResultPlacements{Transformation(first.placement),
+                                      Transformation(second.placement)};
 }
 
 /// A word that the reader could not understand is shown as the document has it.
-std::string ShownWord(const std::string& inWord, const DOM_Node& inElement, const char* inName) {
+std::string ShownWord(const std::string& inWord, const std::string& inAsWritten) {
   if (!inWord.empty() && CaseFolded(inWord) != "error") return inWord;
-  const std::string own = AttributeText(inElement, inName);
-  return own.empty() ? "Not stated" : own;
+  return inAsWritten.empty() ? "Not stated" : inAsWritten;
 }
 
-Entry MakeEntry(const PlacedInterference& inPlaced, const InterferenceRecord& inRecord,
-                ProductPlaces inPlaces) {
+Entry MakeEntry(const InterferenceRecord& inRecord, ProductPlaces inPlaces) {
   Entry entry;
-  entry.element = inPlaced.element;
-  entry.products = ProductsOf(inPlaced.element);
+  entry.record = inRecord;
   if (inPlaces == ProductPlaces::kResult) entry.placements = PlacementsOf(inRecord);
-  entry.facts.number = inPlaced.number;
-  entry.facts.type = ShownWord(inRecord.type, inPlaced.element, "ResultType");
-  entry.facts.status = ShownWord(inRecord.status, inPlaced.element, "Status");
+  entry.facts.number = inRecord.index;
+  entry.facts.type = ShownWord(inRecord.type, inRecord.typeAsWritten);
+  entry.facts.status = ShownWord(inRecord.status, inRecord.statusAsWritten);
   return entry;
 }
 
@@ -152,7 +142,8 @@ class EntryDrawing {
  public:
   EntryDrawing(const Entry& inEntry, const ZORIProduct_var& inRoot, const PictureStore& inStore,
                const PictureStyle& inStyle)
-      : scene_(ZORDefault::MakeInterferenceScene(inRoot, inEntry.element, inEntry.placements)),
+      : scene_(ZORDefault::MakeInterferenceScene(inRoot, inEntry.record.element.Element(),
+                                                 inEntry.placements)),
         number_(inEntry.facts.number),
         store_(inStore),
         style_(inStyle),
@@ -186,46 +177,17 @@ class EntryDrawing {
   ZORUnicodeString format_;
 };
 
-void ReferToPicture(ClashResultFile& ioResult, const Entry& inEntry) {
-  DOM_Node element = inEntry.element;
-  for (DOM_Node old = FirstElement(element, "Picture"); !old.isNull();
-       old = FirstElement(element, "Picture"))
-    element.removeChild(old);
-  if (inEntry.facts.picture.empty()) return;
-  DOM_Element picture = ioResult.Document().createElement("Picture");
-  picture.setAttribute("HRef", inEntry.facts.picture.c_str());
-  element.appendChild(picture);
-}
-
-void ReferToPreview(const DOM_Node& inProduct, const std::string& inPreview) {
-  DOM_Element product(inProduct);
-  if (inPreview.empty())
-    product.removeAttribute("Preview");
-  else
-    product.setAttribute("Preview", inPreview.c_str());
-}
-
-void RecountSets(ClashResultFile& ioResult) {
-  if (ioResult.Kind() != DocumentKind::kClash) return;
-  ForEachElement(ioResult.Root(), "ClashResult", [](const DOM_Node& inSet) {
-    int count = 0;
-    ForEachElement(inSet, "Interference", [&](const DOM_Node&) { ++count; });
-    DOM_Element(inSet).setAttribute("NbInterf", std::to_string(count).c_str());
-  });
-}
-
 }  // namespace
 
-Publication::Publication(ClashResultFile& ioResult, const ListFilter& inFilter,
+Publication::Publication(ClashDocument& ioResult, const ListFilter& inFilter,
                          ProductPlaces inPlaces)
     : hash_(0xcbf29ce484222325) {
-  ForEachInterference(ioResult, [&](const PlacedInterference& inPlaced) {
-    const InterferenceRecord record = ReadInterference(ioResult, inPlaced);
-    hash_ = Hashed(hash_, JsonText(record));
-    if (inFilter.Accepts(record))
-      entries_.push_back(MakeEntry(inPlaced, record, inPlaces));
+  ForEachInterference(ioResult, RecordPart::kAll, [&](const InterferenceRecord& inRecord) {
+    hash_ = Hashed(hash_, JsonText(inRecord));
+    if (inFilter.Accepts(inRecord))
+      entries_.push_back(MakeEntry(inRecord, inPlaces));
     else
-      others_.push_back(inPlaced.element);
+      others_.push_back(inRecord.element);
   });
 }
 
@@ -241,10 +203,10 @@ void Publication::LookUp(const ZORIProduct_var& inRoot) {
   std::string whyMovedBack;
   for (Entry& entry : entries_) {
     const ZORDefault::InterferenceScene scene =
-        ZORDefault::MakeInterferenceScene(inRoot, entry.element, entry.placements);
+        ZORDefault::MakeInterferenceScene(inRoot, entry.record.element.Element(), entry.placements);
     bool isComplete = true;
     for (std::size_t i = 0; i < 2; ++i) {
-      if (entry.products[i].isNull()) continue;
+      if (!entry.record.products[i].exists) continue;
       PublishedProduct& product = entry.facts.products[i];
       product.isMissing = scene.products[i].IsNull();
       if (product.isMissing) missing.insert(NameOf(scene.paths[i]));
@@ -269,7 +231,7 @@ void Publication::LookUp(const ZORIProduct_var& inRoot) {
 
 bool Publication::HasProduct(const Entry& inEntry) const {
   for (std::size_t i = 0; i < 2; ++i)
-    if (!inEntry.products[i].isNull() && !inEntry.facts.products[i].isMissing) return true;
+    if (inEntry.record.products[i].exists && !inEntry.facts.products[i].isMissing) return true;
   return false;
 }
 
@@ -316,14 +278,17 @@ std::size_t Publication::Draw(const ZORIProduct_var& inRoot, const PictureStore&
   return TakeReferences(inStore);
 }
 
-void Publication::Finish(ClashResultFile& ioResult) {
-  for (DOM_Node& other : others_) other.getParentNode().removeChild(other);
-  if (!others_.empty()) RecountSets(ioResult);
+void Publication::Finish(ClashDocument& ioResult) {
+  ClashDocumentEdit edit(ioResult);
+  for (const ElementHandle& other : others_) edit.Remove(other);
+  if (!others_.empty()) edit.RecountInterferences();
   for (const Entry& entry : entries_) {
-    ReferToPicture(ioResult, entry);
+    edit.SetPicture(entry.record.element, entry.facts.picture);
+    edit.RemovePreviews(entry.record.element);
     for (std::size_t i = 0; i < 2; ++i)
-      if (!entry.products[i].isNull())
-        ReferToPreview(entry.products[i], entry.facts.products[i].preview);
+      if (const ProductRecord& product = entry.record.products[i];
+          product.exists && !entry.facts.products[i].preview.empty())
+        edit.SetPreview(product.element, entry.facts.products[i].preview);
   }
 }
 

@@ -9,7 +9,7 @@
 #include <vector>
 
 #include "default_platform/InterferenceScene.h"
-#include "lyra/ClashResultFile.h"
+#include "toolkit/records/ClashDocument.h"
 #include "lyra/ListFilter.h"
 #include "lyra/Picture.h"
 #include "lyra/publish/PictureStore.h"
@@ -19,8 +19,7 @@ namespace lyra {
 
 /// An interference that is published.
 struct Entry {
-  DOM_Node element;
-  std::array<DOM_Node, 2> products;  // null for those that the document does not have
+  ZORToolkit::InterferenceRecord record;
   std::optional<ZORDefault::ResultPlacements> placements;
   PublishedInterference facts;
 };
@@ -39,7 +38,7 @@ struct PictureStyle {
 /// publication.
 class Publication {
  public:
-  Publication(ClashResultFile& ioResult, const ListFilter& inFilter, ProductPlaces inPlaces);
+  Publication(ZORToolkit::ClashDocument& ioResult, const ListFilter& inFilter, ProductPlaces inPlaces);
 
   const std::vector<Entry>& Entries() const { return entries_; }
   /// A number that differs when what the result says of any interference does.
@@ -52,14 +51,14 @@ class Publication {
   std::size_t Draw(const ZORIProduct_var& inRoot, const PictureStore& inStore,
                    const PictureStyle& inStyle, int inProcesses);
   /// Makes the document what is published.
-  void Finish(ClashResultFile& ioResult);
+  void Finish(ZORToolkit::ClashDocument& ioResult);
 
  private:
   bool HasProduct(const Entry& inEntry) const;
   std::size_t TakeReferences(const PictureStore& inStore);
 
   std::vector<Entry> entries_;
-  std::vector<DOM_Node> others_;
+  std::vector<ZORToolkit::ElementHandle> others_;
   std::uint64_t hash_;
 };
 

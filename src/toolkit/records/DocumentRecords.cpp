@@ -1,12 +1,12 @@
-#include "lyra/DocumentRecords.h"
+#include "toolkit/records/DocumentRecords.h"
 
 #include <algorithm>
 #include <climits>
 #include <memory>
 
-#include "lyra/DocumentText.h"
+#include "toolkit/records/ElementWalk.h"
 
-namespace lyra {
+namespace ZORToolkit {
 namespace {
 
 AttributeTexts AllAttributes(const DOM_Node& inElement) {
@@ -27,26 +27,14 @@ int DeclaredCount(const DOM_Node& inResultSet) {
   return declared < INT_MAX ? static_cast<int>(declared) : INT_MAX;
 }
 
-int CountElements(const DOM_Node& inParent, const char* inName) {
-  int count = 0;
-  ForEachElement(inParent, inName, [&](const DOM_Node&) { ++count; });
-  return count;
-}
-
-std::vector<ResultSetRecord> ReadResultSets(const ClashResultFile& inFile) {
+std::vector<ResultSetRecord> ReadResultSets(const ClashDocument& inDocument) {
   std::vector<ResultSetRecord> sets;
-  if (inFile.Kind() != DocumentKind::kClash) return sets;
-  ForEachElement(inFile.Root(), "ClashResult", [&](const DOM_Node& inSet) {
+  if (inDocument.Kind() != DocumentKind::kClash) return sets;
+  ForEachElement(inDocument.Root(), "ClashResult", [&](const DOM_Node& inSet) {
     sets.push_back({AttributeText(inSet, "Name"), AttributeText(inSet, "ComputationCase"),
                     DeclaredCount(inSet), CountElements(inSet, "Interference")});
   });
   return sets;
-}
-
-int CountInterferencesOfAnyKind(const ClashResultFile& inFile) {
-  const bool has =
-      inFile.Kind() == DocumentKind::kClash || inFile.Kind() == DocumentKind::kInterference;
-  return has ? CountInterferences(inFile) : 0;
 }
 
 bool IsFeature(const DOM_Node& inAttribute) {
@@ -99,12 +87,12 @@ std::optional<Placement> ReadPlacement(ZORClashParsing& ioReader, int inPosition
 
 }  // namespace
 
-GeneralRecord ReadGeneral(ClashResultFile& ioFile) {
-  GeneralRecord record;
-  record.file = ioFile.Name();
-  record.kind = ioFile.Kind();
-  record.version = ioFile.Version();
-  ZORClashParsing& reader = ioFile.Reader();
+DocumentRecord ReadDocument(ClashDocument& ioDocument) {
+  DocumentRecord record;
+  record.file = ioDocument.Name();
+  record.kind = ioDocument.Kind();
+  record.version = ioDocument.Version();
+  ZORClashParsing& reader = ioDocument.Reader();
 
   ZORUnicodeString version, reference, responsible;
   DOM_Node date, specification;
@@ -114,11 +102,11 @@ GeneralRecord ReadGeneral(ClashResultFile& ioFile) {
   record.responsible = Utf8(responsible);
   record.date = AllAttributes(date);
   record.specification = AllAttributes(specification);
-  record.results = ReadResultSets(ioFile);
-  record.interferences = CountInterferencesOfAnyKind(ioFile);
+  record.results = ReadResultSets(ioDocument);
+  record.interferences = ioDocument.HasInterferences() ? CountInterferences(ioDocument) : 0;
   reader.GetSpecInfos(record.specifications);
   if (record.kind == DocumentKind::kComponents)
-    record.components = CountElements(ioFile.Root(), nullptr);
+    record.components = CountElements(ioDocument.Root(), nullptr);
   record.links = CountElements(reader.GetElementsNode(), nullptr);
   record.serverMarker = Utf8(reader.GetServerMarker());
   record.transaction = Utf8(reader.GetTransaction());
@@ -133,12 +121,12 @@ GeneralRecord ReadGeneral(ClashResultFile& ioFile) {
   return record;
 }
 
-std::vector<ComponentRecord> ReadComponents(ClashResultFile& ioFile) {
+std::vector<ComponentRecord> ReadComponents(ClashDocument& ioDocument) {
   std::vector<ComponentRecord> components;
-  if (ioFile.Kind() != DocumentKind::kComponents) return components;
-  ZORClashParsing& reader = ioFile.Reader();
+  if (ioDocument.Kind() != DocumentKind::kComponents) return components;
+  ZORClashParsing& reader = ioDocument.Reader();
   int position = 0;
-  for (DOM_Node node = ioFile.Root().getFirstChild(); !node.isNull();
+  for (DOM_Node node = ioDocument.Root().getFirstChild(); !node.isNull();
        node = node.getNextSibling(), ++position) {
     if (node.getNodeType() != DOM_Node::ELEMENT_NODE) continue;
     ComponentRecord record;
@@ -157,14 +145,14 @@ std::vector<ComponentRecord> ReadComponents(ClashResultFile& ioFile) {
   return components;
 }
 
-std::vector<SpecificationRecord> ReadSpecifications(ClashResultFile& ioFile) {
+std::vector<SpecificationRecord> ReadSpecifications(ClashDocument& ioDocument) {
   std::vector<SpecificationRecord> specifications;
   int count = 0;
-  ioFile.Reader().GetSpecInfos(count);
+  ioDocument.Reader().GetSpecInfos(count);
   for (int i = 1; i <= count; ++i) {
     ZORUnicodeString alias[2], id[2], version[2], alien[2], shape[2];
-    ioFile.Reader().GetProductsInSpec(i, alias[0], alias[1], id[0], id[1], version[0], version[1],
-                                      alien[0], alien[1], shape[0], shape[1]);
+    ioDocument.Reader().GetProductsInSpec(i, alias[0], alias[1], id[0], id[1], version[0],
+                                          version[1], alien[0], alien[1], shape[0], shape[1]);
     SpecificationRecord record;
     record.index = i;
     for (std::size_t set = 0; set < 2; ++set)
@@ -175,9 +163,9 @@ std::vector<SpecificationRecord> ReadSpecifications(ClashResultFile& ioFile) {
   return specifications;
 }
 
-std::vector<LinkRecord> ReadLinks(ClashResultFile& ioFile) {
+std::vector<LinkRecord> ReadLinks(ClashDocument& ioDocument) {
   std::vector<LinkRecord> links;
-  ZORClashParsing& reader = ioFile.Reader();
+  ZORClashParsing& reader = ioDocument.Reader();
   ForEachElement(reader.GetElementsNode(), nullptr, [&](const DOM_Node& inElement) {
     ZORUnicodeString link, name[2], id[2], url[2];
     reader.GetAttOfLinkedElement(inElement, link, name[0], name[1], id[0], id[1], url[0], url[1]);
@@ -190,4 +178,4 @@ std::vector<LinkRecord> ReadLinks(ClashResultFile& ioFile) {
   return links;
 }
 
-}  // namespace lyra
+}  // namespace ZORToolkit

@@ -1,4 +1,4 @@
-#include "lyra/ReportWriter.h"
+#include "toolkit/publishing/ReportWriter.h"
 
 #include <algorithm>
 #include <span>
@@ -6,10 +6,14 @@
 
 #include "BuildPath.h"
 #include "ZORLyraGeneralServices.h"
+#include "ZORLyraXMLServices.h"
 #include "platform/xml/DOM_NamedNodeMap.h"
+#include "toolkit/records/DocumentText.h"
 
-namespace lyra {
+namespace ZORToolkit {
 namespace {
+
+constexpr char kDocumentType[] = "clash-report.dtd";
 
 using Names = std::span<const char* const>;
 
@@ -127,6 +131,23 @@ DOM_Node NextKnown(DOM_Node inNode, Names inNames) {
   return inNode;
 }
 
+// Every name that is written is one of the rules', so no depth of the document makes this deep.
+void WriteElement(const DOM_Node& inElement, ZORLyraXMLServices& ioWriter) {
+  const ElementRule* rule = RuleOf(inElement.getNodeName());
+  if (rule == nullptr) return;
+  ioWriter.InitXMLMarkerWithAttr(rule->name);
+  WriteAttributes(inElement, rule->attributes, ioWriter);
+  DOM_Node child = NextKnown(inElement.getFirstChild(), rule->children);
+  if (child.isNull()) {
+    ioWriter.CloseXMLAttrMarkerWithoutElem();
+    return;
+  }
+  ioWriter.CloseXMLAttrMarkerWithElem();
+  for (; !child.isNull(); child = NextKnown(child.getNextSibling(), rule->children))
+    WriteElement(child, ioWriter);
+  ioWriter.CloseXMLMarker(rule->name);
+}
+
 }  // namespace
 
 ZORUnicodeString AttributeValue(const ZORUnicodeString& inText) {
@@ -150,21 +171,19 @@ ZORUnicodeString AttributeValue(const ZORUnicodeString& inText) {
   return value;
 }
 
-// Every name that is written is one of the rules', so no depth of the document makes this deep.
-void WriteReportElement(const DOM_Node& inElement, ZORLyraXMLServices& ioWriter) {
-  const ElementRule* rule = RuleOf(inElement.getNodeName());
-  if (rule == nullptr) return;
-  ioWriter.InitXMLMarkerWithAttr(rule->name);
-  WriteAttributes(inElement, rule->attributes, ioWriter);
-  DOM_Node child = NextKnown(inElement.getFirstChild(), rule->children);
-  if (child.isNull()) {
-    ioWriter.CloseXMLAttrMarkerWithoutElem();
-    return;
-  }
-  ioWriter.CloseXMLAttrMarkerWithElem();
-  for (; !child.isNull(); child = NextKnown(child.getNextSibling(), rule->children))
-    WriteReportElement(child, ioWriter);
-  ioWriter.CloseXMLMarker(rule->name);
+HRESULT WriteReport(const ClashDocument& inDocument, const Prologue& inPrologue,
+                    const std::string& inPath) {
+  inDocument.RequireInterferences();
+  ZORLyraXMLServices writer;
+  const ZORUnicodeString styleSheet = inPrologue.styleSheet.empty()
+                                          ? writer.getStyleSheetFromSetting()
+                                          : FromUtf8(inPrologue.styleSheet);
+  writer.WriteXMLHeaderTag(
+      RootName(inDocument.Kind()),
+      inPrologue.dtd.empty() ? ZORUnicodeString(kDocumentType) : FromUtf8(inPrologue.dtd),
+      AttributeValue(styleSheet));
+  WriteElement(inDocument.Root(), writer);
+  return writer.DumpDocument(FromUtf8(inPath));
 }
 
-}  // namespace lyra
+}  // namespace ZORToolkit

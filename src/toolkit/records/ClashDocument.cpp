@@ -1,4 +1,4 @@
-#include "lyra/ClashResultFile.h"
+#include "toolkit/records/ClashDocument.h"
 
 #include <sys/stat.h>
 #include <unistd.h>
@@ -11,41 +11,40 @@
 #include <optional>
 #include <utility>
 
-#include "lyra/CommandErrors.h"
-#include "lyra/DocumentText.h"
 #include "platform/xml/ZORXMLParseError.h"
+#include "toolkit/records/ElementWalk.h"
 
-namespace lyra {
+namespace ZORToolkit {
 namespace {
 
-struct KindWords {
+struct KindName {
   DocumentKind kind;
   const char* rootName;
   const char* description;
 };
-constexpr KindWords kKinds[] = {
+constexpr KindName kKinds[] = {
     {DocumentKind::kClash, "ClashElement", "a clash document"},
     {DocumentKind::kInterference, "InterferenceElement", "a single-interference document"},
     {DocumentKind::kFederator, "FederatorClashElement", "a federator document"},
     {DocumentKind::kComponents, "Components", "a component list"},
     {DocumentKind::kErrors, "Errors", "an error report"}};
 
-const KindWords& WordsOf(DocumentKind inKind) {
+const KindName& WordsOf(DocumentKind inKind) {
   return *std::find_if(std::begin(kKinds), std::end(kKinds),
-                       [&](const KindWords& inWords) { return inWords.kind == inKind; });
+                       [&](const KindName& inWords) { return inWords.kind == inKind; });
 }
 
 [[noreturn]] void FailBySystem(const std::string& inName) {
-  throw InputError(inName + ": " + std::strerror(errno));
+  throw Error(inName + ": " + std::strerror(errno));
 }
 
-/// Raises InputError for what is no readable regular file: a pipe might never end, a device neither.
+/// Raises Error for what is no readable regular file: a pipe might never end, a device neither.
 void CheckRegularFile(const std::string& inPath) {
   struct stat status {};
   if (stat(inPath.c_str(), &status) != 0) FailBySystem(inPath);
-  if (S_ISDIR(status.st_mode)) throw InputError(inPath + ": is a directory");
+  if (S_ISDIR(status.st_mode)) throw Error(inPath + ": is a directory");
   if (!S_ISREG(status.st_mode))
-    throw InputError(inPath + ": is not a regular file (what a pipe carries is read as \"-\")");
+    throw Error(inPath + ": is not a regular file (what a pipe carries is read as \"-\")");
   if (access(inPath.c_str(), R_OK) != 0) FailBySystem(inPath);
 }
 
@@ -59,7 +58,7 @@ std::string ReadStandardInput() {
     if (count < 0) FailBySystem("-");
     if (count == 0) break;
     used += static_cast<std::size_t>(count);
-    if (used > INT_MAX) throw InputError("-: is larger than 2 GB");
+    if (used > INT_MAX) throw Error("-: is larger than 2 GB");
   }
   bytes.resize(used);
   return bytes;
@@ -77,7 +76,7 @@ std::string Place(const std::string& inName, const ZORXMLParseError& inError) {
 const char* RootName(DocumentKind inKind) { return WordsOf(inKind).rootName; }
 const char* Description(DocumentKind inKind) { return WordsOf(inKind).description; }
 
-ClashResultFile::ClashResultFile(const std::string& inPath) : name_(inPath) {
+ClashDocument::ClashDocument(const std::string& inPath) : name_(inPath) {
   if (inPath == "-") {
     bytes_ = ReadStandardInput();
     reader_ = std::make_unique<ZORClashParsing>(bytes_.data(), static_cast<int>(bytes_.size()));
@@ -88,46 +87,54 @@ ClashResultFile::ClashResultFile(const std::string& inPath) : name_(inPath) {
   Load();
 }
 
-ClashResultFile::ClashResultFile(const std::string& inName, std::string inBytes)
+ClashDocument::ClashDocument(const std::string& inName, std::string inBytes)
     : name_(inName),
       bytes_(std::move(inBytes)),
       reader_(std::make_unique<ZORClashParsing>(bytes_.data(), static_cast<int>(bytes_.size()))) {
   Load();
 }
 
-ClashResultFile::~ClashResultFile() = default;
+ClashDocument::~ClashDocument() = default;
 
-void ClashResultFile::Load() {
+bool ClashDocument::HasInterferences() const {
+  return kind_ == DocumentKind::kClash || kind_ == DocumentKind::kInterference;
+}
+
+void ClashDocument::RequireInterferences() const {
+  Require({DocumentKind::kClash, DocumentKind::kInterference}, "interferences");
+}
+
+void ClashDocument::Load() {
   ZORUnicodeString rootName;
   try {
     // This form of loading hands the tree out; a document without root shows by its missing root.
     reader_->LoadSequence(document_, rootName);
   } catch (const ZORXMLParseError& error) {
-    throw InputError(Place(name_, error) + " " + error.reason);
+    throw Error(Place(name_, error) + " " + error.reason);
   } catch (const std::bad_alloc&) {
-    throw InputError(name_ + ": there is not enough memory for this document");
+    throw Error(name_ + ": there is not enough memory for this document");
   }
   bytes_ = std::string();
-  if (Root().isNull()) throw InputError(name_ + ": the document is empty");
-  for (const KindWords& known : kKinds) {
+  if (Root().isNull()) throw Error(name_ + ": the document is empty");
+  for (const KindName& known : kKinds) {
     if (rootName != known.rootName) continue;
     kind_ = known.kind;
     return;
   }
-  throw InputError(name_ + ": is no clash result: its root element is \"" + Utf8(rootName) + "\"");
+  throw Error(name_ + ": is no clash result: its root element is \"" + Utf8(rootName) + "\"");
 }
 
-std::string ClashResultFile::Version() const {
+std::string ClashDocument::Version() const {
   if (kind_ == DocumentKind::kComponents || kind_ == DocumentKind::kErrors) return {};
   const std::string version = AttributeText(Root(), "Version");
   return version.empty() ? "1.1" : version;
 }
 
-void ClashResultFile::Require(std::initializer_list<DocumentKind> inKinds,
-                              const char* inContent) const {
+void ClashDocument::Require(std::initializer_list<DocumentKind> inKinds,
+                            const char* inContent) const {
   if (std::find(inKinds.begin(), inKinds.end(), kind_) != inKinds.end()) return;
-  throw InputError(name_ + ": " + Description(kind_) + " (\"" + RootName(kind_) + "\") has no " +
-                   inContent);
+  throw Error(name_ + ": " + Description(kind_) + " (\"" + RootName(kind_) + "\") has no " +
+              inContent);
 }
 
-}  // namespace lyra
+}  // namespace ZORToolkit

@@ -1,16 +1,15 @@
-#include "lyra/LinkedFiles.h"
+#include "toolkit/records/LinkedFiles.h"
 
 #include <algorithm>
 #include <filesystem>
 #include <set>
 
 #include "BuildPath.h"
-#include "lyra/CommandErrors.h"
-#include "lyra/DocumentText.h"
+#include "toolkit/records/DocumentText.h"
 
 namespace fs = std::filesystem;
 
-namespace lyra {
+namespace ZORToolkit {
 namespace {
 
 constexpr const char* kLogicalScheme = "ZORDLN://";
@@ -36,11 +35,10 @@ std::string WhatIsWrongWith(const std::string& inPath) {
   std::error_code ignored;
   if (!fs::exists(inPath, ignored)) return "missing";
   try {
-    const ClashResultFile file(inPath);
-    const bool isClash =
-        file.Kind() == DocumentKind::kClash || file.Kind() == DocumentKind::kInterference;
-    return isClash ? "" : std::string("wrong kind: ") + Description(file.Kind());
-  } catch (const InputError& error) {
+    const ClashDocument document(inPath);
+    return document.HasInterferences() ? ""
+                                       : std::string("wrong kind: ") + Description(document.Kind());
+  } catch (const Error& error) {
     const std::string reason = error.what();
     return "unreadable: " +
            (reason.starts_with(inPath) ? reason.substr(inPath.size() + 1) : reason);
@@ -82,4 +80,4 @@ std::vector<std::string> CheckLinks(const std::vector<LinkRecord>& inLinks,
   return problems;
 }
 
-}  // namespace lyra
+}  // namespace ZORToolkit

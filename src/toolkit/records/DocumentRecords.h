@@ -1,6 +1,6 @@
 // What a document says besides its interferences.
-#ifndef ZOR_TOOLS_LYRA_DOCUMENT_RECORDS_H
-#define ZOR_TOOLS_LYRA_DOCUMENT_RECORDS_H
+#ifndef ZOR_TOOLKIT_RECORDS_DOCUMENT_RECORDS_H
+#define ZOR_TOOLKIT_RECORDS_DOCUMENT_RECORDS_H
 
 #include <array>
 #include <optional>
@@ -8,10 +8,9 @@
 #include <utility>
 #include <vector>
 
-#include "lyra/ClashResultFile.h"
-#include "lyra/InterferenceRecord.h"
+#include "toolkit/records/InterferenceRecord.h"
 
-namespace lyra {
+namespace ZORToolkit {
 
 struct ResultSetRecord {
   std::string name, computationCase;
@@ -24,9 +23,11 @@ struct ErrorRecord {
   std::string message;
 };
 
-using AttributeTexts = std::vector<std::pair<std::string, std::string>>;
+/// Names and values.
+typedef std::vector<std::pair<std::string, std::string>> AttributeTexts;
 
-struct GeneralRecord {
+/// What a document says of itself as a whole.
+struct DocumentRecord {
   std::string file;
   DocumentKind kind = DocumentKind::kClash;
   std::string version, reference, responsible;
@@ -74,13 +75,13 @@ struct LinkRecord {
   std::optional<std::string> check = std::nullopt;  // what a check of the linked file said
 };
 
-GeneralRecord ReadGeneral(ClashResultFile& ioFile);
+ZOR_TOOLKIT_EXPORT DocumentRecord ReadDocument(ClashDocument& ioDocument);
 /// Empty for a document that is no component list.
-std::vector<ComponentRecord> ReadComponents(ClashResultFile& ioFile);
-std::vector<SpecificationRecord> ReadSpecifications(ClashResultFile& ioFile);
+ZOR_TOOLKIT_EXPORT std::vector<ComponentRecord> ReadComponents(ClashDocument& ioDocument);
+ZOR_TOOLKIT_EXPORT std::vector<SpecificationRecord> ReadSpecifications(ClashDocument& ioDocument);
 /// Empty for a document that is no federator document.
-std::vector<LinkRecord> ReadLinks(ClashResultFile& ioFile);
+ZOR_TOOLKIT_EXPORT std::vector<LinkRecord> ReadLinks(ClashDocument& ioDocument);
 
-}  // namespace lyra
+}  // namespace ZORToolkit
 
 #endif
