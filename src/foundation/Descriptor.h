@@ -32,7 +32,8 @@ class Descriptor {
 
   bool IsOpen() const { return descriptor_ >= 0; }
   int Get() const { return descriptor_; }
-  int Close() { return IsOpen() ? CloseDescriptor(std::exchange(descriptor_, -1)) : 0; }
+  int Release() { return std::exchange(descriptor_, -1); }
+  int Close() { return IsOpen() ? CloseDescriptor(Release()) : 0; }
 
  private:
   int descriptor_;

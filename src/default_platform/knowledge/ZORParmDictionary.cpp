@@ -14,7 +14,6 @@
 #include <utility>
 
 #include "default_platform/system/CLocale.h"
-#include "default_platform/system/ClassIdentifier.h"
 
 namespace {
 
@@ -144,40 +143,24 @@ std::optional<double> ReadQuantity(const ZORUnicodeString& inText, const std::st
 
 // ---- components
 
-constexpr const char* kUnitName = "ZORICkeUnit";
-constexpr const char* kMagnitudeName = "ZORICkeMagnitude";
-
 // A component that is seen through one interface besides the base.
 template <class Interface>
 class Component : public Interface {
  public:
-  explicit Component(const char* inInterfaceName) : interfaceName_(inInterfaceName) {}
-
+  using ZORBaseUnknown::QueryInterface;
   HRESULT QueryInterface(const IID& inInterface, void** outInterface) override {
     if (inInterface != Interface::ClassId())
       return ZORBaseUnknown::QueryInterface(inInterface, outInterface);
-    return Give(outInterface);
-  }
-  HRESULT QueryInterface(const char* inInterfaceName, void** outInterface) override {
-    if (!inInterfaceName || std::strcmp(inInterfaceName, interfaceName_) != 0)
-      return ZORBaseUnknown::QueryInterface(inInterfaceName, outInterface);
-    return Give(outInterface);
-  }
-
- private:
-  HRESULT Give(void** outInterface) {
     if (!outInterface) return E_INVALIDARG;
     this->AddRef();
     *outInterface = static_cast<Interface*>(this);
     return S_OK;
   }
-
-  const char* const interfaceName_;
 };
 
 class StorageUnit final : public Component<ZORICkeUnit> {
  public:
-  explicit StorageUnit(const char* inBase) : Component(kUnitName), base_(inBase) {}
+  explicit StorageUnit(const char* inBase) : base_(inBase) {}
 
   ZORCke::Boolean Decode(const ZORUnicodeString& inText, double& outValue) const override {
     const auto value = ReadQuantity(inText, base_);
@@ -193,7 +176,7 @@ class StorageUnit final : public Component<ZORICkeUnit> {
 class Magnitude final : public Component<ZORICkeMagnitude> {
  public:
   Magnitude(const char* inName, const char* inBase)
-      : Component(kMagnitudeName), name_(inName), unit_(new StorageUnit(inBase)) {
+      : name_(inName), unit_(new StorageUnit(inBase)) {
     unit_->Release();  // the handle holds it now
   }
 
@@ -216,16 +199,6 @@ const auto& Magnitudes() {
 }
 
 }  // namespace
-
-const IID& ZORICkeUnit::ClassId() {
-  static const IID identifier = ZORDefault::IdentifierOfName(kUnitName);
-  return identifier;
-}
-
-const IID& ZORICkeMagnitude::ClassId() {
-  static const IID identifier = ZORDefault::IdentifierOfName(kMagnitudeName);
-  return identifier;
-}
 
 ZORICkeMagnitude_var ZORParmDictionary::FindMagnitude(const ZORUnicodeString& inName) {
   const auto found = Magnitudes().find(inName.ConvertToChar());

@@ -1,16 +1,12 @@
 #include "default_platform/product_structure/ModelCache.h"
 
-#define XXH_INLINE_ALL
-#include <xxhash.h>
-
-#include <cstdio>
 #include <cstring>
 #include <filesystem>
-#include <fstream>
-#include <random>
 
 #include "default_platform/product_structure/ModelData.h"
-#include "default_platform/system/SystemFiles.h"
+#include "foundation/AtomicFile.h"
+#include "foundation/Hash.h"
+#include "foundation/ReadWholeFile.h"
 #include "platform/system/ZORGetEnv.h"
 
 namespace ZORDefault {
@@ -35,31 +31,26 @@ std::string CacheDirectory() {
 
 /// The hash of the model's bytes and of all else that decides what is read.
 std::string EntryName(std::string_view inBytes, const ModelRequest& inRequest) {
-  char recipe[96];
-  std::snprintf(recipe, sizeof recipe, "%u %d %.17g %zu", kModelCodecVersion,
-                static_cast<int>(inRequest.format), inRequest.deflection, inBytes.size());
-  const XXH128_hash_t bytes = XXH3_128bits(inBytes.data(), inBytes.size());
-  const XXH128_hash_t hash = XXH3_128bits_withSeed(recipe, std::strlen(recipe), bytes.low64);
-  char name[64];
-  std::snprintf(name, sizeof name, "%016llx%016llx.model",
-                static_cast<unsigned long long>(hash.high64 ^ bytes.high64),
-                static_cast<unsigned long long>(hash.low64 ^ bytes.low64));
-  return name;
+  ZORFoundation::Hash128 hash;
+  hash.Add(std::uint64_t{kModelCodecVersion});
+  hash.Add(static_cast<std::uint64_t>(inRequest.format));
+  hash.Add(inRequest.deflection);
+  hash.AddText(inBytes);
+  return ZORFoundation::HexText(hash.Get()) + ".model";
 }
 
 std::uint64_t HashOfFiles(const std::string& inFolder, const std::vector<std::string>& inFiles) {
-  std::uint64_t hash = 0;
-  for (const std::string& file : inFiles) {
-    std::string content;
-    FileStamp stamp;
-    const bool isThere = ReadFile((fs::path(inFolder) / file).string(), content, stamp);
-    hash = XXH3_64bits_withSeed(content.data(), content.size(), hash + (isThere ? 1 : 2));
+  ZORFoundation::Hash64 hash;
+  for (const std::string& name : inFiles) {
+    const auto file = ZORFoundation::TryReadWholeFile((fs::path(inFolder) / name).string());
+    hash.Add(std::uint64_t{file.has_value()});
+    hash.AddText(file ? file->bytes : std::string());
   }
-  return hash;
+  return hash.Get();
 }
 
 std::uint64_t ChecksumOf(std::string_view inModel, std::uint64_t inReferencedFiles) {
-  return XXH3_64bits_withSeed(inModel.data(), inModel.size(), inReferencedFiles);
+  return ZORFoundation::Hash64Of(inModel, inReferencedFiles);
 }
 
 bool IsWholeEntry(const std::string& inEntry, EntryHeader& outHeader) {
@@ -72,18 +63,19 @@ bool IsWholeEntry(const std::string& inEntry, EntryHeader& outHeader) {
          outHeader.checksum == ChecksumOf(model, outHeader.referencedFiles);
 }
 
-/// Writes beside the place and renames, so that other processes see the old entry or the new one.
+/// Other processes see the old entry or the new one. It is checked when it is read, so it need not
+/// be on the disk yet.
 void WriteEntry(const std::string& inPath, const EntryHeader& inHeader,
                 const std::string& inModel) {
-  std::error_code error;
-  fs::create_directories(fs::path(inPath).parent_path(), error);
-  const std::string besides = inPath + "." + std::to_string(std::random_device()()) + ".tmp";
-  std::ofstream file(besides, std::ios::binary);
-  file.write(reinterpret_cast<const char*>(&inHeader), sizeof inHeader);
-  file.write(inModel.data(), static_cast<std::streamsize>(inModel.size()));
-  file.close();
-  if (file) fs::rename(besides, inPath, error);
-  if (!file || error) fs::remove(besides, error);
+  try {
+    fs::create_directories(fs::path(inPath).parent_path());
+    ZORFoundation::AtomicFile file(inPath, {.isSynchronised = false});
+    file.Write({reinterpret_cast<const char*>(&inHeader), sizeof inHeader});
+    file.Write(inModel);
+    file.Commit();
+  } catch (const std::runtime_error&) {
+    // A model that is not kept is read again.
+  }
 }
 
 }  // namespace
@@ -94,9 +86,9 @@ ModelCache::ModelCache(std::string_view inBytes, const ModelRequest& inRequest)
 }
 
 ModelCache::Finding ModelCache::Load(ModelData& outModel) const {
-  std::string entry;
-  FileStamp stamp;
-  if (path_.empty() || !ReadFile(path_, entry, stamp)) return Finding::kNone;
+  const auto file = ZORFoundation::TryReadWholeFile(path_);
+  if (!file) return Finding::kNone;
+  const std::string& entry = file->bytes;
   EntryHeader header;
   ModelData model;
   if (!IsWholeEntry(entry, header) ||

@@ -4,7 +4,7 @@
 #include <map>
 #include <set>
 
-#include "default_platform/system/Utf8.h"
+#include "foundation/Utf8.h"
 #include "platform/system/ZORUnicodeChar.h"
 
 namespace ZORDefault {
@@ -22,8 +22,8 @@ bool IsXmlUnit(char16_t inUnit) {
 }
 
 bool IsPairAt(const std::u16string& inText, std::size_t inPosition) {
-  return inPosition + 1 < inText.size() && IsHighSurrogate(inText[inPosition]) &&
-         IsLowSurrogate(inText[inPosition + 1]);
+  return inPosition + 1 < inText.size() && ZORFoundation::IsHighSurrogate(inText[inPosition]) &&
+         ZORFoundation::IsLowSurrogate(inText[inPosition + 1]);
 }
 
 std::u16string NameOf(const ModelData& inModel, const ModelProduct& inProduct,
@@ -118,8 +118,9 @@ std::u16string ReplaceInvalidXmlChars(std::u16string inText) {
   for (std::size_t i = 0; i < inText.size(); ++i) {
     if (IsPairAt(inText, i)) {
       ++i;
-    } else if (!IsXmlUnit(inText[i]) || IsHighSurrogate(inText[i]) || IsLowSurrogate(inText[i])) {
-      inText[i] = kReplacementCharacter;
+    } else if (!IsXmlUnit(inText[i]) || ZORFoundation::IsHighSurrogate(inText[i]) ||
+               ZORFoundation::IsLowSurrogate(inText[i])) {
+      inText[i] = ZORFoundation::kReplacementCharacter;
     }
   }
   return inText;

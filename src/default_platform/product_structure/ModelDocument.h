@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "default_platform/product_structure/Facet.h"
+#include "default_platform/system/InterfaceRegistry.h"
 #include "default_platform/product_structure/ModelData.h"
 #include "default_platform/product_structure/Product.h"
 #include "default_platform/system/ObjectCounters.h"

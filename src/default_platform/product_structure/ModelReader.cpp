@@ -2,14 +2,15 @@
 
 #include <mutex>
 
-#include "default_platform/NeighbourLibrary.h"
+#include "foundation/PluginLoader.h"
 
 namespace ZORDefault {
 namespace {
 
 ReadModelFunction* LoadReader(std::string& outReason) {
   std::string reason;
-  void* const function = FindInNeighbourLibrary("libZORModelReader.so", kReadModelName, reason);
+  void* const function =
+      ZORFoundation::FindPluginFunction("libZORModelReader.so", kReadModelName, reason);
   if (function == nullptr) outReason = "cannot be read without the model reader: " + reason;
   return reinterpret_cast<ReadModelFunction*>(function);
 }

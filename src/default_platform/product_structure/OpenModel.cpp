@@ -1,5 +1,6 @@
 #include "default_platform/OpenModel.h"
 
+#include <cerrno>
 #include <cmath>
 #include <filesystem>
 
@@ -7,7 +8,7 @@
 #include "default_platform/product_structure/ModelDocument.h"
 #include "default_platform/product_structure/ModelFormat.h"
 #include "default_platform/product_structure/ModelReader.h"
-#include "default_platform/system/SystemFiles.h"
+#include "foundation/ReadWholeFile.h"
 
 namespace ZORDefault {
 namespace {
@@ -15,14 +16,16 @@ namespace {
 constexpr double kMaxDeflection = 0.1;
 
 std::string ReadBytes(const std::string& inPath) {
-  std::error_code error;
-  if (!std::filesystem::exists(inPath, error)) throw ModelError(inPath, "does not exist");
-  if (std::filesystem::is_directory(inPath, error)) throw ModelError(inPath, "is a directory");
-  std::string bytes;
-  FileStamp stamp;
-  if (!ReadFile(inPath, bytes, stamp)) throw ModelError(inPath, "cannot be read");
-  if (bytes.empty()) throw ModelError(inPath, "is empty");
-  return bytes;
+  try {
+    std::string bytes = ZORFoundation::ReadWholeFile(inPath).bytes;
+    if (bytes.empty()) throw ModelError(inPath, "is empty");
+    return bytes;
+  } catch (const ZORFoundation::FileError& error) {
+    const bool isMissing = error.Code() == ENOENT, isFolder = error.Code() == EISDIR;
+    throw ModelError(inPath, isMissing  ? "does not exist"
+                             : isFolder ? "is a directory"
+                                        : "cannot be read");
+  }
 }
 
 ModelFormat CheckedFormat(const std::string& inPath, const std::string& inBytes) {

@@ -53,7 +53,7 @@ Product* FindBelow(const Product& inParent, const ZORUnicodeString& inPath) {
 }  // namespace
 
 const IID& ProductIdentity::ClassId() {
-  static const IID& identifier = RegisteredInterface("ZORProductIdentity");
+  static const IID& identifier = RegisterInterface("ZORProductIdentity", "ProductStructure");
   return identifier;
 }
 
@@ -172,7 +172,7 @@ void Product::SetProperties(const ZORVisPropertiesValues& inValues) {
 }
 
 ZORListValZORBaseUnknown_var* Product::ProductFacet::GetChildren(const char* inInterfaceName) {
-  const IID* const wanted = FindInterfaceByName(inInterfaceName);
+  const IID* const wanted = FindInterface(inInterfaceName);
   if (!wanted) return nullptr;
   auto* const list = new ZORListValZORBaseUnknown_var();
   for (Product* const child : self_.children_)

@@ -5,7 +5,7 @@
 #include <vector>
 
 #include "default_platform/OpenModel.h"
-#include "default_platform/product_structure/Facet.h"
+#include "default_platform/system/InterfaceRegistry.h"
 #include "default_platform/product_structure/ModelData.h"
 #include "default_platform/system/ObjectCounters.h"
 #include "platform/product_structure/ZORIAlias.h"

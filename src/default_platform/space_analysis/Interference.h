@@ -6,7 +6,7 @@
 #include <optional>
 #include <vector>
 
-#include "default_platform/product_structure/Facet.h"
+#include "default_platform/system/InterfaceRegistry.h"
 #include "default_platform/space_analysis/InterferenceElement.h"
 #include "default_platform/space_analysis/InterferenceRep.h"
 #include "default_platform/space_analysis/ViewChoice.h"

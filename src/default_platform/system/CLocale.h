@@ -10,12 +10,16 @@ namespace ZORDefault {
 /// decimal separator is the point, whatever the application chose. Other threads are not touched.
 class CLocaleScope {
  public:
-  CLocaleScope();
-  ~CLocaleScope();
+  CLocaleScope() : previous_(uselocale(CLocale())) {}
+  ~CLocaleScope() { uselocale(previous_); }
   CLocaleScope(const CLocaleScope&) = delete;
   CLocaleScope& operator=(const CLocaleScope&) = delete;
 
  private:
+  static locale_t CLocale() {
+    static const locale_t locale = newlocale(LC_ALL_MASK, "C", nullptr);
+    return locale;
+  }
   locale_t previous_;
 };
 

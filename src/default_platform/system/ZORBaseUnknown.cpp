@@ -1,6 +1,12 @@
 #include "platform/system/ZORBaseUnknown.h"
 
-#include <cstring>
+#include <map>
+#include <mutex>
+#include <string>
+
+#include "default_platform/system/InterfaceRegistry.h"
+#include "default_platform/system/ObjectCounters.h"
+#include "platform/system/ZORErrors.h"
 
 ZORBaseUnknown::ZORBaseUnknown() : referenceCount_(1), implementation_(nullptr) {}
 
@@ -19,13 +25,12 @@ HRESULT ZORBaseUnknown::QueryInterface(const IID& inInterface, void** outInterfa
   return S_OK;
 }
 
+// Identifiers are made from names, so whoever offers an interface by the one offers it by the other.
 HRESULT ZORBaseUnknown::QueryInterface(const char* inInterfaceName, void** outInterface) {
-  if (!outInterface) return E_INVALIDARG;
-  *outInterface = nullptr;
-  if (!inInterfaceName || std::strcmp(inInterfaceName, ClassName()) != 0) return E_NOINTERFACE;
-  AddRef();
-  *outInterface = this;
-  return S_OK;
+  if (inInterfaceName)
+    return QueryInterface(ZORDefault::IdentifierOfName(inInterfaceName), outInterface);
+  if (outInterface) *outInterface = nullptr;
+  return outInterface ? E_NOINTERFACE : E_INVALIDARG;
 }
 
 unsigned int ZORBaseUnknown::AddRef() { return ++referenceCount_; }
@@ -79,3 +84,31 @@ ZORMetaClass* ZORBaseUnknown::MetaObject() {
 
 const char* ZORBaseUnknown::ClassName() { return MetaObject()->IsA(); }
 const IID& ZORBaseUnknown::ClassId() { return MetaObject()->GetClassId(); }
+
+// The errors' destructors are here so that each error has one type identity for every library that
+// catches it.
+ZORFatalError::ZORFatalError(const std::string& inMessage) : std::runtime_error(inMessage) {}
+ZORFatalError::~ZORFatalError() = default;
+
+ZORNullVarError::ZORNullVarError()
+    : std::runtime_error("ThrowErrorNullVar: a call through a null interface handle") {}
+ZORNullVarError::~ZORNullVarError() = default;
+
+void ThrowErrorNullVar() { throw ZORNullVarError(); }
+
+namespace ZORDefault {
+
+ObjectCounter& CounterOf(const char* inClassName) {
+  // Never destroyed: objects are released until the very end of the process.
+  static auto* const counters = new std::map<std::string, ObjectCounter, std::less<>>();
+  static std::mutex mutex;
+  const std::lock_guard lock(mutex);
+  return (*counters)[inClassName];
+}
+
+ObjectCounts CountsOf(const char* inClassName) {
+  const ObjectCounter& counter = CounterOf(inClassName);
+  return {counter.built, counter.released};
+}
+
+}  // namespace ZORDefault

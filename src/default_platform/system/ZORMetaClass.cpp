@@ -4,7 +4,7 @@
 #include <mutex>
 #include <string_view>
 
-#include "default_platform/system/ClassIdentifier.h"
+#include "default_platform/system/InterfaceRegistry.h"
 
 /// All meta-classes of the process, by class name. Never destroyed: classes keep pointers to theirs
 /// until the very end.
@@ -32,6 +32,13 @@ class ZORMetaClassRegistry {
     return classes_[made->name_] = made;
   }
 
+  /// @return null for an unknown name.
+  ZORMetaClass* Find(std::string_view inName) {
+    const std::lock_guard lock(mutex_);
+    const auto known = classes_.find(inName);
+    return known == classes_.end() ? nullptr : known->second;
+  }
+
  private:
   std::mutex mutex_;
   std::map<std::string, ZORMetaClass*, std::less<>> classes_;
@@ -50,6 +57,13 @@ int ZORMetaClass::IsAKindOf(const char* inClassName) const {
   for (const ZORMetaClass* meta = this; meta; meta = meta->base_)
     if (meta->name_ == inClassName) return 1;
   return 0;
+}
+
+const IID* ZORDefault::FindInterface(const char* inName) {
+  const ZORMetaClass* const meta = inName ? ZORMetaClassRegistry::Instance().Find(inName) : nullptr;
+  const bool isInterface =
+      meta == ZORBaseUnknown::MetaObject() || (meta && meta->GetTypeOfClass() == kZORTypeInterface);
+  return isInterface ? &meta->GetClassId() : nullptr;
 }
 
 ZORMetaClass* fct_RetrieveMetaObject(const char* inClassName, ZORTypeOfClass inType,

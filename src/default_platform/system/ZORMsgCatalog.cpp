@@ -4,16 +4,22 @@
 #include <string>
 #include <string_view>
 
-#include "default_platform/system/FileCache.h"
-#include "default_platform/system/SearchPath.h"
-#include "default_platform/system/TomlTable.h"
+#include "default_platform/system/TomlFiles.h"
 #include "platform/system/ZORGetEnv.h"
+#include "platform/system/ZORMsg.h"
 
 struct ZORMsgCatalog::Messages {
   std::map<std::string, ZORMsg, std::less<>> byKey;
 };
 
 namespace {
+
+bool HasSlash(const ZORUnicodeString& inText) {
+  const ZORUC2Bytes* const units = inText.ConvertToUCChar();
+  for (int i = 0; i < inText.GetLengthInChar(); ++i)
+    if (units[i] == u'/') return true;
+  return false;
+}
 
 using ZORDefault::FileCache;
 using Messages = ZORMsgCatalog::Messages;
@@ -54,14 +60,39 @@ std::string UserLanguage() {
 MessagesPointer FindMessages(const char* inName) {
   if (!inName) return nullptr;
   const std::vector<std::string> directories = ZORDefault::CatalogueDirectories();
-  ZORDefault::FoundFile file;
-  if (!ZORDefault::FindToml(directories, UserLanguage() + "/", inName, file) &&
-      !ZORDefault::FindToml(directories, "en/", inName, file))
-    return nullptr;
-  return CatalogueFiles().Get(file.path, file.stamp);
+  auto file = ZORDefault::FindToml(directories, UserLanguage() + "/", inName);
+  if (!file) file = ZORDefault::FindToml(directories, "en/", inName);
+  return CatalogueFiles().Get(file);
 }
 
 }  // namespace
+
+ZORMsg::ZORMsg() = default;
+
+ZORMsg::ZORMsg(const ZORUnicodeString& inText) : text_(inText), isPlain_(!HasSlash(inText)) {}
+
+ZORUnicodeString ZORMsg::BuildMessage(const ZORUnicodeString* inParameters, int inCount) const {
+  if (isPlain_) return text_;
+  const ZORUC2Bytes* const units = text_.ConvertToUCChar();
+  const int length = text_.GetLengthInChar();
+  const auto unitAt = [&](int inPosition) {
+    return inPosition < length ? units[inPosition] : u'\0';
+  };
+  ZORUnicodeString message;
+  for (int i = 0; i < length; ++i) {
+    const ZORUC2Bytes place = unitAt(i + 2);
+    if (units[i] == u'/' && unitAt(i + 1) == u'/') {
+      message.AppendUTF16(u"/", 1);
+      i += 1;
+    } else if (units[i] == u'/' && unitAt(i + 1) == u'p' && place >= u'1' && place <= u'9') {
+      if (inParameters && place - u'1' < inCount) message += inParameters[place - u'1'];
+      i += 2;
+    } else {
+      message.AppendUTF16(units + i, 1);
+    }
+  }
+  return message;
+}
 
 ZORMsgCatalog::ZORMsgCatalog() = default;
 ZORMsgCatalog::~ZORMsgCatalog() = default;

@@ -5,7 +5,8 @@
 #include <string_view>
 #include <utility>
 
-#include "default_platform/system/Utf8.h"
+#include "foundation/Utf8.h"
+#include "platform/system/ZORToken.h"
 
 namespace {
 
@@ -89,7 +90,7 @@ void ZORUnicodeString::BuildFromUTF8(const char* inBytes, std::size_t inCount) {
   // The bytes may be this string's own narrow form, so that is let go last.
   units_.resize(inBytes ? inCount : 0);
   if (!units_.empty())
-    units_.resize(ZORDefault::DecodeUtf8(std::string_view(inBytes, inCount), units_.data()));
+    units_.resize(ZORFoundation::DecodeUtf8(std::string_view(inBytes, inCount), units_.data()));
   narrow_.reset();
 }
 
@@ -174,8 +175,8 @@ const ZORUC2Bytes* ZORUnicodeString::ConvertToUCChar() const {
 const char* ZORUnicodeString::ConvertToChar() const {
   if (units_.empty()) return "";
   if (!narrow_) {
-    auto narrow = std::make_unique<std::string>(ZORDefault::Utf8Length(units_), '\0');
-    ZORDefault::EncodeUtf8(units_, narrow->data());
+    auto narrow = std::make_unique<std::string>(ZORFoundation::Utf8Length(units_), '\0');
+    ZORFoundation::EncodeUtf8(units_, narrow->data());
     narrow_ = std::move(narrow);
   }
   return narrow_->c_str();
@@ -188,7 +189,7 @@ ZORString ZORUnicodeString::ConvertToString() const {
 
 HRESULT ZORUnicodeString::ConvertToUTF8(char* outBytes, std::size_t* outCount) const {
   if (!outBytes || !outCount) return E_INVALIDARG;
-  *outCount = ZORDefault::EncodeUtf8(units_, outBytes);
+  *outCount = ZORFoundation::EncodeUtf8(units_, outBytes);
   return S_OK;
 }
 
@@ -198,7 +199,7 @@ HRESULT ZORUnicodeString::ConvertToWChar(wchar_t* outWide) const {
     for (const char16_t unit : units_) *outWide++ = static_cast<wchar_t>(unit);
   } else {
     for (std::size_t position = 0; position < units_.size();)
-      *outWide++ = static_cast<wchar_t>(ZORDefault::NextCharacter(units_, position));
+      *outWide++ = static_cast<wchar_t>(ZORFoundation::NextCharacter(units_, position));
   }
   *outWide = L'\0';
   return S_OK;
@@ -231,4 +232,26 @@ ZORUnicodeString operator+(const ZORUnicodeString& inA, const ZORUnicodeString& 
 
 ZORUnicodeString operator+(const ZORUnicodeString& inA, const char* inB) {
   return inA + ZORUnicodeString(inB);
+}
+
+namespace {
+
+std::u16string_view UnitsOf(const ZORUnicodeString& inText) {
+  return {inText.ConvertToUCChar(), static_cast<std::size_t>(inText.GetLengthInChar())};
+}
+
+}  // namespace
+
+ZORToken::ZORToken(const ZORUnicodeString& inText) : text_(inText) {}
+
+ZORUnicodeString ZORToken::GetNextToken(const ZORUnicodeString& inSeparators) {
+  const std::u16string_view text = UnitsOf(text_);
+  const std::u16string_view separators = UnitsOf(inSeparators);
+  const std::size_t begin = std::min(
+      text.find_first_not_of(separators, static_cast<std::size_t>(position_)), text.size());
+  const std::size_t end = std::min(text.find_first_of(separators, begin), text.size());
+  position_ = static_cast<int>(end);
+  ZORUnicodeString token;
+  if (begin < end) token.BuildFromUTF16(text.data() + begin, end - begin);
+  return token;
 }

@@ -8,7 +8,7 @@
 #include <mutex>
 #include <utility>
 
-#include "default_platform/NeighbourLibrary.h"
+#include "foundation/PluginLoader.h"
 #include "foundation/Vector3.h"
 
 namespace ZORDefault {
@@ -39,7 +39,8 @@ double PixelSize(const ZOR3DViewpoint& inViewpoint, int inHeight) {
 
 const RayCaster* FindRayCaster() {
   std::string reason;
-  void* const function = FindInNeighbourLibrary("libZORRayCaster.so", kGetRayCasterName, reason);
+  void* const function =
+      ZORFoundation::FindPluginFunction("libZORRayCaster.so", kGetRayCasterName, reason);
   return function ? reinterpret_cast<GetRayCasterFunction*>(function)() : nullptr;
 }
 

@@ -1,26 +1,4 @@
-#include "platform/system/ZORMetaClass.h"
-#include "platform/visualisation/ZORI3DGeoVisu.h"
 #include "platform/visualisation/ZORIVisProperties.h"
-
-namespace {
-
-const IID& RegisteredInterface(const char* inName) {
-  return fct_RetrieveMetaObject(inName, kZORTypeInterface, ZORBaseUnknown::MetaObject(), "ZORNull",
-                                "Visualisation", sizeof(ZORBaseUnknown))
-      ->GetClassId();
-}
-
-}  // namespace
-
-const IID& ZORI3DGeoVisu::ClassId() {
-  static const IID& identifier = RegisteredInterface("ZORI3DGeoVisu");
-  return identifier;
-}
-
-const IID& ZORIVisProperties::ClassId() {
-  static const IID& identifier = RegisteredInterface("ZORIVisProperties");
-  return identifier;
-}
 
 HRESULT ZORVisPropertiesValues::GetInheritance(int inPropertyType, unsigned int& outFlag) const {
   if (inPropertyType != kColour) return E_INVALIDARG;

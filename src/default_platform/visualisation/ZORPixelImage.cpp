@@ -3,20 +3,15 @@
 #include <algorithm>
 #include <array>
 #include <cctype>
-#include <filesystem>
 #include <optional>
-#include <random>
 #include <string>
 #include <string_view>
-#include <system_error>
 #include <utility>
 
+#include "default_platform/system/FileResult.h"
 #include "default_platform/system/ObjectCounters.h"
-#include "default_platform/system/Utf8.h"
 #include "default_platform/visualisation/Rendering.h"
-#include "platform/system/ZORFile.h"
-
-namespace fs = std::filesystem;
+#include "foundation/AtomicFile.h"
 
 namespace {
 
@@ -44,50 +39,6 @@ bool HoldsAllPixels(int inWidth, int inHeight, std::size_t inByteCount) {
                             static_cast<std::size_t>(inHeight);
 }
 
-/// The path in UTF-8, whatever the process's locale.
-std::wstring ToWide(const std::string& inPath) {
-  std::u16string units(inPath.size(), u'\0');
-  units.resize(ZORDefault::DecodeUtf8(inPath, units.data()));
-  std::wstring wide;
-  for (std::size_t position = 0; position < units.size();)
-    wide += static_cast<wchar_t>(ZORDefault::NextCharacter(units, position));
-  return wide;
-}
-
-HRESULT WriteNewFile(const fs::path& inPath, const std::string& inBytes) {
-  int descriptor = 0;
-  HRESULT result = ZORFOpen(ToWide(inPath.string()).c_str(), "wb", &descriptor);
-  if (FAILED(result)) return result;
-  result = ZORFWrite(descriptor, inBytes.data(), inBytes.size(), nullptr);
-  const HRESULT closed = ZORFClose(descriptor);
-  return FAILED(result) ? result : closed;
-}
-
-/// A name beside a file that no other file has.
-fs::path NameBeside(const fs::path& inPath) {
-  static std::random_device random;
-  constexpr std::string_view kDigits = "0123456789abcdef";
-  std::string name = ".picture-";
-  for (int i = 0; i < 16; ++i) name += kDigits[random() % kDigits.size()];
-  return inPath.parent_path() / name;
-}
-
-HRESULT ReplaceFile(const fs::path& inPath, const std::string& inBytes) {
-  std::error_code error;
-  if (fs::is_directory(inPath, error)) return kZORFileIsDirectory;
-  // A link stays and its target is replaced, as with a plain write.
-  const fs::path resolved = fs::canonical(inPath, error);
-  const fs::path target = error ? inPath : resolved;
-  const fs::path beside = NameBeside(target);
-  HRESULT result = WriteNewFile(beside, inBytes);
-  if (SUCCEEDED(result)) {
-    fs::rename(beside, target, error);
-    if (error) result = E_FAIL;
-  }
-  if (FAILED(result)) fs::remove(beside, error);
-  return result;
-}
-
 }  // namespace
 
 ZORPixelImage::ZORPixelImage(int inWidth, int inHeight, std::vector<std::uint8_t> inPixels)
@@ -110,11 +61,11 @@ HRESULT ZORPixelImage::Write(const ZORString& inFormat, const ZORString& inPath)
   std::string bytes;
   if (!rayCaster || !rayCaster->encode(*format, width_, height_, pixels_.data(), bytes))
     return E_FAIL;
-  return ReplaceFile(inPath.CastToCharPtr(), bytes);
-} catch (const fs::filesystem_error&) {
-  return kZORFileBadPath;
-} catch (const std::system_error&) {
-  return kZORFileBadPath;
+  // A picture can be made again, so nobody waits for the disk.
+  ZORFoundation::WriteWholeFile(inPath.CastToCharPtr(), bytes, {.isSynchronised = false});
+  return S_OK;
+} catch (const ZORFoundation::FileError& error) {
+  return ZORDefault::FileResultOf(error.Code());
 } catch (const std::bad_alloc&) {
   return E_FAIL;
 }

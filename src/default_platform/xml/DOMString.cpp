@@ -9,7 +9,7 @@
 #include <stdexcept>
 #include <utility>
 
-#include "default_platform/system/Utf8.h"
+#include "foundation/Utf8.h"
 #include "default_platform/xml/DOM_HandleAccess.h"
 
 namespace {
@@ -63,7 +63,7 @@ DOMString::DOMString() : text_(nullptr), tree_(nullptr) {}
 DOMString::DOMString(const char* inNarrow) : DOMString() {
   if (inNarrow == nullptr) return;
   const std::size_t count = std::strlen(inNarrow);
-  if (!ZORDefault::IsAscii({inNarrow, count})) {
+  if (!ZORFoundation::IsAscii({inNarrow, count})) {
     const ZORUnicodeString text(inNarrow);
     text_ = OwnedCopy(text.ConvertToUCChar(), static_cast<std::size_t>(text.GetLengthInChar()));
     return;

@@ -2,7 +2,7 @@
 
 #include <utility>
 
-#include "default_platform/system/Utf8.h"
+#include "foundation/Utf8.h"
 #include "default_platform/xml/DOM_HandleAccess.h"
 #include "platform/xml/DOM_DOMException.h"
 #include "platform/xml/DOM_NamedNodeMap.h"
@@ -332,7 +332,7 @@ DOM_Node DOM_NamedNodeMap::getNamedItem(const DOMString& inName) const {
 
 DOM_Node DOM_NamedNodeMap::getNamedItem(const char* inName) const {
   const std::string_view name = inName == nullptr ? std::string_view() : inName;
-  if (!ZORDefault::IsAscii(name)) return getNamedItem(DOMString(inName));
+  if (!ZORFoundation::IsAscii(name)) return getNamedItem(DOMString(inName));
   if (isNull()) return DOM_Node();
   DOM_Tree* const tree = DOM_HandleAccess::TreeOf(element_);
   const DOM_Tree::Node element = DOM_HandleAccess::NodeOf(element_);

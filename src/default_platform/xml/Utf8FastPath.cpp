@@ -5,7 +5,7 @@
 #include <cstring>
 #include <xercesc/util/XMLUni.hpp>
 
-#include "default_platform/system/Utf8.h"
+#include "foundation/Utf8.h"
 
 namespace {
 
@@ -49,11 +49,12 @@ bool HasReplacement(std::u16string_view inText) {
   constexpr std::size_t kBlock = 64;
   while (inText.size() >= kBlock) {
     unsigned int hits = 0;
-    for (std::size_t i = 0; i < kBlock; ++i) hits |= inText[i] == ZORDefault::kReplacementCharacter;
+    for (std::size_t i = 0; i < kBlock; ++i)
+      hits |= inText[i] == ZORFoundation::kReplacementCharacter;
     if (hits) return true;
     inText.remove_prefix(kBlock);
   }
-  return inText.find(ZORDefault::kReplacementCharacter) != std::u16string_view::npos;
+  return inText.find(ZORFoundation::kReplacementCharacter) != std::u16string_view::npos;
 }
 
 class Utf8Stream : public xercesc::BinInputStream {
@@ -83,7 +84,7 @@ std::size_t Utf8FastPath::Read(char16_t* outUnits, std::size_t inMax) {
   if (bytes.empty()) return 0;
   if (++reads_ == 1) bytes = WithoutMark(bytes);
   last_ = bytes;
-  const std::size_t count = ZORDefault::DecodeUtf8(bytes, outUnits);
+  const std::size_t count = ZORFoundation::DecodeUtf8(bytes, outUnits);
   if (HasReplacement({outUnits, count})) throw NeedsFullScanner();
   return count;
 }

@@ -1,3 +1,4 @@
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <cmath>
@@ -9,6 +10,7 @@
 #include "default_platform/visualisation/SceneGraph.h"
 #include "platform/space_analysis/ZORISiSubInterference.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
+#include "support/KnownInterfaces.h"
 #include "support/ScopedVariable.h"
 
 namespace {
@@ -180,6 +182,19 @@ TEST(Interference, SubInterferencesAreClosePicturesOfThePoints) {
   EXPECT_NE(0, ZORISiSubInterference_var(list[2])->FillViewpoint(&second));
   EXPECT_NEAR(10, first.origin.z - second.origin.z, 1e-9);
   EXPECT_NEAR(0, first.origin.x - second.origin.x, 1e-9);
+}
+
+TEST(Interference, InterfacesAreFoundByIdentifierAndName) {
+  const auto scene = NutAndRod(kTwoPoints);
+  EXPECT_THAT(support::InterfacesOf(*scene.interference.GetInterface()),
+              testing::ElementsAre("ZORBaseUnknown", "ZORI3DGeoVisu", "ZORISiInterference",
+                                   "ZORISpecObject"));
+  ZORListValZORISpecObject_var list;
+  scene.interference->GetSubInterferences(list);
+  EXPECT_THAT(support::InterfacesOf(*list[1].GetInterface()),
+              testing::ElementsAre("ZORBaseUnknown", "ZORISiSubInterference", "ZORISpecObject"));
+  EXPECT_THAT(support::InterfacesOf(*scene.products[0].GetInterface()),
+              testing::IsSupersetOf({"ZORI3DGeoVisu", "ZORIAlias", "ZORIProduct"}));
 }
 
 TEST(Interference, SubInterferenceKnowsAndKeepsItsFather) {

@@ -2,7 +2,7 @@
 
 #include <cstdio>
 
-#include "default_platform/NeighbourLibrary.h"
+#include "foundation/PluginLoader.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/SafeText.h"
 
@@ -12,7 +12,7 @@ namespace {
 template <typename Function>
 Function* FindFunction(const char* inName) {
   std::string reason;
-  void* const function = ZORDefault::FindInNeighbourLibrary("libZORPage.so", inName, reason);
+  void* const function = ZORFoundation::FindPluginFunction("libZORPage.so", inName, reason);
   if (function == nullptr)
     throw InputError("the library that makes pages cannot be loaded: " + reason);
   return reinterpret_cast<Function*>(function);

@@ -1,15 +1,28 @@
-// A component that offers several interfaces.
-#ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_FACET_H
-#define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_FACET_H
+// The component model: interfaces with their names and identifiers, and components that offer
+// several.
+#ifndef ZOR_DEFAULT_PLATFORM_SYSTEM_INTERFACEREGISTRY_H
+#define ZOR_DEFAULT_PLATFORM_SYSTEM_INTERFACEREGISTRY_H
+
+#include <string_view>
 
 #include "platform/system/ZORBaseUnknown.h"
 
 namespace ZORDefault {
 
+/// The identifier of the class or interface of a name: the same on every run and machine, since it
+/// is the name's 128-bit hash, most significant byte first.
+ZOR_PLATFORM_EXPORT GUID IdentifierOfName(std::string_view inName);
+
+/// The identifier of the interface of a name, which is known from then on.
+ZOR_PLATFORM_EXPORT const IID& RegisterInterface(const char* inName, const char* inFramework);
+
+/// The identifier of a registered interface; null for an unknown name.
+ZOR_PLATFORM_EXPORT const IID* FindInterface(const char* inName);
+
 /// The object behind a set of facets.
 class FacetedComponent {
  public:
-  /// The facet that stands for an interface, without a reference added; null when there is none.
+  /// The facet that is an interface, without a reference added; null when there is none.
   virtual ZORBaseUnknown* FindFacet(const IID& inInterface) = 0;
   virtual ZORMetaClass* GetClass() const = 0;
   virtual unsigned int AddReference() = 0;
@@ -19,20 +32,15 @@ class FacetedComponent {
   ~FacetedComponent() = default;
 };
 
-/// The identifier of the interface of a name; its meta-class is registered at the first call.
-const IID& RegisteredInterface(const char* inName);
-
-/// The identifier of a registered interface of the product structure; null for an unknown name.
-const IID* FindInterfaceByName(const char* inName);
-
 /// One interface of a component. It is a part of the component's object: its references are the
-/// component's, and every facet leads to every other. Facets have their interface as only base, so
-/// that a pointer to one is the pointer to the interface.
+/// component's, and every facet leads to every other, by identifier and by name. Facets have their
+/// interface as only base, so that a pointer to one is the pointer to the interface.
 template <class Interface>
 class Facet : public Interface {
  public:
   explicit Facet(FacetedComponent& inOwner) : owner_(&inOwner) {}
 
+  using Interface::QueryInterface;  // by name
   HRESULT QueryInterface(const IID& inInterface, void** outInterface) override {
     if (!outInterface) return E_INVALIDARG;
     *outInterface = owner_->FindFacet(inInterface);
@@ -40,16 +48,10 @@ class Facet : public Interface {
     owner_->AddReference();
     return S_OK;
   }
-  HRESULT QueryInterface(const char* inInterfaceName, void** outInterface) override {
-    if (!outInterface) return E_INVALIDARG;
-    *outInterface = nullptr;
-    const IID* const known = FindInterfaceByName(inInterfaceName);
-    return known ? QueryInterface(*known, outInterface) : E_NOINTERFACE;
-  }
   unsigned int AddRef() override { return owner_->AddReference(); }
   unsigned int Release() override { return owner_->ReleaseReference(); }
   ZORMetaClass* GetMetaObject() const override { return owner_->GetClass(); }
-  /// The facet that stands for the component's identity.
+  /// The facet that is the component's identity.
   ZORBaseUnknown* GetImpl() const override { return owner_->FindFacet(ZORBaseUnknown::ClassId()); }
 
  private:

@@ -1,0 +1,126 @@
+#include "default_platform/system/TomlFiles.h"
+
+#include <toml++/toml.h>
+
+#include <algorithm>
+#include <optional>
+
+#include "foundation/PluginLoader.h"
+#include "platform/system/ZORGetEnv.h"
+
+namespace ZORDefault {
+namespace {
+
+std::optional<TomlValue> IntegersOf(const toml::array& inArray) {
+  std::vector<std::int64_t> integers;
+  for (const toml::node& element : inArray) {
+    const auto* const integer = element.as_integer();
+    if (!integer) return std::nullopt;
+    integers.push_back(integer->get());
+  }
+  return integers;
+}
+
+std::optional<TomlValue> ValueOf(const toml::node& inNode) {
+  if (const auto* const text = inNode.as_string()) return text->get();
+  if (const auto* const integer = inNode.as_integer()) return integer->get();
+  if (const auto* const number = inNode.as_floating_point()) return number->get();
+  if (const auto* const truth = inNode.as_boolean()) return truth->get();
+  if (const auto* const array = inNode.as_array()) return IntegersOf(*array);
+  return std::nullopt;
+}
+
+std::string_view Variable(const char* inName) {
+  const char* const value = ZORGetEnv(inName);
+  return value ? value : "";
+}
+
+// Empty parts are no directories: "a::b" is a and b.
+void AppendList(std::string_view inList, std::vector<std::string>& ioDirectories) {
+  while (!inList.empty()) {
+    const std::size_t colon = std::min(inList.find(':'), inList.size());
+    if (colon > 0) ioDirectories.emplace_back(inList.substr(0, colon));
+    inList.remove_prefix(std::min(colon + 1, inList.size()));
+  }
+}
+
+void AppendUserDirectory(std::vector<std::string>& ioDirectories) {
+  const std::string_view configuration = Variable("XDG_CONFIG_HOME");
+  const std::string_view home = Variable("HOME");
+  // The rules of XDG base directories: a relative path here is ignored.
+  if (!configuration.empty() && configuration.front() == '/')
+    ioDirectories.push_back(std::string(configuration) + "/zorlyra");
+  else if (!home.empty())
+    ioDirectories.push_back(std::string(home) + "/.config/zorlyra");
+}
+
+// The library lies in lib or, on some systems, in a folder of lib for the processor's kind.
+std::string FindInstalledResources() {
+  const std::string libraries = ZORFoundation::LibraryDirectory();
+  for (const char* const up : {"/../share/ZORLyra", "/../../share/ZORLyra"}) {
+    if (ZORFoundation::StampOfFile(libraries + up)) return libraries + up;
+  }
+  return libraries + "/../share/ZORLyra";
+}
+
+const std::string& InstalledResources() {
+  static const std::string directory = FindInstalledResources();
+  return directory;
+}
+
+std::vector<std::string> SettingDirectories() {
+  std::vector<std::string> directories;
+  AppendList(Variable("ZOR_SETTINGS_PATH"), directories);
+  AppendUserDirectory(directories);
+  directories.push_back(InstalledResources() + "/settings");
+  return directories;
+}
+
+// Whether a name can be that of one file in a directory, and of none outside.
+bool IsFileName(std::string_view inName) {
+  return !inName.empty() && inName.front() != '.' &&
+         inName.find_first_of("/\\") == std::string_view::npos;
+}
+
+FileCache<TomlTable>& SettingFiles() {
+  static auto* const files = new FileCache<TomlTable>(&ParseToml);
+  return *files;
+}
+
+}  // namespace
+
+std::shared_ptr<const TomlTable> ParseToml(std::string_view inText) {
+  try {
+    auto table = std::make_shared<TomlTable>();
+    for (const auto& [key, node] : toml::parse(inText))
+      if (auto value = ValueOf(node)) table->emplace(std::string(key.str()), *std::move(value));
+    return table;
+  } catch (const toml::parse_error&) {
+    return nullptr;
+  }
+}
+
+std::vector<std::string> CatalogueDirectories() {
+  std::vector<std::string> directories;
+  AppendList(Variable("ZOR_CATALOGUE_PATH"), directories);
+  directories.push_back(InstalledResources() + "/catalogues");
+  return directories;
+}
+
+std::optional<FoundFile> FindToml(const std::vector<std::string>& inDirectories,
+                                  std::string_view inFolder, std::string_view inName) {
+  if (!IsFileName(inName)) return std::nullopt;
+  for (const std::string& directory : inDirectories) {
+    std::string path = directory;
+    path.append("/").append(inFolder).append(inName).append(".toml");
+    if (const auto stamp = ZORFoundation::StampOfFile(path)) return FoundFile{path, *stamp};
+  }
+  return std::nullopt;
+}
+
+std::shared_ptr<const TomlTable> ReadSettingFile(std::string_view inFolder,
+                                                 std::string_view inName) {
+  return SettingFiles().Get(FindToml(SettingDirectories(), inFolder, inName));
+}
+
+}  // namespace ZORDefault

@@ -1,0 +1,95 @@
+// Settings and catalogues: TOML files, where they are looked for and what is kept of them.
+#ifndef ZOR_DEFAULT_PLATFORM_SYSTEM_TOMLFILES_H
+#define ZOR_DEFAULT_PLATFORM_SYSTEM_TOMLFILES_H
+
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <mutex>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <variant>
+#include <vector>
+
+#include "foundation/ReadWholeFile.h"
+
+namespace ZORDefault {
+
+/// The value of one entry.
+using TomlValue = std::variant<std::string, std::int64_t, double, bool, std::vector<std::int64_t>>;
+
+/// The entries at the top of a file, by key. Entries of other kinds (tables, dates, mixed arrays)
+/// are left out.
+using TomlTable = std::map<std::string, TomlValue, std::less<>>;
+
+/// @return the entries, or null when the text is not TOML.
+std::shared_ptr<const TomlTable> ParseToml(std::string_view inText);
+
+/// A file that was found, and the stamp that it had then.
+struct FoundFile {
+  std::string path;
+  ZORFoundation::FileStamp stamp;
+};
+
+/// Directories of message catalogues, the first to be looked into first, from the environment as it
+/// is now; below each there is a folder for each language.
+std::vector<std::string> CatalogueDirectories();
+
+/// Looks for NAME.toml in a folder ("" or "system/") of each directory in turn. A name that is not
+/// that of one file in a directory is not found.
+std::optional<FoundFile> FindToml(const std::vector<std::string>& inDirectories,
+                                  std::string_view inFolder, std::string_view inName);
+
+/// The entries of the first NAME.toml among the setting directories; null when there is none or it
+/// is damaged.
+std::shared_ptr<const TomlTable> ReadSettingFile(std::string_view inFolder,
+                                                 std::string_view inName);
+
+/// Gives what a file's content means, reading it only when its stamp is another than at the last
+/// reading. A file that was written so shortly before it was read that a second change might bear
+/// the same time is read again until it has settled.
+template <class Content>
+class FileCache {
+ public:
+  using Pointer = std::shared_ptr<const Content>;
+  using Reader = Pointer (*)(std::string_view inText);
+
+  explicit FileCache(Reader inReader) : reader_(inReader) {}
+
+  /// @return null when there is no file, it cannot be read or means nothing.
+  Pointer Get(const std::optional<FoundFile>& inFile) {
+    if (!inFile) return nullptr;
+    const std::lock_guard lock(mutex_);
+    Entry& entry = entries_[inFile->path];
+    if (!entry.isSettled || entry.stamp != inFile->stamp) Read(inFile->path, entry);
+    return entry.content;
+  }
+
+ private:
+  struct Entry {
+    ZORFoundation::FileStamp stamp;
+    bool isSettled = false;
+    Pointer content;
+  };
+
+  void Read(const std::string& inPath, Entry& outEntry) {
+    constexpr std::int64_t kSettlingTime = 50'000'000;  // some ticks of a file system's clock
+    outEntry = Entry();
+    const std::int64_t now = ZORFoundation::FileClockNow();
+    const auto file = ZORFoundation::TryReadWholeFile(inPath);
+    if (!file) return;
+    outEntry.stamp = file->before;
+    outEntry.isSettled = file->IsConsistent() && file->before.changed + kSettlingTime < now;
+    outEntry.content = reader_(file->bytes);
+  }
+
+  Reader reader_;
+  std::mutex mutex_;
+  std::unordered_map<std::string, Entry> entries_;
+};
+
+}  // namespace ZORDefault
+
+#endif

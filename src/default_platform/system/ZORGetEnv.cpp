@@ -1,5 +1,0 @@
-#include "platform/system/ZORGetEnv.h"
-
-#include <cstdlib>
-
-const char* ZORGetEnv(const char* inName) { return inName ? std::getenv(inName) : nullptr; }
