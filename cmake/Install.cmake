@@ -4,7 +4,6 @@ include(CMakePackageConfigHelpers)
 
 set(headerDir ${CMAKE_INSTALL_INCLUDEDIR}/ZORLyra)
 set(packageDir ${CMAKE_INSTALL_LIBDIR}/cmake/ZORLyra)
-set(noNetworkDir ${CMAKE_INSTALL_LIBDIR}/ZORLyra/no-network)
 
 # The default platform looks for its resources beside its own directory, in ../share/ZORLyra.
 cmake_path(GET CMAKE_INSTALL_LIBDIR PARENT_PATH libraryParent)
@@ -21,14 +20,8 @@ install(TARGETS ZORPlatformDeclarations ZORFoundation ZORDefaultPlatform ZORLyra
   LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
   ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR})
 if(TARGET lyra)
-  # The directory of the network's stand-in comes first, so that libcurl is never found.
-  set_target_properties(lyra PROPERTIES
-    INSTALL_RPATH "$ORIGIN/${binToLib}/ZORLyra/no-network;$ORIGIN/${binToLib}")
+  set_target_properties(lyra PROPERTIES INSTALL_RPATH "$ORIGIN/${binToLib}")
   install(TARGETS lyra RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
-endif()
-get_target_property(noNetworkType lyra_no_network TYPE)
-if(noNetworkType STREQUAL "SHARED_LIBRARY")
-  install(TARGETS lyra_no_network LIBRARY DESTINATION ${noNetworkDir} NAMELINK_SKIP)
 endif()
 
 install(DIRECTORY include/ DESTINATION ${headerDir} FILES_MATCHING PATTERN "*.h")

@@ -21,17 +21,6 @@ MemorySource::~MemorySource() {
   if (adopted_) delete[] bytes_;
 }
 
-std::size_t ByteReader::Read(unsigned char* outBytes, std::size_t inMax) {
-  const std::size_t count = DoRead(outBytes, inMax);
-  bytesRead_ += count;
-  return count;
-}
-
-void ByteReader::Rewind() {
-  DoRewind();
-  bytesRead_ = 0;
-}
-
 namespace {
 
 // Without O_NONBLOCK, opening a pipe would wait for its writer.
@@ -119,19 +108,6 @@ class MemoryReader : public ByteReader {
   std::size_t left_;
 };
 
-class ReaderStream : public xercesc::BinInputStream {
- public:
-  explicit ReaderStream(ByteReader& ioReader) : reader_(ioReader) {}
-  XMLFilePos curPos() const override { return reader_.BytesRead(); }
-  XMLSize_t readBytes(XMLByte* const outBytes, const XMLSize_t inMax) override {
-    return reader_.Read(outBytes, inMax);
-  }
-  const XMLCh* getContentType() const override { return nullptr; }
-
- private:
-  ByteReader& reader_;
-};
-
 }  // namespace
 
 std::unique_ptr<ByteReader> OpenFile(const char* inPath) {
@@ -142,12 +118,3 @@ std::unique_ptr<ByteReader> OpenFile(const char* inPath) {
 std::unique_ptr<ByteReader> OpenMemory(const MemorySource& inSource) {
   return std::make_unique<MemoryReader>(inSource.Bytes(), inSource.Count());
 }
-
-ReaderEntity::ReaderEntity(ByteReader& ioReader, const std::string& inName) : reader_(ioReader) {
-  const ZORUnicodeString name(inName.c_str());
-  const std::u16string terminated(name.ConvertToUCChar(),
-                                  static_cast<std::size_t>(name.GetLengthInChar()));
-  setSystemId(terminated.c_str());
-}
-
-xercesc::BinInputStream* ReaderEntity::makeStream() const { return new ReaderStream(reader_); }

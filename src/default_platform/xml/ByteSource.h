@@ -5,8 +5,6 @@
 #include <cstdint>
 #include <memory>
 #include <string>
-#include <xercesc/sax/InputSource.hpp>
-#include <xercesc/util/BinInputStream.hpp>
 
 #include "platform/system/ZORUnicodeString.h"
 #include "platform/xml/InputSource.h"
@@ -36,12 +34,19 @@ class ByteReader {
  public:
   virtual ~ByteReader() = default;
   /// @return the number of bytes put to outBytes; 0 at the end only.
-  std::size_t Read(unsigned char* outBytes, std::size_t inMax);
+  std::size_t Read(unsigned char* outBytes, std::size_t inMax) {
+    const std::size_t count = DoRead(outBytes, inMax);
+    bytesRead_ += count;
+    return count;
+  }
   std::uint64_t BytesRead() const { return bytesRead_; }
   /// Whether there is nothing to read at all.
   virtual bool IsEmpty() = 0;
   /// Begins again.
-  void Rewind();
+  void Rewind() {
+    DoRewind();
+    bytesRead_ = 0;
+  }
 
  private:
   virtual std::size_t DoRead(unsigned char* outBytes, std::size_t inMax) = 0;
@@ -53,16 +58,5 @@ class ByteReader {
 /// for ever.
 std::unique_ptr<ByteReader> OpenFile(const char* inPath);
 std::unique_ptr<ByteReader> OpenMemory(const MemorySource& inSource);
-
-/// Gives a reader to the XML library as its one and only entity.
-class ReaderEntity : public xercesc::InputSource {
- public:
-  /// @param inName what the library calls the entity by in its messages.
-  ReaderEntity(ByteReader& ioReader, const std::string& inName);
-  xercesc::BinInputStream* makeStream() const override;
-
- private:
-  ByteReader& reader_;
-};
 
 #endif

@@ -49,7 +49,7 @@ DOM_Text* ResizeOwnedText(DOM_Text* inOwned, std::uint32_t inCount) {
   void* const block = std::realloc(HeadOf(inOwned), OwnedBytes(inCount));
   if (block == nullptr) throw std::bad_alloc();
   DOM_Text* const text = reinterpret_cast<DOM_Text*>(static_cast<OwnedHead*>(block) + 1);
-  text->length = inCount;
+  text->head = inCount;
   return text;
 }
 
@@ -106,9 +106,15 @@ DOMString::~DOMString() {
 
 bool DOMString::isNull() const { return text_ == nullptr; }
 
-unsigned int DOMString::length() const { return text_ == nullptr ? 0 : text_->length; }
+unsigned int DOMString::length() const {
+  if (text_ == nullptr) return 0;
+  return tree_ == nullptr ? text_->head : text_->Length();
+}
 
-const ZORUC2Bytes* DOMString::rawBuffer() const { return length() == 0 ? nullptr : text_->Units(); }
+const ZORUC2Bytes* DOMString::rawBuffer() const {
+  if (length() == 0) return nullptr;
+  return tree_ == nullptr ? text_->Units() : tree_->Widen(*text_);
+}
 
 bool DOMString::equals(const DOMString& inOther) const {
   return IsSameText(DOM_HandleAccess::View(*this), DOM_HandleAccess::View(inOther));
@@ -116,11 +122,21 @@ bool DOMString::equals(const DOMString& inOther) const {
 
 bool DOMString::equals(const char* inAscii) const {
   return IsSameText(DOM_HandleAccess::View(*this),
-                    inAscii == nullptr ? std::string_view() : inAscii);
+                    TextView(inAscii == nullptr ? std::string_view() : inAscii));
 }
 
 ZORUnicodeString DOMString::DOMStringToZORUnicodeString() const {
+  constexpr std::size_t kShort = 256;
   ZORUnicodeString text;
-  text.BuildFromUTF16(rawBuffer(), length());
+  const TextView view = DOM_HandleAccess::View(*this);
+  if (view.IsWide()) {
+    text.BuildFromUTF16(view.Units().data(), view.Length());
+  } else if (view.Length() <= kShort) {
+    char16_t units[kShort];
+    view.CopyTo(units);
+    text.BuildFromUTF16(units, view.Length());
+  } else {
+    text.BuildFromUTF16(view.ToUtf16().data(), view.Length());
+  }
   return text;
 }

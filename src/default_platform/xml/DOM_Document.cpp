@@ -1,7 +1,7 @@
 #include "platform/xml/DOM_Document.h"
 
 #include "default_platform/xml/DOM_HandleAccess.h"
-#include "default_platform/xml/XMLNames.h"
+#include "default_platform/xml/XMLChars.h"
 #include "platform/xml/DOM_DOMException.h"
 
 namespace {
@@ -10,6 +10,12 @@ DOM_Tree& TreeToChange(const DOM_Node& inHandle) {
   if (inHandle.isNull())
     throw DOM_DOMException(DOM_DOMException::NULL_HANDLE_ERR, "a change through a null handle");
   return *DOM_HandleAccess::TreeOf(inHandle);
+}
+
+// Raises INVALID_CHARACTER_ERR for what is not a name.
+void RequireXMLName(std::u16string_view inName) {
+  if (!IsXMLName(inName))
+    throw DOM_DOMException(DOM_DOMException::INVALID_CHARACTER_ERR, "not a name of XML");
 }
 
 DOM_Node NewNode(const DOM_Node& inDocument, int inKind, const DOMString& inText) {
@@ -41,10 +47,10 @@ DOM_Node DOM_Document::getDoctype() const {
 
 DOM_Element DOM_Document::createElement(const DOMString& inName) {
   DOM_Tree& tree = TreeToChange(*this);
-  const std::u16string_view name = DOM_HandleAccess::View(inName);
+  const std::u16string_view name = DOM_HandleAccess::Units(inName);
   RequireXMLName(name);
-  return DOM_Element(DOM_HandleAccess::Handle(
-      &tree, tree.NewDetached(ELEMENT_NODE, tree.InternName(name), nullptr)));
+  return DOM_Element(
+      DOM_HandleAccess::Handle(&tree, tree.NewDetached(ELEMENT_NODE, tree.InternName(name), 0)));
 }
 
 DOM_Node DOM_Document::createTextNode(const DOMString& inText) {
@@ -62,7 +68,7 @@ DOM_Node DOM_Document::createComment(const DOMString& inText) {
 DOM_Node DOM_Document::createProcessingInstruction(const DOMString& inTarget,
                                                    const DOMString& inData) {
   DOM_Tree& tree = TreeToChange(*this);
-  const std::u16string_view target = DOM_HandleAccess::View(inTarget);
+  const std::u16string_view target = DOM_HandleAccess::Units(inTarget);
   RequireXMLName(target);
   if (IsReservedTarget(target))
     throw DOM_DOMException(DOM_DOMException::INVALID_CHARACTER_ERR,
@@ -74,7 +80,7 @@ DOM_Node DOM_Document::createProcessingInstruction(const DOMString& inTarget,
 
 DOM_Node DOM_Document::createDocumentFragment() {
   DOM_Tree& tree = TreeToChange(*this);
-  return DOM_HandleAccess::Handle(&tree, tree.NewDetached(DOCUMENT_FRAGMENT_NODE, 0, nullptr));
+  return DOM_HandleAccess::Handle(&tree, tree.NewDetached(DOCUMENT_FRAGMENT_NODE, 0, 0));
 }
 
 DOM_Node DOM_Document::importNode(const DOM_Node& inNode, bool inDeep) {
@@ -103,12 +109,12 @@ DOMString DOM_Element::getAttribute(const DOMString& inName) const {
   if (isNull()) return *empty;
   const DOM_Tree::Attribute attribute = tree_->FindAttribute(node_, DOM_HandleAccess::View(inName));
   if (attribute == 0) return *empty;
-  return DOM_HandleAccess::String(tree_, tree_->AttributeAt(attribute).value);
+  return DOM_HandleAccess::String(tree_, tree_->Text(tree_->AttributeAt(attribute).value));
 }
 
 void DOM_Element::setAttribute(const DOMString& inName, const DOMString& inValue) {
   DOM_Tree& tree = TreeToChange(*this);
-  const std::u16string_view name = DOM_HandleAccess::View(inName);
+  const std::u16string_view name = DOM_HandleAccess::Units(inName);
   RequireXMLName(name);
   tree.SetAttribute(node_, name, DOM_HandleAccess::TextFor(tree, inValue));
 }

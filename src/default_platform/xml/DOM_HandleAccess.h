@@ -30,12 +30,15 @@ class DOM_HandleAccess {
   static DOMString String(DOM_Tree* inTree, const DOM_Text* inText) {
     return inText == nullptr ? DOMString() : DOMString(inTree, inText);
   }
-  static std::u16string_view View(const DOMString& inText) {
-    return inText.text_ == nullptr ? std::u16string_view() : inText.text_->View();
+  static TextView View(const DOMString& inText) {
+    if (inText.text_ == nullptr) return std::u16string_view();
+    return inText.tree_ == nullptr ? TextView(inText.text_->OwnedView()) : inText.text_->View();
   }
-  /// A text for a tree; the text itself when it is the tree's own.
-  static const DOM_Text* TextFor(DOM_Tree& ioTree, const DOMString& inText) {
-    return inText.tree_ == &ioTree ? inText.text_ : ioTree.AddText(View(inText));
+  static std::u16string_view Units(const DOMString& inText) {
+    return {inText.rawBuffer(), inText.length()};
+  }
+  static TextRef TextFor(DOM_Tree& ioTree, const DOMString& inText) {
+    return ioTree.AddText(View(inText));
   }
   /// Makes a string of a block that was allocated by NewOwnedText.
   static DOMString Adopt(DOM_Text* inOwned) { return DOMString(nullptr, inOwned); }

@@ -155,22 +155,25 @@ bool DOM_Node::operator!=(const DOM_Node& inOther) const { return !(*this == inO
 
 short DOM_Node::getNodeType() const {
   if (tree_ == nullptr) return NULL_NODE;
-  return attribute_ != 0 ? static_cast<short>(ATTRIBUTE_NODE) : tree_->At(node_).kind;
+  return attribute_ != 0 ? static_cast<short>(ATTRIBUTE_NODE)
+                         : static_cast<short>(tree_->At(node_).kind);
 }
 
 DOMString DOM_Node::getNodeName() const {
   if (tree_ == nullptr) return DOMString();
   const std::uint32_t name =
       attribute_ != 0 ? tree_->AttributeAt(attribute_).name : tree_->At(node_).name;
-  if (name == 0) return KindName(tree_->At(node_).kind);
+  if (name == 0) return KindName(static_cast<int>(tree_->At(node_).kind));
   return DOM_HandleAccess::String(tree_, tree_->NameText(name));
 }
 
 DOMString DOM_Node::getNodeValue() const {
   if (tree_ == nullptr) return DOMString();
-  if (attribute_ != 0) return DOM_HandleAccess::String(tree_, tree_->AttributeAt(attribute_).value);
+  if (attribute_ != 0)
+    return DOM_HandleAccess::String(tree_, tree_->Text(tree_->AttributeAt(attribute_).value));
   const DOM_Tree::NodeRecord& record = tree_->At(node_);
-  return DOM_HandleAccess::String(tree_, DOM_Tree::HasText(record.kind) ? record.text : nullptr);
+  return DOM_HandleAccess::String(
+      tree_, DOM_Tree::HasText(record.kind) ? tree_->Text(record.text) : nullptr);
 }
 
 DOM_Node DOM_Node::getParentNode() const {
@@ -190,7 +193,7 @@ DOM_Node DOM_Node::getLastChild() const {
 
 DOM_Node DOM_Node::getPreviousSibling() const {
   if (tree_ == nullptr || attribute_ != 0) return DOM_Node();
-  return DOM_HandleAccess::Handle(tree_, tree_->At(node_).previous);
+  return DOM_HandleAccess::Handle(tree_, tree_->PreviousSibling(node_));
 }
 
 DOM_Node DOM_Node::getNextSibling() const {

@@ -14,7 +14,7 @@ constexpr std::uint32_t kMaxWalk = 24;
 }  // namespace
 
 DOM_Tree::DOM_Tree() : serial_(NextSerial()), names_(texts_) {
-  NewNode(DOM_Node::DOCUMENT_NODE, 0, nullptr);
+  NewNode(DOM_Node::DOCUMENT_NODE, 0, 0);
 }
 
 DOM_Tree::Node DOM_Tree::NextWithin(Node inNode, Node inRoot) const {
@@ -84,19 +84,10 @@ DOM_Tree::Attribute DOM_Tree::AttributeAtPosition(Node inElement, std::uint32_t 
   return attribute;
 }
 
-DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, std::u16string_view inName) const {
+// Elements have few attributes, whose names are compared faster than one is looked up.
+DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, TextView inName) const {
   Attribute attribute = At(inElement).firstAttribute;
-  if (attribute == 0) return 0;
-  const Name name = names_.Find(inName);
-  if (name == 0) return 0;
-  while (attribute != 0 && attributes_[attribute].name != name)
-    attribute = attributes_[attribute].next;
-  return attribute;
-}
-
-DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, std::string_view inName) const {
-  Attribute attribute = At(inElement).firstAttribute;
-  while (attribute != 0 && !IsSameText(NameText(attributes_[attribute].name)->View(), inName))
+  while (attribute != 0 && !IsSameText(TextView(NameUnits(attributes_[attribute].name)), inName))
     attribute = attributes_[attribute].next;
   return attribute;
 }
@@ -117,21 +108,17 @@ DOM_Tree::Attribute DOM_Tree::TakeAttribute() {
   return attribute;
 }
 
-DOM_Tree::Node DOM_Tree::NewNode(int inKind, Name inName, const DOM_Text* inText) {
+DOM_Tree::Node DOM_Tree::NewNode(int inKind, Name inName, TextRef inText) {
   const Node node = TakeNode();
   NodeRecord& record = nodes_[node];
   record = NodeRecord();
-  record.kind = static_cast<std::uint8_t>(inKind);
-  record.name = inName;
-  if (HasText(inKind)) {
-    record.text = inText;
-  } else {
-    record.children = {0, 0};
-  }
+  record.kind = static_cast<std::uint32_t>(inKind) & 0xF;
+  record.name = inName & (NameTable::kMaxNames - 1);
+  if (HasText(inKind)) record.text = inText;
   return node;
 }
 
-DOM_Tree::Node DOM_Tree::NewDetached(int inKind, Name inName, const DOM_Text* inText) {
+DOM_Tree::Node DOM_Tree::NewDetached(int inKind, Name inName, TextRef inText) {
   const Node node = NewNode(inKind, inName, inText);
   const DetachedNodes::Group group = detached_.NewGroup();
   nodes_[node].flags = kDetached;
@@ -140,14 +127,18 @@ DOM_Tree::Node DOM_Tree::NewDetached(int inKind, Name inName, const DOM_Text* in
   return node;
 }
 
-DOM_Tree::Node DOM_Tree::AppendNew(Node inParent, int inKind, Name inName, const DOM_Text* inText) {
+DOM_Tree::Node DOM_Tree::AppendNew(Node inParent, Node inLast, int inKind, Name inName,
+                                   TextRef inText) {
   const Node node = NewNode(inKind, inName, inText);
-  LinkLast(inParent, node);
+  NodeRecord& record = nodes_[node];
+  record.parent = inParent;
+  record.previous = inLast == 0 ? node : inLast;
+  (inLast == 0 ? nodes_[inParent].firstChild : nodes_[inLast].next) = node;
   return node;
 }
 
 DOM_Tree::Attribute DOM_Tree::AppendNewAttribute(Node inElement, Attribute inLast, Name inName,
-                                                 const DOM_Text* inValue) {
+                                                 TextRef inValue) {
   const Attribute attribute = TakeAttribute();
   attributes_[attribute] = {inValue, inName, 0};
   (inLast == 0 ? nodes_[inElement].firstAttribute : attributes_[inLast].next) = attribute;
@@ -164,18 +155,18 @@ DOM_Tree::Name DOM_Tree::NameFrom(const DOM_Tree& inSource, Name inName) {
   }
   if (inName >= importedNames_.size()) importedNames_.resize(inSource.NameEnd());
   Name& name = importedNames_[inName];
-  if (name == 0) name = names_.Intern(inSource.NameText(inName)->View());
+  if (name == 0) name = names_.Intern(inSource.NameUnits(inName));
   return name;
 }
 
-const DOM_Text* DOM_Tree::TextFrom(const DOM_Tree& inSource, const DOM_Text* inText) {
-  return &inSource == this ? inText : texts_.Add(inText->View());
+TextRef DOM_Tree::TextFrom(const DOM_Tree& inSource, TextRef inText) {
+  return &inSource == this ? inText : texts_.Add(inSource.texts_[inText].View());
 }
 
 DOM_Tree::Node DOM_Tree::CopyOne(const DOM_Tree& inSource, Node inNode,
                                  DetachedNodes::Group inGroup) {
   const NodeRecord& from = inSource.At(inNode);
-  const DOM_Text* const text = HasText(from.kind) ? TextFrom(inSource, from.text) : nullptr;
+  const TextRef text = HasText(from.kind) ? TextFrom(inSource, from.text) : 0;
   const Node copy = NewNode(from.kind, NameFrom(inSource, from.name), text);
   nodes_[copy].flags = kDetached;
   detached_.AddNode(copy, inGroup);
@@ -214,14 +205,20 @@ DOM_Tree::Node DOM_Tree::Copy(const DOM_Tree& inSource, Node inNode, bool inDeep
 
 // ---- links
 
+// As in pugixml, a first child's previous sibling is the last one, which saves a field.
 void DOM_Tree::LinkLast(Node inParent, Node inChild) {
-  NodeRecord& parent = nodes_[inParent];
   NodeRecord& child = nodes_[inChild];
   child.parent = inParent;
-  child.previous = parent.children.last;
   child.next = 0;
-  (parent.children.last == 0 ? parent.children.first : nodes_[parent.children.last].next) = inChild;
-  parent.children.last = inChild;
+  const Node first = nodes_[inParent].firstChild;
+  if (first == 0) {
+    child.previous = inChild;
+    nodes_[inParent].firstChild = inChild;
+  } else {
+    child.previous = nodes_[first].previous;
+    nodes_[child.previous].next = inChild;
+    nodes_[first].previous = inChild;
+  }
   indexes_.Append(inParent, inChild);
 }
 
@@ -232,7 +229,9 @@ void DOM_Tree::LinkBefore(Node inParent, Node inChild, Node inBefore) {
   child.parent = inParent;
   child.previous = after.previous;
   child.next = inBefore;
-  (after.previous == 0 ? nodes_[inParent].children.first : nodes_[after.previous].next) = inChild;
+  Node& link = nodes_[inParent].firstChild == inBefore ? nodes_[inParent].firstChild
+                                                       : nodes_[after.previous].next;
+  link = inChild;
   after.previous = inChild;
   indexes_.Drop(inParent);
 }
@@ -240,8 +239,10 @@ void DOM_Tree::LinkBefore(Node inParent, Node inChild, Node inBefore) {
 void DOM_Tree::Unlink(Node inChild) {
   NodeRecord& child = nodes_[inChild];
   NodeRecord& parent = nodes_[child.parent];
-  (child.previous == 0 ? parent.children.first : nodes_[child.previous].next) = child.next;
-  (child.next == 0 ? parent.children.last : nodes_[child.next].previous) = child.previous;
+  const bool isFirst = parent.firstChild == inChild;
+  (isFirst ? parent.firstChild : nodes_[child.previous].next) = child.next;
+  if (parent.firstChild != 0)
+    nodes_[child.next == 0 ? parent.firstChild : child.next].previous = child.previous;
   indexes_.Drop(child.parent);
   child.parent = 0;
   child.previous = 0;
@@ -274,17 +275,17 @@ void DOM_Tree::Remove(Node inChild) {
   Unlink(inChild);
 }
 
-void DOM_Tree::SetText(Node inNode, const DOM_Text* inText) {
+void DOM_Tree::SetText(Node inNode, TextRef inText) {
   nodes_[inNode].text = inText;
   NoteChange(inNode);
 }
 
-void DOM_Tree::SetAttributeValue(Node inElement, Attribute inAttribute, const DOM_Text* inValue) {
+void DOM_Tree::SetAttributeValue(Node inElement, Attribute inAttribute, TextRef inValue) {
   attributes_[inAttribute].value = inValue;
   NoteChange(inElement);
 }
 
-void DOM_Tree::SetAttribute(Node inElement, std::u16string_view inName, const DOM_Text* inValue) {
+void DOM_Tree::SetAttribute(Node inElement, std::u16string_view inName, TextRef inValue) {
   const Attribute known = FindAttribute(inElement, inName);
   if (known != 0) return SetAttributeValue(inElement, known, inValue);
   Attribute last = At(inElement).firstAttribute;
@@ -294,7 +295,7 @@ void DOM_Tree::SetAttribute(Node inElement, std::u16string_view inName, const DO
   NoteChange(inElement);
 }
 
-void DOM_Tree::RemoveAttribute(Node inElement, std::u16string_view inName) {
+void DOM_Tree::RemoveAttribute(Node inElement, TextView inName) {
   const Attribute attribute = FindAttribute(inElement, inName);
   if (attribute == 0) return;
   Attribute* link = &nodes_[inElement].firstAttribute;

@@ -43,11 +43,11 @@ class ChunkedRecords {
   std::uint32_t end_ = 1;  // 0 means none
 };
 
-/// What a document type declaration says; null parts are not there.
+/// What a document type declaration says; 0 for what it lacks.
 struct DocumentType {
-  const DOM_Text* publicId = nullptr;
-  const DOM_Text* systemId = nullptr;
-  const DOM_Text* internalSubset = nullptr;
+  TextRef publicId = 0;
+  TextRef systemId = 0;
+  TextRef internalSubset = 0;
 };
 
 /// All nodes, attributes and texts of a document, in a few large blocks, addressed by number. The
@@ -73,32 +73,27 @@ class DOM_Tree {
     kFree = 4         // not a node now
   };
 
-  struct ChildLinks {
-    Node first;
-    Node last;
-  };
-
   struct NodeRecord {
-    std::uint8_t kind;  // a DOM_Node::NodeType
-    std::uint8_t flags;
-    Name name;  // of elements, processing instructions and document types
+    std::uint32_t kind : 4;  // a DOM_Node::NodeType
+    std::uint32_t flags : 4;
+    Name name : 24;  // of elements, processing instructions and document types
     Node parent;
-    Node previous;
+    Node previous;  // of a first child: the last child
     Node next;
     Attribute firstAttribute;
     union {
-      ChildLinks children;   // of the kinds that may have children
-      const DOM_Text* text;  // of the kinds that have a text
+      Node firstChild;  // of the kinds that may have children
+      TextRef text;     // of the kinds that have a text
     };
   };
-  static_assert(sizeof(NodeRecord) == 32);
+  static_assert(sizeof(NodeRecord) == 24);
 
   struct AttributeRecord {
-    const DOM_Text* value;
+    TextRef value;
     Name name;
     Attribute next;
   };
-  static_assert(sizeof(AttributeRecord) == 16);
+  static_assert(sizeof(AttributeRecord) == 12);
 
   /// A tree with the document node alone and no handle; the first handle that goes ends it.
   static DOM_Tree* Create() { return new DOM_Tree; }
@@ -128,10 +123,15 @@ class DOM_Tree {
   static bool HasText(int inKind);  ///< whether nodes of a kind carry a text of their own
   static bool MayHaveChildren(int inKind);
   Node FirstChild(Node inNode) const {
-    return MayHaveChildren(At(inNode).kind) ? At(inNode).children.first : 0;
+    return MayHaveChildren(At(inNode).kind) ? At(inNode).firstChild : 0;
   }
   Node LastChild(Node inNode) const {
-    return MayHaveChildren(At(inNode).kind) ? At(inNode).children.last : 0;
+    const Node first = FirstChild(inNode);
+    return first == 0 ? 0 : At(first).previous;
+  }
+  Node PreviousSibling(Node inNode) const {
+    const Node previous = At(inNode).previous;
+    return previous != 0 && At(previous).next != 0 ? previous : 0;
   }
   /// The node after inNode in document order within inRoot and all below it; 0 at the end.
   Node NextWithin(Node inNode, Node inRoot) const;
@@ -139,12 +139,12 @@ class DOM_Tree {
   Node ChildAt(Node inParent, std::uint32_t inPosition);
   std::uint32_t AttributeCount(Node inElement);
   Attribute AttributeAtPosition(Node inElement, std::uint32_t inPosition);
-  Attribute FindAttribute(Node inElement, std::u16string_view inName) const;
-  /// The same for an ASCII name, which is what readers ask most: elements have few attributes, and
-  /// to compare their names costs less than to look up the number of the name.
-  Attribute FindAttribute(Node inElement, std::string_view inName) const;
+  Attribute FindAttribute(Node inElement, TextView inName) const;
   Node FirstChildOfKind(Node inParent, int inKind) const;
   const DOM_Text* NameText(Name inName) const { return names_.TextOf(inName); }
+  std::u16string_view NameUnits(Name inName) const { return names_.UnitsOf(inName); }
+  const DOM_Text* Text(TextRef inText) const { return inText == 0 ? nullptr : &texts_[inText]; }
+  const char16_t* Widen(const DOM_Text& inText) { return texts_.Widen(inText); }
   Name NameEnd() const { return names_.End(); }  ///< one more than the largest
   Node NodeEnd() const { return nodes_.End(); }
   const DocumentType& Doctype() const { return doctype_; }
@@ -152,19 +152,23 @@ class DOM_Tree {
 
   // Making parts; a node made here has no parent
   Name InternName(std::u16string_view inName) { return names_.Intern(inName); }
-  const DOM_Text* AddText(std::u16string_view inText) { return texts_.Add(inText); }
-  const DOM_Text* AddText(std::u16string_view inText, TextSeries& ioSeries) {
-    return texts_.Add(inText, ioSeries);
+  TextRef AddText(TextView inText) { return texts_.Add(inText); }
+  TextRef AddText(std::string_view inLatin1, TextSeries& ioSeries) {
+    return texts_.Add(inLatin1, ioSeries);
   }
-  Node NewDetached(int inKind, Name inName, const DOM_Text* inText);
+  Node NewDetached(int inKind, Name inName, TextRef inText);
   /// A detached copy of a node of this or another tree.
   Node Copy(const DOM_Tree& inSource, Node inNode, bool inDeep);
 
   // Filling a new document in document order, without checks and without counting changes
-  Node AppendNew(Node inParent, int inKind, Name inName, const DOM_Text* inText);
+  /// @param inLast the parent's last child so far, 0 for none.
+  Node AppendNew(Node inParent, Node inLast, int inKind, Name inName, TextRef inText);
+  /// Ends the children of a parent.
+  void EndChildren(Node inParent, Node inLast) {
+    if (inLast != 0) nodes_[nodes_[inParent].firstChild].previous = inLast;
+  }
   /// @param inLast the element's last attribute so far, 0 for none.
-  Attribute AppendNewAttribute(Node inElement, Attribute inLast, Name inName,
-                               const DOM_Text* inValue);
+  Attribute AppendNewAttribute(Node inElement, Attribute inLast, Name inName, TextRef inValue);
   void SetDoctype(const DocumentType& inDoctype) { doctype_ = inDoctype; }
 
   // Changing
@@ -172,10 +176,10 @@ class DOM_Tree {
   void Insert(Node inParent, Node inChild, Node inBefore);
   /// Takes a node away from its parent.
   void Remove(Node inChild);
-  void SetText(Node inNode, const DOM_Text* inText);
-  void SetAttributeValue(Node inElement, Attribute inAttribute, const DOM_Text* inValue);
-  void SetAttribute(Node inElement, std::u16string_view inName, const DOM_Text* inValue);
-  void RemoveAttribute(Node inElement, std::u16string_view inName);
+  void SetText(Node inNode, TextRef inText);
+  void SetAttributeValue(Node inElement, Attribute inAttribute, TextRef inValue);
+  void SetAttribute(Node inElement, std::u16string_view inName, TextRef inValue);
+  void RemoveAttribute(Node inElement, TextView inName);
 
  private:
   DOM_Tree();
@@ -183,10 +187,10 @@ class DOM_Tree {
 
   Node TakeNode();
   Attribute TakeAttribute();
-  Node NewNode(int inKind, Name inName, const DOM_Text* inText);
+  Node NewNode(int inKind, Name inName, TextRef inText);
   Node CopyOne(const DOM_Tree& inSource, Node inNode, DetachedNodes::Group inGroup);
   Name NameFrom(const DOM_Tree& inSource, Name inName);
-  const DOM_Text* TextFrom(const DOM_Tree& inSource, const DOM_Text* inText);
+  TextRef TextFrom(const DOM_Tree& inSource, TextRef inText);
 
   void LinkLast(Node inParent, Node inChild);
   void LinkBefore(Node inParent, Node inChild, Node inBefore);
@@ -225,7 +229,7 @@ class DOM_Tree {
   NameTable names_;
   ChunkedRecords<NodeRecord> nodes_;
   ChunkedRecords<AttributeRecord> attributes_;
-  Node freeNode_ = 0;  // chained by next
+  Node freeNode_ = 0;            // chained by next
   Attribute freeAttribute_ = 0;  // chained by next
   DocumentType doctype_;
   DetachedNodes detached_;

@@ -136,7 +136,7 @@ void DOM_Tree::FreeSubtree(Node inRoot) {
     // Children first: a node goes when it has none left.
     const Node child = FirstChild(at);
     if (child != 0) {
-      nodes_[at].children.first = nodes_[child].next;
+      nodes_[at].firstChild = nodes_[child].next;
       at = child;
       continue;
     }

@@ -5,83 +5,152 @@
 #include <stdexcept>
 
 namespace {
+
 constexpr std::size_t kFirstBlock = std::size_t{4} * 1024;
-constexpr std::size_t kMaxBlock = std::size_t{1024} * 1024;
 constexpr std::size_t kFirstSlots = 64;
 constexpr std::uint32_t kMaxNewInARow = 100;
+
+bool IsLatin1(std::u16string_view inUnits) {
+  char16_t all = 0;
+  for (const char16_t unit : inUnits) all |= unit;
+  return all < 0x100;
+}
+
 }  // namespace
 
-TextStore::TextStore() : nextBlock_(kFirstBlock), shared_(new Shared[kSharedSlots]()) {}
+void TextView::CopyTo(char16_t* outUnits) const {
+  if (isWide_) {
+    std::copy_n(static_cast<const char16_t*>(units_), length_, outUnits);
+  } else {
+    const auto* const bytes = static_cast<const unsigned char*>(units_);
+    for (std::size_t i = 0; i < length_; ++i) outUnits[i] = bytes[i];
+  }
+}
 
-const DOM_Text* TextStore::Add(std::u16string_view inText) {
-  if (inText.size() > kMaxShared) return AddUnshared(inText);
-  const std::uint64_t hash = HashOfText(inText);
+std::u16string TextView::ToUtf16() const {
+  std::u16string text(length_, u'\0');
+  CopyTo(text.data());
+  return text;
+}
+
+bool IsSameText(TextView inA, TextView inB) {
+  if (inA.Length() != inB.Length()) return false;
+  if (inA.IsWide() == inB.IsWide())
+    return inA.Length() == 0 || std::memcmp(inA.Data(), inB.Data(), inA.Bytes()) == 0;
+  return inA.IsWide() ? IsSameText(inA.Units(), inB.Latin1())
+                      : IsSameText(inB.Units(), inA.Latin1());
+}
+
+TextStore::TextStore() : shared_(new Shared[kSharedSlots]()) {
+  blocks_.emplace_back(new char[kFirstBlock]);
+  pages_.push_back(blocks_.back().get());
+  free_ = 1;  // 0 means no text
+  end_ = kFirstBlock / kStep;
+}
+
+TextRef TextStore::Add(TextView inText) {
+  if (!inText.IsWide() || !IsLatin1(inText.Units())) return AddStored(inText);
+  narrowed_.assign(inText.Units().begin(), inText.Units().end());
+  return AddStored(std::string_view(narrowed_));
+}
+
+TextRef TextStore::AddStored(TextView inText) {
+  return inText.Length() > kMaxShared ? AddUnshared(inText) : AddShared(inText);
+}
+
+TextRef TextStore::AddShared(TextView inText) {
+  const std::uint64_t hash = HashOfBytes(inText.Data(), inText.Bytes());
   Shared& slot = shared_[hash % kSharedSlots];
-  if (slot.hash != hash || slot.text == nullptr || !IsSameText(slot.text->View(), inText))
+  if (slot.text == 0 || slot.hash != hash || !IsSameText((*this)[slot.text].View(), inText))
     slot = {hash, AddUnshared(inText)};
   return slot.text;
 }
 
-const DOM_Text* TextStore::Add(std::u16string_view inText, TextSeries& ioSeries) {
-  if (ioSeries.last != nullptr && IsSameText(ioSeries.last->View(), inText)) {
+TextRef TextStore::Add(std::string_view inLatin1, TextSeries& ioSeries) {
+  if (ioSeries.last != nullptr && ioSeries.last->head == inLatin1.size() &&
+      std::memcmp(ioSeries.last->Latin1(), inLatin1.data(), inLatin1.size()) == 0) {
     ioSeries.newInARow = 0;
-    return ioSeries.last;
+    return ioSeries.lastRef;
   }
-  if (ioSeries.newInARow == kMaxNewInARow) return ioSeries.last = AddUnshared(inText);
-  const char* const before = free_;
-  ioSeries.last = Add(inText);
-  ioSeries.newInARow = free_ == before ? 0 : ioSeries.newInARow + 1;
-  return ioSeries.last;
-}
-
-const DOM_Text* TextStore::AddUnshared(std::u16string_view inText) {
-  if (inText.size() > std::numeric_limits<std::uint32_t>::max())
-    throw std::length_error("a text is longer than 4,294,967,295 units");
-  const std::size_t bytes = sizeof(DOM_Text) + inText.size() * sizeof(char16_t);
-  DOM_Text* text = new (Allocate((bytes + 3) & ~std::size_t{3}))
-      DOM_Text{static_cast<std::uint32_t>(inText.size())};
-  std::copy(inText.begin(), inText.end(), text->Units());
-  return text;
-}
-
-char* TextStore::Allocate(std::size_t inBytes) {
-  if (static_cast<std::size_t>(end_ - free_) < inBytes) return AllocateBlock(inBytes);
-  char* const place = free_;
-  free_ += inBytes;
-  return place;
-}
-
-char* TextStore::AllocateBlock(std::size_t inBytes) {
-  if (inBytes > nextBlock_ / 4) {  // a block of its own; the current one stays in use
-    blocks_.emplace_back(new char[inBytes]);
-    return blocks_.back().get();
+  if (ioSeries.newInARow == kMaxNewInARow) {
+    ioSeries.lastRef = AddUnshared(inLatin1);
+  } else {
+    const TextRef before = free_;
+    ioSeries.lastRef = AddStored(inLatin1);
+    ioSeries.newInARow = free_ == before ? 0 : ioSeries.newInARow + 1;
   }
-  blocks_.emplace_back(new char[nextBlock_]);
-  free_ = blocks_.back().get();
-  end_ = free_ + nextBlock_;
-  nextBlock_ = std::min(nextBlock_ * 2, kMaxBlock);
-  return Allocate(inBytes);
+  ioSeries.last = &(*this)[ioSeries.lastRef];
+  return ioSeries.lastRef;
+}
+
+TextRef TextStore::AddUnshared(TextView inText) {
+  if (inText.Length() > DOM_Text::kMaxLength)
+    throw std::length_error("a text is longer than 2,147,483,647 characters");
+  const TextRef ref = Allocate(sizeof(DOM_Text) + inText.Bytes());
+  char* const place = pages_[ref >> kPageBits] + (ref & (kPageSteps - 1)) * kStep;
+  const auto length = static_cast<std::uint32_t>(inText.Length());
+  DOM_Text* const text = new (place) DOM_Text{inText.IsWide() ? length | DOM_Text::kWide : length};
+  if (length != 0) std::memcpy(text + 1, inText.Data(), inText.Bytes());
+  return ref;
+}
+
+const DOM_Text* TextStore::AddWide(std::u16string_view inUnits) {
+  return &(*this)[AddUnshared(inUnits)];
+}
+
+const char16_t* TextStore::Widen(const DOM_Text& inText) {
+  if (inText.IsWide()) return inText.Units();
+  std::unique_ptr<char16_t[]>& units = widened_[&inText];
+  if (!units) {
+    units.reset(new char16_t[inText.Length()]);
+    inText.View().CopyTo(units.get());
+  }
+  return units.get();
+}
+
+TextRef TextStore::Allocate(std::size_t inBytes) {
+  const std::size_t steps = (inBytes + kStep - 1) / kStep;
+  if (end_ - free_ < steps) {
+    if (steps > kPageSteps / 4) {  // pages of its own; the current one stays in use
+      const auto ref = static_cast<TextRef>(pages_.size() << kPageBits);
+      AddPages(inBytes);
+      return ref;
+    }
+    free_ = static_cast<TextRef>(pages_.size() << kPageBits);
+    AddPages(kPageBytes);
+    end_ = free_ + kPageSteps;
+  }
+  const TextRef ref = free_;
+  free_ += static_cast<TextRef>(steps);
+  return ref;
+}
+
+void TextStore::AddPages(std::size_t inBytes) {
+  const std::size_t count = (inBytes + kPageBytes - 1) / kPageBytes;
+  if (pages_.size() + count > (std::size_t{1} << (32 - kPageBits)))
+    throw std::length_error("a document has more than 16 GB of texts");
+  blocks_.emplace_back(new char[std::max(inBytes, kPageBytes)]);
+  for (std::size_t page = 0; page < count; ++page)
+    pages_.push_back(blocks_.back().get() + page * kPageBytes);
 }
 
 NameTable::NameTable(TextStore& ioTexts) : texts_(ioTexts), names_(1), slots_(kFirstSlots) {
-  names_[0] = texts_.Add({});
+  names_[0] = texts_.AddWide({});
 }
 
 std::size_t NameTable::SlotOf(std::u16string_view inName) const {
   const std::size_t mask = slots_.size() - 1;
-  std::size_t slot = HashOfText(inName) & mask;
-  while (slots_[slot] != 0 && !IsSameText(names_[slots_[slot]]->View(), inName))
-    slot = (slot + 1) & mask;
+  std::size_t slot = HashOfBytes(inName.data(), inName.size() * sizeof(char16_t)) & mask;
+  while (slots_[slot] != 0 && !IsSameText(UnitsOf(slots_[slot]), inName)) slot = (slot + 1) & mask;
   return slot;
 }
-
-std::uint32_t NameTable::Find(std::u16string_view inName) const { return slots_[SlotOf(inName)]; }
 
 std::uint32_t NameTable::Intern(std::u16string_view inName) {
   const std::size_t slot = SlotOf(inName);
   if (slots_[slot] != 0) return slots_[slot];
   const std::uint32_t name = End();
-  names_.push_back(texts_.AddUnshared(inName));
+  if (name == kMaxNames) throw std::length_error("a document has more than 16,777,215 names");
+  names_.push_back(texts_.AddWide(inName));
   slots_[slot] = name;
   if (names_.size() * 2 > slots_.size()) Grow();
   return name;
@@ -89,5 +158,5 @@ std::uint32_t NameTable::Intern(std::u16string_view inName) {
 
 void NameTable::Grow() {
   slots_.assign(slots_.size() * 2, 0);
-  for (std::uint32_t name = 1; name < End(); ++name) slots_[SlotOf(names_[name]->View())] = name;
+  for (std::uint32_t name = 1; name < End(); ++name) slots_[SlotOf(UnitsOf(name))] = name;
 }

@@ -6,18 +6,10 @@
 #include <cstdint>
 #include <cstring>
 #include <memory>
+#include <string>
 #include <string_view>
+#include <unordered_map>
 #include <vector>
-
-/// An immutable UTF-16 text: this head, then the code units. It lies in the arena of a tree, or in a
-/// counted block of its own (see OwnedText in DOMString.cpp).
-struct DOM_Text {
-  std::uint32_t length;
-
-  const char16_t* Units() const { return reinterpret_cast<const char16_t*>(this + 1); }
-  char16_t* Units() { return reinterpret_cast<char16_t*>(this + 1); }
-  std::u16string_view View() const { return {Units(), length}; }
-};
 
 /// As ==, which the standard library does unit by unit.
 inline bool IsSameText(std::u16string_view inA, std::u16string_view inB) {
@@ -25,37 +17,69 @@ inline bool IsSameText(std::u16string_view inA, std::u16string_view inB) {
          (inA.empty() || std::memcmp(inA.data(), inB.data(), inA.size() * sizeof(char16_t)) == 0);
 }
 
-/// The same for an ASCII text; bytes beyond ASCII are taken as Latin-1.
-inline bool IsSameText(std::u16string_view inText, std::string_view inAscii) {
-  if (inText.size() != inAscii.size()) return false;
-  for (std::size_t i = 0; i < inAscii.size(); ++i)
-    if (inText[i] != static_cast<unsigned char>(inAscii[i])) return false;
+/// The same of UTF-16 and Latin-1.
+inline bool IsSameText(std::u16string_view inText, std::string_view inLatin1) {
+  if (inText.size() != inLatin1.size()) return false;
+  for (std::size_t i = 0; i < inLatin1.size(); ++i)
+    if (inText[i] != static_cast<unsigned char>(inLatin1[i])) return false;
   return true;
 }
 
-/// A fast hash of UTF-16 text, eight bytes at a time.
-inline std::uint64_t HashOfText(std::u16string_view inText) {
-  constexpr std::uint64_t kFactor = 0x9E3779B97F4A7C15u;
-  std::uint64_t hash = inText.size() * kFactor;
-  const char16_t* at = inText.data();
-  std::size_t left = inText.size() * sizeof(char16_t);
-  for (; left >= 8; left -= 8, at += 4) {
-    std::uint64_t part;
-    std::memcpy(&part, at, 8);
-    hash = (hash ^ part) * kFactor;
-    hash ^= hash >> 29;
+/// Characters as they are stored: Latin-1 or UTF-16.
+class TextView {
+ public:
+  TextView(std::string_view inLatin1)
+      : units_(inLatin1.data()), length_(inLatin1.size()), isWide_(false) {}
+  TextView(std::u16string_view inUnits)
+      : units_(inUnits.data()), length_(inUnits.size()), isWide_(true) {}
+
+  std::size_t Length() const { return length_; }
+  bool IsWide() const { return isWide_; }
+  std::string_view Latin1() const { return {static_cast<const char*>(units_), length_}; }
+  std::u16string_view Units() const { return {static_cast<const char16_t*>(units_), length_}; }
+  const void* Data() const { return units_; }
+  std::size_t Bytes() const { return length_ * (isWide_ ? sizeof(char16_t) : 1); }
+
+  /// @param outUnits room for Length() units.
+  void CopyTo(char16_t* outUnits) const;
+  std::u16string ToUtf16() const;
+
+ private:
+  const void* units_;
+  std::size_t length_;
+  bool isWide_;
+};
+
+bool IsSameText(TextView inA, TextView inB);
+
+/// An immutable text: this head, then its characters. The texts of a tree are Latin-1 where every
+/// character fits a byte, else UTF-16; equal ones are therefore equal bytes. Those that strings own
+/// (see DOMString.cpp) are always UTF-16, so that all 32 bits count their units.
+struct DOM_Text {
+  static constexpr std::uint32_t kWide = std::uint32_t{1} << 31;
+  static constexpr std::uint32_t kMaxLength = kWide - 1;  // of a tree's text
+
+  std::uint32_t head;
+
+  std::uint32_t Length() const { return head & kMaxLength; }
+  bool IsWide() const { return (head & kWide) != 0; }
+  const char* Latin1() const { return reinterpret_cast<const char*>(this + 1); }
+  const char16_t* Units() const { return reinterpret_cast<const char16_t*>(this + 1); }
+  char16_t* Units() { return reinterpret_cast<char16_t*>(this + 1); }
+  TextView View() const {
+    if (IsWide()) return std::u16string_view(Units(), Length());
+    return std::string_view(Latin1(), Length());
   }
-  if (left > 0) {
-    std::uint64_t part = 0;
-    std::memcpy(&part, at, left);
-    hash = (hash ^ part) * kFactor;
-  }
-  return hash ^ (hash >> 32);
-}
+  std::u16string_view OwnedView() const { return {Units(), head}; }
+};
+
+/// Where a text lies in its store, in steps of four bytes; 0 for none.
+using TextRef = std::uint32_t;
 
 /// The recent texts of one source, such as one attribute of one kind of element.
 struct TextSeries {
   const DOM_Text* last = nullptr;
+  TextRef lastRef = 0;
   std::uint32_t newInARow = 0;
 };
 
@@ -64,39 +88,57 @@ struct TextSeries {
 class TextStore {
  public:
   TextStore();
-  const DOM_Text* Add(std::u16string_view inText);
+  const DOM_Text& operator[](TextRef inText) const {
+    return *reinterpret_cast<const DOM_Text*>(pages_[inText >> kPageBits] +
+                                              (inText & (kPageSteps - 1)) * kStep);
+  }
+  TextRef Add(TextView inText);
   /// As Add. After a long run of different texts, as of numbers, only the last one is compared.
-  const DOM_Text* Add(std::u16string_view inText, TextSeries& ioSeries);
-  /// As Add, without looking for an equal text.
-  const DOM_Text* AddUnshared(std::u16string_view inText);
+  TextRef Add(std::string_view inLatin1, TextSeries& ioSeries);
+  /// As Add, as UTF-16 and without looking for an equal text.
+  const DOM_Text* AddWide(std::u16string_view inUnits);
+  /// The units of a text as UTF-16, kept as long as the store.
+  const char16_t* Widen(const DOM_Text& inText);
 
  private:
   /// A recent text with its hash, so that most others need not be compared.
   struct Shared {
     std::uint64_t hash;
-    const DOM_Text* text;
+    TextRef text;
   };
-  char* Allocate(std::size_t inBytes);
-  char* AllocateBlock(std::size_t inBytes);
+  TextRef AddStored(TextView inText);
+  TextRef AddShared(TextView inText);
+  TextRef AddUnshared(TextView inText);
+  TextRef Allocate(std::size_t inBytes);
+  void AddPages(std::size_t inBytes);
 
+  static constexpr std::size_t kStep = 4;
+  static constexpr std::uint32_t kPageBits = 14;
+  static constexpr std::uint32_t kPageSteps = 1u << kPageBits;
+  static constexpr std::size_t kPageBytes = kPageSteps * kStep;
   static constexpr std::size_t kSharedSlots = 4096;
   static constexpr std::size_t kMaxShared = 64;
 
   std::vector<std::unique_ptr<char[]>> blocks_;
-  char* free_ = nullptr;
-  char* end_ = nullptr;
-  std::size_t nextBlock_;
+  std::vector<char*> pages_;  // of kPageBytes each; a large text spans several
+  TextRef free_ = 0;
+  TextRef end_ = 0;
   std::unique_ptr<Shared[]> shared_;
+  std::string narrowed_;
+  std::unordered_map<const DOM_Text*, std::unique_ptr<char16_t[]>> widened_;
 };
 
 /// Numbers the names of a document: equal names have equal numbers, from 1.
 class NameTable {
  public:
+  static constexpr std::uint32_t kMaxNames = 1u << 24;
+
   explicit NameTable(TextStore& ioTexts);
   std::uint32_t Intern(std::u16string_view inName);
-  /// @return 0 for a name that the document does not have.
-  std::uint32_t Find(std::u16string_view inName) const;
   const DOM_Text* TextOf(std::uint32_t inName) const { return names_[inName]; }
+  std::u16string_view UnitsOf(std::uint32_t inName) const {
+    return {names_[inName]->Units(), names_[inName]->Length()};
+  }
   /// One more than the largest number.
   std::uint32_t End() const { return static_cast<std::uint32_t>(names_.size()); }
 
@@ -108,5 +150,24 @@ class NameTable {
   std::vector<const DOM_Text*> names_;
   std::vector<std::uint32_t> slots_;  // open addressing; a power of two
 };
+
+/// A fast hash of bytes, eight at a time.
+inline std::uint64_t HashOfBytes(const void* inBytes, std::size_t inCount) {
+  constexpr std::uint64_t kFactor = 0x9E3779B97F4A7C15u;
+  std::uint64_t hash = inCount * kFactor;
+  const char* at = static_cast<const char*>(inBytes);
+  for (; inCount >= 8; inCount -= 8, at += 8) {
+    std::uint64_t part;
+    std::memcpy(&part, at, 8);
+    hash = (hash ^ part) * kFactor;
+    hash ^= hash >> 29;
+  }
+  if (inCount > 0) {
+    std::uint64_t part = 0;
+    std::memcpy(&part, at, inCount);
+    hash = (hash ^ part) * kFactor;
+  }
+  return hash ^ (hash >> 32);
+}
 
 #endif

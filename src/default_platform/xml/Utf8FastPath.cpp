@@ -1,125 +1,466 @@
 #include "default_platform/xml/Utf8FastPath.h"
 
 #include <algorithm>
-#include <bit>
 #include <cstring>
-#include <xercesc/util/XMLUni.hpp>
 
-#include "foundation/Utf8.h"
+#include "default_platform/xml/XMLChars.h"
 
 namespace {
 
+constexpr std::size_t kFirstWindow = std::size_t{16} * 1024;
+constexpr std::size_t kUsualWindow = std::size_t{256} * 1024;
+// Larger constructs are for the full scanner, which limits them.
+constexpr std::size_t kMaxWindow = std::size_t{64} * 1024 * 1024;
+constexpr std::size_t kMaxDepth = 1'000'000;
+// What is wrong so near the end of the window may only be cut off; longest is "<![CDATA[".
+constexpr std::ptrdiff_t kMaxLookahead = 16;
+constexpr std::size_t kFirstSlots = 256;
 constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
-constexpr std::string_view kFirstBytes = "< \t\r\n";  // of documents that can be read
 
-bool IsUtf8Name(std::string_view inName) {
+bool IsBlank(char inByte) {
+  return inByte == ' ' || inByte == '\n' || inByte == '\t' || inByte == '\r';
+}
+
+const char* AfterBlanks(const char* inPlace) {
+  while (IsBlank(*inPlace)) ++inPlace;
+  return inPlace;
+}
+
+bool StartsWith(const char* inPlace, std::string_view inText) {
+  return std::memcmp(inPlace, inText.data(), inText.size()) == 0;
+}
+
+bool IsContinuation(char inByte) { return (inByte & 0xC0) == 0x80; }
+
+/// The character that begins at a byte beyond ASCII (Unicode Standard, table 3-7).
+/// @return its bytes; 0 when they are ill-formed.
+int DecodeCharacter(const char* inPlace, char32_t& outCharacter) {
+  const auto byte = [inPlace](int inAt) { return static_cast<unsigned char>(inPlace[inAt]); };
+  const unsigned char lead = byte(0);
+  if (lead < 0xC2 || lead > 0xF4 || !IsContinuation(inPlace[1])) return 0;
+  if (lead < 0xE0) {
+    outCharacter = static_cast<char32_t>((lead & 0x1F) << 6 | (byte(1) & 0x3F));
+    return 2;
+  }
+  if (!IsContinuation(inPlace[2])) return 0;
+  if (lead < 0xF0) {
+    outCharacter =
+        static_cast<char32_t>((lead & 0x0F) << 12 | (byte(1) & 0x3F) << 6 | (byte(2) & 0x3F));
+    return outCharacter < 0x800 || (outCharacter >= 0xD800 && outCharacter < 0xE000) ? 0 : 3;
+  }
+  if (!IsContinuation(inPlace[3])) return 0;
+  outCharacter = static_cast<char32_t>((lead & 0x07) << 18 | (byte(1) & 0x3F) << 12 |
+                                       (byte(2) & 0x3F) << 6 | (byte(3) & 0x3F));
+  return outCharacter < 0x10000 || outCharacter > 0x10FFFF ? 0 : 4;
+}
+
+void Append(char32_t inCharacter, std::u16string& ioText) {
+  if (inCharacter < 0x10000) {
+    ioText += static_cast<char16_t>(inCharacter);
+  } else {
+    ioText += static_cast<char16_t>(0xD7C0 + (inCharacter >> 10));
+    ioText += static_cast<char16_t>(0xDC00 + (inCharacter & 0x3FF));
+  }
+}
+
+int DigitOf(char inByte, int inBase) {
+  if (inByte >= '0' && inByte <= '9') return inByte - '0';
+  if (inBase == 10) return -1;
+  const char small = static_cast<char>(inByte | 0x20);
+  return small >= 'a' && small <= 'f' ? small - 'a' + 10 : -1;
+}
+
+/// Takes one pseudo-attribute of an XML declaration, with the blanks before it.
+/// @return whether there is one of that name; outValue is then its value.
+bool TakePseudoAttribute(const char*& ioPlace, std::string_view inName,
+                         std::string_view& outValue) {
+  const char* at = AfterBlanks(ioPlace);
+  if (at == ioPlace || !StartsWith(at, inName)) return false;
+  at = AfterBlanks(at + inName.size());
+  if (*at != '=') return false;
+  at = AfterBlanks(at + 1);
+  const char quote = *at;
+  if (quote != '"' && quote != '\'') return false;
+  const char* const value = ++at;
+  while (*at != quote && *at > ' ') ++at;
+  if (*at != quote) return false;
+  outValue = {value, static_cast<std::size_t>(at - value)};
+  ioPlace = at + 1;
+  return true;
+}
+
+bool IsUtf8(std::string_view inEncoding) {
   constexpr std::string_view kName = "utf-8";
-  return std::equal(inName.begin(), inName.end(), kName.begin(), kName.end(),
+  return std::equal(inEncoding.begin(), inEncoding.end(), kName.begin(), kName.end(),
                     [](char inA, char inB) { return inA == inB || (inA | 0x20) == inB; });
 }
 
-/// Whether a text's XML declaration, if there is one, leaves it UTF-8.
-bool DeclaresUtf8(std::string_view inText) {
-  constexpr std::string_view kStart = "<?xml";
-  if (!inText.starts_with(kStart)) return true;
-  const std::string_view declaration = inText.substr(0, inText.find("?>"));
-  const std::size_t encoding = declaration.find("encoding");
-  if (encoding == std::string_view::npos) return declaration.size() < inText.size();
-  const std::size_t quote = declaration.find_first_of("'\"", encoding);
-  if (quote == std::string_view::npos) return false;
-  const std::size_t end = declaration.find(declaration[quote], quote + 1);
-  return end != std::string_view::npos &&
-         IsUtf8Name(declaration.substr(quote + 1, end - quote - 1));
-}
-
-/// How many bytes at the end of a text begin a character without ending it.
-std::size_t UnfinishedBytes(std::string_view inText) {
-  for (std::size_t count = 1; count <= std::min<std::size_t>(3, inText.size()); ++count) {
-    const auto byte = static_cast<unsigned char>(inText[inText.size() - count]);
-    if (byte < 0x80) return 0;
-    if (byte < 0xC0) continue;
-    // The ones at the head of a lead byte count the character's bytes.
-    return static_cast<std::size_t>(std::countl_one(byte)) > count ? count : 0;
-  }
-  return 0;
-}
-
-// A block at a time without branches, which compilers turn into vector instructions.
-bool HasReplacement(std::u16string_view inText) {
-  constexpr std::size_t kBlock = 64;
-  while (inText.size() >= kBlock) {
-    unsigned int hits = 0;
-    for (std::size_t i = 0; i < kBlock; ++i)
-      hits |= inText[i] == ZORFoundation::kReplacementCharacter;
-    if (hits) return true;
-    inText.remove_prefix(kBlock);
-  }
-  return inText.find(ZORFoundation::kReplacementCharacter) != std::u16string_view::npos;
-}
-
-class Utf8Stream : public xercesc::BinInputStream {
- public:
-  explicit Utf8Stream(Utf8FastPath& ioText) : text_(ioText) {}
-  XMLFilePos curPos() const override { return bytesRead_; }
-  XMLSize_t readBytes(XMLByte* const outBytes, const XMLSize_t inMax) override {
-    const XMLSize_t count =
-        text_.Read(reinterpret_cast<char16_t*>(outBytes), inMax / sizeof(char16_t)) *
-        sizeof(char16_t);
-    bytesRead_ += count;
-    return count;
-  }
-  const XMLCh* getContentType() const override { return nullptr; }
-
- private:
-  Utf8FastPath& text_;
-  XMLFilePos bytesRead_ = 0;
-};
-
 }  // namespace
 
-Utf8FastPath::Utf8FastPath(ByteReader& ioReader) : reader_(ioReader), bytes_(new char[kMaxBytes]) {}
-
-std::size_t Utf8FastPath::Read(char16_t* outUnits, std::size_t inMax) {
-  std::string_view bytes = NextBytes(std::min(inMax, kMaxBytes));
-  if (bytes.empty()) return 0;
-  if (++reads_ == 1) bytes = WithoutMark(bytes);
-  last_ = bytes;
-  const std::size_t count = ZORFoundation::DecodeUtf8(bytes, outUnits);
-  if (HasReplacement({outUnits, count})) throw NeedsFullScanner();
-  return count;
+Utf8FastPath::Utf8FastPath(ByteReader& ioReader, DOM_Tree& ioTree)
+    : reader_(ioReader),
+      tree_(ioTree),
+      window_(new char[kFirstWindow + ByteSearch::kPadding]),
+      windowBytes_(kFirstWindow),
+      slots_(kFirstSlots) {
+  at_ = end_ = window_.get();
+  open_.push_back({DOM_Tree::kDocument, 0, nullptr});
 }
 
-// Whole characters only; the start of one whose end has not been read stays for the next time.
-std::string_view Utf8FastPath::NextBytes(std::size_t inMax) {
-  std::size_t count = filled_ - used_;
-  std::memmove(bytes_.get(), bytes_.get() + used_, count);
-  std::size_t unfinished = 0;
-  do {
-    const std::size_t added =
-        reader_.Read(reinterpret_cast<unsigned char*>(bytes_.get()) + count, inMax - count);
-    if (added == 0 && count != 0) throw NeedsFullScanner();  // ends within a character
-    count += added;
-    unfinished = UnfinishedBytes({bytes_.get(), count});
-  } while (count != 0 && unfinished == count);
-  filled_ = count;
-  used_ = count - unfinished;
-  return {bytes_.get(), used_};
+void Utf8FastPath::Read() {
+  ReadMore();
+  if (end_ - at_ >= 3 && StartsWith(at_, kByteOrderMark)) at_ += kByteOrderMark.size();
+  ReadDeclaration();
+  ReadContent();
+  if (!hasRoot_ || open_.size() != 1) throw NeedsFullScanner();
+  tree_.EndChildren(DOM_Tree::kDocument, open_.back().lastChild);
 }
 
-std::string_view Utf8FastPath::WithoutMark(std::string_view inText) {
-  if (inText.starts_with(kByteOrderMark)) inText.remove_prefix(kByteOrderMark.size());
-  const bool isText = !inText.empty() && kFirstBytes.find(inText[0]) != std::string_view::npos;
-  if (!isText || !DeclaresUtf8(inText)) throw NeedsFullScanner();
-  return inText;
+// ---- bytes
+
+// Moves what is left to the front of the window, which grows when that is most of it.
+void Utf8FastPath::ReadMore() {
+  const auto kept = static_cast<std::size_t>(end_ - at_);
+  std::size_t bytes = windowBytes_;
+  if (kept * 2 > bytes) bytes *= 2;
+  if (reader_.BytesRead() != 0) bytes = std::max(bytes, kUsualWindow);
+  if (bytes > kMaxWindow) throw NeedsFullScanner();
+  if (bytes != windowBytes_) {
+    std::unique_ptr<char[]> larger(new char[bytes + ByteSearch::kPadding]);
+    std::memcpy(larger.get(), at_, kept);
+    window_ = std::move(larger);
+    windowBytes_ = bytes;
+  } else {
+    std::memmove(window_.get(), at_, kept);
+  }
+  char* const begin = window_.get();
+  std::size_t filled = kept;
+  for (std::size_t count = 1; count != 0 && filled < windowBytes_; filled += count)
+    count = reader_.Read(reinterpret_cast<unsigned char*>(begin) + filled, windowBytes_ - filled);
+  isAllRead_ = filled < windowBytes_;
+  at_ = begin;
+  end_ = begin + filled;
+  std::memset(begin + filled, 0, ByteSearch::kPadding);
 }
 
-bool Utf8FastPath::MayHaveDoctype() const {
-  return reads_ != 1 || last_.find("<!DOCTYPE") != std::string_view::npos;
+void Utf8FastPath::Stop(const char* inPlace) const {
+  if (!isAllRead_ && end_ - inPlace < kMaxLookahead) throw EndOfWindow();
+  throw NeedsFullScanner();
 }
 
-Utf8Entity::Utf8Entity(Utf8FastPath& ioText) : text_(ioText) {
-  setEncoding(std::endian::native == std::endian::little ? xercesc::XMLUni::fgUTF16LEncodingString
-                                                         : xercesc::XMLUni::fgUTF16BEncodingString);
+// ---- the document
+
+void Utf8FastPath::ReadDeclaration() {
+  if (!StartsWith(at_, "<?xml") || !IsBlank(at_[5])) return;
+  const char* at = at_ + 5;
+  std::string_view value;
+  if (!TakePseudoAttribute(at, "version", value) || value != "1.0") throw NeedsFullScanner();
+  if (TakePseudoAttribute(at, "encoding", value) && !IsUtf8(value)) throw NeedsFullScanner();
+  if (TakePseudoAttribute(at, "standalone", value) && value != "yes" && value != "no")
+    throw NeedsFullScanner();
+  at = AfterBlanks(at);
+  if (at[0] != '?' || at[1] != '>') throw NeedsFullScanner();
+  at_ = at + 2;
 }
 
-xercesc::BinInputStream* Utf8Entity::makeStream() const { return new Utf8Stream(text_); }
+void Utf8FastPath::ReadContent() {
+  while (true) {
+    try {
+      while (open_.size() > 1 || at_ != end_) ReadOne();
+      if (isAllRead_) return;
+    } catch (const EndOfWindow&) {
+    }
+    ReadMore();
+  }
+}
+
+void Utf8FastPath::ReadOne() {
+  if (*at_ == '<')
+    ReadMarkup();
+  else if (open_.size() > 1)
+    ReadText();
+  else
+    SkipBlanks();
+}
+
+void Utf8FastPath::ReadMarkup() {
+  switch (at_[1]) {
+    case '/':
+      return ReadEndTag();
+    case '?':
+      return ReadInstruction();
+    case '!':
+      return at_[2] == '-' ? ReadComment() : ReadSection();
+    default:
+      return ReadStartTag();
+  }
+}
+
+// White space around the root is no part of the tree.
+void Utf8FastPath::SkipBlanks() {
+  const char* const at = AfterBlanks(at_);
+  if (at != end_ && *at != '<') throw NeedsFullScanner();
+  at_ = at;
+}
+
+// ---- elements
+
+void Utf8FastPath::ReadStartTag() {
+  const char* at = at_ + 1;
+  const char* const nameEnd = NameEnd(at);
+  if (open_.size() == 1 && hasRoot_) throw NeedsFullScanner();
+  Name& name = FindName(at, nameEnd);
+  at = ReadAttributes(nameEnd, name);
+  const bool isEmpty = *at == '/';
+  if (at[isEmpty ? 1 : 0] != '>') Stop(at);
+  if (open_.size() > kMaxDepth) throw NeedsFullScanner();
+
+  hasRoot_ = true;
+  OpenElement& parent = open_.back();
+  const DOM_Tree::Node element =
+      tree_.AppendNew(parent.node, parent.lastChild, DOM_Node::ELEMENT_NODE, name.number, 0);
+  parent.lastChild = element;
+  DOM_Tree::Attribute last = 0;
+  for (const ReadAttribute& attribute : attributes_)
+    last = tree_.AppendNewAttribute(element, last, attribute.name, attribute.value);
+  at_ = at + (isEmpty ? 2 : 1);
+  if (!isEmpty) open_.push_back({element, 0, &name});
+}
+
+// Reads up to the end of the tag; what ends it is left to the caller.
+const char* Utf8FastPath::ReadAttributes(const char* inPlace, Name& ioElement) {
+  attributes_.clear();
+  const std::uint64_t element = ++elements_;
+  const char* at = inPlace;
+  for (std::size_t position = 0;; ++position) {
+    const char* const before = at;
+    at = AfterBlanks(at);
+    if (*at == '>' || *at == '/') return at;
+    if (at == before) Stop(at);
+    if (position == ioElement.attributes.size()) ioElement.attributes.emplace_back();
+    AttributeShape& shape = ioElement.attributes[position];
+    if (shape.name != nullptr && IsNext(at, *shape.name) && at[shape.name->utf8.size()] == '=') {
+      at += shape.name->utf8.size();
+    } else {
+      const char* const nameEnd = NameEnd(at);
+      Name& name = FindName(at, nameEnd);
+      if (shape.name != &name) shape = {&name, {}};
+      at = AfterBlanks(nameEnd);
+    }
+    if (shape.name->element == element) throw NeedsFullScanner();  // it has the attribute twice
+    shape.name->element = element;
+    if (*at != '=') Stop(at);
+    at = AfterBlanks(at + 1);
+    attributes_.push_back({shape.name->number, ReadValue(at, shape.values)});
+  }
+}
+
+TextRef Utf8FastPath::ReadValue(const char*& ioPlace, TextSeries& ioSeries) {
+  const char quote = *ioPlace;
+  if (quote != '"' && quote != '\'') Stop(ioPlace);
+  const char* const value = ioPlace + 1;
+  const char* at = search_.EndOfValue(value, quote);
+  if (*at == quote) {
+    ioPlace = at + 1;
+    return tree_.AddText({value, static_cast<std::size_t>(at - value)}, ioSeries);
+  }
+  text_.assign(value, at);
+  while (*at != quote) {
+    if (*at == '<') Stop(at);
+    if (*at == '&') {
+      at = AppendReference(at);
+    } else if (IsBlank(*at)) {  // normalised; a line end of two is one
+      at += at[0] == '\r' && at[1] == '\n' ? 2 : 1;
+      text_ += u' ';
+    } else {
+      at = AppendCharacter(at);
+    }
+  }
+  ioPlace = at + 1;
+  return tree_.AddText(std::u16string_view(text_));
+}
+
+void Utf8FastPath::ReadEndTag() {
+  if (open_.size() == 1) throw NeedsFullScanner();
+  const OpenElement& element = open_.back();
+  const char* at = at_ + 2;
+  if (!IsNext(at, *element.name)) {
+    if (end_ - at <= static_cast<std::ptrdiff_t>(element.name->utf8.size())) Stop(end_);
+    throw NeedsFullScanner();
+  }
+  at = AfterBlanks(at + element.name->utf8.size());
+  if (*at != '>') Stop(at);
+  at_ = at + 1;
+  tree_.EndChildren(element.node, element.lastChild);
+  open_.pop_back();
+}
+
+// ---- names
+
+bool Utf8FastPath::IsNext(const char* inPlace, const Name& inName) const {
+  return end_ - inPlace > static_cast<std::ptrdiff_t>(inName.utf8.size()) &&
+         StartsWith(inPlace, inName.utf8);
+}
+
+const char* Utf8FastPath::NameEnd(const char* inPlace) const {
+  const char first = *inPlace;
+  if (first == '-' || first == '.' || (first >= '0' && first <= '9')) Stop(inPlace);
+  const char* at = search_.EndOfName(inPlace);
+  while (static_cast<signed char>(*at) < 0) {
+    char32_t character = 0;
+    const int bytes = DecodeCharacter(at, character);
+    if (bytes == 0 || character > 0xFFFF) Stop(at);
+    if (at == inPlace ? !IsNameStart(character) : !IsNameCharacter(character)) Stop(at);
+    at = search_.EndOfName(at + bytes);
+  }
+  if (at == inPlace || at == end_) Stop(at);
+  return at;
+}
+
+Utf8FastPath::Name& Utf8FastPath::FindName(const char* inPlace, const char* inEnd) {
+  const auto length = static_cast<std::size_t>(inEnd - inPlace);
+  const std::uint64_t hash = HashOfBytes(inPlace, length);
+  const std::size_t mask = slots_.size() - 1;
+  std::size_t slot = hash & mask;
+  for (; slots_[slot] != nullptr; slot = (slot + 1) & mask) {
+    Name& known = *slots_[slot];
+    if (known.hash == hash && std::string_view(inPlace, length) == known.utf8) return known;
+  }
+  text_.clear();
+  for (const char* at = inPlace; at != inEnd;) at = AppendCharacter(at);
+  names_.push_back(std::make_unique<Name>());
+  Name& name = *names_.back();
+  name.number = tree_.InternName(text_);
+  name.utf8.assign(inPlace, inEnd);
+  name.hash = hash;
+  slots_[slot] = &name;
+  if (names_.size() * 2 > slots_.size()) GrowNames();
+  return name;
+}
+
+void Utf8FastPath::GrowNames() {
+  slots_.assign(slots_.size() * 2, nullptr);
+  const std::size_t mask = slots_.size() - 1;
+  for (const std::unique_ptr<Name>& name : names_) {
+    std::size_t slot = name->hash & mask;
+    while (slots_[slot] != nullptr) slot = (slot + 1) & mask;
+    slots_[slot] = name.get();
+  }
+}
+
+// ---- text
+
+void Utf8FastPath::AppendNode(int inKind, DOM_Tree::Name inName, TextRef inText) {
+  OpenElement& parent = open_.back();
+  parent.lastChild = tree_.AppendNew(parent.node, parent.lastChild, inKind, inName, inText);
+}
+
+void Utf8FastPath::ReadText() {
+  const char* at = search_.EndOfText(at_);
+  if (*at == '<') {
+    AppendNode(DOM_Node::TEXT_NODE, 0,
+               tree_.AddText(std::string_view(at_, static_cast<std::size_t>(at - at_))));
+    at_ = at;
+    return;
+  }
+  text_.assign(at_, at);
+  while (*at != '<') {
+    if (*at == '&') {
+      at = AppendReference(at);
+      continue;
+    }
+    if (*at == ']' && at[1] == ']' && at[2] == '>') throw NeedsFullScanner();
+    at = AppendCharacter(at);
+    const char* const plain = search_.EndOfText(at);
+    text_.append(at, plain);
+    at = plain;
+  }
+  AppendNode(DOM_Node::TEXT_NODE, 0, tree_.AddText(std::u16string_view(text_)));
+  at_ = at;
+}
+
+// Line ends become line feeds.
+const char* Utf8FastPath::AppendCharacter(const char* inPlace) {
+  const char byte = *inPlace;
+  if (byte == '\r') {
+    text_ += u'\n';
+    return inPlace + (inPlace[1] == '\n' ? 2 : 1);
+  }
+  if (static_cast<signed char>(byte) >= 0) {
+    if (byte < ' ' && byte != '\t' && byte != '\n') Stop(inPlace);
+    text_ += static_cast<char16_t>(byte);
+    return inPlace + 1;
+  }
+  char32_t character = 0;
+  const int bytes = DecodeCharacter(inPlace, character);
+  if (bytes == 0 || !IsXMLCharacter(character)) Stop(inPlace);
+  Append(character, text_);
+  return inPlace + bytes;
+}
+
+const char* Utf8FastPath::AppendReference(const char* inPlace) {
+  struct Predefined {
+    std::string_view text;
+    char16_t unit;
+  };
+  constexpr Predefined kPredefined[] = {
+      {"&lt;", u'<'}, {"&gt;", u'>'}, {"&amp;", u'&'}, {"&quot;", u'"'}, {"&apos;", u'\''}};
+  for (const Predefined& one : kPredefined) {
+    if (!StartsWith(inPlace, one.text)) continue;
+    text_ += one.unit;
+    return inPlace + one.text.size();
+  }
+  if (inPlace[1] != '#') Stop(inPlace);
+  const int base = inPlace[2] == 'x' ? 16 : 10;
+  const char* at = inPlace + (base == 16 ? 3 : 2);
+  if (DigitOf(*at, base) < 0) Stop(at);
+  char32_t character = 0;
+  for (int digit = DigitOf(*at, base); digit >= 0; digit = DigitOf(*++at, base)) {
+    character = character * static_cast<char32_t>(base) + static_cast<char32_t>(digit);
+    if (character > 0x10FFFF) throw NeedsFullScanner();
+  }
+  if (*at != ';') Stop(at);
+  if (!IsXMLCharacter(character)) throw NeedsFullScanner();
+  Append(character, text_);
+  return at + 1;
+}
+
+// ---- the rest
+
+void Utf8FastPath::ReadComment() {
+  const char* at = at_ + 4;
+  if (at_[3] != '-') Stop(at_);
+  text_.clear();
+  while (at[0] != '-' || at[1] != '-') at = AppendCharacter(at);
+  if (at[2] != '>') Stop(at);
+  AppendNode(DOM_Node::COMMENT_NODE, 0, tree_.AddText(std::u16string_view(text_)));
+  at_ = at + 3;
+}
+
+void Utf8FastPath::ReadSection() {
+  constexpr std::string_view kStart = "<![CDATA[";
+  if (open_.size() == 1 || !StartsWith(at_, kStart)) Stop(at_);
+  const char* at = at_ + kStart.size();
+  text_.clear();
+  while (at[0] != ']' || at[1] != ']' || at[2] != '>') at = AppendCharacter(at);
+  AppendNode(DOM_Node::CDATA_SECTION_NODE, 0, tree_.AddText(std::u16string_view(text_)));
+  at_ = at + 3;
+}
+
+void Utf8FastPath::ReadInstruction() {
+  const char* const target = at_ + 2;
+  const char* at = NameEnd(target);
+  const DOM_Tree::Name name = FindName(target, at).number;
+  if (IsReservedTarget(tree_.NameUnits(name))) throw NeedsFullScanner();
+  if (!IsBlank(*at) && *at != '?') Stop(at);
+  const bool hasData = IsBlank(*at);
+  at = AfterBlanks(at);
+  text_.clear();
+  while (at[0] != '?' || at[1] != '>') {
+    if (!hasData) Stop(at);
+    at = AppendCharacter(at);
+  }
+  AppendNode(DOM_Node::PROCESSING_INSTRUCTION_NODE, name,
+             tree_.AddText(std::u16string_view(text_)));
+  at_ = at + 2;
+}

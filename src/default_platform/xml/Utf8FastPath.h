@@ -1,49 +1,100 @@
-// UTF-8 documents without a document type, which nearly all are, decoded for a faster scanner.
+// The fast path: UTF-8 documents without a document type, which nearly all are.
 #ifndef ZOR_DEFAULT_PLATFORM_XML_UTF8FASTPATH_H
 #define ZOR_DEFAULT_PLATFORM_XML_UTF8FASTPATH_H
 
-#include <cstddef>
 #include <memory>
+#include <string>
 #include <string_view>
-#include <xercesc/sax/InputSource.hpp>
+#include <vector>
 
+#include "default_platform/xml/ByteSearch.h"
 #include "default_platform/xml/ByteSource.h"
+#include "default_platform/xml/DOM_Tree.h"
 
-/// Raised for a text that the fast path does not take.
+/// Raised for a document that the fast path does not read: one in another encoding or with a
+/// document type, one past its limits, and any that is not well-formed.
 struct NeedsFullScanner {};
 
-/// The UTF-8 text of a reader as UTF-16. Raises NeedsFullScanner for bytes that are no UTF-8, for a text that
-/// declares another encoding and for one that holds U+FFFD, which here stands for broken bytes.
+/// Reads a document in one pass into a tree, checking all that XML 1.0 asks of well-formed ones. The
+/// tree is that of the full scanner. One object reads one document.
 class Utf8FastPath {
  public:
-  explicit Utf8FastPath(ByteReader& ioReader);
-  /// @param inMax at least 4. @return the number of units put to outUnits; 0 at the end only.
-  std::size_t Read(char16_t* outUnits, std::size_t inMax);
-  /// Whether there may be a document type declaration in what has been read so far.
-  bool MayHaveDoctype() const;
+  /// @param ioTree a new one; of no use when NeedsFullScanner is raised.
+  Utf8FastPath(ByteReader& ioReader, DOM_Tree& ioTree);
+  /// Raises NeedsFullScanner, and ZORXMLParseError when the bytes cannot be read.
+  void Read();
 
  private:
-  static constexpr std::size_t kMaxBytes = std::size_t{24} * 1024;  // of one read
+  struct Name;
+  /// An attribute of the last element of a kind: the next one very likely has the same.
+  struct AttributeShape {
+    Name* name = nullptr;
+    TextSeries values;
+  };
+  struct Name {
+    DOM_Tree::Name number;
+    std::string utf8;
+    std::uint64_t hash;
+    std::uint64_t element = 0;  // the last one that had an attribute of this name
+    std::vector<AttributeShape> attributes;
+  };
+  struct OpenElement {
+    DOM_Tree::Node node;
+    DOM_Tree::Node lastChild;
+    const Name* name;
+  };
+  struct ReadAttribute {
+    DOM_Tree::Name name;
+    TextRef value;
+  };
+  /// Raised where the bytes read so far end.
+  struct EndOfWindow {};
 
-  std::string_view NextBytes(std::size_t inMax);
-  std::string_view WithoutMark(std::string_view inText);
+  // Bytes
+  void ReadMore();
+  [[noreturn]] void Stop(const char* inPlace) const;
+
+  // Constructs, each from the current place to its end; nothing is kept of one that is not whole
+  void ReadDeclaration();
+  void ReadContent();
+  void ReadOne();
+  void ReadMarkup();
+  void ReadStartTag();
+  const char* ReadAttributes(const char* inPlace, Name& ioElement);
+  void ReadEndTag();
+  void ReadText();
+  void ReadComment();
+  void ReadSection();
+  void ReadInstruction();
+  void SkipBlanks();
+
+  // Parts of these; each returns where it ends
+  const char* NameEnd(const char* inPlace) const;
+  bool IsNext(const char* inPlace, const Name& inName) const;
+  Name& FindName(const char* inPlace, const char* inEnd);
+  void GrowNames();
+  TextRef ReadValue(const char*& ioPlace, TextSeries& ioSeries);
+  const char* AppendCharacter(const char* inPlace);
+  const char* AppendReference(const char* inPlace);
+  void AppendNode(int inKind, DOM_Tree::Name inName, TextRef inText);
 
   ByteReader& reader_;
-  std::unique_ptr<char[]> bytes_;
-  std::size_t filled_ = 0;  // of bytes_
-  std::size_t used_ = 0;    // of these, decoded
-  std::string_view last_;   // what was decoded last
-  std::size_t reads_ = 0;
-};
+  DOM_Tree& tree_;
+  ShortByteSearch search_;
 
-/// Gives a text to the XML library as its one and only entity.
-class Utf8Entity : public xercesc::InputSource {
- public:
-  explicit Utf8Entity(Utf8FastPath& ioText);
-  xercesc::BinInputStream* makeStream() const override;
+  std::unique_ptr<char[]> window_;
+  std::size_t windowBytes_;
+  const char* at_ = nullptr;   // where the construct that is read begins
+  const char* end_ = nullptr;  // of the bytes read so far, where a 0 is
+  bool isAllRead_ = false;
 
- private:
-  Utf8FastPath& text_;
+  std::vector<std::unique_ptr<Name>> names_;
+  std::vector<Name*> slots_;  // open addressing; a power of two
+  std::vector<OpenElement> open_;
+  std::vector<ReadAttribute> attributes_;
+  std::uint64_t elements_ = 0;
+  bool hasRoot_ = false;
+  std::u16string text_;  // what is not plain ASCII
 };
 
 #endif

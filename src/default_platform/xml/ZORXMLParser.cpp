@@ -4,13 +4,12 @@
 #include <array>
 #include <limits>
 #include <string_view>
+#include <type_traits>
 #include <vector>
-#include <xercesc/util/PlatformUtils.hpp>
-#include <xercesc/util/XMLException.hpp>
 
 #include "default_platform/xml/ByteSource.h"
 #include "default_platform/xml/DOM_HandleAccess.h"
-#include "default_platform/xml/XMLNames.h"
+#include "default_platform/xml/XMLChars.h"
 
 namespace {
 
@@ -120,7 +119,9 @@ class TreeWriter {
   void WriteDoctype(const DOM_Tree::NodeRecord& inRecord);
   void WriteIdLiteral(const DOM_Text& inText);
   void WriteName(DOM_Tree::Name inName);
-  void WriteEscaped(std::u16string_view inText, const AsciiTreatments& inTreatments);
+  void WriteEscaped(TextView inText, const AsciiTreatments& inTreatments);
+  template <class Unit>
+  void WriteUnits(std::basic_string_view<Unit> inText, const AsciiTreatments& inTreatments);
 
   const DOM_Tree& tree_;
   TextBuffer buffer_;
@@ -151,11 +152,11 @@ void TreeWriter::Start(DOM_Tree::Node inNode) {
     case DOM_Node::ELEMENT_NODE:
       return StartElement(inNode);
     case DOM_Node::TEXT_NODE:
-      return WriteEscaped(record.text->View(), kInText);
+      return WriteEscaped(tree_.Text(record.text)->View(), kInText);
     case DOM_Node::CDATA_SECTION_NODE:
-      return WriteSection(record.text->View());
+      return WriteSection(tree_.Text(record.text)->View().ToUtf16());
     case DOM_Node::COMMENT_NODE:
-      return WriteComment(record.text->View());
+      return WriteComment(tree_.Text(record.text)->View().ToUtf16());
     case DOM_Node::PROCESSING_INSTRUCTION_NODE:
       return WriteInstruction(record);
     case DOM_Node::DOCUMENT_TYPE_NODE:
@@ -186,13 +187,13 @@ void TreeWriter::End(DOM_Tree::Node inNode) {
 void TreeWriter::WriteAttribute(const DOM_Tree::AttributeRecord& inAttribute) {
   WriteName(inAttribute.name);
   buffer_.Append(u"=\"");
-  WriteEscaped(inAttribute.value->View(), kInAttribute);
+  WriteEscaped(tree_.Text(inAttribute.value)->View(), kInAttribute);
   buffer_.Append(u"\"");
 }
 
 // A document of XML 1.1 may have names that the text, which declares no version, cannot carry.
 void TreeWriter::WriteName(DOM_Tree::Name inName) {
-  const std::u16string_view name = tree_.NameText(inName)->View();
+  const std::u16string_view name = tree_.NameUnits(inName);
   if (!isNameChecked_[inName]) {
     if (!IsXMLName(name)) throw NotSerialisable();
     isNameChecked_[inName] = true;
@@ -204,10 +205,11 @@ constexpr std::size_t kBlock = 8;
 
 // Whether eight units are ASCII that needs no escape in any context. Free of branches, so that it
 // vectorises.
-bool NeedsNoEscape(const char16_t* inUnits) {
+template <class Unit>
+bool NeedsNoEscape(const Unit* inUnits) {
   unsigned int hits = 0;
   for (std::size_t i = 0; i < kBlock; ++i) {
-    const char16_t unit = inUnits[i];
+    const auto unit = static_cast<std::make_unsigned_t<Unit>>(inUnits[i]);
     hits |= static_cast<unsigned int>(unit < 0x20) | static_cast<unsigned int>(unit >= 0x80) |
             static_cast<unsigned int>(unit == u'&') | static_cast<unsigned int>(unit == u'<') |
             static_cast<unsigned int>(unit == u'>') | static_cast<unsigned int>(unit == u'"');
@@ -215,29 +217,40 @@ bool NeedsNoEscape(const char16_t* inUnits) {
   return hits == 0;
 }
 
-void TreeWriter::WriteEscaped(std::u16string_view inText, const AsciiTreatments& inTreatments) {
-  const char16_t* from = inText.data();
-  const char16_t* const end = from + inText.size();
+void TreeWriter::WriteEscaped(TextView inText, const AsciiTreatments& inTreatments) {
+  if (inText.IsWide())
+    WriteUnits(inText.Units(), inTreatments);
+  else
+    WriteUnits(inText.Latin1(), inTreatments);
+}
+
+template <class Unit>
+void TreeWriter::WriteUnits(std::basic_string_view<Unit> inText,
+                            const AsciiTreatments& inTreatments) {
+  const Unit* from = inText.data();
+  const Unit* const end = from + inText.size();
   char16_t* to = buffer_.Reserve(inText.size());
   while (from != end) {
     if (end - from >= static_cast<std::ptrdiff_t>(kBlock) && NeedsNoEscape(from)) {
-      to = std::copy(from, from + kBlock, to);
+      for (std::size_t i = 0; i < kBlock; ++i)
+        to[i] = static_cast<std::make_unsigned_t<Unit>>(from[i]);
+      to += kBlock;
       from += kBlock;
       continue;
     }
-    const char16_t* const pause = from + std::min<std::ptrdiff_t>(kBlock, end - from);
+    const Unit* const pause = from + std::min<std::ptrdiff_t>(kBlock, end - from);
     while (from < pause) {
-      const char16_t unit = *from;
+      const char16_t unit = static_cast<std::make_unsigned_t<Unit>>(*from);
       if (unit < 0x80 ? inTreatments[unit] == kCopy : unit < 0xD800) {
         *to++ = unit;
         ++from;
       } else if (unit >= 0x80) {
-        const bool isPair =
-            unit < 0xDC00 && from + 1 != end && from[1] >= 0xDC00 && from[1] < 0xE000;
+        const bool isPair = unit >= 0xD800 && unit < 0xDC00 && from + 1 != end &&
+                            from[1] >= 0xDC00 && from[1] < 0xE000;
         if (unit >= 0xFFFE || (unit < 0xE000 && !isPair)) throw NotSerialisable();
         *to++ = unit;
         ++from;
-        if (isPair) *to++ = *from++;
+        if (isPair) *to++ = static_cast<char16_t>(*from++);
       } else {
         if (inTreatments[unit] == kRefuse) throw NotSerialisable();
         buffer_.SetEnd(to);
@@ -260,13 +273,13 @@ void TreeWriter::WriteSection(std::u16string_view inText) {
     if (stop == std::u16string_view::npos) break;
     const bool isEnd = inText[stop] == u']';
     const std::size_t count = stop + (isEnd ? 2 : 0);
-    WriteEscaped(inText.substr(0, count), kInSection);
+    WriteUnits(inText.substr(0, count), kInSection);
     buffer_.Append(kEnd);
     if (!isEnd) buffer_.Append(EscapeOf(u'\r'));
     buffer_.Append(kStart);
     inText.remove_prefix(isEnd ? count : count + 1);
   }
-  WriteEscaped(inText, kInSection);
+  WriteUnits(inText, kInSection);
   buffer_.Append(kEnd);
 }
 
@@ -274,19 +287,19 @@ void TreeWriter::WriteComment(std::u16string_view inText) {
   if (inText.find(u"--") != std::u16string_view::npos || inText.ends_with(u'-'))
     throw NotSerialisable();
   buffer_.Append(u"<!--");
-  WriteEscaped(inText, kVerbatim);
+  WriteUnits(inText, kVerbatim);
   buffer_.Append(u"-->");
 }
 
 void TreeWriter::WriteInstruction(const DOM_Tree::NodeRecord& inRecord) {
-  const std::u16string_view data = inRecord.text->View();
+  const std::u16string data = tree_.Text(inRecord.text)->View().ToUtf16();
   // A parser would take leading white space for the separator.
-  if (data.find(u"?>") != std::u16string_view::npos || data.find_first_of(u" \t\n") == 0)
+  if (data.find(u"?>") != std::u16string::npos || data.find_first_of(u" \t\n") == 0)
     throw NotSerialisable();
   buffer_.Append(u"<?");
   WriteName(inRecord.name);
   if (!data.empty()) buffer_.Append(u" ");
-  WriteEscaped(data, kVerbatim);
+  WriteUnits(std::u16string_view(data), kVerbatim);
   buffer_.Append(u"?>");
 }
 
@@ -294,27 +307,27 @@ void TreeWriter::WriteDoctype(const DOM_Tree::NodeRecord& inRecord) {
   const DocumentType& doctype = tree_.Doctype();
   buffer_.Append(u"<!DOCTYPE ");
   WriteName(inRecord.name);
-  if (doctype.publicId != nullptr) {
+  if (doctype.publicId != 0) {
     buffer_.Append(u" PUBLIC ");
-    WriteIdLiteral(*doctype.publicId);
+    WriteIdLiteral(*tree_.Text(doctype.publicId));
     buffer_.Append(u" ");
-  } else if (doctype.systemId != nullptr) {
+  } else if (doctype.systemId != 0) {
     buffer_.Append(u" SYSTEM ");
   }
-  if (doctype.systemId != nullptr) WriteIdLiteral(*doctype.systemId);
-  if (doctype.internalSubset != nullptr) {
+  if (doctype.systemId != 0) WriteIdLiteral(*tree_.Text(doctype.systemId));
+  if (doctype.internalSubset != 0) {
     buffer_.Append(u" [");
-    WriteEscaped(doctype.internalSubset->View(), kVerbatim);
+    WriteEscaped(tree_.Text(doctype.internalSubset)->View(), kVerbatim);
     buffer_.Append(u"]");
   }
   buffer_.Append(u">");
 }
 
 void TreeWriter::WriteIdLiteral(const DOM_Text& inText) {
-  const std::u16string_view quote =
-      inText.View().find(u'"') == std::u16string_view::npos ? u"\"" : u"'";
+  const std::u16string text = inText.View().ToUtf16();
+  const std::u16string_view quote = text.find(u'"') == std::u16string::npos ? u"\"" : u"'";
   buffer_.Append(quote);
-  WriteEscaped(inText.View(), kVerbatim);
+  WriteUnits(std::u16string_view(text), kVerbatim);
   buffer_.Append(quote);
 }
 
@@ -326,22 +339,10 @@ bool IsKnownEncoding(const ZORUnicodeString& inName) {
   return std::find(std::begin(kKnown), std::end(kKnown), name) != std::end(kKnown);
 }
 
-HRESULT Prepare() {
-  try {
-    xercesc::XMLPlatformUtils::Initialize();
-    return S_OK;
-  } catch (const xercesc::XMLException&) {
-    return E_FAIL;
-  }
-}
-
 }  // namespace
 
-HRESULT ZORXMLParser::Initialize() {
-  // Never ended: documents may be read while the process ends.
-  static const HRESULT result = Prepare();
-  return result;
-}
+// There is nothing to prepare: what reads documents is loaded when one needs it.
+HRESULT ZORXMLParser::Initialize() { return S_OK; }
 
 HRESULT ZORXMLParser::CreateMemBufInputSource(const unsigned char* inBytes, unsigned int inCount,
                                               const ZORUnicodeString& inIdentifier,

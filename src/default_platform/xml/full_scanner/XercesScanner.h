@@ -1,6 +1,6 @@
-// From the XML library's scanner to a tree.
-#ifndef ZOR_DEFAULT_PLATFORM_XML_DOCUMENTSCANNER_H
-#define ZOR_DEFAULT_PLATFORM_XML_DOCUMENTSCANNER_H
+// Xerces-C as the full scanner.
+#ifndef ZOR_DEFAULT_PLATFORM_XML_FULL_SCANNER_XERCESSCANNER_H
+#define ZOR_DEFAULT_PLATFORM_XML_FULL_SCANNER_XERCESSCANNER_H
 
 #include <array>
 #include <string>
@@ -10,47 +10,35 @@
 #include <xercesc/sax/HandlerBase.hpp>
 #include <xercesc/util/SecurityManager.hpp>
 
-#include "default_platform/xml/ByteSource.h"
-#include "default_platform/xml/DOM_HandleAccess.h"
-#include "default_platform/xml/DoctypeRecorder.h"
-#include "default_platform/xml/ScannerMemory.h"
-#include "default_platform/xml/Utf8FastPath.h"
+#include "default_platform/xml/FullScanner.h"
+#include "default_platform/xml/full_scanner/DoctypeRecorder.h"
+#include "default_platform/xml/full_scanner/ScannerMemory.h"
 
-/// Where and why a scan ended; the line is 0 when there is no place.
-struct ScanFailure {
-  std::uint64_t line;
-  std::uint64_t column;
-  std::string reason;
-};
-
-/// Listens to the XML library's scanner and fills a tree with what it reports: the library's own
-/// tree takes five times the time and the memory. One object reads one document.
-class DocumentScanner : private xercesc::SAXParser {
+/// Listens to Xerces-C's scanner and passes on what it reports: the library's own tree would take
+/// five times the time and the memory. One object reads one document.
+class XercesScanner : private xercesc::SAXParser {
  public:
-  /// kUtf8: only UTF-8 without a document type, for which the library has a faster scanner. Both give
-  /// the same tree of such documents.
-  enum Kind { kUtf8, kAny };
-
-  DocumentScanner(ScannerMemory& ioMemory, ByteReader& ioReader, Kind inKind);
-  ~DocumentScanner() override;
+  XercesScanner(ScannerMemory& ioMemory, ByteReader& ioReader, ScanSink& ioSink);
+  ~XercesScanner() override;
 
   /// @param inName what the library's messages may call the text by.
-  /// @return the document; without root when the text is empty. Raises ScanFailure; NeedsFullScanner for a
-  /// document of another kind; ZORXMLParseError when the bytes cannot be read.
-  DOM_Document Scan(const std::string& inName);
+  /// Raises ScanFailure, and what the reader and the sink raise.
+  void Scan(const std::string& inName);
 
  private:
   using AttributeList = xercesc::RefVectorOf<xercesc::XMLAttr>;
 
-  struct AttributeShape {
-    DOM_Tree::Name name = 0;
-    TextSeries values;
+  using Name = ScanSink::Name;
+
+  // An element's name, and those of the attributes of the last one of its kind: the next one very
+  // likely has the same ones in the same order.
+  struct AttributeName {
+    std::u16string text;
+    Name name = 0;
   };
-  // The attributes of the last element of a kind: the next one very likely has the same ones in the
-  // same order.
   struct ElementShape {
-    DOM_Tree::Name name = 0;
-    std::vector<AttributeShape> attributes;
+    Name name = 0;
+    std::vector<AttributeName> attributes;
   };
   struct RecentShape {
     const xercesc::XMLElementDecl* kind = nullptr;
@@ -99,32 +87,30 @@ class DocumentScanner : private xercesc::SAXParser {
              const XMLFileLoc inColumn) override;
   xercesc::InputSource* resolveEntity(xercesc::XMLResourceIdentifier* inResource) override;
 
-  // Filling the tree
-  void CheckProlog() const;
-  void AddAttributes(DOM_Tree::Node inElement, ElementShape& ioShape,
-                     const AttributeList& inAttributes, XMLSize_t inCount);
+  // Passing it on
+  void AddAttributes(ElementShape& ioShape, const AttributeList& inAttributes, XMLSize_t inCount);
   ElementShape& ShapeOf(const xercesc::XMLElementDecl& inElement);
   void FlushText();
+  void AddLeaf(int inKind, Name inName, std::u16string_view inText);
   void Charge(std::uint64_t inUnits);
   void RunScanner(const std::string& inName);
   [[noreturn]] void FailHere(const std::string& inReason) const;
 
   ByteReader& reader_;
-  const Kind kind_;
-  Utf8FastPath utf8Text_;
+  ScanSink& sink_;
+  ScannerMemory& memory_;
   xercesc::HandlerBase unused_;
   xercesc::SecurityManager limits_;
 
-  DOM_Document document_;
-  DOM_Tree* tree_;
-  DOM_Tree::Node current_ = DOM_Tree::kDocument;
   std::uint32_t depth_ = 0;
   std::u16string text_;  // of the text node that is being read
   std::uint64_t charged_ = 0;
   std::unordered_map<const xercesc::XMLElementDecl*, ElementShape> shapes_;
   std::array<RecentShape, 64> recent_;  // of shapes_, found without a search
 
-  DocumentType doctype_;
+  ScanSink::Doctype doctype_{};
+  std::u16string publicId_;
+  std::u16string systemId_;
   DoctypeRecorder subset_;
 };
 

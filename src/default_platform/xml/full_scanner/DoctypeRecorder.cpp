@@ -1,4 +1,4 @@
-#include "default_platform/xml/DoctypeRecorder.h"
+#include "default_platform/xml/full_scanner/DoctypeRecorder.h"
 
 #include <string>
 #include <string_view>
