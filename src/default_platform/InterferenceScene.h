@@ -1,46 +1,70 @@
-// An interference of a clash result and its two products, ready for a picture.
+// An interference between two products of a model, ready for a picture.
 #ifndef ZOR_DEFAULT_PLATFORM_INTERFERENCESCENE_H
 #define ZOR_DEFAULT_PLATFORM_INTERFERENCESCENE_H
 
 #include <array>
+#include <cstdint>
 #include <optional>
-#include <string>
+#include <vector>
 
 #include "ZORPlatformExport.h"
 #include "platform/mathematics/ZORMathTransformation.h"
 #include "platform/product_structure/ZORIProduct.h"
 #include "platform/space_analysis/ZORISiInterference.h"
-#include "platform/system/ZORUnicodeString.h"
-#include "platform/xml/DOM_Node.h"
+#include "platform/visualisation/ZOR3DViewpoint.h"
 
 namespace ZORDefault {
 
-struct InterferenceScene {
-  /// The first and the second product, as ones that stand by themselves: a picture changes nothing
-  /// of the model. Where both are shown in nearly the same colour, another one is imposed on the
-  /// second. Empty where the model has none of that path.
-  std::array<ZORIProduct_var, 2> products;
-  /// The alias path by which each was found; of a missing one, the text that says which it is.
-  std::array<ZORUnicodeString, 2> paths;
-  /// Never empty; without geometry where the element gives no point.
-  ZORISiInterference_var interference;
-  /// Why the products stand as in their model although placements were given: one line of UTF-8,
-  /// empty when they stand where these say.
-  std::string whyAsInModel;
+struct StoredViewpoint {
+  ZOR3DViewpoint::Projection projection = ZOR3DViewpoint::kConic;
+  ZORMathVector origin;
+  ZORMathVector sight;  ///< any length above zero
+  double focusDistance = 0;
+  double nearPlane = 0;
+  double farPlane = 0;
 };
 
-/// Where the two products of an interference stood, as the result says.
-typedef std::array<ZORMathTransformation, 2> ResultPlacements;
+enum class MarkerKind {
+  kBalls,     ///< a ball at each point
+  kDimension  ///< a dimension line where there are exactly two points, else balls
+};
 
-/// @param inRoot         the root of an opened model; its products live until the last handle on
-///                       them is released.
-/// @param inInterference an "Interference" element.
-/// @param inPlacements   as a reader of the result answered; nothing: as in the model. When either
-///                       cannot be trusted (no "Matrix" or an incomplete one, numbers with a
-///                       decimal comma, no rotation) both products stand as in the model.
-ZOR_PLATFORM_EXPORT InterferenceScene
-MakeInterferenceScene(const ZORIProduct_var& inRoot, const DOM_Node& inInterference,
-                      const std::optional<ResultPlacements>& inPlacements);
+/// Where two products interfere.
+struct InterferenceGeometry {
+  std::vector<ZORMathVector> points;  ///< of equal ones the first counts
+  MarkerKind markers = MarkerKind::kBalls;
+  std::optional<StoredViewpoint> viewpoint;  ///< nothing: one is chosen that shows both products
+};
+
+/// Red, green, blue, alpha.
+typedef std::array<std::uint8_t, 4> SceneColour;
+
+struct SceneColours {
+  std::optional<SceneColour> imposedOnSecond;  ///< where it could not be told from the first
+  SceneColour markers;
+};
+
+/// Colours in which the two products and the markers are told apart.
+/// @param inProducts of an opened model; empty where one is missing.
+ZOR_PLATFORM_EXPORT SceneColours ChooseColours(const std::array<ZORIProduct_var, 2>& inProducts);
+
+struct SceneProduct {
+  ZORIProduct_var product;  ///< of an opened model; empty where it is missing
+  std::optional<ZORMathTransformation> rootFromProduct;  ///< nothing: as in the model
+};
+
+struct InterferenceScene {
+  /// The two products by themselves, so that a picture changes nothing of the model; each keeps its
+  /// model alive. Empty where one is missing.
+  std::array<ZORIProduct_var, 2> products;
+  /// Never empty.
+  ZORISiInterference_var interference;
+};
+
+/// @param inColours nothing: they are chosen here.
+ZOR_PLATFORM_EXPORT InterferenceScene MakeInterferenceScene(
+    const InterferenceGeometry& inGeometry, const std::array<SceneProduct, 2>& inProducts,
+    const std::optional<SceneColours>& inColours = std::nullopt);
 
 }  // namespace ZORDefault
 

@@ -52,9 +52,9 @@ int CountFramed(const ResultOnModel& inSample, int& outGood) {
 }
 
 void Print(const InterferenceScene& inScene, const std::string& inPath, const char* inFormat) {
-  PrintPictures::PrintListVisuToFile(inScene.products[0], inScene.paths[0], inScene.products[1],
-                                     inScene.paths[1], inScene.interference, inPath.c_str(),
-                                     inFormat, 756, 506, 1, 0);
+  PrintPictures::PrintListVisuToFile(inScene.products[0], "", inScene.products[1], "",
+                                     inScene.interference, inPath.c_str(), inFormat, 756, 506, 1,
+                                     0);
 }
 
 /// Width and height in a PNG file's header.
@@ -85,8 +85,8 @@ TEST(PicturesOfModels, BothProductsAreSeenWhereTheModelsPlacesAreTaken) {
 
 TEST(PicturesOfModels, PlacementsWithDecimalCommasAreNotTrusted) {
   for (std::size_t i = 0; i < FrenchResult().Count(); ++i)
-    EXPECT_TRUE(
-        FrenchResult().Scene(i).whyAsInModel.ends_with(": its numbers are cut at a decimal comma"));
+    EXPECT_TRUE(FrenchResult().Resolved(i).whyAsInModel.ends_with(
+        ": its numbers are cut at a decimal comma"));
 }
 
 TEST(PicturesOfModels, AllInterferencesOfAResultAreWrittenAndEverythingIsReleased) {
@@ -95,9 +95,9 @@ TEST(PicturesOfModels, AllInterferencesOfAResultAreWrittenAndEverythingIsRelease
     const ZORDefault::ObjectCounts counts = ZORDefault::CountsOf(inClass);
     return counts.built - counts.released;
   };
-  const char* const kClasses[] = {"ZOR3DBagRep",     "ZOR3DViewpoint",  "ZORPrint3DRepImage",
-                                  "ZORPixelImage",   "InterferenceRep", "Interference",
-                                  "StandingProduct", "ZORRepPath",      "ZORLyraRepPathBuilder"};
+  const char* const kClasses[] = {"ZOR3DBagRep",   "ZOR3DViewpoint",  "ZORPrint3DRepImage",
+                                  "ZORPixelImage", "InterferenceRep", "Interference",
+                                  "PlacedProduct", "ZORRepPath",      "ZORLyraRepPathBuilder"};
   std::vector<long> before;
   for (const char* const name : kClasses) before.push_back(alive(name));
   const long images = ZORDefault::CountsOf("ZORPrint3DRepImage").built;
@@ -142,12 +142,12 @@ TEST(PicturesOfModels, PreviewShowsOneProduct) {
   const support::TemporaryFolder folder;
   const InterferenceScene scene = Assembly().Scene(0);
   const std::string path = folder.FilePath("preview.png");
-  PrintPictures::PrintListVisuToFilePreview(scene.products[0], scene.paths[0], path.c_str(), "PNG",
-                                            120, 80, 1, 0);
+  PrintPictures::PrintListVisuToFilePreview(scene.products[0], "", path.c_str(), "PNG", 120, 80, 1,
+                                            0);
   const std::string bytes = support::ReadFile(path);
   EXPECT_EQ(std::pair(120, 80), SizeOfPng(bytes));
-  PrintPictures::PrintListVisuToFilePreview(scene.products[1], scene.paths[1], path.c_str(), "PNG",
-                                            120, 80, 1, 0);
+  PrintPictures::PrintListVisuToFilePreview(scene.products[1], "", path.c_str(), "PNG", 120, 80, 1,
+                                            0);
   EXPECT_FALSE(bytes == support::ReadFile(path));
 }
 

@@ -3,17 +3,15 @@
 #define ZOR_TESTS_SUPPORT_RESULT_ON_MODEL_H
 
 #include <array>
-#include <memory>
 #include <optional>
 #include <string>
 #include <vector>
 
-#include "ZORClashParsing.h"
-#include "default_platform/InterferenceScene.h"
 #include "default_platform/OpenModel.h"
 #include "default_platform/visualisation/Rendering.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
 #include "platform/visualisation/ZORI3DGeoVisu.h"
+#include "toolkit/scenes/InterferenceScenes.h"
 
 namespace support {
 
@@ -21,22 +19,21 @@ namespace support {
 class ResultOnModel {
  public:
   ResultOnModel(const std::string& inModel, const std::string& inResult)
-      : model(ZORDefault::OpenModel(inModel, WithoutCache())),
-        path_(inResult),
-        reader_(path_.data()) {
-    ZORUnicodeString kind, reference, version;
-    reader_.LoadSequence(kind, reference, version);
-    ZORListValZORUnicodeString aliases, identifiers;
-    ZORMathTransformation* placements = nullptr;
-    reader_.GetReBuildSessionInfos(aliases, identifiers, placements);
-    placements_.reset(placements);
-    Collect(reader_.GetNodeList().item(0).getParentNode());
+      : model(ZORDefault::OpenModel(inModel, WithoutCache())), scenes_(model.root) {
+    ZORToolkit::ClashDocument document(inResult);
+    ZORToolkit::ForEachInterference(
+        document, ZORToolkit::RecordPart::kAll,
+        [&](const ZORToolkit::InterferenceRecord& inRecord) {
+          records_.push_back(inRecord);
+          resolved_.push_back(scenes_.Resolve(inRecord, ZORToolkit::ProductPlaces::kResult));
+        });
   }
-  std::size_t Count() const { return elements_.size(); }
+  std::size_t Count() const { return records_.size(); }
+  const ZORToolkit::ResolvedInterference& Resolved(std::size_t inIndex) const {
+    return resolved_[inIndex];
+  }
   ZORDefault::InterferenceScene Scene(std::size_t inIndex) const {
-    return ZORDefault::MakeInterferenceScene(
-        model.root, elements_[inIndex],
-        ZORDefault::ResultPlacements{placements_[2 * inIndex], placements_[2 * inIndex + 1]});
+    return ZORToolkit::MakeScene(records_[inIndex], resolved_[inIndex]);
   }
 
   ZORDefault::OpenedModel model;
@@ -47,17 +44,10 @@ class ResultOnModel {
     options.useCache = false;
     return options;
   }
-  void Collect(const DOM_Node& inNode) {
-    for (DOM_Node node = inNode.getFirstChild(); !node.isNull(); node = node.getNextSibling()) {
-      if (node.getNodeName().equals("Interference")) elements_.push_back(node);
-      if (node.getNodeName().equals("ClashResult")) Collect(node);
-    }
-  }
 
-  std::string path_;
-  ZORClashParsing reader_;
-  std::unique_ptr<ZORMathTransformation[]> placements_;
-  std::vector<DOM_Node> elements_;
+  ZORToolkit::InterferenceScenes scenes_;
+  std::vector<ZORToolkit::InterferenceRecord> records_;
+  std::vector<ZORToolkit::ResolvedInterference> resolved_;
 };
 
 inline ZOR3DRep* RepOf(const ZORI3DGeoVisu_var& inObject) {

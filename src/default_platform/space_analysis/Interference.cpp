@@ -1,12 +1,17 @@
 #include "default_platform/space_analysis/Interference.h"
 
 #include <algorithm>
+#include <cmath>
+#include <set>
 
-#include "default_platform/space_analysis/StandingProduct.h"
+#include "default_platform/visualisation/Rendering.h"
+#include "foundation/Vector3.h"
 #include "platform/space_analysis/ZORISiSubInterference.h"
 
 namespace ZORDefault {
 namespace {
+
+using namespace ZORFoundation;
 
 ZORMetaClass* ClassNamed(const char* inName, unsigned int inSize) {
   return fct_RetrieveMetaObject(inName, kZORTypeImplementation, ZORBaseUnknown::MetaObject(),
@@ -82,32 +87,48 @@ const ZOR3DRep* RepOf(const ZORIProduct_var& inProduct) {
   return visualised.IsNull() ? nullptr : dynamic_cast<const ZOR3DRep*>(visualised->GetRep());
 }
 
-/// The first of these that stands out from both products, else the one that does so best.
-PartColour MarkerColourFor(const std::array<ZORIProduct_var, 2>& inProducts) {
-  constexpr PartColour kColours[] = {{255, 0, 140, 255}, {0, 190, 255, 255}, {255, 220, 0, 255}};
-  constexpr int kClear = 230;
-  const PartColour first = MeanColourOf(inProducts[0]), second = MeanColourOf(inProducts[1]);
-  PartColour best = kColours[0];
-  int most = -1;
-  for (const PartColour& colour : kColours) {
-    const int least = std::min(ColourDifference(colour, first), ColourDifference(colour, second));
-    if (least > most) best = colour;
-    most = std::max(most, least);
-    if (least >= kClear) break;
-  }
-  return best;
+/// Those that differ, in the order in which they first occur.
+std::vector<ZORMathVector> DistinctPoints(const std::vector<ZORMathVector>& inPoints) {
+  std::vector<ZORMathVector> distinct;
+  std::set<std::array<double, 3>> known;
+  for (const ZORMathVector& point : inPoints)
+    if (known.insert({point.x, point.y, point.z}).second) distinct.push_back(point);
+  return distinct;
+}
+
+/// Sets all of a viewpoint; an orthographic one shows as much as a perspective one at its focus.
+void Fill(const StoredViewpoint& inStored, ZOR3DViewpoint& outViewpoint) {
+  const ZOR3DViewpoint usual;
+  outViewpoint.projection = inStored.projection;
+  outViewpoint.origin = inStored.origin;
+  outViewpoint.sight = (1 / Length(inStored.sight)) * inStored.sight;
+  outViewpoint.up = UpFor(outViewpoint.sight);
+  outViewpoint.focusDistance = PositiveOr(inStored.focusDistance, usual.focusDistance);
+  outViewpoint.viewAngle = usual.viewAngle;
+  outViewpoint.viewHeight = 2 * outViewpoint.focusDistance * std::tan(usual.viewAngle / 2);
+  // Right before the eye a near plane cuts nothing that matters, but would keep markers from being
+  // an overlay.
+  constexpr double kRightBefore = 0.02;
+  const bool cutsNothing = inStored.projection == ZOR3DViewpoint::kConic &&
+                           inStored.nearPlane <= kRightBefore * outViewpoint.focusDistance;
+  outViewpoint.nearPlane = cutsNothing ? 0 : std::max(inStored.nearPlane, 0.0);
+  outViewpoint.farPlane = inStored.farPlane > inStored.nearPlane ? inStored.farPlane : 0;
 }
 
 }  // namespace
 
-Interference::Interference(const InterferenceElement& inElement,
-                           const std::array<ZORIProduct_var, 2>& inProducts)
-    : element_(inElement),
+Interference::Interference(const InterferenceGeometry& inGeometry,
+                           const std::array<ZORIProduct_var, 2>& inProducts,
+                           const SceneColour& inMarkerColour)
+    : geometry_(inGeometry),
       products_(inProducts),
-      flags_(element_.points.size() + 1, 1),
+      markerColour_(inMarkerColour),
       interference_(*this),
       geoVisu_(*this),
-      specObject_(*this) {}
+      specObject_(*this) {
+  geometry_.points = DistinctPoints(inGeometry.points);
+  flags_.assign(geometry_.points.size() + 1, 1);
+}
 
 ZORBaseUnknown* Interference::FindFacet(const IID& inInterface) {
   if (inInterface == ZORBaseUnknown::ClassId() || inInterface == ZORISiInterference::ClassId())
@@ -129,28 +150,30 @@ unsigned int Interference::ReleaseReference() {
 
 const ChosenView& Interference::GetView() {
   if (view_) return *view_;
-  view_ = element_.viewpoint ? StoredView()
-                             : ChooseView({RepOf(products_[0]), RepOf(products_[1])},
-                                          element_.points, element_.isClearance);
-  view_->markers.colour = MarkerColourFor(products_);
+  const bool isDimension = geometry_.markers == MarkerKind::kDimension;
+  view_ = geometry_.viewpoint ? StoredView()
+                              : ChooseView({RepOf(products_[0]), RepOf(products_[1])},
+                                           geometry_.points, isDimension);
+  view_->markers.colour = markerColour_;
   return *view_;
 }
 
 ChosenView Interference::StoredView() const {
   ZOR3DViewpoint viewpoint;
-  element_.viewpoint->Fill(viewpoint);
+  Fill(*geometry_.viewpoint, viewpoint);
   const double radius = viewpoint.viewHeight / 2;
-  ChosenView view{{radius, viewpoint.sight, viewpoint.up, element_.isClearance},
-                  {element_.points.front(), radius}};
-  LengthenPins({RepOf(products_[0]), RepOf(products_[1])}, element_.points, viewpoint,
+  ChosenView view{
+      {radius, viewpoint.sight, viewpoint.up, geometry_.markers == MarkerKind::kDimension},
+      {geometry_.points.front(), radius}};
+  LengthenPins({RepOf(products_[0]), RepOf(products_[1])}, geometry_.points, viewpoint,
                view.markers);
   return view;
 }
 
 ZORRep* Interference::MakeRep() {
   std::vector<ZORMathVector> shown;
-  for (std::size_t i = 0; i < element_.points.size(); ++i)
-    if (flags_[i] != 0 && flags_.back() != 0) shown.push_back(element_.points[i]);
+  for (std::size_t i = 0; i < geometry_.points.size(); ++i)
+    if (flags_[i] != 0 && flags_.back() != 0) shown.push_back(geometry_.points[i]);
   if (shown.empty()) return nullptr;
   return new InterferenceRep(shown, GetView().markers, GetView().framed);
 }
@@ -163,7 +186,7 @@ void Interference::FillPointViewpoint(std::size_t inPoint, ZOR3DViewpoint& ioVie
   ioViewpoint.sight = markers.sight;
   ioViewpoint.up = markers.up;
   ioViewpoint.Reframe(kWidth, kHeight, 1, 1,
-                      {element_.points[inPoint], kCloser * markers.viewRadius});
+                      {geometry_.points[inPoint], kCloser * markers.viewRadius});
 }
 
 int* Interference::InterferenceFacet::GetFlags() {
@@ -178,18 +201,18 @@ void Interference::InterferenceFacet::SetFlags(const int* inFlags) {
 
 int Interference::InterferenceFacet::FillViewpoint(ZOR3DViewpoint* ioViewpoint) {
   if (!ioViewpoint) return 0;
-  if (const auto& stored = self_.element_.viewpoint) {
-    stored->Fill(*ioViewpoint);
+  if (const auto& stored = self_.geometry_.viewpoint) {
+    Fill(*stored, *ioViewpoint);
     return 1;
   }
-  if (self_.element_.points.empty()) return 0;
+  if (self_.geometry_.points.empty()) return 0;
   ioViewpoint->sight = self_.GetView().markers.sight;
   ioViewpoint->up = self_.GetView().markers.up;
   return 0;
 }
 
 double* Interference::InterferenceFacet::GetGeometricResult() {
-  const std::vector<ZORMathVector>& points = self_.element_.points;
+  const std::vector<ZORMathVector>& points = self_.geometry_.points;
   if (points.empty()) return nullptr;
   double* const result = new double[3 * points.size()];
   for (std::size_t i = 0; i < points.size(); ++i) {
@@ -201,7 +224,7 @@ double* Interference::InterferenceFacet::GetGeometricResult() {
 }
 
 void Interference::InterferenceFacet::GetSubInterferences(ZORListValZORISpecObject_var& ioList) {
-  for (std::size_t i = 0; i < self_.element_.points.size(); ++i)
+  for (std::size_t i = 0; i < self_.geometry_.points.size(); ++i)
     ioList.Append(ZORISpecObject_var((new SubInterference(self_, i))->GetInterface()));
 }
 

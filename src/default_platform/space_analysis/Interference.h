@@ -6,8 +6,8 @@
 #include <optional>
 #include <vector>
 
+#include "default_platform/InterferenceScene.h"
 #include "default_platform/system/InterfaceRegistry.h"
-#include "default_platform/space_analysis/InterferenceElement.h"
 #include "default_platform/space_analysis/InterferenceRep.h"
 #include "default_platform/space_analysis/ViewChoice.h"
 #include "platform/product_structure/ZORIProduct.h"
@@ -16,16 +16,15 @@
 
 namespace ZORDefault {
 
-/// Made of an "Interference" element; its elements and sub-interferences are the points that
-/// differ. Ends with its last reference, sub-interferences' included.
+/// Its elements and sub-interferences are the points that differ. Ends with its last reference, sub-interferences' included.
 class Interference final : public FacetedComponent, private CountedObject<Interference> {
  public:
   static const char* CountedName() { return "Interference"; }
 
   /// Made without a reference.
   /// @param inProducts empty where one is missing.
-  Interference(const InterferenceElement& inElement,
-               const std::array<ZORIProduct_var, 2>& inProducts);
+  Interference(const InterferenceGeometry& inGeometry,
+               const std::array<ZORIProduct_var, 2>& inProducts, const SceneColour& inMarkerColour);
   Interference(const Interference&) = delete;
   Interference& operator=(const Interference&) = delete;
 
@@ -46,7 +45,7 @@ class Interference final : public FacetedComponent, private CountedObject<Interf
    public:
     explicit InterferenceFacet(Interference& inOwner) : Facet(inOwner), self_(inOwner) {}
     int* GetFlags() override;
-    int GetElementCount() override { return static_cast<int>(self_.element_.points.size()); }
+    int GetElementCount() override { return static_cast<int>(self_.geometry_.points.size()); }
     void SetFlags(const int* inFlags) override;
     int FillViewpoint(ZOR3DViewpoint* ioViewpoint) override;
     double* GetGeometricResult() override;
@@ -76,8 +75,9 @@ class Interference final : public FacetedComponent, private CountedObject<Interf
   ChosenView StoredView() const;
 
   unsigned int referenceCount_ = 0;
-  InterferenceElement element_;
+  InterferenceGeometry geometry_;
   std::array<ZORIProduct_var, 2> products_;
+  SceneColour markerColour_;
   std::vector<int> flags_;
   std::optional<ChosenView> view_;
   InterferenceFacet interference_;

@@ -7,12 +7,14 @@
 #include <utility>
 
 #include "default_platform/space_analysis/InterferenceRep.h"
-#include "default_platform/space_analysis/Vectors.h"
 #include "default_platform/visualisation/Rendering.h"
+#include "foundation/Vector3.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
 
 namespace ZORDefault {
 namespace {
+
+using namespace ZORFoundation;
 
 /// The pictures that directions are tried on: a twelfth of those in reports.
 constexpr int kWidth = 63;

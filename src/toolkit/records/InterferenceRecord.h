@@ -36,7 +36,6 @@ class ElementHandle {
   ElementHandle() = default;
   explicit ElementHandle(const DOM_Node& inElement) : element_(inElement) {}
   bool IsEmpty() const { return element_.isNull(); }
-  const DOM_Node& Element() const { return element_; }
   bool operator==(const ElementHandle& inOther) const { return element_ == inOther.element_; }
 
  private:

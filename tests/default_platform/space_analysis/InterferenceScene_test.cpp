@@ -13,9 +13,7 @@ namespace {
 using namespace assembly;
 using ZORDefault::InterferenceScene;
 using ZORDefault::MakeInterferenceScene;
-using ZORDefault::ResultPlacements;
-
-const ResultPlacements kGiven = {ReadMatrix(), ReadMatrix()};
+using ZORDefault::SceneProduct;
 
 ZORMathVector TranslationOf(const ZORIProduct_var& inProduct) {
   return ZORDefault::CollectMeshInstances(*RepOf(inProduct)).front().rootFromPart.GetVector();
@@ -26,30 +24,28 @@ void ExpectAt(const ZORMathVector& inExpected, const ZORIProduct_var& inProduct)
   EXPECT_NEAR(inExpected.y, found.y, 1e-9);
   EXPECT_NEAR(inExpected.z, found.z, 1e-9);
 }
-InterferenceScene Scene(const std::string& inContent) {
-  return MakeInterferenceScene(Root(), Interference(inContent), kGiven);
+InterferenceScene Scene(const char* inFirst, const char* inSecond) {
+  return MakeInterferenceScene(
+      At({}), {SceneProduct{Product(inFirst), Moved()}, {Product(inSecond), Moved()}});
 }
 
-TEST(InterferenceScene, ProductsStandWhereTheResultSays) {
-  const InterferenceScene scene = Scene(ProductText(kNut) + ProductText(kRod));
-  EXPECT_EQ("", scene.whyAsInModel);
+TEST(InterferenceScene, ProductsArePlacedAsGiven) {
+  const InterferenceScene scene = Scene(kNut, kRod);
   ExpectAt({1, 2, 3}, scene.products[0]);
   ExpectAt({1, 2, 3}, scene.products[1]);
-  EXPECT_TRUE(scene.paths[0] == kNut);
-  EXPECT_TRUE(scene.paths[1] == kRod);
 }
 
 TEST(InterferenceScene, PartsOfAnAssemblyMoveWithIt) {
   const ZORIProduct_var assembly = Product("rod-assembly_1");
-  const InterferenceScene scene = Scene(ProductText("rod-assembly_1") + ProductText(kRod));
+  const InterferenceScene scene = Scene("rod-assembly_1", kRod);
   const auto before = ZORDefault::CollectMeshInstances(*RepOf(assembly));
   const auto after = ZORDefault::CollectMeshInstances(*RepOf(scene.products[0]));
   ASSERT_EQ(3u, before.size());
   ASSERT_EQ(3u, after.size());
   // The same point of the assembly, seen from each part.
-  const ZORMathTransformation model = Facts(assembly).rootFromProduct;
+  const ZORMathTransformation model = Info(assembly).rootFromProduct;
   const ZORMathVector inAssembly(5, 6, 7);
-  const ZORMathVector moved = ReadMatrix() * inAssembly, stood = model * inAssembly;
+  const ZORMathVector moved = Moved() * inAssembly, stood = model * inAssembly;
   for (std::size_t i = 0; i < 3; ++i) {
     const ZORMathVector a = before[i].rootFromPart.GetVector(),
                         b = after[i].rootFromPart.GetVector();
@@ -59,45 +55,24 @@ TEST(InterferenceScene, PartsOfAnAssemblyMoveWithIt) {
   }
 }
 
-TEST(InterferenceScene, WithoutPlacementsProductsStandAsInTheModel) {
+TEST(InterferenceScene, WithoutPlacementsProductsArePlacedAsInTheModel) {
   const InterferenceScene scene = NutAndRod();
-  EXPECT_EQ("", scene.whyAsInModel);
-  ExpectAt(Facts(Product(kNut)).rootFromProduct.GetVector(), scene.products[0]);
+  ExpectAt(Info(Product(kNut)).rootFromProduct.GetVector(), scene.products[0]);
+  ExpectAt(Info(Product(kRod)).rootFromProduct.GetVector(), scene.products[1]);
 }
 
-TEST(InterferenceScene, OnePlacementThatIsNotTrustedPutsBothAsInTheModel) {
-  const InterferenceScene scene = Scene(ProductText(kNut) + ProductText(kRod, ""));
-  EXPECT_EQ(std::string(kRod) + ": the result has no matrix of it", scene.whyAsInModel);
-  ExpectAt(Facts(Product(kNut)).rootFromProduct.GetVector(), scene.products[0]);
-  ExpectAt(Facts(Product(kRod)).rootFromProduct.GetVector(), scene.products[1]);
-}
-
-TEST(InterferenceScene, MissingProductIsEmptyAndItsTextIsKept) {
-  const InterferenceScene scene = Scene(ProductText("gone") + ProductText(kRod));
+TEST(InterferenceScene, MissingProductIsEmpty) {
+  const InterferenceScene scene = Scene("gone", kRod);
   EXPECT_TRUE(scene.products[0].IsNull());
-  EXPECT_TRUE(scene.paths[0] == "gone");
   EXPECT_FALSE(scene.products[1].IsNull());
-}
-
-TEST(InterferenceScene, AliasIsThePathWhereTheIdentifierIsNone) {
-  const InterferenceScene scene =
-      Scene("<Product DescriptionID='A1B2' Alias='" + std::string(kNut) + "'/>");
-  EXPECT_FALSE(scene.products[0].IsNull());
-  EXPECT_TRUE(scene.paths[0] == kNut);
-}
-
-TEST(InterferenceScene, InterferenceWithoutProductsHasNone) {
-  const InterferenceScene scene = Scene("");
-  EXPECT_TRUE(scene.products[0].IsNull());
-  EXPECT_TRUE(scene.products[1].IsNull());
   EXPECT_FALSE(scene.interference.IsNull());
 }
 
-TEST(InterferenceScene, StandingProductIsTheModelsInAllElse) {
-  const InterferenceScene scene = Scene(ProductText(kNut) + ProductText(kRod));
+TEST(InterferenceScene, PlacedProductIsTheModelsInAllElse) {
+  const InterferenceScene scene = Scene(kNut, kRod);
   EXPECT_TRUE(ZORIAlias_var(scene.products[0])->GetAlias() == "nut_1");
   EXPECT_EQ(Product("rod-assembly_1"), scene.products[0]->GetFatherProduct());
-  EXPECT_EQ(Facts(Product(kNut)).part, Facts(scene.products[0]).part);
+  EXPECT_EQ(Info(Product(kNut)).part, Info(scene.products[0]).part);
 }
 
 unsigned int ImposedRed(const ZORIProduct_var& inProduct) {
@@ -116,11 +91,24 @@ TEST(InterferenceScene, ProductsOfDifferentColoursKeepThem) {
 }
 
 TEST(InterferenceScene, SecondProductOfTheSameColourIsShownInAnother) {
-  const InterferenceScene scene =
-      Scene(ProductText(kNut) + ProductText("rod-assembly_1 --++-- nut_2"));
+  const InterferenceScene scene = Scene(kNut, "rod-assembly_1 --++-- nut_2");
   EXPECT_EQ(999u, ImposedRed(scene.products[0]));
   EXPECT_NE(999u, ImposedRed(scene.products[1]));
   EXPECT_EQ(999u, ImposedRed(Product("rod-assembly_1 --++-- nut_2")));
+}
+
+TEST(InterferenceScene, ColoursThatAreGivenAreTaken) {
+  ZORDefault::SceneColours colours;
+  colours.imposedOnSecond = {1, 2, 3, 255};
+  const InterferenceScene scene = MakeInterferenceScene(
+      At({}), {SceneProduct{Product(kNut), {}}, {Product(kRod), {}}}, colours);
+  EXPECT_EQ(1u, ImposedRed(scene.products[1]));
+}
+
+TEST(InterferenceScene, ColoursOfMissingProductsAreThoseOfMarkersAlone) {
+  const ZORDefault::SceneColours colours = ZORDefault::ChooseColours({});
+  EXPECT_FALSE(colours.imposedOnSecond);
+  EXPECT_EQ(255, colours.markers[3]);
 }
 
 TEST(InterferenceScene, EverythingEndsWithItsHandles) {
@@ -128,11 +116,11 @@ TEST(InterferenceScene, EverythingEndsWithItsHandles) {
     const ZORDefault::ObjectCounts counts = ZORDefault::CountsOf(inClass);
     return counts.built - counts.released;
   };
-  const long products = alive("StandingProduct"), interferences = alive("Interference");
-  const long bags = alive("ZOR3DBagRep"), built = ZORDefault::CountsOf("StandingProduct").built;
-  { const InterferenceScene scene = Scene(ProductText(kNut) + ProductText(kRod)); }
-  EXPECT_EQ(2, ZORDefault::CountsOf("StandingProduct").built - built);
-  EXPECT_EQ(products, alive("StandingProduct"));
+  const long products = alive("PlacedProduct"), interferences = alive("Interference");
+  const long bags = alive("ZOR3DBagRep"), built = ZORDefault::CountsOf("PlacedProduct").built;
+  { const InterferenceScene scene = Scene(kNut, kRod); }
+  EXPECT_EQ(2, ZORDefault::CountsOf("PlacedProduct").built - built);
+  EXPECT_EQ(products, alive("PlacedProduct"));
   EXPECT_EQ(interferences, alive("Interference"));
   EXPECT_EQ(bags, alive("ZOR3DBagRep"));
 }

@@ -3,6 +3,7 @@
 
 #include <cmath>
 #include <memory>
+#include <vector>
 
 #include "default_platform/space_analysis/Assembly.h"
 #include "default_platform/system/ObjectCounters.h"
@@ -19,12 +20,17 @@ using assembly::NutAndRod;
 using assembly::RepOf;
 using ZORDefault::InterferenceScene;
 
-constexpr char kTwoPoints[] = "<Point Ux='178' Uy='75' Uz='65'/><Point Ux='178' Uy='75' Uz='55'/>";
-constexpr char kStored[] =
-    "<Point Ux='1' Uy='2' Uz='3'/>"
-    "<Viewpoint FocusDistance='200' NearPlane='30' FarPlane='2000' ProjectionType='Cylindrique'>"
-    "<Point Ux='10,5' Uy='20' Uz='30'/>"
-    "<Vector CorrespondingData='Sight' Vx='0' Vy='2' Vz='0'/></Viewpoint>";
+using assembly::At;
+using assembly::kTouch;
+
+const std::vector<ZORMathVector> kTwoPoints = {kTouch, {178, 75, 55}};
+
+/// Looks along y.
+ZORDefault::InterferenceGeometry WithViewpoint(ZOR3DViewpoint::Projection inProjection) {
+  ZORDefault::InterferenceGeometry geometry = At({{1, 2, 3}});
+  geometry.viewpoint = {inProjection, {10.5, 20, 30}, {0, 2, 0}, 200, 30, 2000};
+  return geometry;
+}
 
 struct Destroyer {
   void operator()(ZORRep* inRep) const { inRep->Destroy(); }
@@ -37,15 +43,13 @@ std::size_t TrianglesOf(const InterferenceScene& inScene) {
 }
 
 TEST(Interference, ElementsAreThePointsThatDiffer) {
-  EXPECT_EQ(
-      1,
-      NutAndRod(std::string(assembly::kPoint) + assembly::kPoint).interference->GetElementCount());
-  EXPECT_EQ(2, NutAndRod(kTwoPoints).interference->GetElementCount());
-  EXPECT_EQ(0, NutAndRod("").interference->GetElementCount());
+  EXPECT_EQ(1, NutAndRod(At({kTouch, kTouch})).interference->GetElementCount());
+  EXPECT_EQ(2, NutAndRod(At(kTwoPoints)).interference->GetElementCount());
+  EXPECT_EQ(0, NutAndRod(At({})).interference->GetElementCount());
 }
 
 TEST(Interference, GeometryHoldsTheCoordinates) {
-  const auto scene = NutAndRod("<Point Ux='1,5' Uy='2' Uz='-3e1'/>");
+  const auto scene = NutAndRod(At({{1.5, 2, -30}}));
   const std::unique_ptr<double[]> geometry(scene.interference->GetGeometricResult());
   ASSERT_TRUE(geometry);
   EXPECT_EQ(1.5, geometry[0]);
@@ -53,14 +57,8 @@ TEST(Interference, GeometryHoldsTheCoordinates) {
   EXPECT_EQ(-30, geometry[2]);
 }
 
-TEST(Interference, PointWithoutANumberIsNone) {
-  const auto scene = NutAndRod("<Point Ux='1' Uy='' Uz='3'/><Point Ux='1' Uy='nan' Uz='3'/>");
-  EXPECT_EQ(nullptr, scene.interference->GetGeometricResult());
-  EXPECT_EQ(0, scene.interference->GetElementCount());
-}
-
 TEST(Interference, WithoutPointsThereIsNothingToShow) {
-  const auto scene = NutAndRod("");
+  const auto scene = NutAndRod(At({}));
   EXPECT_EQ(nullptr, scene.interference->GetGeometricResult());
   EXPECT_EQ(nullptr, RepOf(scene.interference));
   ZOR3DViewpoint viewpoint;
@@ -68,7 +66,7 @@ TEST(Interference, WithoutPointsThereIsNothingToShow) {
 }
 
 TEST(Interference, FlagsSayWhichElementsAreShown) {
-  const auto scene = NutAndRod(kTwoPoints);
+  const auto scene = NutAndRod(At(kTwoPoints));
   const std::unique_ptr<int[]> flags(scene.interference->GetFlags());
   EXPECT_EQ(1, flags[0]);
   EXPECT_EQ(1, flags[2]);
@@ -84,19 +82,17 @@ TEST(Interference, FlagsSayWhichElementsAreShown) {
 }
 
 TEST(Interference, PointsThatNearlyCoincideAreOneBall) {
-  const std::string one = "<Point Ux='178' Uy='75' Uz='65'/>";
-  const std::string beside = "<Point Ux='178.0001' Uy='75' Uz='65'/>";
-  EXPECT_EQ(2, NutAndRod(one + beside).interference->GetElementCount());
-  EXPECT_EQ(TrianglesOf(NutAndRod(one)), TrianglesOf(NutAndRod(one + beside)));
+  const std::vector<ZORMathVector> near = {kTouch, {178.0001, 75, 65}};
+  EXPECT_EQ(2, NutAndRod(At(near)).interference->GetElementCount());
+  EXPECT_EQ(TrianglesOf(NutAndRod()), TrianglesOf(NutAndRod(At(near))));
 }
 
 TEST(Interference, VeryManyPointsAreShownByASample) {
-  std::string points;
+  std::vector<ZORMathVector> points;
   constexpr int kCount = 20000;
   for (int i = 0; i < kCount; ++i)
-    points += "<Point Ux='" + std::to_string(i % 25) + "' Uy='" + std::to_string(i / 25 % 25) +
-              "' Uz='" + std::to_string(i / 625) + "'/>";
-  const auto scene = NutAndRod(points);
+    points.push_back({1.0 * (i % 25), 1.0 * (i / 25 % 25), 1.0 * (i / 625)});
+  const auto scene = NutAndRod(At(points));
   EXPECT_EQ(kCount, scene.interference->GetElementCount());
   const OwnRep rep(RepOf(scene.interference));
   const auto mesh = ZORDefault::CollectMeshInstances(*rep).front().mesh;
@@ -115,21 +111,24 @@ TEST(Interference, RepresentationIsANewOneEachTime) {
   EXPECT_GE(after.built - before.built, 2);
 }
 
-TEST(Interference, ClearanceOfTwoPointsHasADimensionLineInAnyLanguage) {
-  const std::size_t balls = TrianglesOf(NutAndRod(kTwoPoints));
-  for (const char* const word : {"Clearance", "Jeu", "Abstand", "Gioco", "Holgura", "クリアランス"})
-    EXPECT_NE(balls, TrianglesOf(NutAndRod(kTwoPoints, word))) << word;
-  EXPECT_EQ(balls, TrianglesOf(NutAndRod(kTwoPoints, "Clash")));
+TEST(Interference, DimensionLineJoinsTwoPointsAlone) {
+  const auto trianglesOf = [](const std::vector<ZORMathVector>& inPoints) {
+    ZORDefault::InterferenceGeometry geometry = At(inPoints);
+    geometry.markers = ZORDefault::MarkerKind::kDimension;
+    return TrianglesOf(NutAndRod(geometry));
+  };
+  EXPECT_NE(TrianglesOf(NutAndRod(At(kTwoPoints))), trianglesOf(kTwoPoints));
+  EXPECT_EQ(TrianglesOf(NutAndRod()), trianglesOf({kTouch}));
 }
 
-TEST(Interference, MarkersAreDrawnOverProducts) {
+TEST(Interference, MarkersAreAnOverlay) {
   const auto scene = NutAndRod();
   const OwnRep rep(RepOf(scene.interference));
   EXPECT_TRUE(ZORDefault::CollectMeshInstances(*rep).front().isOverlay);
 }
 
 TEST(Interference, StoredViewpointIsFilledIn) {
-  const auto scene = NutAndRod(kStored);
+  const auto scene = NutAndRod(WithViewpoint(ZOR3DViewpoint::kCylindric));
   ZOR3DViewpoint viewpoint;
   ASSERT_EQ(1, scene.interference->FillViewpoint(&viewpoint));
   EXPECT_EQ(ZOR3DViewpoint::kCylindric, viewpoint.projection);
@@ -143,36 +142,25 @@ TEST(Interference, StoredViewpointIsFilledIn) {
 }
 
 TEST(Interference, SightStraightDownHasAnotherUp) {
-  std::string text = kStored;
-  text.replace(text.find("Vy='2' Vz='0'"), 13, "Vy='0' Vz='-1'");
+  auto geometry = WithViewpoint(ZOR3DViewpoint::kConic);
+  geometry.viewpoint->sight = {0, 0, -1};
   ZOR3DViewpoint viewpoint;
-  ASSERT_EQ(1, NutAndRod(text).interference->FillViewpoint(&viewpoint));
+  ASSERT_EQ(1, NutAndRod(geometry).interference->FillViewpoint(&viewpoint));
   EXPECT_EQ(1, viewpoint.up.y);
 }
 
-TEST(Interference, ViewpointWithoutSightOrPointIsNone) {
-  std::string withoutSight = kStored;
-  withoutSight.replace(withoutSight.find("Vy='2'"), 6, "Vy='0'");
-  std::string withoutPoint = kStored;
-  withoutPoint.replace(withoutPoint.find("Uy='20'"), 7, "");
+TEST(Interference, NearPlaneRightBeforeTheEyeOfAPerspectiveViewIsLeftOut) {
+  auto geometry = WithViewpoint(ZOR3DViewpoint::kConic);
   ZOR3DViewpoint viewpoint;
-  EXPECT_NE(1, NutAndRod(withoutSight).interference->FillViewpoint(&viewpoint));
-  EXPECT_NE(1, NutAndRod(withoutPoint).interference->FillViewpoint(&viewpoint));
-}
-
-TEST(Interference, NearPlaneRightBeforeTheEyeOfAConicViewIsLeftOut) {
-  std::string text = kStored;
-  text.replace(text.find("Cylindrique"), 11, "Conique");
-  ZOR3DViewpoint viewpoint;
-  ASSERT_EQ(1, NutAndRod(text).interference->FillViewpoint(&viewpoint));
+  ASSERT_EQ(1, NutAndRod(geometry).interference->FillViewpoint(&viewpoint));
   EXPECT_EQ(30, viewpoint.nearPlane);
-  text.replace(text.find("NearPlane='30'"), 14, "NearPlane='1'");
-  ASSERT_EQ(1, NutAndRod(text).interference->FillViewpoint(&viewpoint));
+  geometry.viewpoint->nearPlane = 1;
+  ASSERT_EQ(1, NutAndRod(geometry).interference->FillViewpoint(&viewpoint));
   EXPECT_EQ(0, viewpoint.nearPlane);
 }
 
 TEST(Interference, SubInterferencesAreClosePicturesOfThePoints) {
-  const auto scene = NutAndRod(kTwoPoints);
+  const auto scene = NutAndRod(At(kTwoPoints));
   ZORListValZORISpecObject_var list;
   scene.interference->GetSubInterferences(list);
   ASSERT_EQ(2, list.Size());
@@ -185,7 +173,7 @@ TEST(Interference, SubInterferencesAreClosePicturesOfThePoints) {
 }
 
 TEST(Interference, InterfacesAreFoundByIdentifierAndName) {
-  const auto scene = NutAndRod(kTwoPoints);
+  const auto scene = NutAndRod(At(kTwoPoints));
   EXPECT_THAT(support::InterfacesOf(*scene.interference.GetInterface()),
               testing::ElementsAre("ZORBaseUnknown", "ZORI3DGeoVisu", "ZORISiInterference",
                                    "ZORISpecObject"));
@@ -211,9 +199,7 @@ TEST(Interference, SubInterferenceKnowsAndKeepsItsFather) {
 }
 
 TEST(Interference, WithoutProductsItIsFramedFromTheDefaultDirection) {
-  const auto scene = ZORDefault::MakeInterferenceScene(
-      assembly::Root(), assembly::Interference(assembly::GeometryText(assembly::kPoint)),
-      std::nullopt);
+  const auto scene = ZORDefault::MakeInterferenceScene(At({kTouch}), {});
   ZOR3DViewpoint usual, viewpoint;
   EXPECT_NE(1, scene.interference->FillViewpoint(&viewpoint));
   EXPECT_NEAR(usual.sight.x, viewpoint.sight.x, 1e-12);

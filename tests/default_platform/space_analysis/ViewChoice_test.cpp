@@ -6,8 +6,8 @@
 #include <array>
 #include <cmath>
 
-#include "default_platform/space_analysis/Vectors.h"
 #include "default_platform/visualisation/Rendering.h"
+#include "foundation/Vector3.h"
 #include "support/MeshScenes.h"
 
 namespace {

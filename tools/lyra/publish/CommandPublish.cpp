@@ -96,7 +96,7 @@ PictureStyle StyleOf(const PublishOptions& inOptions) {
   return style;
 }
 
-ProductPlaces WeldPoints(const PublishOptions& inOptions) {
+ProductPlaces PlacesOf(const PublishOptions& inOptions) {
   const bool areModels = ChosenWord("--positions", inOptions.positions, kPositions) == 1;
   return areModels ? ProductPlaces::kModel : ProductPlaces::kResult;
 }
@@ -143,12 +143,12 @@ Drawn DrawPictures(const PublishOptions& inOptions, const PictureStyle& inStyle,
   const ZORIProduct_var root = OpenModelFile(inOptions.model).root;
   const PictureStore store(inOptions.directory,
                            inStyle.format == PictureFormat::kPng ? ".png" : ".jpg");
-  ioPublication.LookUp(root);
+  ioPublication.LookUp(root, PlacesOf(inOptions));
   if (!store.Prepare(StampOf(inOptions, ioPublication, inStyle), inOptions.resume))
     std::fputs("lyra: warning: the pictures that are there show something else: all are drawn\n",
                stderr);
   Drawn drawn;
-  drawn.failures = ioPublication.Draw(root, store, inStyle, processes);
+  drawn.failures = ioPublication.Draw(store, inStyle, processes);
   for (const Entry& entry : ioPublication.Entries()) drawn.pictures += !entry.facts.picture.empty();
   return drawn;
 }
@@ -179,7 +179,7 @@ PageRequest RequestOf(const PublishOptions& inOptions, const OtherStyleSheet& in
   request.styleSheet = inSheet.text;
   request.styleSheetName = inSheet.path.empty() ? "clash-page.xsl" : inSheet.path;
   request.model = Utf8(FromUtf8(fs::path(inOptions.model).filename().string()));
-  request.isAsInModel = !inOptions.model.empty() && WeldPoints(inOptions) == ProductPlaces::kModel;
+  request.isAsInModel = !inOptions.model.empty() && PlacesOf(inOptions) == ProductPlaces::kModel;
   for (const Entry& entry : inPublication.Entries()) request.interferences.push_back(entry.facts);
   return request;
 }
@@ -199,13 +199,13 @@ void WriteAll(const PublishOptions& inOptions, const OtherStyleSheet& inSheet,
 int Publish(const PublishOptions& inOptions, Output& ioOutput) {
   const ListFilter filter = ParseOnly(inOptions.only);
   const PictureStyle style = StyleOf(inOptions);
-  const ProductPlaces places = WeldPoints(inOptions);
+  PlacesOf(inOptions);
   ProcessCount(inOptions);
   ChooseLanguage(inOptions.language);
   ClashDocument file(inOptions.file);
   file.RequireInterferences();
   const OtherStyleSheet sheet = ChosenStyleSheet(inOptions);
-  Publication publication(file, filter, places);
+  Publication publication(file, filter);
   Drawn drawn;
   try {
     fs::create_directories(inOptions.directory);

@@ -6,13 +6,11 @@
 #include <set>
 
 #include "PrintPictures.h"
-#include "default_platform/OpenModel.h"
 #include "lyra/RecordsJson.h"
 #include "lyra/SafeText.h"
 #include "lyra/publish/DrawingProgress.h"
 #include "lyra/publish/DrawingWorkers.h"
 #include "lyra/publish/ZoomSetting.h"
-#include "platform/visualisation/ZORIVisProperties.h"
 #include "toolkit/records/ClashDocumentEdit.h"
 #include "toolkit/records/DocumentText.h"
 #include "toolkit/records/InterferenceRecord.h"
@@ -23,7 +21,7 @@ namespace lyra {
 using namespace ZORToolkit;
 namespace {
 
-constexpr char kPlainGrey[] = "#d2d2d2";  // of parts without a colour
+constexpr char kNoPath[] = "";  // the products are found already
 
 /// The 64-bit hash of Fowler, Noll and Vo (FNV-1a), continued.
 std::uint64_t Hashed(std::uint64_t inHash, const std::string& inText) {
@@ -38,72 +36,19 @@ void Warn(const std::string& inText) {
   std::fprintf(stderr, "lyra: warning: %s\n", Printable(inText).c_str());
 }
 
-ZORMathTransformation Transformation(const Placement& inPlacement) {
-  const auto vector = [&](std::size_t inFirst) {
-    return ZORMathVector(inPlacement[inFirst], inPlacement[inFirst + 1], inPlacement[inFirst + 2]);
-  };
-  ZORMathTransformation transformation;
-  transformation.SetMatrix(ZORMath3x3Matrix(vector(0), vector(3), vector(6)));
-  transformation.SetVector(vector(9));
-  return transformation;
-}
-
-std::optional<ZORDefault::ResultPlacements> PlacementsOf(const InterferenceRecord& inRecord) {
-  const auto& [first, second] = inRecord.products;
-  if (!first.exists || !second.exists) return std::nullopt;
-  return ZORDefault::ResultPlacements{Transformation(first.placement),
-                                      Transformation(second.placement)};
-}
-
 /// A word that the reader could not understand is shown as the document has it.
 std::string ShownWord(const std::string& inWord, const std::string& inAsWritten) {
   if (!inWord.empty() && CaseFolded(inWord) != "error") return inWord;
   return inAsWritten.empty() ? "Not stated" : inAsWritten;
 }
 
-Entry MakeEntry(const InterferenceRecord& inRecord, ProductPlaces inPlaces) {
+Entry MakeEntry(const InterferenceRecord& inRecord) {
   Entry entry;
   entry.record = inRecord;
-  if (inPlaces == ProductPlaces::kResult) entry.placements = PlacementsOf(inRecord);
   entry.facts.number = inRecord.index;
   entry.facts.type = ShownWord(inRecord.type, inRecord.typeAsWritten);
   entry.facts.status = ShownWord(inRecord.status, inRecord.statusAsWritten);
   return entry;
-}
-
-std::string ColourText(unsigned inRed, unsigned inGreen, unsigned inBlue) {
-  char text[8];
-  std::snprintf(text, sizeof text, "#%02x%02x%02x", inRed & 0xFF, inGreen & 0xFF, inBlue & 0xFF);
-  return text;
-}
-
-/// The colour that the highest ancestor imposes; else empty.
-std::string ImposedColour(const ZORIProduct_var& inProduct) {
-  std::string colour;
-  for (ZORIProduct_var product = inProduct; !product.IsNull();
-       product = product->GetFatherProduct()) {
-    const ZORIVisProperties_var properties = product;
-    ZORVisPropertiesValues values;
-    unsigned isImposed = 0, red = 0, green = 0, blue = 0;
-    if (properties.IsNull() || FAILED(properties->GetPropertiesAtt(values, 11, 5)) ||
-        FAILED(values.GetInheritance(ZORVisPropertiesValues::kColour, isImposed)) ||
-        isImposed == 0 || FAILED(values.GetColor(red, green, blue)))
-      continue;
-    colour = ColourText(red, green, blue);
-  }
-  return colour;
-}
-
-/// What a product is drawn in; empty for an assembly of many colours.
-/// @param inShown   the product as the picture shows it.
-/// @param inOfModel the same one in the model.
-std::string ColourOf(const ZORIProduct_var& inShown, const ZORIProduct_var& inOfModel) {
-  const std::string imposed = ImposedColour(inShown);
-  ZORDefault::ProductInfo facts;
-  if (!imposed.empty() || !ZORDefault::GetProductInfo(inOfModel.GetInterface(), facts))
-    return imposed;
-  if (!facts.colour) return facts.triangles > 0 ? kPlainGrey : "";
-  return ColourText((*facts.colour)[0], (*facts.colour)[1], (*facts.colour)[2]);
 }
 
 /// "1 product", "2 products".
@@ -111,10 +56,7 @@ std::string Counted(std::size_t inCount, const std::string& inThing) {
   return std::to_string(inCount) + " " + inThing + (inCount == 1 ? "" : "s");
 }
 
-std::string NameOf(const ZORUnicodeString& inPath) {
-  const std::string path = Utf8(inPath);
-  return path.empty() ? "(no name)" : path;
-}
+std::string NameOf(const std::string& inPath) { return inPath.empty() ? "(no name)" : inPath; }
 
 /// A text of UTF-8 for one line among others.
 std::string Shortened(const std::string& inText) {
@@ -140,10 +82,8 @@ std::string Listed(const std::set<std::string>& inTexts) {
 /// Draws in the folder of the pictures, which is the current one: no text has to carry its path.
 class EntryDrawing {
  public:
-  EntryDrawing(const Entry& inEntry, const ZORIProduct_var& inRoot, const PictureStore& inStore,
-               const PictureStyle& inStyle)
-      : scene_(ZORDefault::MakeInterferenceScene(inRoot, inEntry.record.element.Element(),
-                                                 inEntry.placements)),
+  EntryDrawing(const Entry& inEntry, const PictureStore& inStore, const PictureStyle& inStyle)
+      : scene_(MakeScene(inEntry.record, inEntry.resolved)),
         number_(inEntry.facts.number),
         store_(inStore),
         style_(inStyle),
@@ -154,8 +94,7 @@ class EntryDrawing {
     if (store_.Has(store_.PictureName(number_))) return;
     const auto& [first, second] = scene_.products;
     if (first.IsNull() && second.IsNull()) return;
-    PrintPictures::PrintListVisuToFile(first, scene_.paths[0], second, scene_.paths[1],
-                                       scene_.interference,
+    PrintPictures::PrintListVisuToFile(first, kNoPath, second, kNoPath, scene_.interference,
                                        FromUtf8(store_.UnfinishedName(number_)), format_,
                                        style_.size.width, style_.size.height, 1, 0);
     store_.Finish(number_);
@@ -165,9 +104,9 @@ class EntryDrawing {
   void DrawPreview(std::size_t inProduct) {
     const std::string name = store_.PreviewName(number_, inProduct);
     if (scene_.products[inProduct].IsNull() || store_.Has(name)) return;
-    PrintPictures::PrintListVisuToFilePreview(
-        scene_.products[inProduct], scene_.paths[inProduct], FromUtf8(name), format_,
-        std::max(1, style_.size.width / 2), std::max(1, style_.size.height / 2), 1, 0);
+    PrintPictures::PrintListVisuToFilePreview(scene_.products[inProduct], kNoPath, FromUtf8(name),
+                                              format_, std::max(1, style_.size.width / 2),
+                                              std::max(1, style_.size.height / 2), 1, 0);
   }
 
   ZORDefault::InterferenceScene scene_;
@@ -179,13 +118,12 @@ class EntryDrawing {
 
 }  // namespace
 
-Publication::Publication(ClashDocument& ioResult, const ListFilter& inFilter,
-                         ProductPlaces inPlaces)
+Publication::Publication(ClashDocument& ioResult, const ListFilter& inFilter)
     : hash_(0xcbf29ce484222325) {
   ForEachInterference(ioResult, RecordPart::kAll, [&](const InterferenceRecord& inRecord) {
     hash_ = Hashed(hash_, JsonText(inRecord));
     if (inFilter.Accepts(inRecord))
-      entries_.push_back(MakeEntry(inRecord, inPlaces));
+      entries_.push_back(MakeEntry(inRecord));
     else
       others_.push_back(inRecord.element);
   });
@@ -197,29 +135,29 @@ std::string Publication::Fingerprint() const {
   return text;
 }
 
-void Publication::LookUp(const ZORIProduct_var& inRoot) {
+void Publication::LookUp(const ZORIProduct_var& inRoot, ProductPlaces inPlaces) {
+  InterferenceScenes scenes(inRoot);
   std::set<std::string> missing;
   std::size_t incomplete = 0, movedBack = 0;
   std::string whyMovedBack;
   for (Entry& entry : entries_) {
-    const ZORDefault::InterferenceScene scene =
-        ZORDefault::MakeInterferenceScene(inRoot, entry.record.element.Element(), entry.placements);
+    entry.resolved = scenes.Resolve(entry.record, inPlaces);
     bool isComplete = true;
     for (std::size_t i = 0; i < 2; ++i) {
       if (!entry.record.products[i].exists) continue;
-      PublishedProduct& product = entry.facts.products[i];
-      product.isMissing = scene.products[i].IsNull();
-      if (product.isMissing) missing.insert(NameOf(scene.paths[i]));
-      isComplete = isComplete && !product.isMissing;
-      if (!product.isMissing)
-        product.colour =
-            ColourOf(scene.products[i], ZORDefault::FindProduct(inRoot, scene.paths[i]));
+      const ResolvedProduct& product = entry.resolved.products[i];
+      PublishedProduct& facts = entry.facts.products[i];
+      facts.colour = product.colour;
+      facts.isMissing = product.shown.product.IsNull();
+      if (facts.isMissing) missing.insert(NameOf(product.path));
+      isComplete = isComplete && !facts.isMissing;
     }
     incomplete += isComplete ? 0 : 1;
-    if (!HasProduct(entry)) continue;
-    entry.facts.whyAsInModel = scene.whyAsInModel;
-    if (!scene.whyAsInModel.empty() && movedBack++ == 0)
-      whyMovedBack = std::to_string(entry.facts.number) + ": " + Shortened(scene.whyAsInModel);
+    if (!entry.resolved.HasProduct()) continue;
+    const std::string& why = entry.resolved.whyAsInModel;
+    entry.facts.whyAsInModel = why;
+    if (!why.empty() && movedBack++ == 0)
+      whyMovedBack = std::to_string(entry.facts.number) + ": " + Shortened(why);
   }
   if (incomplete > 0)
     Warn("the model lacks " + Counted(missing.size(), "product") + " of " +
@@ -229,17 +167,11 @@ void Publication::LookUp(const ZORIProduct_var& inRoot) {
          " are drawn where they stand in the model; interference " + whyMovedBack);
 }
 
-bool Publication::HasProduct(const Entry& inEntry) const {
-  for (std::size_t i = 0; i < 2; ++i)
-    if (inEntry.record.products[i].exists && !inEntry.facts.products[i].isMissing) return true;
-  return false;
-}
-
 std::size_t Publication::TakeReferences(const PictureStore& inStore) {
   std::size_t lacking = 0;
   for (Entry& entry : entries_) {
     PublishedInterference& facts = entry.facts;
-    if (!HasProduct(entry)) continue;
+    if (!entry.resolved.HasProduct()) continue;
     facts.picture = inStore.Reference(inStore.PictureName(facts.number));
     if (facts.picture.empty()) ++lacking;
     for (const std::string& name : inStore.ThumbnailNames(facts.number))
@@ -251,11 +183,11 @@ std::size_t Publication::TakeReferences(const PictureStore& inStore) {
   return lacking;
 }
 
-std::size_t Publication::Draw(const ZORIProduct_var& inRoot, const PictureStore& inStore,
-                              const PictureStyle& inStyle, int inProcesses) {
+std::size_t Publication::Draw(const PictureStore& inStore, const PictureStyle& inStyle,
+                              int inProcesses) {
   std::vector<const Entry*> wanted;
   for (const Entry& entry : entries_)
-    if (HasProduct(entry)) wanted.push_back(&entry);
+    if (entry.resolved.HasProduct()) wanted.push_back(&entry);
   if (!wanted.empty()) {
     const ZoomSetting zoom(inStyle.zoom);
     DrawingProgress progress(wanted.size());
@@ -267,7 +199,7 @@ std::size_t Publication::Draw(const ZORIProduct_var& inRoot, const PictureStore&
     };
     work.draw = [&](std::size_t inWanted) {
       try {
-        EntryDrawing(*wanted[inWanted], inRoot, inStore, inStyle).Draw();
+        EntryDrawing(*wanted[inWanted], inStore, inStyle).Draw();
       } catch (const std::exception&) {
         // Its picture is not there, which is what is looked for at the end.
       }

@@ -8,24 +8,21 @@
 #include <string>
 #include <vector>
 
-#include "default_platform/InterferenceScene.h"
-#include "toolkit/records/ClashDocument.h"
 #include "lyra/ListFilter.h"
 #include "lyra/Picture.h"
 #include "lyra/publish/PictureStore.h"
 #include "lyra/publish/PublishedInterference.h"
+#include "toolkit/records/ClashDocument.h"
+#include "toolkit/scenes/InterferenceScenes.h"
 
 namespace lyra {
 
 /// An interference that is published.
 struct Entry {
   ZORToolkit::InterferenceRecord record;
-  std::optional<ZORDefault::ResultPlacements> placements;
+  ZORToolkit::ResolvedInterference resolved;  // once it is looked up
   PublishedInterference facts;
 };
-
-/// Where the products stand that pictures show.
-enum class ProductPlaces { kResult, kModel };
 
 struct PictureStyle {
   PictureFormat format = PictureFormat::kJpeg;
@@ -38,23 +35,21 @@ struct PictureStyle {
 /// publication.
 class Publication {
  public:
-  Publication(ZORToolkit::ClashDocument& ioResult, const ListFilter& inFilter, ProductPlaces inPlaces);
+  Publication(ZORToolkit::ClashDocument& ioResult, const ListFilter& inFilter);
 
   const std::vector<Entry>& Entries() const { return entries_; }
   /// A number that differs when what the result says of any interference does.
   std::string Fingerprint() const;
 
   /// Says which products the model has, and their colours. Warns of what it lacks.
-  void LookUp(const ZORIProduct_var& inRoot);
+  void LookUp(const ZORIProduct_var& inRoot, ZORToolkit::ProductPlaces inPlaces);
   /// Draws the pictures that are not there yet. @return how many interferences got none although
   /// the model has one of their products.
-  std::size_t Draw(const ZORIProduct_var& inRoot, const PictureStore& inStore,
-                   const PictureStyle& inStyle, int inProcesses);
+  std::size_t Draw(const PictureStore& inStore, const PictureStyle& inStyle, int inProcesses);
   /// Makes the document what is published.
   void Finish(ZORToolkit::ClashDocument& ioResult);
 
  private:
-  bool HasProduct(const Entry& inEntry) const;
   std::size_t TakeReferences(const PictureStore& inStore);
 
   std::vector<Entry> entries_;

@@ -1,16 +1,18 @@
-#include "default_platform/space_analysis/StandingProduct.h"
+#include "default_platform/space_analysis/PlacedProduct.h"
 
 #include <cstdlib>
 #include <optional>
 #include <vector>
 
 #include "default_platform/product_structure/Product.h"
-#include "default_platform/space_analysis/Vectors.h"
 #include "default_platform/visualisation/SceneGraph.h"
+#include "foundation/Vector3.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
 
 namespace ZORDefault {
 namespace {
+
+using namespace ZORFoundation;
 
 /// The rows of an inverse matrix are the cross products of the columns.
 ZORMathTransformation Inverse(const ZORMathTransformation& inPlacement) {
@@ -25,12 +27,12 @@ ZORMathTransformation Inverse(const ZORMathTransformation& inPlacement) {
   return result;
 }
 
-class StandingProduct final : public FacetedComponent, private CountedObject<StandingProduct> {
+class PlacedProduct final : public FacetedComponent, private CountedObject<PlacedProduct> {
  public:
-  static const char* CountedName() { return "StandingProduct"; }
+  static const char* CountedName() { return "PlacedProduct"; }
 
-  StandingProduct(Product& inProduct, const ZORMathTransformation& rootFromProduct,
-                  const PartColour* inColour)
+  PlacedProduct(Product& inProduct, const ZORMathTransformation& rootFromProduct,
+                const PartColour* inColour)
       : original_(inProduct.GetInterface()),
         properties_(inProduct.GetProperties()),
         product_(*this),
@@ -43,8 +45,8 @@ class StandingProduct final : public FacetedComponent, private CountedObject<Sta
     if (const ZOR3DRep* const rep = inProduct.GetRep())
       MakeRep(*rep, rootFromProduct * Inverse(inProduct.GetRootFromProduct()));
   }
-  StandingProduct(const StandingProduct&) = delete;
-  StandingProduct& operator=(const StandingProduct&) = delete;
+  PlacedProduct(const PlacedProduct&) = delete;
+  PlacedProduct& operator=(const PlacedProduct&) = delete;
 
   ZORBaseUnknown* FindFacet(const IID& inInterface) override {
     if (inInterface == ZORBaseUnknown::ClassId() || inInterface == ZORIProduct::ClassId())
@@ -64,9 +66,9 @@ class StandingProduct final : public FacetedComponent, private CountedObject<Sta
  private:
   /// All interfaces but those of what is shown are the model's product's.
   template <class Interface>
-  class StandingFacet : public Facet<Interface> {
+  class PlacedFacet : public Facet<Interface> {
    public:
-    explicit StandingFacet(StandingProduct& inOwner) : Facet<Interface>(inOwner), self_(inOwner) {}
+    explicit PlacedFacet(PlacedProduct& inOwner) : Facet<Interface>(inOwner), self_(inOwner) {}
     HRESULT QueryInterface(const IID& inInterface, void** outInterface) override {
       if (self_.FindFacet(inInterface))
         return Facet<Interface>::QueryInterface(inInterface, outInterface);
@@ -75,25 +77,25 @@ class StandingProduct final : public FacetedComponent, private CountedObject<Sta
     using Facet<Interface>::QueryInterface;
 
    protected:
-    StandingProduct& self_;
+    PlacedProduct& self_;
   };
-  class ProductFacet final : public StandingFacet<ZORIProduct> {
+  class ProductFacet final : public PlacedFacet<ZORIProduct> {
    public:
-    using StandingFacet::StandingFacet;
+    using PlacedFacet::PlacedFacet;
     ZORListValZORBaseUnknown_var* GetChildren(const char* inInterfaceName) override {
       return self_.original_->GetChildren(inInterfaceName);
     }
     ZORIProduct_var GetFatherProduct() override { return self_.original_->GetFatherProduct(); }
   };
-  class GeoVisuFacet final : public StandingFacet<ZORI3DGeoVisu> {
+  class GeoVisuFacet final : public PlacedFacet<ZORI3DGeoVisu> {
    public:
-    using StandingFacet::StandingFacet;
+    using PlacedFacet::PlacedFacet;
     ZORRep* GetRep() override { return self_.rep_; }
   };
 
-  class VisPropertiesFacet final : public StandingFacet<ZORIVisProperties> {
+  class VisPropertiesFacet final : public PlacedFacet<ZORIVisProperties> {
    public:
-    using StandingFacet::StandingFacet;
+    using PlacedFacet::PlacedFacet;
     HRESULT GetPropertiesAtt(ZORVisPropertiesValues& outValues, int inProperties, int inGeometry,
                              int inReserved, int inAlsoReserved) override {
       const HRESULT result =
@@ -108,7 +110,7 @@ class StandingProduct final : public FacetedComponent, private CountedObject<Sta
     }
   };
 
-  ~StandingProduct() {
+  ~PlacedProduct() {
     if (rep_) rep_->Destroy();
     for (PlacedMeshRep* const mesh : meshes_) mesh->Destroy();
   }
@@ -149,12 +151,13 @@ std::optional<PartColour> ImposedColourOf(const ZORIVisProperties_var& inPropert
 
 }  // namespace
 
-ZORIProduct_var StandAt(const ZORIProduct_var& inProduct,
-                        const ZORMathTransformation& rootFromProduct, const PartColour* inColour) {
+ZORIProduct_var PlaceProduct(const ZORIProduct_var& inProduct,
+                             const ZORMathTransformation& rootFromProduct,
+                             const PartColour* inColour) {
   const ZORInterfaceHandle<ProductIdentity> identity = inProduct;
   if (identity.IsNull()) return {};
-  auto* const standing = new StandingProduct(identity->GetProduct(), rootFromProduct, inColour);
-  return ZORIProduct_var(standing->GetInterface());
+  auto* const placed = new PlacedProduct(identity->GetProduct(), rootFromProduct, inColour);
+  return ZORIProduct_var(placed->GetInterface());
 }
 
 PartColour MeanColourOf(const ZORIProduct_var& inProduct) {
