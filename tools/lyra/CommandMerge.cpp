@@ -3,6 +3,7 @@
 #include <memory>
 
 #include "lyra/Prologue.h"
+#include "lyra/ReplacedFile.h"
 #include "lyra/Verbs.h"
 
 namespace lyra {
@@ -32,8 +33,8 @@ int Merge(MergeOptions& ioOptions, Output& ioOutput) {
     edit.TakeIn(*LoadClash(ioOptions.files[i]), trace);
   if (ioOptions.verbose) std::fputs(trace.c_str(), stderr);
   if (ioOptions.sumCounts) edit.RecountInterferences();
-  OutputFile output(ioOptions.output);
-  output.Check(edit.Dump(ioOptions.prologue, output.Path()));
+  ReplacedFile output(ioOptions.output);
+  output.Check(edit.Dump(ioOptions.prologue, output.TemporaryPath()));
   output.Finish(ioOutput);
   return 0;
 }

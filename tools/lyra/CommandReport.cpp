@@ -2,6 +2,7 @@
 #include <memory>
 
 #include "lyra/Prologue.h"
+#include "lyra/ReplacedFile.h"
 #include "lyra/Verbs.h"
 #include "toolkit/publishing/ReportWriter.h"
 #include "toolkit/records/ClashDocument.h"
@@ -20,8 +21,8 @@ int Report(const ReportOptions& inOptions, Output& ioOutput) {
   inOptions.prologue.Check();
   const ClashDocument document(inOptions.file);
   document.RequireInterferences();
-  OutputFile output(inOptions.output);
-  output.Check(WriteReport(document, inOptions.prologue, output.Path()));
+  ReplacedFile output(inOptions.output);
+  output.Check(WriteReport(document, inOptions.prologue, output.TemporaryPath()));
   output.Finish(ioOutput);
   return 0;
 }

@@ -7,12 +7,16 @@
 #include <cwctype>
 #include <vector>
 
-#include "foundation/Utf8.h"
+#include "toolkit/records/DocumentText.h"
 
 namespace lyra {
+using namespace ZORToolkit;
 namespace {
 
-using ZORFoundation::IsAscii;
+bool IsAscii(std::string_view inText) {
+  return std::all_of(inText.begin(), inText.end(),
+                     [](char inByte) { return static_cast<unsigned char>(inByte) < 0x80; });
+}
 
 bool IsPlain(std::string_view inText) {
   return std::all_of(inText.begin(), inText.end(),
@@ -20,16 +24,31 @@ bool IsPlain(std::string_view inText) {
 }
 
 std::vector<char32_t> CodePoints(std::string_view inText) {
+  const ZORUnicodeString text = FromUtf8(inText);
+  const ZORUC2Bytes* units = text.ConvertToUCChar();
+  const int count = text.GetLengthInChar();
   std::vector<char32_t> points;
-  points.reserve(inText.size());
-  for (std::size_t position = 0; position < inText.size();)
-    points.push_back(ZORFoundation::NextCharacter(inText, position));
+  points.reserve(static_cast<std::size_t>(count));
+  for (int i = 0; i < count; ++i) {
+    const bool isPair = (units[i] & 0xFC00) == 0xD800 && i + 1 < count;
+    if (isPair) {
+      points.push_back(0x10000U + ((units[i] & 0x3FFU) << 10) + (units[i + 1] & 0x3FFU));
+      ++i;
+    } else {
+      points.push_back(units[i]);
+    }
+  }
   return points;
 }
 
-void AppendCodePoint(char32_t inPoint, std::string& ioText) {
-  char bytes[4];
-  ioText.append(bytes, ZORFoundation::EncodeCharacter(inPoint, bytes));
+void AppendCodePoint(char32_t inPoint, ZORUnicodeString& ioText) {
+  const ZORUC2Bytes pair[2] = {static_cast<ZORUC2Bytes>(0xD7C0 + (inPoint >> 10)),
+                               static_cast<ZORUC2Bytes>(0xDC00 + (inPoint & 0x3FF))};
+  const ZORUC2Bytes unit = static_cast<ZORUC2Bytes>(inPoint);
+  if (inPoint < 0x10000)
+    ioText.AppendUTF16(&unit, 1);
+  else
+    ioText.AppendUTF16(pair, 2);
 }
 
 bool IsControl(char32_t inPoint) { return inPoint < 0x20 || (inPoint >= 0x7F && inPoint < 0xA0); }
@@ -83,28 +102,29 @@ int ColumnsOf(const std::vector<char32_t>& inPoints) {
 
 std::string Printable(std::string_view inText) {
   if (IsPlain(inText)) return std::string(inText);
-  std::string shown;
+  ZORUnicodeString shown;
   for (char32_t point : CodePoints(inText)) {
     if (IsControl(point) || IsDeceptive(point))
-      shown += Hex("\\u{%X}", point);
+      shown += Hex("\\u{%X}", point).c_str();
     else
       AppendCodePoint(point, shown);
   }
-  return shown;
+  return Utf8(shown);
 }
 
 std::string EscapedForJson(std::string inJson) {
   if (IsAscii(inJson) && inJson.find('\x7F') == std::string::npos) return inJson;
-  std::string escaped;
+  ZORUnicodeString escaped;
   for (char32_t point : CodePoints(inJson)) {
     if (!IsControl(point) && !IsDeceptive(point))
       AppendCodePoint(point, escaped);
     else if (point < 0x10000)
-      escaped += Hex("\\u%04x", point);
+      escaped += Hex("\\u%04x", point).c_str();
     else
-      escaped += Hex("\\u%04x", 0xD7C0 + (point >> 10)) + Hex("\\u%04x", 0xDC00 + (point & 0x3FF));
+      escaped += (Hex("\\u%04x", 0xD7C0 + (point >> 10)) + Hex("\\u%04x", 0xDC00 + (point & 0x3FF)))
+                     .c_str();
   }
-  return escaped;
+  return Utf8(escaped);
 }
 
 int DisplayWidth(std::string_view inText) {
@@ -123,18 +143,18 @@ std::string Fitted(std::string_view inText, int inWidth, Cut inCut) {
   points.resize(kept);
   points.push_back(U'…');
   if (inCut == Cut::kStart) std::reverse(points.begin(), points.end());
-  std::string fitted;
+  ZORUnicodeString fitted;
   for (char32_t point : points) AppendCodePoint(point, fitted);
-  return fitted;
+  return Utf8(fitted);
 }
 
 std::string CaseFolded(std::string_view inText) {
-  std::string folded;
+  ZORUnicodeString folded;
   const UnicodeTables tables;
   // By way of the capital, so that both forms of a letter such as the Greek sigma meet.
   for (char32_t point : CodePoints(inText))
     AppendCodePoint(static_cast<char32_t>(towlower(towupper(static_cast<wint_t>(point)))), folded);
-  return folded;
+  return Utf8(folded);
 }
 
 }  // namespace lyra

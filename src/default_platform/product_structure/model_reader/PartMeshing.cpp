@@ -8,7 +8,6 @@
 #include <Geom_Plane.hxx>
 #include <Poly_Triangulation.hxx>
 #include <Standard_Failure.hxx>
-#include <Standard_OutOfMemory.hxx>
 #include <TopExp.hxx>
 #include <TopExp_Explorer.hxx>
 #include <TopoDS.hxx>
@@ -17,7 +16,6 @@
 #include <algorithm>
 #include <cmath>
 #include <exception>
-#include <new>
 
 #include "default_platform/product_structure/model_reader/MeshBuilder.h"
 #include "default_platform/product_structure/model_reader/TreeWalk.h"
@@ -218,23 +216,17 @@ void FillMesh(const TDF_Label& inLabel, const TopoDS_Shape& inShape, ModelPart& 
 
 }  // namespace
 
-bool MeshPart(const TDF_Label& inPart, double inDeflection, ModelPart& ioPart) {
+void MeshPart(const TDF_Label& inPart, double inDeflection, ModelPart& ioPart) {
   const TopoDS_Shape shape = XCAFDoc_ShapeTool::GetShape(inPart);
-  if (shape.IsNull()) return true;
+  if (shape.IsNull()) return;
   try {
     Tessellate(shape, inDeflection);
     FillMesh(inPart, shape, ioPart);
-    return true;
-  } catch (const Standard_OutOfMemory&) {
-    throw std::bad_alloc();
-  } catch (const std::bad_alloc&) {
-    throw;
   } catch (const Standard_Failure&) {
     ioPart.failedToTessellate = true;
   } catch (const std::exception&) {
     ioPart.failedToTessellate = true;
   }
-  return false;
 }
 
 }  // namespace ZORDefault

@@ -1,0 +1,319 @@
+#include "toolkit/detection/FindInterferences.h"
+
+#include <Standard_Failure.hxx>
+#include <atomic>
+#include <map>
+#include <memory>
+#include <mutex>
+#include <thread>
+#include <unordered_map>
+
+#include "toolkit/detection/BodyPair.h"
+
+namespace ZORDetection {
+namespace {
+
+gp_Trsf ToMotion(const Placement& inPlacement) {
+  gp_Trsf motion;
+  const auto& [x, y, z] = inPlacement;
+  motion.SetValues(x[0], x[1], x[2], x[3], y[0], y[1], y[2], y[3], z[0], z[1], z[2], z[3]);
+  return motion;
+}
+
+Point ToPoint(const gp_XYZ& inPoint) { return {inPoint.X(), inPoint.Y(), inPoint.Z()}; }
+
+/// Two parts in one placement to each other, judged once for all pairs of products that stand so.
+struct Task {
+  std::uint32_t firstPart = 0, secondPart = 0;
+  gp_Trsf firstFromSecond;
+};
+
+struct PairOfProducts {
+  std::uint32_t first = 0, second = 0;
+  std::size_t task = 0;
+  bool isSwapped = false;  ///< the task's first part is the second product's
+};
+
+/// Finds the task of a relative placement. Placements that differ by rounding only have one task, also
+/// where they fall on two sides of a border between cells.
+class TaskTable {
+ public:
+  std::size_t TaskFor(std::uint32_t inFirst, std::uint32_t inSecond, const gp_Trsf& inMotion,
+                      double inSize) {
+    Key key{};
+    std::array<double, 12> scaled{};
+    std::size_t at = 0;
+    for (int row = 1; row <= 3; ++row)
+      for (int column = 1; column <= 4; ++column)
+        scaled[at++] = inMotion.Value(row, column) / (column == 4 ? kCell : kCell / inSize);
+    std::vector<std::size_t> unsure;
+    for (std::size_t i = 0; i < scaled.size(); ++i) {
+      key.cells[i] = std::llround(scaled[i]);
+      if (std::abs(std::abs(scaled[i] - static_cast<double>(key.cells[i])) - 0.5) < kBorder)
+        unsure.push_back(i);
+    }
+    key.first = inFirst;
+    key.second = inSecond;
+    const std::size_t variants = unsure.size() > 4 ? 1 : std::size_t{1} << unsure.size();
+    for (std::size_t variant = 0; variant < variants; ++variant) {
+      Key other = key;
+      for (std::size_t i = 0; i < unsure.size(); ++i)
+        if ((variant >> i & 1U) != 0)
+          other.cells[unsure[i]] +=
+              scaled[unsure[i]] > static_cast<double>(key.cells[unsure[i]]) ? 1 : -1;
+      if (const auto known = places_.find(other); known != places_.end()) return known->second;
+    }
+    places_.emplace(key, tasks_.size());
+    tasks_.push_back({inFirst, inSecond, inMotion});
+    return tasks_.size() - 1;
+  }
+
+  const std::vector<Task>& Tasks() const { return tasks_; }
+
+ private:
+  static constexpr double kCell = 1e-6;    // millimetres
+  static constexpr double kBorder = 1e-3;  // of a cell
+
+  struct Key {
+    std::uint32_t first, second;
+    std::array<std::int64_t, 12> cells;
+    bool operator==(const Key&) const = default;
+  };
+  struct KeyHash {
+    std::size_t operator()(const Key& inKey) const {
+      std::uint64_t hash = inKey.first * 0x9E3779B97F4A7C15ULL + inKey.second;
+      for (const std::int64_t cell : inKey.cells) {
+        hash = (hash ^ static_cast<std::uint64_t>(cell)) * 0xBF58476D1CE4E5B9ULL;
+        hash ^= hash >> 29U;
+      }
+      return hash;
+    }
+  };
+
+  std::unordered_map<Key, std::size_t, KeyHash> places_;
+  std::vector<Task> tasks_;
+};
+
+/// Probes of one thread, made when first asked for.
+class ProbeCache {
+ public:
+  BodyProbe& ProbeOf(const Body& inBody) {
+    auto& probe = probes_[&inBody];
+    if (!probe) probe = std::make_unique<BodyProbe>(inBody);
+    return *probe;
+  }
+
+ private:
+  std::unordered_map<const Body*, std::unique_ptr<BodyProbe>> probes_;
+};
+
+/// A deeper clash before a less deep one, any clash before a contact, a contact before a clearance.
+bool Outweighs(const Verdict& inFirst, const Verdict& inSecond) {
+  if (inFirst.kind != inSecond.kind) return inFirst.kind < inSecond.kind;
+  return inFirst.kind == Kind::kClash ? inFirst.depth > inSecond.depth
+                                      : inFirst.distance < inSecond.distance;
+}
+
+void Merge(Verdict&& inVerdict, std::optional<Verdict>& ioBest) {
+  if (!ioBest) {
+    ioBest = std::move(inVerdict);
+    return;
+  }
+  const bool isSameKind = inVerdict.kind == ioBest->kind;
+  const bool isMesh = inVerdict.hasMeshPrecision || ioBest->hasMeshPrecision;
+  const double precision = std::max(inVerdict.precision, ioBest->precision);
+  Verdict other = std::move(inVerdict);
+  if (Outweighs(other, *ioBest)) std::swap(other, *ioBest);
+  if (isSameKind && ioBest->kind != Kind::kClearance) {
+    ioBest->curveLength += other.curveLength;
+    ioBest->curve.insert(ioBest->curve.end(), other.curve.begin(), other.curve.end());
+  }
+  ioBest->hasMeshPrecision = isMesh;
+  ioBest->precision = precision;
+}
+
+class Search {
+ public:
+  Search(const std::vector<Part>& inParts, const std::vector<Product>& inProducts,
+         const Options& inOptions)
+      : products_(inProducts), options_(inOptions) {
+    for (const Part& part : inParts) {
+      geometries_.push_back(GeometryOf(part, inOptions.meshSize));
+      for (Unjudged& problem : geometries_.back().problems) {
+        problem.part = static_cast<std::uint32_t>(geometries_.size() - 1);
+        findings_.unjudged.push_back(std::move(problem));
+      }
+    }
+  }
+
+  Findings Run() {
+    CollectPairs();
+    findings_.pairsChecked = pairs_.size();
+    findings_.verdicts = tasks_.Tasks().size();
+    JudgeTasks();
+    for (const PairOfProducts& pair : pairs_)
+      if (verdicts_[pair.task]) AddInterference(pair, *verdicts_[pair.task]);
+    return std::move(findings_);
+  }
+
+ private:
+  const PartGeometry& GeometryOfProduct(std::uint32_t inProduct) const {
+    return geometries_[products_[inProduct].part];
+  }
+
+  void CollectPairs() {
+    std::vector<Box> boxes;
+    std::vector<std::uint32_t> owners;
+    const double reach = std::max(options_.contactGap, options_.clearance) / 2;
+    for (std::uint32_t i = 0; i < products_.size(); ++i) {
+      motions_.push_back(ToMotion(products_[i].rootFromProduct));
+      const PartGeometry& part = GeometryOfProduct(i);
+      if (part.box.IsEmpty()) continue;
+      boxes.push_back(part.box.Moved(motions_.back()).Grown(reach + part.pointPrecision));
+      owners.push_back(i);
+    }
+    TriangleTree tree;
+    tree.Build(boxes);
+    std::vector<std::uint32_t> partners, stack;
+    for (std::uint32_t i = 0; i < boxes.size(); ++i) {
+      partners.clear();
+      if (!tree.IsEmpty()) stack.assign(1, 0);
+      while (!stack.empty()) {
+        const std::uint32_t position = stack.back();
+        stack.pop_back();
+        const TriangleTree::Node& node = tree.Nodes()[position];
+        if (node.box.SquareDistance(boxes[i]) > 0) continue;
+        if (node.IsLeaf()) {
+          for (const std::uint32_t j : tree.Items(node))
+            if (j > i && boxes[j].SquareDistance(boxes[i]) <= 0) partners.push_back(j);
+        } else {
+          stack.push_back(node.first);
+          stack.push_back(position + 1);
+        }
+      }
+      std::ranges::sort(partners);
+      for (const std::uint32_t j : partners) AddPair(owners[i], owners[j]);
+    }
+  }
+
+  void AddPair(std::uint32_t inFirst, std::uint32_t inSecond) {
+    if (options_.isWanted && !options_.isWanted(inFirst, inSecond)) return;
+    PairOfProducts pair{inFirst, inSecond, 0, products_[inSecond].part < products_[inFirst].part};
+    const std::uint32_t a = pair.isSwapped ? inSecond : inFirst;
+    const std::uint32_t b = pair.isSwapped ? inFirst : inSecond;
+    const double size = std::max(GeometryOfProduct(b).box.Diagonal(), 1.0);
+    pair.task = tasks_.TaskFor(products_[a].part, products_[b].part,
+                               motions_[a].Inverted() * motions_[b], size);
+    pairs_.push_back(pair);
+  }
+
+  void JudgeTasks() {
+    verdicts_.resize(tasks_.Tasks().size());
+    std::atomic<std::size_t> next{0};
+    std::atomic<bool> isStopped{false};
+    std::mutex progressMutex;
+    std::size_t done = 0;
+    const auto work = [&] {
+      ProbeCache probes;
+      while (!isStopped) {
+        const std::size_t task = next++;
+        if (task >= verdicts_.size()) return;
+        JudgeTask(task, probes, progressMutex);
+        if (!options_.progress) continue;
+        const std::lock_guard lock(progressMutex);
+        if (!options_.progress(++done, verdicts_.size())) isStopped = true;
+      }
+    };
+    std::vector<std::thread> threads;
+    for (unsigned i = 1; i < options_.threads; ++i) threads.emplace_back(work);
+    work();
+    for (std::thread& thread : threads) thread.join();
+    findings_.isStopped = isStopped;
+    std::ranges::sort(failures_, {}, &std::pair<std::size_t, std::string>::first);
+    for (const auto& [task, reason] : failures_) {
+      const Task& of = tasks_.Tasks()[task];
+      findings_.unjudged.push_back(
+          {of.firstPart, false, "against part " + std::to_string(of.secondPart) + ": " + reason});
+    }
+  }
+
+  void JudgeTask(std::size_t inTask, ProbeCache& ioProbes, std::mutex& ioMutex) {
+    std::string reason;
+    try {
+      verdicts_[inTask] = VerdictOf(tasks_.Tasks()[inTask], ioProbes);
+      return;
+    } catch (const Standard_Failure& failure) {
+      reason = failure.GetMessageString();
+    } catch (const std::exception& error) {
+      reason = error.what();
+    }
+    const std::lock_guard lock(ioMutex);
+    failures_.emplace_back(inTask, reason);
+  }
+
+  std::optional<Verdict> VerdictOf(const Task& inTask, ProbeCache& ioProbes) const {
+    const PartGeometry &first = geometries_[inTask.firstPart],
+                       &second = geometries_[inTask.secondPart];
+    const double reach = std::max(options_.contactGap, options_.clearance);
+    const double precision = first.pointPrecision + second.pointPrecision;
+    std::vector<Box> boxes;
+    for (const Body& body : second.bodies)
+      boxes.push_back(body.box.Moved(inTask.firstFromSecond).Grown(reach + precision));
+    std::optional<Verdict> best;
+    for (const Body& a : first.bodies)
+      for (std::size_t i = 0; i < second.bodies.size(); ++i) {
+        const Body& b = second.bodies[i];
+        if (a.box.SquareDistance(boxes[i]) > 0) continue;
+        const bool isMixed = a.isSolid != b.isSolid;
+        if (options_.sheets == SheetPolicy::kIgnore && (!a.isSolid || !b.isSolid)) continue;
+        BodyPair pair(ioProbes.ProbeOf(a), ioProbes.ProbeOf(b), inTask.firstFromSecond, precision,
+                      options_);
+        std::optional<Verdict> verdict = pair.Judge();
+        if (!verdict) continue;
+        if (isMixed && verdict->kind == Kind::kClash && options_.sheets == SheetPolicy::kContact)
+          verdict->kind = Kind::kContact;
+        Merge(std::move(*verdict), best);
+      }
+    return best;
+  }
+
+  void AddInterference(const PairOfProducts& inPair, const Verdict& inVerdict) {
+    const gp_Trsf& rootFromCommon = motions_[inPair.isSwapped ? inPair.second : inPair.first];
+    Interference found;
+    found.first = inPair.first;
+    found.second = inPair.second;
+    found.kind = inVerdict.kind;
+    if (found.kind == Kind::kClash) found.value = inVerdict.depth > 0 ? -inVerdict.depth : 0.0;
+    if (found.kind == Kind::kClearance) found.value = inVerdict.distance;
+    std::array<gp_XYZ, 2> points = inVerdict.points;
+    if (inPair.isSwapped && found.kind == Kind::kClearance) std::swap(points[0], points[1]);
+    for (std::size_t i = 0; i < 2; ++i) found.points[i] = ToPoint(Moved(rootFromCommon, points[i]));
+    found.curveLength = inVerdict.curveLength;
+    for (const gp_XYZ& point : inVerdict.curve)
+      found.curve.push_back(ToPoint(Moved(rootFromCommon, point)));
+    found.isDuplicate = inVerdict.isDuplicate;
+    found.isSheetInSolid = inVerdict.isSheetInSolid;
+    found.hasMeshPrecision = inVerdict.hasMeshPrecision;
+    found.precision = inVerdict.precision;
+    findings_.interferences.push_back(std::move(found));
+  }
+
+  const std::vector<Product>& products_;
+  const Options& options_;
+  std::vector<PartGeometry> geometries_;
+  std::vector<gp_Trsf> motions_;
+  TaskTable tasks_;
+  std::vector<PairOfProducts> pairs_;
+  std::vector<std::optional<Verdict>> verdicts_;
+  std::vector<std::pair<std::size_t, std::string>> failures_;
+  Findings findings_;
+};
+
+}  // namespace
+
+Findings FindInterferences(const std::vector<Part>& inParts, const std::vector<Product>& inProducts,
+                           const Options& inOptions) {
+  return Search(inParts, inProducts, inOptions).Run();
+}
+
+}  // namespace ZORDetection

@@ -1,0 +1,93 @@
+// Clashes, contacts and clearance violations between the products of an assembly.
+#ifndef ZOR_TOOLKIT_DETECTION_FINDINTERFERENCES_H
+#define ZOR_TOOLKIT_DETECTION_FINDINTERFERENCES_H
+
+#include <array>
+#include <cstdint>
+#include <functional>
+#include <string>
+#include <vector>
+
+class TopoDS_Shape;
+
+namespace ZORDetection {
+
+/// Coordinates in millimetres.
+using Point = std::array<double, 3>;
+
+/// A rigid placement: a direct rotation by rows, each followed by its component of the translation.
+using Placement = std::array<std::array<double, 4>, 3>;
+
+/// What products are instances of. Exact geometry if there is any, else triangles.
+struct Part {
+  const TopoDS_Shape* shape = nullptr;  ///< borrowed for the call; gets triangles
+  std::vector<Point> points;
+  std::vector<std::array<std::uint32_t, 3>> triangles;
+  /// Largest error of `points`: half a unit in the last place of a single-precision file.
+  double pointPrecision = 0;
+};
+
+struct Product {
+  std::uint32_t part = 0;
+  Placement rootFromProduct{{{1, 0, 0, 0}, {0, 1, 0, 0}, {0, 0, 1, 0}}};
+};
+
+/// What a surface that encloses nothing means when it enters a solid.
+enum class SheetPolicy { kClash, kContact, kIgnore };
+
+/// Lengths in millimetres.
+struct Options {
+  double tolerance = 0.01;   ///< a clash is deeper
+  double contactGap = 1e-5;  ///< a contact is at most this far apart
+  double clearance = 0;      ///< 0: clearances are not looked for
+  SheetPolicy sheets = SheetPolicy::kClash;
+  unsigned threads = 1;
+  double meshSize = 1;  ///< scales the triangles that the search starts from, not the result
+  bool withCurves = true;
+  /// Says which pairs are looked at; all when empty. Called from the calling thread only.
+  std::function<bool(std::uint32_t, std::uint32_t)> isWanted;
+  /// Told how many verdicts are done of how many; returns false to stop. From any thread, never twice
+  /// at a time.
+  std::function<bool(std::size_t, std::size_t)> progress;
+};
+
+enum class Kind { kClash, kContact, kClearance };
+
+struct Interference {
+  std::uint32_t first = 0, second = 0;  ///< products, first < second
+  Kind kind = Kind::kContact;
+  double value = 0;  ///< minus the depth, 0, or the distance
+  /// Deepest point and its foot, the closest points, or twice the middle of the patch of contact.
+  /// The first lies on the first product unless the second product is the one that goes deeper.
+  std::array<Point, 2> points{};
+  double curveLength = 0;    ///< of the crossing, or of the border of the patch of contact
+  std::vector<Point> curve;  ///< points along it
+  bool isDuplicate = false;  ///< the same geometry at the same place
+  bool isSheetInSolid = false;
+  bool hasMeshPrecision = false;  ///< triangles were all there was
+  double precision = 0;           ///< by how much such triangles may miss their surface
+};
+
+/// Something that could not be judged.
+struct Unjudged {
+  std::uint32_t part = 0;
+  bool isWholePart = true;  ///< nothing of the part was checked
+  std::string reason;
+};
+
+struct Findings {
+  std::vector<Interference> interferences;  ///< in the order of the products
+  std::vector<Unjudged> unjudged;
+  std::size_t pairsChecked = 0;  ///< of products whose boxes come near
+  std::size_t verdicts = 0;      ///< pairs of parts in different placements to each other
+  bool isStopped = false;
+};
+
+/// Looks at each pair of products once. The result does not depend on the number of threads.
+/// @return what was found up to a stop that `progress` asked for.
+Findings FindInterferences(const std::vector<Part>& inParts, const std::vector<Product>& inProducts,
+                           const Options& inOptions);
+
+}  // namespace ZORDetection
+
+#endif
