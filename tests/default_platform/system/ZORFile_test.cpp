@@ -301,6 +301,23 @@ TEST(ZORFCopy, OldTargetKeepsItsPermissions) {
   EXPECT_EQ(status.st_mode & 0777, 0666u);
 }
 
+TEST(ZORFCopy, OntoADanglingLinkMakesTheFileThatItLeadsTo) {
+  const TemporaryFolder folder;
+  folder.WriteFile("source", "new");
+  fs::create_symlink("target", folder.FilePath("link"));
+  EXPECT_EQ(Copy(folder.FilePath("source"), folder.FilePath("link")), S_OK);
+  EXPECT_TRUE(fs::is_symlink(folder.FilePath("link")));
+  EXPECT_EQ(ReadFile(folder.FilePath("target")), "new");
+}
+
+TEST(ZORFCopy, NewTargetHasThePermissionsOfTheSource) {
+  const TemporaryFolder folder;
+  folder.WriteFile("source", "text");
+  fs::permissions(folder.FilePath("source"), fs::perms(0700));
+  EXPECT_EQ(Copy(folder.FilePath("source"), folder.FilePath("new")), S_OK);
+  EXPECT_EQ(fs::status(folder.FilePath("new")).permissions(), fs::perms(0700));
+}
+
 TEST(ZORFCopy, UnknownFlagsAndNullAreRefused) {
   EXPECT_EQ(ZORFCopy(nullptr, L"a", 0), E_INVALIDARG);
   EXPECT_EQ(ZORFCopy(L"a", nullptr, 0), E_INVALIDARG);

@@ -4,6 +4,8 @@
 #include <gtest/gtest.h>
 #include <jpeglib.h>
 #include <png.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
 #include <cstdio>
 #include <filesystem>
@@ -86,6 +88,8 @@ std::vector<std::uint8_t> DecodedJpeg(const std::string& inPath) {
   return pixels;
 }
 
+ZORPixelImage Sample() { return ZORPixelImage(kWidth, kHeight, SomePixels()); }
+
 TEST_F(ZORPixelImageFiles, PngHoldsTheVeryPixels) {
   const ZORPixelImage image(kWidth, kHeight, SomePixels());
   EXPECT_EQ(image.Write("PNG", PathOf("a.png").c_str()), S_OK);
@@ -151,6 +155,37 @@ TEST_F(ZORPixelImageFiles, LinkStaysAndItsTargetIsReplaced) {
   EXPECT_EQ(image.Write("PNG", PathOf("link.png").c_str()), S_OK);
   EXPECT_TRUE(fs::is_symlink(PathOf("link.png")));
   EXPECT_EQ(DecodedPng(PathOf("target.png")), SomePixels());
+}
+
+TEST_F(ZORPixelImageFiles, DanglingLinkStaysAndLeadsToThePicture) {
+  fs::create_symlink("real.png", PathOf("link.png"));
+  EXPECT_EQ(Sample().Write("PNG", PathOf("link.png").c_str()), S_OK);
+  EXPECT_TRUE(fs::is_symlink(PathOf("link.png")));
+  EXPECT_EQ(DecodedPng(PathOf("real.png")), SomePixels());
+}
+
+TEST_F(ZORPixelImageFiles, LinkInACircleIsRefusedAndStays) {
+  fs::create_symlink("one.png", PathOf("one.png"));
+  EXPECT_EQ(Sample().Write("PNG", PathOf("one.png").c_str()), kZORFileBadPath);
+  EXPECT_TRUE(fs::is_symlink(PathOf("one.png")));
+}
+
+TEST_F(ZORPixelImageFiles, OldFileKeepsItsPermissions) {
+  WriteText("a.png", "old");
+  fs::permissions(PathOf("a.png"), fs::perms(0640));
+  EXPECT_EQ(Sample().Write("PNG", PathOf("a.png").c_str()), S_OK);
+  EXPECT_EQ(fs::status(PathOf("a.png")).permissions(), fs::perms(0640));
+}
+
+// Also for root, who may put a file in a device's place.
+TEST_F(ZORPixelImageFiles, DeviceStaysADevice) {
+  constexpr dev_t kNull = 0x103;  // what /dev/null is
+  if (mknod(PathOf("null").c_str(), S_IFCHR | 0666, kNull) != 0)
+    GTEST_SKIP() << "no devices may be made here";
+  EXPECT_EQ(Sample().Write("PNG", PathOf("null").c_str()), S_OK);
+  EXPECT_TRUE(fs::is_character_file(PathOf("null")));
+  EXPECT_EQ(Files(), std::vector<std::string>{"null"});
+  EXPECT_EQ(Sample().Write("PNG", "/dev/full"), kZORFileDiskFull);
 }
 
 TEST_F(ZORPixelImageFiles, NamesInAnyLanguageAreWritten) {
