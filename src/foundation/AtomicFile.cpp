@@ -36,7 +36,7 @@ std::uint64_t RandomNumber() {
   return number;
 }
 
-/// The path behind symbolic links, which need not lead to a file.
+/// Resolves symbolic links, whether or not the last one leads to a file.
 std::string FollowLinks(const std::string& inPath) {
   constexpr int kMaxLinks = 40;  // as many as Linux follows
   fs::path path = inPath;
@@ -58,7 +58,7 @@ void CopyExtendedAttributes(int inFrom, int inTo) {
   for (std::size_t start = 0; start < names.size();) {
     const char* const name = names.data() + start;
     start = names.find('\0', start) + 1;
-    // Rights that were given to the old bytes, not to whatever comes in their place.
+    // Granted to the old content, not to whatever replaces it.
     if (std::string_view(name) == "security.capability") continue;
     const ssize_t count = fgetxattr(inFrom, name, nullptr, 0);
     if (count < 0) continue;
@@ -71,15 +71,15 @@ void CopyExtendedAttributes(int inFrom, int inTo) {
 }  // namespace
 
 TemporaryFile::TemporaryFile(const std::string& inFolder, unsigned int inMode,
-                             const std::string& inStandsFor)
-    : standsFor_(inStandsFor) {
+                             const std::string& inReportedPath)
+    : reportedPath_(inReportedPath) {
   const std::string folder = inFolder + (inFolder.ends_with('/') ? "" : "/");
   do {
     path_ = folder + std::string(kTemporaryPrefix) + HexText(RandomNumber());
-    removeOnSignal_.emplace(path_.c_str());  // before there is something to remove
+    removeOnSignal_.emplace(path_.c_str());  // first, so that no signal falls between
     descriptor_ = open(path_.c_str(), O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, inMode);
   } while (descriptor_ < 0 && errno == EEXIST);
-  if (descriptor_ < 0) throw FileError(standsFor_, errno);
+  if (descriptor_ < 0) throw FileError(reportedPath_, errno);
 }
 
 TemporaryFile::~TemporaryFile() {
@@ -94,17 +94,17 @@ std::string TemporaryFile::Utf8Path() const {
 void TemporaryFile::Write(std::string_view inBytes) {
   std::size_t written = 0;
   const int error = WriteAll(descriptor_, inBytes, written);
-  if (error != 0) throw FileError(standsFor_, error);
+  if (error != 0) throw FileError(reportedPath_, error);
 }
 
 int TemporaryFile::Reopen() {
   struct stat here {
   }, there{};
   if (fstat(descriptor_, &here) != 0 || stat(path_.c_str(), &there) != 0)
-    throw FileError(standsFor_, errno);
+    throw FileError(reportedPath_, errno);
   if (here.st_ino == there.st_ino && here.st_dev == there.st_dev) return descriptor_;
   const int reopened = open(path_.c_str(), O_RDWR | O_CLOEXEC | O_NOFOLLOW);
-  if (reopened < 0) throw FileError(standsFor_, errno);
+  if (reopened < 0) throw FileError(reportedPath_, errno);
   close(descriptor_);
   return descriptor_ = reopened;
 }
@@ -147,12 +147,12 @@ void AtomicFile::KeepAttributes(int inDescriptor) const {
   const ZORFoundation::Descriptor old(open(target_.c_str(), O_PATH | O_CLOEXEC));
   struct stat status {};
   if (!old.IsOpen() || fstat(old.Get(), &status) != 0 || !S_ISREG(status.st_mode)) return;
-  // Whoever may not give the file away may still give it to a group of his own.
+  // Without the right to change the owner, the group may still be one of the process's own.
   bool isOwnerKept = fchown(inDescriptor, status.st_uid, status.st_gid) == 0;
   if (!isOwnerKept)
     isOwnerKept = fchown(inDescriptor, static_cast<uid_t>(-1), status.st_gid) == 0 &&
                   status.st_uid == geteuid();
-  // The rights of another owner's program are not passed on to this one's.
+  // Set-user-id and set-group-id bits must not pass to another owner.
   if (fchmod(inDescriptor, status.st_mode & (isOwnerKept ? 07777U : 0777U)) != 0)
     throw FileError(path_, errno);
   const ZORFoundation::Descriptor readable(
@@ -176,7 +176,7 @@ void AtomicFile::Commit() {
 void AtomicFile::Rename() {
   const char* const from = temporary_->Path().c_str();
   if (!options_.mayReplace) {
-    // There was no such file before; another process may have been quicker.
+    // No such file at first, but another process may have made one since.
     if (renameat2(AT_FDCWD, from, AT_FDCWD, target_.c_str(), RENAME_NOREPLACE) == 0) return;
     if (errno != EINVAL && errno != ENOSYS) throw FileError(path_, errno);
   }

@@ -1,4 +1,4 @@
-// Files that take their place only once they are whole.
+// Atomic replacement of files.
 #ifndef ZOR_FOUNDATION_ATOMICFILE_H
 #define ZOR_FOUNDATION_ATOMICFILE_H
 
@@ -12,53 +12,59 @@
 
 namespace ZORFoundation {
 
-/// A new file under a name of its own, removed when this goes or a termination signal ends the
-/// process. Raises FileError for the path that it stands for.
+/// A new file under a unique name, removed by the destructor or when a termination signal ends the
+/// process. Raises FileError.
 class ZOR_FOUNDATION_EXPORT TemporaryFile {
  public:
-  /// @param inMode permissions, from which the system takes what the user's mask forbids.
-  /// @param inStandsFor the path in a FileError.
-  TemporaryFile(const std::string& inFolder, unsigned int inMode, const std::string& inStandsFor);
+  /// @param inMode permissions, subject to the umask.
+  /// @param inReportedPath the path that a FileError names in place of the temporary one.
+  TemporaryFile(const std::string& inFolder, unsigned int inMode,
+                const std::string& inReportedPath);
   ~TemporaryFile();
   TemporaryFile(const TemporaryFile&) = delete;
   TemporaryFile& operator=(const TemporaryFile&) = delete;
 
   const std::string& Path() const { return path_; }
-  /// A path that is valid UTF-8, whatever the folder's name is, and works while this lives.
+  /// A path to the same file that is valid UTF-8 whatever the folder's name, for as long as this
+  /// lives.
   std::string Utf8Path() const;
-  /// Open for reading and writing; from the start of the file as long as only others write.
+  /// Open for reading and writing.
   int Descriptor() const { return descriptor_; }
 
   void Write(std::string_view inBytes);
-  /// Takes up what another replaced the file by. @return its descriptor.
+  /// Switches to whatever file now has this path, in case a writer replaced it.
+  /// @return the descriptor.
   int Reopen();
-  /// The file has got another name.
+  /// The file has been renamed and is no longer this object's to remove.
   void Release() { path_.clear(); }
 
-  /// Whether a file's name, without its folder, is one of those that this class gives.
+  /// Whether a file name, without its folder, is of the form that this class generates.
   static bool IsTemporaryName(std::string_view inName);
 
  private:
-  std::string standsFor_;
-  std::string path_;  // empty when the file is not this object's any more
+  std::string reportedPath_;
+  std::string path_;  // empty once released
   std::optional<RemoveOnSignal> removeOnSignal_;
   int descriptor_ = -1;
 };
 
 struct AtomicFileOptions {
-  unsigned int modeOfNew = 0666;  ///< permissions of a file that did not exist, without the mask's
-  bool mayReplace = true;         ///< otherwise an existing file is refused (EEXIST)
-  /// Whether the bytes are on the disk before they take their place. Not needed for what can be
-  /// made again.
+  unsigned int modeOfNew =
+      0666;                ///< permissions of a file that did not exist; subject to the umask
+  bool mayReplace = true;  ///< otherwise an existing file is refused (EEXIST)
+  /// Flush the bytes to disk before the rename. Not worth the wait for what can be made again.
   bool isSynchronised = true;
 };
 
-/// Replaces a file by a new one that is written beside it. Whatever happens before Commit has
-/// succeeded, the old file stays as it is, and nothing is left of the new one unless the process is
-/// killed. The new file has the permissions of the old one, and its owner, group, extended
-/// attributes and access control list where the system allows it. A link is followed, also one to
-/// where no file is yet. A device or a pipe is never replaced: it is given the bytes at the end.
-/// Raises FileError, at once where nothing can be written, and std::bad_alloc.
+/// Replaces a file by a new one that is written beside it. Until Commit succeeds the old file is
+/// untouched; if it never does, nothing is left of the new one unless the process is killed.
+///
+/// The new file keeps the permissions of the old one and, where the system allows it, its owner,
+/// group, extended attributes and access control list. Symbolic links are followed, dangling ones
+/// included. A device or a pipe is never replaced: it receives the bytes at Commit.
+///
+/// The constructor already raises FileError where nothing could be written; every operation may
+/// raise std::bad_alloc.
 class ZOR_FOUNDATION_EXPORT AtomicFile {
  public:
   explicit AtomicFile(const std::string& inPath, const AtomicFileOptions& inOptions = {});
@@ -67,7 +73,7 @@ class ZOR_FOUNDATION_EXPORT AtomicFile {
   AtomicFile& operator=(const AtomicFile&) = delete;
 
   void Write(std::string_view inBytes) { temporary_->Write(inBytes); }
-  /// The new file, for what writes by a path or a descriptor.
+  /// The new file, for writers that take a path or a descriptor.
   const TemporaryFile& Temporary() const { return *temporary_; }
   void Commit();
 
@@ -77,8 +83,8 @@ class ZOR_FOUNDATION_EXPORT AtomicFile {
   void Rename();
   void CopyIntoTarget() const;
 
-  std::string path_;    // as it was given
-  std::string target_;  // behind all links
+  std::string path_;    // as given
+  std::string target_;  // with links resolved
   AtomicFileOptions options_;
   bool isNew_ = false;     // nothing is replaced
   bool isStream_ = false;  // a device or a pipe

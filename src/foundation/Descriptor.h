@@ -1,4 +1,4 @@
-// Open files.
+// Open files. The functions return 0, or the errno value of what failed.
 #ifndef ZOR_FOUNDATION_DESCRIPTOR_H
 #define ZOR_FOUNDATION_DESCRIPTOR_H
 
@@ -10,13 +10,12 @@
 
 namespace ZORFoundation {
 
-/// Writes all the bytes. @return 0, or the errno value that says why not.
+/// Writes all the bytes.
 /// @param outWritten the number really written, also after a failure.
 ZOR_FOUNDATION_EXPORT int WriteAll(int inDescriptor, std::string_view inBytes,
                                    std::size_t& outWritten);
 
-/// Closes an open file, since closing can be what fails. @return 0, or the errno value that says why
-/// bytes may be lost.
+/// Closes an open file. Written bytes may be lost when this fails.
 ZOR_FOUNDATION_EXPORT int CloseDescriptor(int inDescriptor);
 
 /// A file descriptor, closed when the scope ends.
@@ -39,8 +38,7 @@ class Descriptor {
   int descriptor_;
 };
 
-/// Copies what is left of one open file into another. @return 0, or the errno value that says why
-/// not.
+/// Copies the rest of one open file into another.
 ZOR_FOUNDATION_EXPORT int CopyBytes(int inSource, int inTarget);
 
 }  // namespace ZORFoundation

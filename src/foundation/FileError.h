@@ -21,7 +21,7 @@ class ZOR_FOUNDATION_EXPORT FileError : public std::runtime_error {
     code_ = inCode;
   }
 
-  /// The errno value. What is neither a file nor a folder has ESPIPE, what is too large EFBIG.
+  /// The errno value; ESPIPE for what is neither a file nor a folder, EFBIG for what is too large.
   int Code() const { return code_; }
   std::string Path() const { return std::string(what(), reasonStart_ - 2); }
   std::string Reason() const { return what() + reasonStart_; }

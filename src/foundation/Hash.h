@@ -15,7 +15,7 @@ struct Hash128Value {
   friend bool operator==(const Hash128Value&, const Hash128Value&) = default;
 };
 
-/// The hash of bytes that are at hand.
+/// The hash of bytes in memory.
 ZOR_FOUNDATION_EXPORT std::uint64_t Hash64Of(std::string_view inBytes, std::uint64_t inSeed = 0);
 ZOR_FOUNDATION_EXPORT Hash128Value Hash128Of(std::string_view inBytes, std::uint64_t inSeed = 0);
 
@@ -23,7 +23,7 @@ ZOR_FOUNDATION_EXPORT Hash128Value Hash128Of(std::string_view inBytes, std::uint
 ZOR_FOUNDATION_EXPORT std::string HexText(std::uint64_t inHash);
 ZOR_FOUNDATION_EXPORT std::string HexText(const Hash128Value& inHash);
 
-/// The state behind the two hashes below.
+/// The state shared by the two hashes below.
 class ZOR_FOUNDATION_EXPORT HashState {
  protected:
   explicit HashState(std::uint64_t inSeed);
@@ -35,14 +35,14 @@ class ZOR_FOUNDATION_EXPORT HashState {
   alignas(64) unsigned char state_[576];
 };
 
-/// A hash to which bytes are added piece by piece: how they are cut makes no difference to bytes,
-/// so texts of free length are added by AddText.
+/// A hash of bytes added piece by piece. Where the pieces are cut makes no difference, so texts of
+/// variable length go through AddText.
 template <class Value>
 class IncrementalHash : private HashState {
  public:
   explicit IncrementalHash(std::uint64_t inSeed = 0) : HashState(inSeed) {}
   void Add(std::string_view inBytes) { AddBytes(inBytes.data(), inBytes.size()); }
-  /// Adds the text and where it ends.
+  /// Adds the length, then the text.
   void AddText(std::string_view inText) {
     Add(inText.size());
     Add(inText);

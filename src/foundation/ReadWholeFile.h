@@ -1,4 +1,4 @@
-// Files that are read as a whole.
+// Reading whole files.
 #ifndef ZOR_FOUNDATION_READWHOLEFILE_H
 #define ZOR_FOUNDATION_READWHOLEFILE_H
 
@@ -11,7 +11,7 @@
 
 namespace ZORFoundation {
 
-/// What tells one content of a file from another without reading it.
+/// Identifies a file's content without reading it: another content has another stamp.
 struct FileStamp {
   std::uint64_t device = 0, inode = 0, size = 0;
   std::int64_t modified = 0, changed = 0;  // nanoseconds since 1970
@@ -26,21 +26,21 @@ ZOR_FOUNDATION_EXPORT std::int64_t FileClockNow();
 
 struct ReadOptions {
   std::uint64_t maxSize = std::numeric_limits<std::uint64_t>::max();  ///< in bytes
-  /// Whether devices and pipes are read too, to their end. Otherwise they are refused at once,
-  /// without waiting for whoever writes into them.
+  /// Read devices and pipes too, to their end. Otherwise they are refused at once, without waiting
+  /// for a writer.
   bool mayBeStream = false;
 };
 
 struct WholeFile {
   std::string bytes;
-  FileStamp before, after;  ///< of the first and the last byte's reading
-  /// Whether the bytes are one state of the file, which has that stamp.
+  FileStamp before, after;  ///< taken before the first and after the last byte was read
+  /// Whether the file stayed the same meanwhile, so that bytes and stamp belong together.
   bool IsConsistent() const { return before == after && before.size == bytes.size(); }
 };
 
-/// Reads a file from its first byte to its last. Raises FileError: missing (ENOENT), a folder
-/// (EISDIR), a device, pipe or socket (ESPIPE), larger than allowed (EFBIG), and what the system
-/// says else; std::bad_alloc.
+/// Reads a file from its first byte to its last. Raises FileError when it is missing (ENOENT), a
+/// folder (EISDIR), a device, pipe or socket (ESPIPE), larger than allowed (EFBIG), or unreadable
+/// for another reason; std::bad_alloc.
 ZOR_FOUNDATION_EXPORT WholeFile ReadWholeFile(const std::string& inPath,
                                               const ReadOptions& inOptions = {});
 
@@ -49,7 +49,7 @@ ZOR_FOUNDATION_EXPORT std::optional<WholeFile> TryReadWholeFile(const std::strin
                                                                 const ReadOptions& inOptions = {});
 
 /// Reads what is left of an open file, pipe or device.
-/// @param inName stands for the path in a FileError.
+/// @param inName what a FileError names.
 ZOR_FOUNDATION_EXPORT std::string ReadToEnd(
     int inDescriptor, const std::string& inName,
     std::uint64_t inMaxSize = std::numeric_limits<std::uint64_t>::max());

@@ -9,11 +9,11 @@
 
 namespace ZORFoundation {
 
-/// From now on such a signal removes unfinished files before it ends the process. It is for the
-/// program to call this; a library leaves its host's signals alone.
+/// Makes these signals remove unfinished files before they end the process. For programs to call; a
+/// library leaves its host's signals alone.
 ZOR_FOUNDATION_EXPORT void HandleTerminationSignals();
 
-/// While this lives, a termination signal that is handled removes a file of this process.
+/// While this lives, a termination signal removes a file, if the program handles such signals.
 class ZOR_FOUNDATION_EXPORT RemoveOnSignal {
  public:
   /// @param inPath lives as long as this; the file need not exist yet.
@@ -26,18 +26,18 @@ class ZOR_FOUNDATION_EXPORT RemoveOnSignal {
   std::size_t slot_;
 };
 
-/// While this lives the first termination signal is only noted, for work that is to stop in good
-/// order; the next one ends the process. One at a time; forked processes have it too.
+/// While this lives the first termination signal is only recorded, so that work can stop cleanly;
+/// the next one ends the process. One at a time; inherited by forked processes.
 class ZOR_FOUNDATION_EXPORT StopRequest {
  public:
   StopRequest();
-  /// The signals are handled as before.
+  /// Restores the previous handling.
   ~StopRequest();
   StopRequest(const StopRequest&) = delete;
   StopRequest& operator=(const StopRequest&) = delete;
 
   bool IsMade() const;
-  /// Raises Interrupted when it is made.
+  /// Raises Interrupted once a signal was recorded.
   void Check() const;
 };
 
@@ -46,7 +46,7 @@ struct Interrupted {
   int signal;
 };
 
-/// Ends the process as the signal does that is not caught.
+/// Ends the process as the uncaught signal would.
 [[noreturn]] ZOR_FOUNDATION_EXPORT void EndBySignal(int inSignal);
 
 }  // namespace ZORFoundation

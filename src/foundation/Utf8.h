@@ -10,7 +10,7 @@
 
 namespace ZORFoundation {
 
-/// What stands for text that cannot be converted.
+/// Replaces what cannot be converted.
 inline constexpr char16_t kReplacementCharacter = 0xFFFD;
 
 inline bool IsHighSurrogate(char32_t inUnit) { return inUnit >= 0xD800 && inUnit <= 0xDBFF; }

@@ -7,7 +7,7 @@
 
 namespace ZORFoundation {
 
-/// A position, a direction or a colour. Nothing is set at first, since millions are made.
+/// A position, a direction or a colour. Uninitialised by default, since millions are made.
 template <class Number>
 struct Vector3 {
   Number x, y, z;
@@ -15,8 +15,8 @@ struct Vector3 {
 using Vector3f = Vector3<float>;
 using Vector3d = Vector3<double>;
 
-/// Any type with the public members x, y and z, such as a platform's own vector: what follows is
-/// for all of them. Types of other namespaces need `using namespace ZORFoundation`.
+/// Any type with public members x, y and z, such as the platform's vectors. The functions below
+/// serve all of them; for types of other namespaces they need `using namespace ZORFoundation`.
 template <class Vector>
 concept IsVector3 = requires(const Vector& inVector) {
   Vector{inVector.x, inVector.y, inVector.z};

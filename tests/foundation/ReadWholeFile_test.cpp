@@ -58,7 +58,7 @@ TEST(ReadWholeFile, StampsAreTheFilesAndAgree) {
   EXPECT_EQ(whole.before.size, 4U);
 }
 
-TEST(ReadWholeFile, StampTellsAChangedFile) {
+TEST(ReadWholeFile, StampOfAChangedFileDiffers) {
   const TemporaryFolder folder;
   folder.WriteFile("a", "text");
   const auto before = StampOfFile(folder.FilePath("a"));

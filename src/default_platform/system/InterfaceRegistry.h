@@ -13,13 +13,13 @@ namespace ZORDefault {
 /// is the name's 128-bit hash, most significant byte first.
 ZOR_PLATFORM_EXPORT GUID IdentifierOfName(std::string_view inName);
 
-/// The identifier of the interface of a name, which is known from then on.
+/// Registers an interface under a name. @return its identifier.
 ZOR_PLATFORM_EXPORT const IID& RegisterInterface(const char* inName, const char* inFramework);
 
 /// The identifier of a registered interface; null for an unknown name.
 ZOR_PLATFORM_EXPORT const IID* FindInterface(const char* inName);
 
-/// The object behind a set of facets.
+/// An object that offers its interfaces as facets.
 class FacetedComponent {
  public:
   /// The facet that is an interface, without a reference added; null when there is none.

@@ -1,4 +1,4 @@
-// Settings and catalogues: TOML files, where they are looked for and what is kept of them.
+// Settings and message catalogues: where their TOML files are searched for, and a cache of them.
 #ifndef ZOR_DEFAULT_PLATFORM_SYSTEM_TOMLFILES_H
 #define ZOR_DEFAULT_PLATFORM_SYSTEM_TOMLFILES_H
 
@@ -47,9 +47,9 @@ std::optional<FoundFile> FindToml(const std::vector<std::string>& inDirectories,
 std::shared_ptr<const TomlTable> ReadSettingFile(std::string_view inFolder,
                                                  std::string_view inName);
 
-/// Gives what a file's content means, reading it only when its stamp is another than at the last
-/// reading. A file that was written so shortly before it was read that a second change might bear
-/// the same time is read again until it has settled.
+/// Caches the parsed content of files, reading one again only when its stamp has changed. A file
+/// written so recently that a second change could carry the same time is read again until it has
+/// settled.
 template <class Content>
 class FileCache {
  public:
@@ -58,7 +58,7 @@ class FileCache {
 
   explicit FileCache(Reader inReader) : reader_(inReader) {}
 
-  /// @return null when there is no file, it cannot be read or means nothing.
+  /// @return null when there is no file, or it cannot be read or parsed.
   Pointer Get(const std::optional<FoundFile>& inFile) {
     if (!inFile) return nullptr;
     const std::lock_guard lock(mutex_);

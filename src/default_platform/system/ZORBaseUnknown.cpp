@@ -25,7 +25,7 @@ HRESULT ZORBaseUnknown::QueryInterface(const IID& inInterface, void** outInterfa
   return S_OK;
 }
 
-// Identifiers are made from names, so whoever offers an interface by the one offers it by the other.
+// Identifiers are made from names, so an interface offered by one is offered by the other too.
 HRESULT ZORBaseUnknown::QueryInterface(const char* inInterfaceName, void** outInterface) {
   if (inInterfaceName)
     return QueryInterface(ZORDefault::IdentifierOfName(inInterfaceName), outInterface);

@@ -1,5 +1,5 @@
-// Numbers in texts: what the C library's formatted reading and printing do in the C locale, with
-// short ways for the plain formats.
+// Numbers in texts: the C library's formatted reading and printing in the C locale, with fast paths
+// for the common formats.
 #include <algorithm>
 #include <charconv>
 #include <cstdio>
@@ -28,7 +28,7 @@ bool SkipDigits(const char*& ioText) {
   return digits <= 4;
 }
 
-// Reads what stands between '%' and the conversion letter.
+// Skips what lies between '%' and the conversion letter.
 bool SkipToLetter(const char*& ioText, NumberKind inKind, FormatUse inUse) {
   if (inUse == FormatUse::kPrint)
     while (IsOneOf(*ioText, inKind == NumberKind::kInt ? "-+ 0" : "-+ #0")) ++ioText;
@@ -89,9 +89,9 @@ bool ReadDecimalInt(std::u16string_view inText, int& outNumber) {
 
 // The start of a text as narrow characters, as long as they are those of a plain decimal number;
 // empty when the number is not plain: then the C library decides.
-class PlainNumber {
+class DecimalDigits {
  public:
-  explicit PlainNumber(std::u16string_view inText) {
+  explicit DecimalDigits(std::u16string_view inText) {
     const char16_t* const end = inText.data() + inText.size();
     const char16_t* text = SkipSpace(inText.data(), end);
     if (text < end && *text == '+') {
@@ -121,13 +121,13 @@ class PlainNumber {
   std::size_t length_ = 0;
 };
 
-// @return false also where only the C library can tell.
-bool ReadPlainDouble(std::u16string_view inText, double& outNumber) {
-  const PlainNumber plain(inText);
+// @return false also where only the C library can decide.
+bool ReadDecimalDouble(std::u16string_view inText, double& outNumber) {
+  const DecimalDigits digits(inText);
   double number = 0;
-  const auto [rest, error] = std::from_chars(plain.begin(), plain.end(), number);
-  // What is left over (such as the "e" of "1e") and what is out of range is the C library's affair.
-  if (error != std::errc() || rest != plain.end()) return false;
+  const auto [rest, error] = std::from_chars(digits.begin(), digits.end(), number);
+  // What is left over (such as the "e" of "1e") and what is out of range is left to the C library.
+  if (error != std::errc() || rest != digits.end()) return false;
   outNumber = number;
   return true;
 }
@@ -205,7 +205,7 @@ int ZORUnicodeString::ConvertToNum(double* outNumber, const char* inFormat) cons
   if (!outNumber) return 0;
   const bool plain =
       IsFormat(inFormat, "%le") || IsFormat(inFormat, "%lf") || IsFormat(inFormat, "%lg");
-  if (plain && ReadPlainDouble(units_, *outNumber)) return 1;
+  if (plain && ReadDecimalDouble(units_, *outNumber)) return 1;
   if (!plain && !FindConversion(inFormat, NumberKind::kDouble, FormatUse::kScan)) return 0;
   double number = 0;
   if (!Scan(ConvertToChar(), inFormat, &number)) return 0;

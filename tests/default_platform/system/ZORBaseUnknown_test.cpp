@@ -90,7 +90,7 @@ TEST(ZORBaseUnknown, QueryInterfaceRefusesANullOutput) {
   EXPECT_EQ(component.QueryInterface("ZORBaseUnknown", nullptr), E_INVALIDARG);
 }
 
-TEST(ZORBaseUnknown, AutomationIsNotThere) {
+TEST(ZORBaseUnknown, AutomationIsNotImplemented) {
   ZORBaseUnknown component;
   EXPECT_EQ(component.GetTypeInfoCount(nullptr), E_NOTIMPL);
   EXPECT_EQ(component.GetTypeInfo(0, 0, nullptr), E_NOTIMPL);
@@ -98,7 +98,7 @@ TEST(ZORBaseUnknown, AutomationIsNotThere) {
   EXPECT_EQ(component.Invoke(0, kPaintId, 0, 0, nullptr, nullptr, nullptr, nullptr), E_NOTIMPL);
 }
 
-TEST(ZORBaseUnknown, ClassIsTold) {
+TEST(ZORBaseUnknown, ClassIsReported) {
   ZORBaseUnknown component;
   EXPECT_STREQ(component.IsA(), "ZORBaseUnknown");
   EXPECT_STREQ(ZORBaseUnknown::ClassName(), "ZORBaseUnknown");
@@ -115,7 +115,7 @@ TEST(ZORBaseUnknown, DerivedClassIsAlsoItsBase) {
   EXPECT_EQ(paint.IsAKindOf("ZORBaseUnknown"), 1);
 }
 
-TEST(ZORBaseUnknown, ImplementsItselfUnlessToldOtherwise) {
+TEST(ZORBaseUnknown, ImplementsItselfUnlessSetOtherwise) {
   ZORBaseUnknown first, second;
   EXPECT_EQ(first.GetImpl(), &first);
   EXPECT_EQ(first.IsEqual(&first), 1);
@@ -128,7 +128,7 @@ TEST(ZORBaseUnknown, ImplementsItselfUnlessToldOtherwise) {
   EXPECT_EQ(second.GetImpl(), &second);
 }
 
-TEST(ZORBaseUnknown, IsThereAndTakesStateChanges) {
+TEST(ZORBaseUnknown, IsNotNullAndAcceptsStateChanges) {
   ZORBaseUnknown component;
   EXPECT_EQ(component.IsNull(), 0);
   EXPECT_EQ(component.ChangeComponentState(0, 1), S_OK);
@@ -152,7 +152,7 @@ struct CallsByName : ZORBaseUnknown {
   using ZORBaseUnknown::QueryInterface;
   HRESULT QueryInterface(const char*, void**) override { return E_FAIL; }
 };
-struct TellsItsMeta : ZORBaseUnknown {
+struct ReportsItsMeta : ZORBaseUnknown {
   ZORMetaClass* GetMetaObject() const override { return nullptr; }
 };
 struct ChangesState : ZORBaseUnknown {
@@ -179,7 +179,7 @@ int OverriddenSlot() {
 TEST(ZORBaseUnknown, SlotsAreInTheirFixedOrder) {
   EXPECT_EQ(OverriddenSlot<CountsReferences>(), 1);
   EXPECT_EQ(OverriddenSlot<CallsByName>(), 7);
-  EXPECT_EQ(OverriddenSlot<TellsItsMeta>(), 10);
+  EXPECT_EQ(OverriddenSlot<ReportsItsMeta>(), 10);
   EXPECT_EQ(OverriddenSlot<ChangesState>(), 17);
 }
 

@@ -57,7 +57,7 @@ class SizeLimit {
 
 }  // namespace
 
-TEST(ZORFileAccess, TellsWhatIsThere) {
+TEST(ZORFileAccess, ReportsWhatExists) {
   const TemporaryFolder folder;
   folder.WriteFile("a", "x");
   EXPECT_EQ(ZORFileAccess(folder.FilePath("a").c_str(), 0), 0);
@@ -160,7 +160,7 @@ TEST(ZORFWrite, WritesNothingAndMuch) {
   EXPECT_EQ(ReadFile(folder.FilePath("a")), much);
 }
 
-TEST(ZORFWrite, FullDiskIsTold) {
+TEST(ZORFWrite, FullDiskIsReported) {
   int descriptor = -1;
   std::size_t written = 99;
   ASSERT_EQ(Open("/dev/full", "wb", descriptor), S_OK);
@@ -169,7 +169,7 @@ TEST(ZORFWrite, FullDiskIsTold) {
   EXPECT_EQ(ZORFClose(descriptor), S_OK);
 }
 
-TEST(ZORFWrite, PartThatFittedIsTold) {
+TEST(ZORFWrite, PartThatFittedIsReported) {
   const TemporaryFolder folder;
   int descriptor = -1;
   std::size_t written = 99;
@@ -264,7 +264,7 @@ TEST(ZORFCopy, DeviceIsWrittenIntoNotReplaced) {
   EXPECT_TRUE(fs::is_character_file("/dev/null"));
 }
 
-TEST(ZORFCopy, MissingSourceOrDirectoryIsTold) {
+TEST(ZORFCopy, MissingSourceOrDirectoryIsReported) {
   const TemporaryFolder folder;
   folder.WriteFile("source", "text");
   folder.WriteFile("target", "old");

@@ -180,7 +180,7 @@ TEST_P(ShippedCatalogues, ListsAreTheSameInAllLanguages) {
   }
 }
 
-TEST_P(ShippedCatalogues, StatesCanBeToldApart) {
+TEST_P(ShippedCatalogues, StatesAreDistinct) {
   EXPECT_NE(Text("Relevant"), Text("Irrelevant"));
   EXPECT_NE(Text("Relevant"), Text("NotInspected"));
   EXPECT_NE(Text("Irrelevant"), Text("NotInspected"));

@@ -70,7 +70,7 @@ TEST(ZORUnicodeString, ConvertToNumSaturatesInts) {
   EXPECT_EQ(ToInt("-99999999999999999999999999", "%i"), INT_MIN);
 }
 
-TEST(ZORUnicodeString, ConvertToNumTellsBasesApartWithI) {
+TEST(ZORUnicodeString, ConvertToNumDetectsTheBaseWithI) {
   EXPECT_EQ(ToInt("0x1F", "%i"), 31);
   EXPECT_EQ(ToInt("010", "%i"), 8);
   EXPECT_EQ(ToInt("10", "%i"), 10);

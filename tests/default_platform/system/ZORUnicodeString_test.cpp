@@ -304,7 +304,7 @@ TEST(ZORUnicodeString, SearchSubStringFindsAtEveryPlaceOfLongTexts) {
   }
 }
 
-TEST(ZORUnicodeString, SubStringTakesAtMostWhatIsThere) {
+TEST(ZORUnicodeString, SubStringEndsWithTheText) {
   const ZORUnicodeString text("abcdef");
   EXPECT_TRUE(text.SubString(2, 3) == "cde");
   EXPECT_TRUE(text.SubString(2) == "cdef");
