@@ -21,17 +21,31 @@ struct PartMesh;
 
 namespace ZORDefault {
 
+enum class ModelErrorKind {
+  kFile,         ///< it does not exist, is a folder, is empty, cannot be read, changes all the time
+  kFormat,       ///< of no known format, or cut off
+  kUnreadable,   ///< the CAD kernel cannot read it, or finds nothing to show
+  kDamaged,      ///< readable but for a part; only with ModelOptions::isStrict
+  kCrash,        ///< the CAD kernel crashed
+  kTimeLimit,    ///< more processor time than allowed
+  kMemoryLimit,  ///< more memory than allowed
+  kNoReader      ///< the program that reads models cannot be started
+};
+
 /// A model cannot be opened. what() is "PATH: REASON", one line of UTF-8.
 class ZOR_PLATFORM_EXPORT ModelError : public std::runtime_error {
  public:
-  ModelError(const std::string& inPath, const std::string& inReason);
+  ModelError(const std::string& inPath, const std::string& inReason,
+             ModelErrorKind inKind = ModelErrorKind::kUnreadable);
   ~ModelError() override;
+  ModelErrorKind GetKind() const { return kind_; }
   const std::string& GetPath() const { return path_; }
   const std::string& GetReason() const { return reason_; }
 
  private:
   std::string path_;
   std::string reason_;
+  ModelErrorKind kind_;
 };
 
 struct ModelOptions {
@@ -42,9 +56,15 @@ struct ModelOptions {
   /// ~/.cache/zorlyra) and take it from there the next time. Where nothing can be written the model
   /// is opened all the same.
   bool useCache = true;
-  /// Told the share that is done, 0 to 1, never less than before. May be empty.
+  /// A file of which the CAD kernel leaves out what it cannot read is an error, not a warning.
+  bool isStrict = false;
+  /// Processor time in seconds and memory in bytes that reading may take; 0: 6 s and 10 s a megabyte,
+  /// 512 MB and 256 times the file's size. A model in the cache has no limits.
+  double maxSeconds = 0;
+  std::uint64_t maxMemory = 0;
+  /// Called with the share that is done, 0 to 1, never less than before. May be empty.
   std::function<void(double inDone)> progress;
-  /// Told in one line of what was mended or left out. May be empty.
+  /// Called with one line for what was repaired or left out. May be empty.
   std::function<void(const std::string& inWarning)> warn;
 };
 
@@ -60,8 +80,10 @@ struct OpenedModel {
 /// roots gets one above them. A placement that cannot be undone, or is not finite, is read as none,
 /// with a warning; a part without triangles stays in the tree.
 /// @param inPath in UTF-8 on Linux.
-/// Raises ModelError when nothing can be shown: there is no such file, it is empty, cut off, not of
-/// its format, or holds no geometry.
+/// The file is read by a process of its own, so that a damaged one cannot crash the caller's. Other
+/// files that it names are read when they are regular files in its folder or below.
+/// Raises ModelError when nothing can be shown, std::bad_alloc, and what the functions in the options
+/// raise.
 ZOR_PLATFORM_EXPORT OpenedModel OpenModel(const std::string& inPath,
                                           const ModelOptions& inOptions = {});
 

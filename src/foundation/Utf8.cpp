@@ -35,12 +35,6 @@ void CopyAsciiBlocks(std::basic_string_view<From> inText, std::size_t& ioPositio
   }
 }
 
-UChar32 NextOfUtf8(std::string_view inBytes, std::size_t& ioPosition) {
-  UChar32 character;
-  U8_NEXT(inBytes.data(), ioPosition, inBytes.size(), character);
-  return character;
-}
-
 inline char32_t NextOfUtf16(std::u16string_view inUnits, std::size_t& ioPosition) {
   char32_t character;
   U16_NEXT_OR_FFFD(inUnits.data(), ioPosition, inUnits.size(), character);
@@ -56,8 +50,11 @@ inline char* Encode(char32_t inCharacter, char* outBytes) {
 }  // namespace
 
 bool IsUtf8(std::string_view inBytes) {
-  for (std::size_t position = 0; position < inBytes.size();)
-    if (NextOfUtf8(inBytes, position) < 0) return false;
+  for (std::size_t position = 0; position < inBytes.size();) {
+    UChar32 character;
+    U8_NEXT(inBytes.data(), position, inBytes.size(), character);
+    if (character < 0) return false;
+  }
   return true;
 }
 
@@ -92,6 +89,12 @@ std::size_t Utf8Length(std::u16string_view inUnits) {
 
 char32_t NextCharacter(std::u16string_view inUnits, std::size_t& ioPosition) {
   return NextOfUtf16(inUnits, ioPosition);
+}
+
+char32_t NextCharacter(std::string_view inBytes, std::size_t& ioPosition) {
+  char32_t character;
+  U8_NEXT_OR_FFFD(inBytes.data(), ioPosition, inBytes.size(), character);
+  return character;
 }
 
 char* EncodeCharacter(char32_t inCharacter, char* outBytes) {

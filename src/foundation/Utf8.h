@@ -41,6 +41,10 @@ ZOR_FOUNDATION_EXPORT std::size_t EncodeUtf8(std::u16string_view inUnits, char* 
 /// surrogate is U+FFFD.
 ZOR_FOUNDATION_EXPORT char32_t NextCharacter(std::u16string_view inUnits, std::size_t& ioPosition);
 
+/// Takes the character at a position of a UTF-8 text and moves the position past it; a maximal part
+/// of an ill-formed sequence is U+FFFD.
+ZOR_FOUNDATION_EXPORT char32_t NextCharacter(std::string_view inBytes, std::size_t& ioPosition);
+
 /// Writes one character below U+110000, no surrogate, as UTF-8.
 /// @return the end of what was written.
 ZOR_FOUNDATION_EXPORT char* EncodeCharacter(char32_t inCharacter, char* outBytes);

@@ -102,3 +102,11 @@ TEST(Utf8, RandomUnitsComeBackWithReplacements) {
     EXPECT_EQ(Decoded(Encoded(units)), expected);
   }
 }
+
+TEST(Utf8, CharactersAreTakenOneByOne) {
+  const std::string_view bytes = "a\xE2\x82\xAC\xE2\x82z";
+  std::size_t position = 0;
+  for (const char32_t expected : {U'a', U'\u20AC', U'\uFFFD', U'z'})
+    EXPECT_EQ(NextCharacter(bytes, position), expected);
+  EXPECT_EQ(position, bytes.size());
+}

@@ -137,6 +137,7 @@ TEST(IncludeArrows, ToolkitSeesLibraryPlatformFrontHeadersAndFoundation) {
   for (const char* include : {kGroup, kDefaultPlatform, kTool, "\"StaticOrder.h\""}) {
     EXPECT_FALSE(MayInclude("src/toolkit/scenes/A.cpp", include)) << include;
   }
+  EXPECT_FALSE(MayInclude("src/toolkit/scenes/A.h", kThirdParty));
 }
 
 TEST(IncludeArrows, CommandSeesTheToolkitAndWhatItStandsOn) {

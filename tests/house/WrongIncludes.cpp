@@ -27,6 +27,9 @@ const Part* PartOf(const std::string& inPath) {
            Pattern("src/(platform|foundation)/.*|ZORPlatformExport")},
       Part{Pattern("src/default_platform/.*"),
            Pattern("src/(platform|foundation)/.*|ZORPlatformExport|third-party")},
+      Part{Pattern("src/toolkit/.*\\.h"),
+           Pattern("include/.*|src/(platform|foundation)/.*|src/default_platform/[^/]*|"
+                   "ZORToolkitExport")},
       Part{Pattern("src/toolkit/.*"),
            Pattern("include/.*|src/(platform|foundation)/.*|src/default_platform/[^/]*|"
                    "ZORToolkitExport|third-party")},

@@ -301,7 +301,7 @@ TEST_F(Publish, KilledRunGoesOn) {
            kResult + " & for i in {1..1000}; do ls " + folder_ +
            "/pictures/*.jpg && break; sleep 0.01; done; kill -9 $!");
   EXPECT_EQ(RunSmall({"--resume"}).code, 0);
-  const CommandResult difference = RunShell("diff -r -x '.picture-*' " + whole + " " + folder_);
+  const CommandResult difference = RunShell("diff -r -x '.zorlyra-*' " + whole + " " + folder_);
   EXPECT_EQ(difference.code, 0) << difference.out;
 }
 

@@ -188,8 +188,9 @@ TEST_F(PublishedPictures, TerminatedRunGoesOn) {
 TEST_F(PublishedPictures, WhatAKilledRunLeftUnfinishedGoes) {
   ASSERT_EQ(Run(NutAndRod("", "")).code, 0);
   for (const char* name :
-       {"out/.lyra-Ab12Cz", "out/pictures/.picture-0123456789abcdef", "out/pictures/.drawing_1.jpg",
-        "out/pictures/.drawing_1_SubItf_12.png", "out/.mine", "out/pictures/.mine"})
+       {"out/.zorlyra-fedcba9876543210", "out/pictures/.zorlyra-0123456789abcdef",
+        "out/pictures/.drawing_1.jpg", "out/pictures/.drawing_1_SubItf_12.png", "out/.mine",
+        "out/pictures/.mine"})
     directory_.Write(name, "unfinished");
   ASSERT_EQ(Run(NutAndRod("", ""), {"--resume"}).code, 0);
   EXPECT_THAT(Hidden(folder_), testing::ElementsAre(".mine"));

@@ -4,7 +4,6 @@
 
 #include "lyra/CommandErrors.h"
 #include "lyra/Prologue.h"
-#include "lyra/ReplacedFile.h"
 #include "lyra/Verbs.h"
 #include "toolkit/records/DocumentText.h"
 #include "toolkit/records/InterferenceRecord.h"
@@ -58,8 +57,8 @@ std::unique_ptr<ClashDocument> LoadNew(const std::string& inPath, const std::str
 int Federate(const FederateOptions& inOptions, Output& ioOutput) {
   inOptions.prologue.Check();
   const std::vector<LinkRecord> links = GatherLinks(inOptions);
-  ReplacedFile output(inOptions.output);
-  const std::string& path = output.TemporaryPath();
+  OutputFile output(inOptions.output);
+  const std::string& path = output.Path();
   output.Check(CreateFederator(inOptions.prologue, path));
   const std::unique_ptr<ClashDocument> federator = LoadNew(path, inOptions.output);
   ClashDocumentEdit edit(*federator);

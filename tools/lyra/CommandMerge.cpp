@@ -3,7 +3,6 @@
 #include <memory>
 
 #include "lyra/Prologue.h"
-#include "lyra/ReplacedFile.h"
 #include "lyra/Verbs.h"
 
 namespace lyra {
@@ -33,8 +32,8 @@ int Merge(MergeOptions& ioOptions, Output& ioOutput) {
     edit.TakeIn(*LoadClash(ioOptions.files[i]), trace);
   if (ioOptions.verbose) std::fputs(trace.c_str(), stderr);
   if (ioOptions.sumCounts) edit.RecountInterferences();
-  ReplacedFile output(ioOptions.output);
-  output.Check(edit.Dump(ioOptions.prologue, output.TemporaryPath()));
+  OutputFile output(ioOptions.output);
+  output.Check(edit.Dump(ioOptions.prologue, output.Path()));
   output.Finish(ioOutput);
   return 0;
 }

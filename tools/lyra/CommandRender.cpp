@@ -7,7 +7,6 @@
 #include "lyra/ModelFile.h"
 #include "lyra/Picture.h"
 #include "lyra/ProductWalk.h"
-#include "lyra/ReplacedFile.h"
 #include "lyra/Verbs.h"
 #include "platform/product_structure/ZORIAlias.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
@@ -92,28 +91,19 @@ void Fill(Scene& ioScene, const RenderOptions& inOptions, const ZORIProduct_var&
   }
 }
 
-/// @return false when the file is still empty. A picture takes the file's place, so what may be done
-/// with the file is carried over, and an open file's path is resolved first.
-bool Draw(ZOR3DRep& inRep, const PictureWishes& inWishes, const std::string& inPath) {
-  const fs::path place = fs::canonical(inPath);
-  const fs::perms permissions = fs::status(place).permissions();
-  TakePicture(inRep, inWishes, inPath);
-  fs::permissions(place, permissions);
-  return !fs::is_empty(place);
-}
-
 int Render(const RenderOptions& inOptions, Output& ioOutput) {
   PictureWishes wishes;
   wishes.format = FormatOfPicture(inOptions.picture);
   wishes.view = ViewOf(inOptions.view);
   wishes.keepsBackground = inOptions.keepBackground;
   if (!inOptions.size.empty()) wishes.size = SizeOf(inOptions.size);
-  { const ReplacedFile probe(inOptions.picture); }  // fails at once where nothing can be written
+  { const OutputFile probe(inOptions.picture); }  // fails at once where nothing can be written
   const ZORIProduct_var root = OpenModelFile(inOptions.file).root;
   Scene scene;
   Fill(scene, inOptions, root);
-  ReplacedFile file(inOptions.picture);
-  if (!Draw(*scene.Rep(), wishes, file.TemporaryPath()))
+  OutputFile file(inOptions.picture);
+  TakePicture(*scene.Rep(), wishes, file.Path());
+  if (fs::is_empty(file.Path()))
     throw InputError(inOptions.picture + ": the picture cannot be drawn or written");
   file.Finish(ioOutput);
   return 0;

@@ -2,7 +2,6 @@
 #include <memory>
 
 #include "lyra/Prologue.h"
-#include "lyra/ReplacedFile.h"
 #include "lyra/Verbs.h"
 #include "toolkit/publishing/ReportWriter.h"
 #include "toolkit/records/ClashDocument.h"
@@ -21,8 +20,8 @@ int Report(const ReportOptions& inOptions, Output& ioOutput) {
   inOptions.prologue.Check();
   const ClashDocument document(inOptions.file);
   document.RequireInterferences();
-  ReplacedFile output(inOptions.output);
-  output.Check(WriteReport(document, inOptions.prologue, output.TemporaryPath()));
+  OutputFile output(inOptions.output);
+  output.Check(WriteReport(document, inOptions.prologue, output.Path()));
   output.Finish(ioOutput);
   return 0;
 }

@@ -1,9 +1,11 @@
 // lyra path NAME, lyra escape TEXT, lyra filename TEXT
-#include <cstdio>
+#include <unistd.h>
+
 #include <memory>
 
 #include "BuildPath.h"
 #include "ZORLyraGeneralServices.h"
+#include "foundation/ReadWholeFile.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
 #include "toolkit/records/DocumentText.h"
@@ -19,19 +21,12 @@ struct TextOptions {
 
 using Converter = void (*)(ZORUnicodeString& inText, ZORUnicodeString& ioOutput);
 
-std::string ReadStandardInput() {
-  std::string bytes;
-  char part[1 << 14];
-  for (std::size_t count; (count = std::fread(part, 1, sizeof part, stdin)) > 0;)
-    bytes.append(part, count);
-  if (std::ferror(stdin) != 0) throw InputError("-: cannot be read");
-  return bytes;
-}
-
 /// Converts a text of the command line as a line, standard input as it stands.
 int Convert(const TextOptions& inOptions, Converter inFirst, Converter inOther, Output& ioOutput) {
   const bool isStream = inOptions.text == "-";
-  ZORUnicodeString text = FromUtf8(isStream ? ReadStandardInput() : inOptions.text), converted;
+  ZORUnicodeString text = FromUtf8(isStream ? ZORFoundation::ReadToEnd(STDIN_FILENO, "-")
+                                            : inOptions.text),
+                   converted;
   (inOptions.other ? inOther : inFirst)(text, converted);
   ioOutput.Write(Utf8(converted) + (isStream ? "" : "\n"));
   return 0;

@@ -6,12 +6,18 @@
 #include <cerrno>
 #include <cstdlib>
 #include <cstring>
+#include <filesystem>
 #include <string>
 
+#include "foundation/ReadWholeFile.h"
 #include "lyra/CommandErrors.h"
+#include "platform/system/ZORFile.h"
 #include "platform/system/ZORGetEnv.h"
 
 namespace lyra {
+
+using ZORFoundation::FileError;
+
 namespace {
 
 bool IsSet(const char* inName) {
@@ -49,6 +55,29 @@ int Output::Width() const {
   }
   winsize size{};
   return ioctl(fileno(stream_), TIOCGWINSZ, &size) == 0 ? size.ws_col : 0;
+}
+
+OutputFile::OutputFile(const std::string& inPath) : path_(inPath) {
+  constexpr unsigned int kOwnerOnly = 0600;
+  if (inPath == "-")
+    forStream_.emplace(std::filesystem::temp_directory_path().string(), kOwnerOnly, inPath);
+  else
+    file_.emplace(inPath);
+}
+
+void OutputFile::Check(HRESULT inResult) const {
+  if (SUCCEEDED(inResult)) return;
+  if (inResult == kZORFileNotFound) throw FileError(path_, ENOENT);
+  if (inResult == kZORFileAccessDenied) throw FileError(path_, EACCES);
+  if (inResult == kZORFileDiskFull) throw FileError(path_, ENOSPC);
+  throw FileError(path_, EIO, "the file could not be written");
+}
+
+void OutputFile::Finish(Output& ioOutput) {
+  if (file_)
+    file_->Commit();
+  else
+    ioOutput.Write(ZORFoundation::ReadWholeFile(Temporary().Path()).bytes);
 }
 
 }  // namespace lyra

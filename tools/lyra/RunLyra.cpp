@@ -7,9 +7,9 @@
 #include <string>
 #include <vector>
 
+#include "foundation/TerminationSignals.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/CommandLine.h"
-#include "lyra/EndingSignals.h"
 #include "lyra/Language.h"
 #include "lyra/SafeText.h"
 
@@ -70,6 +70,7 @@ int RunLyra(int inCount, char** inArguments) {
   // A reader that goes away shows as a failed write, so that work can stop in good order.
   std::signal(SIGPIPE, SIG_IGN);
   std::signal(SIGXFSZ, SIG_IGN);  // likewise a file that may not grow any further
+  ZORFoundation::HandleTerminationSignals();
   try {
     Output output(stdout);
     const int code = ParseAndAct(inCount, inArguments, output);
@@ -79,8 +80,8 @@ int RunLyra(int inCount, char** inArguments) {
     return 0;
   } catch (const UsageError& error) {
     return ComplainOfUsage(error.what());
-  } catch (const Interrupted& interrupted) {
-    EndBy(interrupted.signal);
+  } catch (const ZORFoundation::Interrupted& interrupted) {
+    ZORFoundation::EndBySignal(interrupted.signal);
   } catch (const std::bad_alloc&) {
     Complain("there is not enough memory");
   } catch (const std::exception& error) {

@@ -7,16 +7,12 @@
 #include <cwctype>
 #include <vector>
 
-#include "toolkit/records/DocumentText.h"
+#include "foundation/Utf8.h"
 
 namespace lyra {
-using namespace ZORToolkit;
 namespace {
 
-bool IsAscii(std::string_view inText) {
-  return std::all_of(inText.begin(), inText.end(),
-                     [](char inByte) { return static_cast<unsigned char>(inByte) < 0x80; });
-}
+using ZORFoundation::IsAscii;
 
 bool IsPlain(std::string_view inText) {
   return std::all_of(inText.begin(), inText.end(),
@@ -24,31 +20,16 @@ bool IsPlain(std::string_view inText) {
 }
 
 std::vector<char32_t> CodePoints(std::string_view inText) {
-  const ZORUnicodeString text = FromUtf8(inText);
-  const ZORUC2Bytes* units = text.ConvertToUCChar();
-  const int count = text.GetLengthInChar();
   std::vector<char32_t> points;
-  points.reserve(static_cast<std::size_t>(count));
-  for (int i = 0; i < count; ++i) {
-    const bool isPair = (units[i] & 0xFC00) == 0xD800 && i + 1 < count;
-    if (isPair) {
-      points.push_back(0x10000U + ((units[i] & 0x3FFU) << 10) + (units[i + 1] & 0x3FFU));
-      ++i;
-    } else {
-      points.push_back(units[i]);
-    }
-  }
+  points.reserve(inText.size());
+  for (std::size_t position = 0; position < inText.size();)
+    points.push_back(ZORFoundation::NextCharacter(inText, position));
   return points;
 }
 
-void AppendCodePoint(char32_t inPoint, ZORUnicodeString& ioText) {
-  const ZORUC2Bytes pair[2] = {static_cast<ZORUC2Bytes>(0xD7C0 + (inPoint >> 10)),
-                               static_cast<ZORUC2Bytes>(0xDC00 + (inPoint & 0x3FF))};
-  const ZORUC2Bytes unit = static_cast<ZORUC2Bytes>(inPoint);
-  if (inPoint < 0x10000)
-    ioText.AppendUTF16(&unit, 1);
-  else
-    ioText.AppendUTF16(pair, 2);
+void AppendCodePoint(char32_t inPoint, std::string& ioText) {
+  char bytes[4];
+  ioText.append(bytes, ZORFoundation::EncodeCharacter(inPoint, bytes));
 }
 
 bool IsControl(char32_t inPoint) { return inPoint < 0x20 || (inPoint >= 0x7F && inPoint < 0xA0); }
@@ -102,29 +83,28 @@ int ColumnsOf(const std::vector<char32_t>& inPoints) {
 
 std::string Printable(std::string_view inText) {
   if (IsPlain(inText)) return std::string(inText);
-  ZORUnicodeString shown;
+  std::string shown;
   for (char32_t point : CodePoints(inText)) {
     if (IsControl(point) || IsDeceptive(point))
-      shown += Hex("\\u{%X}", point).c_str();
+      shown += Hex("\\u{%X}", point);
     else
       AppendCodePoint(point, shown);
   }
-  return Utf8(shown);
+  return shown;
 }
 
 std::string EscapedForJson(std::string inJson) {
   if (IsAscii(inJson) && inJson.find('\x7F') == std::string::npos) return inJson;
-  ZORUnicodeString escaped;
+  std::string escaped;
   for (char32_t point : CodePoints(inJson)) {
     if (!IsControl(point) && !IsDeceptive(point))
       AppendCodePoint(point, escaped);
     else if (point < 0x10000)
-      escaped += Hex("\\u%04x", point).c_str();
+      escaped += Hex("\\u%04x", point);
     else
-      escaped += (Hex("\\u%04x", 0xD7C0 + (point >> 10)) + Hex("\\u%04x", 0xDC00 + (point & 0x3FF)))
-                     .c_str();
+      escaped += Hex("\\u%04x", 0xD7C0 + (point >> 10)) + Hex("\\u%04x", 0xDC00 + (point & 0x3FF));
   }
-  return Utf8(escaped);
+  return escaped;
 }
 
 int DisplayWidth(std::string_view inText) {
@@ -143,18 +123,18 @@ std::string Fitted(std::string_view inText, int inWidth, Cut inCut) {
   points.resize(kept);
   points.push_back(U'…');
   if (inCut == Cut::kStart) std::reverse(points.begin(), points.end());
-  ZORUnicodeString fitted;
+  std::string fitted;
   for (char32_t point : points) AppendCodePoint(point, fitted);
-  return Utf8(fitted);
+  return fitted;
 }
 
 std::string CaseFolded(std::string_view inText) {
-  ZORUnicodeString folded;
+  std::string folded;
   const UnicodeTables tables;
   // By way of the capital, so that both forms of a letter such as the Greek sigma meet.
   for (char32_t point : CodePoints(inText))
     AppendCodePoint(static_cast<char32_t>(towlower(towupper(static_cast<wint_t>(point)))), folded);
-  return Utf8(folded);
+  return folded;
 }
 
 }  // namespace lyra

@@ -1,10 +1,12 @@
 #include "default_platform/product_structure/ModelCache.h"
 
+#include <cstdio>
 #include <cstring>
 #include <filesystem>
+#include <optional>
 
-#include "default_platform/product_structure/ModelData.h"
 #include "foundation/AtomicFile.h"
+#include "foundation/FileError.h"
 #include "foundation/Hash.h"
 #include "foundation/ReadWholeFile.h"
 #include "platform/system/ZORGetEnv.h"
@@ -14,12 +16,11 @@ namespace {
 
 namespace fs = std::filesystem;
 
-/// What an entry begins with; the model's bytes follow.
+/// What an entry begins with; the encoded model follows.
 struct EntryHeader {
   char mark[8] = {'Z', 'O', 'R', 'M', 'O', 'D', 'E', 'L'};
-  std::uint64_t size = 0;             // of the bytes that follow
-  std::uint64_t checksum = 0;         // of the bytes that follow and of referencedFiles
-  std::uint64_t referencedFiles = 0;  // of the content of the other files
+  std::uint64_t size = 0;      // of the bytes that follow
+  std::uint64_t checksum = 0;  // of the bytes that follow
 };
 
 std::string CacheDirectory() {
@@ -32,50 +33,39 @@ std::string CacheDirectory() {
 /// The hash of the model's bytes and of all else that decides what is read.
 std::string EntryName(std::string_view inBytes, const ModelRequest& inRequest) {
   ZORFoundation::Hash128 hash;
+  hash.AddText(inBytes);
   hash.Add(std::uint64_t{kModelCodecVersion});
   hash.Add(static_cast<std::uint64_t>(inRequest.format));
   hash.Add(inRequest.deflection);
-  hash.AddText(inBytes);
   return ZORFoundation::HexText(hash.Get()) + ".model";
 }
 
-std::uint64_t HashOfFiles(const std::string& inFolder, const std::vector<std::string>& inFiles) {
-  ZORFoundation::Hash64 hash;
-  for (const std::string& name : inFiles) {
-    const auto file = ZORFoundation::TryReadWholeFile((fs::path(inFolder) / name).string());
-    hash.Add(std::uint64_t{file.has_value()});
-    hash.AddText(file ? file->bytes : std::string());
+/// Whether a referenced file is as it was when the model was read.
+bool IsUnchanged(const ReferencedFile& inFile, const fs::path& inFolder) {
+  const fs::path path = inFolder / inFile.name;
+  std::error_code error;
+  switch (inFile.state) {
+    case ReferencedFile::State::kRead: {
+      const auto whole = ZORFoundation::TryReadWholeFile(path.string());
+      return whole && ZORFoundation::Hash64Of(whole->bytes) == inFile.hash;
+    }
+    case ReferencedFile::State::kMissing:
+      return !fs::exists(path, error);
+    case ReferencedFile::State::kUnread:
+    case ReferencedFile::State::kRefused:
+      return fs::exists(path, error);
   }
-  return hash.Get();
+  return false;
 }
 
-std::uint64_t ChecksumOf(std::string_view inModel, std::uint64_t inReferencedFiles) {
-  return ZORFoundation::Hash64Of(inModel, inReferencedFiles);
-}
-
-bool IsWholeEntry(const std::string& inEntry, EntryHeader& outHeader) {
+bool IsWholeEntry(const std::string& inEntry) {
   if (inEntry.size() < sizeof(EntryHeader)) return false;
   const EntryHeader expected;
-  std::memcpy(&outHeader, inEntry.data(), sizeof(EntryHeader));
-  const std::string_view model = std::string_view(inEntry).substr(sizeof(EntryHeader));
-  return std::memcmp(outHeader.mark, expected.mark, sizeof expected.mark) == 0 &&
-         outHeader.size == model.size() &&
-         outHeader.checksum == ChecksumOf(model, outHeader.referencedFiles);
-}
-
-/// Other processes see the old entry or the new one. It is checked when it is read, so it need not
-/// be on the disk yet.
-void WriteEntry(const std::string& inPath, const EntryHeader& inHeader,
-                const std::string& inModel) {
-  try {
-    fs::create_directories(fs::path(inPath).parent_path());
-    ZORFoundation::AtomicFile file(inPath, {.isSynchronised = false});
-    file.Write({reinterpret_cast<const char*>(&inHeader), sizeof inHeader});
-    file.Write(inModel);
-    file.Commit();
-  } catch (const std::runtime_error&) {
-    // A model that is not kept is read again.
-  }
+  EntryHeader header;
+  std::memcpy(&header, inEntry.data(), sizeof header);
+  const std::string_view model = std::string_view(inEntry).substr(sizeof header);
+  return std::memcmp(header.mark, expected.mark, sizeof expected.mark) == 0 &&
+         header.size == model.size() && header.checksum == ZORFoundation::Hash64Of(model);
 }
 
 }  // namespace
@@ -86,27 +76,34 @@ ModelCache::ModelCache(std::string_view inBytes, const ModelRequest& inRequest)
 }
 
 ModelCache::Finding ModelCache::Load(ModelData& outModel) const {
-  const auto file = ZORFoundation::TryReadWholeFile(path_);
-  if (!file) return Finding::kNone;
-  const std::string& entry = file->bytes;
-  EntryHeader header;
+  const auto entry = path_.empty() ? std::nullopt : ZORFoundation::TryReadWholeFile(path_);
+  if (!entry) return Finding::kNone;
   ModelData model;
-  if (!IsWholeEntry(entry, header) ||
-      !DecodeModel(std::string_view(entry).substr(sizeof header), model))
+  if (!IsWholeEntry(entry->bytes) ||
+      !DecodeModel(std::string_view(entry->bytes).substr(sizeof(EntryHeader)), model))
     return Finding::kDamaged;
-  if (header.referencedFiles != HashOfFiles(folder_, model.referencedFiles)) return Finding::kNone;
+  for (const ReferencedFile& file : model.referencedFiles)
+    if (!IsUnchanged(file, folder_)) return Finding::kNone;
   outModel = std::move(model);
   return Finding::kFound;
 }
 
-void ModelCache::Store(const ModelData& inModel) const {
+void ModelCache::Store(std::string_view inEncodedModel) const {
   if (path_.empty()) return;
-  const std::string model = EncodeModel(inModel);
   EntryHeader header;
-  header.size = model.size();
-  header.referencedFiles = HashOfFiles(folder_, inModel.referencedFiles);
-  header.checksum = ChecksumOf(model, header.referencedFiles);
-  WriteEntry(path_, header, model);
+  header.size = inEncodedModel.size();
+  header.checksum = ZORFoundation::Hash64Of(inEncodedModel);
+  try {
+    fs::create_directories(fs::path(path_).parent_path());
+    ZORFoundation::AtomicFileOptions options;
+    options.isSynchronised = false;
+    ZORFoundation::AtomicFile file(path_, options);
+    file.Write({reinterpret_cast<const char*>(&header), sizeof header});
+    file.Write(inEncodedModel);
+    file.Commit();
+  } catch (const std::runtime_error&) {
+    // Without an entry the model is read again the next time.
+  }
 }
 
 }  // namespace ZORDefault

@@ -5,6 +5,7 @@
 #include <string>
 #include <string_view>
 
+#include "default_platform/product_structure/ModelData.h"
 #include "default_platform/product_structure/ModelReader.h"
 
 namespace ZORDefault {
@@ -20,9 +21,9 @@ class ModelCache {
   /// @param outModel set when it is found; files that it was also read from must be as they were.
   Finding Load(ModelData& outModel) const;
 
-  /// Keeps a model; the old entry stays whole until the new one is. Nothing is said where it cannot
-  /// be written.
-  void Store(const ModelData& inModel) const;
+  /// Keeps an encoded model; the old entry stays whole until the new one is. Nothing is said where it
+  /// cannot be written.
+  void Store(std::string_view inEncodedModel) const;
 
  private:
   std::string folder_;  ///< of the model: other files lie relative to it

@@ -52,6 +52,7 @@ class Reader {
     const auto count = Get<std::uint64_t>();
     return Has(1, count) ? count : 0;
   }
+  bool IsWhole() const { return isWhole_; }
   bool IsAtEnd() const { return isWhole_ && position_ == bytes_.size(); }
 
  private:
@@ -69,6 +70,38 @@ class Reader {
   std::size_t position_ = 0;
   bool isWhole_ = true;
 };
+
+void PutTexts(Writer& ioWriter, const std::vector<std::string>& inTexts) {
+  ioWriter.Put<std::uint64_t>(inTexts.size());
+  for (const std::string& text : inTexts) ioWriter.PutAll(text);
+}
+
+std::string GetText(Reader& ioReader) {
+  std::string text;
+  ioReader.GetAll(text);
+  return text;
+}
+
+/// Stops at the first piece that is not there: a false count costs no more than the bytes hold.
+template <class Item>
+void GetEach(Reader& ioReader, std::vector<Item>& outItems, Item (*inGet)(Reader&)) {
+  const std::size_t count = ioReader.GetCount();
+  for (std::size_t i = 0; i < count && ioReader.IsWhole(); ++i) outItems.push_back(inGet(ioReader));
+}
+
+void PutReferencedFile(Writer& ioWriter, const ReferencedFile& inFile) {
+  ioWriter.PutAll(inFile.name);
+  ioWriter.Put(inFile.state);
+  ioWriter.Put(inFile.hash);
+}
+
+ReferencedFile GetReferencedFile(Reader& ioReader) {
+  ReferencedFile file;
+  ioReader.GetAll(file.name);
+  file.state = ioReader.Get<ReferencedFile::State>();
+  file.hash = ioReader.Get<std::uint64_t>();
+  return file;
+}
 
 void PutColour(Writer& ioWriter, const std::optional<PartColour>& inColour) {
   ioWriter.Put<std::uint8_t>(inColour ? 1 : 0);
@@ -191,10 +224,11 @@ bool IsSound(const ModelData& inModel) {
 
 std::string EncodeModel(const ModelData& inModel) {
   Writer writer;
+  writer.Put<std::uint8_t>(inModel.hadFailure);
   writer.Put<std::uint64_t>(inModel.referencedFiles.size());
-  for (const std::string& file : inModel.referencedFiles) writer.PutAll(file);
-  writer.Put<std::uint64_t>(inModel.warnings.size());
-  for (const std::string& warning : inModel.warnings) writer.PutAll(warning);
+  for (const ReferencedFile& file : inModel.referencedFiles) PutReferencedFile(writer, file);
+  PutTexts(writer, inModel.damages);
+  PutTexts(writer, inModel.warnings);
   writer.Put<std::uint64_t>(inModel.parts.size());
   for (const ModelPart& part : inModel.parts) PutPart(writer, part);
   writer.Put<std::uint64_t>(inModel.products.size());
@@ -205,14 +239,12 @@ std::string EncodeModel(const ModelData& inModel) {
 bool DecodeModel(std::string_view inBytes, ModelData& outModel) {
   Reader reader(inBytes);
   ModelData model;
-  model.referencedFiles.resize(reader.GetCount());
-  for (std::string& file : model.referencedFiles) reader.GetAll(file);
-  model.warnings.resize(reader.GetCount());
-  for (std::string& warning : model.warnings) reader.GetAll(warning);
-  const std::size_t parts = reader.GetCount();
-  for (std::size_t i = 0; i < parts; ++i) model.parts.push_back(GetPart(reader));
-  const std::size_t products = reader.GetCount();
-  for (std::size_t i = 0; i < products; ++i) model.products.push_back(GetProduct(reader));
+  model.hadFailure = reader.Get<std::uint8_t>() != 0;
+  GetEach(reader, model.referencedFiles, &GetReferencedFile);
+  GetEach(reader, model.damages, &GetText);
+  GetEach(reader, model.warnings, &GetText);
+  GetEach(reader, model.parts, &GetPart);
+  GetEach(reader, model.products, &GetProduct);
   if (!reader.IsAtEnd() || !IsSound(model)) return false;
   outModel = std::move(model);
   return true;

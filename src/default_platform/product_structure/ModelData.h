@@ -37,19 +37,34 @@ struct ModelProduct {
   std::optional<PartColour> colour;
 };
 
+/// Another file that a model names.
+struct ReferencedFile {
+  enum class State : std::uint8_t {
+    kRead,     ///< parts of the content come from it
+    kMissing,  ///< it does not exist
+    kUnread,   ///< it exists, but nothing in it is needed
+    kRefused   ///< it lies outside the model's folder, or is no file
+  };
+  std::string name;  ///< relative to the model's folder, or absolute
+  State state = State::kMissing;
+  std::uint64_t hash = 0;  ///< of its bytes, when they were read
+};
+
 /// The first product is the root; a parent stands before its children, which are in order.
 struct ModelData {
   std::vector<ModelPart> parts;
   std::vector<ModelProduct> products;
-  /// Files that parts of the content were taken from: relative to the model's folder, or absolute.
-  std::vector<std::string> referencedFiles;
+  std::vector<ReferencedFile> referencedFiles;
+  std::vector<std::string> damages;   ///< what the file holds and the model does not; one line each
   std::vector<std::string> warnings;  ///< one line each, UTF-8
+  bool hadFailure = false;            ///< another reading may give more: not to be kept
 };
 
 /// Counts up with every change of the bytes or of what a reading gives.
-inline constexpr std::uint32_t kModelCodecVersion = 3;
+inline constexpr std::uint32_t kModelCodecVersion = 4;
 
-/// In the machine's own byte order: entries are not moved between machines.
+/// The form in which models are kept in the cache and handed over by the process that reads them, in
+/// the machine's own byte order.
 std::string EncodeModel(const ModelData& inModel);
 
 /// @return false when the bytes are no model: too short, too long, or holding impossible positions.

@@ -6,9 +6,9 @@
 #include <string>
 #include <vector>
 
-#include "default_platform/system/InterfaceRegistry.h"
 #include "default_platform/product_structure/ModelData.h"
 #include "default_platform/product_structure/Product.h"
+#include "default_platform/system/InterfaceRegistry.h"
 #include "default_platform/system/ObjectCounters.h"
 #include "platform/product_structure/ZORDocument.h"
 #include "platform/product_structure/ZORIProviders.h"

@@ -3,11 +3,13 @@
 #include <cerrno>
 #include <cmath>
 #include <filesystem>
+#include <optional>
 
 #include "default_platform/product_structure/ModelCache.h"
 #include "default_platform/product_structure/ModelDocument.h"
 #include "default_platform/product_structure/ModelFormat.h"
 #include "default_platform/product_structure/ModelReader.h"
+#include "foundation/FileError.h"
 #include "foundation/ReadWholeFile.h"
 
 namespace ZORDefault {
@@ -15,26 +17,42 @@ namespace {
 
 constexpr double kMaxDeflection = 0.1;
 
-std::string ReadBytes(const std::string& inPath) {
-  try {
-    std::string bytes = ZORFoundation::ReadWholeFile(inPath).bytes;
-    if (bytes.empty()) throw ModelError(inPath, "is empty");
-    return bytes;
-  } catch (const ZORFoundation::FileError& error) {
-    const bool isMissing = error.Code() == ENOENT, isFolder = error.Code() == EISDIR;
-    throw ModelError(inPath, isMissing  ? "does not exist"
-                             : isFolder ? "is a directory"
-                                        : "cannot be read");
+std::string ReasonOf(const ZORFoundation::FileError& inError) {
+  switch (inError.Code()) {
+    case ENOENT:
+    case ENOTDIR:
+      return "does not exist";
+    case EISDIR:
+      return "is a directory";
+    case ESPIPE:
+      return inError.Reason();
+    default:
+      return "cannot be read: " + inError.Reason();
   }
+}
+
+/// One state of the file, which may be saved at the same time.
+std::string ReadBytes(const std::string& inPath) try {
+  constexpr int kAttempts = 5;
+  for (int attempt = 0; attempt < kAttempts; ++attempt) {
+    ZORFoundation::WholeFile whole = ZORFoundation::ReadWholeFile(inPath);
+    if (!whole.IsConsistent()) continue;
+    if (whole.bytes.empty()) throw ModelError(inPath, "is empty", ModelErrorKind::kFile);
+    return std::move(whole.bytes);
+  }
+  throw ModelError(inPath, "changes while it is read", ModelErrorKind::kFile);
+} catch (const ZORFoundation::FileError& error) {
+  throw ModelError(inPath, ReasonOf(error), ModelErrorKind::kFile);
 }
 
 ModelFormat CheckedFormat(const std::string& inPath, const std::string& inBytes) {
   std::string reason;
   const ModelFormat format = DecideFormat(inPath, inBytes, reason);
-  if (format == ModelFormat::kUnknown) throw ModelError(inPath, reason);
+  if (format == ModelFormat::kUnknown) throw ModelError(inPath, reason, ModelErrorKind::kFormat);
   if (!IsWhole(format, inBytes)) {
     throw ModelError(inPath,
-                     std::string("is cut off: its ") + NameOfFormat(format) + " data has no end");
+                     std::string("is cut off: its ") + NameOfFormat(format) + " data has no end",
+                     ModelErrorKind::kFormat);
   }
   return format;
 }
@@ -46,29 +64,36 @@ ModelRequest RequestFor(const std::string& inPath, ModelFormat inFormat,
   return {error ? inPath : path.string(), inFormat, inOptions.deflection, inOptions.progress};
 }
 
-ModelData ReadFromFile(const std::string& inPath, const ModelRequest& inRequest) {
-  ModelData model;
-  std::string reason;
-  if (!ReadModelWithLibrary(inRequest, model, reason)) throw ModelError(inPath, reason);
-  return model;
-}
-
-/// From the cache when it is there and whole, else from the file and into the cache.
+/// From the cache when it is there and whole, else from the bytes and into the cache.
 ModelData ReadModel(const std::string& inPath, const std::string& inBytes,
-                    const ModelOptions& inOptions, bool& outIsFromCache) {
+                    const ModelOptions& inOptions, bool& outIsFromCache) try {
   const ModelRequest request = RequestFor(inPath, CheckedFormat(inPath, inBytes), inOptions);
   ModelData model;
-  outIsFromCache = false;
-  if (!inOptions.useCache) return ReadFromFile(inPath, request);
-  const ModelCache cache(inBytes, request);
-  const ModelCache::Finding finding = cache.Load(model);
+  std::optional<ModelCache> cache;
+  if (inOptions.useCache) cache.emplace(inBytes, request);
+  const auto finding = cache ? cache->Load(model) : ModelCache::Finding::kNone;
   if (finding == ModelCache::Finding::kDamaged && inOptions.warn)
     inOptions.warn(inPath + ": its entry in the cache was damaged and is made anew");
   outIsFromCache = finding == ModelCache::Finding::kFound;
   if (outIsFromCache) return model;
-  model = ReadFromFile(inPath, request);
-  cache.Store(model);
+  const std::string encoded =
+      ReadModelInChild(request, inBytes, LimitsFor(inOptions, inBytes.size()));
+  if (!DecodeModel(encoded, model))
+    throw ModelError(inPath, "cannot be read: the model reader gave no model",
+                     ModelErrorKind::kCrash);
+  if (cache && !model.hadFailure) cache->Store(encoded);
   return model;
+} catch (const ModelReaderError& error) {
+  throw ModelError(inPath, error.reason, error.kind);
+}
+
+void ReportDamages(const std::string& inPath, const ModelData& inModel,
+                   const ModelOptions& inOptions) {
+  for (const std::string& damage : inModel.damages) {
+    if (inOptions.isStrict)
+      throw ModelError(inPath, "is damaged: " + damage, ModelErrorKind::kDamaged);
+    if (inOptions.warn) inOptions.warn(inPath + ": is damaged: " + damage);
+  }
 }
 
 std::u16string NameOfFile(const std::string& inPath) {
@@ -77,8 +102,12 @@ std::u16string NameOfFile(const std::string& inPath) {
 
 }  // namespace
 
-ModelError::ModelError(const std::string& inPath, const std::string& inReason)
-    : std::runtime_error(inPath + ": " + inReason), path_(inPath), reason_(inReason) {}
+ModelError::ModelError(const std::string& inPath, const std::string& inReason,
+                       ModelErrorKind inKind)
+    : std::runtime_error(inPath + ": " + inReason),
+      path_(inPath),
+      reason_(inReason),
+      kind_(inKind) {}
 
 ModelError::~ModelError() = default;
 
@@ -87,6 +116,7 @@ OpenedModel OpenModel(const std::string& inPath, const ModelOptions& inOptions) 
     throw ModelError(inPath, "cannot be tessellated with a deflection outside 0 to 0.1");
   OpenedModel opened;
   ModelData model = ReadModel(inPath, ReadBytes(inPath), inOptions, opened.isFromCache);
+  ReportDamages(inPath, model, inOptions);
   if (inOptions.warn)
     for (const std::string& warning : model.warnings) inOptions.warn(inPath + ": " + warning);
   if (inOptions.progress) inOptions.progress(1);

@@ -5,8 +5,8 @@
 #include <vector>
 
 #include "default_platform/OpenModel.h"
-#include "default_platform/system/InterfaceRegistry.h"
 #include "default_platform/product_structure/ModelData.h"
+#include "default_platform/system/InterfaceRegistry.h"
 #include "default_platform/system/ObjectCounters.h"
 #include "platform/product_structure/ZORIAlias.h"
 #include "platform/product_structure/ZORILinkableObject.h"

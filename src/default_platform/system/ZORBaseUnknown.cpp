@@ -85,17 +85,6 @@ ZORMetaClass* ZORBaseUnknown::MetaObject() {
 const char* ZORBaseUnknown::ClassName() { return MetaObject()->IsA(); }
 const IID& ZORBaseUnknown::ClassId() { return MetaObject()->GetClassId(); }
 
-// The errors' destructors are here so that each error has one type identity for every library that
-// catches it.
-ZORFatalError::ZORFatalError(const std::string& inMessage) : std::runtime_error(inMessage) {}
-ZORFatalError::~ZORFatalError() = default;
-
-ZORNullVarError::ZORNullVarError()
-    : std::runtime_error("ThrowErrorNullVar: a call through a null interface handle") {}
-ZORNullVarError::~ZORNullVarError() = default;
-
-void ThrowErrorNullVar() { throw ZORNullVarError(); }
-
 namespace ZORDefault {
 
 ObjectCounter& CounterOf(const char* inClassName) {

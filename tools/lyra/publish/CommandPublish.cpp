@@ -1,16 +1,15 @@
 // lyra publish RESULT --model MODEL -o DIR
 #include <algorithm>
-#include <fstream>
 #include <memory>
-#include <sstream>
 #include <thread>
 
 #include "ZORLyraXMLServices.h"
+#include "foundation/AtomicFile.h"
+#include "foundation/ReadWholeFile.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/Language.h"
 #include "lyra/ModelFile.h"
 #include "lyra/OptionWord.h"
-#include "lyra/ReplacedFile.h"
 #include "lyra/Verbs.h"
 #include "lyra/publish/OnlyFilter.h"
 #include "lyra/publish/PageLibrary.h"
@@ -54,11 +53,9 @@ struct OtherStyleSheet {
 };
 
 std::string ReadWhole(const std::string& inPath) {
-  std::ifstream stream(inPath, std::ios::binary);
-  std::ostringstream bytes;
-  bytes << stream.rdbuf();
-  if (!fs::is_regular_file(inPath) || !stream) throw InputError(inPath + ": cannot be read");
-  return bytes.str();
+  auto file = ZORFoundation::TryReadWholeFile(inPath);
+  if (!file) throw InputError(inPath + ": cannot be read");
+  return std::move(file->bytes);
 }
 
 /// A reference may be written with backslashes, as on other systems.
@@ -153,22 +150,14 @@ Drawn DrawPictures(const PublishOptions& inOptions, const PictureStyle& inStyle,
   return drawn;
 }
 
-void WriteFile(const std::string& inPath, const std::string& inBytes, Output& ioOutput) {
-  ReplacedFile file(inPath);
-  std::ofstream stream(file.TemporaryPath(), std::ios::binary);
-  stream << inBytes;
-  if (!stream.flush()) throw InputError(inPath + ": the file could not be written");
-  file.Finish(ioOutput);
-}
-
 /// @return the report's bytes.
 std::string WriteReport(ClashDocument& ioResult, const std::string& inStyleSheet,
                         const std::string& inPath, Output& ioOutput) {
-  ReplacedFile file(inPath);
+  OutputFile file(inPath);
   Prologue prologue;
   prologue.styleSheet = inStyleSheet;
-  file.Check(WriteReport(ioResult, prologue, file.TemporaryPath()));
-  std::string bytes = ReadWhole(file.TemporaryPath());
+  file.Check(WriteReport(ioResult, prologue, file.Path()));
+  std::string bytes = ReadWhole(file.Path());
   file.Finish(ioOutput);
   return bytes;
 }
@@ -190,10 +179,10 @@ void WriteAll(const PublishOptions& inOptions, const OtherStyleSheet& inSheet,
   const std::string folder = inOptions.directory + "/";
   PageRequest request = RequestOf(inOptions, inSheet, inPublication);
   request.report = WriteReport(ioResult, inSheet.Name(), folder + kReport, ioOutput);
-  WriteFile(folder + kReportType, library.ReportType(), ioOutput);
-  WriteFile(folder + inSheet.Name(),
-            inSheet.path.empty() ? library.ReportStyleSheet() : inSheet.text, ioOutput);
-  WriteFile(folder + kPage, library.MakePage(request), ioOutput);
+  ZORFoundation::WriteWholeFile(folder + kReportType, library.ReportType());
+  ZORFoundation::WriteWholeFile(folder + inSheet.Name(),
+                                inSheet.path.empty() ? library.ReportStyleSheet() : inSheet.text);
+  ZORFoundation::WriteWholeFile(folder + kPage, library.MakePage(request));
 }
 
 int Publish(const PublishOptions& inOptions, Output& ioOutput) {

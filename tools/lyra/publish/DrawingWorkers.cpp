@@ -13,8 +13,8 @@
 #include <string>
 #include <vector>
 
+#include "foundation/TerminationSignals.h"
 #include "lyra/CommandErrors.h"
-#include "lyra/EndingSignals.h"
 
 namespace lyra {
 namespace {
@@ -72,8 +72,8 @@ struct Pipe {
 };
 
 // When nobody reads any more the command has ended, so there is nothing to draw for.
-[[noreturn]] void Work(const DrawingWork& inWork, const StopRequest& inStop, SharedCounter& ioNext,
-                       const Pipe& inPipe) {
+[[noreturn]] void Work(const DrawingWork& inWork, const ZORFoundation::StopRequest& inStop,
+                       SharedCounter& ioNext, const Pipe& inPipe) {
   int code = 0;
   try {
     close(inPipe.reader);
@@ -90,7 +90,7 @@ struct Pipe {
   _exit(code);  // what this process shares with its parent is the parent's to write and to remove
 }
 
-void Follow(const DrawingWork& inWork, const StopRequest& inStop, const Pipe& inPipe,
+void Follow(const DrawingWork& inWork, const ZORFoundation::StopRequest& inStop, const Pipe& inPipe,
             SharedCounter& ioNext, std::size_t& ioDone) {
   char bytes[256];
   for (;;) {
@@ -111,7 +111,7 @@ bool EndedWell(pid_t inProcess) {
 }
 
 /// @return how many of the processes failed.
-int DrawOnce(int inProcesses, const DrawingWork& inWork, const StopRequest& inStop,
+int DrawOnce(int inProcesses, const DrawingWork& inWork, const ZORFoundation::StopRequest& inStop,
              SharedCounter& ioNext, std::size_t& ioDone) {
   Pipe pipe;
   std::vector<pid_t> processes;
@@ -132,7 +132,7 @@ int DrawOnce(int inProcesses, const DrawingWork& inWork, const StopRequest& inSt
 
 // What a process that crashed was drawing is given up; what was not begun yet is not.
 void DrawInProcesses(int inProcesses, const DrawingWork& inWork) {
-  const StopRequest stop;
+  const ZORFoundation::StopRequest stop;
   SharedCounter next;
   std::size_t done = 0;
   while (DrawOnce(inProcesses, inWork, stop, next, done) > 0 && !stop.IsMade() &&

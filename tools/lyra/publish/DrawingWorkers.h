@@ -17,7 +17,7 @@ struct DrawingWork {
 /// Shares the work among processes that start as copies of this one, which should have drawn nothing
 /// yet and run no other thread. Nothing is drawn here, so that a drawing that crashes is the only one
 /// that is lost. A signal that ends the command lets each drawing be finished that is begun, and is
-/// then raised as Interrupted. Raises InputError when no process can be started.
+/// then raised as ZORFoundation::Interrupted. Raises InputError when no process can be started.
 void DrawInProcesses(int inProcesses, const DrawingWork& inWork);
 
 }  // namespace lyra

@@ -1,10 +1,9 @@
 #include "lyra/publish/PictureStore.h"
 
-#include <fstream>
-#include <iterator>
 #include <regex>
 
-#include "lyra/CommandErrors.h"
+#include "foundation/AtomicFile.h"
+#include "foundation/ReadWholeFile.h"
 
 namespace fs = std::filesystem;
 
@@ -14,29 +13,25 @@ namespace {
 constexpr char kFolder[] = "pictures";
 constexpr char kStampFile[] = ".lyra-publish";
 
-std::string BytesOf(const fs::path& inPath) {
-  std::ifstream stream(inPath, std::ios::binary);
-  return {std::istreambuf_iterator<char>(stream), {}};
-}
-
 const std::regex& FinishedNames() {
   static const std::regex names(
       R"(interference_\d+(_product_[12]|_SubItf_\d+)?\.(jpg|png|jpg\.png))");
   return names;
 }
 
-/// Of pictures that are being drawn, and of those and other files that are being written.
+/// Of pictures that are being drawn.
 const std::regex& UnfinishedNames() {
-  static const std::regex names(
-      R"(\.drawing_\d+(_SubItf_\d+)?\.(jpg|png|jpg\.png)|\.picture-[0-9a-f]{16}|\.lyra-[A-Za-z0-9]{6})");
+  static const std::regex names(R"(\.drawing_\d+(_SubItf_\d+)?\.(jpg|png|jpg\.png))");
   return names;
 }
 
 void RemoveMatching(const fs::path& inFolder, const std::regex& inNames) {
   std::vector<fs::path> matching;
-  for (const fs::directory_entry& entry : fs::directory_iterator(inFolder))
-    if (std::regex_match(entry.path().filename().string(), inNames))
+  for (const fs::directory_entry& entry : fs::directory_iterator(inFolder)) {
+    const std::string name = entry.path().filename().string();
+    if (std::regex_match(name, inNames) || ZORFoundation::TemporaryFile::IsTemporaryName(name))
       matching.push_back(entry.path());
+  }
   for (const fs::path& path : matching) fs::remove(path);
 }
 
@@ -51,13 +46,12 @@ PictureStore::PictureStore(const fs::path& inPublication, const std::string& inE
 bool PictureStore::Prepare(const std::string& inStamp, bool inGoesOn) const {
   fs::create_directories(folder_);
   const fs::path stampFile = folder_ / kStampFile;
-  const bool isSame = BytesOf(stampFile) == inStamp;
+  const auto stamp = ZORFoundation::TryReadWholeFile(stampFile.string());
+  const bool isSame = stamp && stamp->bytes == inStamp;
   if (inGoesOn && isSame) return true;
   const bool hadStamp = fs::remove(stampFile);
   RemoveMatching(folder_, FinishedNames());
-  std::ofstream stream(stampFile, std::ios::binary);
-  stream << inStamp;
-  if (!stream.flush()) throw InputError(stampFile.string() + ": cannot be written");
+  ZORFoundation::WriteWholeFile(stampFile.string(), inStamp);
   return !inGoesOn || !hadStamp;
 }
 

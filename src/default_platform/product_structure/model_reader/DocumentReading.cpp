@@ -3,6 +3,9 @@
 #include <BRep_Builder.hxx>
 #include <IGESCAFControl_Reader.hxx>
 #include <IGESControl_Controller.hxx>
+#include <Interface_Check.hxx>
+#include <Interface_CheckIterator.hxx>
+#include <Interface_InterfaceModel.hxx>
 #include <Interface_Static.hxx>
 #include <Message.hxx>
 #include <Message_Messenger.hxx>
@@ -15,8 +18,11 @@
 #include <STEPCAFControl_Reader.hxx>
 #include <TopoDS_Compound.hxx>
 #include <TopoDS_Face.hxx>
+#include <Transfer_TransientProcess.hxx>
 #include <XCAFDoc_DocumentTool.hxx>
 #include <XCAFDoc_ShapeTool.hxx>
+#include <XSControl_TransferReader.hxx>
+#include <XSControl_WorkSession.hxx>
 #include <algorithm>
 #include <filesystem>
 
@@ -33,10 +39,6 @@ Handle(TDocStd_Document) NewDocument() {
   return document;
 }
 
-std::string Refused(ModelFormat inFormat) {
-  return std::string("cannot be read as ") + NameOfFormat(inFormat);
-}
-
 void AddReferencedFile(const TCollection_AsciiString& inFile, const std::string& inModelPath,
                        std::vector<std::string>& outReferencedFiles) {
   const std::filesystem::path path(inFile.ToCString());
@@ -45,9 +47,36 @@ void AddReferencedFile(const TCollection_AsciiString& inFile, const std::string&
                                                                        : path.string());
 }
 
-bool ReadStep(const ModelRequest& inRequest, Handle(TDocStd_Document) & ioDocument,
-              const Message_ProgressRange& inProgress,
-              std::vector<std::string>& outReferencedFiles) {
+std::size_t CountFailed(Interface_CheckIterator ioChecks) {
+  std::size_t count = 0;
+  for (ioChecks.Start(); ioChecks.More(); ioChecks.Next())
+    if (ioChecks.Value()->HasFailed()) ++count;
+  return count;
+}
+
+void AddDamage(std::size_t inCount, const char* inWhat, std::vector<std::string>& ioDamages) {
+  if (inCount > 0)
+    ioDamages.push_back(std::to_string(inCount) + (inCount == 1 ? " entity" : " entities") +
+                        inWhat);
+}
+
+/// What the kernel itself says it could not read or build.
+template <class Reader>
+std::vector<std::string> DamagesOf(const Reader& inReader) {
+  std::vector<std::string> damages;
+  const Handle(XSControl_WorkSession)& session = inReader.WS();
+  const Handle(Interface_InterfaceModel) model = session->Model();
+  std::size_t unread = 0;
+  for (int i = 1; i <= model->NbEntities(); ++i)
+    if (model->IsErrorEntity(i)) ++unread;
+  AddDamage(unread, " of the file could not be read", damages);
+  if (const auto& process = session->TransferReader()->TransientProcess(); !process.IsNull())
+    AddDamage(CountFailed(process->CheckList(true)), " of the file could not be built", damages);
+  return damages;
+}
+
+bool ReadStep(const ModelRequest& inRequest, const Message_ProgressRange& inProgress,
+              const std::function<void(const char*)>& inTellStage, LoadedDocument& ioLoaded) {
   Message_ProgressScope scope(inProgress, nullptr, kReadShare + kTransferShare);
   STEPCAFControl_Reader reader;
   reader.SetColorMode(true);
@@ -58,34 +87,37 @@ bool ReadStep(const ModelRequest& inRequest, Handle(TDocStd_Document) & ioDocume
   reader.SetMatMode(false);
   if (reader.ReadFile(inRequest.path.c_str()) != IFSelect_RetDone) return false;
   scope.Next(kReadShare);
-  if (!reader.Transfer(ioDocument, scope.Next(kTransferShare))) return false;
+  if (inTellStage) inTellStage("building its shapes");
+  if (!reader.Transfer(ioLoaded.document, scope.Next(kTransferShare))) return false;
   NCollection_DataMap<TCollection_AsciiString, Handle(STEPCAFControl_ExternFile)>::Iterator file(
       reader.ExternFiles());
   for (; file.More(); file.Next())
-    AddReferencedFile(file.Key(), inRequest.path, outReferencedFiles);
-  std::ranges::sort(outReferencedFiles);
+    AddReferencedFile(file.Key(), inRequest.path, ioLoaded.referencedFiles);
+  std::ranges::sort(ioLoaded.referencedFiles);
+  ioLoaded.damages = DamagesOf(reader.Reader());
   return true;
 }
 
-bool ReadIges(const ModelRequest& inRequest, Handle(TDocStd_Document) & ioDocument,
-              const Message_ProgressRange& inProgress) {
+bool ReadIges(const ModelRequest& inRequest, const Message_ProgressRange& inProgress,
+              const std::function<void(const char*)>& inTellStage, LoadedDocument& ioLoaded) {
   IGESCAFControl_Reader reader;
   reader.SetColorMode(true);
   reader.SetNameMode(true);
   reader.SetLayerMode(false);
-  return reader.ReadFile(inRequest.path.c_str()) == IFSelect_RetDone &&
-         reader.Transfer(ioDocument, inProgress);
+  if (reader.ReadFile(inRequest.path.c_str()) != IFSelect_RetDone) return false;
+  if (inTellStage) inTellStage("building its shapes");
+  if (!reader.Transfer(ioLoaded.document, inProgress)) return false;
+  ioLoaded.damages = DamagesOf(reader);
+  return true;
 }
 
 bool ReadMeshes(RWMesh_CafReader& ioReader, const ModelRequest& inRequest,
-                const Handle(TDocStd_Document) & inDocument,
-                const Message_ProgressRange& inProgress,
-                std::vector<std::string>& outReferencedFiles) {
-  ioReader.SetDocument(inDocument);
+                const Message_ProgressRange& inProgress, LoadedDocument& ioLoaded) {
+  ioReader.SetDocument(ioLoaded.document);
   if (!ioReader.Perform(inRequest.path.c_str(), inProgress)) return false;
   NCollection_IndexedMap<TCollection_AsciiString>::Iterator file(ioReader.ExternalFiles());
   for (; file.More(); file.Next())
-    AddReferencedFile(file.Value(), inRequest.path, outReferencedFiles);
+    AddReferencedFile(file.Value(), inRequest.path, ioLoaded.referencedFiles);
   return true;
 }
 
@@ -106,47 +138,45 @@ class GltfReader : public RWGltf_CafReader {
 };
 
 /// glTF is in metres with y upwards.
-bool ReadGltf(const ModelRequest& inRequest, const Handle(TDocStd_Document) & inDocument,
-              const Message_ProgressRange& inProgress,
-              std::vector<std::string>& outReferencedFiles) {
+bool ReadGltf(const ModelRequest& inRequest, const Message_ProgressRange& inProgress,
+              LoadedDocument& ioLoaded) {
   GltfReader reader;
   reader.SetSystemLengthUnit(kMillimetre);
   reader.SetSystemCoordinateSystem(RWMesh_CoordinateSystem_Zup);
-  return ReadMeshes(reader, inRequest, inDocument, inProgress, outReferencedFiles);
+  return ReadMeshes(reader, inRequest, inProgress, ioLoaded);
 }
 
 /// OBJ says nothing of its unit and its upward axis: its numbers are taken as they stand.
-bool ReadObj(const ModelRequest& inRequest, const Handle(TDocStd_Document) & inDocument,
-             const Message_ProgressRange& inProgress,
-             std::vector<std::string>& outReferencedFiles) {
+bool ReadObj(const ModelRequest& inRequest, const Message_ProgressRange& inProgress,
+             LoadedDocument& ioLoaded) {
   RWObj_CafReader reader;
-  return ReadMeshes(reader, inRequest, inDocument, inProgress, outReferencedFiles);
+  return ReadMeshes(reader, inRequest, inProgress, ioLoaded);
 }
 
-bool ReadStl(const ModelRequest& inRequest, const Handle(TDocStd_Document) & inDocument,
-             const Message_ProgressRange& inProgress) {
+bool ReadStl(const ModelRequest& inRequest, const Message_ProgressRange& inProgress,
+             LoadedDocument& ioLoaded) {
   const Handle(Poly_Triangulation) triangles = RWStl::ReadFile(inRequest.path.c_str(), inProgress);
   if (triangles.IsNull()) return false;
   TopoDS_Face face;
   BRep_Builder().MakeFace(face, triangles);
-  XCAFDoc_DocumentTool::ShapeTool(inDocument->Main())->AddShape(face, false);
+  XCAFDoc_DocumentTool::ShapeTool(ioLoaded.document->Main())->AddShape(face, false);
   return true;
 }
 
-bool Read(const ModelRequest& inRequest, Handle(TDocStd_Document) & ioDocument,
-          const Message_ProgressRange& inProgress, std::vector<std::string>& outReferencedFiles) {
+bool Read(const ModelRequest& inRequest, const Message_ProgressRange& inProgress,
+          const std::function<void(const char*)>& inTellStage, LoadedDocument& ioLoaded) {
   switch (inRequest.format) {
     case ModelFormat::kStep:
-      return ReadStep(inRequest, ioDocument, inProgress, outReferencedFiles);
+      return ReadStep(inRequest, inProgress, inTellStage, ioLoaded);
     case ModelFormat::kIges:
-      return ReadIges(inRequest, ioDocument, inProgress);
+      return ReadIges(inRequest, inProgress, inTellStage, ioLoaded);
     case ModelFormat::kGltf:
     case ModelFormat::kGlb:
-      return ReadGltf(inRequest, ioDocument, inProgress, outReferencedFiles);
+      return ReadGltf(inRequest, inProgress, ioLoaded);
     case ModelFormat::kObj:
-      return ReadObj(inRequest, ioDocument, inProgress, outReferencedFiles);
+      return ReadObj(inRequest, inProgress, ioLoaded);
     case ModelFormat::kStl:
-      return ReadStl(inRequest, ioDocument, inProgress);
+      return ReadStl(inRequest, inProgress, ioLoaded);
     case ModelFormat::kUnknown:
       break;
   }
@@ -168,13 +198,12 @@ void PrepareReaders() {
   Interface_Static::SetIVal("read.stepcaf.subshapes.name", 0);
 }
 
-Handle(TDocStd_Document)
-    ReadDocument(const ModelRequest& inRequest, const Message_ProgressRange& inProgress,
-                 std::vector<std::string>& outReferencedFiles, std::string& outReason) {
-  Handle(TDocStd_Document) document = NewDocument();
-  if (Read(inRequest, document, inProgress, outReferencedFiles)) return document;
-  outReason = Refused(inRequest.format);
-  return nullptr;
+LoadedDocument ReadDocument(const ModelRequest& inRequest, const Message_ProgressRange& inProgress,
+                            const std::function<void(const char*)>& inTellStage) {
+  LoadedDocument loaded;
+  loaded.document = NewDocument();
+  if (!Read(inRequest, inProgress, inTellStage, loaded)) loaded.document.Nullify();
+  return loaded;
 }
 
 }  // namespace ZORDefault

@@ -4,6 +4,7 @@
 
 #include <Message_ProgressRange.hxx>
 #include <TDocStd_Document.hxx>
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -14,11 +15,16 @@ namespace ZORDefault {
 /// Silences the kernel and sets what its readers take from process-wide parameters.
 void PrepareReaders();
 
-/// @param outReferencedFiles the files that the model refers to, as it names them.
-/// @return null when the file cannot be read; outReason says why.
-Handle(TDocStd_Document)
-    ReadDocument(const ModelRequest& inRequest, const Message_ProgressRange& inProgress,
-                 std::vector<std::string>& outReferencedFiles, std::string& outReason);
+/// What a file was read into.
+struct LoadedDocument {
+  Handle(TDocStd_Document) document;         ///< null when the file cannot be read
+  std::vector<std::string> referencedFiles;  ///< relative to the model's folder, or absolute
+  std::vector<std::string> damages;          ///< what the kernel left out, one line each
+};
+
+/// @param inTellStage is told what is done next; may be empty.
+LoadedDocument ReadDocument(const ModelRequest& inRequest, const Message_ProgressRange& inProgress,
+                            const std::function<void(const char*)>& inTellStage = {});
 
 }  // namespace ZORDefault
 

@@ -8,6 +8,7 @@
 #include <Geom_Plane.hxx>
 #include <Poly_Triangulation.hxx>
 #include <Standard_Failure.hxx>
+#include <Standard_OutOfMemory.hxx>
 #include <TopExp.hxx>
 #include <TopExp_Explorer.hxx>
 #include <TopoDS.hxx>
@@ -16,6 +17,7 @@
 #include <algorithm>
 #include <cmath>
 #include <exception>
+#include <new>
 
 #include "default_platform/product_structure/model_reader/MeshBuilder.h"
 #include "default_platform/product_structure/model_reader/TreeWalk.h"
@@ -216,17 +218,23 @@ void FillMesh(const TDF_Label& inLabel, const TopoDS_Shape& inShape, ModelPart& 
 
 }  // namespace
 
-void MeshPart(const TDF_Label& inPart, double inDeflection, ModelPart& ioPart) {
+bool MeshPart(const TDF_Label& inPart, double inDeflection, ModelPart& ioPart) {
   const TopoDS_Shape shape = XCAFDoc_ShapeTool::GetShape(inPart);
-  if (shape.IsNull()) return;
+  if (shape.IsNull()) return true;
   try {
     Tessellate(shape, inDeflection);
     FillMesh(inPart, shape, ioPart);
+    return true;
+  } catch (const Standard_OutOfMemory&) {
+    throw std::bad_alloc();
+  } catch (const std::bad_alloc&) {
+    throw;
   } catch (const Standard_Failure&) {
     ioPart.failedToTessellate = true;
   } catch (const std::exception&) {
     ioPart.failedToTessellate = true;
   }
+  return false;
 }
 
 }  // namespace ZORDefault

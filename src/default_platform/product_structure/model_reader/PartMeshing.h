@@ -11,7 +11,8 @@ namespace ZORDefault {
 /// Tessellates a part and fills its mesh, area and what is missing of them. A part for which that
 /// fails stays without mesh.
 /// @param inDeflection as a share of the diagonal of the part's box.
-void MeshPart(const TDF_Label& inPart, double inDeflection, ModelPart& ioPart);
+/// @return false when the kernel raised an error. Raises std::bad_alloc.
+bool MeshPart(const TDF_Label& inPart, double inDeflection, ModelPart& ioPart);
 
 }  // namespace ZORDefault
 

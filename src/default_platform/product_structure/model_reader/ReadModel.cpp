@@ -1,17 +1,28 @@
-// The entry of the reader library.
+// The program that reads models: damaged ones may crash the CAD kernel, which must not be in a host's
+// process.
+#include <unistd.h>
+
 #include <Message_ProgressIndicator.hxx>
 #include <Message_ProgressScope.hxx>
 #include <Standard_Failure.hxx>
+#include <Standard_OutOfMemory.hxx>
 #include <algorithm>
+#include <cstdlib>
 #include <exception>
 #include <filesystem>
+#include <new>
+#include <set>
 #include <vector>
 
-#include "default_platform/product_structure/ModelReader.h"
 #include "default_platform/product_structure/model_reader/DocumentReading.h"
+#include "default_platform/product_structure/model_reader/FileDoor.h"
+#include "default_platform/product_structure/model_reader/ModelChecks.h"
 #include "default_platform/product_structure/model_reader/PartMeshing.h"
-#include "default_platform/product_structure/model_reader/ReferencedFiles.h"
+#include "default_platform/product_structure/model_reader/ProcessLimits.h"
 #include "default_platform/product_structure/model_reader/TreeWalk.h"
+#include "foundation/Descriptor.h"
+#include "foundation/ReadWholeFile.h"
+#include "foundation/Utf8.h"
 
 namespace ZORDefault {
 namespace {
@@ -19,29 +30,53 @@ namespace {
 constexpr int kReadingShare = 60;  // of a hundred: reading against tessellating
 constexpr int kMeshingShare = 40;
 
-/// Tells a function of every hundredth that is done.
-class Progress : public Message_ProgressIndicator {
- public:
-  explicit Progress(const std::function<void(double)>& inTell) : tell_(inTell) {}
+/// Raised where a model cannot be read.
+struct Refusal {
+  std::string reason;
+};
 
+void TellStatus(const std::string& inLine) {
+  std::size_t written = 0;
+  ZORFoundation::WriteAll(ModelReaderProtocol::kStatus, inLine + '\n', written);
+}
+
+/// Tells of every hundredth that is done.
+class Progress : public Message_ProgressIndicator {
  protected:
   void Show(const Message_ProgressScope&, const Standard_Boolean) override {
-    const double done = std::min(GetPosition(), 1.0);
-    if (!tell_ || done < told_ + 0.01) return;
+    const int done = static_cast<int>(100 * std::min(GetPosition(), 1.0));
+    if (done <= told_) return;
     told_ = done;
-    tell_(done);
+    TellStatus(std::to_string(done));
   }
 
  private:
-  const std::function<void(double)>& tell_;
-  double told_ = 0;
+  int told_ = 0;
 };
+
+/// Messages of the kernel may have several lines.
+std::string OneLine(const char* inMessage) {
+  std::string line = inMessage ? inMessage : "";
+  std::ranges::replace_if(
+      line, [](unsigned char byte) { return byte < 0x20; }, ' ');
+  return line;
+}
+
+std::string ToUtf8(const std::u16string& inText) {
+  std::string text(ZORFoundation::Utf8Length(inText), '\0');
+  ZORFoundation::EncodeUtf8(inText, text.data());
+  return OneLine(text.c_str());
+}
 
 void MeshParts(const std::vector<TDF_Label>& inLabels, double inDeflection,
                const Message_ProgressRange& inProgress, ModelData& ioModel) {
   Message_ProgressScope scope(inProgress, nullptr, static_cast<double>(inLabels.size()));
-  for (std::size_t i = 0; i < inLabels.size(); ++i, scope.Next())
-    if (!ioModel.parts[i].isAssembly) MeshPart(inLabels[i], inDeflection, ioModel.parts[i]);
+  for (std::size_t i = 0; i < inLabels.size(); ++i, scope.Next()) {
+    ModelPart& part = ioModel.parts[i];
+    if (part.isAssembly) continue;
+    TellStatus("tessellating its part \"" + ToUtf8(part.name) + '"');
+    if (!MeshPart(inLabels[i], inDeflection, part)) ioModel.hadFailure = true;
+  }
 }
 
 std::string Counted(std::size_t inCount, const char* inOne, const char* inSeveral) {
@@ -60,34 +95,25 @@ void WarnOfMissingTriangles(ModelData& ioModel) {
     ioModel.warnings.push_back(Counted(faces, "face has", "faces have") + " no triangles");
 }
 
-void WarnOfScaledNodes(const ModelRequest& inRequest, ModelData& ioModel) {
+void WarnOfScaledNodes(const ModelRequest& inRequest, std::string_view inBytes,
+                       ModelData& ioModel) {
   if (inRequest.format != ModelFormat::kGltf && inRequest.format != ModelFormat::kGlb) return;
-  const std::size_t nodes = CountScaledNodes(inRequest.path);
+  const std::size_t nodes = CountScaledNodes(inBytes);
   if (nodes > 0)
     ioModel.warnings.push_back(Counted(nodes, "scaled node is", "scaled nodes are") +
                                " shown without scale");
 }
 
-/// Messages of the kernel may have several lines.
-std::string OneLine(const char* inMessage) {
-  std::string line = inMessage ? inMessage : "";
-  std::ranges::replace_if(
-      line, [](unsigned char byte) { return byte < 0x20; }, ' ');
-  return line;
-}
-
-/// "" when all are there.
-std::string DescribeMissingFiles(const ModelRequest& inRequest, const ModelData& inModel) {
-  const auto folder = std::filesystem::path(inRequest.path).parent_path();
-  std::vector<std::string> missing = inModel.referencedFiles;
-  std::erase_if(missing, [&](const std::string& file) {
-    std::error_code error;
-    return std::filesystem::exists(folder / file, error);
-  });
-  if (missing.empty()) return "";
-  if (missing.size() == 1) return "its file " + missing[0] + " is missing";
-  return "its file " + missing[0] + " and " + std::to_string(missing.size() - 1) +
-         " more are missing";
+/// "its file a.stp IS", or "its file a.stp and 2 more ARE"; "" for no file in this state.
+std::string DescribeFiles(const ModelData& inModel, ReferencedFile::State inState,
+                          const char* inPredicate) {
+  std::vector<std::string> names;
+  for (const ReferencedFile& file : inModel.referencedFiles)
+    if (file.state == inState) names.push_back(file.name);
+  if (names.empty()) return "";
+  std::string text = "its file " + names[0];
+  if (names.size() > 1) text += " and " + std::to_string(names.size() - 1) + " more";
+  return OneLine((text + (names.size() == 1 ? " is " : " are ") + inPredicate).c_str());
 }
 
 /// Readers of meshes call a root without name as the file, but the file may be renamed.
@@ -103,43 +129,77 @@ bool HasGeometry(const ModelData& inModel) {
   });
 }
 
-bool Read(const ModelRequest& inRequest, ModelData& outModel, std::string& outReason) {
-  if (const std::string file = FindNonRegularFile(inRequest); !file.empty()) {
-    outReason = OneLine(("names " + file + ", which is no file").c_str());
-    return false;
-  }
+ModelData Read(const ModelRequest& inRequest, std::string_view inBytes) {
+  TellStatus(std::string("reading its ") + NameOfFormat(inRequest.format) + " data");
+  if (const std::string fault = FindFault(inRequest, inBytes); !fault.empty())
+    throw Refusal{OneLine(fault.c_str())};
   PrepareReaders();
-  Handle(Progress) progress = new Progress(inRequest.progress);
+  Handle(Progress) progress = new Progress();
   Message_ProgressScope scope(progress->Start(), nullptr, kReadingShare + kMeshingShare);
-  const Handle(TDocStd_Document) document =
-      ReadDocument(inRequest, scope.Next(kReadingShare), outModel.referencedFiles, outReason);
-  if (document.IsNull()) return false;
-  const std::vector<TDF_Label> labels = WalkTree(document, outModel);
-  MeshParts(labels, inRequest.deflection, scope.Next(kMeshingShare), outModel);
-  ForgetFileName(inRequest, outModel);
-  WarnOfMissingTriangles(outModel);
-  WarnOfScaledNodes(inRequest, outModel);
-  const std::string missingFiles = OneLine(DescribeMissingFiles(inRequest, outModel).c_str());
-  if (!HasGeometry(outModel)) {
-    outReason = missingFiles.empty() ? "holds no geometry" : "holds no geometry; " + missingFiles;
-    return false;
-  }
-  if (!missingFiles.empty()) outModel.warnings.push_back(missingFiles);
-  return true;
+  const LoadedDocument loaded = ReadDocument(inRequest, scope.Next(kReadingShare),
+                                             [](const char* stage) { TellStatus(stage); });
+  if (const std::string file = FirstNonRegularFile(); !file.empty())
+    throw Refusal{OneLine(("names " + file + ", which is no file").c_str())};
+  if (loaded.document.IsNull())
+    throw Refusal{std::string("cannot be read as ") + NameOfFormat(inRequest.format)};
+  ModelData model;
+  const std::vector<TDF_Label> labels = WalkTree(loaded.document, model);
+  MeshParts(labels, inRequest.deflection, scope.Next(kMeshingShare), model);
+  std::set<std::string> names(loaded.referencedFiles.begin(), loaded.referencedFiles.end());
+  for (const std::string& name : RefusedFiles()) names.insert(name);
+  for (const std::string& name : names) model.referencedFiles.push_back(ReferencedFileAt(name));
+  ForgetFileName(inRequest, model);
+  model.damages = loaded.damages;
+  WarnOfMissingTriangles(model);
+  WarnOfScaledNodes(inRequest, inBytes, model);
+  const std::string missing = DescribeFiles(model, ReferencedFile::State::kMissing, "missing");
+  if (!HasGeometry(model))
+    throw Refusal{missing.empty() ? "holds no geometry" : "holds no geometry; " + missing};
+  for (const std::string& warning :
+       {missing, DescribeFiles(model, ReferencedFile::State::kRefused, "outside its folder")})
+    if (!warning.empty()) model.warnings.push_back(warning);
+  model.hadFailure = model.hadFailure || HasChangedFile();
+  return model;
+}
+
+int Answer(int inExitCode, std::string_view inBytes) {
+  std::size_t written = 0;
+  const int error = ZORFoundation::WriteAll(ModelReaderProtocol::kResult, inBytes, written);
+  return error == 0 ? inExitCode : ModelReaderProtocol::kExitOutOfMemory;
+}
+
+int Refuse(const std::string& inReason) {
+  return Answer(ModelReaderProtocol::kExitRefused, inReason);
+}
+
+int Run(char** inArguments) try {
+  ModelRequest request;
+  request.format = static_cast<ModelFormat>(std::atoi(inArguments[1]));
+  request.deflection = std::atof(inArguments[2]);
+  SetProcessLimits({std::atof(inArguments[4]), std::strtoull(inArguments[3], nullptr, 10)});
+  request.path = inArguments[5];
+  lseek(ModelReaderProtocol::kModel, 0, SEEK_SET);
+  const std::string bytes = ZORFoundation::ReadToEnd(ModelReaderProtocol::kModel, request.path);
+  CloseDoorBehind(request.path, ModelReaderProtocol::kModel);
+  return Answer(ModelReaderProtocol::kExitRead, EncodeModel(Read(request, bytes)));
+} catch (const Refusal& refusal) {
+  return Refuse(refusal.reason);
+} catch (const Standard_OutOfMemory&) {
+  return ModelReaderProtocol::kExitOutOfMemory;
+} catch (const std::bad_alloc&) {
+  return ModelReaderProtocol::kExitOutOfMemory;
+} catch (const Standard_Failure& failure) {
+  return Refuse("cannot be read: " + OneLine(failure.GetMessageString()));
+} catch (const std::exception& error) {
+  return Refuse("cannot be read: " + OneLine(error.what()));
 }
 
 }  // namespace
 }  // namespace ZORDefault
 
-extern "C" __attribute__((visibility("default"))) bool ZORReadModel(
-    const ZORDefault::ModelRequest& inRequest, ZORDefault::ModelData& outModel,
-    std::string& outReason) {
-  try {
-    return ZORDefault::Read(inRequest, outModel, outReason);
-  } catch (const Standard_Failure& failure) {
-    outReason = "cannot be read: " + ZORDefault::OneLine(failure.GetMessageString());
-  } catch (const std::exception& error) {
-    outReason = "cannot be read: " + ZORDefault::OneLine(error.what());
-  }
-  return false;
+int main(int inCount, char** inArguments) {
+  constexpr int kArguments = 6;
+  if (inCount != kArguments) return ZORDefault::ModelReaderProtocol::kExitOutOfMemory + 1;
+  // Without destructors: what the kernel built need not be taken apart.
+  _exit(ZORDefault::Run(inArguments));
 }

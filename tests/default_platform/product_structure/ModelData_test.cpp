@@ -1,7 +1,7 @@
+#include "default_platform/product_structure/ModelData.h"
+
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-
-#include "default_platform/product_structure/ModelData.h"
 
 using testing::ElementsAre;
 using ZORDefault::DecodeModel;
@@ -37,7 +37,8 @@ ModelData TwoInstances() {
   model.products[1].colour = PartColour{1, 2, 3, 4};
   model.products[2].name = u"second";
   model.products[2].parentFromProduct.SetVector({5, 6, 7});
-  model.referencedFiles = {"other.bin"};
+  model.referencedFiles.push_back({"other.bin", ZORDefault::ReferencedFile::State::kRead, 42});
+  model.damages = {"1 entity of the file could not be read"};
   model.warnings = {"a warning"};
   return model;
 }
@@ -49,7 +50,7 @@ ModelData Decoded(const std::string& inBytes) {
 }
 }  // namespace
 
-TEST(ModelCodec, DecodeGivesAllThatWasEncoded) {
+TEST(ModelData, DecodeGivesAllThatWasEncoded) {
   const ModelData model = Decoded(EncodeModel(TwoInstances()));
   ASSERT_EQ(model.parts.size(), 2u);
   EXPECT_TRUE(model.parts[0].isAssembly);
@@ -63,11 +64,16 @@ TEST(ModelCodec, DecodeGivesAllThatWasEncoded) {
   EXPECT_FALSE(model.products[2].colour.has_value());
   EXPECT_EQ(model.products[2].name, u"second");
   EXPECT_EQ(model.products[2].parentFromProduct.GetVector().y, 6);
-  EXPECT_THAT(model.referencedFiles, ElementsAre("other.bin"));
+  ASSERT_EQ(model.referencedFiles.size(), 1u);
+  EXPECT_EQ(model.referencedFiles[0].name, "other.bin");
+  EXPECT_EQ(model.referencedFiles[0].state, ZORDefault::ReferencedFile::State::kRead);
+  EXPECT_EQ(model.referencedFiles[0].hash, 42u);
+  EXPECT_THAT(model.damages, ElementsAre("1 entity of the file could not be read"));
+  EXPECT_FALSE(model.hadFailure);
   EXPECT_THAT(model.warnings, ElementsAre("a warning"));
 }
 
-TEST(ModelCodec, DecodeGivesTheWholeMesh) {
+TEST(ModelData, DecodeGivesTheWholeMesh) {
   const ModelData model = Decoded(EncodeModel(TwoInstances()));
   ASSERT_NE(model.parts[1].mesh, nullptr);
   const PartMesh& mesh = *model.parts[1].mesh;
@@ -82,19 +88,34 @@ TEST(ModelCodec, DecodeGivesTheWholeMesh) {
   EXPECT_EQ(mesh.sphere.radius, 4);
 }
 
-TEST(ModelCodec, DecodeRefusesEveryShorterText) {
+TEST(ModelData, DecodeRefusesEveryShorterText) {
   const std::string bytes = EncodeModel(TwoInstances());
   ModelData model;
   for (std::size_t length = 0; length < bytes.size(); ++length)
     EXPECT_FALSE(DecodeModel(std::string_view(bytes).substr(0, length), model)) << length;
 }
 
-TEST(ModelCodec, DecodeRefusesALongerText) {
+/// A count that is read from a damaged byte may be anything.
+TEST(ModelData, DecodeSurvivesEveryDamagedByte) {
+  const std::string bytes = EncodeModel(TwoInstances());
+  ModelData model;
+  std::size_t refused = 0;
+  for (std::size_t i = 0; i < bytes.size(); ++i) {
+    for (const char damage : {'\x01', '\x80', '\xFF'}) {
+      std::string damaged = bytes;
+      damaged[i] = static_cast<char>(damaged[i] ^ damage);
+      if (!DecodeModel(damaged, model)) ++refused;
+    }
+  }
+  EXPECT_GT(refused, bytes.size() / 2);
+}
+
+TEST(ModelData, DecodeRefusesALongerText) {
   ModelData model;
   EXPECT_FALSE(DecodeModel(EncodeModel(TwoInstances()) + '\0', model));
 }
 
-TEST(ModelCodec, DecodeRefusesATriangleWithoutPoints) {
+TEST(ModelData, DecodeRefusesATriangleWithoutPoints) {
   ModelData damaged = TwoInstances();
   auto mesh = std::make_shared<PartMesh>(*damaged.parts[1].mesh);
   mesh->triangles[0][1] = 3;
@@ -103,21 +124,21 @@ TEST(ModelCodec, DecodeRefusesATriangleWithoutPoints) {
   EXPECT_FALSE(DecodeModel(EncodeModel(damaged), model));
 }
 
-TEST(ModelCodec, DecodeRefusesAFatherThatComesLater) {
+TEST(ModelData, DecodeRefusesAParentThatComesLater) {
   ModelData damaged = TwoInstances();
   damaged.products[1].parent = 2;
   ModelData model;
   EXPECT_FALSE(DecodeModel(EncodeModel(damaged), model));
 }
 
-TEST(ModelCodec, DecodeRefusesAnUnknownPart) {
+TEST(ModelData, DecodeRefusesAnUnknownPart) {
   ModelData damaged = TwoInstances();
   damaged.products[2].part = 2;
   ModelData model;
   EXPECT_FALSE(DecodeModel(EncodeModel(damaged), model));
 }
 
-TEST(ModelCodec, DecodeLeavesTheModelOnFailure) {
+TEST(ModelData, DecodeLeavesTheModelOnFailure) {
   ModelData model = TwoInstances();
   EXPECT_FALSE(DecodeModel("damaged", model));
   EXPECT_EQ(model.products.size(), 3u);
