@@ -9,8 +9,8 @@
 #include <stdexcept>
 #include <utility>
 
-#include "foundation/Utf8.h"
 #include "default_platform/xml/DOM_HandleAccess.h"
+#include "foundation/Utf8.h"
 
 namespace {
 

@@ -2,8 +2,8 @@
 
 #include <utility>
 
-#include "foundation/Utf8.h"
 #include "default_platform/xml/DOM_HandleAccess.h"
+#include "foundation/Utf8.h"
 #include "platform/xml/DOM_DOMException.h"
 #include "platform/xml/DOM_NamedNodeMap.h"
 #include "platform/xml/DOM_NodeList.h"

@@ -17,57 +17,8 @@ constexpr std::ptrdiff_t kMaxLookahead = 16;
 constexpr std::size_t kFirstSlots = 256;
 constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
 
-bool IsBlank(char inByte) {
-  return inByte == ' ' || inByte == '\n' || inByte == '\t' || inByte == '\r';
-}
-
-const char* AfterBlanks(const char* inPlace) {
-  while (IsBlank(*inPlace)) ++inPlace;
-  return inPlace;
-}
-
 bool StartsWith(const char* inPlace, std::string_view inText) {
   return std::memcmp(inPlace, inText.data(), inText.size()) == 0;
-}
-
-bool IsContinuation(char inByte) { return (inByte & 0xC0) == 0x80; }
-
-/// The character that begins at a byte beyond ASCII (Unicode Standard, table 3-7).
-/// @return its bytes; 0 when they are ill-formed.
-int DecodeCharacter(const char* inPlace, char32_t& outCharacter) {
-  const auto byte = [inPlace](int inAt) { return static_cast<unsigned char>(inPlace[inAt]); };
-  const unsigned char lead = byte(0);
-  if (lead < 0xC2 || lead > 0xF4 || !IsContinuation(inPlace[1])) return 0;
-  if (lead < 0xE0) {
-    outCharacter = static_cast<char32_t>((lead & 0x1F) << 6 | (byte(1) & 0x3F));
-    return 2;
-  }
-  if (!IsContinuation(inPlace[2])) return 0;
-  if (lead < 0xF0) {
-    outCharacter =
-        static_cast<char32_t>((lead & 0x0F) << 12 | (byte(1) & 0x3F) << 6 | (byte(2) & 0x3F));
-    return outCharacter < 0x800 || (outCharacter >= 0xD800 && outCharacter < 0xE000) ? 0 : 3;
-  }
-  if (!IsContinuation(inPlace[3])) return 0;
-  outCharacter = static_cast<char32_t>((lead & 0x07) << 18 | (byte(1) & 0x3F) << 12 |
-                                       (byte(2) & 0x3F) << 6 | (byte(3) & 0x3F));
-  return outCharacter < 0x10000 || outCharacter > 0x10FFFF ? 0 : 4;
-}
-
-void Append(char32_t inCharacter, std::u16string& ioText) {
-  if (inCharacter < 0x10000) {
-    ioText += static_cast<char16_t>(inCharacter);
-  } else {
-    ioText += static_cast<char16_t>(0xD7C0 + (inCharacter >> 10));
-    ioText += static_cast<char16_t>(0xDC00 + (inCharacter & 0x3FF));
-  }
-}
-
-int DigitOf(char inByte, int inBase) {
-  if (inByte >= '0' && inByte <= '9') return inByte - '0';
-  if (inBase == 10) return -1;
-  const char small = static_cast<char>(inByte | 0x20);
-  return small >= 'a' && small <= 'f' ? small - 'a' + 10 : -1;
 }
 
 /// Takes one pseudo-attribute of an XML declaration, with the blanks before it.
@@ -308,7 +259,7 @@ const char* Utf8FastPath::NameEnd(const char* inPlace) const {
   const char* at = search_.EndOfName(inPlace);
   while (static_cast<signed char>(*at) < 0) {
     char32_t character = 0;
-    const int bytes = DecodeCharacter(at, character);
+    const int bytes = DecodeUtf8Character(at, character);
     if (bytes == 0 || character > 0xFFFF) Stop(at);
     if (at == inPlace ? !IsNameStart(character) : !IsNameCharacter(character)) Stop(at);
     at = search_.EndOfName(at + bytes);
@@ -392,9 +343,9 @@ const char* Utf8FastPath::AppendCharacter(const char* inPlace) {
     return inPlace + 1;
   }
   char32_t character = 0;
-  const int bytes = DecodeCharacter(inPlace, character);
+  const int bytes = DecodeUtf8Character(inPlace, character);
   if (bytes == 0 || !IsXMLCharacter(character)) Stop(inPlace);
-  Append(character, text_);
+  AppendUtf16(character, text_);
   return inPlace + bytes;
 }
 
@@ -421,7 +372,7 @@ const char* Utf8FastPath::AppendReference(const char* inPlace) {
   }
   if (*at != ';') Stop(at);
   if (!IsXMLCharacter(character)) throw NeedsFullScanner();
-  Append(character, text_);
+  AppendUtf16(character, text_);
   return at + 1;
 }
 

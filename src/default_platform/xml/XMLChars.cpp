@@ -25,6 +25,8 @@ bool IsIn(const Range (&inRanges)[kCount], char32_t inCharacter) {
   });
 }
 
+bool IsContinuation(char inByte) { return (inByte & 0xC0) == 0x80; }
+
 }  // namespace
 
 bool IsNameStart(char32_t inCharacter) { return IsIn(kNameStart, inCharacter); }
@@ -41,4 +43,41 @@ bool IsXMLName(std::u16string_view inName) {
 bool IsReservedTarget(std::u16string_view inTarget) {
   return inTarget.size() == 3 && (inTarget[0] | 0x20) == u'x' && (inTarget[1] | 0x20) == u'm' &&
          (inTarget[2] | 0x20) == u'l';
+}
+
+int DigitOf(char inByte, int inBase) {
+  if (inByte >= '0' && inByte <= '9') return inByte - '0';
+  if (inBase == 10) return -1;
+  const char small = static_cast<char>(inByte | 0x20);
+  return small >= 'a' && small <= 'f' ? small - 'a' + 10 : -1;
+}
+
+// Unicode Standard, table 3-7.
+int DecodeUtf8Character(const char* inPlace, char32_t& outCharacter) {
+  const auto byte = [inPlace](int inAt) { return static_cast<unsigned char>(inPlace[inAt]); };
+  const unsigned char lead = byte(0);
+  if (lead < 0xC2 || lead > 0xF4 || !IsContinuation(inPlace[1])) return 0;
+  if (lead < 0xE0) {
+    outCharacter = static_cast<char32_t>((lead & 0x1F) << 6 | (byte(1) & 0x3F));
+    return 2;
+  }
+  if (!IsContinuation(inPlace[2])) return 0;
+  if (lead < 0xF0) {
+    outCharacter =
+        static_cast<char32_t>((lead & 0x0F) << 12 | (byte(1) & 0x3F) << 6 | (byte(2) & 0x3F));
+    return outCharacter < 0x800 || (outCharacter >= 0xD800 && outCharacter < 0xE000) ? 0 : 3;
+  }
+  if (!IsContinuation(inPlace[3])) return 0;
+  outCharacter = static_cast<char32_t>((lead & 0x07) << 18 | (byte(1) & 0x3F) << 12 |
+                                       (byte(2) & 0x3F) << 6 | (byte(3) & 0x3F));
+  return outCharacter < 0x10000 || outCharacter > 0x10FFFF ? 0 : 4;
+}
+
+void AppendUtf16(char32_t inCharacter, std::u16string& ioText) {
+  if (inCharacter < 0x10000) {
+    ioText += static_cast<char16_t>(inCharacter);
+  } else {
+    ioText += static_cast<char16_t>(0xD7C0 + (inCharacter >> 10));
+    ioText += static_cast<char16_t>(0xDC00 + (inCharacter & 0x3FF));
+  }
 }

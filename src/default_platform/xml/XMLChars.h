@@ -1,7 +1,8 @@
-// The character classes of XML 1.0, fifth edition.
+// The characters of XML 1.0, fifth edition, and how they are encoded.
 #ifndef ZOR_DEFAULT_PLATFORM_XML_XMLCHARS_H
 #define ZOR_DEFAULT_PLATFORM_XML_XMLCHARS_H
 
+#include <string>
 #include <string_view>
 
 bool IsNameStart(char32_t inCharacter);
@@ -17,5 +18,21 @@ inline bool IsXMLCharacter(char32_t inCharacter) {
 bool IsXMLName(std::u16string_view inName);
 /// Whether a processing instruction's target is "xml" in any case, which is not free for use.
 bool IsReservedTarget(std::u16string_view inTarget);
+
+inline bool IsBlank(char inByte) {
+  return inByte == ' ' || inByte == '\n' || inByte == '\t' || inByte == '\r';
+}
+inline const char* AfterBlanks(const char* inPlace) {
+  while (IsBlank(*inPlace)) ++inPlace;
+  return inPlace;
+}
+/// @return the value of a digit of base 10 or 16; -1 for another byte.
+int DigitOf(char inByte, int inBase);
+
+/// Decodes the character that begins at a byte beyond ASCII. No byte is looked at that follows one
+/// that is wrong.
+/// @return its number of bytes; 0 when they are ill-formed.
+int DecodeUtf8Character(const char* inPlace, char32_t& outCharacter);
+void AppendUtf16(char32_t inCharacter, std::u16string& ioText);
 
 #endif

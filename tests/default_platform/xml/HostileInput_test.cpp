@@ -127,6 +127,58 @@ TEST(HostileInput, ModestEntitiesAreNoFlood) {
   EXPECT_EQ(ParseErrorOf(text), "");
 }
 
+TEST(HostileInput, ParameterEntitiesThatMultiplyAreRefusedQuickly) {
+  std::string text = "<!DOCTYPE r [<!ENTITY % p0 ''>";
+  for (int i = 1; i <= 10; ++i)
+    text += "<!ENTITY % p" + std::to_string(i) + " \"" +
+            Repeated("&#37;p" + std::to_string(i - 1) + ";", 10) + "\">";
+  text += " %p10; ]><r/>";
+  EXPECT_EQ(
+      RunLimited(
+          10, 200,
+          [&] { return ParseErrorOf(text).find("more than 60,000 times") != std::string::npos; }),
+      0);
+}
+
+TEST(HostileInput, ParameterEntitiesThatMultiplyDeclarationsAreRefusedInBoundedMemory) {
+  std::string text = "<!DOCTYPE r [<!ENTITY % p0 '<!--" + std::string(2000, 'x') + "-->'>";
+  for (int i = 1; i <= 4; ++i)
+    text += "<!ENTITY % p" + std::to_string(i) + " \"" +
+            Repeated("&#37;p" + std::to_string(i - 1) + ";", 10) + "\">";
+  text += " %p4; ]><r/>";
+  EXPECT_EQ(
+      RunLimited(10, 200,
+                 [&] { return ParseErrorOf(text).find("too much text") != std::string::npos; }),
+      0);
+}
+
+TEST(HostileInput, ParameterEntitiesInModestNumbersAreNoFlood) {
+  EXPECT_EQ(
+      ParseErrorOf("<!DOCTYPE r [<!ENTITY % p '<!--c-->'>" + Repeated("%p;", 5000) + "]><r/>"), "");
+}
+
+TEST(HostileInput, ManyAttributesAreReadInLinearTime) {
+  std::string attributes;
+  for (int i = 0; i < 100'000; ++i) attributes += " n" + std::to_string(i) + "='v'";
+  for (const char* const before : {"<a", "<!DOCTYPE a><a"}) {
+    const std::string text = before + attributes;
+    EXPECT_EQ(RunLimited(10, 300, [&] { return ParseErrorOf(text + "/>").empty(); }), 0);
+    EXPECT_EQ(RunLimited(10, 300, [&] { return !ParseErrorOf(text + " n7='w'/>").empty(); }), 0);
+  }
+}
+
+TEST(HostileInput, BytesBeyondUnicodeAreRefused) {
+  for (const std::string& bytes :
+       {std::string("\xF5\x80\x80\x80"), std::string("\xF6\xBF\xBF\xBF"),
+        std::string("\xF7\x80\x80\x80"), std::string("\xF4\x90\x80\x80")})
+    for (const char* const before : {"", "\xEF\xBB\xBF", "<?xml version='1.0' encoding='UTF-8'?>",
+                                     "<?xml version='1.0' encoding='utf8'?>", "<!DOCTYPE a>"}) {
+      const std::string error = ParseErrorOf(before + std::string("<a b='") + bytes + "B'/>");
+      EXPECT_EQ(error.find("LIDPipodIBM:1:"), 0u) << before << error;
+    }
+  EXPECT_EQ(ParseErrorOf("<?xml version='1.0' encoding='ISO-8859-1'?><a b='\xF5\xF6\xF7'/>"), "");
+}
+
 TEST(HostileInput, AttributeOfOneGigabyteIsRefusedInBoundedMemory) {
   const TemporaryFolder folder;
   const std::string path = folder.FilePath("huge.xml");

@@ -7,6 +7,7 @@
 #include <cstdlib>
 #include <new>
 #include <xercesc/framework/MemoryManager.hpp>
+#include <xercesc/internal/XMLReader.hpp>
 #include <xercesc/sax/Locator.hpp>
 #include <xercesc/util/PlatformUtils.hpp>
 
@@ -14,6 +15,7 @@
 struct ScannerMemoryExhausted {
   std::uint64_t line;
   std::uint64_t column;
+  const char* reason;
 };
 
 /// Gives a scanner memory up to a limit. A scanner keeps little between two events: only a huge name,
@@ -29,12 +31,18 @@ class ScannerMemory : public xercesc::MemoryManager {
   ScannerMemory& operator=(const ScannerMemory&) = delete;
 
   static constexpr std::size_t kMaxBytes = std::size_t{400} * 1024 * 1024;
+  /// Each entity that is expanded makes a reader, those of document types too, which the library's
+  /// own limit does not count.
+  static constexpr std::size_t kMaxReaders = 60'000;
 
   /// @param inPlace where the scanner is, for errors; null for nowhere. Lives as long as the scanner.
   void SetPlace(const xercesc::Locator* inPlace) { place_ = inPlace; }
 
   void* allocate(XMLSize_t inBytes) override {
-    if (inBytes > kMaxBytes - used_) Fail();
+    if (inBytes > kMaxBytes - used_)
+      Fail("a name, value or text is too large, or there are too many names");
+    if (IsReader(inBytes) && ++readers_ > kMaxReaders)
+      Fail("entities are expanded more than 60,000 times");
     void* const block = std::malloc(sizeof(Head) + inBytes);
     if (block == nullptr) throw std::bad_alloc();
     used_ += inBytes;
@@ -62,12 +70,17 @@ class ScannerMemory : public xercesc::MemoryManager {
     inHead->next->previous = inHead->previous;
     std::free(inHead);
   }
-  [[noreturn]] void Fail() const {
-    if (place_ == nullptr) throw ScannerMemoryExhausted{0, 0};
-    throw ScannerMemoryExhausted{place_->getLineNumber(), place_->getColumnNumber()};
+  // The library puts a pointer before its objects.
+  static bool IsReader(std::size_t inBytes) {
+    return inBytes >= sizeof(xercesc::XMLReader) && inBytes <= sizeof(xercesc::XMLReader) + 64;
+  }
+  [[noreturn]] void Fail(const char* inReason) const {
+    if (place_ == nullptr) throw ScannerMemoryExhausted{0, 0, inReason};
+    throw ScannerMemoryExhausted{place_->getLineNumber(), place_->getColumnNumber(), inReason};
   }
 
   std::size_t used_ = 0;
+  std::size_t readers_ = 0;
   Head blocks_{0, &blocks_, &blocks_};  // a ring
   const xercesc::Locator* place_ = nullptr;
 };

@@ -1,5 +1,6 @@
 #include "default_platform/xml/full_scanner/XercesScanner.h"
 
+#include <algorithm>
 #include <new>
 #include <string_view>
 #include <xercesc/framework/XMLErrorCodes.hpp>
@@ -34,17 +35,51 @@ std::u16string_view View(const char16_t* inText) {
   return inText == nullptr ? std::u16string_view() : std::u16string_view(inText);
 }
 
+bool IsSameIgnoringCase(std::string_view inA, std::string_view inLower) {
+  return std::equal(
+      inA.begin(), inA.end(), inLower.begin(), inLower.end(),
+      [](char inUnit, char inSmall) { return inUnit == inSmall || (inUnit | 0x20) == inSmall; });
+}
+
+/// Whether a document that begins so is in UTF-8.
+bool IsUtf8(std::string_view inBegin) {
+  constexpr std::string_view kMark = "\xEF\xBB\xBF";
+  if (inBegin.starts_with(kMark)) inBegin.remove_prefix(kMark.size());
+  if (inBegin.empty() || std::string_view("< \t\r\n").find(inBegin[0]) == std::string_view::npos ||
+      (inBegin.size() > 1 && inBegin[1] == '\0'))
+    return false;
+  if (!inBegin.starts_with("<?xml")) return true;
+  const std::string_view declaration = inBegin.substr(0, inBegin.find("?>"));
+  const std::size_t encoding = declaration.find("encoding");
+  if (encoding == std::string_view::npos) return true;
+  const std::size_t quote = declaration.find_first_of("'\"", encoding);
+  if (quote == std::string_view::npos) return true;
+  const std::size_t end = declaration.find(declaration[quote], quote + 1);
+  const std::string_view name = declaration.substr(quote + 1, end - quote - 1);
+  return IsSameIgnoringCase(name, "utf-8") || IsSameIgnoringCase(name, "utf8");
+}
+
+/// Hands bytes to the library. In UTF-8 it drops sequences that begin with F5 to F7, which are beyond
+/// Unicode: it gets a byte instead that it refuses.
 class ReaderStream : public xercesc::BinInputStream {
  public:
   explicit ReaderStream(ByteReader& ioReader) : reader_(ioReader) {}
   XMLFilePos curPos() const override { return reader_.BytesRead(); }
   XMLSize_t readBytes(XMLByte* const outBytes, const XMLSize_t inMax) override {
-    return reader_.Read(outBytes, inMax);
+    const bool isFirst = reader_.BytesRead() == 0;
+    const std::size_t count = reader_.Read(outBytes, inMax);
+    if (isFirst) isUtf8_ = IsUtf8({reinterpret_cast<const char*>(outBytes), count});
+    if (isUtf8_)
+      std::replace_if(
+          outBytes, outBytes + count,
+          [](XMLByte inByte) { return inByte >= 0xF5 && inByte <= 0xF7; }, XMLByte{0xFF});
+    return count;
   }
   const XMLCh* getContentType() const override { return nullptr; }
 
  private:
   ByteReader& reader_;
+  bool isUtf8_ = false;
 };
 
 /// Gives a reader to the library as its one and only entity.
@@ -81,7 +116,7 @@ std::string OneLineReason(const char16_t* inText) {
 }  // namespace
 
 XercesScanner::XercesScanner(ScannerMemory& ioMemory, ByteReader& ioReader, ScanSink& ioSink)
-    : xercesc::SAXParser(nullptr, &ioMemory), reader_(ioReader), sink_(ioSink), memory_(ioMemory) {
+    : xercesc::SAXParser(nullptr, &ioMemory), reader_(ioReader), sink_(ioSink) {
   setValidationScheme(Val_Never);
   setDoNamespaces(false);
   setDoSchema(false);
@@ -113,8 +148,7 @@ void XercesScanner::RunScanner(const std::string& inName) {
   try {
     parse(ReaderEntity(reader_, inName));
   } catch (const ScannerMemoryExhausted& failure) {
-    throw ScanFailure{failure.line, failure.column,
-                      "a name, value or text is too large, or there are too many names"};
+    throw ScanFailure{failure.line, failure.column, failure.reason};
   } catch (const xercesc::OutOfMemoryException&) {
     throw ScanFailure{0, 0, "out of memory"};
   } catch (const std::bad_alloc&) {
@@ -232,6 +266,13 @@ void XercesScanner::XMLDecl(const XMLCh* const inVersion, const XMLCh* const, co
 
 // ---- document type
 
+// Entities may multiply declarations too.
+void XercesScanner::ChargeSubset() {
+  const std::size_t units = subset_.Text().size();
+  Charge(units - chargedSubset_);
+  chargedSubset_ = units;
+}
+
 void XercesScanner::doctypeDecl(const xercesc::DTDElementDecl& inElement,
                                 const XMLCh* const inPublicId, const XMLCh* const inSystemId,
                                 const bool, const bool) {
@@ -243,18 +284,24 @@ void XercesScanner::doctypeDecl(const xercesc::DTDElementDecl& inElement,
   sink_.SetDoctype(doctype_);
 }
 
-void XercesScanner::doctypeComment(const XMLCh* const inText) { subset_.AddComment(inText); }
+void XercesScanner::doctypeComment(const XMLCh* const inText) {
+  subset_.AddComment(inText);
+  ChargeSubset();
+}
 
 void XercesScanner::doctypePI(const XMLCh* const inTarget, const XMLCh* const inData) {
   subset_.AddProcessingInstruction(inTarget, inData);
+  ChargeSubset();
 }
 
 void XercesScanner::doctypeWhitespace(const XMLCh* const inText, const XMLSize_t inCount) {
   subset_.AddWhitespace(inText, inCount);
+  ChargeSubset();
 }
 
 void XercesScanner::elementDecl(const xercesc::DTDElementDecl& inElement, const bool) {
   subset_.AddElement(inElement);
+  ChargeSubset();
 }
 
 void XercesScanner::startAttList(const xercesc::DTDElementDecl& inElement) {
@@ -264,6 +311,7 @@ void XercesScanner::startAttList(const xercesc::DTDElementDecl& inElement) {
 void XercesScanner::attDef(const xercesc::DTDElementDecl&, const xercesc::DTDAttDef& inAttribute,
                            const bool) {
   subset_.AddAttribute(inAttribute);
+  ChargeSubset();
 }
 
 void XercesScanner::endAttList(const xercesc::DTDElementDecl&) { subset_.EndAttributes(); }
@@ -271,10 +319,12 @@ void XercesScanner::endAttList(const xercesc::DTDElementDecl&) { subset_.EndAttr
 void XercesScanner::entityDecl(const xercesc::DTDEntityDecl& inEntity, const bool inIsParameter,
                                const bool) {
   subset_.AddEntity(inEntity, inIsParameter);
+  ChargeSubset();
 }
 
 void XercesScanner::notationDecl(const xercesc::XMLNotationDecl& inNotation, const bool) {
   subset_.AddNotation(inNotation);
+  ChargeSubset();
 }
 
 void XercesScanner::endIntSubset() {

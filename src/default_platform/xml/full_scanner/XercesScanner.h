@@ -93,18 +93,19 @@ class XercesScanner : private xercesc::SAXParser {
   void FlushText();
   void AddLeaf(int inKind, Name inName, std::u16string_view inText);
   void Charge(std::uint64_t inUnits);
+  void ChargeSubset();
   void RunScanner(const std::string& inName);
   [[noreturn]] void FailHere(const std::string& inReason) const;
 
   ByteReader& reader_;
   ScanSink& sink_;
-  ScannerMemory& memory_;
   xercesc::HandlerBase unused_;
   xercesc::SecurityManager limits_;
 
   std::uint32_t depth_ = 0;
   std::u16string text_;  // of the text node that is being read
   std::uint64_t charged_ = 0;
+  std::size_t chargedSubset_ = 0;  // units of subset_
   std::unordered_map<const xercesc::XMLElementDecl*, ElementShape> shapes_;
   std::array<RecentShape, 64> recent_;  // of shapes_, found without a search
 
