@@ -4,6 +4,7 @@
 #include <memory>
 #include <stdexcept>
 
+#include "FormerTree.h"
 #include "Measurement.h"
 #include "PugixmlTree.h"
 #include "SaxScan.h"
@@ -56,6 +57,16 @@ Steps LoadWithZORLyra(const Arguments& inArguments) {
   DOM_Document document;
   TimeStep("load", steps, [&] { document = LoadDocument(inArguments.at(0)); });
   steps[0].hash = HashOf(document);
+  return steps;
+}
+
+Steps LoadAsFormerly(const Arguments& inArguments) {
+  Steps steps;
+  std::unique_ptr<former::Tree> tree;
+  TimeStep("load", steps, [&] { tree = former::Load(inArguments.at(0)); });
+  TreeHash hash;
+  former::HashTree(*tree, 1, 0, hash);
+  steps[0].hash = hash.Value();
   return steps;
 }
 

@@ -44,6 +44,8 @@ void TimeStep(const std::string& inName, Steps& ioSteps, const Work& inWork) {
 
 // The measurements by subject. Arguments are paths of documents, outputs last.
 Steps LoadWithZORLyra(const Arguments& inArguments);
+/// The loader of before: Xerces-C's scanner fills a tree in UTF-16.
+Steps LoadAsFormerly(const Arguments& inArguments);
 Steps LoadWithXerces(const Arguments& inArguments);
 /// No tree: what it costs Xerces-C to read the text.
 Steps ScanWithXerces(const Arguments& inArguments);

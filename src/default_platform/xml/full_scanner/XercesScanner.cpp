@@ -59,6 +59,13 @@ bool IsUtf8(std::string_view inBegin) {
   return IsSameIgnoringCase(name, "utf-8") || IsSameIgnoringCase(name, "utf8");
 }
 
+/// Whether a byte begins a sequence of UTF-8 beyond Unicode, as far as its bytes are there.
+bool IsBeyondUnicode(const XMLByte* inPlace, const XMLByte* inEnd) {
+  if (*inPlace < 0xF5 || *inPlace > 0xF7) return false;
+  const XMLByte* const end = std::min(inPlace + 4, inEnd);
+  return std::all_of(inPlace + 1, end, [](XMLByte inByte) { return (inByte & 0xC0) == 0x80; });
+}
+
 /// Hands bytes to the library. In UTF-8 it drops sequences that begin with F5 to F7, which are beyond
 /// Unicode: it gets a byte instead that it refuses.
 class ReaderStream : public xercesc::BinInputStream {
@@ -67,19 +74,29 @@ class ReaderStream : public xercesc::BinInputStream {
   XMLFilePos curPos() const override { return reader_.BytesRead(); }
   XMLSize_t readBytes(XMLByte* const outBytes, const XMLSize_t inMax) override {
     const bool isFirst = reader_.BytesRead() == 0;
-    const std::size_t count = reader_.Read(outBytes, inMax);
-    if (isFirst) isUtf8_ = IsUtf8({reinterpret_cast<const char*>(outBytes), count});
-    if (isUtf8_)
-      std::replace_if(
-          outBytes, outBytes + count,
-          [](XMLByte inByte) { return inByte >= 0xF5 && inByte <= 0xF7; }, XMLByte{0xFF});
-    return count;
+    const std::size_t kept = held_.size();
+    std::copy(held_.begin(), held_.end(), outBytes);
+    held_.clear();
+    const std::size_t added = reader_.Read(outBytes + kept, inMax - kept);
+    XMLByte* const end = outBytes + kept + added;
+    if (isFirst) isUtf8_ = IsUtf8({reinterpret_cast<const char*>(outBytes), added});
+    if (!isUtf8_) return kept + added;
+    for (XMLByte* at = outBytes; at != end; ++at) {
+      if (!IsBeyondUnicode(at, end)) continue;
+      if (end - at < 4 && added != 0 && at != outBytes) {  // the rest of it comes next
+        held_.assign(at, end);
+        return static_cast<XMLSize_t>(at - outBytes);
+      }
+      if (end - at >= 4) *at = 0xFF;
+    }
+    return kept + added;
   }
   const XMLCh* getContentType() const override { return nullptr; }
 
  private:
   ByteReader& reader_;
   bool isUtf8_ = false;
+  std::vector<XMLByte> held_;
 };
 
 /// Gives a reader to the library as its one and only entity.
