@@ -26,7 +26,9 @@ endif()
 
 install(DIRECTORY include/ DESTINATION ${headerDir} FILES_MATCHING PATTERN "*.h")
 install(DIRECTORY src/platform/ DESTINATION ${headerDir}/platform FILES_MATCHING PATTERN "*.h")
-install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit FILES_MATCHING PATTERN "*.h" PATTERN "ElementWalk.h" EXCLUDE)
+# Not those of the CAD kernel's part, which is loaded by name.
+install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit
+  FILES_MATCHING PATTERN "*.h" PATTERN "ElementWalk.h" EXCLUDE PATTERN "detection" EXCLUDE)
 install(FILES ${PROJECT_BINARY_DIR}/generated/ZORLyraExport.h ${PROJECT_BINARY_DIR}/generated/ZORPlatformExport.h
   ${PROJECT_BINARY_DIR}/generated/ZORToolkitExport.h
   DESTINATION ${headerDir})
