@@ -8,8 +8,6 @@
 #include <algorithm>
 #include <cerrno>
 
-#include "foundation/Descriptor.h"
-
 namespace ZORFoundation {
 namespace {
 
@@ -28,10 +26,9 @@ struct stat StatusOf(int inDescriptor, const std::string& inPath) {
   return status;
 }
 
-void CheckKind(mode_t inMode, const ReadOptions& inOptions, const std::string& inPath) {
-  if (S_ISDIR(inMode)) throw FileError(inPath, EISDIR);
-  if (!S_ISREG(inMode) && !inOptions.mayBeStream)
-    throw FileError(inPath, ESPIPE, "is a device, a pipe or a socket");
+void CheckKind(mode_t inMode, bool inMayBeStream, const std::string& inPath) {
+  if (S_ISDIR(inMode)) throw FileError(inPath, EISDIR, "is a directory");
+  if (!S_ISREG(inMode) && !inMayBeStream) throw FileError(inPath, ESPIPE, "is not a regular file");
 }
 
 void CheckSize(std::uint64_t inSize, std::uint64_t inMaxSize, const std::string& inPath) {
@@ -52,6 +49,30 @@ std::int64_t FileClockNow() {
   return Nanoseconds(now);
 }
 
+Descriptor OpenForReading(const std::string& inPath, bool inMayBeStream) {
+  // Without waiting, so that a pipe in a file's place cannot stop the caller.
+  const int noWait = inMayBeStream ? 0 : O_NONBLOCK;
+  Descriptor file(open(inPath.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY | noWait));
+  // A socket cannot be opened by its path.
+  if (!file.IsOpen() && errno == ENXIO) CheckKind(S_IFSOCK, inMayBeStream, inPath);
+  if (!file.IsOpen()) throw FileError(inPath, errno);
+  CheckKind(StatusOf(file.Get(), inPath).st_mode, inMayBeStream, inPath);
+  return file;
+}
+
+std::size_t ReadSome(int inDescriptor, void* outBytes, std::size_t inMax,
+                     const std::string& inName) {
+  for (;;) {
+    const ssize_t count = read(inDescriptor, outBytes, inMax);
+    if (count >= 0) return static_cast<std::size_t>(count);
+    if (errno != EINTR) throw FileError(inName, errno);
+  }
+}
+
+void Rewind(int inDescriptor, const std::string& inName) {
+  if (lseek(inDescriptor, 0, SEEK_SET) != 0) throw FileError(inName, errno);
+}
+
 std::string ReadToEnd(int inDescriptor, const std::string& inName, std::uint64_t inMaxSize) {
   std::string bytes;
   // Growing step by step would copy large files several times.
@@ -61,28 +82,18 @@ std::string ReadToEnd(int inDescriptor, const std::string& inName, std::uint64_t
     bytes.reserve(static_cast<std::size_t>(status.st_size));
   }
   char part[1 << 16];
-  for (;;) {
-    const ssize_t count = read(inDescriptor, part, sizeof part);
-    if (count == 0) return bytes;
-    if (count < 0 && errno == EINTR) continue;
-    if (count < 0) throw FileError(inName, errno);
-    bytes.append(part, static_cast<std::size_t>(count));
+  while (const std::size_t count = ReadSome(inDescriptor, part, sizeof part, inName)) {
+    bytes.append(part, count);
     CheckSize(bytes.size(), inMaxSize, inName);
   }
+  return bytes;
 }
 
 WholeFile ReadWholeFile(const std::string& inPath, const ReadOptions& inOptions) {
-  // Without waiting, so that a pipe in a file's place cannot stop the caller.
-  const int noWait = inOptions.mayBeStream ? 0 : O_NONBLOCK;
-  const Descriptor file(open(inPath.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY | noWait));
-  // A socket cannot be opened by its path.
-  if (!file.IsOpen() && errno == ENXIO) CheckKind(S_IFSOCK, inOptions, inPath);
-  if (!file.IsOpen()) throw FileError(inPath, errno);
-  const struct stat before = StatusOf(file.Get(), inPath);
-  CheckKind(before.st_mode, inOptions, inPath);
+  const Descriptor file = OpenForReading(inPath, inOptions.mayBeStream);
   WholeFile whole;
+  whole.before = StampOf(StatusOf(file.Get(), inPath));
   whole.bytes = ReadToEnd(file.Get(), inPath, inOptions.maxSize);
-  whole.before = StampOf(before);
   whole.after = StampOf(StatusOf(file.Get(), inPath));
   return whole;
 }

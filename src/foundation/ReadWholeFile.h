@@ -7,6 +7,7 @@
 #include <optional>
 #include <string>
 
+#include "foundation/Descriptor.h"
 #include "foundation/FileError.h"
 
 namespace ZORFoundation {
@@ -47,6 +48,18 @@ ZOR_FOUNDATION_EXPORT WholeFile ReadWholeFile(const std::string& inPath,
 /// The same where the reason does not matter.
 ZOR_FOUNDATION_EXPORT std::optional<WholeFile> TryReadWholeFile(const std::string& inPath,
                                                                 const ReadOptions& inOptions = {});
+
+/// Opens a file for reading; raises FileError like ReadWholeFile.
+ZOR_FOUNDATION_EXPORT Descriptor OpenForReading(const std::string& inPath,
+                                                bool inMayBeStream = false);
+
+/// Reads up to so many bytes, fewer at the end and from streams. @return 0 at the end only.
+/// @param inName what a FileError names.
+ZOR_FOUNDATION_EXPORT std::size_t ReadSome(int inDescriptor, void* outBytes, std::size_t inMax,
+                                           const std::string& inName);
+
+/// Goes back to the start of an open file. Raises FileError.
+ZOR_FOUNDATION_EXPORT void Rewind(int inDescriptor, const std::string& inName);
 
 /// Reads what is left of an open file, pipe or device.
 /// @param inName what a FileError names.

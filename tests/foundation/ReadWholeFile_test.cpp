@@ -157,3 +157,32 @@ TEST(ReadWholeFile, TriedOneGivesNothingInPlaceOfAReason) {
   EXPECT_EQ(TryReadWholeFile(folder.FilePath("a"))->bytes, "text");
   EXPECT_FALSE(TryReadWholeFile(folder.FilePath("b")));
 }
+
+TEST(OpenForReading, ReadsRewindsAndReadsAgain) {
+  const TemporaryFolder folder;
+  folder.WriteFile("a", "text");
+  const auto file = ZORFoundation::OpenForReading(folder.FilePath("a"));
+  char bytes[8];
+  EXPECT_EQ(ZORFoundation::ReadSome(file.Get(), bytes, 3, "a"), 3U);
+  EXPECT_EQ(ZORFoundation::ReadSome(file.Get(), bytes, 3, "a"), 1U);
+  EXPECT_EQ(ZORFoundation::ReadSome(file.Get(), bytes, 3, "a"), 0U);
+  ZORFoundation::Rewind(file.Get(), "a");
+  EXPECT_EQ(ZORFoundation::ReadToEnd(file.Get(), "a"), "text");
+}
+
+TEST(OpenForReading, RefusesWhatIsNoRegularFile) {
+  const TemporaryFolder folder;
+  EXPECT_THROW(ZORFoundation::OpenForReading(folder.path.string()), FileError);
+  EXPECT_THROW(ZORFoundation::OpenForReading("/dev/null"), FileError);
+  EXPECT_TRUE(ZORFoundation::OpenForReading("/dev/null", true).IsOpen());
+}
+
+TEST(OpenForReading, FailureNamesWhatWasRead) {
+  try {
+    char bytes[8];
+    ZORFoundation::ReadSome(-1, bytes, sizeof bytes, "name");
+    FAIL();
+  } catch (const FileError& error) {
+    EXPECT_STREQ(error.what(), "name: Bad file descriptor");
+  }
+}

@@ -1,14 +1,9 @@
 #include "default_platform/xml/ByteSource.h"
 
-#include <fcntl.h>
-#include <sys/stat.h>
-#include <unistd.h>
-
 #include <algorithm>
-#include <cerrno>
 #include <cstring>
-#include <system_error>
 
+#include "foundation/ReadWholeFile.h"
 #include "platform/xml/ZORXMLParseError.h"
 
 InputSource::~InputSource() = default;
@@ -23,21 +18,11 @@ MemorySource::~MemorySource() {
 
 namespace {
 
-// Without O_NONBLOCK, opening a pipe would wait for its writer.
-constexpr int kOpenFlags = O_RDONLY | O_NONBLOCK | O_CLOEXEC | O_NOCTTY;
-
 class FileReader : public ByteReader {
  public:
-  explicit FileReader(const char* inPath) : path_(inPath), file_(open(inPath, kOpenFlags)) {
-    if (file_ < 0) FailWithErrno();
-    struct stat status;
-    if (fstat(file_, &status) != 0) CloseAndFail(std::generic_category().message(errno));
-    if (S_ISDIR(status.st_mode)) CloseAndFail("is a directory");
-    if (!S_ISREG(status.st_mode)) CloseAndFail("is not a regular file");
+  explicit FileReader(const char* inPath) : path_(inPath) {
+    Try([&] { file_ = ZORFoundation::OpenForReading(path_); });
   }
-  ~FileReader() override { close(file_); }
-  FileReader(const FileReader&) = delete;
-  FileReader& operator=(const FileReader&) = delete;
 
   bool IsEmpty() override {
     if (!hasFirst_) {
@@ -57,30 +42,28 @@ class FileReader : public ByteReader {
   }
 
   void DoRewind() override {
-    if (lseek(file_, 0, SEEK_SET) != 0) FailWithErrno();
+    Try([&] { ZORFoundation::Rewind(file_.Get(), path_); });
     hasFirst_ = false;
     isFirstDelivered_ = false;
   }
 
   std::size_t FromFile(unsigned char* outBytes, std::size_t inMax) {
-    std::ptrdiff_t count = 0;
-    do {
-      count = read(file_, outBytes, inMax);
-    } while (count < 0 && errno == EINTR);
-    if (count < 0) FailWithErrno();
-    return static_cast<std::size_t>(count);
+    std::size_t count = 0;
+    Try([&] { count = ZORFoundation::ReadSome(file_.Get(), outBytes, inMax, path_); });
+    return count;
   }
 
-  [[noreturn]] void FailWithErrno() const {
-    throw ZORXMLParseError(path_, 0, 0, std::generic_category().message(errno));
-  }
-  [[noreturn]] void CloseAndFail(const std::string& inReason) const {
-    close(file_);
-    throw ZORXMLParseError(path_, 0, 0, inReason);
+  template <class Act>
+  void Try(const Act& inAct) const {
+    try {
+      inAct();
+    } catch (const ZORFoundation::FileError& error) {
+      throw ZORXMLParseError(path_, 0, 0, error.Reason());
+    }
   }
 
   std::string path_;
-  int file_;
+  ZORFoundation::Descriptor file_;
   // One byte read ahead tells an empty file from others; its stated size may be a lie.
   unsigned char first_ = 0;
   bool hasFirst_ = false;

@@ -1,8 +1,5 @@
 #include "toolkit/records/ClashDocument.h"
 
-#include <sys/stat.h>
-#include <unistd.h>
-
 #include <algorithm>
 #include <cerrno>
 #include <climits>
@@ -11,6 +8,7 @@
 #include <optional>
 #include <utility>
 
+#include "foundation/ReadWholeFile.h"
 #include "platform/xml/ZORXMLParseError.h"
 #include "toolkit/records/ElementWalk.h"
 
@@ -34,34 +32,24 @@ const KindName& WordsOf(DocumentKind inKind) {
                        [&](const KindName& inWords) { return inWords.kind == inKind; });
 }
 
-[[noreturn]] void FailBySystem(const std::string& inName) {
-  throw Error(inName + ": " + std::strerror(errno));
-}
-
 /// Raises Error for what is no readable regular file: a pipe might never end, a device neither.
 void CheckRegularFile(const std::string& inPath) {
-  struct stat status {};
-  if (stat(inPath.c_str(), &status) != 0) FailBySystem(inPath);
-  if (S_ISDIR(status.st_mode)) throw Error(inPath + ": is a directory");
-  if (!S_ISREG(status.st_mode))
-    throw Error(inPath + ": is not a regular file (what a pipe carries is read as \"-\")");
-  if (access(inPath.c_str(), R_OK) != 0) FailBySystem(inPath);
+  try {
+    ZORFoundation::OpenForReading(inPath);
+  } catch (const ZORFoundation::FileError& error) {
+    const bool isStream = error.Code() == ESPIPE;
+    throw Error(error.what() +
+                std::string(isStream ? " (what a pipe carries is read as \"-\")" : ""));
+  }
 }
 
 std::string ReadStandardInput() {
-  std::string bytes;
-  std::size_t used = 0;
-  for (;;) {
-    if (used == bytes.size()) bytes.resize(std::max<std::size_t>(1 << 16, 2 * used));
-    const ssize_t count = read(STDIN_FILENO, bytes.data() + used, bytes.size() - used);
-    if (count < 0 && errno == EINTR) continue;
-    if (count < 0) FailBySystem("-");
-    if (count == 0) break;
-    used += static_cast<std::size_t>(count);
-    if (used > INT_MAX) throw Error("-: is larger than 2 GB");
+  constexpr int kStandardInput = 0;
+  try {
+    return ZORFoundation::ReadToEnd(kStandardInput, "-", INT_MAX);
+  } catch (const ZORFoundation::FileError& error) {
+    throw Error(error.Code() == EFBIG ? "-: is larger than 2 GB" : error.what());
   }
-  bytes.resize(used);
-  return bytes;
 }
 
 std::string Place(const std::string& inName, const ZORXMLParseError& inError) {
