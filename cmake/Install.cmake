@@ -26,6 +26,7 @@ endif()
 
 install(DIRECTORY include/ DESTINATION ${headerDir} FILES_MATCHING PATTERN "*.h")
 install(DIRECTORY src/platform/ DESTINATION ${headerDir}/platform FILES_MATCHING PATTERN "*.h")
+install(FILES src/default_platform/OpenModel.h DESTINATION ${headerDir}/default_platform)
 # Not those of the CAD kernel's part, which is loaded by name.
 install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit
   FILES_MATCHING PATTERN "*.h" PATTERN "ElementWalk.h" EXCLUDE PATTERN "detection" EXCLUDE)

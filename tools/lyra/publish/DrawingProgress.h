@@ -15,19 +15,17 @@ std::string DrawingText(std::size_t inDone, std::size_t inAll, double inSeconds)
 /// A line on standard error that is gone at the end; nothing when that is no terminal.
 class DrawingProgress {
  public:
-  DrawingProgress();
+  explicit DrawingProgress(std::size_t inAll);
   ~DrawingProgress();
   DrawingProgress(const DrawingProgress&) = delete;
   DrawingProgress& operator=(const DrawingProgress&) = delete;
 
-  /// The line is gone once all is done.
-  void Show(std::size_t inDone, std::size_t inAll);
+  void Show(std::size_t inDone);
 
  private:
-  void Clear();
-
   using Clock = std::chrono::steady_clock;
 
+  std::size_t all_;
   bool isTerminal_;
   Clock::time_point start_ = Clock::now(), shown_;
   std::size_t width_ = 0;  // of what stands on the line

@@ -1,4 +1,4 @@
-#include "toolkit/publishing/DrawingWorkers.h"
+#include "lyra/publish/DrawingWorkers.h"
 
 #include <fcntl.h>
 #include <sys/mman.h>
@@ -14,13 +14,13 @@
 #include <vector>
 
 #include "foundation/TerminationSignals.h"
-#include "toolkit/Error.h"
+#include "lyra/CommandErrors.h"
 
-namespace ZORToolkit {
+namespace lyra {
 namespace {
 
 [[noreturn]] void FailToStart() {
-  throw Error(std::string("no process can be started to draw: ") + std::strerror(errno));
+  throw InputError(std::string("no process can be started to draw: ") + std::strerror(errno));
 }
 
 /// A number that all processes count up together.
@@ -77,7 +77,10 @@ struct Pipe {
   int code = 0;
   try {
     close(inPipe.reader);
+    bool isBegun = false;
     for (std::size_t i = ioNext.Next(); i < inWork.count; i = ioNext.Next()) {
+      if (!isBegun) inWork.begin();
+      isBegun = true;
       inWork.draw(i);
       if (write(inPipe.writer, "", 1) != 1 || inStop.IsMade()) break;
     }
@@ -138,4 +141,4 @@ void DrawInProcesses(int inProcesses, const DrawingWork& inWork) {
   stop.Check();
 }
 
-}  // namespace ZORToolkit
+}  // namespace lyra
