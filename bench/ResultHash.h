@@ -7,22 +7,21 @@
 #include <string>
 #include <string_view>
 
-/// FNV-1a, 64 bits (Fowler, Noll, Vo), over texts as UTF-8, whatever form they come in, each ended
-/// by a byte that no UTF-8 text holds.
+#include "foundation/Hash.h"
+
+/// A hash over texts as UTF-8, whatever form they come in, each ended by a byte that no UTF-8 text
+/// holds.
 class ResultHash {
  public:
   void Add(std::string_view inUtf8);
   void Add(std::u16string_view inUtf16);
-  void Add(std::uint64_t inNumber);
+  void Add(std::uint64_t inNumber) { hash_.Add(inNumber); }
   /// Part of a text, which the next Add ends.
-  void AddPart(std::string_view inUtf8);
-  std::uint64_t Value() const { return value_; }
+  void AddPart(std::string_view inUtf8) { hash_.Add(inUtf8); }
+  std::uint64_t Value() const { return hash_.Get(); }
 
  private:
-  void AddByte(unsigned char inByte) { value_ = (value_ ^ inByte) * 0x100000001B3u; }
-  void AddCharacter(char32_t inCharacter);
-
-  std::uint64_t value_ = 0xCBF29CE484222325u;
+  ZORFoundation::Hash64 hash_;
 };
 
 /// The hash of a file's bytes; raises when it cannot be read.
