@@ -1,4 +1,4 @@
-// Texts made safe for XML and for file names, logical names of places, a date stamp.
+// Escaping for XML and for file names, logical names of directories, date stamps.
 #ifndef ZOR_BUILD_PATH_H
 #define ZOR_BUILD_PATH_H
 
@@ -6,18 +6,18 @@
 #include "platform/system/ZORString.h"
 #include "platform/system/ZORUnicodeString.h"
 
-/// Helpers for texts and paths. Only static operations; nothing is kept between two calls, and none
-/// reports a failure but through its result.
+/// Helpers for texts and paths: static, stateless operations, which report failures through their
+/// results alone.
 ///
 /// The four converters append the converted input to the output, whose earlier text stays in front.
-/// An empty input appends nothing. They work on UTF-16 code units: what is not named below is
-/// copied as it is, surrogates, control characters and apostrophes included. Input and output may
-/// be one string: its converted text then follows the text that it had.
+/// They work on UTF-16 code units and copy all that is not listed below unchanged, surrogates,
+/// control characters and apostrophes included. Input and output may be the same string: the
+/// converted text then follows the original.
 class ZOR_LYRA_EXPORT BuildPath {
  public:
   BuildPath() = default;
   BuildPath(const BuildPath& inOther) = default;
-  /// There is nothing to copy. @return this object.
+  /// Copies nothing: there is no state. @return this object.
   BuildPath& operator=(const BuildPath& inOther);
 
   // Texts for XML
@@ -29,8 +29,8 @@ class ZOR_LYRA_EXPORT BuildPath {
 
   // Names of files
   /// Replaces the nine characters that a Windows file name may not hold (" * / : < > ? \ |) by an
-  /// ampersand and their decimal code, such as "&47", and each space by "_". The ampersand itself
-  /// stays, so the input cannot be had back.
+  /// ampersand and their decimal code, such as "&47", and each space by "_". Not reversible: an
+  /// ampersand in the input is not escaped.
   static void DeleteSpecialCharacterOfFilename(ZORUnicodeString& inText,
                                                ZORUnicodeString& ioOutput);
   /// Replaces the same nine characters by complete character references such as "&#47;"; spaces
@@ -40,7 +40,7 @@ class ZOR_LYRA_EXPORT BuildPath {
 
   /// @return the number in decimal, with a leading "-" when it is negative.
   static ZORUnicodeString ConvToStr(int inValue);
-  /// @return one backslash, the separator on every system; nothing is appended to anything.
+  /// @return one backslash, the separator on every system. Appends nothing, in spite of its name.
   static ZORUnicodeString AppendSlash();
   /// @return one backslash as narrow text.
   static ZORString AppendSlash2();

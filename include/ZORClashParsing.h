@@ -12,29 +12,27 @@
 #include "platform/xml/DOM_NamedNodeMap.h"
 #include "platform/xml/DOM_NodeList.h"
 
-class ZORClashDocumentIndex;
-
 /// Reads a clash-result document from a file or from memory and answers questions about it.
 ///
-/// Typical use: construct, LoadSequence once, then ask. Before a successful load, and after one
-/// that found no root element, every question answers as for a missing root. Outputs are filled in
-/// place; unless an operation says otherwise, what is not found leaves its output untouched. A
-/// missing attribute reads as the empty string. Names are compared exactly, letter case included.
-/// The reader catches nothing: what the platform raises (ZORXMLParseError for a malformed document)
-/// reaches the caller.
+/// Typical use: construct, LoadSequence once, then query. Before a successful load, and after one
+/// that found no root element, every query answers as for a missing root. Outputs are filled in
+/// place; unless stated otherwise, an output whose source is missing is left untouched. A missing
+/// attribute reads as the empty string. Names are compared exactly and case-sensitively. What the
+/// platform raises (on the default platform ZORXMLParseError for a malformed document) reaches the
+/// caller.
 ///
 /// Interferences are numbered from 1 in document order over all result sets. Component positions
 /// count every child node of the root from 0, texts and comments included.
 ///
-/// The loaded tree belongs to the caller as much as to the reader: when the caller changes it, the
-/// next answer is that of the changed document. One thread at a time.
+/// The document is shared with the caller: after a change by the caller the next answer is that of
+/// the changed document. One thread at a time.
 class ZOR_LYRA_EXPORT ZORClashParsing {
  public:
   // Building
-  /// A reader on a file. The path is kept, not copied, and never freed: it must stay as it is until
-  /// LoadSequence has returned.
+  /// A reader on a file. The path is neither copied nor freed: it must stay valid and unchanged
+  /// until LoadSequence has returned.
   explicit ZORClashParsing(char* inPath);
-  /// A reader on inLength bytes in memory, kept and never freed like a path.
+  /// A reader on inLength bytes in memory, neither copied nor freed, as with a path.
   ZORClashParsing(char* inBuffer, int inLength);
   /// A reader on nothing: neither source nor document is copied.
   ZORClashParsing(ZORClashParsing& inOther);
@@ -69,9 +67,9 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
   DOM_NodeList GetNodeList();
   /// The first element "Elements" of a "FederatorClashElement" document; else a null node.
   DOM_Node GetElementsNode();
-  /// Finds the inIndex-th (from 1) child element of a name. The index is also checked against the
-  /// number of all child nodes and must be below it: a parent whose only child is the wanted
-  /// element, with no space around it, does not deliver it.
+  /// Finds the inIndex-th (from 1) child element of a name. The index must also be less than the
+  /// number of all child nodes: a parent whose only child is the wanted element, with no space
+  /// around it, does not deliver it.
   /// @return S_OK, or E_FAIL with outNode untouched. Nothing of the reader is used.
   HRESULT GetValideNode(DOM_Node inParent, int inIndex, ZORUnicodeString inName, DOM_Node& outNode);
   /// @param inPosition component position, not negative.
@@ -85,9 +83,9 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
   /// The first "Error" under the root: its "Message" and its "ErrorId". Without one the message is
   /// untouched and the id -1, which is also what an id that is no number gives.
   void GetErrorId(ZORUnicodeString& outMessage, int& outErrorId);
-  ZORUnicodeString GetServerMarker();
-  ZORUnicodeString GetTransaction();
-  ZORUnicodeString GetPRCName();
+  ZORUnicodeString GetServerMarker();  ///< the root's "ServerMarker"; empty without it
+  ZORUnicodeString GetTransaction();   ///< the root's "Transaction"; empty without it
+  ZORUnicodeString GetPRCName();       ///< the root's "PRCName"; empty without it
 
   // General information
   /// The root's "Version" (as it stands), "ZORDocument" and "Responsible", its last "Date" and
@@ -107,9 +105,8 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
   // Interferences
   /// Finds an interference by number.
   /// @param outInterference a deep copy, of the same document but without parent.
-  /// @param ioFirstLabel    must be empty on entry: a filled one means that the first product is
-  ///                        known, and each product then goes to the second outputs. Becomes
-  ///                        "instance -- shape".
+  /// @param ioFirstLabel    "instance -- shape". Must be empty on entry: if it is not, the first
+  ///                        product counts as read, and each product goes to the second outputs.
   /// @return S_OK, or E_FAIL with all outputs untouched.
   HRESULT GetithInterference(int inIndex, DOM_Node& outInterference, ZORUnicodeString& ioFirstLabel,
                              ZORUnicodeString& outSecondLabel, ZORUnicodeString& outFirstPreview,
@@ -164,9 +161,9 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
   /// @param outComputationType, outRuleName, outRuleClearance, outSeverity,
   ///                         outPenetrationCandidate of the violated rule; untouched without one.
   /// @param outRetrieve      "Old", "New", or the text as written.
-  /// @param ioFirstAlien     must be empty on entry: a filled one means that the first product is
-  ///                         known, and each product then goes to the second outputs. "YES" when
-  ///                         empty in the document.
+  /// @param ioFirstAlien     "YES" when empty in the document. Must be empty on entry: if it is
+  ///                         not, the first product counts as read, and each product goes to the
+  ///                         second outputs.
   /// @param outFirstInstance the alias of a product that the PDM system manages, else the last
   ///                         segment of the description identifier.
   /// @param outReserved      emptied when there is a "GeometricAspect", never filled.
@@ -219,9 +216,9 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
   ZORUnicodeString GetShapeAttrValue(int inPosition, int inShape, ZORUnicodeString inName);
   /// The component's placement: the columns Rx, Ry, Rz of its rotation, then its translation T, in
   /// millimetres.
-  /// @param outPosition a new array of 12 doubles, always; the caller deletes it (delete[]).
-  /// Elements whose
-  ///                    source is missing are not set; a number that does not convert is 0.
+  /// @param outPosition always a new array of 12 doubles, which the caller deletes (delete[]).
+  ///                    Elements whose source is missing are not set; a number that does not
+  ///                    convert is 0.
   void GetPosition(int inPosition, double*& outPosition);
 
   // Specification
@@ -246,7 +243,7 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
                              ZORUnicodeString& outFirstURL, ZORUnicodeString& outSecondURL);
 
   // Rebuilding a session
-  /// The products of all interferences and where they stood.
+  /// The products of all interferences and their placements.
   /// @param ioAliases, ioDescriptionIds two texts an interference are appended.
   /// @param outPositions for each "ClashResult" that declares interferences, a new array of two
   ///                     transformations a declared interference; the pointer ends on the last such
@@ -257,12 +254,11 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
                               ZORMathTransformation*& outPositions);
 
   // Merging
-  /// Copies the interferences of a second document behind those of the first document's result
-  /// set, and its specifications into the first document's "ProductsInSpec". Uses nothing of the
-  /// reader.
-  /// The first "ClashResult" of the first document takes them all; without one, the root's last
-  /// child node does. Its "NbInterf", when present, becomes the sum of its declared number and that
-  /// of the second document's last result set, however many interferences there are.
+  /// Appends copies of a second document's interferences to the first document's result set, and of
+  /// its specifications to the first document's "ProductsInSpec". Uses nothing of the reader.
+  /// The first "ClashResult" of the first document receives them all; without one, the root's last
+  /// child node does. Its "NbInterf", if present, becomes the sum of its declared number and that of
+  /// the second document's last result set, however many interferences there are.
   /// @param ioFirst  when null, or without a node to take interferences, becomes the second.
   /// @param inSecond left as it is.
   /// @param ioTrace  a line for each step is appended.
@@ -271,7 +267,6 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
   HRESULT MergeDocuments(DOM_Document& ioFirst, DOM_Document& inSecond, ZORUnicodeString& ioTrace);
 
  private:
-  bool ParseSource(DOM_Document& outDocument, HRESULT& ioResult);
   void GetInterferenceData(DOM_Node inInterference, ZORUnicodeString& outValue,
                            ZORUnicodeString& outResultType, ZORUnicodeString& outRuleName,
                            ZORUnicodeString& ioFirstAlias, ZORUnicodeString& outSecondAlias);
@@ -288,14 +283,12 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
   ZORUnicodeString GetAttrOnNode(DOM_Node inNode, const char* inName);
   double GetAttrDoubleOnNode(DOM_Node inNode, const char* inName);
   double TransDouble(DOM_NamedNodeMap inAttributes, char* inName);
-  DOM_Node ComponentAt(int inPosition);
 
   char* path_;
   char* buffer_;
   int bufferLength_;
   ZORUnicodeString documentKind_;
   DOM_Element root_;
-  ZORClashDocumentIndex* index_;  // where things stand in the document, refreshed when it changes
 };
 
 #endif

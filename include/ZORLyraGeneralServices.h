@@ -11,8 +11,8 @@
 #include "platform/system/ZORUnicodeString.h"
 #include "platform/xml/DOM_Document.h"
 
-/// Services that every reader and writer uses. Only static operations; nothing is kept between two
-/// calls. None raises an error of its own; those that answer a code say which.
+/// Static, stateless services that every reader and writer uses. None raises an error of its own;
+/// result codes are listed where there are any.
 class ZOR_LYRA_EXPORT ZORLyraGeneralServices {
  public:
   ZORLyraGeneralServices() = delete;

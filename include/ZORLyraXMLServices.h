@@ -1,4 +1,4 @@
-// XML written by markers, federator documents, documents written to files, pictures.
+// XML written tag by tag, federator documents, documents dumped to files, pictures.
 #ifndef ZOR_LYRA_XML_SERVICES_H
 #define ZOR_LYRA_XML_SERVICES_H
 
@@ -19,20 +19,19 @@ class ZORRep;
 /// element), or InitXMLMarkerWithoutAttr; content through AddPCData; CloseXMLMarker; at the end
 /// DumpDocument(path).
 ///
-/// Nothing is escaped or checked: texts are written as they are given (see
-/// BuildPath::CheckXMLString), and the order of the calls is the caller's affair. Nothing is ever
-/// taken back from the text.
+/// Nothing is escaped or checked: texts are appended as given (see BuildPath::CheckXMLString), and
+/// balanced markers are the caller's responsibility.
 ///
-/// All writers of the process share whether markup is laid out (line feeds and spaces) or compact.
-/// It is compact until the first default construction; each default construction selects the laid
-/// out form, and CreateNewFederatorDocument and the DumpDocument of a node select what their last
-/// argument says. The selection holds for earlier writers too. One thread at a time in the process.
+/// Whether markup is laid out (with line feeds and spaces) or compact is shared by all writers of
+/// the process, earlier ones included. It is compact until the first default construction; each
+/// default construction selects the laid out form, CreateNewFederatorDocument and the DumpDocument
+/// of a node select by their last argument. One thread at a time in the process.
 class ZOR_LYRA_EXPORT ZORLyraXMLServices : public ZORBaseUnknown {
  public:
   // Building
   /// A writer without text. Selects the laid out form for all writers.
   ZORLyraXMLServices();
-  /// A writer with the other's text so far. What the writers share stays as it is.
+  /// A writer with a copy of the other's text. The shared form does not change.
   ZORLyraXMLServices(const ZORLyraXMLServices& inOther);
   ZORLyraXMLServices& operator=(const ZORLyraXMLServices& inOther);
   ~ZORLyraXMLServices() override;
@@ -86,13 +85,13 @@ class ZOR_LYRA_EXPORT ZORLyraXMLServices : public ZORBaseUnknown {
   HRESULT CreateNewFederatorDocument(ZORUnicodeString inPath, ZORUnicodeString inDTDIdentifier,
                                      ZORUnicodeString inStyleSheet, int inIndent);
   /// Writes this writer's text into a file, as UTF-8. The text is kept.
-  /// @return S_OK, or the platform's negative code of opening, writing or closing, the first of
-  ///         them. A file that could not be written whole is left as it is.
+  /// @return S_OK, or the platform's first negative code of opening, writing or closing. A file
+  ///         that could not be written whole is left as it is.
   int DumpDocument(ZORUnicodeString inPath);
-  /// Writes a node and all below it into a file, as UTF-8. After the first ">" of the text (at its
-  /// start when there is none) follow, each behind a line feed and where not empty, the style-sheet
-  /// reference and then the document type. Selects the form of all writers; the file does not
-  /// depend on it.
+  /// Writes a node and all below it into a file, as UTF-8. The style-sheet reference and then the
+  /// document type, where not empty and each after a line feed, are inserted after the first ">" of
+  /// the text (at its start when there is none). Selects the form of all writers, on which the file
+  /// does not depend.
   /// @param inTypeName name in the document type.
   /// @param inPrologue 1 puts the XML declaration of the message catalogue and a line feed in
   ///                   front; any other value puts nothing.
@@ -104,22 +103,23 @@ class ZOR_LYRA_EXPORT ZORLyraXMLServices : public ZORBaseUnknown {
                        int inIndent);
   /// Copies a file from one directory to another under the same name; an existing target is
   /// replaced.
-  /// @return S_OK, or the platform's negative code: E_INVALIDARG for a path of 260 bytes or more.
+  /// @return S_OK, or the platform's negative code of the copy. A path of 260 bytes or more does not
+  ///         fit: nothing is copied then.
   HRESULT CopyFile(const char* inFileName, ZORUnicodeString inSourceDirectory,
                    ZORUnicodeString inTargetDirectory);
 
   // Pictures; nothing is reported
-  /// Draws a representation, all of it framed, in 756 by 506 pixels, surfaces shaded and hidden
-  /// edges off, and writes it as a JPEG file, whatever the path ends in. A null representation, or
-  /// one that cannot be drawn, writes no file; in the latter case the print image is not released.
+  /// Renders a representation, framed as a whole, in 756 by 506 pixels, surfaces shaded and hidden
+  /// edges off, into a JPEG file, whatever the path's extension. A null representation, or one that
+  /// cannot be rendered, writes no file; in the latter case the print image is not released.
   /// @param inRep            a ZOR3DRep.
   /// @param inPath           its narrow form names the file.
   /// @param inKeepBackground 0: white; any other value: the platform's own background.
   static void TakeRepImage(ZORRep* inRep, ZORUnicodeString inPath, int inKeepBackground);
   /// The same in any size; the print image is always released.
-  /// @param inWidth, inHeight in pixels, as the platform can draw them.
-  /// @param inViewMode       1: surfaces shaded and hidden edges off; any other value: as the
-  ///                         platform draws at first.
+  /// @param inWidth, inHeight in pixels, within the platform's limits.
+  /// @param inViewMode       1: surfaces shaded and hidden edges off; any other value: the
+  ///                         platform's defaults.
   static void TakeRepImage(ZORRep* inRep, ZORUnicodeString inPath, int inWidth, int inHeight,
                            int inViewMode, int inKeepBackground);
   /// The same as the first, through a viewpoint instead of framed.
@@ -128,8 +128,6 @@ class ZOR_LYRA_EXPORT ZORLyraXMLServices : public ZORBaseUnknown {
                            int inKeepBackground);
 
  private:
-  void AppendAttribute(const ZORUnicodeString& inName, const ZORUnicodeString& inValue);
-
   static ZORMetaClass* meta_object;  // null until first asked for
 
   ZORUnicodeString text_;

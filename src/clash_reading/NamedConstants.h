@@ -4,40 +4,48 @@
 
 #include "platform/system/ZORUnicodeString.h"
 
-/// One process-wide text a name, built in this order when the library is loaded and released in
-/// reverse order when it is unloaded. Each holds the text that it is called by.
+/// All names, in the order in which they are built.
+// clang-format off
+#define ZOR_NAMED_CONSTANTS(X) \
+  X(Name) \
+  X(AttrType) \
+  X(AttrValue) \
+  X(Component) \
+  X(Components) \
+  X(Alias) \
+  X(Alien) \
+  X(ComponentAttribute) \
+  X(ComponentAttributes) \
+  X(DocumentVersionUUID) \
+  X(ComponentUuid) \
+  X(PartNumber) \
+  X(ShapePosition) \
+  X(ComponentShape) \
+  X(ComponentShapes) \
+  X(ComponentType) \
+  X(ZORDocument) \
+  X(Rx) \
+  X(Ry) \
+  X(Rz) \
+  X(T) \
+  X(Ux) \
+  X(Uy) \
+  X(Uz) \
+  X(PRCName) \
+  X(ServerMarker) \
+  X(ShapeId) \
+  X(ShapeName) \
+  X(ShapeOnDisk) \
+  X(ShapeType) \
+  X(Transaction)
+// clang-format on
+
+/// One process-wide text for each name, which holds that name. Built in order when the library is
+/// loaded, released in reverse order when it is unloaded.
 namespace names {
-extern const ZORUnicodeString Name;
-extern const ZORUnicodeString AttrType;
-extern const ZORUnicodeString AttrValue;
-extern const ZORUnicodeString Component;
-extern const ZORUnicodeString Components;
-extern const ZORUnicodeString Alias;
-extern const ZORUnicodeString Alien;
-extern const ZORUnicodeString ComponentAttribute;
-extern const ZORUnicodeString ComponentAttributes;
-extern const ZORUnicodeString DocumentVersionUUID;
-extern const ZORUnicodeString ComponentUuid;
-extern const ZORUnicodeString PartNumber;
-extern const ZORUnicodeString ShapePosition;
-extern const ZORUnicodeString ComponentShape;
-extern const ZORUnicodeString ComponentShapes;
-extern const ZORUnicodeString ComponentType;
-extern const ZORUnicodeString ZORDocument;
-extern const ZORUnicodeString Rx;
-extern const ZORUnicodeString Ry;
-extern const ZORUnicodeString Rz;
-extern const ZORUnicodeString T;
-extern const ZORUnicodeString Ux;
-extern const ZORUnicodeString Uy;
-extern const ZORUnicodeString Uz;
-extern const ZORUnicodeString PRCName;
-extern const ZORUnicodeString ServerMarker;
-extern const ZORUnicodeString ShapeId;
-extern const ZORUnicodeString ShapeName;
-extern const ZORUnicodeString ShapeOnDisk;
-extern const ZORUnicodeString ShapeType;
-extern const ZORUnicodeString Transaction;
+#define ZOR_DECLARE_NAME(name) extern const ZORUnicodeString name;
+ZOR_NAMED_CONSTANTS(ZOR_DECLARE_NAME)
+#undef ZOR_DECLARE_NAME
 }  // namespace names
 
 #endif

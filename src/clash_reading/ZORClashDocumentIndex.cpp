@@ -1,21 +1,72 @@
 #include "clash_reading/ZORClashDocumentIndex.h"
 
 #include <algorithm>
+#include <memory>
+#include <mutex>
+#include <unordered_map>
+#include <utility>
 
-#include "clash_reading/ElementWalk.h"
+#include "PlatformAdapter.h"
+#include "clash_reading/ClashElements.h"
 #include "clash_reading/NamedConstants.h"
 
+namespace {
+
+// Hosts create readers by value, so their layout is fixed and their indexes are kept here. Locked
+// because readers may live on different threads.
+struct ReaderIndexes {
+  std::mutex mutex;
+  std::unordered_map<const ZORClashParsing*, std::unique_ptr<ZORClashDocumentIndex>> byReader;
+};
+
+// Never deleted: a host's static reader may outlive the library's own static objects.
+ReaderIndexes& AllIndexes() {
+  static auto* const indexes = new ReaderIndexes;
+  return *indexes;
+}
+
+}  // namespace
+
+ZORClashDocumentIndex& ZORClashDocumentIndex::Of(const ZORClashParsing& inReader,
+                                                 const DOM_Element& inRoot) {
+  ReaderIndexes& indexes = AllIndexes();
+  ZORClashDocumentIndex* index = nullptr;
+  {
+    const std::lock_guard lock(indexes.mutex);
+    const auto [entry, isNew] = indexes.byReader.emplace(&inReader, nullptr);
+    if (isNew) entry->second = std::make_unique<ZORClashDocumentIndex>();
+    index = entry->second.get();
+  }
+  index->Refresh(inRoot);
+  return *index;
+}
+
+void ZORClashDocumentIndex::Discard(const ZORClashParsing& inReader) {
+  ReaderIndexes& indexes = AllIndexes();
+  std::unique_ptr<ZORClashDocumentIndex> discarded;  // freed unlocked: it may own a whole document
+  const std::lock_guard lock(indexes.mutex);
+  if (const auto entry = indexes.byReader.find(&inReader); entry != indexes.byReader.end()) {
+    discarded = std::move(entry->second);
+    indexes.byReader.erase(entry);
+  }
+}
+
 void ZORClashDocumentIndex::Refresh(const DOM_Element& inRoot) {
-  const std::uint64_t changeCount = inRoot.getChangeCount();
-  // Changes outside the document's tree are not counted: of a root that the caller took out of it
-  // nothing can be kept.
-  if (root_ == inRoot && changeCount_ == changeCount && IsInDocument(inRoot)) return;
-  Forget();
+  const std::optional<std::uint64_t> changeCount = adapter::ChangeCount(inRoot);
+  // Changes below a root that the caller has detached are not counted.
+  if (changeCount && changeCount_ == changeCount && adapter::AreSame(root_, inRoot) &&
+      IsInDocument(inRoot))
+    return;
+  *this = ZORClashDocumentIndex();
   root_ = inRoot;
   changeCount_ = changeCount;
 }
 
-void ZORClashDocumentIndex::Forget() { *this = ZORClashDocumentIndex(); }
+bool IsInDocument(const DOM_Node& inNode) {
+  DOM_Node top = inNode;
+  for (DOM_Node up = top.getParentNode(); !up.isNull(); up = top.getParentNode()) top = up;
+  return top.getNodeType() == DOM_Node::DOCUMENT_NODE;
+}
 
 const std::vector<DOM_Node>& ZORClashDocumentIndex::ResultSets() {
   BuildInterferences();
@@ -27,9 +78,11 @@ const std::vector<DOM_Node>& ZORClashDocumentIndex::Interferences() {
   return interferences_;
 }
 
-bool ZORClashDocumentIndex::IsInLastResultSet(std::size_t inInterference) {
+const DOM_Node& ZORClashDocumentIndex::ResultSetOf(std::size_t inInterference) {
   BuildInterferences();
-  return !firstInterference_.empty() && inInterference >= firstInterference_.back();
+  const auto next =
+      std::upper_bound(firstInterference_.begin(), firstInterference_.end(), inInterference);
+  return resultSets_[static_cast<std::size_t>(next - firstInterference_.begin()) - 1];
 }
 
 void ZORClashDocumentIndex::BuildInterferences() {
@@ -89,7 +142,7 @@ const std::vector<DOM_Node>& ZORClashDocumentIndex::Specifications() {
 }
 
 const std::vector<DOM_Node>& ZORClashDocumentIndex::RealAttributes(const DOM_Node& inComponent) {
-  if (attributesOf_.isNull() || attributesOf_ != inComponent) {
+  if (attributesOf_.isNull() || !adapter::AreSame(attributesOf_, inComponent)) {
     realAttributes_.clear();
     ForEachElement(inComponent, names::ComponentAttributes, [&](const DOM_Node& inAttributes) {
       ForEachElement(inAttributes, names::ComponentAttribute, [&](const DOM_Node& inAttribute) {
@@ -104,7 +157,7 @@ const std::vector<DOM_Node>& ZORClashDocumentIndex::RealAttributes(const DOM_Nod
 }
 
 const std::vector<DOM_Node>& ZORClashDocumentIndex::Shapes(const DOM_Node& inComponent) {
-  if (shapesOf_.isNull() || shapesOf_ != inComponent) {
+  if (shapesOf_.isNull() || !adapter::AreSame(shapesOf_, inComponent)) {
     shapes_.clear();
     ForEachElement(inComponent, names::ComponentShapes, [&](const DOM_Node& inShapes) {
       ForEachElement(inShapes, names::ComponentShape,
@@ -117,7 +170,8 @@ const std::vector<DOM_Node>& ZORClashDocumentIndex::Shapes(const DOM_Node& inCom
 
 const std::vector<DOM_Node>& ZORClashDocumentIndex::NamedChildren(const DOM_Node& inParent,
                                                                   const ZORUnicodeString& inName) {
-  if (childrenOf_.isNull() || childrenOf_ != inParent || childrenName_ != inName) {
+  if (childrenOf_.isNull() || !adapter::AreSame(childrenOf_, inParent) ||
+      !(childrenName_ == inName)) {
     namedChildren_.clear();
     ForEachElement(inParent, inName,
                    [&](const DOM_Node& inChild) { namedChildren_.push_back(inChild); });

@@ -2,9 +2,11 @@
 #include "ZORClashParsing.h"
 
 #include <memory>
+#include <utility>
 
+#include "PlatformAdapter.h"
 #include "ZORLyraGeneralServices.h"
-#include "clash_reading/ElementWalk.h"
+#include "clash_reading/ClashElements.h"
 #include "clash_reading/NamedConstants.h"
 #include "clash_reading/ZORClashDocumentIndex.h"
 #include "platform/system/ZORFile.h"
@@ -17,6 +19,38 @@ constexpr int kReadAccess = 4;
 constexpr const char* kMemoryIdentifier = "LIDPipodIBM";
 constexpr const char* kDefaultVersion = "1.1";
 
+/// A file's path or, if that is null, bytes in memory.
+struct Source {
+  const char* path;
+  const char* buffer;
+  int bufferLength;
+};
+
+/// @param ioResult set to the reason when the source is refused before parsing; a buffer source also
+///                 leaves the code of its creation here.
+/// @return whether the source was parsed.
+bool Parse(const Source& inSource, DOM_Document& outDocument, HRESULT& ioResult) {
+  DOMParser parser(nullptr);
+  parser.setDoValidation(false);
+  if (inSource.path) {
+    if (ZORFileAccess(inSource.path, kReadAccess) != 0) {
+      ioResult = E_FAIL;
+      return false;
+    }
+    parser.parse(inSource.path);
+  } else {
+    InputSource* created = nullptr;
+    ioResult = ZORXMLParser::CreateMemBufInputSource(
+        reinterpret_cast<const unsigned char*>(inSource.buffer),
+        static_cast<unsigned int>(inSource.bufferLength), kMemoryIdentifier, 0, created);
+    if (FAILED(ioResult)) return false;
+    const std::unique_ptr<InputSource> source(created);
+    parser.parse(*source);
+  }
+  outDocument = parser.getDocument();
+  return true;
+}
+
 bool HasClashAttributes(const ZORUnicodeString& inRootName) {
   return inRootName == "ClashElement" || inRootName == "InterferenceElement" ||
          inRootName == "FederatorClashElement";
@@ -25,13 +59,10 @@ bool HasClashAttributes(const ZORUnicodeString& inRootName) {
 }  // namespace
 
 ZORClashParsing::ZORClashParsing(char* inPath)
-    : path_(inPath), buffer_(nullptr), bufferLength_(0), index_(new ZORClashDocumentIndex) {}
+    : path_(inPath), buffer_(nullptr), bufferLength_(0) {}
 
 ZORClashParsing::ZORClashParsing(char* inBuffer, int inLength)
-    : path_(nullptr),
-      buffer_(inBuffer),
-      bufferLength_(inLength),
-      index_(new ZORClashDocumentIndex) {}
+    : path_(nullptr), buffer_(inBuffer), bufferLength_(inLength) {}
 
 ZORClashParsing::ZORClashParsing(ZORClashParsing&) : ZORClashParsing(nullptr, 0) {}
 
@@ -41,46 +72,21 @@ ZORClashParsing::~ZORClashParsing() {
   path_ = nullptr;
   buffer_ = nullptr;
   bufferLength_ = 0;
-  delete index_;
+  ZORClashDocumentIndex::Discard(*this);
 }
 
 // ---- Loading
 
-// @param ioResult set to the reason when the source is refused before parsing; a buffer source also
-//                 leaves the code of its creation here.
-// @return whether the source was parsed.
-bool ZORClashParsing::ParseSource(DOM_Document& outDocument, HRESULT& ioResult) {
-  ZORXMLParser::Initialize();
-  DOMParser parser(nullptr);
-  parser.setDoValidation(false);
-  if (path_) {
-    if (ZORFileAccess(path_, kReadAccess) != 0) {
-      ioResult = E_FAIL;
-      return false;
-    }
-    parser.parse(path_);
-  } else {
-    InputSource* created = nullptr;
-    ioResult = ZORXMLParser::CreateMemBufInputSource(
-        reinterpret_cast<const unsigned char*>(buffer_), static_cast<unsigned int>(bufferLength_),
-        kMemoryIdentifier, 0, created);
-    if (FAILED(ioResult)) return false;
-    const std::unique_ptr<InputSource> source(created);
-    parser.parse(*source);
-  }
-  outDocument = parser.getDocument();
-  return true;
-}
-
 HRESULT ZORClashParsing::LoadSequence(ZORUnicodeString& outKind, ZORUnicodeString& outReference,
                                       ZORUnicodeString& ioVersion) {
+  ZORXMLParser::Initialize();
   outReference = ZORUnicodeString();
   DOM_Document document;
   HRESULT result = S_OK;
-  if (!ParseSource(document, result)) return result;
+  if (!Parse({path_, buffer_, bufferLength_}, document, result)) return result;
 
+  ZORClashDocumentIndex::Discard(*this);
   root_ = document.getDocumentElement();
-  index_->Refresh(root_);
   if (root_.isNull()) {
     outKind = "Unknown";
     documentKind_ = outKind;
@@ -102,13 +108,14 @@ HRESULT ZORClashParsing::LoadSequence(ZORUnicodeString& outKind, ZORUnicodeStrin
 }
 
 HRESULT ZORClashParsing::LoadSequence(DOM_Document& outDocument, ZORUnicodeString& outKind) {
+  ZORXMLParser::Initialize();
   HRESULT result = E_FAIL;
   DOM_Document document;
-  if (!ParseSource(document, result)) return result;
+  if (!Parse({path_, buffer_, bufferLength_}, document, result)) return result;
 
   outDocument = document;
+  ZORClashDocumentIndex::Discard(*this);
   root_ = document.getDocumentElement();
-  index_->Refresh(root_);
   if (!root_.isNull()) {
     result = S_OK;
     outKind = ZORLyraGeneralServices::GetDOMName(root_);
@@ -135,12 +142,12 @@ HRESULT ZORClashParsing::GetValideNode(DOM_Node inParent, int inIndex, ZORUnicod
   const unsigned int childCount = inParent.getChildNodes().getLength();
   if (inIndex < 1 || static_cast<unsigned int>(inIndex) >= childCount) return E_FAIL;
 
-  // Only changes inside the loaded document are seen by the reader's index.
+  // The reader's index notices changes in the loaded document only.
   ZORClashDocumentIndex ownIndex;
-  const bool ours = !root_.isNull() && inParent.getOwnerDocument() == root_.getOwnerDocument() &&
-                    IsInDocument(inParent);
-  ZORClashDocumentIndex& index = ours ? *index_ : ownIndex;
-  if (ours) index.Refresh(root_);
+  const bool isOurs = !root_.isNull() &&
+                      adapter::AreSame(inParent.getOwnerDocument(), root_.getOwnerDocument()) &&
+                      IsInDocument(inParent);
+  ZORClashDocumentIndex& index = isOurs ? ZORClashDocumentIndex::Of(*this, root_) : ownIndex;
   const auto& children = index.NamedChildren(inParent, inName);
   if (static_cast<std::size_t>(inIndex) > children.size()) return E_FAIL;
   outNode = children[static_cast<std::size_t>(inIndex) - 1];
@@ -148,20 +155,15 @@ HRESULT ZORClashParsing::GetValideNode(DOM_Node inParent, int inIndex, ZORUnicod
 }
 
 int ZORClashParsing::IsValideNode(int inPosition, ZORUnicodeString inName) {
-  return IsElementNamed(ComponentAt(inPosition), inName) ? 1 : 0;
+  return IsElementNamed(ChildAt(root_, inPosition), inName) ? 1 : 0;
 }
 
 int ZORClashParsing::IsValideNode(int inPosition, int, ZORUnicodeString) {
   bool found = false;
-  ForEachElement(ComponentAt(inPosition), names::ComponentShapes, [&](const DOM_Node& inShapes) {
+  ForEachElement(ChildAt(root_, inPosition), names::ComponentShapes, [&](const DOM_Node& inShapes) {
     found = found || !FirstElement(inShapes, names::ComponentShape).isNull();
   });
   return found ? 1 : 0;
-}
-
-// A null node outside the root's children.
-DOM_Node ZORClashParsing::ComponentAt(int inPosition) {
-  return root_.getChildNodes().item(static_cast<unsigned int>(inPosition));
 }
 
 // ---- Attributes of the root, and errors
@@ -192,14 +194,14 @@ ZORUnicodeString ZORClashParsing::GetAttrOnNode(DOM_Node inNode, const char* inN
   return ZORLyraGeneralServices::GetAttrOnNode(std::move(inNode), inName);
 }
 
-// -1.0 where there is no number: placements of interferences show by it what they lack.
+// -1.0 when there is no number, which marks incomplete placements.
 double ZORClashParsing::GetAttrDoubleOnNode(DOM_Node inNode, const char* inName) {
   double value = 0.0;
   const ZORUnicodeString text = GetAttrOnNode(std::move(inNode), inName);
   return text.ConvertToNum(&value, "%le") != 0 ? value : -1.0;
 }
 
-// 0.0 where there is no number, unlike above: components take it as no offset.
+// 0.0 when there is no number, unlike above: no offset.
 double ZORClashParsing::TransDouble(DOM_NamedNodeMap inAttributes, char* inName) {
   double value = 0.0;
   const DOMString text = inAttributes.getNamedItem(inName).getNodeValue();

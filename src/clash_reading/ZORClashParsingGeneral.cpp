@@ -1,18 +1,17 @@
-// General information, interferences by number, attributes of components.
+// General information, and interferences by number.
 #include "ZORClashParsing.h"
 #include "ZORLyraGeneralServices.h"
-#include "clash_reading/DeclaredCount.h"
-#include "clash_reading/ElementWalk.h"
+#include "clash_reading/ClashElements.h"
 #include "clash_reading/NamedConstants.h"
 #include "clash_reading/ZORClashDocumentIndex.h"
 #include "platform/system/ZORSettingRepository.h"
 
 namespace {
 
-// The setting "PublishDefDir" replaces the ".." of a picture reference; unset, it is the empty
-// text.
+// A missing setting reads as the empty text, which removes the "..".
 void ReplaceParentByPublishDirectory(ZORUnicodeString& ioPicture) {
-  ZORSettingRepository* settings = ZORSettingRepository::GetRepository("ClashPublish");
+  ZORSettingRepository* const settings =
+      ZORSettingRepository::GetRepository("ClashPublish", 0, 1, nullptr);
   if (!settings) return;
   ZORString directory;
   settings->ReadSetting("PublishDefDir", &directory);
@@ -64,8 +63,7 @@ HRESULT ZORClashParsing::GetithInterference(int inIndex, DOM_Node& outInterferen
                                             ZORUnicodeString& outSecondLabel,
                                             ZORUnicodeString& outFirstPreview,
                                             ZORUnicodeString& outSecondPreview) {
-  index_->Refresh(root_);
-  const auto& interferences = index_->Interferences();
+  const auto& interferences = ZORClashDocumentIndex::Of(*this, root_).Interferences();
   if (inIndex < 1 || static_cast<std::size_t>(inIndex) > interferences.size()) return E_FAIL;
   const DOM_Node& interference = interferences[static_cast<std::size_t>(inIndex) - 1];
   outInterference = interference.cloneNode(true);
@@ -83,29 +81,91 @@ void ZORClashParsing::GetClashPreviewURL(int inIndex, ZORUnicodeString& outPictu
     return;
   }
   if (inIndex < 1) return;
-  index_->Refresh(root_);
+  const std::size_t rank = static_cast<std::size_t>(inIndex) - 1;
   for (const DOM_Node& interference :
-       index_->InterferencesAtRank(static_cast<std::size_t>(inIndex) - 1))
+       ZORClashDocumentIndex::Of(*this, root_).InterferencesAtRank(rank))
     GetInterferenceData(interference, outPicture);
 }
 
-ZORUnicodeString ZORClashParsing::GetAttrValue(int inPosition, ZORUnicodeString inName) {
-  const DOM_Node component = ComponentAt(inPosition);
-  ZORUnicodeString value;
-  bool found = false;
-  ForEachElement(component, names::ComponentAttributes, [&](const DOM_Node& inAttributes) {
-    DOM_Node attribute = inAttributes.getFirstChild();
-    for (; !found && !attribute.isNull(); attribute = attribute.getNextSibling()) {
-      if (!IsElementNamed(attribute, names::ComponentAttribute) ||
-          GetAttrOnNode(attribute, names::Name.ConvertToChar()) != inName)
-        continue;
-      value = GetAttrOnNode(attribute, names::AttrValue.ConvertToChar());
-      found = true;
-    }
-  });
-  return value;
+void ZORClashParsing::GetClashInfos(int inIndex, ZORUnicodeString& outValue,
+                                    ZORUnicodeString& outResultType, ZORUnicodeString& outRuleName,
+                                    ZORUnicodeString& outFirstAlias,
+                                    ZORUnicodeString& outSecondAlias) {
+  outFirstAlias = ZORUnicodeString();
+  outSecondAlias = ZORUnicodeString();
+  const auto& interferences = ZORClashDocumentIndex::Of(*this, root_).Interferences();
+  if (inIndex < 1 || static_cast<std::size_t>(inIndex) > interferences.size()) return;
+  GetInterferenceData(interferences[static_cast<std::size_t>(inIndex) - 1], outValue, outResultType,
+                      outRuleName, outFirstAlias, outSecondAlias);
 }
 
-ZORUnicodeString ZORClashParsing::GetCompoAttr(int inPosition, ZORUnicodeString inName) {
-  return GetAttrOnNode(ComponentAt(inPosition), inName.ConvertToChar());
+void ZORClashParsing::GetClashInfos(
+    ZORUnicodeString inVersion, int inIndex, ZORUnicodeString& outResultName,
+    ZORUnicodeString& outResultType, ZORUnicodeString& outClearance, ZORUnicodeString& outStatus,
+    ZORUnicodeString& outComputationType, ZORUnicodeString& outRetrieve,
+    ZORUnicodeString& outRuleName, ZORUnicodeString& outRuleClearance,
+    ZORUnicodeString& outFirstDescriptionId, ZORUnicodeString& outSecondDescriptionId,
+    ZORUnicodeString& outFirstProcessMode, ZORUnicodeString& outSecondProcessMode,
+    ZORUnicodeString& outComment, ZORUnicodeString& outFirstAlien, ZORUnicodeString& outSecondAlien,
+    ZORUnicodeString& outFirstDescriptionIdAgain, ZORUnicodeString& outSecondDescriptionIdAgain,
+    ZORUnicodeString& outFirstInstance, ZORUnicodeString& outSecondInstance,
+    ZORUnicodeString& outFirstShapeName, ZORUnicodeString& outSecondShapeName,
+    ZORUnicodeString& outFirstShapeSource, ZORUnicodeString& outSecondShapeSource,
+    ZORUnicodeString& outSeverity, ZORUnicodeString& outPenetrationCandidate,
+    ZORUnicodeString& outCurveLength, ZORUnicodeString& outDistance, ZORUnicodeString& outReserved,
+    ZORUnicodeString& outPoints, ZORUnicodeString& outFocusDistance, ZORUnicodeString& outNearPlane,
+    ZORUnicodeString& outFarPlane, ZORUnicodeString& outProjection, ZORUnicodeString& outViewpointX,
+    ZORUnicodeString& outViewpointY, ZORUnicodeString& outViewpointZ, ZORUnicodeString& outSightX,
+    ZORUnicodeString& outSightY, ZORUnicodeString& outSightZ, ZORUnicodeString& outSecondVectorX,
+    ZORUnicodeString& outSecondVectorY, ZORUnicodeString& outSecondVectorZ) {
+  outFirstDescriptionId = ZORUnicodeString();
+  outSecondDescriptionId = ZORUnicodeString();
+  outFirstAlien = ZORUnicodeString();
+  outSecondAlien = ZORUnicodeString();
+
+  const auto read = [&](const DOM_Node& inInterference) {
+    GetInterferenceDataV12(
+        inInterference, outResultType, outClearance, outStatus, outComputationType, outRetrieve,
+        outRuleName, outRuleClearance, outFirstDescriptionId, outSecondDescriptionId,
+        outFirstProcessMode, outSecondProcessMode, outComment, outFirstAlien, outSecondAlien,
+        outFirstDescriptionIdAgain, outSecondDescriptionIdAgain, outFirstInstance,
+        outSecondInstance, outFirstShapeName, outSecondShapeName, outFirstShapeSource,
+        outSecondShapeSource, outSeverity, outPenetrationCandidate, outCurveLength, outDistance,
+        outReserved, outPoints, outFocusDistance, outNearPlane, outFarPlane, outProjection,
+        outViewpointX, outViewpointY, outViewpointZ, outSightX, outSightY, outSightZ,
+        outSecondVectorX, outSecondVectorY, outSecondVectorZ);
+  };
+  const auto preferRuleClearance = [&] {
+    if (outRuleClearance.GetLengthInChar() != 0) outClearance = outRuleClearance;
+  };
+
+  if (documentKind_ != "ClashElement") {
+    outResultName = ZORUnicodeString();
+    const DOM_Node interference = FirstElement(root_, "Interference");
+    if (interference.isNull()) return;
+    read(interference);
+    preferRuleClearance();
+    return;
+  }
+
+  ZORClashDocumentIndex& index = ZORClashDocumentIndex::Of(*this, root_);
+  const auto nameResultSet = [&](const DOM_Node& inResultSet) {
+    outResultName = GetAttrOnNode(inResultSet, names::Name.ConvertToChar());
+    outComputationType = GetAttrOnNode(inResultSet, "ComputationCase");
+  };
+  const auto& resultSets = index.ResultSets();
+  const auto& interferences = index.Interferences();
+  if (resultSets.empty()) return;
+  // Hosts rely on the last result set naming the result, whichever set the interference is in.
+  if (inIndex < 1 || static_cast<std::size_t>(inIndex) > interferences.size()) {
+    nameResultSet(resultSets.back());
+    return;
+  }
+  const std::size_t position = static_cast<std::size_t>(inIndex) - 1;
+  const DOM_Node& resultSet = index.ResultSetOf(position);
+  nameResultSet(resultSet);
+  if (inVersion == "1.2") read(interferences[position]);
+  preferRuleClearance();
+  // In the last set itself the interference's rule may have replaced the computation case.
+  if (&resultSet != &resultSets.back()) nameResultSet(resultSets.back());
 }

@@ -1,46 +1,69 @@
 // Everything about one "Interference" element.
 #include <string_view>
+#include <utility>
 
 #include "ZORClashParsing.h"
 #include "ZORLyraGeneralServices.h"
-#include "clash_reading/ElementWalk.h"
-#include "clash_reading/InterferenceWords.h"
+#include "clash_reading/ClashElements.h"
 #include "clash_reading/NamedConstants.h"
-#include "clash_reading/ZORClashDocumentIndex.h"
+#include "platform/system/ZORMsgCatalog.h"
 #include "platform/system/ZORToken.h"
-#include "platform/xml/DOM_NamedNodeMap.h"
 
 namespace {
 
 constexpr std::u16string_view kPathSeparator = u" --++-- ";
 constexpr const char* kManagedByPdm = "KORVAPDM";
 
-std::u16string_view UnitsOf(const ZORUnicodeString& inText) {
-  return {inText.ConvertToUCChar(), static_cast<std::size_t>(inText.GetLengthInChar())};
-}
-
-// What an element says in its attributes, asked for once for all that are read of it.
-class ElementAttributes {
+/// Translates words in the writer's language to fixed ones by the message catalogue, which is
+/// loaded on construction. If it cannot be loaded, all of its texts are empty.
+class InterferenceWords {
  public:
-  explicit ElementAttributes(const DOM_Node& inElement) : attributes_(inElement.getAttributes()) {}
+  InterferenceWords() : isLoaded_(catalogue_.LoadMsgCatalog("ZORLyraITFClashDialog3") == 1) {}
 
-  // Empty where the attribute is missing.
-  ZORUnicodeString Text(const char* inName) const {
-    return ZORLyraGeneralServices::GetDOMName(attributes_.getNamedItem(inName).getNodeValue());
+  /// "ResultTypeNoNLS" as it stands where present; else "ResultType" as "Clash", "Contact",
+  /// "Clearance" or "error".
+  ZORUnicodeString ResultType(const DOM_Node& inInterference) const {
+    const DOM_Node neutral = inInterference.getAttributes().getNamedItem("ResultTypeNoNLS");
+    if (!neutral.isNull()) return ZORLyraGeneralServices::GetDOMName(neutral.getNodeValue());
+    const ZORUnicodeString word =
+        Stripped(ZORLyraGeneralServices::GetAttrOnNode(inInterference, "ResultType"));
+    for (const auto& [type, allLanguages] :
+         {std::pair("Clash", "ClashAllLanguages"), std::pair("Contact", "ContactAllLanguages"),
+          std::pair("Clearance", "ClearanceAllLanguages")}) {
+      if (Word(allLanguages).SearchSubString(word, 0, adapter::kSearchForward) >= 0 ||
+          word == Word(type))
+        return type;
+    }
+    return "error";
   }
-  ZORUnicodeString Text(const ZORUnicodeString& inName) const {
-    return Text(inName.ConvertToChar());
+  /// "Relevant", "Irrelevant", "Not inspected" or "error".
+  ZORUnicodeString Status(const ZORUnicodeString& inText) const {
+    const ZORUnicodeString word = Stripped(inText);
+    if (word == Word("Relevant")) return "Relevant";
+    if (word == Word("Irrelevant")) return "Irrelevant";
+    if (word == Word("NotInspected")) return "Not inspected";
+    return "error";
   }
-  // An attribute that holds a number, with its decimal comma made a point. Only the first comma is
-  // one.
-  ZORUnicodeString Number(const char* inName) const {
-    ZORUnicodeString text = Text(inName);
-    if (UnitsOf(text).find(u',') != std::u16string_view::npos) text.ReplaceSubString(",", ".");
-    return text;
+  /// "Old", "New" or the text without surrounding spaces.
+  ZORUnicodeString Retrieve(const ZORUnicodeString& inText) const {
+    const ZORUnicodeString word = Stripped(inText);
+    if (word == Word("Old")) return "Old";
+    if (word == Word("New")) return "New";
+    return word;
   }
 
  private:
-  DOM_NamedNodeMap attributes_;
+  static ZORUnicodeString Stripped(const ZORUnicodeString& inText) {
+    return inText.Strip(adapter::kStripBothEnds, ZORUnicodeChar(' '));
+  }
+  /// The catalogue's word for a key, in the current language.
+  ZORUnicodeString Word(const char* inKey) const {
+    if (!isLoaded_) return ZORUnicodeString();
+    return Stripped(catalogue_.GetCatalogMsg(inKey).BuildMessage());
+  }
+
+  ZORMsgCatalog catalogue_;
+  bool isLoaded_;
 };
 
 void AppendPoint(const DOM_Node& inPoint, ZORUnicodeString& ioPoints) {
@@ -53,8 +76,8 @@ void AppendPoint(const DOM_Node& inPoint, ZORUnicodeString& ioPoints) {
   ioPoints += attributes.Number("Uz");
 }
 
-// The last segment of a path; empty where a segment is empty or holds a line feed, since there the
-// platform's tokenizer decides.
+// The last segment of a path; empty if a segment is empty or holds a line feed, where the result
+// depends on the platform's tokenizer.
 std::u16string_view LastPlainSegment(std::u16string_view inPath) {
   if (inPath.find(u'\n') != std::u16string_view::npos) return {};
   for (std::size_t end = 0; (end = inPath.find(kPathSeparator)) != std::u16string_view::npos;) {
@@ -64,110 +87,19 @@ std::u16string_view LastPlainSegment(std::u16string_view inPath) {
   return inPath;
 }
 
-// Replaces every separator by a line feed, in one pass: texts may hold many.
-ZORUnicodeString SegmentsAsLines(const ZORUnicodeString& inIdentifier) {
-  ZORUnicodeString separator;
-  separator.BuildFromUTF16(kPathSeparator.data(), kPathSeparator.size());
+// Every separator replaced by a line feed, in one pass: a text may hold many.
+ZORUnicodeString SegmentsAsLines(std::u16string_view inPath) {
   ZORUnicodeString lines;
-  int from = 0;
-  for (int at = inIdentifier.SearchSubString(separator); at >= 0;
-       at = inIdentifier.SearchSubString(separator, from)) {
-    lines.AppendUTF16(inIdentifier.ConvertToUCChar() + from, static_cast<std::size_t>(at - from));
-    lines += "\n";
-    from = at + separator.GetLengthInChar();
+  for (std::size_t end = 0; (end = inPath.find(kPathSeparator)) != std::u16string_view::npos;) {
+    adapter::AppendUnits(lines, inPath.substr(0, end));
+    lines.Append("\n");
+    inPath.remove_prefix(end + kPathSeparator.size());
   }
-  return from == 0 ? inIdentifier : lines.Append(inIdentifier.SubString(from));
+  adapter::AppendUnits(lines, inPath);
+  return lines;
 }
 
 }  // namespace
-
-// ---- Finding an interference
-
-void ZORClashParsing::GetClashInfos(int inIndex, ZORUnicodeString& outValue,
-                                    ZORUnicodeString& outResultType, ZORUnicodeString& outRuleName,
-                                    ZORUnicodeString& outFirstAlias,
-                                    ZORUnicodeString& outSecondAlias) {
-  outFirstAlias = ZORUnicodeString();
-  outSecondAlias = ZORUnicodeString();
-  index_->Refresh(root_);
-  const auto& interferences = index_->Interferences();
-  if (inIndex < 1 || static_cast<std::size_t>(inIndex) > interferences.size()) return;
-  GetInterferenceData(interferences[static_cast<std::size_t>(inIndex) - 1], outValue, outResultType,
-                      outRuleName, outFirstAlias, outSecondAlias);
-}
-
-void ZORClashParsing::GetClashInfos(
-    ZORUnicodeString inVersion, int inIndex, ZORUnicodeString& outResultName,
-    ZORUnicodeString& outResultType, ZORUnicodeString& outClearance, ZORUnicodeString& outStatus,
-    ZORUnicodeString& outComputationType, ZORUnicodeString& outRetrieve,
-    ZORUnicodeString& outRuleName, ZORUnicodeString& outRuleClearance,
-    ZORUnicodeString& outFirstDescriptionId, ZORUnicodeString& outSecondDescriptionId,
-    ZORUnicodeString& outFirstProcessMode, ZORUnicodeString& outSecondProcessMode,
-    ZORUnicodeString& outComment, ZORUnicodeString& outFirstAlien, ZORUnicodeString& outSecondAlien,
-    ZORUnicodeString& outFirstDescriptionIdAgain, ZORUnicodeString& outSecondDescriptionIdAgain,
-    ZORUnicodeString& outFirstInstance, ZORUnicodeString& outSecondInstance,
-    ZORUnicodeString& outFirstShapeName, ZORUnicodeString& outSecondShapeName,
-    ZORUnicodeString& outFirstShapeSource, ZORUnicodeString& outSecondShapeSource,
-    ZORUnicodeString& outSeverity, ZORUnicodeString& outPenetrationCandidate,
-    ZORUnicodeString& outCurveLength, ZORUnicodeString& outDistance, ZORUnicodeString& outReserved,
-    ZORUnicodeString& outPoints, ZORUnicodeString& outFocusDistance, ZORUnicodeString& outNearPlane,
-    ZORUnicodeString& outFarPlane, ZORUnicodeString& outProjection, ZORUnicodeString& outViewpointX,
-    ZORUnicodeString& outViewpointY, ZORUnicodeString& outViewpointZ, ZORUnicodeString& outSightX,
-    ZORUnicodeString& outSightY, ZORUnicodeString& outSightZ, ZORUnicodeString& outSecondVectorX,
-    ZORUnicodeString& outSecondVectorY, ZORUnicodeString& outSecondVectorZ) {
-  outFirstDescriptionId = ZORUnicodeString();
-  outSecondDescriptionId = ZORUnicodeString();
-  outFirstAlien = ZORUnicodeString();
-  outSecondAlien = ZORUnicodeString();
-
-  const auto read = [&](const DOM_Node& inInterference) {
-    GetInterferenceDataV12(
-        inInterference, outResultType, outClearance, outStatus, outComputationType, outRetrieve,
-        outRuleName, outRuleClearance, outFirstDescriptionId, outSecondDescriptionId,
-        outFirstProcessMode, outSecondProcessMode, outComment, outFirstAlien, outSecondAlien,
-        outFirstDescriptionIdAgain, outSecondDescriptionIdAgain, outFirstInstance,
-        outSecondInstance, outFirstShapeName, outSecondShapeName, outFirstShapeSource,
-        outSecondShapeSource, outSeverity, outPenetrationCandidate, outCurveLength, outDistance,
-        outReserved, outPoints, outFocusDistance, outNearPlane, outFarPlane, outProjection,
-        outViewpointX, outViewpointY, outViewpointZ, outSightX, outSightY, outSightZ,
-        outSecondVectorX, outSecondVectorY, outSecondVectorZ);
-  };
-  const auto preferRuleClearance = [&] {
-    if (outRuleClearance.GetLengthInChar() != 0) outClearance = outRuleClearance;
-  };
-
-  if (documentKind_ != "ClashElement") {
-    outResultName = ZORUnicodeString();
-    const DOM_Node interference = FirstElement(root_, "Interference");
-    if (interference.isNull()) return;
-    read(interference);
-    preferRuleClearance();
-    return;
-  }
-
-  index_->Refresh(root_);
-  if (index_->ResultSets().empty()) return;
-  // Hosts rely on the last result set naming the result whichever set the interference is in. Where
-  // that set is the interference's own, its rule still replaces the computation case.
-  const auto nameLastResultSet = [&] {
-    const DOM_Node& resultSet = index_->ResultSets().back();
-    outResultName = GetAttrOnNode(resultSet, names::Name.ConvertToChar());
-    outComputationType = GetAttrOnNode(resultSet, "ComputationCase");
-  };
-  const auto& interferences = index_->Interferences();
-  if (inIndex < 1 || static_cast<std::size_t>(inIndex) > interferences.size()) {
-    nameLastResultSet();
-    return;
-  }
-  const std::size_t position = static_cast<std::size_t>(inIndex) - 1;
-  const bool inLast = index_->IsInLastResultSet(position);
-  if (inLast) nameLastResultSet();
-  if (inVersion == "1.2") read(interferences[position]);
-  preferRuleClearance();
-  if (!inLast) nameLastResultSet();
-}
-
-// ---- Reading one interference
 
 void ZORClashParsing::GetInterferenceDataV12(
     DOM_Node inInterference, ZORUnicodeString& outResultType, ZORUnicodeString& outClearance,
@@ -205,23 +137,26 @@ void ZORClashParsing::GetInterferenceDataV12(
     outSeverity = rule.Text("Severity");
     outPenetrationCandidate = rule.Text("PenetrationCandidate");
   };
-  // The first product leaves its Alien flag filled, and that is how the second is told from it.
+  // A filled Alien flag means that the first product has been read. Hosts may pass one string for
+  // two outputs, so everything is read before the outputs are filled, in this order.
   const auto readProduct = [&](const DOM_Node& inProduct) {
     const ElementAttributes product(inProduct);
     const bool first = ioFirstAlien.GetLengthInChar() == 0;
-    const ZORUnicodeString identifier = product.Text("DescriptionID");
+    ZORUnicodeString identifier = product.Text("DescriptionID");
     ZORUnicodeString alien = product.Text(names::Alien);
     if (alien.GetLengthInChar() == 0) alien = "YES";
-    const ZORUnicodeString processMode = product.Text("ProcessMode");
-    (first ? outFirstInstance : outSecondInstance) = processMode == kManagedByPdm
-                                                         ? product.Text(names::Alias)
-                                                         : GetInstanceNameFromDID(identifier);
+    ZORUnicodeString processMode = product.Text("ProcessMode");
+    ZORUnicodeString shapeName = product.Text(names::ShapeName);
+    ZORUnicodeString shapeSource = product.Text("ShapeSource");
+    ZORUnicodeString instance = processMode == kManagedByPdm ? product.Text(names::Alias)
+                                                             : GetInstanceNameFromDID(identifier);
     (first ? outFirstDescriptionId : outSecondDescriptionId) = identifier;
-    (first ? ioFirstAlien : outSecondAlien) = alien;
-    (first ? outFirstShapeSource : outSecondShapeSource) = product.Text("ShapeSource");
-    (first ? outFirstDescriptionIdAgain : outSecondDescriptionIdAgain) = identifier;
-    (first ? outFirstProcessMode : outSecondProcessMode) = processMode;
-    (first ? outFirstShapeName : outSecondShapeName) = product.Text(names::ShapeName);
+    (first ? ioFirstAlien : outSecondAlien) = std::move(alien);
+    (first ? outFirstShapeSource : outSecondShapeSource) = std::move(shapeSource);
+    (first ? outFirstDescriptionIdAgain : outSecondDescriptionIdAgain) = std::move(identifier);
+    (first ? outFirstInstance : outSecondInstance) = std::move(instance);
+    (first ? outFirstProcessMode : outSecondProcessMode) = std::move(processMode);
+    (first ? outFirstShapeName : outSecondShapeName) = std::move(shapeName);
   };
   const auto readViewpoint = [&](const DOM_Node& inViewpoint) {
     const ElementAttributes viewpoint(inViewpoint);
@@ -235,8 +170,7 @@ void ZORClashParsing::GetInterferenceDataV12(
       outViewpointY = point.Number("Uy");
       outViewpointZ = point.Number("Uz");
     });
-    // No document carries a second vector under another name: the last three outputs stay the
-    // caller's.
+    // There is no second vector: the last three outputs keep the caller's texts.
     ForEachElement(inViewpoint, "Vector", [&](const DOM_Node& inVector) {
       const ElementAttributes vector(inVector);
       if (vector.Text("CorrespondingData") != "Sight") return;
@@ -261,13 +195,13 @@ void ZORClashParsing::GetInterferenceDataV12(
   ForEachChild(inInterference, [&](const DOM_Node& inChild) {
     if (inChild.getNodeType() != DOM_Node::ELEMENT_NODE) return;
     const DOMString name = inChild.getNodeName();
-    if (IsText(name, "ViolatedRule"))
+    if (adapter::IsText(name, "ViolatedRule"))
       readRule(inChild);
-    else if (IsText(name, "Product"))
+    else if (adapter::IsText(name, "Product"))
       readProduct(inChild);
-    else if (IsText(name, "GeometricAspect"))
+    else if (adapter::IsText(name, "GeometricAspect"))
       readGeometry(inChild);
-    else if (IsText(name, "Comment"))
+    else if (adapter::IsText(name, "Comment"))
       outComment = GetAttrOnNode(inChild, "Value");
   });
 }
@@ -320,8 +254,7 @@ void ZORClashParsing::GetInterferenceData(DOM_Node inInterference, ZORUnicodeStr
     return ZORMathVector(GetAttrDoubleOnNode(inNode, inX), GetAttrDoubleOnNode(inNode, inY),
                          GetAttrDoubleOnNode(inNode, inZ));
   };
-  // Without "Matrix" everything stays zero: no rotation at all, which tells it from a placement at
-  // the origin.
+  // All zeros without a "Matrix", not the identity: callers recognise a missing placement by it.
   const auto readPosition = [&](const DOM_Node& inProduct) {
     ZORMathVector translation, columns[3];
     ForEachElement(inProduct, "Matrix", [&](const DOM_Node& inMatrix) {
@@ -355,12 +288,12 @@ void ZORClashParsing::GetInterferenceData(DOM_Node inInterference, ZORUnicodeStr
 
 ZORUnicodeString ZORClashParsing::GetInstanceNameFromDID(ZORUnicodeString inDescriptionId) {
   ZORUnicodeString last;
-  if (const std::u16string_view plain = LastPlainSegment(UnitsOf(inDescriptionId));
-      !plain.empty()) {
+  const std::u16string_view path = adapter::UnitsOf(inDescriptionId);
+  if (const std::u16string_view plain = LastPlainSegment(path); !plain.empty()) {
     last.BuildFromUTF16(plain.data(), plain.size());
     return last;
   }
-  ZORToken segments(SegmentsAsLines(inDescriptionId));
+  ZORToken segments(SegmentsAsLines(path));
   for (ZORUnicodeString segment = segments.GetNextToken("\n"); segment.GetLengthInChar() != 0;
        segment = segments.GetNextToken("\n"))
     last = segment;

@@ -4,8 +4,7 @@
 
 #include "ZORClashParsing.h"
 #include "ZORLyraGeneralServices.h"
-#include "clash_reading/DeclaredCount.h"
-#include "clash_reading/ElementWalk.h"
+#include "clash_reading/ClashElements.h"
 
 namespace {
 void Trace(ZORUnicodeString& ioTrace, const char* inMessage) {
@@ -13,20 +12,16 @@ void Trace(ZORUnicodeString& ioTrace, const char* inMessage) {
   ioTrace.Append("\n");
 }
 
-// Visits the child elements of a name that are there now. Those that a visit appends are not
-// visited, so that merging a document with itself ends.
+// Calls inVisit for the child elements of a name, but not for those that a visit appends, so that
+// merging a document with itself ends.
 template <class Visit>
-void ForEachElementOfNow(const DOM_Node& inParent, const char* inName, const Visit& inVisit) {
-  const DOM_Node last = inParent.getLastChild();
-  bool isLast = last.isNull();
-  for (DOM_Node child = inParent.getFirstChild(); !isLast; child = child.getNextSibling()) {
-    isLast = child == last;
+void ForEachPresentElement(const DOM_Node& inParent, const char* inName, const Visit& inVisit) {
+  unsigned int left = inParent.getChildNodes().getLength();
+  for (DOM_Node child = inParent.getFirstChild(); left > 0; child = child.getNextSibling(), --left)
     if (IsElementNamed(child, inName)) inVisit(child);
-  }
 }
 
-// The first result set. Without one the root's last child takes its place, whatever it is: hosts
-// rely on it.
+// The first result set, or else the root's last child, whatever that is: hosts rely on it.
 DOM_Node FindResultSet(const DOM_Element& inRoot, int& outCount) {
   const DOM_Node resultSet = FirstElement(inRoot, "ClashResult");
   if (resultSet.isNull()) return inRoot.getLastChild();
@@ -37,10 +32,10 @@ DOM_Node FindResultSet(const DOM_Element& inRoot, int& outCount) {
 // Returns the declared number of the last result set: the numbers of several are not summed.
 int AppendInterferences(const DOM_Element& inRoot, DOM_Document& ioTarget, DOM_Node& ioResultSet) {
   int count = 0;
-  ForEachElementOfNow(inRoot, "ClashResult", [&](const DOM_Node& inSource) {
+  ForEachPresentElement(inRoot, "ClashResult", [&](const DOM_Node& inSource) {
     count = TruncatedDeclaredCount(inSource);
     if (ioResultSet.isNull()) return;
-    ForEachElementOfNow(inSource, "Interference", [&](const DOM_Node& inInterference) {
+    ForEachPresentElement(inSource, "Interference", [&](const DOM_Node& inInterference) {
       ioResultSet.appendChild(ioTarget.importNode(inInterference, true));
     });
   });
@@ -49,8 +44,8 @@ int AppendInterferences(const DOM_Element& inRoot, DOM_Document& ioTarget, DOM_N
 
 void AppendSpecifications(const DOM_Element& inRoot, DOM_Document& ioTarget,
                           DOM_Element& ioTargetRoot, DOM_Node& ioProducts) {
-  ForEachElementOfNow(inRoot, "ProductsInSpec", [&](const DOM_Node& inProducts) {
-    ForEachElementOfNow(inProducts, "Specification", [&](const DOM_Node& inSpecification) {
+  ForEachPresentElement(inRoot, "ProductsInSpec", [&](const DOM_Node& inProducts) {
+    ForEachPresentElement(inProducts, "Specification", [&](const DOM_Node& inSpecification) {
       if (ioProducts.isNull()) {
         ioProducts = ioTarget.importNode(inProducts, false);
         if (!ioTargetRoot.isNull()) ioTargetRoot.appendChild(ioProducts);
@@ -93,7 +88,7 @@ HRESULT ZORClashParsing::MergeDocuments(DOM_Document& ioFirst, DOM_Document& inS
   DOM_Node resultSet = FindResultSet(firstRoot, firstCount);
   Trace(ioTrace, "About to get productsInSpec Node of First Document");
   DOM_Node products = FirstElement(firstRoot, "ProductsInSpec");
-  // The nodes found so far stay those of the document that ioFirst referred to.
+  // The nodes found so far remain those of the original first document.
   if (resultSet.isNull() && !inSecond.isNull()) ioFirst = inSecond;
 
   Trace(ioTrace, "About to append interferences of Second Document to first Document");

@@ -1,35 +1,52 @@
 // Components, specification, linked documents, rebuilding a session.
-#include <utility>
-
 #include "ZORClashParsing.h"
 #include "ZORLyraGeneralServices.h"
-#include "clash_reading/ElementWalk.h"
+#include "clash_reading/ClashElements.h"
 #include "clash_reading/NamedConstants.h"
 #include "clash_reading/ZORClashDocumentIndex.h"
 
 int ZORClashParsing::GetNbProd() { return static_cast<int>(root_.getChildNodes().getLength()); }
 
 ZORUnicodeString ZORClashParsing::GetPrdId(int inPosition) {
-  return GetAttrOnNode(ComponentAt(inPosition), names::Alias.ConvertToChar());
+  return GetAttrOnNode(ChildAt(root_, inPosition), names::Alias.ConvertToChar());
 }
 
 ZORUnicodeString ZORClashParsing::GetPrdName(int inPosition) { return GetPrdId(inPosition); }
 
 ZORUnicodeString ZORClashParsing::GetPrdType(int inPosition) {
-  return GetAttrOnNode(ComponentAt(inPosition), names::ComponentType.ConvertToChar());
+  return GetAttrOnNode(ChildAt(root_, inPosition), names::ComponentType.ConvertToChar());
+}
+
+ZORUnicodeString ZORClashParsing::GetAttrValue(int inPosition, ZORUnicodeString inName) {
+  const DOM_Node component = ChildAt(root_, inPosition);
+  ZORUnicodeString value;
+  bool found = false;
+  ForEachElement(component, names::ComponentAttributes, [&](const DOM_Node& inAttributes) {
+    DOM_Node attribute = inAttributes.getFirstChild();
+    for (; !found && !attribute.isNull(); attribute = attribute.getNextSibling()) {
+      if (!IsElementNamed(attribute, names::ComponentAttribute) ||
+          GetAttrOnNode(attribute, names::Name.ConvertToChar()) != inName)
+        continue;
+      value = GetAttrOnNode(attribute, names::AttrValue.ConvertToChar());
+      found = true;
+    }
+  });
+  return value;
+}
+
+ZORUnicodeString ZORClashParsing::GetCompoAttr(int inPosition, ZORUnicodeString inName) {
+  return GetAttrOnNode(ChildAt(root_, inPosition), inName.ConvertToChar());
 }
 
 int ZORClashParsing::GetNbRealAttr(int inPosition) {
-  index_->Refresh(root_);
-  const DOM_Node component = ComponentAt(inPosition);
-  return static_cast<int>(index_->RealAttributes(component).size());
+  const DOM_Node component = ChildAt(root_, inPosition);
+  return static_cast<int>(ZORClashDocumentIndex::Of(*this, root_).RealAttributes(component).size());
 }
 
 void ZORClashParsing::GetSetOfRealAttr(int inPosition, int inNumber, ZORUnicodeString& outName,
                                        ZORUnicodeString& outType, ZORUnicodeString& outValue) {
-  index_->Refresh(root_);
-  const DOM_Node component = ComponentAt(inPosition);
-  const auto& attributes = index_->RealAttributes(component);
+  const DOM_Node component = ChildAt(root_, inPosition);
+  const auto& attributes = ZORClashDocumentIndex::Of(*this, root_).RealAttributes(component);
   if (inNumber < 1 || static_cast<std::size_t>(inNumber) > attributes.size()) return;
   const DOM_Node& attribute = attributes[static_cast<std::size_t>(inNumber) - 1];
   outName = GetAttrOnNode(attribute, names::Name.ConvertToChar());
@@ -38,23 +55,21 @@ void ZORClashParsing::GetSetOfRealAttr(int inPosition, int inNumber, ZORUnicodeS
 }
 
 int ZORClashParsing::GetNbShapes(int inPosition) {
-  index_->Refresh(root_);
-  const DOM_Node component = ComponentAt(inPosition);
-  return static_cast<int>(index_->Shapes(component).size());
+  const DOM_Node component = ChildAt(root_, inPosition);
+  return static_cast<int>(ZORClashDocumentIndex::Of(*this, root_).Shapes(component).size());
 }
 
 ZORUnicodeString ZORClashParsing::GetShapeAttrValue(int inPosition, int inShape,
                                                     ZORUnicodeString inName) {
-  index_->Refresh(root_);
-  const DOM_Node component = ComponentAt(inPosition);
-  const auto& shapes = index_->Shapes(component);
+  const DOM_Node component = ChildAt(root_, inPosition);
+  const auto& shapes = ZORClashDocumentIndex::Of(*this, root_).Shapes(component);
   if (inShape < 0 || static_cast<std::size_t>(inShape) >= shapes.size()) return ZORUnicodeString();
   return GetAttrOnNode(shapes[static_cast<std::size_t>(inShape)], inName.ConvertToChar());
 }
 
 void ZORClashParsing::GetPosition(int inPosition, double*& outPosition) {
   outPosition = new double[12];
-  const DOM_Node component = ComponentAt(inPosition);
+  const DOM_Node component = ChildAt(root_, inPosition);
   char ux[] = "Ux", uy[] = "Uy", uz[] = "Uz";
   const ZORUnicodeString* triples[] = {&names::Rx, &names::Ry, &names::Rz, &names::T};
   ForEachElement(component, names::ShapePosition, [&](const DOM_Node& inPlacement) {
@@ -73,8 +88,7 @@ void ZORClashParsing::GetPosition(int inPosition, double*& outPosition) {
 // ---- Specification
 
 void ZORClashParsing::GetSpecInfos(int& outCount) {
-  index_->Refresh(root_);
-  outCount = static_cast<int>(index_->Specifications().size());
+  outCount = static_cast<int>(ZORClashDocumentIndex::Of(*this, root_).Specifications().size());
 }
 
 void ZORClashParsing::GetProductsInSpec(
@@ -83,8 +97,7 @@ void ZORClashParsing::GetProductsInSpec(
     ZORUnicodeString& outSecondVersion, ZORUnicodeString& outFirstAlien,
     ZORUnicodeString& outSecondAlien, ZORUnicodeString& outFirstShapeName,
     ZORUnicodeString& outSecondShapeName) {
-  index_->Refresh(root_);
-  const auto& specifications = index_->Specifications();
+  const auto& specifications = ZORClashDocumentIndex::Of(*this, root_).Specifications();
   if (inNumber < 1 || static_cast<std::size_t>(inNumber) > specifications.size()) return;
   const DOM_Node& specification = specifications[static_cast<std::size_t>(inNumber) - 1];
 
@@ -133,7 +146,7 @@ void ZORClashParsing::GetReBuildSessionInfos(ZORListValZORUnicodeString& ioAlias
     int declared = 0;
     GetAttrOnNode(inResultSet, "NbInterf").ConvertToNum(&declared, "%d");
     if (declared < 1) return;
-    // An earlier result set's array is abandoned here: the caller is promised the last one.
+    // Abandons an earlier result set's array: the contract is that the caller gets the last.
     outPositions = new ZORMathTransformation[2 * static_cast<std::size_t>(declared)];
 
     int taken = 0;

@@ -1,6 +1,8 @@
-// Conversions between documents and texts, and lengths.
+// Conversions between documents and texts, lengths, logical names.
 #include "ZORLyraGeneralServices.h"
 
+#include "LogicalNames.h"
+#include "PlatformAdapter.h"
 #include "platform/knowledge/ZORParmDictionary.h"
 #include "platform/xml/DOM_NamedNodeMap.h"
 
@@ -9,7 +11,7 @@ namespace {
 constexpr double kUnreadable = -0.0001;  // in metres; scaled like every other result
 constexpr double kMillimetresPerMetre = 1000.0;
 
-// One code for points and vectors, which are written alike.
+// Points and vectors are written alike.
 template <class Triple>
 DOM_Element CoordinatesElement(const ZORUnicodeString& inName, DOM_Document inDocument,
                                const Triple& inTriple) {
@@ -79,4 +81,15 @@ double ZORLyraGeneralServices::ConvertValueInMM(ZORUnicodeString inValue) {
       unit->Decode(inValue.Append("mm"), length) == ZORCke::False)
     length = kUnreadable;
   return length * kMillimetresPerMetre;
+}
+
+// The scheme is assumed to stand at the start, wherever it was found.
+ZORUnicodeString ZORLyraGeneralServices::TransformFromDLName(ZORUnicodeString inName) {
+  if (inName.SearchSubString(kLogicalNameScheme, 0, adapter::kSearchForward) < 0)
+    return DirectoryOfLogicalName(inName);
+  return DirectoryOfPrefixedName(inName, kLogicalNameSchemeLength);
+}
+
+ZORUnicodeString ZORLyraGeneralServices::TransformPathnameFromDLName(ZORUnicodeString inReference) {
+  return PathOfReference(inReference);
 }

@@ -1,8 +1,8 @@
 // Storage identifiers of products, product trees, providers of documents.
 #include <memory>
-#include <utility>
 #include <vector>
 
+#include "PlatformAdapter.h"
 #include "ZORLyraGeneralServices.h"
 #include "platform/product_structure/ZORIAlias.h"
 #include "platform/product_structure/ZORILinkableObject.h"
@@ -18,64 +18,63 @@ constexpr int kVersionSeparatorLength = 8;
 constexpr char kPathSeparator[] = " --++-- ";
 constexpr int kShownRepresentation = 1;
 
-struct Releaser {
-  void operator()(ZORBaseUnknown* inComponent) const { inComponent->Release(); }
-};
-/// An interface that came with a reference, which goes with this pointer.
-template <class Interface>
-using Referenced = std::unique_ptr<Interface, Releaser>;
-
-/// An interface of a component; null when the component refuses it or gives nothing.
-template <class Interface>
-Referenced<Interface> Ask(ZORBaseUnknown& inComponent, const IID& inInterface, HRESULT& outResult) {
+/// Queries a component (a pointer or a handle) for an interface. Empty if the query fails or yields
+/// null. The reference that the query added is released at once: the handle holds its own.
+template <class Interface, class Component>
+ZORInterfaceHandle<Interface> Ask(const Component& inComponent, const IID& inInterface,
+                                  HRESULT& outResult) {
   void* found = nullptr;
-  outResult = inComponent.QueryInterface(inInterface, &found);
-  return Referenced<Interface>(SUCCEEDED(outResult) ? static_cast<Interface*>(found) : nullptr);
+  outResult = inComponent->QueryInterface(inInterface, &found);
+  if (FAILED(outResult) || !found) return ZORInterfaceHandle<Interface>();
+  auto* const component = static_cast<Interface*>(found);
+  const ZORInterfaceHandle<Interface> handle(component);
+  component->Release();
+  return handle;
 }
 
-bool HasNamedRepresentation(ZORIProductInSession& inSession) {
+bool HasNamedRepresentation(const ZORIProductInSession_var& inSession) {
   int state = 0;
   ZORUnicodeString name;
-  return inSession.GetRepresentationName(state, kShownRepresentation, name) == S_OK && name != "";
+  return inSession->GetRepresentationName(state, kShownRepresentation, name) == S_OK && name != "";
 }
 
-/// The answer counts, not the handle: a representation may not be loaded yet.
-bool HasRepresentation(ZORIProductInSession& inSession) {
+/// Success alone decides: the handle is null while a representation is not loaded.
+bool HasRepresentation(const ZORIProductInSession_var& inSession) {
   int state = 0;
   ZORBaseUnknown_var representation;
-  return SUCCEEDED(inSession.GetRepresentation(state, kShownRepresentation, representation));
+  return SUCCEEDED(inSession->GetRepresentation(state, kShownRepresentation, representation));
 }
 
-bool HasOwnRepresentation(ZORIProduct& inProduct) {
+bool HasOwnRepresentation(ZORIProduct* inProduct) {
   HRESULT result = E_FAIL;
   const auto session =
       Ask<ZORIProductInSession>(inProduct, ZORIProductInSession::ClassId(), result);
   if (result != S_OK) return false;
-  if (!session) ThrowErrorNullVar();
-  return ZORPrdNewVisuMode() == 0 ? HasNamedRepresentation(*session) : HasRepresentation(*session);
+  return ZORPrdNewVisuMode() == 0 ? HasNamedRepresentation(session) : HasRepresentation(session);
 }
 
-/// A product whose children are being expanded.
+/// A product and how many of its children have been expanded.
 struct Level {
-  Referenced<ZORIProduct> product;  // null for the product that the caller holds
+  ZORIProduct_var product;
   std::unique_ptr<ZORListValZORBaseUnknown_var> children;
   int done = 0;
 
   bool HasNext() const { return children && done < children->Size(); }
-  Referenced<ZORIProduct> Next() {
+  ZORIProduct_var Next() {
     const ZORBaseUnknown_var& child = (*children)[++done];
     HRESULT ignored = E_FAIL;
-    if (child.IsNull()) return nullptr;
-    return Ask<ZORIProduct>(*child.GetInterface(), ZORIProduct::ClassId(), ignored);
+    if (child.IsNull()) return ZORIProduct_var();
+    return Ask<ZORIProduct>(child, ZORIProduct::ClassId(), ignored);
   }
 };
 
-/// Lists the product itself where it counts, and takes its children.
-Level Enter(ZORIProduct& inProduct, ZORListValZORBaseUnknown_var& ioList) {
+/// Lists the product itself if it qualifies, and fetches its children.
+Level Enter(ZORIProduct* inProduct, ZORListValZORBaseUnknown_var& ioList) {
   Level level;
-  level.children.reset(inProduct.GetChildren("ZORIProduct"));
+  level.product = ZORIProduct_var(inProduct);
+  level.children.reset(inProduct->GetChildren("ZORIProduct"));
   if (!level.HasNext() || HasOwnRepresentation(inProduct))
-    ioList.Append(ZORBaseUnknown_var(&inProduct));
+    ioList.Append(ZORBaseUnknown_var(inProduct));
   return level;
 }
 
@@ -85,8 +84,9 @@ ZORListValZORUnicodeString AliasesToRoot(ZORIProduct_var inProduct) {
   for (ZORIAlias_var alias = inProduct; !alias.IsNull(); alias = inProduct) {
     aliases.Append(alias->GetAlias());
     const ZORISpecObject_var object = inProduct;
-    const Referenced<ZORISpecObject> father(object->GetFather());
-    inProduct = ZORISpecObject_var(father.get());
+    ZORISpecObject* const parent = object->GetFather();
+    inProduct = ZORISpecObject_var(parent);
+    if (parent) parent->Release();
   }
   return aliases;
 }
@@ -105,7 +105,7 @@ HRESULT ZORLyraGeneralServices::GetPDMIdDVFromStorageProdId(
   outPDMId = "";
   outDocumentVersionId = "";
   if (inStorageId.GetLengthInChar() == 0) return E_FAIL;
-  const int separator = inStorageId.SearchSubString(kVersionSeparator);
+  const int separator = inStorageId.SearchSubString(kVersionSeparator, 0, adapter::kSearchForward);
   if (separator < 0) {
     outPDMId = inStorageId;
     return S_OK;
@@ -116,18 +116,18 @@ HRESULT ZORLyraGeneralServices::GetPDMIdDVFromStorageProdId(
   return S_OK;
 }
 
-// With levels of its own instead of a call a level, so that a deep tree needs no deep stack.
+// Iterative, so that a deep tree does not need a deep call stack.
 void ZORLyraGeneralServices::Expand(ZORIProduct* inProduct, ZORListValZORBaseUnknown_var& ioList) {
   if (!inProduct) return;
   std::vector<Level> levels;
-  levels.push_back(Enter(*inProduct, ioList));
+  levels.push_back(Enter(inProduct, ioList));
   while (!levels.empty()) {
     if (!levels.back().HasNext()) {
       levels.pop_back();
-    } else if (Referenced<ZORIProduct> child = levels.back().Next()) {
-      levels.push_back(Enter(*child, ioList));
-      levels.back().product = std::move(child);
+      continue;
     }
+    const ZORIProduct_var child = levels.back().Next();
+    if (!child.IsNull()) levels.push_back(Enter(child.operator->(), ioList));
   }
 }
 
@@ -152,10 +152,9 @@ HRESULT ZORLyraGeneralServices::RegisterProvider(const IID& inInterface,
   if (providers.IsNull()) return E_FAIL;
 
   HRESULT result = E_FAIL;
-  const auto implemented = Ask<ZORBaseUnknown>(*inProvider.GetInterface(), inInterface, result);
-  if (!implemented) return E_FAIL;
-  const auto provider =
-      Ask<ZORBaseUnknown>(*inProvider.GetInterface(), ZORBaseUnknown::ClassId(), result);
-  if (!provider) return E_FAIL;
-  return providers->AddProvider(inInterface, provider.get());
+  const auto implemented = Ask<ZORBaseUnknown>(inProvider, inInterface, result);
+  if (implemented.IsNull()) return E_FAIL;
+  const auto provider = Ask<ZORBaseUnknown>(inProvider, ZORBaseUnknown::ClassId(), result);
+  if (provider.IsNull()) return E_FAIL;
+  return providers->AddProvider(inInterface, provider.operator->());
 }

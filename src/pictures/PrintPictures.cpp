@@ -7,6 +7,7 @@
 
 #include "BuildPath.h"
 #include "RepCapture.h"
+#include "Teardown.h"
 #include "pictures/ProductList.h"
 #include "platform/space_analysis/ZORISiSubInterference.h"
 #include "platform/system/ZORGetEnv.h"
@@ -24,32 +25,23 @@ constexpr unsigned int kOpaque = 255;
 constexpr int kAllProperties = 11;
 constexpr int kWholeGeometry = 5;
 constexpr int kColourProperty = 0;
-
-/// A viewpoint for as long as it is needed.
-class OwnViewpoint {
- public:
-  OwnViewpoint() = default;
-  ~OwnViewpoint() { viewpoint_->Release(); }
-  OwnViewpoint(const OwnViewpoint&) = delete;
-  OwnViewpoint& operator=(const OwnViewpoint&) = delete;
-  ZOR3DViewpoint* Get() const { return viewpoint_; }
-  ZOR3DViewpoint* operator->() const { return viewpoint_; }
-
- private:
-  ZOR3DViewpoint* const viewpoint_ = new ZOR3DViewpoint;
-};
+constexpr int kThumbnailWidth = 72, kThumbnailHeight = 50;  // whatever the main picture's size
 
 /// The representation of an interference with all its elements shown.
 ZORRep* TakeInterferenceRep(const ZORISiInterference_var& inInterference) {
-  int* const savedFlags = inInterference->GetFlags();
-  const int count = std::max(inInterference->GetElementCount(), 0);
-  const std::vector<int> allShown(static_cast<std::size_t>(count) + 1, 1);
-  inInterference->SetFlags(allShown.data());
+  std::unique_ptr<int[]> savedFlags(inInterference->GetFlags());
+  {
+    const int count = std::max(inInterference->GetElementCount(), 0);
+    const std::vector<int> allShown(static_cast<std::size_t>(count) + 1, 1);
+    inInterference->SetFlags(allShown.data());
+  }
   const ZORI3DGeoVisu_var visualised = inInterference;
-  if (visualised.IsNull()) return nullptr;  // the saved flags are neither given back nor freed
+  if (visualised.IsNull()) {
+    savedFlags.release();  // by contract neither restored nor freed
+    return nullptr;
+  }
   ZORRep* const rep = visualised->GetRep();
-  inInterference->SetFlags(savedFlags);
-  delete[] savedFlags;
+  inInterference->SetFlags(savedFlags.get());
   return rep;
 }
 
@@ -76,101 +68,133 @@ ZORUnicodeString SubInterferencePath(const ZORUnicodeString& inImagePath, int in
   const ZORUnicodeString tail = ZORUnicodeString("_SubItf_") + number;
   ZORUnicodeString path = inImagePath;
   while (path.ReplaceSubString(".png", tail) >= 0) continue;
-  return path.Append(".png");
+  path.Append(".png");
+  return path;
 }
 
-}  // namespace
+/// Finds the colour that is imposed on a product, as PrintPictures::RetrieveColor does.
+using ColourQuery = HRESULT (*)(ZORIProduct_var inProduct, int& outFound, unsigned int& outRed,
+                                unsigned int& outGreen, unsigned int& outBlue);
 
 /// A bag with a product's representation, which belongs to the product.
-class PrintPictures::ShownProduct {
+class ShownProduct {
  public:
-  ShownProduct(ZORLyraRepPathBuilder& ioBuilder, const ZORIProduct_var& inProduct,
-               const ZORUnicodeString& inPath)
-      : ShownProduct() {
+  void Build(ZORLyraRepPathBuilder& ioBuilder, const ZORIProduct_var& inProduct,
+             const ZORUnicodeString& inPath, ColourQuery inRetrieveColor) {
     bag_ = new ZOR3DBagRep;
     if (FAILED(ioBuilder.GetRepPathFromSpecObjV4(inProduct, inPath, path_)) || !path_) return;
     path_->Rewind();
     rep_ = path_->NextChildRep();
-    ImposeColour(inProduct);
-    if (rep_) bag_->AddChild(rep_);
+    ImposeColour(inProduct, inRetrieveColor);
+    if (!rep_) return;
+    bag_->AddChild(rep_);
+    isRepInBag_ = true;
   }
-  ~ShownProduct() {
+  void AddTo(ZOR3DBagRep* inTop) {
     if (!bag_) return;
-    if (rep_) bag_->RemoveChild(rep_);
-    bag_->Destroy();
+    inTop->AddChild(bag_);
+    top_ = inTop;
   }
-  ShownProduct(const ShownProduct&) = delete;
-  ShownProduct& operator=(const ShownProduct&) = delete;
+  /// Adds the steps that detach bag and representation and destroy the bag. Called before Build:
+  /// steps for what has not been built do nothing.
+  void AddSteps(Teardown& ioTeardown) {
+    ioTeardown.Add([this] {
+      if (top_) top_->RemoveChild(bag_);
+    });
+    ioTeardown.Add([this] {
+      if (isRepInBag_) bag_->RemoveChild(rep_);
+    });
+    ioTeardown.Add([this] {
+      if (bag_) bag_->Destroy();
+    });
+  }
 
   ZOR3DBagRep* GetBag() const { return bag_; }
   ZORRepPath* GetPath() const { return path_; }
 
  private:
-  /// What is built from here on is taken apart when an error is raised on the way.
-  ShownProduct() = default;
-
-  void ImposeColour(const ZORIProduct_var& inProduct) {
+  void ImposeColour(const ZORIProduct_var& inProduct, ColourQuery inRetrieveColor) {
     int found = 0;
     unsigned int red = 0, green = 0, blue = 0;
-    const HRESULT result = RetrieveColor(inProduct, found, red, green, blue);
+    const HRESULT result = inRetrieveColor(inProduct, found, red, green, blue);
     if (FAILED(result) || found != 1 || !rep_) return;
     rep_->SetColorRGBA(red, green, blue, kOpaque);
     rep_->SetInheritanceMode(kImposedColour);
   }
 
+  ZOR3DBagRep* top_ = nullptr;  // null until the bag is in it
   ZOR3DBagRep* bag_ = nullptr;
   ZORRepPath* path_ = nullptr;
   ZORRep* rep_ = nullptr;
+  bool isRepInBag_ = false;
 };
 
 /// The two products and the interference under one bag.
-class PrintPictures::Scene {
+class Scene {
  public:
-  Scene(const ZORIProduct_var& inFirst, const ZORUnicodeString& inFirstPath,
-        const ZORIProduct_var& inSecond, const ZORUnicodeString& inSecondPath,
-        const ZORISiInterference_var& inInterference)
-      : Scene() {
-    first_ = Show(inFirst, inFirstPath);
-    second_ = Show(inSecond, inSecondPath);
+  Scene() {
+    teardown_.Add([this] {
+      if (isInterferenceInTop_) top_->RemoveChild(interference_);
+    });
+    teardown_.Add([this] {
+      if (interference_) interference_->Destroy();
+    });
+    first_.AddSteps(teardown_);
+    second_.AddSteps(teardown_);
+    teardown_.Add([this] { top_->Destroy(); });
+  }
+
+  void Build(const ZORIProduct_var& inFirst, const ZORUnicodeString& inFirstPath,
+             const ZORIProduct_var& inSecond, const ZORUnicodeString& inSecondPath,
+             const ZORISiInterference_var& inInterference, ColourQuery inRetrieveColor) {
+    Show(first_, inFirst, inFirstPath, inRetrieveColor);
+    Show(second_, inSecond, inSecondPath, inRetrieveColor);
     if (!inInterference.IsNull()) interference_ = TakeInterferenceRep(inInterference);
-    if (first_) top_->AddChild(first_->GetBag());
-    if (second_) top_->AddChild(second_->GetBag());
-    if (interference_) top_->AddChild(interference_);
+    first_.AddTo(top_);
+    second_.AddTo(top_);
+    if (!interference_) return;
+    top_->AddChild(interference_);
+    isInterferenceInTop_ = true;
   }
-  ~Scene() {
-    if (interference_) {
-      top_->RemoveChild(interference_);
-      interference_->Destroy();
-    }
-    TakeOut(first_);
-    TakeOut(second_);
-    top_->Destroy();
-  }
-  Scene(const Scene&) = delete;
-  Scene& operator=(const Scene&) = delete;
+  /// Destroys everything but the products' representations. To be called at the end; see Teardown.
+  void TakeApart() { teardown_.Run(); }
 
   ZOR3DBagRep* GetTop() const { return top_; }
   ZOR3DRep* GetInterference() const { return static_cast<ZOR3DRep*>(interference_); }
 
  private:
-  Scene() = default;
-
-  std::unique_ptr<ShownProduct> Show(const ZORIProduct_var& inProduct,
-                                     const ZORUnicodeString& inPath) {
-    if (ZORI3DGeoVisu_var(inProduct).IsNull()) return nullptr;
-    return std::make_unique<ShownProduct>(builder_, inProduct, inPath);
-  }
-  void TakeOut(std::unique_ptr<ShownProduct>& ioProduct) {
-    if (!ioProduct) return;
-    top_->RemoveChild(ioProduct->GetBag());
-    ioProduct.reset();
+  void Show(ShownProduct& outShown, const ZORIProduct_var& inProduct,
+            const ZORUnicodeString& inPath, ColourQuery inRetrieveColor) {
+    if (!inProduct.IsNull() && !ZORI3DGeoVisu_var(inProduct).IsNull())
+      outShown.Build(builder_, inProduct, inPath, inRetrieveColor);
   }
 
   ZORLyraRepPathBuilder builder_{kLoadedOnly};
   ZOR3DBagRep* top_ = new ZOR3DBagRep;
-  std::unique_ptr<ShownProduct> first_, second_;
+  ShownProduct first_, second_;
   ZORRep* interference_ = nullptr;
+  bool isInterferenceInTop_ = false;
+  Teardown teardown_;
 };
+
+/// A viewpoint of one picture.
+class OwnViewpoint {
+ public:
+  OwnViewpoint() {
+    teardown_.Add([this] { viewpoint_->Release(); });
+  }
+  /// To be called at the end; see Teardown.
+  void Release() { teardown_.Run(); }
+
+  ZOR3DViewpoint* Get() const { return viewpoint_; }
+  ZOR3DViewpoint* operator->() const { return viewpoint_; }
+
+ private:
+  ZOR3DViewpoint* const viewpoint_ = new ZOR3DViewpoint;
+  Teardown teardown_;
+};
+
+}  // namespace
 
 void PrintPictures::GeneratePictures(ZORIProduct_var inFirst, ZORUnicodeString inFirstPath,
                                      ZORIProduct_var inSecond, ZORUnicodeString inSecondPath,
@@ -198,32 +222,34 @@ void PrintPictures::PrintListVisuToFile(ZORIProduct_var inFirst, ZORUnicodeStrin
                                         ZORUnicodeString inImagePath, ZORUnicodeString inFormat,
                                         int inWidth, int inHeight, int inViewMode,
                                         int inKeepBackground) {
-  const Scene scene(inFirst, inFirstPath, inSecond, inSecondPath, inInterference);
-  const OwnViewpoint viewpoint;
-  const bool isInterference = !inInterference.IsNull();
-  if (isInterference && inInterference->FillViewpoint(viewpoint.Get()) == 1) {
+  Scene scene;
+  scene.Build(inFirst, inFirstPath, inSecond, inSecondPath, inInterference, &RetrieveColor);
+  OwnViewpoint viewpoint;
+  const auto takeThroughViewpoint = [&] {
     TakeRepImage(scene.GetTop(), inImagePath, viewpoint.Get(), inFormat, inWidth, inHeight,
                  inViewMode, inKeepBackground);
-    return;
-  }
-  const std::unique_ptr<double[]> geometry(isInterference ? inInterference->GetGeometricResult()
-                                                          : nullptr);
-  if (!geometry || !scene.GetInterference()) {
-    TakeRepImage(scene.GetTop(), inImagePath, inFormat, inWidth, inHeight, inViewMode,
-                 inKeepBackground);
-    return;
-  }
-  const ZOR3DRep* const framed =
-      FramesInterferenceAlone() ? scene.GetInterference() : scene.GetTop();
-  viewpoint->Reframe(static_cast<float>(inWidth), static_cast<float>(inHeight), 1.0F, 1.0F,
-                     framed->GetShowBoundingElement());
-  TakeRepImage(scene.GetTop(), inImagePath, viewpoint.Get(), inFormat, inWidth, inHeight,
-               inViewMode, inKeepBackground);
-  if (AreSubInterferencesWanted()) {
-    constexpr int kThumbnailWidth = 72, kThumbnailHeight = 50;
-    PrintSubInterferenceImage(scene.GetTop(), inInterference, inImagePath, inFormat, inViewMode,
-                              inKeepBackground, kThumbnailWidth, kThumbnailHeight);
-  }
+  };
+  const auto draw = [&] {
+    const bool isInterference = !inInterference.IsNull();
+    if (isInterference && inInterference->FillViewpoint(viewpoint.Get()) == 1)
+      return takeThroughViewpoint();
+    const std::unique_ptr<double[]> geometry(isInterference ? inInterference->GetGeometricResult()
+                                                            : nullptr);
+    if (!geometry || !scene.GetInterference())
+      return TakeRepImage(scene.GetTop(), inImagePath, inFormat, inWidth, inHeight, inViewMode,
+                          inKeepBackground);
+    const ZOR3DRep* const framed =
+        FramesInterferenceAlone() ? scene.GetInterference() : scene.GetTop();
+    viewpoint->Reframe(static_cast<float>(inWidth), static_cast<float>(inHeight), 1.0F, 1.0F,
+                       framed->GetShowBoundingElement());
+    takeThroughViewpoint();
+    if (AreSubInterferencesWanted())
+      PrintSubInterferenceImage(scene.GetTop(), inInterference, inImagePath, inFormat, inViewMode,
+                                inKeepBackground, kThumbnailWidth, kThumbnailHeight);
+  };
+  draw();
+  viewpoint.Release();
+  scene.TakeApart();
 }
 
 void PrintPictures::PrintListVisuToFilePreview(ZORIProduct_var inProduct, ZORUnicodeString inPath,
@@ -232,11 +258,15 @@ void PrintPictures::PrintListVisuToFilePreview(ZORIProduct_var inProduct, ZORUni
                                                int inViewMode, int inKeepBackground) {
   if (inProduct.IsNull()) return;
   ZORLyraRepPathBuilder builder(kLoadedOnly);
-  std::unique_ptr<ZORRepPath> path;
-  const ShownProduct product(builder, inProduct, inPath);
+  std::unique_ptr<ZORRepPath> path;  // deleted before its builder
+  ShownProduct product;
+  Teardown teardown;
+  product.AddSteps(teardown);
+  product.Build(builder, inProduct, inPath, &RetrieveColor);
   path.reset(product.GetPath());
   TakeRepImage(product.GetBag(), inImagePath, inFormat, inWidth, inHeight, inViewMode,
                inKeepBackground);
+  teardown.Run();
 }
 
 void PrintPictures::TakeRepImage(ZORRep* inScene, ZORUnicodeString inImagePath,
@@ -251,7 +281,7 @@ void PrintPictures::TakeRepImage(ZORRep* inScene, ZORUnicodeString inImagePath,
   image->Release();
 }
 
-// A print image that gave no picture is left unreleased.
+// By contract a print image that could not be rasterised is not released.
 void PrintPictures::TakeRepImage(ZORRep* inScene, ZORUnicodeString inImagePath,
                                  ZOR3DViewpoint* inViewpoint, ZORUnicodeString inFormat,
                                  int inWidth, int inHeight, int inViewMode, int inKeepBackground) {
@@ -262,20 +292,20 @@ void PrintPictures::TakeRepImage(ZORRep* inScene, ZORUnicodeString inImagePath,
   if (Capture(*image, inFormat, inImagePath)) image->Release();
 }
 
-// From the top down: what is imposed highest wins.
+// From the root down: the highest ancestor that imposes a colour wins.
 HRESULT PrintPictures::RetrieveColor(ZORIProduct_var inProduct, int& outFound, unsigned int& outRed,
                                      unsigned int& outGreen, unsigned int& outBlue) {
   outFound = 0;
   if (inProduct.IsNull()) return E_INVALIDARG;
-  ProductList line;
+  ProductList ancestors;  // the product itself first, the root last
   for (ZORIProduct_var product = inProduct; !product.IsNull();
        product = product->GetFatherProduct())
-    line.Append(product);
+    ancestors.Append(product);
 
   HRESULT result = S_OK;
-  for (int i = line.Size(); i >= 1; --i) {
-    if (line[i].IsNull()) continue;
-    const ZORIVisProperties_var properties = line[i];
+  for (int i = ancestors.Size(); i >= 1; --i) {
+    if (ancestors[i].IsNull()) continue;
+    const ZORIVisProperties_var properties = ancestors[i];
     if (properties.IsNull()) {
       result = E_FAIL;
       continue;
@@ -302,9 +332,10 @@ void PrintPictures::PrintSubInterferenceImage(ZORRep* inScene,
   const int count = inInterference->GetSubInterferenceCount();
   for (int i = 1; i <= count; ++i) {
     const ZORISiSubInterference_var part = parts[i];
-    const OwnViewpoint viewpoint;
-    if (part.IsNull() || part->FillViewpoint(viewpoint.Get()) == 0) continue;
-    TakeRepImage(inScene, SubInterferencePath(inImagePath, i), viewpoint.Get(), inFormat, inWidth,
-                 inHeight, inViewMode, inKeepBackground);
+    OwnViewpoint viewpoint;
+    if (!part.IsNull() && part->FillViewpoint(viewpoint.Get()) != 0)
+      TakeRepImage(inScene, SubInterferencePath(inImagePath, i), viewpoint.Get(), inFormat, inWidth,
+                   inHeight, inViewMode, inKeepBackground);
+    viewpoint.Release();
   }
 }

@@ -1,23 +1,32 @@
-// The writer itself and its markers.
+// The writer itself, its markers, pictures of representations.
 #include "ZORLyraXMLServices.h"
 
 #include <string_view>
 
 #include "BuildPath.h"
+#include "PlatformAdapter.h"
+#include "RepCapture.h"
 #include "ZORLyraGeneralServices.h"
 #include "platform/system/ZORMsgCatalog.h"
 #include "platform/system/ZORSettingRepository.h"
-#include "xml_writing/Prologue.h"
 #include "xml_writing/WriterState.h"
 
 namespace {
-void AppendLiteral(ZORUnicodeString& ioText, std::u16string_view inLiteral) {
-  ioText.AppendUTF16(inLiteral.data(), inLiteral.size());
-}
+constexpr char kClassName[] = "ZORLyraXMLServices";
+constexpr int kReportWidth = 756;  // of pictures
+constexpr int kReportHeight = 506;
 
 void AppendForm(ZORUnicodeString& ioText, std::u16string_view inLaidOut,
                 std::u16string_view inCompact) {
-  AppendLiteral(ioText, writer_state::IsLaidOut() ? inLaidOut : inCompact);
+  adapter::AppendUnits(ioText, writer_state::IsLaidOut() ? inLaidOut : inCompact);
+}
+
+void AppendAttribute(ZORUnicodeString& ioText, const ZORUnicodeString& inName,
+                     const ZORUnicodeString& inValue) {
+  ioText.Append(inName);
+  adapter::AppendUnits(ioText, u"=\"");
+  ioText.Append(inValue);
+  adapter::AppendUnits(ioText, u"\" ");
 }
 
 ZORUnicodeString StyleSheetSetting() {
@@ -28,7 +37,7 @@ ZORUnicodeString StyleSheetSetting() {
   return value;
 }
 
-// "Ressources" is the folder's name.
+// "Ressources" is spelled like the folder.
 ZORUnicodeString DefaultStyleSheet() {
   ZORUnicodeString path("Ressources");
   path.Append(BuildPath::AppendSlash());
@@ -54,13 +63,16 @@ ZORLyraXMLServices::~ZORLyraXMLServices() = default;
 
 ZORMetaClass* ZORLyraXMLServices::MetaObject() {
   if (meta_object == nullptr)
-    meta_object = fct_RetrieveMetaObject("ZORLyraXMLServices", kZORTypeImplementation,
-                                         ZORBaseUnknown::MetaObject(), "ZORNull", "Pelinor",
-                                         sizeof(ZORLyraXMLServices));
+    meta_object =
+        fct_RetrieveMetaObject(kClassName, kZORTypeImplementation, ZORBaseUnknown::MetaObject(),
+                               "ZORNull", "Pelinor", sizeof(ZORLyraXMLServices));
   return meta_object;
 }
 
-const char* ZORLyraXMLServices::ClassName() { return MetaObject()->IsA(); }
+const char* ZORLyraXMLServices::ClassName() {
+  MetaObject();
+  return kClassName;
+}
 
 const CLSID& ZORLyraXMLServices::ClassId() { return MetaObject()->GetClassId(); }
 
@@ -75,35 +87,27 @@ int ZORLyraXMLServices::IsAKindOf(const char* inClassName) const {
 }
 
 void ZORLyraXMLServices::InitXMLMarkerWithAttr(ZORUnicodeString inName) {
-  AppendLiteral(text_, u"<");
+  adapter::AppendUnits(text_, u"<");
   text_.Append(inName);
-  AppendLiteral(text_, u" ");
+  adapter::AppendUnits(text_, u" ");
 }
 
 void ZORLyraXMLServices::InitXMLMarkerWithoutAttr(ZORUnicodeString inName) {
-  AppendLiteral(text_, u"<");
+  adapter::AppendUnits(text_, u"<");
   text_.Append(inName);
-  AppendLiteral(text_, u"> ");
-}
-
-void ZORLyraXMLServices::AppendAttribute(const ZORUnicodeString& inName,
-                                         const ZORUnicodeString& inValue) {
-  text_.Append(inName);
-  AppendLiteral(text_, u"=\"");
-  text_.Append(inValue);
-  AppendLiteral(text_, u"\" ");
+  adapter::AppendUnits(text_, u"> ");
 }
 
 void ZORLyraXMLServices::AddAttr(ZORUnicodeString inName, ZORUnicodeString inValue) {
-  AppendAttribute(inName, inValue);
+  AppendAttribute(text_, inName, inValue);
 }
 
 void ZORLyraXMLServices::AddAttr(ZORUnicodeString inName, int inValue) {
-  AppendAttribute(inName, BuildPath::ConvToStr(inValue));
+  AppendAttribute(text_, inName, BuildPath::ConvToStr(inValue));
 }
 
 void ZORLyraXMLServices::AddAttr(ZORUnicodeString inName, char* inValue) {
-  AppendAttribute(inName, ZORUnicodeString(inValue));
+  AppendAttribute(text_, inName, ZORUnicodeString(inValue));
 }
 
 void ZORLyraXMLServices::CloseXMLAttrMarkerWithElem() { AppendForm(text_, u"> \n", u">"); }
@@ -135,4 +139,34 @@ ZORUnicodeString ZORLyraXMLServices::getStyleSheetFromSetting() {
   ZORUnicodeString styleSheet = StyleSheetSetting();
   if (styleSheet == "") styleSheet = DefaultStyleSheet();
   return ZORLyraGeneralServices::TransformPathnameFromDLName(styleSheet);
+}
+
+// By contract a print image that could not be rasterised is not released, here and in the variant
+// with a viewpoint.
+void ZORLyraXMLServices::TakeRepImage(ZORRep* inRep, ZORUnicodeString inPath,
+                                      int inKeepBackground) {
+  if (!inRep) return;
+  auto* const image =
+      new ZORPrint3DRepImage(static_cast<ZOR3DRep*>(inRep), kReportWidth, kReportHeight);
+  SetUpSupport(image->GetSupport(), inKeepBackground != 0, true);
+  if (Capture(*image, "JPEG", inPath)) image->Release();
+}
+
+void ZORLyraXMLServices::TakeRepImage(ZORRep* inRep, ZORUnicodeString inPath, int inWidth,
+                                      int inHeight, int inViewMode, int inKeepBackground) {
+  if (!inRep) return;
+  auto* const image = new ZORPrint3DRepImage(static_cast<ZOR3DRep*>(inRep), inWidth, inHeight);
+  SetUpSupport(image->GetSupport(), inKeepBackground != 0, inViewMode == 1);
+  Capture(*image, "JPEG", inPath);
+  image->Release();
+}
+
+void ZORLyraXMLServices::TakeRepImage(ZORRep* inRep, ZORUnicodeString inPath,
+                                      ZOR3DViewpoint* inViewpoint, int inKeepBackground) {
+  if (!inRep) return;
+  auto* const image =
+      new ZORPrint3DRepImage(static_cast<ZOR3DRep*>(inRep), kReportWidth, kReportHeight);
+  SetUpSupport(image->GetSupport(), inKeepBackground != 0, true);
+  *image->GetViewpoint() = *inViewpoint;
+  if (Capture(*image, "JPEG", inPath)) image->Release();
 }

@@ -1,54 +1,118 @@
 // The writer's operations on files.
+#include <algorithm>
+#include <cstdlib>
 #include <fstream>
+#include <memory>
+#include <new>
+#include <string>
 #include <string_view>
-#include <vector>
 
+#include "PlatformAdapter.h"
+#include "Teardown.h"
 #include "ZORLyraXMLServices.h"
 #include "platform/system/ZORFile.h"
 #include "platform/xml/DOMString.h"
 #include "platform/xml/ZORXMLParser.h"
-#include "xml_writing/Prologue.h"
-#include "xml_writing/Utf8File.h"
 #include "xml_writing/WriterState.h"
 
 namespace {
 constexpr int kPathSize = 260;  // bytes of a joined path, terminating zero included
 
-std::u16string_view Units(const ZORUnicodeString& inText) {
-  return {inText.ConvertToUCChar(), static_cast<std::size_t>(inText.GetLengthInChar())};
+/// A path in the form that the platform's file operations take.
+std::wstring ToWide(const ZORUnicodeString& inPath) {
+  std::wstring wide(static_cast<std::size_t>(inPath.GetLengthInChar()) + 10, L'\0');
+  inPath.ConvertToWChar(wide.data());
+  return wide;
 }
 
-// Both lines are inserted at one point, the document type first: the style sheet, inserted later,
-// comes to stand before it.
-ZORUnicodeString InsertedLines() {
+/// A buffer of UTF-8, zeroed and large enough for any text of a given length: four bytes a unit. It
+/// comes from calloc, which maps the pages of a large block only as they are written.
+class Utf8Bytes {
+ public:
+  /// Raises std::bad_alloc when there is no memory for texts of inLength units.
+  explicit Utf8Bytes(std::size_t inLength)
+      : bytes_(static_cast<char*>(std::calloc(4 * inLength + 4, 1))) {
+    if (bytes_ == nullptr) throw std::bad_alloc();
+  }
+  void Add(const ZORUnicodeString& inText) {
+    std::size_t count = 0;
+    inText.ConvertToUTF8(bytes_.get() + count_, &count);
+    count_ += count;
+  }
+  /// Converts a long text in slices that fit the cache, without a second copy of it.
+  void Add(std::u16string_view inUnits) {
+    constexpr std::size_t kSlice = std::size_t{64} * 1024;
+    ZORUnicodeString slice;
+    while (!inUnits.empty()) {
+      std::size_t count = std::min(inUnits.size(), kSlice);
+      const bool splitsPair = count < inUnits.size() && (inUnits[count - 1] & 0xFC00) == 0xD800;
+      if (splitsPair) --count;
+      slice.BuildFromUTF16(inUnits.data(), count);
+      Add(slice);
+      inUnits.remove_prefix(count);
+    }
+  }
+  HRESULT WriteTo(int inDescriptor) const {
+    std::size_t written = 0;
+    return ZORFWrite(inDescriptor, bytes_.get(), count_, &written);
+  }
+
+ private:
+  struct Free {
+    void operator()(char* inBytes) const { std::free(inBytes); }
+  };
+  std::unique_ptr<char, Free> bytes_;
+  std::size_t count_ = 0;
+};
+
+/// The style-sheet reference and the document type of a dumped node, each after a line feed.
+ZORUnicodeString PrologueLines() {
   ZORUnicodeString lines;
-  if (writer_state::styleSheet != "")
-    lines.Append("\n").Append(StyleSheetLine(writer_state::styleSheet));
+  const auto add = [&](const ZORUnicodeString& inLine) {
+    lines.Append("\n");
+    lines.Append(inLine);
+  };
+  if (writer_state::styleSheet != "") add(StyleSheetLine(writer_state::styleSheet));
   if (writer_state::dtdIdentifier != "")
-    lines.Append("\n").Append(
-        DocumentTypeLine(writer_state::typeName, writer_state::dtdIdentifier));
+    add(DocumentTypeLine(writer_state::typeName, writer_state::dtdIdentifier));
   return lines;
 }
 
-// What a file is made of, in order. The lines go behind the first ">", or first where there is none.
-std::vector<std::u16string_view> PiecesOfDocument(std::u16string_view inHead,
-                                                  std::u16string_view inLines,
-                                                  std::u16string_view inBody) {
-  const std::size_t afterInHead = inHead.find(u'>') + 1;  // 0 where there is none
-  const std::size_t afterInBody = afterInHead > 0 ? 0 : inBody.find(u'>') + 1;
-  if (afterInBody > 0)
-    return {inHead, inBody.substr(0, afterInBody), inLines, inBody.substr(afterInBody)};
-  return {inHead.substr(0, afterInHead), inLines, inHead.substr(afterInHead), inBody};
+/// A document as UTF-8: declaration and body, with the lines inserted after the first ">", or at the
+/// start if there is none.
+Utf8Bytes DocumentWithLines(std::u16string_view inDeclaration, std::u16string_view inLines,
+                            std::u16string_view inBody) {
+  Utf8Bytes document(inDeclaration.size() + inLines.size() + inBody.size());
+  const std::size_t inHead = inDeclaration.find(u'>') + 1;  // 0 where there is none
+  const std::size_t inRest = inHead > 0 ? 0 : inBody.find(u'>') + 1;
+  if (inRest > 0) {
+    document.Add(inDeclaration);
+    document.Add(inBody.substr(0, inRest));
+    document.Add(inLines);
+    document.Add(inBody.substr(inRest));
+  } else {
+    document.Add(inDeclaration.substr(0, inHead));
+    document.Add(inLines);
+    document.Add(inDeclaration.substr(inHead));
+    document.Add(inBody);
+  }
+  return document;
 }
 
-HRESULT WriteFile(const ZORUnicodeString& inPath,
-                  const std::vector<std::u16string_view>& inPieces) {
-  OutputFile file;
-  const HRESULT opened = file.Open(inPath);
+/// Opens a file, makes bytes of it and writes them.
+/// @param inMakeBytes  called when the file is open.
+/// @param outClosed the platform's code of closing, when the file was opened.
+template <class MakeBytes>
+HRESULT WriteFile(const ZORUnicodeString& inPath, const MakeBytes& inMakeBytes,
+                  HRESULT& outClosed) {
+  int descriptor = 0;
+  const HRESULT opened = ZORFOpen(ToWide(inPath).c_str(), "wb", &descriptor);
   if (FAILED(opened)) return opened;
-  Utf8Encoder encoder(file);
-  for (const std::u16string_view piece : inPieces) encoder.Add(piece);
-  return encoder.Finish();
+  Teardown close;
+  close.Add([&] { outClosed = ZORFClose(descriptor); });
+  const HRESULT written = inMakeBytes().WriteTo(descriptor);
+  close.Run();
+  return written;
 }
 }  // namespace
 
@@ -68,12 +132,15 @@ HRESULT ZORLyraXMLServices::CreateNewFederatorDocument(ZORUnicodeString inPath,
 }
 
 int ZORLyraXMLServices::DumpDocument(ZORUnicodeString inPath) {
-  OutputFile file;
-  const HRESULT opened = file.Open(inPath);
-  if (FAILED(opened)) return opened;
-  const Utf8Bytes text = ToUtf8(text_);
-  const HRESULT written = file.Write(text.bytes.get(), text.count);
-  const HRESULT closed = file.Close();
+  HRESULT closed = S_OK;
+  const HRESULT written = WriteFile(
+      inPath,
+      [&] {
+        Utf8Bytes bytes(static_cast<std::size_t>(text_.GetLengthInChar()));
+        bytes.Add(text_);
+        return bytes;
+      },
+      closed);
   return FAILED(written) ? written : closed;
 }
 
@@ -87,19 +154,24 @@ HRESULT ZORLyraXMLServices::DumpDocument(DOM_Node inNode, ZORUnicodeString inPat
   if (FAILED(serialised)) return serialised;
 
   ZORUnicodeString declaration;
-  if (inPrologue == 1) declaration.Append(XMLDeclaration()).Append("\n");
-  const ZORUnicodeString lines = InsertedLines();
-  return WriteFile(inPath, PiecesOfDocument(Units(declaration), Units(lines),
-                                            {body.rawBuffer(), body.length()}));
+  if (inPrologue == 1) {
+    declaration.Append(XMLDeclaration());
+    declaration.Append("\n");
+  }
+  // Converted before the file is opened, so that running out of memory leaves an old file intact.
+  const Utf8Bytes bytes = DocumentWithLines(
+      adapter::UnitsOf(declaration), adapter::UnitsOf(PrologueLines()), adapter::UnitsOf(body));
+  HRESULT ignored = S_OK;
+  return WriteFile(
+      inPath, [&]() -> const Utf8Bytes& { return bytes; }, ignored);
 }
 
+// The codes of the joins are ignored: copying a path that does not fit fails anyway.
 HRESULT ZORLyraXMLServices::CopyFile(const char* inFileName, ZORUnicodeString inSourceDirectory,
                                      ZORUnicodeString inTargetDirectory) {
-  char source[kPathSize];
-  char target[kPathSize];
-  const HRESULT sourceJoined = ZORMakePath(inSourceDirectory.ConvertToChar(), inFileName, source);
-  if (FAILED(sourceJoined)) return sourceJoined;
-  const HRESULT targetJoined = ZORMakePath(inTargetDirectory.ConvertToChar(), inFileName, target);
-  if (FAILED(targetJoined)) return targetJoined;
+  char source[kPathSize] = "";
+  char target[kPathSize] = "";
+  ZORMakePath(inSourceDirectory.ConvertToChar(), inFileName, source);
+  ZORMakePath(inTargetDirectory.ConvertToChar(), inFileName, target);
   return ZORFCopy(ToWide(source).c_str(), ToWide(target).c_str(), 0);
 }

@@ -3,6 +3,7 @@
 #define ZOR_TESTS_PICTURES_FAKE_OBJECTS_H
 
 #include <algorithm>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string>
@@ -131,6 +132,9 @@ class FakeInterference : public FakeComponent {
   ZORISiInterference_var Handle() { return ZORISiInterference_var(&interference_); }
 
   std::vector<int> flags = {0, 1, 0};
+  const int* givenFlags = nullptr;         ///< the last array of SetFlags
+  std::function<void()> onFlags;           ///< called by each SetFlags
+  std::function<void()> onRepresentation;  ///< called when it is asked for
   int viewpointAnswer = 0;
   bool hasGeometry = true;
   bool hasRep = true;
@@ -151,6 +155,8 @@ class FakeInterference : public FakeComponent {
     }
     int GetElementCount() override { return static_cast<int>(self_.flags.size()) - 1; }
     void SetFlags(const int* inFlags) override {
+      self_.givenFlags = inFlags;
+      if (self_.onFlags) self_.onFlags();
       std::copy_n(inFlags, self_.flags.size(), self_.flags.begin());
       std::string text = "set flags";
       for (const int flag : self_.flags) text += " " + std::to_string(flag);
@@ -178,6 +184,7 @@ class FakeInterference : public FakeComponent {
     explicit GeoVisuFacet(FakeInterference& inSelf) : FakeFacet(inSelf), self_(inSelf) {}
     ZORRep* GetRep() override {
       recorded.Note("representation");
+      if (self_.onRepresentation) self_.onRepresentation();
       return self_.hasRep ? new NamedRep("clash", self_.radius) : nullptr;
     }
 

@@ -14,7 +14,7 @@ class ZOR_PLATFORM_EXPORT ZORICkeUnit : public ZORBaseUnknown {
   /// Reads a number followed by a unit, such as "0.5m", "25 mm" or "1 inch", as a value in this
   /// unit.
   /// @return ZORCke::False, outValue unchanged, when the text has no number, no unit, or a unit of
-  /// another magnitude.
+  ///         another magnitude.
   virtual ZORCke::Boolean Decode(const ZORUnicodeString& inText, double& outValue) const = 0;
 };
 

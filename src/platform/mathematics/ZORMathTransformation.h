@@ -3,6 +3,7 @@
 #define ZOR_PLATFORM_MATHEMATICS_ZORMATHTRANSFORMATION_H
 
 #include "ZORPlatformExport.h"
+#include "platform/ZORPlatformAdditions.h"
 #include "platform/mathematics/ZORMath3x3Matrix.h"
 #include "platform/mathematics/ZORMathVector.h"
 
@@ -12,6 +13,8 @@ class ZOR_PLATFORM_EXPORT ZORMathTransformation {
   ZORMathTransformation();
   void SetMatrix(const ZORMath3x3Matrix& inMatrix);
   void SetVector(const ZORMathVector& inTranslation);
+
+#if ZOR_PLATFORM_ADDITIONS
   const ZORMath3x3Matrix& GetMatrix() const;
   const ZORMathVector& GetVector() const;
   /// The twelve numbers: first, second and third column of the matrix, then the translation.
@@ -19,6 +22,7 @@ class ZOR_PLATFORM_EXPORT ZORMathTransformation {
   ZORMathVector operator*(const ZORMathVector& inPoint) const;
   /// The transformation that applies inOther first.
   ZORMathTransformation operator*(const ZORMathTransformation& inOther) const;
+#endif
 
  private:
   ZORMath3x3Matrix matrix_;

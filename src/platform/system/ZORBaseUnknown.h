@@ -3,6 +3,7 @@
 #define ZOR_PLATFORM_SYSTEM_ZORBASEUNKNOWN_H
 
 #include "ZORPlatformExport.h"
+#include "platform/ZORPlatformAdditions.h"
 #include "platform/system/ZORGuid.h"
 #include "platform/system/ZORMetaClass.h"
 #include "platform/system/ZORResult.h"
@@ -18,8 +19,7 @@ class ZOR_PLATFORM_EXPORT ZORBaseUnknown {
   /// The reference count stays this object's own.
   ZORBaseUnknown& operator=(const ZORBaseUnknown& inOther);
 
-  /// @param outInterface set to the object as that interface with a reference added; null on
-  /// failure.
+  /// @param outInterface set to the object as that interface, a reference added; null on failure.
   /// @return S_OK, E_NOINTERFACE, or E_INVALIDARG for a null output.
   virtual HRESULT QueryInterface(const IID& inInterface, void** outInterface);
   virtual unsigned int AddRef();   ///< @return the new count
@@ -45,13 +45,16 @@ class ZOR_PLATFORM_EXPORT ZORBaseUnknown {
   virtual int IsNull() const;  ///< 0: an object is there
   /// @return 1 when both are interfaces of one object, else 0.
   virtual int IsEqual(const ZORBaseUnknown* inOther) const;
-  /// Called when the component is loaded, activated or put away; this base does nothing. @return
-  /// S_OK
+  /// Called when the component is loaded, activated or put away; this base does nothing.
+  /// @return S_OK
   virtual HRESULT ChangeComponentState(int inFrom, int inTo);
 
   static ZORMetaClass* MetaObject();
-  static const char* ClassName();  ///< "ZORBaseUnknown"
   static const IID& ClassId();
+
+#if ZOR_PLATFORM_ADDITIONS
+  static const char* ClassName();  ///< "ZORBaseUnknown"
+#endif
 
  private:
   unsigned int referenceCount_;

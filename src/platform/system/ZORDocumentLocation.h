@@ -8,14 +8,14 @@
 
 /// Looks a logical name up in the table of document locations.
 /// @param outDirectory set to a new string that the caller deletes; null on failure.
-/// @return S_OK, or E_FAIL when the name is not in the table or the table cannot be read,
-/// E_INVALIDARG for a null output.
+/// @return S_OK; E_FAIL when the name is not in the table or the table cannot be read; E_INVALIDARG
+///         for a null output.
 ZOR_PLATFORM_EXPORT HRESULT ZORGetDLName(const ZORUnicodeString& inName,
                                          ZORUnicodeString** outDirectory);
 
 /// Replaces each ${VARIABLE} of a text by the environment's value, in place.
-/// @return S_OK, or E_FAIL for an unknown variable or an unclosed brace (the text is unchanged),
-/// E_INVALIDARG for null.
+/// @return S_OK; E_FAIL, the text unchanged, for an unknown variable or an unclosed brace;
+///         E_INVALIDARG for null.
 ZOR_PLATFORM_EXPORT HRESULT ZORExpandString(ZORUnicodeString* ioText);
 
 #endif

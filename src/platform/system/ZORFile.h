@@ -5,8 +5,10 @@
 #include <cstddef>
 
 #include "ZORPlatformExport.h"
+#include "platform/ZORPlatformAdditions.h"
 #include "platform/system/ZORResult.h"
 
+#if ZOR_PLATFORM_ADDITIONS
 /// Codes of the file operations below: negative, one for each common reason, others as E_FAIL.
 enum ZORFileResult : HRESULT {
   kZORFileNotFound = static_cast<HRESULT>(0x80070002),
@@ -16,9 +18,10 @@ enum ZORFileResult : HRESULT {
   kZORFileBadPath = static_cast<HRESULT>(0x800700A1),
   kZORFileIsDirectory = static_cast<HRESULT>(0x8007010B),
 };
+#endif
 
-/// @param inPath narrow path. @param inMode 0 exists, 2 may be written, 4 may be read, or a sum of
-/// these.
+/// @param inPath narrow path.
+/// @param inMode 0: exists; 2: may be written; 4: may be read; or a sum of these.
 /// @return 0 when all of it holds, else nonzero.
 ZOR_PLATFORM_EXPORT int ZORFileAccess(const char* inPath, int inMode);
 

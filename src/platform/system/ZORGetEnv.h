@@ -4,8 +4,8 @@
 
 #include "ZORPlatformExport.h"
 
-/// @return the value of an environment variable, or null when it is not set; the environment's own,
-/// read now.
+/// @return the value that an environment variable has now, or null when it is not set; owned by the
+///         environment.
 ZOR_PLATFORM_EXPORT const char* ZORGetEnv(const char* inName);
 
 #endif

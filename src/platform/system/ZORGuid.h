@@ -2,6 +2,8 @@
 #ifndef ZOR_PLATFORM_SYSTEM_ZORGUID_H
 #define ZOR_PLATFORM_SYSTEM_ZORGUID_H
 
+#include "platform/ZORPlatformAdditions.h"
+
 #ifdef _WIN32
 #include <guiddef.h>
 #else
@@ -18,10 +20,12 @@ typedef struct _GUID {
 typedef GUID IID;
 typedef GUID CLSID;
 
+#if ZOR_PLATFORM_ADDITIONS
 inline bool operator==(const GUID& inA, const GUID& inB) {
   return std::memcmp(&inA, &inB, sizeof(GUID)) == 0;
 }
 inline bool operator!=(const GUID& inA, const GUID& inB) { return !(inA == inB); }
+#endif
 #endif
 
 #endif

@@ -2,6 +2,7 @@
 #ifndef ZOR_PLATFORM_SYSTEM_ZORINTERFACEHANDLE_H
 #define ZOR_PLATFORM_SYSTEM_ZORINTERFACEHANDLE_H
 
+#include "platform/ZORPlatformAdditions.h"
 #include "platform/system/ZORBaseUnknown.h"
 #include "platform/system/ZORErrors.h"
 
@@ -38,12 +39,14 @@ class ZORInterfaceHandle {
   }
 
   bool IsNull() const { return interface_ == nullptr; }
-  bool operator!() const { return IsNull(); }
   /// @return the interface; raises ZORNullVarError when there is none.
   Interface* operator->() const {
     if (!interface_) ThrowErrorNullVar();
     return interface_;
   }
+
+#if ZOR_PLATFORM_ADDITIONS
+  bool operator!() const { return IsNull(); }
   /// The interface or null, without a reference added.
   Interface* GetInterface() const { return interface_; }
   friend bool operator==(const ZORInterfaceHandle& inA, const ZORInterfaceHandle& inB) {
@@ -53,6 +56,7 @@ class ZORInterfaceHandle {
   friend bool operator!=(const ZORInterfaceHandle& inA, const ZORInterfaceHandle& inB) {
     return !(inA == inB);
   }
+#endif
 
  private:
   void Hold() {

@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <vector>
 
+#include "platform/ZORPlatformAdditions.h"
 #include "platform/system/ZORErrors.h"
 
 /// A list of values whose positions run from 1 to Size(). A position outside raises ZORFatalError.
@@ -13,9 +14,12 @@ class ZORListVal {
  public:
   int Size() const { return static_cast<int>(values_.size()); }
   void Append(const Value& inValue) { values_.push_back(inValue); }
-  void RemoveAll() { values_.clear(); }
   const Value& operator[](int inPosition) const { return values_[Checked(inPosition)]; }
+
+#if ZOR_PLATFORM_ADDITIONS
   Value& operator[](int inPosition) { return values_[Checked(inPosition)]; }
+  void RemoveAll() { values_.clear(); }
+#endif
 
  private:
   std::size_t Checked(int inPosition) const {

@@ -5,6 +5,7 @@
 #include <string>
 
 #include "ZORPlatformExport.h"
+#include "platform/ZORPlatformAdditions.h"
 #include "platform/system/ZORGuid.h"
 
 /// What kind of class a meta-class describes. Class type 1 is a class that implements.
@@ -14,16 +15,19 @@ enum ZORTypeOfClass { kZORTypeInterface = 0, kZORTypeImplementation = 1, kZORTyp
 /// callers.
 class ZOR_PLATFORM_EXPORT ZORMetaClass {
  public:
+  /// An identifier made from the class's name: the same on every run and machine.
+  const CLSID& GetClassId() const;
+  /// @return 1 when the class is, or derives from, the named class, else 0 (also for null).
+  int IsAKindOf(const char* inClassName) const;
+
+#if ZOR_PLATFORM_ADDITIONS
   const char* IsA() const;              ///< the class's name
   const ZORMetaClass* GetBase() const;  ///< null for the root of all classes
   ZORTypeOfClass GetTypeOfClass() const;
   const char* GetExtendedClass() const;  ///< "ZORNull" when the class extends none
   const char* GetFramework() const;      ///< the framework that owns the class
   unsigned int GetInstanceSize() const;  ///< bytes of one object
-  /// An identifier made from the class's name: the same on every run and machine.
-  const CLSID& GetClassId() const;
-  /// @return 1 when the class is, or derives from, the named class, else 0 (also for null).
-  int IsAKindOf(const char* inClassName) const;
+#endif
 
  private:
   friend class ZORMetaClassRegistry;

@@ -9,7 +9,7 @@ class ZOR_PLATFORM_EXPORT ZORSysSettingRepository : public ZORSettingRepository 
  public:
   /// @param inMode 0; other values are accepted and mean the same.
   /// @return the repository (the platform's), or null when there is none of this name or it cannot
-  /// be read.
+  ///         be read.
   static ZORSysSettingRepository* GetRepository(const char* inName, int inMode = 0);
   /// Reads the first inCount numbers of an attribute, as ReadSetting does.
   HRESULT ReadAttr(const char* inName, int* outValues, int inCount = 1);

@@ -2,6 +2,8 @@
 #ifndef ZOR_PLATFORM_SYSTEM_ZORUNICODECHAR_H
 #define ZOR_PLATFORM_SYSTEM_ZORUNICODECHAR_H
 
+#include "platform/ZORPlatformAdditions.h"
+
 /// A UTF-16 code unit as a number; ZORUnicodeString::ConvertToUCChar gives an array of them.
 typedef char16_t ZORUC2Bytes;
 
@@ -13,9 +15,12 @@ class ZORUnicodeChar {
   ZORUnicodeChar(char inCharacter) : unit_(static_cast<unsigned char>(inCharacter)) {}
   /// Makes this the given code unit; surrogate halves are kept as they are.
   void BuildFromUC2Bytes(ZORUC2Bytes inUnit) { unit_ = inUnit; }
+
+#if ZOR_PLATFORM_ADDITIONS
   ZORUC2Bytes ConvertToUC2Bytes() const { return unit_; }
   friend bool operator==(ZORUnicodeChar a, ZORUnicodeChar b) { return a.unit_ == b.unit_; }
   friend bool operator!=(ZORUnicodeChar a, ZORUnicodeChar b) { return a.unit_ != b.unit_; }
+#endif
 
  private:
   ZORUC2Bytes unit_ = 0;

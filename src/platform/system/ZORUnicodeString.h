@@ -7,6 +7,7 @@
 #include <string>
 
 #include "ZORPlatformExport.h"
+#include "platform/ZORPlatformAdditions.h"
 #include "platform/system/ZORResult.h"
 #include "platform/system/ZORString.h"
 #include "platform/system/ZORUnicodeChar.h"
@@ -15,17 +16,10 @@
 /// The narrow form is UTF-8 on Linux and the ANSI code page on Windows.
 class ZOR_PLATFORM_EXPORT ZORUnicodeString {
  public:
-  /// How Strip works: which ends are stripped. kStripBoth is the mode 4 that readers use.
-  enum StripMode { kStripLeading = 1, kStripTrailing = 2, kStripBoth = 4 };
-  /// How SearchSubString works: mode 1 looks forward from the start position, mode 2 backward.
-  enum SearchMode { kSearchForward = 1, kSearchBackward = 2 };
-
   ZORUnicodeString();
   /// @param inNarrow zero-terminated narrow text; null gives the empty string. Bytes that are not
-  /// valid text become
-  ///                 U+FFFD.
+  ///                 valid text become U+FFFD.
   ZORUnicodeString(const char* inNarrow);
-  ZORUnicodeString(const ZORString& inNarrow);
   ZORUnicodeString(const ZORUnicodeString& inOther);
   ZORUnicodeString(ZORUnicodeString&& ioOther) noexcept;
   ZORUnicodeString& operator=(const ZORUnicodeString& inOther);
@@ -36,12 +30,10 @@ class ZOR_PLATFORM_EXPORT ZORUnicodeString {
   /// Replaces the text by inCount code units, kept as they are (lone surrogates too). Null with a
   /// count of 0 empties it.
   void BuildFromUTF16(const ZORUC2Bytes* inUnits, std::size_t inCount);
-  /// Replaces the text by the bytes of a UTF-8 text; invalid sequences become U+FFFD.
-  void BuildFromUTF8(const char* inBytes, std::size_t inCount);
   /// Replaces the text by the number in a printf format for one int ("%d", "%i") or one double
   /// ("%f", "%g", "%le"). The decimal separator is always the point, whatever the process's locale.
-  /// @return S_OK, or E_INVALIDARG for a format that does not hold exactly one conversion of that
-  /// type (text unchanged).
+  /// @return S_OK, or E_INVALIDARG, the text unchanged, for a format that does not hold exactly one
+  ///         conversion of that type.
   HRESULT BuildFromNum(int inNumber, const char* inFormat = "%d");
   HRESULT BuildFromNum(double inNumber, const char* inFormat = "%f");
 
@@ -49,31 +41,24 @@ class ZOR_PLATFORM_EXPORT ZORUnicodeString {
   ZORUnicodeString& Append(const ZORUnicodeString& inTail);
   ZORUnicodeString& operator+=(const ZORUnicodeString& inTail);
   ZORUnicodeString& operator+=(ZORUnicodeChar inTail);
-  /// Appends inCount code units as they are; amortised constant for each unit.
-  ZORUnicodeString& AppendUTF16(const ZORUC2Bytes* inUnits, std::size_t inCount);
-  /// Makes room for inCount code units in all, so that appending up to there does not move the
-  /// text.
-  void Reserve(std::size_t inCount);
   /// Puts a text before the code unit at inPosition (0 to length; other positions are brought into
   /// that range).
   ZORUnicodeString& Insert(int inPosition, const ZORUnicodeString& inText);
-  /// The text without the given character at the ends chosen by inMode (a StripMode; any other
-  /// strips nothing).
-  ZORUnicodeString Strip(int inMode = kStripBoth,
-                         ZORUnicodeChar inCharacter = ZORUnicodeChar(' ')) const;
+  /// The text without the given character at its ends.
+  /// @param inMode 1: the leading ones; 2: the trailing ones; 4: both; any other strips nothing.
+  ZORUnicodeString Strip(int inMode = 4, ZORUnicodeChar inCharacter = ZORUnicodeChar(' ')) const;
   /// Replaces the first occurrence of a text.
   /// @return its position, or -1 when absent (or when inOld is empty); then nothing changes.
   int ReplaceSubString(const ZORUnicodeString& inOld, const ZORUnicodeString& inNew);
 
   // Asking
   int GetLengthInChar() const;
-  /// @return the position of the first (mode 1) or last (mode 2) occurrence at or after (before)
-  /// inStart; -1 when absent,
-  ///         when inStart is outside the text or when inText is empty.
-  int SearchSubString(const ZORUnicodeString& inText, int inStart = 0,
-                      int inMode = kSearchForward) const;
-  /// The part from inStart of at most inLength code units (all the rest when negative); empty when
-  /// inStart is outside.
+  /// @param inMode 1 searches forward from inStart, 2 backward.
+  /// @return the position of the first occurrence on the way; -1 when absent, when inStart is
+  ///         outside the text or when inText is empty.
+  int SearchSubString(const ZORUnicodeString& inText, int inStart = 0, int inMode = 1) const;
+  /// The part from inStart on, at most inLength code units (a negative number: all the rest); empty
+  /// when inStart is outside.
   ZORUnicodeString SubString(int inStart, int inLength = -1) const;
   /// Reads a number in a scanf format for one int ("%d", "%i") or one double ("%le", "%lf", "%lg").
   /// Like scanf, leading white space is passed over and the number ends at the first character that
@@ -98,8 +83,6 @@ class ZOR_PLATFORM_EXPORT ZORUnicodeString {
 
   ZOR_PLATFORM_EXPORT friend bool operator==(const ZORUnicodeString& inA,
                                              const ZORUnicodeString& inB);
-  ZOR_PLATFORM_EXPORT friend bool operator!=(const ZORUnicodeString& inA,
-                                             const ZORUnicodeString& inB);
   /// Comparison with narrow text, without a conversion when that text is ASCII.
   ZOR_PLATFORM_EXPORT friend bool operator==(const ZORUnicodeString& inA, const char* inB);
   ZOR_PLATFORM_EXPORT friend bool operator!=(const ZORUnicodeString& inA, const char* inB);
@@ -107,6 +90,23 @@ class ZOR_PLATFORM_EXPORT ZORUnicodeString {
                                                         const ZORUnicodeString& inB);
   ZOR_PLATFORM_EXPORT friend ZORUnicodeString operator+(const ZORUnicodeString& inA,
                                                         const char* inB);
+
+#if ZOR_PLATFORM_ADDITIONS
+  /// What Strip and SearchSubString call their modes.
+  enum StripMode { kStripLeading = 1, kStripTrailing = 2, kStripBoth = 4 };
+  enum SearchMode { kSearchForward = 1, kSearchBackward = 2 };
+
+  ZORUnicodeString(const ZORString& inNarrow);
+  /// Replaces the text by the bytes of a UTF-8 text; invalid sequences become U+FFFD.
+  void BuildFromUTF8(const char* inBytes, std::size_t inCount);
+  /// Appends inCount code units as they are; amortised constant for each unit.
+  ZORUnicodeString& AppendUTF16(const ZORUC2Bytes* inUnits, std::size_t inCount);
+  /// Makes room for inCount code units in all, so that appending up to there does not move the
+  /// text.
+  void Reserve(std::size_t inCount);
+  ZOR_PLATFORM_EXPORT friend bool operator!=(const ZORUnicodeString& inA,
+                                             const ZORUnicodeString& inB);
+#endif
 
  private:
   std::u16string units_;

@@ -4,6 +4,7 @@
 
 #include <vector>
 
+#include "platform/ZORPlatformAdditions.h"
 #include "platform/visualisation/ZOR3DRep.h"
 
 /// Shows its children, which it does not own. Made with new, ended with Destroy.
@@ -14,9 +15,12 @@ class ZOR_PLATFORM_EXPORT ZOR3DBagRep : public ZOR3DRep {
   void AddChild(ZORRep* inChild);
   /// Takes the first occurrence of a child out; one that is none is passed over.
   void RemoveChild(ZORRep* inChild);
-  const std::vector<ZOR3DRep*>& GetChildren() const;
   ZOR3DBoundingSphere GetShowBoundingElement() const override;
+
+#if ZOR_PLATFORM_ADDITIONS
+  const std::vector<ZOR3DRep*>& GetChildren() const;
   void Accept(ZOR3DSceneVisitor& ioVisitor) const override;
+#endif
 
  protected:
   ~ZOR3DBagRep() override;

@@ -2,6 +2,7 @@
 #ifndef ZOR_PLATFORM_VISUALISATION_ZOR3DVIEWPOINT_H
 #define ZOR_PLATFORM_VISUALISATION_ZOR3DVIEWPOINT_H
 
+#include "platform/ZORPlatformAdditions.h"
 #include "platform/mathematics/ZORMathVector.h"
 #include "platform/system/ZORBaseUnknown.h"
 #include "platform/visualisation/ZOR3DBoundingSphere.h"
@@ -10,8 +11,6 @@
 /// default looks from a corner (direction (-1, -1, -1), z upwards), conic.
 class ZOR_PLATFORM_EXPORT ZOR3DViewpoint : public ZORBaseUnknown {
  public:
-  enum Projection { kConic, kCylindric };
-
   ZOR3DViewpoint();
   /// A copy has its own reference count.
   ZOR3DViewpoint(const ZOR3DViewpoint& inOther);
@@ -28,6 +27,10 @@ class ZOR_PLATFORM_EXPORT ZOR3DViewpoint : public ZORBaseUnknown {
   /// an empty sphere.
   void Reframe(float inWidth, float inHeight, float inWidthScale, float inHeightScale);
 
+#if !ZOR_PLATFORM_ADDITIONS
+ private:
+#endif
+  enum Projection { kConic, kCylindric };
   Projection projection = kConic;
   ZORMathVector origin;  ///< where the eye is
   ZORMathVector sight;   ///< unit vector into the picture

@@ -5,16 +5,16 @@
 #include <cstdint>
 #include <vector>
 
+#include "platform/ZORPlatformAdditions.h"
 #include "platform/system/ZORBaseUnknown.h"
 #include "platform/system/ZORString.h"
 
 /// Pixels of 8-bit red, green and blue, rows from the top. Released by whoever rasterised it.
 class ZOR_PLATFORM_EXPORT ZORPixelImage : public ZORBaseUnknown {
  public:
-  ZORPixelImage(int inWidth, int inHeight, std::vector<std::uint8_t> inPixels);
   ~ZORPixelImage() override;
-  /// Prepares the pixels for writing. @param inDepth 2: true colour, which they have already; other
-  /// values are refused with E_INVALIDARG.
+  /// Prepares the pixels for writing.
+  /// @param inDepth 2: true colour, which they have already; E_INVALIDARG for other values.
   HRESULT Prepare(int inDepth);
   /// Writes the picture beside its place and renames it, so that an old file stays whole on
   /// failure.
@@ -22,9 +22,13 @@ class ZOR_PLATFORM_EXPORT ZORPixelImage : public ZORBaseUnknown {
   /// @return S_OK; E_INVALIDARG for an unknown format; a file code of ZORFile.h. No file is left
   ///         then.
   HRESULT Write(const ZORString& inFormat, const ZORString& inPath) const;
+
+#if ZOR_PLATFORM_ADDITIONS
+  ZORPixelImage(int inWidth, int inHeight, std::vector<std::uint8_t> inPixels);
   int GetWidth() const;
   int GetHeight() const;
   const std::vector<std::uint8_t>& GetPixels() const;
+#endif
 
  private:
   int width_;

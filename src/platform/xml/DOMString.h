@@ -3,6 +3,7 @@
 #define ZOR_PLATFORM_XML_DOMSTRING_H
 
 #include "ZORPlatformExport.h"
+#include "platform/ZORPlatformAdditions.h"
 #include "platform/system/ZORUnicodeString.h"
 
 class DOM_Tree;
@@ -16,8 +17,6 @@ class ZOR_PLATFORM_EXPORT DOMString {
   DOMString();  ///< null
   /// @param inNarrow zero-terminated narrow text; null gives the null string.
   DOMString(const char* inNarrow);
-  /// @param inUnits inCount UTF-16 code units; null gives the null string.
-  DOMString(const ZORUC2Bytes* inUnits, unsigned int inCount);
   DOMString(const DOMString& inOther);
   DOMString(DOMString&& ioOther) noexcept;
   DOMString& operator=(DOMString inOther) noexcept;
@@ -28,10 +27,15 @@ class ZOR_PLATFORM_EXPORT DOMString {
   /// The code units, without terminating zero; null when the length is 0. Valid while this string
   /// or a copy lives.
   const ZORUC2Bytes* rawBuffer() const;
+  ZORUnicodeString DOMStringToZORUnicodeString() const;
+
+#if ZOR_PLATFORM_ADDITIONS
+  /// @param inUnits inCount UTF-16 code units; null gives the null string.
+  DOMString(const ZORUC2Bytes* inUnits, unsigned int inCount);
   /// Same text; a null string equals an empty one.
   bool equals(const DOMString& inOther) const;
   bool equals(const char* inAscii) const;
-  ZORUnicodeString DOMStringToZORUnicodeString() const;
+#endif
 
  private:
   friend class DOM_Tree;

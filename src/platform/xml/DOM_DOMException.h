@@ -6,7 +6,9 @@
 #include <string>
 
 #include "ZORPlatformExport.h"
+#include "platform/ZORPlatformAdditions.h"
 
+#if ZOR_PLATFORM_ADDITIONS
 /// A change that a document refuses. Nothing has been changed.
 class ZOR_PLATFORM_EXPORT DOM_DOMException : public std::runtime_error {
  public:
@@ -27,5 +29,6 @@ class ZOR_PLATFORM_EXPORT DOM_DOMException : public std::runtime_error {
 
   ExceptionCode code;
 };
+#endif
 
 #endif

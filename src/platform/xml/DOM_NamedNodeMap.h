@@ -2,6 +2,7 @@
 #ifndef ZOR_PLATFORM_XML_DOM_NAMEDNODEMAP_H
 #define ZOR_PLATFORM_XML_DOM_NAMEDNODEMAP_H
 
+#include "platform/ZORPlatformAdditions.h"
 #include "platform/xml/DOM_Node.h"
 
 /// The attributes of an element in document order, as they are at each question. Empty by default.
@@ -14,9 +15,12 @@ class ZOR_PLATFORM_EXPORT DOM_NamedNodeMap {
   DOM_Node item(unsigned int inPosition) const;
   /// @return the attribute of a name, null when there is none.
   DOM_Node getNamedItem(const DOMString& inName) const;
+
+#if ZOR_PLATFORM_ADDITIONS
   /// The same without making a string of the name, which is what readers ask most.
   /// @param inName zero-terminated narrow text; null for no name.
   DOM_Node getNamedItem(const char* inName) const;
+#endif
 
  private:
   friend class DOM_Node;

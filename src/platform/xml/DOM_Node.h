@@ -5,6 +5,7 @@
 #include <cstdint>
 
 #include "ZORPlatformExport.h"
+#include "platform/ZORPlatformAdditions.h"
 #include "platform/xml/DOMString.h"
 
 class DOM_Document;
@@ -20,7 +21,9 @@ class DOM_Tree;
 class ZOR_PLATFORM_EXPORT DOM_Node {
  public:
   enum NodeType {
+#if ZOR_PLATFORM_ADDITIONS
     NULL_NODE = 0,  ///< what a null handle answers
+#endif
     ELEMENT_NODE = 1,
     ATTRIBUTE_NODE = 2,
     TEXT_NODE = 3,
@@ -42,9 +45,6 @@ class ZOR_PLATFORM_EXPORT DOM_Node {
   ~DOM_Node();
 
   bool isNull() const;
-  /// Same node of the same document; two null handles are equal.
-  bool operator==(const DOM_Node& inOther) const;
-  bool operator!=(const DOM_Node& inOther) const;
 
   // Asking
   short getNodeType() const;
@@ -54,8 +54,8 @@ class ZOR_PLATFORM_EXPORT DOM_Node {
   /// Value of an attribute, text of a text node, comment, CDATA section or processing instruction;
   /// else null.
   DOMString getNodeValue() const;
-  DOM_Node getParentNode()
-      const;  ///< null for an attribute, a document, a fragment and a node without parent
+  /// Null for an attribute, a document, a fragment and a node without parent.
+  DOM_Node getParentNode() const;
   DOM_Node getFirstChild() const;
   DOM_Node getLastChild() const;
   DOM_Node getPreviousSibling() const;
@@ -67,10 +67,6 @@ class ZOR_PLATFORM_EXPORT DOM_Node {
   DOM_NamedNodeMap getAttributes() const;  ///< empty for all but elements
   /// The document of the node; null for a document itself.
   DOM_Document getOwnerDocument() const;
-  /// How many changes have been made to the node's document so far. The same number twice means
-  /// that no node in it has come, gone, moved or changed its value in between. Making a node or a
-  /// copy that stays outside the tree, and changing such nodes, does not count.
-  std::uint64_t getChangeCount() const;
 
   // Changing
   /// Sets the value of an attribute, text, comment, CDATA section or processing instruction; other
@@ -80,6 +76,19 @@ class ZOR_PLATFORM_EXPORT DOM_Node {
   /// children.
   /// @return inChild. Raises HIERARCHY_REQUEST_ERR, WRONG_DOCUMENT_ERR or NULL_HANDLE_ERR.
   DOM_Node appendChild(const DOM_Node& inChild);
+  /// A copy in the same document, without parent; an element's attributes are always copied. Null
+  /// for a null handle. Raises NOT_SUPPORTED_ERR for a document, a document type or an attribute.
+  /// @param inDeep whether all descendants are copied too, whatever their depth: nothing recurses.
+  DOM_Node cloneNode(bool inDeep) const;
+
+#if ZOR_PLATFORM_ADDITIONS
+  /// Same node of the same document; two null handles are equal.
+  bool operator==(const DOM_Node& inOther) const;
+  bool operator!=(const DOM_Node& inOther) const;
+  /// How many changes have been made to the node's document so far. The same number twice means
+  /// that no node in it has come, gone, moved or changed its value in between. Making a node or a
+  /// copy that stays outside the tree, and changing such nodes, does not count.
+  std::uint64_t getChangeCount() const;
   /// As appendChild, before a child of this node (last when inBefore is null). Also raises
   /// NOT_FOUND_ERR.
   DOM_Node insertBefore(const DOM_Node& inChild, const DOM_Node& inBefore);
@@ -87,11 +96,7 @@ class ZOR_PLATFORM_EXPORT DOM_Node {
   DOM_Node replaceChild(const DOM_Node& inNew, const DOM_Node& inOld);
   /// @return inChild, now without parent. Raises NOT_FOUND_ERR.
   DOM_Node removeChild(const DOM_Node& inChild);
-  /// A copy in the same document, without parent; an element's attributes are always copied. Null
-  /// for a null handle. Raises NOT_SUPPORTED_ERR for a document, a document type or an attribute.
-  /// @param inDeep whether all descendants are copied too (whatever their depth: nothing here
-  /// recurses).
-  DOM_Node cloneNode(bool inDeep) const;
+#endif
 
  protected:
   friend class DOM_HandleAccess;

@@ -7,7 +7,9 @@
 #include <string>
 
 #include "ZORPlatformExport.h"
+#include "platform/ZORPlatformAdditions.h"
 
+#if ZOR_PLATFORM_ADDITIONS
 /// A document that cannot be read. what() is "SOURCE:LINE:COLUMN: REASON", without the numbers that
 /// are 0.
 class ZOR_PLATFORM_EXPORT ZORXMLParseError : public std::runtime_error {
@@ -21,5 +23,6 @@ class ZOR_PLATFORM_EXPORT ZORXMLParseError : public std::runtime_error {
   std::uint64_t column;  ///< from 1; 0 when the reason has no place
   std::string reason;    ///< one line
 };
+#endif
 
 #endif

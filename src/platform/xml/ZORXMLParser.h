@@ -10,8 +10,8 @@
 
 class ZOR_PLATFORM_EXPORT ZORXMLParser {
  public:
-  /// Prepares the XML library; may be called again and again. @return S_OK, or E_FAIL when it
-  /// cannot be prepared.
+  /// Prepares the XML library; may be called again and again.
+  /// @return S_OK, or E_FAIL when it cannot be prepared.
   static HRESULT Initialize();
 
   /// Makes a source over bytes in memory.
@@ -25,15 +25,14 @@ class ZOR_PLATFORM_EXPORT ZORXMLParser {
                                          const ZORUnicodeString& inIdentifier,
                                          unsigned char inAdopt, InputSource*& outSource);
 
-  /// Writes a node and all below it as XML text, without an XML declaration and with nothing between
-  /// the nodes of a document. Characters that must be escaped are, so that the text reads back as an
-  /// equal tree; only neighbouring texts read back as one, and a CDATA section that holds "]]>" or a
-  /// carriage return as several nodes with the same characters.
-  /// @param inEncoding name of the encoding the text is meant for; "UTF-8" and "UTF-16" are known, in
-  /// any case.
+  /// Writes a node and all below it as XML text, without an XML declaration and with nothing
+  /// between the nodes of a document. The text reads back as an equal tree, but for neighbouring
+  /// texts, which read back as one, and a CDATA section that holds "]]>" or a carriage return, which
+  /// reads back as several nodes with the same characters.
+  /// @param inEncoding the encoding that the text is meant for: "UTF-8" or "UTF-16", in any case.
   /// @param outText    the text; unchanged on failure.
   /// @return S_OK; E_INVALIDARG for a null node or an unknown encoding; E_FAIL for a tree that no XML
-  /// text can carry (a control character, half a surrogate pair, "--" in a comment).
+  ///         text can carry (a control character, half a surrogate pair, "--" in a comment).
   static HRESULT WriteXML(const DOM_Node& inNode, const ZORUnicodeString& inEncoding,
                           DOMString& outText);
 };

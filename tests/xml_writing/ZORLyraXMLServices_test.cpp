@@ -1,8 +1,9 @@
+#include "ZORLyraXMLServices.h"
+
 #include <gtest/gtest.h>
 
 #include <string>
 
-#include "ZORLyraXMLServices.h"
 #include "support/PlatformFolder.h"
 
 namespace {

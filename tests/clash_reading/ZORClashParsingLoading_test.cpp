@@ -2,7 +2,9 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
+#include <thread>
 #include <type_traits>
+#include <vector>
 
 #include "platform/xml/ZORXMLParseError.h"
 #include "support/LoadedReader.h"
@@ -514,6 +516,35 @@ TEST(ZORClashParsing, FullInfosBeforeLoadingEmptyTheResultName) {
     const bool reset = number == 8 || number == 9 || number == 13 || number == 14;
     EXPECT_EQ(reset ? "" : kUntouched, infos[number]) << number;
   }
+}
+
+// ---- The reader as an object
+
+// Hosts make readers by value, so that nothing may be added to these fields.
+struct GivenFields {
+  virtual ~GivenFields() = default;
+  char* path;
+  char* buffer;
+  int bufferLength;
+  ZORUnicodeString documentKind;
+  DOM_Element root;
+};
+static_assert(sizeof(ZORClashParsing) == sizeof(GivenFields));
+
+TEST(ZORClashParsing, ReadersOnDifferentThreadsDoNotDisturbEachOther) {
+  const auto loadAndRead = [](int inCount) {
+    std::string text = "<ClashElement><ClashResult>";
+    for (int i = 0; i < inCount; ++i) text += "<Interference/>";
+    text += "</ClashResult></ClashElement>";
+    for (int round = 0; round < 50; ++round) {
+      LoadedReader reader(text);
+      EXPECT_EQ(S_OK, IthInterference().Read(*reader, inCount).result);
+      EXPECT_EQ(E_FAIL, IthInterference().Read(*reader, inCount + 1).result);
+    }
+  };
+  std::vector<std::thread> threads;
+  for (int count = 1; count <= 4; ++count) threads.emplace_back(loadAndRead, count);
+  for (std::thread& thread : threads) thread.join();
 }
 
 }  // namespace

@@ -1,7 +1,9 @@
 // The 41 texts of one interference.
 #include <gtest/gtest.h>
 
+#include <array>
 #include <string>
+#include <tuple>
 
 #include "support/LoadedReader.h"
 #include "support/PlatformFolder.h"
@@ -33,6 +35,41 @@ std::string StatusOf(const std::string& inStatus) {
 }
 std::string RetrieveOf(const std::string& inRetrieve) {
   return Read("<Interference RetrieveInf=\"" + inRetrieve + "\"/>")[5];
+}
+
+// What is read into one string that is given for two outputs.
+std::string ReadIntoOne(int inNumber, int inOther, const char* inFirstAlien) {
+  SharedReader reader(
+      "<Interference><Product DescriptionID='Id' Alien='Alien' ShapeSource='Source' Alias='Alias' "
+      "ProcessMode='KORVAPDM' ShapeName='Shape'/></Interference>");
+  std::array<ZORUnicodeString, 41> texts;
+  texts[12] = inFirstAlien;
+  std::array<ZORUnicodeString*, 41> outputs;
+  for (std::size_t i = 0; i < texts.size(); ++i) outputs[i] = &texts[i];
+  outputs[static_cast<std::size_t>(inOther) - 1] = outputs[static_cast<std::size_t>(inNumber) - 1];
+  std::apply([&](auto*... outTexts) { reader->GetInterferenceDataV12(reader.root, *outTexts...); },
+             outputs);
+  return Text(*outputs[static_cast<std::size_t>(inNumber) - 1]);
+}
+
+// ---- Order of the outputs, which shows where a host gives one string twice
+
+TEST(InterferenceData, FirstProductIsFilledInItsOrder) {
+  EXPECT_EQ("Alien", ReadIntoOne(8, 13, ""));
+  EXPECT_EQ("Source", ReadIntoOne(13, 21, ""));
+  EXPECT_EQ("Id", ReadIntoOne(21, 15, ""));
+  EXPECT_EQ("Alias", ReadIntoOne(15, 17, ""));
+  EXPECT_EQ("KORVAPDM", ReadIntoOne(17, 10, ""));
+  EXPECT_EQ("Shape", ReadIntoOne(10, 19, ""));
+}
+
+TEST(InterferenceData, SecondProductIsFilledInItsOrder) {
+  EXPECT_EQ("Alien", ReadIntoOne(9, 14, "known"));
+  EXPECT_EQ("Source", ReadIntoOne(14, 22, "known"));
+  EXPECT_EQ("Id", ReadIntoOne(22, 16, "known"));
+  EXPECT_EQ("Alias", ReadIntoOne(16, 18, "known"));
+  EXPECT_EQ("KORVAPDM", ReadIntoOne(18, 11, "known"));
+  EXPECT_EQ("Shape", ReadIntoOne(11, 20, "known"));
 }
 
 // ---- Result type

@@ -3,6 +3,7 @@
 
 #include <array>
 #include <string>
+#include <tuple>
 
 #include "support/LoadedReader.h"
 
@@ -259,6 +260,19 @@ TEST(ZORClashParsing, FullInfosOfAnInterferenceOfTheFirstSetNameTheLastSet) {
   infos.Read(*reader, "1.2", 1);
   EXPECT_EQ("second", Text(infos.resultName));
   EXPECT_EQ("case 2", infos[4]);
+}
+
+// The result's name is given as the rule's clearance too: it is the own set's when that replaces
+// the clearance.
+TEST(ZORClashParsing, FullInfosNameTheOwnSetBeforeTheLast) {
+  LoadedReader reader(
+      "<ClashElement><ClashResult Name='A'><Interference/></ClashResult>"
+      "<ClashResult Name='B'/></ClashElement>");
+  std::array<ZORUnicodeString, 41> texts;
+  std::apply([&](auto&... outTexts) { reader->GetClashInfos("1.1", 1, texts[6], outTexts...); },
+             texts);
+  EXPECT_EQ("A", Text(texts[1]));
+  EXPECT_EQ("B", Text(texts[6]));
 }
 
 TEST(ZORClashParsing, FullInfosOfALaterSetWithoutAttributesEmptyNameAndCase) {

@@ -1,7 +1,8 @@
 // The picture of an interference: scene, colours, view and the pictures beside it.
+#include "PrintPictures.h"
+
 #include <gtest/gtest.h>
 
-#include "PrintPictures.h"
 #include "default_platform/system/ObjectCounters.h"
 #include "pictures/FakeObjects.h"
 #include "support/AbandonedMemory.h"

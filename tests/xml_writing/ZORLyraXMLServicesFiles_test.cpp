@@ -403,12 +403,13 @@ TEST_F(FileCopy, OfAMissingFileGivesThePlatformsCodeAndLeavesTheTarget) {
   EXPECT_EQ(support::ReadFile(folder_.FilePath("to/a")), "old");
 }
 
-TEST_F(FileCopy, OfPathsThatDoNotFitCopiesNothing) {
+// The joined path is empty then, which no path may be.
+TEST_F(FileCopy, OfPathsThatDoNotFitGivesThePlatformsCodeOfTheCopy) {
   const std::string longest(255, 'n');
   folder_.WriteFile(longest, "bytes");
   fs::create_directory(folder_.path / "to");
   EXPECT_EQ(writer_.CopyFile(longest.c_str(), folder_.path.c_str(), folder_.FilePath("to").c_str()),
-            E_INVALIDARG);
+            kZORFileBadPath);
   EXPECT_TRUE(fs::is_empty(folder_.path / "to"));
 }
 
@@ -425,5 +426,5 @@ TEST_F(FileCopy, OfPathsThatJustFit) {
   EXPECT_EQ(support::ReadFile(folder_.FilePath("to/" + name)), "new");
   EXPECT_EQ(writer_.CopyFile((name + "n").c_str(), folder_.FilePath("fr").c_str(),
                              folder_.FilePath("to").c_str()),
-            E_INVALIDARG);
+            kZORFileBadPath);
 }

@@ -1,16 +1,23 @@
-#include "path_text/LogicalNames.h"
+#include "LogicalNames.h"
 
 #include <memory>
 
 #include "BuildPath.h"
+#include "PlatformAdapter.h"
 #include "platform/system/ZORDocumentLocation.h"
 
 namespace {
-constexpr char kScheme[] = "ZORDLN://";
-constexpr int kSchemeLength = 9;
-constexpr int kMarkLength = 3;  // what stands before a name that begins with no ordinary character
+constexpr int kMarkLength = 3;  // of what precedes a name after a first byte that is not ASCII text
 
-// The directory as the table holds it, not expanded; null when the name is not there.
+ZORUnicodeString From(const ZORUnicodeString& inText, int inStart) {
+  return inText.SubString(inStart, inText.GetLengthInChar() - inStart);
+}
+
+int Find(const ZORUnicodeString& inText, const ZORUnicodeString& inPart) {
+  return inText.SearchSubString(inPart, 0, adapter::kSearchForward);
+}
+
+/// The directory as the table holds it, not expanded; null for a name that is not in it.
 std::unique_ptr<ZORUnicodeString> LookUp(const ZORUnicodeString& inName) {
   ZORUnicodeString* found = nullptr;
   const HRESULT result = ZORGetDLName(inName, &found);
@@ -25,29 +32,36 @@ ZORUnicodeString DirectoryOr(const ZORUnicodeString& inName, const ZORUnicodeStr
   return FAILED(ZORExpandString(directory.get())) ? ZORUnicodeString() : *directory;
 }
 
-// Bytes beyond ASCII count as negative, whatever the compiler's char is.
+// Compared as a signed byte, whatever the compiler's char is: bytes beyond ASCII are negative.
 bool BeginsWithOrdinaryCharacter(const ZORUnicodeString& inName) {
-  return inName.ConvertToString()[0].SignedValue() > 1;
+  const char first = inName.ConvertToString()[0];
+  return static_cast<signed char>(first) > 1;
 }
 }  // namespace
 
 ZORUnicodeString DirectoryOfLogicalName(const ZORUnicodeString& inName) {
   if (BeginsWithOrdinaryCharacter(inName)) return DirectoryOr(inName, inName);
-  return DirectoryOr(inName.SubString(kMarkLength), ZORUnicodeString());
+  return DirectoryOfPrefixedName(inName, kMarkLength);
+}
+
+ZORUnicodeString DirectoryOfPrefixedName(const ZORUnicodeString& inText, int inPrefixLength) {
+  const bool isShort = inText.GetLengthInChar() <= inPrefixLength;
+  return DirectoryOr(isShort ? ZORUnicodeString() : From(inText, inPrefixLength),
+                     ZORUnicodeString());
 }
 
 ZORUnicodeString PathOfReference(const ZORUnicodeString& inReference) {
-  const int scheme = inReference.SearchSubString(kScheme);
+  const int scheme = Find(inReference, kLogicalNameScheme);
   if (scheme < 0) return inReference;
-  const ZORUnicodeString rest = inReference.SubString(scheme + kSchemeLength);
+  const ZORUnicodeString rest = From(inReference, scheme + kLogicalNameSchemeLength);
   const ZORUnicodeString slash = BuildPath::AppendSlash();
-  const int split = rest.SearchSubString(slash);
+  const int split = Find(rest, slash);
 
   const std::unique_ptr<ZORUnicodeString> path =
       LookUp(split < 0 ? rest : rest.SubString(0, split));
   if (path == nullptr) return ZORUnicodeString();
   if (FAILED(ZORExpandString(path.get()))) return ZORUnicodeString("error");
   path->Append(slash);
-  if (split >= 0) path->Append(rest.SubString(split + 1));
+  if (split >= 0) path->Append(From(rest, split + 1));
   return *path;
 }
