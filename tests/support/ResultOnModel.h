@@ -24,16 +24,15 @@ class ResultOnModel {
     ZORToolkit::ForEachInterference(
         document, ZORToolkit::RecordPart::kAll,
         [&](const ZORToolkit::InterferenceRecord& inRecord) {
-          records_.push_back(inRecord);
           resolved_.push_back(scenes_.Resolve(inRecord, ZORToolkit::ProductPlaces::kResult));
         });
   }
-  std::size_t Count() const { return records_.size(); }
+  std::size_t Count() const { return resolved_.size(); }
   const ZORToolkit::ResolvedInterference& Resolved(std::size_t inIndex) const {
     return resolved_[inIndex];
   }
   ZORDefault::InterferenceScene Scene(std::size_t inIndex) const {
-    return ZORToolkit::MakeScene(records_[inIndex], resolved_[inIndex]);
+    return ZORToolkit::MakeScene(resolved_[inIndex]);
   }
 
   ZORDefault::OpenedModel model;
@@ -46,7 +45,6 @@ class ResultOnModel {
   }
 
   ZORToolkit::InterferenceScenes scenes_;
-  std::vector<ZORToolkit::InterferenceRecord> records_;
   std::vector<ZORToolkit::ResolvedInterference> resolved_;
 };
 

@@ -163,7 +163,7 @@ TEST(InterferenceScenes, AliasIsThePathWhereTheIdentifierIsNone) {
 TEST(InterferenceScenes, InterferenceWithoutProductsHasNone) {
   const ResolvedInterference resolved = Resolve({});
   EXPECT_FALSE(resolved.HasProduct());
-  EXPECT_FALSE(MakeScene({}, resolved).interference.IsNull());
+  EXPECT_FALSE(MakeScene(resolved).interference.IsNull());
 }
 
 TEST(InterferenceScenes, ColoursAreThoseOfThePicture) {

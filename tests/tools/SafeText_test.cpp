@@ -2,7 +2,6 @@
 
 #include <gtest/gtest.h>
 
-using lyra::CaseFolded;
 using lyra::Cut;
 using lyra::DisplayWidth;
 using lyra::EscapedForJson;
@@ -58,10 +57,4 @@ TEST(Fitted, CutsAtTheChosenEnd) {
 TEST(Fitted, DoesNotSplitAWideCharacter) {
   EXPECT_EQ(Fitted("日本語", 4, Cut::kEnd), "日…");
   EXPECT_EQ(Fitted("日本語", 4, Cut::kStart), "…語");
-}
-
-TEST(CaseFolded, MakesLettersOfAllCasesEqual) {
-  EXPECT_EQ(CaseFolded("ABC é"), CaseFolded("abc É"));
-  EXPECT_EQ(CaseFolded("ΣΣ"), CaseFolded("σς"));
-  EXPECT_NE(CaseFolded("a"), CaseFolded("b"));
 }

@@ -58,7 +58,7 @@ int Federate(const FederateOptions& inOptions, Output& ioOutput) {
   inOptions.prologue.Check();
   const std::vector<LinkRecord> links = GatherLinks(inOptions);
   OutputFile output(inOptions.output);
-  const std::string& path = output.Path();
+  const std::string path = output.Path();
   output.Check(CreateFederator(inOptions.prologue, path));
   const std::unique_ptr<ClashDocument> federator = LoadNew(path, inOptions.output);
   ClashDocumentEdit edit(*federator);

@@ -14,8 +14,8 @@ using namespace ZORToolkit;
 namespace {
 
 struct ListOptions {
-  std::string file, language, result, product;
-  std::vector<std::string> types, statuses;
+  std::string file, language;
+  FilterOptions filter;
   bool json = false, csv = false;
 };
 
@@ -40,29 +40,20 @@ std::vector<std::string> Cells(const InterferenceRecord& inRecord) {
           NameOf(inRecord.products[1])};
 }
 
-ListFilter FilterOf(const ListOptions& inOptions) {
-  ListFilter filter;
-  filter.SetTypes(inOptions.types);
-  filter.SetStatuses(inOptions.statuses);
-  if (!inOptions.result.empty()) filter.SetResult(inOptions.result);
-  if (!inOptions.product.empty()) filter.SetProduct(inOptions.product);
-  return filter;
-}
-
 /// What a row needs.
-RecordPart PartFor(const ListFilter& inFilter) {
+RecordPart PartFor(const RecordFilter& inFilter) {
   return inFilter.NeedsLabels() ? RecordPart::kAll : RecordPart::kRow;
 }
 
 template <class Visit>
-void ForEachAccepted(ClashDocument& ioDocument, const ListFilter& inFilter, RecordPart inPart,
+void ForEachAccepted(ClashDocument& ioDocument, const RecordFilter& inFilter, RecordPart inPart,
                      const Visit& inVisit) {
   ForEachInterference(ioDocument, inPart, [&](const InterferenceRecord& inRecord) {
     if (inFilter.Accepts(inRecord)) inVisit(inRecord);
   });
 }
 
-void PrintJson(ClashDocument& ioDocument, const ListFilter& inFilter, Output& ioOutput) {
+void PrintJson(ClashDocument& ioDocument, const RecordFilter& inFilter, Output& ioOutput) {
   JsonArray array(ioOutput);
   ForEachAccepted(ioDocument, inFilter, RecordPart::kAll,
                   [&](const InterferenceRecord& inRecord) { array.Add(inRecord); });
@@ -70,7 +61,7 @@ void PrintJson(ClashDocument& ioDocument, const ListFilter& inFilter, Output& io
   ioOutput.Write("\n");
 }
 
-void PrintCsv(ClashDocument& ioDocument, const ListFilter& inFilter, Output& ioOutput) {
+void PrintCsv(ClashDocument& ioDocument, const RecordFilter& inFilter, Output& ioOutput) {
   ioOutput.Write(CsvRow(Headers()));
   ForEachAccepted(ioDocument, inFilter, PartFor(inFilter), [&](const InterferenceRecord& inRecord) {
     std::vector<std::string> cells = Cells(inRecord);
@@ -81,7 +72,7 @@ void PrintCsv(ClashDocument& ioDocument, const ListFilter& inFilter, Output& ioO
   });
 }
 
-void PrintTable(ClashDocument& ioDocument, const ListFilter& inFilter, Output& ioOutput) {
+void PrintTable(ClashDocument& ioDocument, const RecordFilter& inFilter, Output& ioOutput) {
   std::vector<TableColumn> columns;
   for (const std::string& header : Headers()) columns.push_back({header});
   columns[0].align = columns[2].align = TableColumn::Align::kRight;
@@ -95,7 +86,7 @@ void PrintTable(ClashDocument& ioDocument, const ListFilter& inFilter, Output& i
 int List(const ListOptions& inOptions, Output& ioOutput) {
   if (inOptions.json && inOptions.csv)
     throw UsageError("list: --json and --csv exclude each other");
-  const ListFilter filter = FilterOf(inOptions);
+  const RecordFilter filter = FilterOf(inOptions.filter);
   ChooseLanguage(inOptions.language);
   ClashDocument document(inOptions.file);
   document.RequireInterferences();
@@ -113,14 +104,14 @@ int List(const ListOptions& inOptions, Output& ioOutput) {
 VerbAction DeclareList(Arguments& ioArguments) {
   const auto options = std::make_shared<ListOptions>();
   ioArguments.Positional("FILE", options->file, "A clash result, or - for standard input");
-  ioArguments.Texts("--type", "TYPE", options->types,
+  ioArguments.Texts("--type", "TYPE", options->filter.types,
                     "Only clash, contact, clearance or error; may be given several times");
   ioArguments.Words("--type", kTypeWords);
-  ioArguments.Texts("--status", "STATUS", options->statuses,
+  ioArguments.Texts("--status", "STATUS", options->filter.statuses,
                     "Only relevant, irrelevant, not-inspected or error; likewise");
   ioArguments.Words("--status", kStatusWords);
-  ioArguments.Text("--result", "NAME", options->result, "Only the result set of this name");
-  ioArguments.Text("--product", "TEXT", options->product,
+  ioArguments.Text("--result", "NAME", options->filter.result, "Only the result set of this name");
+  ioArguments.Text("--product", "TEXT", options->filter.product,
                    "Only with a product whose alias, identifier, instance or label holds TEXT");
   ioArguments.Flag("--json", options->json, "Print a JSON array of all that is known of each");
   ioArguments.Flag("--csv", options->csv, "Print comma-separated values for a spreadsheet");

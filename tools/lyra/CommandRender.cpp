@@ -92,17 +92,17 @@ void Fill(Scene& ioScene, const RenderOptions& inOptions, const ZORIProduct_var&
 }
 
 int Render(const RenderOptions& inOptions, Output& ioOutput) {
-  PictureWishes wishes;
-  wishes.format = FormatOfPicture(inOptions.picture);
-  wishes.view = ViewOf(inOptions.view);
-  wishes.keepsBackground = inOptions.keepBackground;
-  if (!inOptions.size.empty()) wishes.size = SizeOf(inOptions.size);
+  PictureOptions picture;
+  picture.format = FormatOfPicture(inOptions.picture);
+  picture.view = ViewOf(inOptions.view);
+  picture.keepsBackground = inOptions.keepBackground;
+  if (!inOptions.size.empty()) picture.size = SizeOf(inOptions.size);
   { const OutputFile probe(inOptions.picture); }  // fails at once where nothing can be written
   const ZORIProduct_var root = OpenModelFile(inOptions.file).root;
   Scene scene;
   Fill(scene, inOptions, root);
   OutputFile file(inOptions.picture);
-  TakePicture(*scene.Rep(), wishes, file.Path());
+  TakePicture(*scene.Rep(), picture, file.Path());
   if (fs::is_empty(file.Path()))
     throw InputError(inOptions.picture + ": the picture cannot be drawn or written");
   file.Finish(ioOutput);

@@ -1,38 +1,26 @@
-// Which interferences a list shows.
+// Which interferences a user asks for.
 #ifndef ZOR_TOOLS_LYRA_LIST_FILTER_H
 #define ZOR_TOOLS_LYRA_LIST_FILTER_H
 
-#include <optional>
 #include <string>
 #include <vector>
 
-#include "toolkit/records/InterferenceRecord.h"
+#include "toolkit/records/RecordFilter.h"
 
 namespace lyra {
 
 inline constexpr const char* kTypeWords[] = {"clash", "contact", "clearance", "error"};
 inline constexpr const char* kStatusWords[] = {"relevant", "irrelevant", "not-inspected", "error"};
 
-/// All conditions must hold; an absent one always holds.
-class ListFilter {
- public:
-  /// Clash, contact, clearance or error in any letter case; any of several. Raises UsageError for
-  /// another word.
-  void SetTypes(const std::vector<std::string>& inWords);
-  /// Relevant, irrelevant, not-inspected (or "not inspected") or error, likewise.
-  void SetStatuses(const std::vector<std::string>& inWords);
-  void SetResult(const std::string& inName) { result_ = inName; }
-  /// A text that the alias, id, instance or label of one of the products holds in any letter case.
-  void SetProduct(const std::string& inText);
-
-  /// Whether Accepts looks at the products' labels.
-  bool NeedsLabels() const { return product_.has_value(); }
-  bool Accepts(const ZORToolkit::InterferenceRecord& inRecord) const;
-
- private:
-  std::vector<std::string> types_, statuses_;
-  std::optional<std::string> result_, product_;
+/// As given; empty for no condition.
+struct FilterOptions {
+  std::vector<std::string> types;     ///< of kTypeWords in any letter case
+  std::vector<std::string> statuses;  ///< of kStatusWords, likewise; also "not inspected"
+  std::string result, product;
 };
+
+/// Raises UsageError for a word that is not known.
+ZORToolkit::RecordFilter FilterOf(const FilterOptions& inOptions);
 
 }  // namespace lyra
 

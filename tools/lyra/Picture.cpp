@@ -17,14 +17,12 @@ namespace lyra {
 using namespace ZORToolkit;
 namespace {
 
-constexpr int kLargestSize = 16384;
-
 /// @return 0 for what is no whole number or out of range.
 int PixelCount(std::string_view inText) {
   int count = 0;
   const auto [end, error] = std::from_chars(inText.data(), inText.data() + inText.size(), count);
   const bool isNumber = error == std::errc() && end == inText.data() + inText.size();
-  return isNumber && count >= 1 && count <= kLargestSize ? count : 0;
+  return isNumber && count >= 1 && count <= kMaxPictureSize ? count : 0;
 }
 
 struct Releaser {
@@ -64,7 +62,7 @@ PictureSize SizeOf(const std::string& inText) {
     size = {PixelCount(text.substr(0, by)), PixelCount(text.substr(by + 1))};
   if (size.width == 0 || size.height == 0)
     throw UsageError("--size: a size is such as 756x506, each 1 to " +
-                     std::to_string(kLargestSize) + ", not \"" + inText + "\"");
+                     std::to_string(kMaxPictureSize) + ", not \"" + inText + "\"");
   return size;
 }
 
@@ -77,17 +75,17 @@ std::optional<PictureView> ViewOf(const std::string& inWord) {
   return views[place - 1];
 }
 
-void TakePicture(ZOR3DRep& inRep, const PictureWishes& inWishes, const std::string& inPath) {
+void TakePicture(ZOR3DRep& inRep, const PictureOptions& inOptions, const std::string& inPath) {
   constexpr int kPlainModes = 1;
-  const auto [width, height] = inWishes.size;
-  const int keepsBackground = inWishes.keepsBackground ? 1 : 0;
+  const auto [width, height] = inOptions.size;
+  const int keepsBackground = inOptions.keepsBackground ? 1 : 0;
   const ZORUnicodeString path = FromUtf8(inPath);
-  const char* const format = inWishes.format == PictureFormat::kPng ? "PNG" : "JPEG";
-  if (inWishes.view)
+  const char* const format = FormatName(inOptions.format);
+  if (inOptions.view)
     PrintPictures::TakeRepImage(&inRep, path,
-                                ViewpointOf(*inWishes.view, inWishes.size, inRep).get(), format,
+                                ViewpointOf(*inOptions.view, inOptions.size, inRep).get(), format,
                                 width, height, kPlainModes, keepsBackground);
-  else if (inWishes.format == PictureFormat::kPng)
+  else if (inOptions.format == PictureFormat::kPng)
     PrintPictures::TakeRepImage(&inRep, path, format, width, height, kPlainModes, keepsBackground);
   else
     ZORLyraXMLServices::TakeRepImage(&inRep, path, width, height, kPlainModes, keepsBackground);

@@ -7,15 +7,9 @@
 
 #include "platform/mathematics/ZORMathVector.h"
 #include "platform/visualisation/ZOR3DRep.h"
+#include "toolkit/publishing/PictureOptions.h"
 
 namespace lyra {
-
-enum class PictureFormat { kJpeg, kPng };
-
-struct PictureSize {
-  int width = 756;
-  int height = 506;
-};
 
 /// A direction to look in, without perspective.
 struct PictureView {
@@ -23,18 +17,18 @@ struct PictureView {
   ZORMathVector up;
 };
 
-struct PictureWishes {
-  PictureFormat format = PictureFormat::kJpeg;
-  PictureSize size;
+struct PictureOptions {
+  ZORToolkit::PictureFormat format = ZORToolkit::PictureFormat::kJpeg;
+  ZORToolkit::PictureSize size;
   std::optional<PictureView> view;  ///< none: from a corner, in perspective
   bool keepsBackground = false;
 };
 
 // What users write; each raises UsageError for what it does not know.
 /// By the ending of the picture's name, in any letter case.
-PictureFormat FormatOfPicture(const std::string& inPath);
+ZORToolkit::PictureFormat FormatOfPicture(const std::string& inPath);
 /// "WxH", 1 to 16384 each.
-PictureSize SizeOf(const std::string& inText);
+ZORToolkit::PictureSize SizeOf(const std::string& inText);
 inline constexpr const char* kViewWords[] = {"iso",   "front", "back",  "left",
                                              "right", "top",   "bottom"};
 /// One of these words; "iso" is none. The front is seen in the direction of the y axis, z upwards;
@@ -42,7 +36,7 @@ inline constexpr const char* kViewWords[] = {"iso",   "front", "back",  "left",
 std::optional<PictureView> ViewOf(const std::string& inWord);
 
 /// Writes a picture with all of a representation framed; no file when it cannot be drawn.
-void TakePicture(ZOR3DRep& inRep, const PictureWishes& inWishes, const std::string& inPath);
+void TakePicture(ZOR3DRep& inRep, const PictureOptions& inOptions, const std::string& inPath);
 
 }  // namespace lyra
 

@@ -4,7 +4,6 @@
 #include <clocale>
 #include <cstdio>
 #include <cwchar>
-#include <cwctype>
 #include <vector>
 
 #include "foundation/Utf8.h"
@@ -126,15 +125,6 @@ std::string Fitted(std::string_view inText, int inWidth, Cut inCut) {
   std::string fitted;
   for (char32_t point : points) AppendCodePoint(point, fitted);
   return fitted;
-}
-
-std::string CaseFolded(std::string_view inText) {
-  std::string folded;
-  const UnicodeTables tables;
-  // By way of the capital, so that both forms of a letter such as the Greek sigma meet.
-  for (char32_t point : CodePoints(inText))
-    AppendCodePoint(static_cast<char32_t>(towlower(towupper(static_cast<wint_t>(point)))), folded);
-  return folded;
 }
 
 }  // namespace lyra

@@ -23,9 +23,6 @@ enum class Cut { kStart, kEnd };
 /// A printable text of at most inWidth columns; what is left out is shown by "…".
 std::string Fitted(std::string_view inText, int inWidth, Cut inCut);
 
-/// The text with differences of letter case taken out, character by character.
-std::string CaseFolded(std::string_view inText);
-
 }  // namespace lyra
 
 #endif

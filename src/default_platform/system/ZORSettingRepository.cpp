@@ -8,7 +8,9 @@
 #include <memory>
 #include <mutex>
 #include <string>
+#include <vector>
 
+#include "default_platform/SettingOverride.h"
 #include "default_platform/system/TomlFiles.h"
 #include "platform/system/ZORSysSettingRepository.h"
 
@@ -76,6 +78,27 @@ bool ConvertTomlValue(const TomlValue& inValue, int& outValue) {
   return true;
 }
 
+/// A value that goes before those of the files.
+struct OverriddenSetting {
+  const SettingOverride* owner;
+  std::string repository, setting;
+  TomlValue value;
+};
+std::vector<OverriddenSetting>& Overrides() {
+  static std::vector<OverriddenSetting> overrides;
+  return overrides;
+}
+
+/// @param inSetting null: any setting of the repository.
+const TomlValue* FindOverride(const std::string& inRepository, const char* inSetting) {
+  const auto found = std::find_if(Overrides().rbegin(), Overrides().rend(),
+                                  [&](const OverriddenSetting& inOverride) {
+                                    return inOverride.repository == inRepository &&
+                                           (!inSetting || inOverride.setting == inSetting);
+                                  });
+  return found == Overrides().rend() ? nullptr : &found->value;
+}
+
 /// A repository that reads NAME.toml of a folder of the setting directories at each call.
 /// @tparam Repository ZORSettingRepository or ZORSysSettingRepository.
 template <class Repository>
@@ -83,7 +106,10 @@ class TomlSettingRepository final : public Repository {
  public:
   /// The one repository of a name; null when its file is not there or damaged.
   static Repository* Find(const char* inFolder, const char* inName) {
-    if (!inName || !ReadSettingFile(inFolder, inName)) return nullptr;
+    if (!inName) return nullptr;
+    if (!FindOverride(inFolder + std::string(inName), nullptr) &&
+        !ReadSettingFile(inFolder, inName))
+      return nullptr;
     // Never destroyed: callers keep repositories until the process ends.
     static auto* const repositories =
         new std::map<std::string, std::unique_ptr<TomlSettingRepository>, std::less<>>();
@@ -137,8 +163,9 @@ class TomlSettingRepository final : public Repository {
     return S_OK;
   }
 
-  static const TomlValue* ValueOf(const std::shared_ptr<const TomlTable>& inTable,
-                                  const char* inName) {
+  const TomlValue* ValueOf(const std::shared_ptr<const TomlTable>& inTable,
+                           const char* inName) const {
+    if (const TomlValue* const value = FindOverride(folder_ + name_, inName)) return value;
     if (!inTable) return nullptr;
     const auto found = inTable->find(std::string_view(inName));
     return found == inTable->end() ? nullptr : &found->second;
@@ -149,6 +176,16 @@ class TomlSettingRepository final : public Repository {
 };
 
 }  // namespace
+SettingOverride::SettingOverride(const std::string& inRepository, const std::string& inSetting,
+                                 int inValue) {
+  Overrides().push_back({this, inRepository, inSetting, static_cast<std::int64_t>(inValue)});
+}
+
+SettingOverride::~SettingOverride() {
+  std::erase_if(Overrides(),
+                [&](const OverriddenSetting& inOverride) { return inOverride.owner == this; });
+}
+
 }  // namespace ZORDefault
 
 ZORSettingRepository::~ZORSettingRepository() = default;

@@ -1,8 +1,13 @@
 #include "toolkit/publishing/ReportWriter.h"
 
 #include <algorithm>
+#include <functional>
+#include <map>
 #include <span>
 #include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
 
 #include "BuildPath.h"
 #include "ZORLyraGeneralServices.h"
@@ -111,18 +116,6 @@ const char* Substitute(const ZORUC2Bytes* inUnits, int inPosition, int inCount) 
   return unit < 0x20 || unit >= 0xFFFE ? kReplacement : nullptr;
 }
 
-void WriteAttributes(const DOM_Node& inElement, Names inNames, ZORLyraXMLServices& ioWriter) {
-  const DOM_NamedNodeMap attributes = inElement.getAttributes();
-  const unsigned int count = attributes.getLength();
-  for (unsigned int i = 0; i < count; ++i) {
-    const DOM_Node attribute = attributes.item(i);
-    const DOMString name = attribute.getNodeName();
-    if (!IsAmong(name, inNames)) continue;
-    ioWriter.AddAttr(name.DOMStringToZORUnicodeString(),
-                     AttributeValue(ZORLyraGeneralServices::GetDOMName(attribute.getNodeValue())));
-  }
-}
-
 /// The first child element, from a node on, that reports have.
 DOM_Node NextKnown(DOM_Node inNode, Names inNames) {
   while (!inNode.isNull() && (inNode.getNodeType() != DOM_Node::ELEMENT_NODE ||
@@ -131,21 +124,146 @@ DOM_Node NextKnown(DOM_Node inNode, Names inNames) {
   return inNode;
 }
 
-// Every name that is written is one of the rules', so no depth of the document makes this deep.
-void WriteElement(const DOM_Node& inElement, ZORLyraXMLServices& ioWriter) {
-  const ElementRule* rule = RuleOf(inElement.getNodeName());
-  if (rule == nullptr) return;
-  ioWriter.InitXMLMarkerWithAttr(rule->name);
-  WriteAttributes(inElement, rule->attributes, ioWriter);
-  DOM_Node child = NextKnown(inElement.getFirstChild(), rule->children);
-  if (child.isNull()) {
-    ioWriter.CloseXMLAttrMarkerWithoutElem();
-    return;
+/// Puts a report into the library's writer.
+struct MarkerWriter {
+  ZORLyraXMLServices& services;
+
+  void Begin(const DOM_Node&, const char* inName) const { services.InitXMLMarkerWithAttr(inName); }
+  void Attribute(const ZORUnicodeString& inName, const ZORUnicodeString& inValue) const {
+    services.AddAttr(inName, inValue);
   }
-  ioWriter.CloseXMLAttrMarkerWithElem();
+  void EndAttributes(bool inHasChildren) const {
+    inHasChildren ? services.CloseXMLAttrMarkerWithElem()
+                  : services.CloseXMLAttrMarkerWithoutElem();
+  }
+  void End(const char* inName) const { services.CloseXMLMarker(inName); }
+};
+
+/// Puts a report, laid out as the library's writer does, and what a page knows besides into a text.
+class AnnotatingWriter {
+ public:
+  AnnotatingWriter(const PublishedResult& inPublished, std::string& ioText)
+      : published_(inPublished), text_(ioText) {}
+
+  void Begin(const DOM_Node& inElement, const char* inName) {
+    text_.append("<").append(inName).append(" ");
+    attributes_.clear();
+    appended_.clear();
+    const std::string_view name = inName;
+    if (open_.empty()) AnnotateRoot();
+    if (name == "Interference") AnnotateInterference(ElementHandle(inElement));
+    if (name == "Product") AnnotateProduct(ElementHandle(inElement));
+    name_ = inName;
+  }
+  void Attribute(const ZORUnicodeString& inName, const ZORUnicodeString& inValue) {
+    text_.append(Utf8(inName)).append("=\"").append(Utf8(inValue)).append("\" ");
+  }
+  void EndAttributes(bool inHasChildren) {
+    text_ += attributes_;
+    if (inHasChildren) {
+      text_ += "> \n";
+      open_.push_back(appended_);
+    } else if (appended_.empty()) {
+      text_ += "/> \n\n";
+    } else {
+      text_.append(">").append(appended_).append("</").append(name_).append("> \n\n");
+    }
+  }
+  void End(const char* inName) {
+    text_.append("\n").append(open_.back()).append("</").append(inName).append("> \n");
+    open_.pop_back();
+  }
+
+ private:
+  static void Set(const char* inName, const std::string& inValue, std::string& ioText) {
+    if (inValue.empty()) return;
+    const std::string value = Utf8(AttributeValue(FromUtf8(inValue)));
+    ioText.append(inName).append("=\"").append(value).append("\" ");
+  }
+
+  // Style sheets can count only slowly. The most frequent words first.
+  void Count(const char* inElement, std::string PublishedInterference::*inWord) {
+    std::map<std::string, std::size_t> counts;
+    for (const PublishedInterference& each : published_.interferences) ++counts[each.*inWord];
+    std::vector<std::pair<std::string, std::size_t>> words(counts.begin(), counts.end());
+    std::ranges::stable_sort(words, std::ranges::greater(),
+                             &std::pair<std::string, std::size_t>::second);
+    for (const auto& [word, count] : words) {
+      appended_.append("<").append(inElement).append(" ");
+      Set("page:word", word, appended_);
+      Set("page:count", std::to_string(count), appended_);
+      appended_ += "/>";
+    }
+  }
+
+  void AnnotateRoot() {
+    text_ += "xmlns:page=\"urn:zorlyra:page\" ";
+    Set("page:model", published_.model, attributes_);
+    if (published_.isAsInModel) Set("page:asInModel", "yes", attributes_);
+    Count("page:Type", &PublishedInterference::type);
+    Count("page:Status", &PublishedInterference::status);
+  }
+
+  void AnnotateInterference(const ElementHandle& inElement) {
+    interference_ = nullptr;
+    if (next_ == published_.interferences.size() ||
+        !(published_.interferences[next_].element == inElement))
+      return;
+    interference_ = &published_.interferences[next_++];
+    Set("page:number", std::to_string(interference_->number), attributes_);
+    Set("page:type", interference_->type, attributes_);
+    Set("page:status", interference_->status, attributes_);
+    Set("page:picture", interference_->picture, attributes_);
+    Set("page:asInModel", interference_->whyAsInModel, attributes_);
+    for (const std::string& thumbnail : interference_->thumbnails) {
+      appended_ += "<page:Thumbnail ";
+      Set("href", thumbnail, appended_);
+      appended_ += "/>";
+    }
+  }
+
+  void AnnotateProduct(const ElementHandle& inElement) {
+    if (interference_ == nullptr) return;
+    for (const PublishedProduct& product : interference_->products) {
+      if (!(product.element == inElement)) continue;
+      Set("page:colour", product.colour, attributes_);
+      Set("page:preview", product.preview, attributes_);
+      if (product.isMissing) Set("page:missing", "yes", attributes_);
+    }
+  }
+
+  const PublishedResult& published_;
+  std::string& text_;
+  std::string attributes_;  // of the element that is begun, behind its own
+  std::string appended_;    // its elements, behind its own
+  const char* name_ = "";
+  std::vector<std::string> open_;  // what is appended to the elements around
+  std::size_t next_ = 0;
+  const PublishedInterference* interference_ = nullptr;
+};
+
+// Every name that is written is one of the rules', so no depth of the document makes this deep.
+template <class Writer>
+void WriteElement(const DOM_Node& inElement, Writer& ioWriter) {
+  const ElementRule* const rule = RuleOf(inElement.getNodeName());
+  if (rule == nullptr) return;
+  ioWriter.Begin(inElement, rule->name);
+  const DOM_NamedNodeMap attributes = inElement.getAttributes();
+  const unsigned int count = attributes.getLength();
+  for (unsigned int i = 0; i < count; ++i) {
+    const DOM_Node attribute = attributes.item(i);
+    const DOMString name = attribute.getNodeName();
+    if (!IsAmong(name, rule->attributes)) continue;
+    ioWriter.Attribute(
+        name.DOMStringToZORUnicodeString(),
+        AttributeValue(ZORLyraGeneralServices::GetDOMName(attribute.getNodeValue())));
+  }
+  DOM_Node child = NextKnown(inElement.getFirstChild(), rule->children);
+  ioWriter.EndAttributes(!child.isNull());
+  if (child.isNull()) return;
   for (; !child.isNull(); child = NextKnown(child.getNextSibling(), rule->children))
     WriteElement(child, ioWriter);
-  ioWriter.CloseXMLMarker(rule->name);
+  ioWriter.End(rule->name);
 }
 
 }  // namespace
@@ -182,8 +300,16 @@ HRESULT WriteReport(const ClashDocument& inDocument, const Prologue& inPrologue,
       RootName(inDocument.Kind()),
       inPrologue.dtd.empty() ? ZORUnicodeString(kDocumentType) : FromUtf8(inPrologue.dtd),
       AttributeValue(styleSheet));
-  WriteElement(inDocument.Root(), writer);
+  MarkerWriter markers{writer};
+  WriteElement(inDocument.Root(), markers);
   return writer.DumpDocument(FromUtf8(inPath));
+}
+
+std::string AnnotatedReport(const ClashDocument& inDocument, const PublishedResult& inPublished) {
+  std::string text = "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n";
+  AnnotatingWriter writer(inPublished, text);
+  WriteElement(inDocument.Root(), writer);
+  return text;
 }
 
 }  // namespace ZORToolkit

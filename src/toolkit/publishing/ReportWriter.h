@@ -2,7 +2,9 @@
 #ifndef ZOR_TOOLKIT_PUBLISHING_REPORT_WRITER_H
 #define ZOR_TOOLKIT_PUBLISHING_REPORT_WRITER_H
 
+#include <array>
 #include <string>
+#include <vector>
 
 #include "toolkit/records/ClashDocumentEdit.h"
 
@@ -17,6 +19,37 @@ namespace ZORToolkit {
 /// Raises Error for a document without interferences.
 ZOR_TOOLKIT_EXPORT HRESULT WriteReport(const ClashDocument& inDocument, const Prologue& inPrologue,
                                        const std::string& inPath);
+
+/// What a page knows of a product besides the report. UTF-8.
+struct PublishedProduct {
+  ElementHandle element;
+  std::string colour;   ///< "#rrggbb" as in the picture; empty when it has none of its own
+  std::string preview;  ///< relative to the page; empty when there is none
+  bool isMissing = false;
+};
+
+/// The same of an interference.
+struct PublishedInterference {
+  ElementHandle element;
+  int number = 0;  ///< in the whole result, from 1
+  std::string type, status;
+  std::string picture;  ///< relative to the page; empty when there is none
+  std::vector<std::string> thumbnails;
+  std::string whyAsInModel;  ///< why the picture does not have the result's placements; else empty
+  std::array<PublishedProduct, 2> products;
+};
+
+/// The same of a result.
+struct PublishedResult {
+  std::string model;         ///< name of the model; empty for none
+  bool isAsInModel = false;  ///< all pictures have the model's placements, as was asked for
+  std::vector<PublishedInterference> interferences;  ///< in document order
+};
+
+/// The elements of the report with what a page knows besides, as attributes and elements of the
+/// namespace "urn:zorlyra:page". UTF-8.
+ZOR_TOOLKIT_EXPORT std::string AnnotatedReport(const ClashDocument& inDocument,
+                                               const PublishedResult& inPublished);
 
 /// A text as the value of an attribute that reads back as it was: markup characters escaped, tabs
 /// and line ends as references. What XML cannot carry becomes U+FFFD.

@@ -6,6 +6,7 @@
 #include <cmath>
 #include <string_view>
 
+#include "foundation/Hash.h"
 #include "platform/system/ZORToken.h"
 #include "toolkit/records/ElementWalk.h"
 
@@ -229,7 +230,48 @@ InterferenceRecord Read(ClashDocument& ioDocument, const PlacedInterference& inP
   return record;
 }
 
+void AddTo(ZORFoundation::Hash64& ioHash, const NumberTriple& inTriple) {
+  for (const Number& number : inTriple) ioHash.AddText(number.text);
+}
+
+void AddTo(ZORFoundation::Hash64& ioHash, const ProductRecord& inProduct) {
+  ioHash.Add(std::uint64_t{inProduct.exists});
+  for (const std::string* const text :
+       {&inProduct.id, &inProduct.alias, &inProduct.instance, &inProduct.label, &inProduct.alien,
+        &inProduct.processMode, &inProduct.shape, &inProduct.shapeSource, &inProduct.preview,
+        &inProduct.whyMisread})
+    ioHash.AddText(*text);
+  for (const double number : inProduct.placement) ioHash.Add(number);
+}
+
+void AddTo(ZORFoundation::Hash64& ioHash, const std::optional<ViewpointRecord>& inViewpoint) {
+  ioHash.Add(std::uint64_t{inViewpoint.has_value()});
+  if (!inViewpoint) return;
+  ioHash.AddText(inViewpoint->projection);
+  AddTo(ioHash, {inViewpoint->focusDistance, inViewpoint->nearPlane, inViewpoint->farPlane});
+  AddTo(ioHash, inViewpoint->point);
+  AddTo(ioHash, inViewpoint->sight);
+}
+
 }  // namespace
+
+std::uint64_t HashOf(const InterferenceRecord& inRecord) {
+  ZORFoundation::Hash64 hash;
+  hash.Add(static_cast<std::uint64_t>(inRecord.index));
+  const RuleRecord& rule = inRecord.rule;
+  for (const std::string* const text :
+       {&inRecord.result, &inRecord.name, &inRecord.value.text, &inRecord.type,
+        &inRecord.typeAsWritten, &inRecord.clearance.text, &inRecord.status,
+        &inRecord.statusAsWritten, &inRecord.computationCase, &inRecord.retrieve, &rule.name,
+        &rule.clearance.text, &rule.severity, &rule.penetrationCandidate, &inRecord.comment,
+        &inRecord.picture, &inRecord.curveLength.text, &inRecord.distance.text})
+    hash.AddText(*text);
+  for (const ProductRecord& product : inRecord.products) AddTo(hash, product);
+  hash.Add(inRecord.points.size());
+  for (const NumberTriple& point : inRecord.points) AddTo(hash, point);
+  AddTo(hash, inRecord.viewpoint);
+  return hash.Get();
+}
 
 Number::Number(std::string inText) : Number(FromUtf8(inText)) { text = std::move(inText); }
 

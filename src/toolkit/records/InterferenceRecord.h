@@ -3,6 +3,7 @@
 #define ZOR_TOOLKIT_RECORDS_INTERFERENCE_RECORD_H
 
 #include <array>
+#include <cstdint>
 #include <functional>
 #include <optional>
 #include <string>
@@ -106,6 +107,9 @@ ZOR_TOOLKIT_EXPORT void ForEachInterference(
 /// that number.
 ZOR_TOOLKIT_EXPORT InterferenceRecord ReadInterference(ClashDocument& ioDocument,
                                                        long long inNumber);
+/// A number that differs when anything differs that the document says of the interference. The same
+/// on every run and machine.
+ZOR_TOOLKIT_EXPORT std::uint64_t HashOf(const InterferenceRecord& inRecord);
 ZOR_TOOLKIT_EXPORT int CountInterferences(const ClashDocument& inDocument);
 
 }  // namespace ZORToolkit

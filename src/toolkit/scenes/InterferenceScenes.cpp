@@ -168,6 +168,7 @@ ResolvedInterference InterferenceScenes::Resolve(const InterferenceRecord& inRec
                                                  ProductPlaces inPlaces) {
   ResolvedInterference resolved;
   auto& [first, second] = resolved.products;
+  resolved.geometry = GeometryOf(inRecord);
   Resolve(inRecord.products[0], first);
   Resolve(inRecord.products[1], second);
   resolved.colours = ZORDefault::ChooseColours({first.shown.product, second.shown.product});
@@ -181,16 +182,15 @@ ResolvedInterference InterferenceScenes::Resolve(const InterferenceRecord& inRec
   return resolved;
 }
 
-ZORDefault::InterferenceScene MakeScene(const InterferenceRecord& inRecord,
-                                        const ResolvedInterference& inResolved) {
-  return ZORDefault::MakeInterferenceScene(
-      GeometryOf(inRecord), {inResolved.products[0].shown, inResolved.products[1].shown},
-      inResolved.colours);
+ZORDefault::InterferenceScene MakeScene(const ResolvedInterference& inResolved) {
+  const auto& [first, second] = inResolved.products;
+  return ZORDefault::MakeInterferenceScene(inResolved.geometry, {first.shown, second.shown},
+                                           inResolved.colours);
 }
 
 ZORDefault::InterferenceScene MakeScene(const InterferenceRecord& inRecord,
                                         const ZORIProduct_var& inRoot) {
-  return MakeScene(inRecord, InterferenceScenes(inRoot).Resolve(inRecord, ProductPlaces::kResult));
+  return MakeScene(InterferenceScenes(inRoot).Resolve(inRecord, ProductPlaces::kResult));
 }
 
 }  // namespace ZORToolkit

@@ -29,6 +29,7 @@ struct ResolvedProduct {
 /// All that an interference needs of a model for its picture.
 struct ResolvedInterference {
   std::array<ResolvedProduct, 2> products;
+  ZORDefault::InterferenceGeometry geometry;
   ZORDefault::SceneColours colours;
   /// Why the products are placed as in the model although the result has placements: one line of
   /// UTF-8, empty when they are placed where these say.
@@ -69,9 +70,8 @@ class ZOR_TOOLKIT_EXPORT InterferenceScenes {
 };
 
 /// A scene for PrintPictures.
-ZOR_TOOLKIT_EXPORT ZORDefault::InterferenceScene MakeScene(const InterferenceRecord& inRecord,
-                                                           const ResolvedInterference& inResolved);
-/// The same of one interference, as the result places its products.
+ZOR_TOOLKIT_EXPORT ZORDefault::InterferenceScene MakeScene(const ResolvedInterference& inResolved);
+/// The same of one interference, its products placed as the result says.
 /// @param inRoot the root of an opened model.
 ZOR_TOOLKIT_EXPORT ZORDefault::InterferenceScene MakeScene(const InterferenceRecord& inRecord,
                                                            const ZORIProduct_var& inRoot);

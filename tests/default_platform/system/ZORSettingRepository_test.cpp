@@ -5,6 +5,7 @@
 #include <climits>
 #include <string>
 
+#include "default_platform/SettingOverride.h"
 #include "platform/system/ZORSysSettingRepository.h"
 #include "support/PlatformFolder.h"
 
@@ -244,4 +245,34 @@ TEST(ZORSysSettingRepository, InstalledClashSettingsHaveNoValueSet) {
   int mode = 9;
   EXPECT_EQ(repository->ReadAttr("ModeOfSubInterf", &mode, 1), E_FAIL);
   EXPECT_EQ(mode, 9);
+}
+
+TEST(SettingOverride, GoesBeforeTheFilesAndEndsWithItself) {
+  const support::PlatformFolder folder;
+  folder.WriteSettings("ClashPublish", "PictureZoom = 3\n");
+  const auto zoom = [] {
+    int value = -1;
+    ZORSettingRepository* const settings = ZORSettingRepository::GetRepository("ClashPublish");
+    if (settings != nullptr) settings->ReadSetting("PictureZoom", &value, 1);
+    return value;
+  };
+  {
+    const ZORDefault::SettingOverride first("ClashPublish", "PictureZoom", 1);
+    EXPECT_EQ(1, zoom());
+    const ZORDefault::SettingOverride second("ClashPublish", "PictureZoom", 2);
+    EXPECT_EQ(2, zoom());
+  }
+  EXPECT_EQ(3, zoom());
+}
+
+TEST(SettingOverride, MakesARepositoryThatHasNoFile) {
+  const support::PlatformFolder folder;
+  EXPECT_EQ(nullptr, ZORSettingRepository::GetRepository("NoSuchFile"));
+  const ZORDefault::SettingOverride setting("NoSuchFile", "Number", 7);
+  ZORSettingRepository* const settings = ZORSettingRepository::GetRepository("NoSuchFile");
+  ASSERT_NE(nullptr, settings);
+  int value = 0;
+  EXPECT_EQ(S_OK, settings->ReadSetting("Number", &value));
+  EXPECT_EQ(7, value);
+  EXPECT_NE(S_OK, settings->ReadSetting("Other", &value));
 }

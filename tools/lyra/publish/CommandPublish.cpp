@@ -1,35 +1,24 @@
 // lyra publish RESULT --model MODEL -o DIR
 #include <algorithm>
 #include <memory>
+#include <sstream>
 #include <thread>
 
-#include "ZORLyraXMLServices.h"
-#include "foundation/AtomicFile.h"
-#include "foundation/ReadWholeFile.h"
-#include "lyra/CommandErrors.h"
 #include "lyra/Language.h"
+#include "lyra/ListFilter.h"
 #include "lyra/ModelFile.h"
 #include "lyra/OptionWord.h"
+#include "lyra/Picture.h"
+#include "lyra/SafeText.h"
 #include "lyra/Verbs.h"
-#include "lyra/publish/OnlyFilter.h"
-#include "lyra/publish/PageLibrary.h"
-#include "lyra/publish/Publication.h"
-#include "platform/system/ZORSettingRepository.h"
-#include "platform/system/ZORSysSettingRepository.h"
-#include "toolkit/publishing/ReportWriter.h"
-#include "toolkit/records/DocumentText.h"
-
-namespace fs = std::filesystem;
+#include "lyra/publish/DrawingProgress.h"
+#include "toolkit/publishing/Publication.h"
 
 namespace lyra {
 using namespace ZORToolkit;
 namespace {
 
-constexpr char kReport[] = "report.xml";
-constexpr char kPage[] = "index.html";
-constexpr char kReportStyleSheet[] = "clash-report.xsl";
-constexpr char kReportType[] = "clash-report.dtd";
-constexpr long long kMostProcesses = 256;
+constexpr long long kMaxProcesses = 256;
 constexpr const char* kFormats[] = {"jpeg", "png"};
 constexpr const char* kZooms[] = {"interference", "products"};  // by the setting's value
 constexpr const char* kPositions[] = {"result", "model"};
@@ -42,174 +31,93 @@ struct PublishOptions {
   bool resume = false;
 };
 
-/// A style sheet that is applied in the place of the page's own.
-struct OtherStyleSheet {
-  std::string path;  // empty: none
-  std::string text;
-
-  std::string Name() const {
-    return path.empty() ? kReportStyleSheet : fs::path(path).filename().string();
+/// From conditions such as "type=clash,status=relevant": type, status, result and product, each as
+/// the options of `lyra list` take it. Several words of one kind are alternatives.
+class OnlyConditions {
+ public:
+  void Add(const std::string& inCondition) {
+    const std::size_t equals = inCondition.find('=');
+    const std::string name = inCondition.substr(0, equals);
+    const std::string word = equals == std::string::npos ? "" : inCondition.substr(equals + 1);
+    if (word.empty())
+      throw UsageError("--only: a condition is such as type=clash, not \"" + inCondition + "\"");
+    if (name == "type")
+      options_.types.push_back(word);
+    else if (name == "status")
+      options_.statuses.push_back(word);
+    else if (name == "result")
+      SetOnce(name, word, options_.result);
+    else if (name == "product")
+      SetOnce(name, word, options_.product);
+    else
+      throw UsageError("--only: unknown word \"" + name +
+                       "\"; known are type, status, result, product");
   }
+  RecordFilter Filter() const { return FilterOf(options_); }
+
+ private:
+  static void SetOnce(const std::string& inName, const std::string& inWord, std::string& ioText) {
+    if (!ioText.empty()) throw UsageError("--only: " + inName + " is given twice");
+    ioText = inWord;
+  }
+  FilterOptions options_;
 };
 
-std::string ReadWhole(const std::string& inPath) {
-  auto file = ZORFoundation::TryReadWholeFile(inPath);
-  if (!file) throw InputError(inPath + ": cannot be read");
-  return std::move(file->bytes);
-}
-
-/// A reference may be written with backslashes, as on other systems.
-std::string StyleSheetOfSetting() {
-  ZORSettingRepository* const settings = ZORSettingRepository::GetRepository("ClashPublish");
-  ZORUnicodeString ignored;
-  if (settings == nullptr || FAILED(settings->ReadSetting("XslTemplate", &ignored))) return {};
-  std::string path = Utf8(ZORLyraXMLServices().getStyleSheetFromSetting());
-  if (!fs::exists(path)) std::replace(path.begin(), path.end(), '\\', '/');
-  return path;
-}
-
-OtherStyleSheet ChosenStyleSheet(const PublishOptions& inOptions) {
-  OtherStyleSheet sheet;
-  sheet.path = inOptions.styleSheet.empty() ? StyleSheetOfSetting() : inOptions.styleSheet;
-  if (sheet.path.empty()) return sheet;
-  sheet.text = ReadWhole(sheet.path);
-  const std::string name = sheet.Name();
-  if (name == kReport || name == kPage || name == kReportType)
-    throw InputError(sheet.path + ": a style sheet of this name would take the place of another");
-  PageRequest reading;  // says what is wrong before drawing
-  reading.styleSheet = sheet.text;
-  reading.styleSheetName = sheet.path;
-  PageLibrary().MakePage(reading);
-  return sheet;
-}
-
-PictureStyle StyleOf(const PublishOptions& inOptions) {
-  PictureStyle style;
-  const bool isPng = ChosenWord("--format", inOptions.format, kFormats) == 1;
-  style.format = isPng ? PictureFormat::kPng : PictureFormat::kJpeg;
-  if (!inOptions.size.empty()) style.size = SizeOf(inOptions.size);
-  if (!inOptions.zoom.empty())
-    style.zoom = static_cast<int>(ChosenWord("--zoom", inOptions.zoom, kZooms));
-  return style;
-}
-
-ProductPlaces PlacesOf(const PublishOptions& inOptions) {
-  const bool areModels = ChosenWord("--positions", inOptions.positions, kPositions) == 1;
-  return areModels ? ProductPlaces::kModel : ProductPlaces::kResult;
+RecordFilter FilterOfConditions(const std::vector<std::string>& inLists) {
+  OnlyConditions conditions;
+  for (const std::string& list : inLists) {
+    std::istringstream parts(list);
+    for (std::string part; std::getline(parts, part, ',');) conditions.Add(part);
+  }
+  return conditions.Filter();
 }
 
 int ProcessCount(const PublishOptions& inOptions) {
   if (!inOptions.jobs) return static_cast<int>(std::max(1U, std::thread::hardware_concurrency()));
-  if (*inOptions.jobs < 1 || *inOptions.jobs > kMostProcesses)
-    throw UsageError("--jobs: 1 to " + std::to_string(kMostProcesses));
+  if (*inOptions.jobs < 1 || *inOptions.jobs > kMaxProcesses)
+    throw UsageError("--jobs: 1 to " + std::to_string(kMaxProcesses));
   return static_cast<int>(*inOptions.jobs);
 }
 
-/// The settings by which pictures differ.
-std::string PictureSettings(const PictureStyle& inStyle) {
-  int zoom = inStyle.zoom.value_or(0), subInterferences = 0;
-  if (auto* const settings = ZORSettingRepository::GetRepository("ClashPublish");
-      settings != nullptr && !inStyle.zoom)
-    settings->ReadSetting("PictureZoom", &zoom, 1);
-  if (auto* const settings = ZORSysSettingRepository::GetRepository("Clash"))
-    settings->ReadAttr("ModeOfSubInterf", &subInterferences);
-  const char* const switchedOn = std::getenv("TRX_VELD_SUBINTERF");
-  return std::to_string(zoom) + " " + std::to_string(subInterferences) + " " +
-         (switchedOn != nullptr ? switchedOn : "");
-}
-
-/// What the pictures are made from.
-std::string StampOf(const PublishOptions& inOptions, const Publication& inPublication,
-                    const PictureStyle& inStyle) {
-  const auto time = fs::last_write_time(inOptions.model).time_since_epoch().count();
-  return "result " + inPublication.Fingerprint() + "\nmodel " +
-         fs::canonical(inOptions.model).string() + " " +
-         std::to_string(fs::file_size(inOptions.model)) + " " + std::to_string(time) +
-         "\npictures " + inOptions.format + " " + std::to_string(inStyle.size.width) + "x" +
-         std::to_string(inStyle.size.height) + " " + inOptions.positions + " " +
-         PictureSettings(inStyle) + "\n";
-}
-
-struct Drawn {
-  std::size_t pictures = 0, failures = 0;
-};
-
-Drawn DrawPictures(const PublishOptions& inOptions, const PictureStyle& inStyle,
-                   Publication& ioPublication) {
-  const int processes = ProcessCount(inOptions);
-  const ZORIProduct_var root = OpenModelFile(inOptions.model).root;
-  const PictureStore store(inOptions.directory,
-                           inStyle.format == PictureFormat::kPng ? ".png" : ".jpg");
-  ioPublication.LookUp(root, PlacesOf(inOptions));
-  if (!store.Prepare(StampOf(inOptions, ioPublication, inStyle), inOptions.resume))
-    std::fputs("lyra: warning: the pictures that are there show something else: all are drawn\n",
-               stderr);
-  Drawn drawn;
-  drawn.failures = ioPublication.Draw(store, inStyle, processes);
-  for (const Entry& entry : ioPublication.Entries()) drawn.pictures += !entry.facts.picture.empty();
-  return drawn;
-}
-
-/// @return the report's bytes.
-std::string WriteReport(ClashDocument& ioResult, const std::string& inStyleSheet,
-                        const std::string& inPath, Output& ioOutput) {
-  OutputFile file(inPath);
-  Prologue prologue;
-  prologue.styleSheet = inStyleSheet;
-  file.Check(WriteReport(ioResult, prologue, file.Path()));
-  std::string bytes = ReadWhole(file.Path());
-  file.Finish(ioOutput);
-  return bytes;
-}
-
-PageRequest RequestOf(const PublishOptions& inOptions, const OtherStyleSheet& inSheet,
-                      const Publication& inPublication) {
-  PageRequest request;
-  request.styleSheet = inSheet.text;
-  request.styleSheetName = inSheet.path.empty() ? "clash-page.xsl" : inSheet.path;
-  request.model = Utf8(FromUtf8(fs::path(inOptions.model).filename().string()));
-  request.isAsInModel = !inOptions.model.empty() && PlacesOf(inOptions) == ProductPlaces::kModel;
-  for (const Entry& entry : inPublication.Entries()) request.interferences.push_back(entry.facts);
-  return request;
-}
-
-void WriteAll(const PublishOptions& inOptions, const OtherStyleSheet& inSheet,
-              const Publication& inPublication, ClashDocument& ioResult, Output& ioOutput) {
-  const PageLibrary library;
-  const std::string folder = inOptions.directory + "/";
-  PageRequest request = RequestOf(inOptions, inSheet, inPublication);
-  request.report = WriteReport(ioResult, inSheet.Name(), folder + kReport, ioOutput);
-  ZORFoundation::WriteWholeFile(folder + kReportType, library.ReportType());
-  ZORFoundation::WriteWholeFile(folder + inSheet.Name(),
-                                inSheet.path.empty() ? library.ReportStyleSheet() : inSheet.text);
-  ZORFoundation::WriteWholeFile(folder + kPage, library.MakePage(request));
+PublicationOptions ToolkitOptions(const PublishOptions& inOptions) {
+  PublicationOptions options;
+  options.filter = FilterOfConditions(inOptions.only);
+  const bool isPng = ChosenWord("--format", inOptions.format, kFormats) == 1;
+  options.format = isPng ? PictureFormat::kPng : PictureFormat::kJpeg;
+  if (!inOptions.size.empty()) options.size = SizeOf(inOptions.size);
+  if (!inOptions.zoom.empty())
+    options.zoom = static_cast<PictureZoom>(ChosenWord("--zoom", inOptions.zoom, kZooms));
+  const bool areModels = ChosenWord("--positions", inOptions.positions, kPositions) == 1;
+  options.places = areModels ? ProductPlaces::kModel : ProductPlaces::kResult;
+  options.processes = ProcessCount(inOptions);
+  options.folder = inOptions.directory;
+  options.styleSheet = inOptions.styleSheet;
+  options.model = inOptions.model;
+  options.resume = inOptions.resume;
+  return options;
 }
 
 int Publish(const PublishOptions& inOptions, Output& ioOutput) {
-  const ListFilter filter = ParseOnly(inOptions.only);
-  const PictureStyle style = StyleOf(inOptions);
-  PlacesOf(inOptions);
-  ProcessCount(inOptions);
+  PublicationOptions options = ToolkitOptions(inOptions);
   ChooseLanguage(inOptions.language);
-  ClashDocument file(inOptions.file);
-  file.RequireInterferences();
-  const OtherStyleSheet sheet = ChosenStyleSheet(inOptions);
-  Publication publication(file, filter);
-  Drawn drawn;
-  try {
-    fs::create_directories(inOptions.directory);
-    RemoveUnfinishedFiles(inOptions.directory);
-    if (!inOptions.model.empty()) drawn = DrawPictures(inOptions, style, publication);
-  } catch (const fs::filesystem_error& error) {
-    throw InputError(error.path1().string() + ": " + error.code().message());
+  ClashDocument document(inOptions.file);
+  options.warn = [](const std::string& inWarning) {
+    std::fprintf(stderr, "lyra: warning: %s\n", Printable(inWarning).c_str());
+  };
+  Published made;
+  {
+    std::optional<DrawingProgress> progress;
+    options.drawn = [&](std::size_t inDone, std::size_t inAll) { progress->Show(inDone, inAll); };
+    made = ZORToolkit::Publish(document, options, [&] {
+      const ZORIProduct_var root = OpenModelFile(inOptions.model).root;
+      progress.emplace();
+      return root;
+    });
   }
-  publication.Finish(file);
-  WriteAll(inOptions, sheet, publication, file, ioOutput);
-  ioOutput.Write(Utf8(FromUtf8((fs::path(inOptions.directory) / kPage).string())) + ": " +
-                 std::to_string(publication.Entries().size()) + " interferences, " +
-                 std::to_string(drawn.pictures) + " with a picture\n");
-  if (drawn.failures > 0)
-    throw InputError(std::to_string(drawn.failures) +
+  ioOutput.Write(made.page + ": " + std::to_string(made.interferences) + " interferences, " +
+                 std::to_string(made.pictures) + " with a picture\n");
+  if (made.failures > 0)
+    throw InputError(std::to_string(made.failures) +
                      " interferences have no picture: it cannot be drawn or written");
   return 0;
 }

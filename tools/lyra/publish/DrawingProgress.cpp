@@ -27,19 +27,22 @@ std::string DrawingText(std::size_t inDone, std::size_t inAll, double inSeconds)
          Duration(static_cast<double>(inAll - inDone) / rate) + " left";
 }
 
-DrawingProgress::DrawingProgress(std::size_t inAll)
-    : all_(inAll), isTerminal_(isatty(STDERR_FILENO) == 1) {}
+DrawingProgress::DrawingProgress() : isTerminal_(isatty(STDERR_FILENO) == 1) {}
 
-DrawingProgress::~DrawingProgress() {
+DrawingProgress::~DrawingProgress() { Clear(); }
+
+void DrawingProgress::Clear() {
   if (width_ != 0) std::fprintf(stderr, "\r%*s\r", static_cast<int>(width_), "");
+  width_ = 0;
 }
 
-void DrawingProgress::Show(std::size_t inDone) {
+void DrawingProgress::Show(std::size_t inDone, std::size_t inAll) {
+  if (inDone == inAll) return Clear();
   const Clock::time_point now = Clock::now();
   if (!isTerminal_ || now - shown_ < std::chrono::milliseconds(100)) return;
   shown_ = now;
   const std::string text =
-      DrawingText(inDone, all_, std::chrono::duration<double>(now - start_).count());
+      DrawingText(inDone, inAll, std::chrono::duration<double>(now - start_).count());
   std::fprintf(stderr, "\r%-*s", static_cast<int>(width_), text.c_str());
   width_ = text.size();
 }

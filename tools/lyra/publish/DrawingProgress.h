@@ -15,17 +15,19 @@ std::string DrawingText(std::size_t inDone, std::size_t inAll, double inSeconds)
 /// A line on standard error that is gone at the end; nothing when that is no terminal.
 class DrawingProgress {
  public:
-  explicit DrawingProgress(std::size_t inAll);
+  DrawingProgress();
   ~DrawingProgress();
   DrawingProgress(const DrawingProgress&) = delete;
   DrawingProgress& operator=(const DrawingProgress&) = delete;
 
-  void Show(std::size_t inDone);
+  /// The line is gone once all is done.
+  void Show(std::size_t inDone, std::size_t inAll);
 
  private:
+  void Clear();
+
   using Clock = std::chrono::steady_clock;
 
-  std::size_t all_;
   bool isTerminal_;
   Clock::time_point start_ = Clock::now(), shown_;
   std::size_t width_ = 0;  // of what stands on the line

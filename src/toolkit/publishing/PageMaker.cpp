@@ -1,4 +1,4 @@
-#include "lyra/publish/PageMaker.h"
+#include "toolkit/publishing/PageMaker.h"
 
 #include <libxml/parser.h>
 #include <libxml/xmlIO.h>
@@ -8,20 +8,16 @@
 #include <libxslt/xsltInternals.h>
 #include <libxslt/xsltutils.h>
 
-#include <algorithm>
 #include <cstdarg>
 #include <cstdio>
-#include <map>
 #include <memory>
 #include <string_view>
 #include <utility>
 
-#include "lyra/publish/ShippedTexts.h"
+#include "toolkit/publishing/ShippedTexts.h"
 
-namespace lyra {
+namespace ZORToolkit {
 namespace {
-
-constexpr char kNamespace[] = "urn:zorlyra:page";
 
 template <auto Free>
 struct Freer {
@@ -34,11 +30,6 @@ using XmlDocument = std::unique_ptr<xmlDoc, Freer<xmlFreeDoc>>;
 using StyleSheet = std::unique_ptr<xsltStylesheet, Freer<xsltFreeStylesheet>>;
 using Security = std::unique_ptr<xsltSecurityPrefs, Freer<xsltFreeSecurityPrefs>>;
 using Context = std::unique_ptr<xsltTransformContext, Freer<xsltFreeTransformContext>>;
-
-const xmlChar* Xml(const std::string& inText) {
-  return reinterpret_cast<const xmlChar*>(inText.c_str());
-}
-const xmlChar* Xml(const char* inText) { return reinterpret_cast<const xmlChar*>(inText); }
 
 // Both libraries report in pieces of a line.
 void Collect(void* ioText, const char* inFormat, ...) __attribute__((format(printf, 2, 3)));
@@ -100,85 +91,6 @@ xmlDocPtr Parse(const std::string& inBytes, const char* inName, int inOptions) {
                        XML_PARSE_NONET | inOptions);
 }
 
-bool IsElement(const xmlNode* inNode, const char* inName) {
-  return inNode->type == XML_ELEMENT_NODE && xmlStrEqual(inNode->name, Xml(inName));
-}
-
-template <class Visit>
-void ForEachChild(xmlNode* inParent, const char* inName, const Visit& inVisit) {
-  for (xmlNode* child = inParent->children; child != nullptr; child = child->next)
-    if (IsElement(child, inName)) inVisit(child);
-}
-
-/// Adds what is known of the interferences to a report.
-class FactWriter {
- public:
-  explicit FactWriter(xmlNode* ioRoot)
-      : root_(ioRoot), space_(xmlNewNs(ioRoot, Xml(kNamespace), Xml("page"))) {}
-
-  void Add(const PageRequest& inRequest) {
-    Set(root_, "model", inRequest.model);
-    if (inRequest.isAsInModel) Set(root_, "asInModel", "yes");
-    Count(inRequest, "Type", &PublishedInterference::type);
-    Count(inRequest, "Status", &PublishedInterference::status);
-    std::size_t next = 0;
-    const auto add = [&](xmlNode* ioInterference) {
-      if (next < inRequest.interferences.size())
-        Add(ioInterference, inRequest.interferences[next++]);
-    };
-    ForEachChild(root_, "Interference", add);
-    ForEachChild(root_, "ClashResult",
-                 [&](xmlNode* ioSet) { ForEachChild(ioSet, "Interference", add); });
-  }
-
- private:
-  void Set(xmlNode* ioElement, const char* inName, const std::string& inValue) {
-    if (!inValue.empty())
-      xmlNewNsProp(ioElement, space_, Xml(inName), Xml(WithVisibleDirections(inValue)));
-  }
-
-  // Style sheets can count only slowly. The most frequent words first.
-  void Count(const PageRequest& inRequest, const char* inName,
-             std::string PublishedInterference::*inWord) {
-    std::map<std::string, std::size_t> counts;
-    for (const PublishedInterference& facts : inRequest.interferences) ++counts[facts.*inWord];
-    std::vector<std::pair<std::string, std::size_t>> words(counts.begin(), counts.end());
-    std::stable_sort(words.begin(), words.end(),
-                     [](const auto& inA, const auto& inB) { return inA.second > inB.second; });
-    for (const auto& [word, count] : words) {
-      xmlNode* const element = xmlNewChild(root_, space_, Xml(inName), nullptr);
-      Set(element, "word", word);
-      Set(element, "count", std::to_string(count));
-    }
-  }
-
-  void Add(xmlNode* ioInterference, const PublishedInterference& inFacts) {
-    Set(ioInterference, "number", std::to_string(inFacts.number));
-    Set(ioInterference, "type", inFacts.type);
-    Set(ioInterference, "status", inFacts.status);
-    Set(ioInterference, "picture", inFacts.picture);
-    Set(ioInterference, "asInModel", inFacts.whyAsInModel);
-    for (const std::string& thumbnail : inFacts.thumbnails)
-      xmlNewProp(xmlNewChild(ioInterference, space_, Xml("Thumbnail"), nullptr), Xml("href"),
-                 Xml(thumbnail));
-    xmlNode* products[2] = {nullptr, nullptr};
-    ForEachChild(ioInterference, "Product", [&](xmlNode* ioProduct) {
-      (products[0] == nullptr ? products[0] : products[1]) = ioProduct;
-    });
-    for (std::size_t i = 0; i < 2; ++i)
-      if (products[i] != nullptr) Add(products[i], inFacts.products[i]);
-  }
-
-  void Add(xmlNode* ioProduct, const PublishedProduct& inFacts) {
-    Set(ioProduct, "colour", inFacts.colour);
-    Set(ioProduct, "preview", inFacts.preview);
-    if (inFacts.isMissing) Set(ioProduct, "missing", "yes");
-  }
-
-  xmlNode* root_;
-  xmlNs* space_;
-};
-
 StyleSheet ParseStyleSheet(const PageRequest& inRequest) {
   const std::string own = inRequest.styleSheet.empty() ? kPageStyleSheet : inRequest.styleSheet;
   XmlDocument document(Parse(own, inRequest.styleSheetName.c_str(), XML_PARSE_NOENT));
@@ -189,12 +101,12 @@ StyleSheet ParseStyleSheet(const PageRequest& inRequest) {
   return sheet->errors == 0 ? std::move(sheet) : nullptr;
 }
 
-bool Apply(xsltStylesheet& inSheet, xmlDoc& inReport, xsltSecurityPrefs& inSecurity,
+bool Apply(xsltStylesheet& inSheet, xmlDoc& inDocument, xsltSecurityPrefs& inSecurity,
            std::string& outBytes) {
-  const Context context(xsltNewTransformContext(&inSheet, &inReport));
+  const Context context(xsltNewTransformContext(&inSheet, &inDocument));
   if (!context || xsltSetCtxtSecurityPrefs(&inSecurity, context.get()) != 0) return false;
   const XmlDocument page(
-      xsltApplyStylesheetUser(&inSheet, &inReport, nullptr, nullptr, nullptr, context.get()));
+      xsltApplyStylesheetUser(&inSheet, &inDocument, nullptr, nullptr, nullptr, context.get()));
   if (!page || context->state != XSLT_STATE_OK) return false;
   xmlChar* bytes = nullptr;
   int length = 0;
@@ -212,29 +124,28 @@ bool MakePage(const PageRequest& inRequest, Page& outPage) {
   if (!security) return false;
   RefuseTheOutside(*security);
   const StyleSheet sheet = ParseStyleSheet(inRequest);
-  if (!sheet || inRequest.report.empty()) return sheet != nullptr;
-  const XmlDocument report(
-      Parse(WithVisibleDirections(inRequest.report), "report.xml", XML_PARSE_HUGE));
-  if (!report) return false;
-  FactWriter(xmlDocGetRootElement(report.get())).Add(inRequest);
-  return Apply(*sheet, *report, *security, outPage.bytes);
+  if (!sheet || inRequest.document.empty()) return sheet != nullptr;
+  const XmlDocument document(
+      Parse(WithVisibleDirections(inRequest.document), "report.xml", XML_PARSE_HUGE));
+  return document && Apply(*sheet, *document, *security, outPage.bytes);
 }
 
 }  // namespace
-}  // namespace lyra
+}  // namespace ZORToolkit
 
-#define LYRA_EXPORT extern "C" __attribute__((visibility("default")))
+#define ZOR_PAGE_EXPORT extern "C" __attribute__((visibility("default")))
 
-LYRA_EXPORT bool LyraMakePage(const lyra::PageRequest& inRequest, lyra::Page& outPage) {
-  const bool isMade = lyra::MakePage(inRequest, outPage);
+ZOR_PAGE_EXPORT bool ZORMakePage(const ZORToolkit::PageRequest& inRequest,
+                                 ZORToolkit::Page& outPage) {
+  const bool isMade = ZORToolkit::MakePage(inRequest, outPage);
   xmlSetGenericErrorFunc(nullptr, nullptr);
   xsltSetGenericErrorFunc(nullptr, nullptr);
   if (!isMade) {
-    outPage.reason = lyra::FirstLine(outPage.messages);
+    outPage.reason = ZORToolkit::FirstLine(outPage.messages);
     if (outPage.reason.empty()) outPage.reason = "the style sheet makes no page";
   }
   return isMade;
 }
 
-LYRA_EXPORT const char* LyraReportStyleSheet() { return lyra::kReportStyleSheet; }
-LYRA_EXPORT const char* LyraReportType() { return lyra::kReportType; }
+ZOR_PAGE_EXPORT const char* ZORReportStyleSheet() { return ZORToolkit::kReportStyleSheet; }
+ZOR_PAGE_EXPORT const char* ZORReportType() { return ZORToolkit::kReportType; }

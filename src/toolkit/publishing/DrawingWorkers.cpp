@@ -1,4 +1,4 @@
-#include "lyra/publish/DrawingWorkers.h"
+#include "toolkit/publishing/DrawingWorkers.h"
 
 #include <fcntl.h>
 #include <sys/mman.h>
@@ -14,13 +14,13 @@
 #include <vector>
 
 #include "foundation/TerminationSignals.h"
-#include "lyra/CommandErrors.h"
+#include "toolkit/Error.h"
 
-namespace lyra {
+namespace ZORToolkit {
 namespace {
 
 [[noreturn]] void FailToStart() {
-  throw InputError(std::string("no process can be started to draw: ") + std::strerror(errno));
+  throw Error(std::string("no process can be started to draw: ") + std::strerror(errno));
 }
 
 /// A number that all processes count up together.
@@ -77,10 +77,7 @@ struct Pipe {
   int code = 0;
   try {
     close(inPipe.reader);
-    bool isBegun = false;
     for (std::size_t i = ioNext.Next(); i < inWork.count; i = ioNext.Next()) {
-      if (!isBegun) inWork.begin();
-      isBegun = true;
       inWork.draw(i);
       if (write(inPipe.writer, "", 1) != 1 || inStop.IsMade()) break;
     }
@@ -141,4 +138,4 @@ void DrawInProcesses(int inProcesses, const DrawingWork& inWork) {
   stop.Check();
 }
 
-}  // namespace lyra
+}  // namespace ZORToolkit

@@ -1,11 +1,11 @@
 // The style sheets and the document type that are shipped, as texts.
-#ifndef ZOR_TOOLS_LYRA_PUBLISH_SHIPPEDTEXTS_H
-#define ZOR_TOOLS_LYRA_PUBLISH_SHIPPEDTEXTS_H
+#ifndef ZOR_TOOLKIT_PUBLISHING_SHIPPEDTEXTS_H
+#define ZOR_TOOLKIT_PUBLISHING_SHIPPEDTEXTS_H
 
-namespace lyra {
+namespace ZORToolkit {
 extern const char kPageStyleSheet[];
 extern const char kReportStyleSheet[];
 extern const char kReportType[];
-}  // namespace lyra
+}  // namespace ZORToolkit
 
 #endif

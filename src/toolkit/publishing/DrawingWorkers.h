@@ -1,25 +1,24 @@
 // Drawing in several processes.
-#ifndef ZOR_TOOLS_LYRA_PUBLISH_DRAWINGWORKERS_H
-#define ZOR_TOOLS_LYRA_PUBLISH_DRAWINGWORKERS_H
+#ifndef ZOR_TOOLKIT_PUBLISHING_DRAWINGWORKERS_H
+#define ZOR_TOOLKIT_PUBLISHING_DRAWINGWORKERS_H
 
 #include <cstddef>
 #include <functional>
 
-namespace lyra {
+namespace ZORToolkit {
 
 struct DrawingWork {
   std::size_t count = 0;
-  std::function<void()> begin;              ///< in each process, before its first drawing
   std::function<void(std::size_t)> draw;    ///< in one of the processes, for each of the count
   std::function<void(std::size_t)> isDone;  ///< here, with how many are drawn
 };
 
 /// Shares the work among processes that start as copies of this one, which should have drawn nothing
 /// yet and run no other thread. Nothing is drawn here, so that a drawing that crashes is the only one
-/// that is lost. A signal that ends the command lets each drawing be finished that is begun, and is
-/// then raised as ZORFoundation::Interrupted. Raises InputError when no process can be started.
+/// that is lost. A termination signal lets each drawing be finished that is begun, and is
+/// then raised as ZORFoundation::Interrupted. Raises Error when no process can be started.
 void DrawInProcesses(int inProcesses, const DrawingWork& inWork);
 
-}  // namespace lyra
+}  // namespace ZORToolkit
 
 #endif

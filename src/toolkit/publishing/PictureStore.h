@@ -1,12 +1,12 @@
 // The folder of a publication's pictures.
-#ifndef ZOR_TOOLS_LYRA_PUBLISH_PICTURESTORE_H
-#define ZOR_TOOLS_LYRA_PUBLISH_PICTURESTORE_H
+#ifndef ZOR_TOOLKIT_PUBLISHING_PICTURESTORE_H
+#define ZOR_TOOLKIT_PUBLISHING_PICTURESTORE_H
 
 #include <filesystem>
 #include <string>
 #include <vector>
 
-namespace lyra {
+namespace ZORToolkit {
 
 /// Pictures appear whole or not at all, and a main one after its small ones, so one that is there is
 /// done. A stamp beside them says what
@@ -49,6 +49,6 @@ class PictureStore {
 /// Removes what runs that were killed left unfinished in a publication's folder and its pictures'.
 void RemoveUnfinishedFiles(const std::filesystem::path& inPublication);
 
-}  // namespace lyra
+}  // namespace ZORToolkit
 
 #endif

@@ -1,4 +1,4 @@
-#include "lyra/publish/PictureStore.h"
+#include "toolkit/publishing/PictureStore.h"
 
 #include <regex>
 
@@ -7,32 +7,29 @@
 
 namespace fs = std::filesystem;
 
-namespace lyra {
+namespace ZORToolkit {
 namespace {
 
 constexpr char kFolder[] = "pictures";
 constexpr char kStampFile[] = ".lyra-publish";
 
-const std::regex& FinishedNames() {
+/// Of pictures that are being drawn, and of these and other files that are being written.
+bool IsUnfinished(const std::string& inName) {
+  static const std::regex drawn(R"(\.drawing_\d+(_SubItf_\d+)?\.(jpg|png|jpg\.png))");
+  return ZORFoundation::TemporaryFile::IsTemporaryName(inName) || std::regex_match(inName, drawn);
+}
+
+bool IsFinished(const std::string& inName) {
   static const std::regex names(
       R"(interference_\d+(_product_[12]|_SubItf_\d+)?\.(jpg|png|jpg\.png))");
-  return names;
+  return std::regex_match(inName, names);
 }
 
-/// Of pictures that are being drawn.
-const std::regex& UnfinishedNames() {
-  static const std::regex names(R"(\.drawing_\d+(_SubItf_\d+)?\.(jpg|png|jpg\.png))");
-  return names;
-}
-
-void RemoveMatching(const fs::path& inFolder, const std::regex& inNames) {
-  std::vector<fs::path> matching;
-  for (const fs::directory_entry& entry : fs::directory_iterator(inFolder)) {
-    const std::string name = entry.path().filename().string();
-    if (std::regex_match(name, inNames) || ZORFoundation::TemporaryFile::IsTemporaryName(name))
-      matching.push_back(entry.path());
-  }
-  for (const fs::path& path : matching) fs::remove(path);
+void RemoveFiles(const fs::path& inFolder, bool (*inIsMeant)(const std::string& inName)) {
+  std::vector<fs::path> meant;
+  for (const fs::directory_entry& entry : fs::directory_iterator(inFolder))
+    if (inIsMeant(entry.path().filename().string())) meant.push_back(entry.path());
+  for (const fs::path& path : meant) fs::remove(path);
 }
 
 std::string FinishedStem(int inNumber) { return "interference_" + std::to_string(inNumber); }
@@ -46,11 +43,11 @@ PictureStore::PictureStore(const fs::path& inPublication, const std::string& inE
 bool PictureStore::Prepare(const std::string& inStamp, bool inGoesOn) const {
   fs::create_directories(folder_);
   const fs::path stampFile = folder_ / kStampFile;
-  const auto stamp = ZORFoundation::TryReadWholeFile(stampFile.string());
-  const bool isSame = stamp && stamp->bytes == inStamp;
+  const auto old = ZORFoundation::TryReadWholeFile(stampFile.string());
+  const bool isSame = old && old->bytes == inStamp;
   if (inGoesOn && isSame) return true;
   const bool hadStamp = fs::remove(stampFile);
-  RemoveMatching(folder_, FinishedNames());
+  RemoveFiles(folder_, IsFinished);
   ZORFoundation::WriteWholeFile(stampFile.string(), inStamp);
   return !inGoesOn || !hadStamp;
 }
@@ -108,9 +105,9 @@ std::string PictureStore::Reference(const std::string& inName) const {
 }
 
 void RemoveUnfinishedFiles(const fs::path& inPublication) {
-  RemoveMatching(inPublication, UnfinishedNames());
+  RemoveFiles(inPublication, IsUnfinished);
   const fs::path pictures = inPublication / kFolder;
-  if (fs::is_directory(pictures)) RemoveMatching(pictures, UnfinishedNames());
+  if (fs::is_directory(pictures)) RemoveFiles(pictures, IsUnfinished);
 }
 
-}  // namespace lyra
+}  // namespace ZORToolkit

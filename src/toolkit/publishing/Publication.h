@@ -1,0 +1,55 @@
+// A clash result published as a folder: a page, a report and pictures.
+#ifndef ZOR_TOOLKIT_PUBLISHING_PUBLICATION_H
+#define ZOR_TOOLKIT_PUBLISHING_PUBLICATION_H
+
+#include <cstddef>
+#include <functional>
+#include <optional>
+#include <string>
+
+#include "toolkit/publishing/PictureOptions.h"
+#include "toolkit/records/RecordFilter.h"
+#include "toolkit/scenes/InterferenceScenes.h"
+
+namespace ZORToolkit {
+
+/// What is framed where an interference has no viewpoint; values of the setting "PictureZoom".
+enum class PictureZoom { kInterference = 0, kProducts = 1 };
+
+struct PublicationOptions {
+  std::string folder;      ///< made where it is missing
+  std::string styleSheet;  ///< path; empty: the setting "XslTemplate", without it the page's own
+  RecordFilter filter;
+  std::string model;  ///< path of the model that the pictures show; empty: no pictures
+  PictureFormat format = PictureFormat::kJpeg;
+  PictureSize size;
+  std::optional<PictureZoom> zoom;  ///< nothing: the setting "PictureZoom"
+  ProductPlaces places = ProductPlaces::kResult;
+  int processes = 1;    ///< that draw; at least 1
+  bool resume = false;  ///< keep the pictures of a run that was ended early
+  /// Told in one line of what is shown otherwise than expected. May be empty.
+  std::function<void(const std::string& inWarning)> warn;
+  /// Told how many interferences are drawn. May be empty.
+  std::function<void(std::size_t inDone, std::size_t inAll)> drawn;
+};
+
+struct Published {
+  std::string page;  ///< path of the page
+  std::size_t interferences = 0;
+  std::size_t pictures = 0;  ///< interferences with one
+  std::size_t failures = 0;  ///< without one although the model has one of their products
+};
+
+/// Publishes the interferences of a result that a filter accepts. Pictures are drawn in processes
+/// that start as copies of this one, which runs no other thread; a termination signal is raised as
+/// ZORFoundation::Interrupted.
+/// @param ioResult    becomes the result that is published: the other interferences leave it, and it
+///                    refers to the pictures of the publication alone.
+/// @param inOpenModel answers the root of the model; called once, if there is one.
+/// Raises Error and what inOpenModel raises; pictures that are whole stay.
+ZOR_TOOLKIT_EXPORT Published Publish(ClashDocument& ioResult, const PublicationOptions& inOptions,
+                                     const std::function<ZORIProduct_var()>& inOpenModel);
+
+}  // namespace ZORToolkit
+
+#endif

@@ -1,0 +1,30 @@
+// The files of a publication but its pictures.
+#ifndef ZOR_TOOLKIT_PUBLISHING_PUBLISHED_FILES_H
+#define ZOR_TOOLKIT_PUBLISHING_PUBLISHED_FILES_H
+
+#include <string>
+
+#include "toolkit/publishing/Publication.h"
+#include "toolkit/publishing/ReportWriter.h"
+
+namespace ZORToolkit {
+
+inline constexpr char kPageFile[] = "index.html";
+
+/// The style sheet that makes the page.
+struct PageStyleSheet {
+  /// Raises Error for one that cannot be read or is no style sheet, before anything is drawn.
+  /// @param inPath as PublicationOptions has it.
+  explicit PageStyleSheet(const std::string& inPath);
+
+  std::string path;  // empty: the page's own
+  std::string text;
+};
+
+/// Writes report, page and what they need. Raises Error.
+void WritePublishedFiles(const PublicationOptions& inOptions, const PageStyleSheet& inSheet,
+                         const ClashDocument& inDocument, const PublishedResult& inPublished);
+
+}  // namespace ZORToolkit
+
+#endif

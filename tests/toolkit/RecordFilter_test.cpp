@@ -1,0 +1,54 @@
+#include "toolkit/records/RecordFilter.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+using namespace ZORToolkit;
+
+InterferenceRecord Record() {
+  InterferenceRecord record;
+  record.result = "set";
+  record.type = "Clash";
+  record.status = "Not inspected";
+  record.products[1].alias = "Straße";
+  return record;
+}
+
+TEST(CaseFolded, MakesLettersOfAllCasesEqual) {
+  EXPECT_EQ(CaseFolded("ABC é"), CaseFolded("abc É"));
+  EXPECT_EQ(CaseFolded("ΣΣ"), CaseFolded("σς"));
+  EXPECT_NE(CaseFolded("a"), CaseFolded("b"));
+  EXPECT_EQ("😀", CaseFolded("😀"));
+}
+
+TEST(RecordFilter, WithoutConditionsAcceptsAll) { EXPECT_TRUE(RecordFilter().Accepts({})); }
+
+TEST(RecordFilter, WordsOfOneKindAreAlternatives) {
+  RecordFilter filter;
+  filter.SetTypes({"contact", "CLASH"});
+  filter.SetStatuses({"not-inspected"});
+  EXPECT_TRUE(filter.Accepts(Record()));
+  filter.SetTypes({"contact"});
+  EXPECT_FALSE(filter.Accepts(Record()));
+}
+
+TEST(RecordFilter, ResultIsMeantExactly) {
+  RecordFilter filter;
+  filter.SetResult("set");
+  EXPECT_TRUE(filter.Accepts(Record()));
+  filter.SetResult("SET");
+  EXPECT_FALSE(filter.Accepts(Record()));
+}
+
+TEST(RecordFilter, ProductHoldsATextInAnyLetterCase) {
+  RecordFilter filter;
+  EXPECT_FALSE(filter.NeedsLabels());
+  filter.SetProduct("STRA");
+  EXPECT_TRUE(filter.NeedsLabels());
+  EXPECT_TRUE(filter.Accepts(Record()));
+  filter.SetProduct("other");
+  EXPECT_FALSE(filter.Accepts(Record()));
+}
+
+}  // namespace
