@@ -118,7 +118,7 @@ class ZOR_LYRA_EXPORT ZORClashParsing {
   /// wins. To be called on a loaded reader only.
   void GetClashPreviewURL(int inIndex, ZORUnicodeString& outPicture);
   /// Value, result type (as written), rule name and aliases of an interference. The aliases are
-  /// emptied first; a second product is told from the first by a filled first alias.
+  /// emptied first; while the first alias is empty, a product counts as the first.
   void GetClashInfos(int inIndex, ZORUnicodeString& outValue, ZORUnicodeString& outResultType,
                      ZORUnicodeString& outRuleName, ZORUnicodeString& outFirstAlias,
                      ZORUnicodeString& outSecondAlias);

@@ -48,7 +48,7 @@ class ZOR_LYRA_EXPORT ZORLyraGeneralServices {
   // Lengths
   /// A length such as "0.5m" or "25 mm" in millimetres; a bare number is in millimetres already.
   /// @return the length; -1.0 when the platform knows no magnitude "LENGTH" or no unit for it; -0.1
-  ///         when the text cannot be read. A genuine negative length cannot be told from these.
+  ///         when the text cannot be read. Indistinguishable from a negative length.
   static double ConvertValueInMM(ZORUnicodeString inValue);
 
   // Logical names
@@ -84,7 +84,7 @@ class ZOR_LYRA_EXPORT ZORLyraGeneralServices {
   static void Expand(ZORIProduct* inProduct, ZORListValZORBaseUnknown_var& ioList);
   /// The aliases from below the root down to the product, joined by " --++-- "; empty for a root
   /// and for what has no alias. Raises ZORNullVarError when a product on the way has an alias but
-  /// does not know its father (no ZORISpecObject).
+  /// does not offer ZORISpecObject, which knows its parent.
   static ZORUnicodeString GetPathRoot(ZORIProduct_var inProduct);
   /// Adds a provider for an interface to a document, which keeps a reference.
   /// @param inDocument null: the document that holds the provider.
