@@ -145,13 +145,39 @@ TEST(IncludeArrows, CommandSeesTheToolkitAndWhatItStandsOn) {
   for (const char* include : {kTool, kToolkit, kPublic, kFront, kFoundation, kThirdParty}) {
     EXPECT_TRUE(MayInclude("tools/lyra/A.cpp", include)) << include;
   }
-  for (const char* include : {kGroup, kDefaultPlatform}) {
+  for (const char* include : {kGroup, kDefaultPlatform, kPlatform}) {  // a header of XML
     EXPECT_FALSE(MayInclude("tools/lyra/A.cpp", include)) << include;
   }
 }
 
 TEST(IncludeArrows, WindowsHeadersAreForTheEntryPoint) {
   EXPECT_TRUE(MayInclude("src/windows/A.cpp", "<windows.h>"));
+}
+
+namespace {
+constexpr const char* kXml = R"(\bDOM_\w|\bZORXMLParser\b)";
+/// Names of a clash document's elements; the counted objects' own names may be the same.
+constexpr const char* kClashDocument =
+    R"re(^(?!.*CountedName).*"(ClashElement|Clash|GeometricAspect|Interferences?|Products?|Preview)")re";
+}  // namespace
+
+TEST(Words, CommandKnowsNoXml) {
+  EXPECT_THAT(house::FindLines(ThisProject(), "tools/", kXml), IsEmpty());
+}
+
+TEST(Words, DefaultPlatformKnowsNoClashDocument) {
+  EXPECT_THAT(house::FindLines(ThisProject(), "src/default_platform/", kClashDocument), IsEmpty());
+}
+
+TEST(Words, AreNoticed) {
+  EXPECT_THAT(
+      house::FindLines({{"tools/lyra/A.cpp", {"int a;", "DOM_Node node;"}}}, "tools/", kXml),
+      ElementsAre("tools/lyra/A.cpp:2: DOM_Node node;"));
+  EXPECT_THAT(house::FindLines({{"src/A.cpp",
+                                 {"Find(\"Interference\");", "ZORISiInterference* i;",
+                                  "CountedName() { return \"Product\"; }"}}},
+                               "src/", kClashDocument),
+              ElementsAre("src/A.cpp:1: Find(\"Interference\");"));
 }
 
 TEST(SourceTree, FindLinesLooksBelowTheFolderAlone) {
@@ -206,4 +232,42 @@ TEST(Files, ALongerOneIsNoticed) {
   const std::vector<std::string> two(2);
   EXPECT_THAT(FilesLongerThan(1, {{"src/A.cpp", two}, {"src/B.cpp", {""}}, {"docs/C.md", two}}),
               ElementsAre("src/A.cpp"));
+}
+
+namespace {
+/// The files of tests that are no program of their own name: those that their folder's
+/// CMakeLists.txt does not name without ".cpp".
+std::vector<std::string> TestsWithoutProgram(const std::vector<house::SourceFile>& inTree) {
+  static const std::regex kName(R"(\b(\w+?)(_test)?\b(\.cpp)?)");
+  std::set<std::string> named;
+  for (const house::SourceFile& file : inTree) {
+    if (!file.path.ends_with("/CMakeLists.txt")) continue;
+    const std::string folder = fs::path(file.path).parent_path().generic_string();
+    for (const std::string& line : file.lines) {
+      for (std::sregex_iterator word(line.begin(), line.end(), kName), end; word != end; ++word) {
+        if (!(*word)[3].matched) named.insert(folder + "/" + word->str(1) + "_test.cpp");
+      }
+    }
+  }
+  std::vector<std::string> files;
+  for (const house::SourceFile& file : inTree) {
+    const bool isTest = file.path.starts_with("tests/") && file.path.ends_with("_test.cpp");
+    if (isTest && !named.contains(file.path)) files.push_back(file.path);
+  }
+  return files;
+}
+}  // namespace
+
+TEST(TestPrograms, AreNamedAfterTheirFiles) {
+  EXPECT_THAT(TestsWithoutProgram(ThisProject()), IsEmpty());
+}
+
+TEST(TestPrograms, AFileWithoutOneIsNoticed) {
+  EXPECT_THAT(TestsWithoutProgram(
+                  {{"tests/a/A_test.cpp", {}},
+                   {"tests/a/B_test.cpp", {}},
+                   {"tests/a/C_test.cpp", {}},
+                   {"tests/a/CMakeLists.txt",
+                    {"foreach(subject C)", "zor_add_test(A_test B_test.cpp LIBRARIES ZORLyra)"}}}),
+              ElementsAre("tests/a/B_test.cpp"));
 }

@@ -36,8 +36,8 @@ const Part* PartOf(const std::string& inPath) {
       Part{Pattern("src/windows/.*"), Pattern("include/.*|src/platform/.*|windows")},
       Part{Pattern("src/.*"), Pattern("include/.*|src/platform/.*|src/[^/]*|ZORLyraExport")},
       Part{Pattern("tools/.*"),
-           Pattern("include/.*|src/(platform|foundation|toolkit)/.*|src/default_platform/[^/]*|"
-                   "third-party")},
+           Pattern("include/.*|src/platform/(?!xml/).*|src/(foundation|toolkit)/.*|"
+                   "src/default_platform/[^/]*|third-party")},
   };
   for (const Part& part : kParts) {
     if (std::regex_match(inPath, part.files)) return &part;
