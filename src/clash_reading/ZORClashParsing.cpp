@@ -66,6 +66,7 @@ ZORClashParsing::ZORClashParsing(char* inBuffer, int inLength)
 
 ZORClashParsing::ZORClashParsing(ZORClashParsing&) : ZORClashParsing(nullptr, 0) {}
 
+// NOLINTNEXTLINE(bugprone-unhandled-self-assignment): takes nothing over
 ZORClashParsing& ZORClashParsing::operator=(ZORClashParsing&) { return *this; }
 
 ZORClashParsing::~ZORClashParsing() {

@@ -26,6 +26,7 @@ struct Aabb {
 struct RenderCache {
   RenderCache() = default;
   RenderCache(const RenderCache&) {}
+  // NOLINTNEXTLINE(bugprone-unhandled-self-assignment): takes nothing over
   RenderCache& operator=(const RenderCache&) {
     bvh.reset();
     bounds.reset();

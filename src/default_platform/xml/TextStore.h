@@ -157,7 +157,7 @@ inline std::uint64_t HashOfBytes(const void* inBytes, std::size_t inCount) {
   std::uint64_t hash = inCount * kFactor;
   const char* at = static_cast<const char*>(inBytes);
   for (; inCount >= 8; inCount -= 8, at += 8) {
-    std::uint64_t part;
+    std::uint64_t part = 0;
     std::memcpy(&part, at, 8);
     hash = (hash ^ part) * kFactor;
     hash ^= hash >> 29;
