@@ -48,7 +48,7 @@ bool IsWithin(const DOM_Tree& inTree, DOM_Tree::Node inNode, DOM_Tree::Node inRo
 }
 
 void CheckKinds(const DOM_Tree& inTree, DOM_Tree::Node inParent, DOM_Tree::Node inChild) {
-  const int child = inTree.At(inChild).kind;
+  const auto child = inTree.At(inChild).kind;
   const bool inDocument = inParent == DOM_Tree::kDocument;
   switch (child) {
     case DOM_Node::ELEMENT_NODE:
@@ -69,7 +69,7 @@ void CheckKinds(const DOM_Tree& inTree, DOM_Tree::Node inParent, DOM_Tree::Node 
 
 void CheckDocumentChildren(const DOM_Tree& inTree, DOM_Tree::Node inChild, DOM_Tree::Node inBefore,
                            DOM_Tree::Node inReplaced) {
-  const int kind = inTree.At(inChild).kind;
+  const auto kind = inTree.At(inChild).kind;
   if (kind != DOM_Node::ELEMENT_NODE && kind != DOM_Node::DOCUMENT_TYPE_NODE) return;
   bool isAfter = false;  // whether the children met come after the new one
   for (DOM_Tree::Node at = inTree.FirstChild(DOM_Tree::kDocument); at != 0;
