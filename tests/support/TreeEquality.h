@@ -16,10 +16,10 @@ inline std::string TreeDifference(const DOM_Node& inA, const DOM_Node& inB);
 namespace detail {
 
 inline std::string Describe(const DOM_Node& inNode) {
-  return inNode.isNull() ? "nothing"
-                         : "kind " + std::to_string(inNode.getNodeType()) + " \"" +
-                               Narrow(inNode.getNodeName()) + "\" = \"" +
-                               Narrow(inNode.getNodeValue()) + "\"";
+  return inNode.isNull()
+             ? "nothing"
+             : "kind " + std::to_string(inNode.getNodeType()) + " \"" +
+                   Narrow(inNode.getNodeName()) + "\" = \"" + Narrow(inNode.getNodeValue()) + "\"";
 }
 
 inline bool IsSameNode(const DOM_Node& inA, const DOM_Node& inB) {

@@ -7,9 +7,9 @@
 #include <vector>
 
 #include "default_platform/InterferenceScene.h"
-#include "default_platform/system/InterfaceRegistry.h"
 #include "default_platform/space_analysis/InterferenceRep.h"
 #include "default_platform/space_analysis/ViewChoice.h"
+#include "default_platform/system/InterfaceRegistry.h"
 #include "platform/product_structure/ZORIProduct.h"
 #include "platform/space_analysis/ZORISiInterference.h"
 #include "platform/visualisation/ZORI3DGeoVisu.h"
