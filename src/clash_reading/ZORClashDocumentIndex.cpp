@@ -1,6 +1,8 @@
 #include "clash_reading/ZORClashDocumentIndex.h"
 
 #include <algorithm>
+#include <atomic>
+#include <cstdint>
 #include <memory>
 #include <mutex>
 #include <unordered_map>
@@ -17,6 +19,7 @@ namespace {
 struct ReaderIndexes {
   std::mutex mutex;
   std::unordered_map<const ZORClashParsing*, std::unique_ptr<ZORClashDocumentIndex>> byReader;
+  std::atomic<std::uint64_t> discards = 0;
 };
 
 // Never deleted: a host's static reader may outlive the library's own static objects.
@@ -25,20 +28,34 @@ ReaderIndexes& AllIndexes() {
   return *indexes;
 }
 
+// The thread's last look-up, which spares the next one the lock; valid until any index is discarded.
+struct LastLookup {
+  const ZORClashParsing* reader = nullptr;
+  ZORClashDocumentIndex* index = nullptr;
+  std::uint64_t discards = 0;
+};
+thread_local LastLookup lastLookup;
+
+ZORClashDocumentIndex* FindOrCreate(ReaderIndexes& ioIndexes, const ZORClashParsing& inReader) {
+  const std::lock_guard lock(ioIndexes.mutex);
+  auto entry = ioIndexes.byReader.find(&inReader);
+  if (entry == ioIndexes.byReader.end())
+    entry = ioIndexes.byReader.emplace(&inReader, std::make_unique<ZORClashDocumentIndex>()).first;
+  return entry->second.get();
+}
+
 }  // namespace
 
 ZORClashDocumentIndex& ZORClashDocumentIndex::Of(const ZORClashParsing& inReader,
                                                  const DOM_Element& inRoot) {
   ReaderIndexes& indexes = AllIndexes();
-  ZORClashDocumentIndex* index = nullptr;
-  {
-    const std::lock_guard lock(indexes.mutex);
-    const auto [entry, isNew] = indexes.byReader.emplace(&inReader, nullptr);
-    if (isNew) entry->second = std::make_unique<ZORClashDocumentIndex>();
-    index = entry->second.get();
-  }
-  index->Refresh(inRoot);
-  return *index;
+  LastLookup& last = lastLookup;
+  const std::uint64_t discards = indexes.discards.load(std::memory_order_acquire);
+  if (last.reader != &inReader || last.discards != discards)
+    last = {&inReader, FindOrCreate(indexes, inReader), discards};
+  ZORClashDocumentIndex& index = *last.index;
+  index.Refresh(inRoot);
+  return index;
 }
 
 void ZORClashDocumentIndex::Discard(const ZORClashParsing& inReader) {
@@ -48,6 +65,7 @@ void ZORClashDocumentIndex::Discard(const ZORClashParsing& inReader) {
   if (const auto entry = indexes.byReader.find(&inReader); entry != indexes.byReader.end()) {
     discarded = std::move(entry->second);
     indexes.byReader.erase(entry);
+    indexes.discards.fetch_add(1, std::memory_order_release);
   }
 }
 
