@@ -1,4 +1,4 @@
-#include "lyra/Csv.h"
+#include "lyra/terminal/Csv.h"
 
 #include <gtest/gtest.h>
 

@@ -6,7 +6,7 @@
 #include <filesystem>
 #include <regex>
 
-#include "lyra/publish/DrawingProgress.h"
+#include "lyra/terminal/Progress.h"
 #include "tools/Command.h"
 
 using testing::EndsWith;

@@ -334,6 +334,7 @@ TEST_F(Render, WithoutTheDrawingLibraryNothingIsWritten) {
   const std::string line =
       "mkdir " + directory.Path("lib") +
       " && cp -P \"$(dirname \"$(command -v lyra)\")\"/../lib/lib*.so* " + directory.Path("lib") +
+      " && cp -rP \"$(dirname \"$(command -v lyra)\")\"/../lib/ZORLyra " + directory.Path("lib") +
       " && rm " + directory.Path("lib/libZORRayCaster.so") +
       " && LD_LIBRARY_PATH=" + directory.Path("lib") + " lyra render " + kModel + " -o ";
   for (const char* name : {"a.png", "a.jpg"}) {

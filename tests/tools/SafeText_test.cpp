@@ -1,4 +1,4 @@
-#include "lyra/SafeText.h"
+#include "lyra/terminal/SafeText.h"
 
 #include <gtest/gtest.h>
 

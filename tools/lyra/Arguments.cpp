@@ -9,11 +9,11 @@ void Arguments::Positional(const char* inName, std::string& outText, const char*
 }
 
 void Arguments::Positionals(const char* inName, std::vector<std::string>& outTexts,
-                            const char* inHelp, int inFewest) {
+                            const char* inHelp, int inMinCount) {
   app_.add_option(inName, outTexts, inHelp)
       ->required()
       ->type_name("")
-      ->expected(inFewest, CLI::detail::expected_max_vector_size);
+      ->expected(inMinCount, CLI::detail::expected_max_vector_size);
 }
 
 void Arguments::PositionalNumber(const char* inName, long long& outNumber, const char* inHelp) {

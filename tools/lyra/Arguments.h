@@ -30,7 +30,7 @@ class Arguments {
   // Required, by position
   void Positional(const char* inName, std::string& outText, const char* inHelp);
   void Positionals(const char* inName, std::vector<std::string>& outTexts, const char* inHelp,
-                   int inFewest = 1);
+                   int inMinCount = 1);
   void PositionalNumber(const char* inName, long long& outNumber, const char* inHelp);
 
   // Optional, by name such as "--type" or "-o,--output"

@@ -10,8 +10,8 @@
 #include "foundation/TerminationSignals.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/CommandLine.h"
-#include "lyra/Language.h"
-#include "lyra/SafeText.h"
+#include "lyra/commands/CommonOptions.h"
+#include "lyra/terminal/SafeText.h"
 
 namespace lyra {
 namespace {

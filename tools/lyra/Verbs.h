@@ -6,7 +6,7 @@
 #include <span>
 
 #include "lyra/Arguments.h"
-#include "lyra/Output.h"
+#include "lyra/terminal/Output.h"
 
 namespace lyra {
 

@@ -1,5 +1,4 @@
 #include "lyra/manual/Papers.h"
-#include "lyra/manual/TextPieces.h"
 
 namespace lyra {
 namespace {

@@ -3,6 +3,8 @@
 #define ZOR_TOOLS_LYRA_MANUAL_PAPERS_H
 
 #include <string>
+#include <string_view>
+#include <vector>
 
 #include "lyra/manual/CommandTable.h"
 
@@ -15,6 +17,12 @@ std::string ManualPage(const CommandTable& inTable);
 std::string BashCompletion(const CommandTable& inTable);
 std::string ZshCompletion(const CommandTable& inTable);
 std::string FishCompletion(const CommandTable& inTable);
+
+// Small pieces of text
+std::string Joined(const std::vector<std::string>& inTexts, std::string_view inBetween);
+std::string Replaced(std::string inText, std::string_view inOld, std::string_view inNew);
+/// With a backslash before each of these characters.
+std::string Escaped(std::string_view inText, std::string_view inCharacters);
 
 }  // namespace lyra
 

@@ -1,0 +1,58 @@
+// lyra merge A B [C …] -o OUT
+#include <cstdio>
+#include <memory>
+
+#include "lyra/Verbs.h"
+#include "lyra/commands/CommonOptions.h"
+
+namespace lyra {
+using namespace ZORToolkit;
+namespace {
+
+struct MergeOptions {
+  std::vector<std::string> files;
+  std::string output;
+  PrologueOptions prologue;
+  bool sumCounts = false, withoutPrologue = false, verbose = false;
+};
+
+std::unique_ptr<ClashDocument> LoadClash(const std::string& inPath) {
+  auto document = std::make_unique<ClashDocument>(inPath);
+  document->Require({DocumentKind::kClash}, "result sets");
+  return document;
+}
+
+int Merge(MergeOptions& ioOptions, Output& ioOutput) {
+  ioOptions.prologue.hasDeclaration = !ioOptions.withoutPrologue;
+  ioOptions.prologue.Check();
+  std::string trace;
+  const std::unique_ptr<ClashDocument> merged = LoadClash(ioOptions.files.front());
+  ClashDocumentEdit edit(*merged);
+  for (std::size_t i = 1; i < ioOptions.files.size(); ++i)
+    edit.TakeIn(*LoadClash(ioOptions.files[i]), trace);
+  if (ioOptions.verbose) std::fputs(trace.c_str(), stderr);
+  if (ioOptions.sumCounts) edit.RecountInterferences();
+  OutputFile output(ioOptions.output);
+  output.Check(edit.Dump(ioOptions.prologue, output.Path()));
+  output.Finish(ioOutput);
+  return 0;
+}
+
+}  // namespace
+
+VerbAction DeclareMerge(Arguments& ioArguments) {
+  const auto options = std::make_shared<MergeOptions>();
+  ioArguments.Positionals("FILE", options->files,
+                          "Two or more clash documents; the first takes in the others", 2);
+  ioArguments.RequiredText("-o,--output", "OUT", options->output, "Where the result is written");
+  ioArguments.Flag("--sum-counts", options->sumCounts,
+                   "Declare the interferences that are there, not the sum of what was declared");
+  options->prologue.Declare(ioArguments);
+  ioArguments.Text("--type-name", "NAME", options->prologue.typeName,
+                   "Name in the document type (default: that of the root)");
+  ioArguments.Flag("--no-prologue", options->withoutPrologue, "Write no XML declaration");
+  ioArguments.Flag("-v,--verbose", options->verbose, "Tell each step on standard error");
+  return [options](Output& ioOutput) { return Merge(*options, ioOutput); };
+}
+
+}  // namespace lyra

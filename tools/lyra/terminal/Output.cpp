@@ -1,0 +1,83 @@
+#include "lyra/terminal/Output.h"
+
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstdlib>
+#include <cstring>
+#include <filesystem>
+#include <string>
+
+#include "foundation/ReadWholeFile.h"
+#include "lyra/CommandErrors.h"
+#include "platform/system/ZORFile.h"
+#include "platform/system/ZORGetEnv.h"
+
+namespace lyra {
+
+using ZORFoundation::FileError;
+
+namespace {
+
+bool IsSet(const char* inName) {
+  const char* value = ZORGetEnv(inName);
+  return value != nullptr && *value != '\0';
+}
+
+bool IsTerminalStream(std::FILE* inStream) { return isatty(fileno(inStream)) == 1; }
+
+}  // namespace
+
+Output::Output(std::FILE* inStream)
+    : stream_(inStream),
+      isTerminal_(IsTerminalStream(inStream)),
+      isStyled_(isTerminal_ && !IsSet("NO_COLOR")) {}
+
+void Output::Write(std::string_view inBytes) {
+  if (std::fwrite(inBytes.data(), 1, inBytes.size(), stream_) != inBytes.size()) Fail(errno);
+}
+
+void Output::Finish() {
+  if (std::fflush(stream_) != 0) Fail(errno);
+}
+
+void Output::Fail(int inErrorNumber) {
+  if (inErrorNumber == EPIPE) throw ReaderGone();
+  throw InputError(std::string("standard output: ") + std::strerror(inErrorNumber));
+}
+
+int Output::Width() const {
+  if (!isTerminal_) return 0;
+  if (const char* columns = ZORGetEnv("COLUMNS"); columns != nullptr) {
+    const int width = std::atoi(columns);
+    if (width > 0) return width;
+  }
+  winsize size{};
+  return ioctl(fileno(stream_), TIOCGWINSZ, &size) == 0 ? size.ws_col : 0;
+}
+
+OutputFile::OutputFile(const std::string& inPath) : path_(inPath) {
+  constexpr unsigned int kOwnerOnly = 0600;
+  if (inPath == "-")
+    forStream_.emplace(std::filesystem::temp_directory_path().string(), kOwnerOnly, inPath);
+  else
+    file_.emplace(inPath);
+}
+
+void OutputFile::Check(HRESULT inResult) const {
+  if (SUCCEEDED(inResult)) return;
+  if (inResult == kZORFileNotFound) throw FileError(path_, ENOENT);
+  if (inResult == kZORFileAccessDenied) throw FileError(path_, EACCES);
+  if (inResult == kZORFileDiskFull) throw FileError(path_, ENOSPC);
+  throw FileError(path_, EIO, "the file could not be written");
+}
+
+void OutputFile::Finish(Output& ioOutput) {
+  if (file_)
+    file_->Commit();
+  else
+    ioOutput.Write(ZORFoundation::ReadWholeFile(Temporary().Path()).bytes);
+}
+
+}  // namespace lyra

@@ -1,0 +1,130 @@
+#include "lyra/terminal/SafeText.h"
+
+#include <algorithm>
+#include <clocale>
+#include <cstdio>
+#include <cwchar>
+#include <vector>
+
+#include "foundation/Utf8.h"
+
+namespace lyra {
+namespace {
+
+using ZORFoundation::IsAscii;
+
+bool IsPlain(std::string_view inText) {
+  return std::all_of(inText.begin(), inText.end(),
+                     [](char inByte) { return inByte >= ' ' && inByte < 0x7F; });
+}
+
+std::vector<char32_t> CodePoints(std::string_view inText) {
+  std::vector<char32_t> points;
+  points.reserve(inText.size());
+  for (std::size_t position = 0; position < inText.size();)
+    points.push_back(ZORFoundation::NextCharacter(inText, position));
+  return points;
+}
+
+void AppendCodePoint(char32_t inPoint, std::string& ioText) {
+  char bytes[4];
+  ioText.append(bytes, ZORFoundation::EncodeCharacter(inPoint, bytes));
+}
+
+bool IsControl(char32_t inPoint) { return inPoint < 0x20 || (inPoint >= 0x7F && inPoint < 0xA0); }
+
+// Marks, embeddings, overrides and isolates of the direction of writing; line and paragraph
+// separators; tags, which are invisible.
+bool IsDeceptive(char32_t inPoint) {
+  return inPoint == 0x061C || (inPoint >= 0x200E && inPoint <= 0x200F) ||
+         (inPoint >= 0x2028 && inPoint <= 0x202E) || (inPoint >= 0x2066 && inPoint <= 0x2069) ||
+         (inPoint >= 0xE0000 && inPoint <= 0xE007F);
+}
+
+std::string Hex(const char* inFormat, char32_t inPoint) {
+  char digits[16];
+  std::snprintf(digits, sizeof digits, inFormat, static_cast<unsigned int>(inPoint));
+  return digits;
+}
+
+/// Makes the character tables of Unicode current while it lives, whatever the process's locale.
+class UnicodeTables {
+ public:
+  UnicodeTables() : previous_(Tables() != nullptr ? uselocale(Tables()) : nullptr) {}
+  ~UnicodeTables() {
+    if (previous_ != nullptr) uselocale(previous_);
+  }
+  UnicodeTables(const UnicodeTables&) = delete;
+  UnicodeTables& operator=(const UnicodeTables&) = delete;
+
+ private:
+  // Loaded when the first text beyond ASCII comes, and kept for the process's lifetime.
+  static locale_t Tables() {
+    static const locale_t tables = newlocale(LC_CTYPE_MASK, "C.UTF-8", nullptr);
+    return tables;
+  }
+  locale_t previous_;
+};
+
+int ColumnsOf(char32_t inPoint) {
+  const int columns = wcwidth(static_cast<wchar_t>(inPoint));
+  return columns < 0 ? 1 : columns;  // not in the tables: most characters take one column
+}
+
+int ColumnsOf(const std::vector<char32_t>& inPoints) {
+  const UnicodeTables tables;
+  int width = 0;
+  for (char32_t point : inPoints) width += ColumnsOf(point);
+  return width;
+}
+
+}  // namespace
+
+std::string Printable(std::string_view inText) {
+  if (IsPlain(inText)) return std::string(inText);
+  std::string shown;
+  for (char32_t point : CodePoints(inText)) {
+    if (IsControl(point) || IsDeceptive(point))
+      shown += Hex("\\u{%X}", point);
+    else
+      AppendCodePoint(point, shown);
+  }
+  return shown;
+}
+
+std::string EscapedForJson(std::string inJson) {
+  if (IsAscii(inJson) && inJson.find('\x7F') == std::string::npos) return inJson;
+  std::string escaped;
+  for (char32_t point : CodePoints(inJson)) {
+    if (!IsControl(point) && !IsDeceptive(point))
+      AppendCodePoint(point, escaped);
+    else if (point < 0x10000)
+      escaped += Hex("\\u%04x", point);
+    else
+      escaped += Hex("\\u%04x", 0xD7C0 + (point >> 10)) + Hex("\\u%04x", 0xDC00 + (point & 0x3FF));
+  }
+  return escaped;
+}
+
+int DisplayWidth(std::string_view inText) {
+  return IsAscii(inText) ? static_cast<int>(inText.size()) : ColumnsOf(CodePoints(inText));
+}
+
+std::string Fitted(std::string_view inText, int inWidth, Cut inCut) {
+  if (DisplayWidth(inText) <= inWidth) return std::string(inText);
+  std::vector<char32_t> points = CodePoints(inText);
+  if (inCut == Cut::kStart) std::reverse(points.begin(), points.end());
+  const UnicodeTables tables;
+  int width = 1;  // of the sign that something is missing
+  std::size_t kept = 0;
+  while (kept < points.size() && width + ColumnsOf(points[kept]) <= inWidth)
+    width += ColumnsOf(points[kept++]);
+  points.resize(kept);
+  points.push_back(U'…');
+  if (inCut == Cut::kStart) std::reverse(points.begin(), points.end());
+  std::string fitted;
+  for (char32_t point : points) AppendCodePoint(point, fitted);
+  return fitted;
+}
+
+}  // namespace lyra
