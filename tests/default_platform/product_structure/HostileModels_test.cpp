@@ -73,6 +73,31 @@ TEST(HostileModels, StepWithAMissingLineEndsTheReaderAlone) {
   EXPECT_THAT(outcome.reason, HasSubstr("while building its shapes"));
 }
 
+TEST(HostileModels, StepThatLosesFacesSaysSo) {
+  const Folder folder;
+  const std::string path = folder.Write("a.stp", SampleWithoutLine(5895));  // a point of an edge
+  ModelOptions options;
+  options.useCache = false;
+  const Outcome outcome = Open(path, options);
+  EXPECT_TRUE(outcome.isOpened);
+  EXPECT_THAT(outcome.warnings,
+              testing::Contains(path + ": is damaged: 4 entities of the file could not be built"));
+  options.isStrict = true;
+  const Outcome strict = Open(path, options);
+  EXPECT_FALSE(strict.isOpened);
+  EXPECT_EQ(strict.kind, ModelErrorKind::kDamaged);
+  EXPECT_EQ(strict.reason, "is damaged: 4 entities of the file could not be built");
+}
+
+TEST(HostileModels, DamageIsKnownFromTheCacheToo) {
+  const OwnCache cache;
+  const Folder folder;
+  const std::string path = folder.Write("a.stp", SampleWithoutLine(5895));
+  const Outcome first = Open(path), second = Open(path);
+  EXPECT_FALSE(first.warnings.empty());
+  EXPECT_EQ(first.warnings, second.warnings);
+}
+
 TEST(HostileModels, StepFilesThatNameEachOther) {
   ModelOptions options;
   options.useCache = false;

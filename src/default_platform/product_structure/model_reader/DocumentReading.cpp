@@ -6,6 +6,7 @@
 #include <Interface_Check.hxx>
 #include <Interface_CheckIterator.hxx>
 #include <Interface_InterfaceModel.hxx>
+#include <Interface_ReportEntity.hxx>
 #include <Interface_Static.hxx>
 #include <Message.hxx>
 #include <Message_Messenger.hxx>
@@ -25,6 +26,7 @@
 #include <XSControl_WorkSession.hxx>
 #include <algorithm>
 #include <filesystem>
+#include <string_view>
 
 namespace ZORDefault {
 namespace {
@@ -60,6 +62,18 @@ void AddDamage(std::size_t inCount, const char* inWhat, std::vector<std::string>
                         inWhat);
 }
 
+/// Exporters leave out names and the dimensions of units, on which nothing depends.
+bool IsHarmless(std::string_view inMessage) {
+  return inMessage.ends_with("not a quoted String") ||
+         inMessage.find("(dimensions)") != std::string_view::npos;
+}
+
+bool IsDamaged(const Handle(Interface_Check) & inCheck) {
+  for (int i = 1; i <= inCheck->NbFails(); ++i)
+    if (!IsHarmless(inCheck->CFail(i))) return true;
+  return false;
+}
+
 /// What the kernel itself says it could not read or build.
 template <class Reader>
 std::vector<std::string> DamagesOf(const Reader& inReader) {
@@ -68,7 +82,7 @@ std::vector<std::string> DamagesOf(const Reader& inReader) {
   const Handle(Interface_InterfaceModel) model = session->Model();
   std::size_t unread = 0;
   for (int i = 1; i <= model->NbEntities(); ++i)
-    if (model->IsErrorEntity(i)) ++unread;
+    if (model->IsErrorEntity(i) && IsDamaged(model->ReportEntity(i)->Check())) ++unread;
   AddDamage(unread, " of the file could not be read", damages);
   if (const auto& process = session->TransferReader()->TransientProcess(); !process.IsNull())
     AddDamage(CountFailed(process->CheckList(true)), " of the file could not be built", damages);

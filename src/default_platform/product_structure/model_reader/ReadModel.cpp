@@ -149,12 +149,13 @@ ModelData Read(const ModelRequest& inRequest, std::string_view inBytes) {
   for (const std::string& name : RefusedFiles()) names.insert(name);
   for (const std::string& name : names) model.referencedFiles.push_back(ReferencedFileAt(name));
   ForgetFileName(inRequest, model);
-  model.damages = loaded.damages;
   WarnOfMissingTriangles(model);
   WarnOfScaledNodes(inRequest, inBytes, model);
   const std::string missing = DescribeFiles(model, ReferencedFile::State::kMissing, "missing");
   if (!HasGeometry(model))
     throw Refusal{missing.empty() ? "holds no geometry" : "holds no geometry; " + missing};
+  // The kernel cannot build what lies in a missing file, and that is said below.
+  if (missing.empty()) model.damages = loaded.damages;
   for (const std::string& warning :
        {missing, DescribeFiles(model, ReferencedFile::State::kRefused, "outside its folder")})
     if (!warning.empty()) model.warnings.push_back(warning);
