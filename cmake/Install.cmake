@@ -26,10 +26,12 @@ endif()
 
 install(DIRECTORY include/ DESTINATION ${headerDir} FILES_MATCHING PATTERN "*.h")
 install(DIRECTORY src/platform/ DESTINATION ${headerDir}/platform FILES_MATCHING PATTERN "*.h")
-install(FILES src/default_platform/OpenModel.h DESTINATION ${headerDir}/default_platform)
-# Not those of the CAD kernel's part, which is loaded by name.
-install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit
-  FILES_MATCHING PATTERN "*.h" PATTERN "ElementWalk.h" EXCLUDE PATTERN "detection" EXCLUDE)
+install(FILES src/default_platform/InterferenceScene.h src/default_platform/OpenModel.h
+  src/default_platform/SettingOverride.h DESTINATION ${headerDir}/default_platform)
+# Not those of the CAD kernel's part, which is loaded by name, and of the toolkit's own sources.
+install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit FILES_MATCHING PATTERN "*.h"
+  PATTERN "detection" EXCLUDE
+  REGEX "/(DrawingWorkers|ElementWalk|PageMaker|PictureStore|PublishedFiles|ShippedTexts)[.]h$" EXCLUDE)
 install(FILES ${PROJECT_BINARY_DIR}/generated/ZORLyraExport.h ${PROJECT_BINARY_DIR}/generated/ZORPlatformExport.h
   ${PROJECT_BINARY_DIR}/generated/ZORToolkitExport.h
   DESTINATION ${headerDir})

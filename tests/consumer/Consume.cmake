@@ -1,5 +1,5 @@
 # Installs the build, moves what was installed, and builds and runs the outside project by CMake and by pkg-config:
-#   cmake -D build=… -D work=… -D project=… -D sample=… -D compiler=… -D flags=… -P Consume.cmake
+#   cmake -D build=… -D work=… -D project=… -D picture=… -D sample=… -D model=… -D compiler=… -D flags=… -P Consume.cmake
 set(installed ${work}/installed)
 set(prefix "${work}/moved to another place")
 file(REMOVE_RECURSE ${work})
@@ -23,6 +23,21 @@ Run(${CMAKE_COMMAND} -S ${project} -B ${work}/by-cmake -DCMAKE_PREFIX_PATH=${pre
 Run(${CMAKE_COMMAND} --build ${work}/by-cmake)
 Run(${work}/by-cmake/kind ${sample})
 ExpectKind(CMake)
+
+# Through installed headers alone: a model is opened, an interference read and drawn. Other settings than the installed
+# ones would be found first.
+Run(${CMAKE_COMMAND} -S ${picture} -B ${work}/picture -DCMAKE_PREFIX_PATH=${prefix}
+  -DCMAKE_CXX_COMPILER=${compiler} -DCMAKE_CXX_FLAGS=${flags})
+Run(${CMAKE_COMMAND} --build ${work}/picture)
+Run(${work}/picture/picture ${model} ${sample} 1 ${work}/picture.png)
+if(NOT output MATCHES "^Contact: .+ and .+\n$")
+  message(FATAL_ERROR "the program that draws printed: ${output}")
+endif()
+file(READ ${work}/picture.png bytes HEX)
+# The signature, and in the header 300 by 200 pixels.
+if(NOT bytes MATCHES "^89504e470d0a1a0a0000000d494844520000012c000000c8")
+  message(FATAL_ERROR "the picture is none")
+endif()
 
 set(ENV{PKG_CONFIG_PATH} "${prefix}/lib/pkgconfig")
 find_program(shell sh REQUIRED)
