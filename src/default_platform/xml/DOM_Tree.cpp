@@ -33,13 +33,15 @@ DOM_Tree::Node DOM_Tree::FirstChildOfKind(Node inParent, int inKind) const {
 // ---- positions
 
 const PositionIndexes::Children* DOM_Tree::IndexOf(Node inParent) {
-  const PositionIndexes::Children* const known = indexes_.Find(inParent);
+  const bool isIndexed = At(inParent).flags & kIndexed;
+  const PositionIndexes::Children* const known = isIndexed ? indexes_.Find(inParent) : nullptr;
   if (known != nullptr) return known;
   Node child = FirstChild(inParent);
   for (std::uint32_t steps = 0; child != 0 && steps < kMaxWalk; ++steps) child = At(child).next;
   if (child == 0) return nullptr;
   PositionIndexes::Children children;
   for (child = FirstChild(inParent); child != 0; child = At(child).next) children.push_back(child);
+  nodes_[inParent].flags |= kIndexed;
   return &indexes_.Keep(inParent, std::move(children));
 }
 
@@ -88,6 +90,16 @@ DOM_Tree::Attribute DOM_Tree::AttributeAtPosition(Node inElement, std::uint32_t 
 DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, TextView inName) const {
   Attribute attribute = At(inElement).firstAttribute;
   while (attribute != 0 && !IsSameText(TextView(NameUnits(attributes_[attribute].name)), inName))
+    attribute = attributes_[attribute].next;
+  return attribute;
+}
+
+DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, std::string_view inLatin1) const {
+  Attribute attribute = At(inElement).firstAttribute;
+  if (attribute == 0) return 0;
+  const Name name = names_.Find(inLatin1);
+  if (name == 0) return 0;
+  while (attribute != 0 && attributes_[attribute].name != name)
     attribute = attributes_[attribute].next;
   return attribute;
 }
@@ -219,7 +231,7 @@ void DOM_Tree::LinkLast(Node inParent, Node inChild) {
     nodes_[child.previous].next = inChild;
     nodes_[first].previous = inChild;
   }
-  indexes_.Append(inParent, inChild);
+  if (nodes_[inParent].flags & kIndexed) indexes_.Append(inParent, inChild);
 }
 
 void DOM_Tree::LinkBefore(Node inParent, Node inChild, Node inBefore) {
@@ -233,7 +245,7 @@ void DOM_Tree::LinkBefore(Node inParent, Node inChild, Node inBefore) {
                                                        : nodes_[after.previous].next;
   link = inChild;
   after.previous = inChild;
-  indexes_.Drop(inParent);
+  if (nodes_[inParent].flags & kIndexed) indexes_.Drop(inParent);
 }
 
 void DOM_Tree::Unlink(Node inChild) {
@@ -243,7 +255,7 @@ void DOM_Tree::Unlink(Node inChild) {
   (isFirst ? parent.firstChild : nodes_[child.previous].next) = child.next;
   if (parent.firstChild != 0)
     nodes_[child.next == 0 ? parent.firstChild : child.next].previous = child.previous;
-  indexes_.Drop(child.parent);
+  if (parent.flags & kIndexed) indexes_.Drop(child.parent);
   child.parent = 0;
   child.previous = 0;
   child.next = 0;

@@ -70,7 +70,8 @@ class DOM_Tree {
   enum Flag : std::uint8_t {
     kDetached = 1,    // see above
     kListedRoot = 2,  // among the roots of its group
-    kFree = 4         // not a node now
+    kFree = 4,        // not a node now
+    kIndexed = 8      // indexes_ may hold its children
   };
 
   struct NodeRecord {
@@ -140,6 +141,7 @@ class DOM_Tree {
   std::uint32_t AttributeCount(Node inElement);
   Attribute AttributeAtPosition(Node inElement, std::uint32_t inPosition);
   Attribute FindAttribute(Node inElement, TextView inName) const;
+  Attribute FindAttribute(Node inElement, std::string_view inLatin1) const;
   Node FirstChildOfKind(Node inParent, int inKind) const;
   const DOM_Text* NameText(Name inName) const { return names_.TextOf(inName); }
   std::u16string_view NameUnits(Name inName) const { return names_.UnitsOf(inName); }

@@ -62,7 +62,7 @@ void DetachedNodes::LeaveChunk(Node inNode) {
 void DOM_Tree::AttachSubtree(Node inRoot) {
   for (Node at = inRoot; at != 0; at = NextWithin(at, inRoot)) {
     if (!(nodes_[at].flags & kDetached)) continue;
-    nodes_[at].flags = 0;
+    nodes_[at].flags &= kIndexed;
     detached_.RemoveNode(at);
   }
 }
@@ -156,7 +156,7 @@ void DOM_Tree::FreeOne(Node inNode) {
     attribute = next;
   }
   if (cursor_.element == inNode) cursor_ = AttributeCursor();
-  indexes_.Drop(inNode);
+  if (record.flags & kIndexed) indexes_.Drop(inNode);
   detached_.RemoveNode(inNode);
   record = NodeRecord();
   record.flags = kFree;

@@ -35,11 +35,9 @@ class PositionIndexes {
 
   std::array<Index, 8> indexes_;
   std::uint64_t age_ = 0;
-  bool any_ = false;
 };
 
 inline PositionIndexes::Index* PositionIndexes::Of(std::uint32_t inParent) {
-  if (!any_) return nullptr;
   for (Index& index : indexes_)
     if (index.parent == inParent) return &index;
   return nullptr;
@@ -61,7 +59,6 @@ inline const PositionIndexes::Children& PositionIndexes::Keep(std::uint32_t inPa
   cheapest.parent = inParent;
   cheapest.children = std::move(inChildren);
   cheapest.worth = age_ + cheapest.children.size();
-  any_ = true;
   return cheapest.children;
 }
 

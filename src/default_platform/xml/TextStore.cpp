@@ -145,6 +145,15 @@ std::size_t NameTable::SlotOf(std::u16string_view inName) const {
   return slot;
 }
 
+std::uint32_t NameTable::Find(std::string_view inLatin1) const {
+  const auto address = reinterpret_cast<std::uintptr_t>(inLatin1.data());
+  std::uint32_t& found = found_[(address ^ (address >> 8)) % found_.size()];
+  if (found != 0 && IsSameText(UnitsOf(found), inLatin1)) return found;
+  const std::uint32_t name = slots_[SlotOf(TextView(inLatin1).ToUtf16())];
+  if (name != 0) found = name;
+  return name;
+}
+
 std::uint32_t NameTable::Intern(std::u16string_view inName) {
   const std::size_t slot = SlotOf(inName);
   if (slots_[slot] != 0) return slots_[slot];

@@ -2,6 +2,7 @@
 #ifndef ZOR_DEFAULT_PLATFORM_XML_TEXTSTORE_H
 #define ZOR_DEFAULT_PLATFORM_XML_TEXTSTORE_H
 
+#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
@@ -135,6 +136,8 @@ class NameTable {
 
   explicit NameTable(TextStore& ioTexts);
   std::uint32_t Intern(std::u16string_view inName);
+  /// @return 0 for a name that the document does not have.
+  std::uint32_t Find(std::string_view inLatin1) const;
   const DOM_Text* TextOf(std::uint32_t inName) const { return names_[inName]; }
   std::u16string_view UnitsOf(std::uint32_t inName) const {
     return {names_[inName]->Units(), names_[inName]->Length()};
@@ -149,6 +152,8 @@ class NameTable {
   TextStore& texts_;
   std::vector<const DOM_Text*> names_;
   std::vector<std::uint32_t> slots_;  // open addressing; a power of two
+  // Readers ask for the same few names by the same literals: the last one found by each address.
+  mutable std::array<std::uint32_t, 256> found_{};
 };
 
 /// A fast hash of bytes, eight at a time.
