@@ -107,20 +107,25 @@ std::vector<std::string> CatalogueDirectories() {
   return directories;
 }
 
-std::optional<FoundFile> FindToml(const std::vector<std::string>& inDirectories,
-                                  std::string_view inFolder, std::string_view inName) {
-  if (!IsFileName(inName)) return std::nullopt;
-  for (const std::string& directory : inDirectories) {
-    std::string path = directory;
-    path.append("/").append(inFolder).append(inName).append(".toml");
+std::vector<std::string> TomlCandidates(const std::vector<std::string>& inDirectories,
+                                        std::string_view inFolder, std::string_view inName) {
+  std::vector<std::string> paths;
+  if (!IsFileName(inName)) return paths;
+  for (const std::string& directory : inDirectories)
+    paths.push_back(
+        std::string(directory).append("/").append(inFolder).append(inName).append(".toml"));
+  return paths;
+}
+
+std::optional<FoundFile> FindFirst(const std::vector<std::string>& inPaths) {
+  for (const std::string& path : inPaths)
     if (const auto stamp = ZORFoundation::StampOfFile(path)) return FoundFile{path, *stamp};
-  }
   return std::nullopt;
 }
 
 std::shared_ptr<const TomlTable> ReadSettingFile(std::string_view inFolder,
                                                  std::string_view inName) {
-  return SettingFiles().Get(FindToml(SettingDirectories(), inFolder, inName));
+  return SettingFiles().Get(FindFirst(TomlCandidates(SettingDirectories(), inFolder, inName)));
 }
 
 }  // namespace ZORDefault

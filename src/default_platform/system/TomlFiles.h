@@ -37,10 +37,12 @@ struct FoundFile {
 /// is now; below each there is a folder for each language.
 std::vector<std::string> CatalogueDirectories();
 
-/// Looks for NAME.toml in a folder ("" or "system/") of each directory in turn. A name that is not
-/// that of one file in a directory is not found.
-std::optional<FoundFile> FindToml(const std::vector<std::string>& inDirectories,
-                                  std::string_view inFolder, std::string_view inName);
+/// NAME.toml in a folder ("" or "system/") of each directory in turn; none for a name that is not
+/// that of one file in a directory.
+std::vector<std::string> TomlCandidates(const std::vector<std::string>& inDirectories,
+                                        std::string_view inFolder, std::string_view inName);
+/// The first of these files that exists now.
+std::optional<FoundFile> FindFirst(const std::vector<std::string>& inPaths);
 
 /// The entries of the first NAME.toml among the setting directories; null when there is none or it
 /// is damaged.

@@ -3,6 +3,8 @@
 #include <map>
 #include <string>
 #include <string_view>
+#include <utility>
+#include <vector>
 
 #include "default_platform/system/TomlFiles.h"
 #include "platform/system/ZORGetEnv.h"
@@ -57,12 +59,29 @@ std::string UserLanguage() {
   return "en";
 }
 
+// The files that a catalogue may be, the first to be looked for first. Hosts ask for the same one a
+// hundred thousand times: the last answer holds as long as the environment does.
+const std::vector<std::string>& CandidatesOf(const char* inName) {
+  struct Search {
+    std::string name, language, path;
+    std::vector<std::string> files;
+  };
+  thread_local Search last;
+  const std::string language = UserLanguage();
+  const char* const path = ZORGetEnv("ZOR_CATALOGUE_PATH");
+  const std::string_view pathNow = path == nullptr ? "" : path;
+  if (last.name == inName && last.language == language && last.path == pathNow) return last.files;
+  const std::vector<std::string> directories = ZORDefault::CatalogueDirectories();
+  last = {inName, language, std::string(pathNow),
+          ZORDefault::TomlCandidates(directories, language + "/", inName)};
+  for (std::string& file : ZORDefault::TomlCandidates(directories, "en/", inName))
+    last.files.push_back(std::move(file));
+  return last.files;
+}
+
 MessagesPointer FindMessages(const char* inName) {
   if (!inName) return nullptr;
-  const std::vector<std::string> directories = ZORDefault::CatalogueDirectories();
-  auto file = ZORDefault::FindToml(directories, UserLanguage() + "/", inName);
-  if (!file) file = ZORDefault::FindToml(directories, "en/", inName);
-  return CatalogueFiles().Get(file);
+  return CatalogueFiles().Get(ZORDefault::FindFirst(CandidatesOf(inName)));
 }
 
 }  // namespace
