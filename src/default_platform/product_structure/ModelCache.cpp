@@ -75,17 +75,17 @@ ModelCache::ModelCache(std::string_view inBytes, const ModelRequest& inRequest)
   if (!path_.empty()) path_ += '/' + EntryName(inBytes, inRequest);
 }
 
-ModelCache::Finding ModelCache::Load(ModelData& outModel) const {
+ModelCache::Lookup ModelCache::Load(ModelData& outModel) const {
   const auto entry = path_.empty() ? std::nullopt : ZORFoundation::TryReadWholeFile(path_);
-  if (!entry) return Finding::kNone;
+  if (!entry) return Lookup::kMiss;
   ModelData model;
   if (!IsWholeEntry(entry->bytes) ||
       !DecodeModel(std::string_view(entry->bytes).substr(sizeof(EntryHeader)), model))
-    return Finding::kDamaged;
+    return Lookup::kDamaged;
   for (const ReferencedFile& file : model.referencedFiles)
-    if (!IsUnchanged(file, folder_)) return Finding::kNone;
+    if (!IsUnchanged(file, folder_)) return Lookup::kMiss;
   outModel = std::move(model);
-  return Finding::kFound;
+  return Lookup::kHit;
 }
 
 void ModelCache::Store(std::string_view inEncodedModel) const {

@@ -1,4 +1,4 @@
-// Models that were read before.
+// The cache of models that were read before.
 #ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELCACHE_H
 #define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELCACHE_H
 
@@ -10,19 +10,18 @@
 
 namespace ZORDefault {
 
-/// The place of one model in the user's cache directory. Its name is a 128-bit hash of the model's
-/// bytes and of all that decides what is read from them; its content ends in a checksum.
+/// One model's entry in the user's cache directory. Its name is a 128-bit hash of the model's bytes
+/// and of everything else that decides what is read from them.
 class ModelCache {
  public:
-  enum class Finding { kNone, kFound, kDamaged };
+  enum class Lookup { kMiss, kHit, kDamaged };
 
   ModelCache(std::string_view inBytes, const ModelRequest& inRequest);
 
-  /// @param outModel set when it is found; files that it was also read from must be as they were.
-  Finding Load(ModelData& outModel) const;
+  /// @param outModel set when it is found and the files that it refers to have not changed.
+  Lookup Load(ModelData& outModel) const;
 
-  /// Keeps an encoded model; the old entry stays whole until the new one is. Nothing is said where it
-  /// cannot be written.
+  /// Stores an encoded model atomically. A failure is not reported.
   void Store(std::string_view inEncodedModel) const;
 
  private:

@@ -1,4 +1,4 @@
-// A model as it was read: parts and the tree of products that shows them.
+// A model as it was read: its parts, and the tree of products that are instances of them.
 #ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELDATA_H
 #define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELDATA_H
 
@@ -14,15 +14,15 @@
 
 namespace ZORDefault {
 
-/// What one or more products are instances of: a part or an assembly. Held once.
+/// A part or an assembly, shared by the products that are its instances.
 struct ModelPart {
   std::u16string name;  ///< as the file has it; may be empty
-  std::string label;    ///< the reader's own number for it, such as "0:1:1:30"; may be empty
+  std::string label;    ///< the kernel's label, such as "0:1:1:30"; may be empty
   std::optional<PartColour> colour;
   std::shared_ptr<const PartMesh> mesh;  ///< null: an assembly, or a part with nothing to show
   bool isAssembly = false;
-  bool failedToTessellate = false;          ///< it has surfaces, but no triangle came of them
-  std::uint32_t facesWithoutTriangles = 0;  ///< faces that are missing from the mesh
+  bool failedToTessellate = false;          ///< it has surfaces but no triangles
+  std::uint32_t facesWithoutTriangles = 0;  ///< missing from the mesh
   double area = 0;                          ///< of all triangles, square millimetres
 };
 
@@ -50,24 +50,24 @@ struct ReferencedFile {
   std::uint64_t hash = 0;  ///< of its bytes, when they were read
 };
 
-/// The first product is the root; a parent stands before its children, which are in order.
+/// The products in preorder, the root first.
 struct ModelData {
   std::vector<ModelPart> parts;
   std::vector<ModelProduct> products;
   std::vector<ReferencedFile> referencedFiles;
   std::vector<std::string> damages;   ///< what the file holds and the model does not; one line each
   std::vector<std::string> warnings;  ///< one line each, UTF-8
-  bool hadFailure = false;            ///< another reading may give more: not to be kept
+  bool hadFailure = false;            ///< not to be cached: another reading may give more
 };
 
-/// Counts up with every change of the bytes or of what a reading gives.
+/// Incremented with every change of the encoding, or of what is read from the same file.
 inline constexpr std::uint32_t kModelCodecVersion = 4;
 
 /// The form in which models are kept in the cache and handed over by the process that reads them, in
 /// the machine's own byte order.
 std::string EncodeModel(const ModelData& inModel);
 
-/// @return false when the bytes are no model: too short, too long, or holding impossible positions.
+/// @return false when the bytes are no model: too short, too long, or with indices out of range.
 bool DecodeModel(std::string_view inBytes, ModelData& outModel);
 
 }  // namespace ZORDefault

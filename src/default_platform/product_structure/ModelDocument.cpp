@@ -40,7 +40,6 @@ std::u16string Numbered(const std::u16string& inName, std::size_t inNumber) {
   return inName + u'.' + std::u16string(digits.begin(), digits.end());
 }
 
-/// Numbers the aliases that several of these siblings bear.
 void NumberDuplicates(const std::vector<std::size_t>& inSiblings,
                       std::vector<std::u16string>& ioAliases) {
   std::map<std::u16string, std::size_t> bearers;
@@ -107,7 +106,7 @@ HRESULT ModelDocument::ProvidersFacet::AddProvider(const IID& inInterface,
     return provider.interfaceId == inInterface && provider.component->IsEqual(inProvider);
   });
   if (isKnown) return E_FAIL;
-  // A reference on one of its own products would keep the document alive for ever.
+  // A reference to one of its own products would be a cycle.
   const bool isOwn = self_.Holds(inProvider) || inProvider->IsEqual(&self_.document_);
   self_.providers_.push_back(
       {inInterface, inProvider, isOwn ? ZORBaseUnknown_var() : ZORBaseUnknown_var(inProvider)});

@@ -16,12 +16,12 @@
 
 namespace ZORDefault {
 
-/// Owns a model and its products, and ends with the last reference on itself or any of them.
+/// Owns a model and its products. Deleted with the last reference to itself or to any of them.
 class ModelDocument final : public FacetedComponent, private CountedObject<ModelDocument> {
  public:
   static const char* CountedName() { return "ModelDocument"; }
 
-  /// Made with one reference.
+  /// Has one reference at first.
   /// @param inFileName the root's name where it has none.
   ModelDocument(ModelData inModel, const std::u16string& inFileName);
   ModelDocument(const ModelDocument&) = delete;
@@ -49,7 +49,7 @@ class ModelDocument final : public FacetedComponent, private CountedObject<Model
   struct Provider {
     IID interfaceId;
     ZORBaseUnknown* component;
-    ZORBaseUnknown_var reference;  // empty for what lives in this document anyway
+    ZORBaseUnknown_var reference;  // empty for the document's own products
   };
 
   ~ModelDocument() = default;
@@ -68,8 +68,8 @@ class ModelDocument final : public FacetedComponent, private CountedObject<Model
 ZOR_PLATFORM_EXPORT std::u16string ReplaceInvalidXmlChars(std::u16string inText);
 
 /// The alias of each product of a model, in the model's order: its own name, or its part's, or
-/// "Component"; siblings that would have the same are numbered from .1 on, passing over a number
-/// that would give the name of another sibling.
+/// "Component"; siblings with the same alias are numbered from .1 on, skipping a number that
+/// would give the name of another sibling.
 /// @param inFileName stands for the root's name where it has none.
 ZOR_PLATFORM_EXPORT std::vector<std::u16string> AliasesOf(const ModelData& inModel,
                                                           const std::u16string& inFileName);

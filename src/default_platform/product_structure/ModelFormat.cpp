@@ -19,7 +19,6 @@ std::string_view WithoutLeadingSpace(std::string_view inText) {
   return start == std::string_view::npos ? std::string_view() : inText.substr(start);
 }
 
-/// The bytes from which a mark at the end is looked for.
 std::string_view Tail(std::string_view inBytes, std::size_t inLength) {
   return inBytes.substr(inBytes.size() - std::min(inBytes.size(), inLength));
 }
@@ -46,7 +45,7 @@ bool IsIges(std::string_view inBytes) {
 constexpr std::size_t kStlHeader = 84;
 constexpr std::size_t kStlTriangle = 50;
 
-/// A binary STL says after 80 free bytes how many triangles follow.
+/// A binary STL has its count of triangles after a header of 80 bytes.
 std::uint64_t BinaryStlSize(std::string_view inBytes) {
   return kStlHeader + std::uint64_t{kStlTriangle} * LittleEndian32(inBytes, kStlHeader - 4);
 }

@@ -1,4 +1,4 @@
-// Which format a model file is in, and whether all of it is there.
+// The format of a model file, and whether the file is complete.
 #ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELFORMAT_H
 #define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODELFORMAT_H
 
@@ -9,7 +9,7 @@ namespace ZORDefault {
 
 enum class ModelFormat { kUnknown, kStep, kIges, kGltf, kGlb, kObj, kStl };
 
-/// How people call the format; "" for the unknown one.
+/// The format's usual name; "" for the unknown one.
 inline const char* NameOfFormat(ModelFormat inFormat) {
   switch (inFormat) {
     case ModelFormat::kStep:
@@ -30,19 +30,18 @@ inline const char* NameOfFormat(ModelFormat inFormat) {
   return "";
 }
 
-/// The format that a file's ending promises, in any letter case.
+/// By the file name extension, in any case.
 ModelFormat FormatOfEnding(const std::string& inPath);
 
-/// The format that the bytes themselves show. OBJ has no mark of its own and is never found so.
+/// By the content. OBJ has no signature and is never detected.
 ModelFormat FormatOfContent(std::string_view inBytes);
 
-/// The format to read a file in: what its content shows, else what its ending promises.
+/// By the content, else by the extension.
 /// @param outReason why there is none, one line.
 ModelFormat DecideFormat(const std::string& inPath, std::string_view inBytes,
                          std::string& outReason);
 
-/// @return false when the end of a file of that format is missing. Formats without a mark at their
-///         end are taken as whole.
+/// @return false when the file is truncated. Formats without an end marker count as complete.
 bool IsWhole(ModelFormat inFormat, std::string_view inBytes);
 
 }  // namespace ZORDefault

@@ -71,10 +71,10 @@ ModelData ReadModel(const std::string& inPath, const std::string& inBytes,
   ModelData model;
   std::optional<ModelCache> cache;
   if (inOptions.useCache) cache.emplace(inBytes, request);
-  const auto finding = cache ? cache->Load(model) : ModelCache::Finding::kNone;
-  if (finding == ModelCache::Finding::kDamaged && inOptions.warn)
+  const auto lookup = cache ? cache->Load(model) : ModelCache::Lookup::kMiss;
+  if (lookup == ModelCache::Lookup::kDamaged && inOptions.warn)
     inOptions.warn(inPath + ": its entry in the cache was damaged and is made anew");
-  outIsFromCache = finding == ModelCache::Finding::kFound;
+  outIsFromCache = lookup == ModelCache::Lookup::kHit;
   if (outIsFromCache) return model;
   const std::string encoded =
       ReadModelInChild(request, inBytes, LimitsFor(inOptions, inBytes.size()));

@@ -33,7 +33,7 @@ const PartColour* ShownColourOf(const Product& inProduct) {
   return nullptr;
 }
 
-/// A name may hold the separator itself, so every way to cut the path is tried.
+/// A name may contain the separator, so the path is split at every one in turn.
 Product* FindBelow(const Product& inParent, const ZORUnicodeString& inPath) {
   static const ZORUnicodeString kSeparator(" --++-- ");
   for (Product* const child : inParent.GetChildren())
@@ -152,7 +152,7 @@ void Product::MakeRep() {
       bag->AddChild(rep);
     }
   }
-  // An inheritance that was set while there was no representation yet.
+  // The inheritance may have been set before there was a representation.
   unsigned int flag = 0;
   if (rep_ && SUCCEEDED(properties_.GetInheritance(ZORVisPropertiesValues::kColour, flag)) && flag)
     ShowColour(properties_);

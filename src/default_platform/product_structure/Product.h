@@ -22,7 +22,7 @@ namespace ZORDefault {
 
 class ModelDocument;
 
-/// The way back from any interface of a product to the product; only this platform asks for it.
+/// Gives the product behind any of its interfaces; private to this platform.
 class ProductIdentity : public ZORBaseUnknown {
  public:
   static const IID& ClassId();
@@ -36,7 +36,7 @@ class Product final : public FacetedComponent, private CountedObject<Product> {
  public:
   static const char* CountedName() { return "Product"; }
 
-  /// @param inIndex the product's place in the document's model.
+  /// @param inIndex in the document's model.
   Product(ModelDocument& inDocument, std::size_t inIndex, Product* inParent);
   ~Product();
   Product(const Product&) = delete;
@@ -57,14 +57,14 @@ class Product final : public FacetedComponent, private CountedObject<Product> {
   const ZORUnicodeString& GetAlias() const;
   const ZORMathTransformation& GetRootFromProduct() const { return rootFromProduct_; }
   ProductInfo GetInfo() const;
-  /// Whether a name in an alias path means this product among its siblings.
+  /// Whether a name in an alias path refers to this product among its siblings.
   bool IsCalled(const ZORUnicodeString& inName) const;
 
   /// The representation, made at the first call; null when there is nothing to show.
   ZOR3DRep* GetRep();
   const ZORVisPropertiesValues& GetProperties() const { return properties_; }
   void SetProperties(const ZORVisPropertiesValues& inValues);
-  /// Whether the product has triangles or edges itself, not only below it.
+  /// Whether the product itself has triangles or edges, not only its descendants.
   bool HasGeometry() const { return GetPart().mesh != nullptr; }
 
  private:

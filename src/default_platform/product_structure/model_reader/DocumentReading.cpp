@@ -135,7 +135,7 @@ bool ReadMeshes(RWMesh_CafReader& ioReader, const ModelRequest& inRequest,
   return true;
 }
 
-/// Puts several roots below one: the kernel would keep only one of roots that show the same mesh.
+/// Gives several roots a common parent: the kernel would merge roots that share a mesh.
 class GltfReader : public RWGltf_CafReader {
  protected:
   void fillDocument() override {

@@ -1,4 +1,4 @@
-// Reading a file of any format into one kind of document.
+// Reading a file of any format into an XDE document.
 #ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_DOCUMENTREADING_H
 #define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_DOCUMENTREADING_H
 
@@ -22,7 +22,7 @@ struct LoadedDocument {
   std::vector<std::string> damages;          ///< what the kernel left out, one line each
 };
 
-/// @param inTellStage is told what is done next; may be empty.
+/// @param inTellStage called with what is done next; may be empty.
 LoadedDocument ReadDocument(const ModelRequest& inRequest, const Message_ProgressRange& inProgress,
                             const std::function<void(const char*)>& inTellStage = {});
 

@@ -18,7 +18,7 @@ namespace {
 
 constexpr double kCreaseCosine = 0.8660254037844386;  // 30 degrees
 
-/// For each point the number of its place, equal for points in the same place.
+/// @return a number per point, equal for coincident points.
 std::vector<std::uint32_t> WeldPoints(const std::vector<gp_XYZ>& inPoints) {
   const auto key = [&](std::uint32_t point) {
     const gp_XYZ& at = inPoints[point];
@@ -49,7 +49,7 @@ double AngleAt(const TriangleSoup& inMesh, const Triangle& inTriangle, std::size
   return std::acos(std::clamp(one.Dot(two), -1.0, 1.0));
 }
 
-/// All corners, those of one place together.
+/// All corners, sorted by place.
 std::vector<Corner> CornersOf(const TriangleSoup& inMesh,
                               const std::vector<std::uint32_t>& inPlaces) {
   std::vector<Corner> corners;
@@ -130,7 +130,7 @@ class Creaser {
     return sum.SquareModulus() > 0 ? UnitOf(sum) : faceNormals_[inTriangle];
   }
 
-  /// The new point of a triangle's corner: the same for corners with the same normal.
+  /// Corners of one point share a vertex when their normals are equal.
   std::uint32_t AddCorner(std::uint32_t inTriangle, std::uint32_t inPoint) {
     const bool isGiven = mesh_.normals[inPoint].SquareModulus() > 0;
     const gp_XYZ normal =
@@ -156,7 +156,7 @@ class Creaser {
 
 constexpr double kTangentCosine = 0.9990482;  // 2.5 degrees
 
-typedef std::vector<std::uint32_t> Nodes;  // positions in the builder, along the edge
+typedef std::vector<std::uint32_t> Nodes;  // indices in the builder, along the edge
 
 class EdgeDrawer {
  public:
@@ -198,7 +198,7 @@ class EdgeDrawer {
     return nodes;
   }
 
-  /// Both faces have the edge's points in the same order.
+  /// Both polygons have the same points in the same order.
   bool AreTangent(const Nodes& inOne, const Nodes& inTwo) const {
     return inOne.size() == inTwo.size() &&
            std::ranges::equal(inOne, inTwo, [&](std::uint32_t a, std::uint32_t b) {

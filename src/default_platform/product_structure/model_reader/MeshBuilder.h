@@ -1,4 +1,4 @@
-// A mesh while it is put together, in double precision.
+// Building a part's mesh, in double precision.
 #ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_MESHBUILDER_H
 #define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_MESHBUILDER_H
 
@@ -15,9 +15,9 @@ typedef std::vector<gp_XYZ> Polyline;
 
 struct MeshBuilder {
   std::vector<gp_XYZ> points;
-  std::vector<gp_XYZ> normals;  ///< one a point, unit
+  std::vector<gp_XYZ> normals;  ///< one per point, unit
   std::vector<Triangle> triangles;
-  std::vector<std::uint16_t> triangleColours;  ///< one a triangle
+  std::vector<std::uint16_t> triangleColours;  ///< one per triangle
   std::vector<Polyline> edges;
 };
 
@@ -32,23 +32,23 @@ inline gp_XYZ UnitOf(const gp_XYZ& inDirection) {
   return length > 0 ? inDirection / length : gp_XYZ(0, 0, 1);
 }
 
-/// Triangles as a file has them.
+/// Unconnected triangles, as mesh formats have them.
 struct TriangleSoup {
   std::vector<gp_XYZ> points;
-  std::vector<gp_XYZ> normals;  ///< of the file, one a point; a zero vector: it has none
+  std::vector<gp_XYZ> normals;  ///< as given, one per point; zero where there is none
   std::vector<Triangle> triangles;
   std::vector<std::uint16_t> triangleColours;
 };
 
-/// Adds a mesh: points that lie in the same place are one; a point without a normal gets the mean
-/// of the triangles around it, weighted by their angles there, of those that bend away by less than
-/// the crease angle. Edges are those that are sharper, and those with other than two triangles.
+/// Welds coincident points and adds the mesh. Points without a normal get the mean of the incident
+/// face normals within the crease angle, weighted by the incident angles (Thuermer and Wuethrich,
+/// "Computing vertex normals from polygonal facets", 1998). Feature edges are creases, and edges
+/// with other than two triangles.
 void AddCreasedMesh(const TriangleSoup& inMesh, MeshBuilder& ioBuilder);
 
-/// Adds the boundaries of tessellated faces, each once; those on which a surface meets itself, or
-/// two faces pass into each other without a bend, are left out. A shape without faces has all its
-/// curves drawn.
-/// @param inFirstPoints for each face the position of its first point in the builder, or kNoPoints.
+/// Adds the edges of tessellated faces, each once, without seams and without those where two faces
+/// are tangent. Of a shape without faces all curves are added.
+/// @param inFirstPoints the index in the builder of each face's first point, or kNoPoints.
 void AddSurfaceEdges(const TopoDS_Shape& inShape, const TopTools_IndexedMapOfShape& inFaces,
                      const std::vector<std::uint32_t>& inFirstPoints, MeshBuilder& ioBuilder);
 

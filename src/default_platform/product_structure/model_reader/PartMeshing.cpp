@@ -28,7 +28,7 @@ namespace {
 constexpr double kAngularDeflection = 0.5;  // radians
 constexpr double kNormalTolerance = 1e-7;
 
-/// Meshes of a file are faces with triangles but without surface.
+/// Mesh formats give faces with triangles but without a surface.
 bool HasSurfaces(const TopoDS_Shape& inShape) {
   TopLoc_Location location;
   TopExp_Explorer face(inShape, TopAbs_FACE);
@@ -111,7 +111,7 @@ class FaceMesh {
     for (int i = 1; i <= triangles_->NbNodes(); ++i) {
       gp_Dir normal;
       const gp_XYZ& mean = means[static_cast<std::size_t>(i) - 1];
-      // Where a surface has no normal, as at the tip of a cone, its triangles have one.
+      // At a singularity, such as the apex of a cone, the triangles' normals are used.
       const bool isFound =
           GeomLib::NormEstim(surface_, triangles_->UVNode(i), kNormalTolerance, normal) <= 1;
       ioBuilder.normals.push_back(isFound ? Placed(normal) : UnitOf(mean));
@@ -150,8 +150,8 @@ std::array<float, 3> ToFloats(const gp_XYZ& inVector) {
           static_cast<float>(inVector.Z())};
 }
 
-/// The middle of the box around all points.
-gp_XYZ MiddleOf(const MeshBuilder& inBuilder) {
+/// The centre of the bounding box.
+gp_XYZ CentreOf(const MeshBuilder& inBuilder) {
   Bnd_Box box;
   for (const gp_XYZ& point : inBuilder.points) box.Add(gp_Pnt(point));
   for (const Polyline& edge : inBuilder.edges)
@@ -166,12 +166,12 @@ gp_XYZ MiddleOf(const MeshBuilder& inBuilder) {
 std::shared_ptr<const PartMesh> ToPartMesh(const MeshBuilder& inBuilder,
                                            std::vector<PartColour> inColours) {
   auto mesh = std::make_shared<PartMesh>();
-  const gp_XYZ middle = MiddleOf(inBuilder);
-  mesh->origin = {middle.X(), middle.Y(), middle.Z()};
+  const gp_XYZ centre = CentreOf(inBuilder);
+  mesh->origin = {centre.X(), centre.Y(), centre.Z()};
   double radius = 0;
   const auto relative = [&](const gp_XYZ& point) {
-    radius = std::max(radius, (point - middle).Modulus());
-    return ToFloats(point - middle);
+    radius = std::max(radius, (point - centre).Modulus());
+    return ToFloats(point - centre);
   };
   for (const gp_XYZ& point : inBuilder.points) mesh->points.push_back(relative(point));
   for (const gp_XYZ& normal : inBuilder.normals) mesh->normals.push_back(ToFloats(normal));

@@ -1,4 +1,4 @@
-// From the shape of a part to its mesh.
+// Tessellating a part.
 #ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_PARTMESHING_H
 #define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_PARTMESHING_H
 
@@ -8,8 +8,8 @@
 
 namespace ZORDefault {
 
-/// Tessellates a part and fills its mesh, area and what is missing of them. A part for which that
-/// fails stays without mesh.
+/// Fills the part's mesh, its area, and its counts of what has no triangles. On failure the part has
+/// no mesh.
 /// @param inDeflection as a share of the diagonal of the part's box.
 /// @return false when the kernel raised an error. Raises std::bad_alloc.
 bool MeshPart(const TDF_Label& inPart, double inDeflection, ModelPart& ioPart);

@@ -23,7 +23,7 @@ std::uint8_t ToByte(double inShare) {
   return static_cast<std::uint8_t>(std::lround(std::clamp(inShare, 0.0, 1.0) * 255));
 }
 
-/// The kernel keeps colours linear; pictures are made in the usual non-linear values.
+/// From the kernel's linear RGB to sRGB.
 PartColour ToPartColour(const Quantity_ColorRGBA& inColour) {
   double red = 0, green = 0, blue = 0;
   inColour.GetRGB().Values(red, green, blue, Quantity_TOC_sRGB);
@@ -165,7 +165,7 @@ FaceColours FaceColoursOf(const TDF_Label& inPart, const TopTools_IndexedMapOfSh
   for (const TDF_Label& label : labels)
     if (const auto colour = ColourOf(label))
       coloured.push_back({XCAFDoc_ShapeTool::GetShape(label), *colour});
-  // Larger kinds of shape come first in their enumeration: a face's own colour wins in the end.
+  // Compounds and solids come before faces, whose own colours win.
   std::ranges::stable_sort(coloured, {}, [](const Coloured& c) { return c.shape.ShapeType(); });
   for (const Coloured& one : coloured) {
     for (TopExp_Explorer face(one.shape, TopAbs_FACE); face.More(); face.Next()) {

@@ -1,4 +1,4 @@
-// From a document to products and parts.
+// Walking a document's assembly tree, and its colours.
 #ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_TREEWALK_H
 #define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_TREEWALK_H
 
@@ -13,18 +13,17 @@
 
 namespace ZORDefault {
 
-/// Fills products and parts, still without meshes. Several roots get one above them.
-/// @return for each part the label that it comes from; a null label for a root that was added.
+/// Fills products and parts, without meshes. Several roots get a common parent.
+/// @return each part's label; null for the parent that was added.
 std::vector<TDF_Label> WalkTree(const Handle(TDocStd_Document) & inDocument, ModelData& outModel);
 
-/// The colour of what a label stands for: of its surfaces, else a general one, else that of its
-/// material.
+/// The label's surface colour, else its general one, else its material's base colour.
 std::optional<PartColour> ColourOf(const TDF_Label& inLabel);
 
-/// The colours below one part.
+/// The colours of a part's faces.
 struct FaceColours {
   std::vector<PartColour> colours;    ///< each once
-  std::vector<std::uint16_t> ofFace;  ///< for each face a position there, or PartMesh::kNoColour
+  std::vector<std::uint16_t> ofFace;  ///< index of each face's colour, or PartMesh::kNoColour
 };
 
 /// @param inFaces the faces of the part.
