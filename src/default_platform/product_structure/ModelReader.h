@@ -39,7 +39,7 @@ struct ModelReaderProtocol {
   static constexpr int kResult = 4;  ///< takes an encoded model, or why there is none
   static constexpr int kStatus = 5;  ///< takes lines: a percentage, or what is done from then on
   static constexpr int kExitRead = 0;
-  static constexpr int kExitRefused = 1;
+  static constexpr int kExitRefused = 2;
   static constexpr int kExitOutOfMemory = 3;
 };
 
