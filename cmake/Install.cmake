@@ -31,7 +31,8 @@ install(FILES src/default_platform/InterferenceScene.h src/default_platform/Open
 # Not those of the CAD kernel's part, which is loaded by name, and of the toolkit's own sources.
 install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit FILES_MATCHING PATTERN "*.h"
   PATTERN "detection" EXCLUDE
-  REGEX "/(DrawingWorkers|ElementWalk|PageMaker|PictureStore|PublishedFiles|ShippedTexts)[.]h$" EXCLUDE)
+  REGEX "/(DrawingWorkers|ElementWalk|PageMaker|PictureStore|PublishedFiles|ShippedTexts)[.]h$" EXCLUDE
+  REGEX "/review/(Assignment|Frames|LanguageWords|TomlFile)[.]h$" EXCLUDE)
 install(FILES ${PROJECT_BINARY_DIR}/generated/ZORLyraExport.h ${PROJECT_BINARY_DIR}/generated/ZORPlatformExport.h
   ${PROJECT_BINARY_DIR}/generated/ZORToolkitExport.h
   DESTINATION ${headerDir})

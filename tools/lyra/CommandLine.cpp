@@ -17,7 +17,8 @@ void ShapeHelp(CLI::App& ioApp) {
   ioApp.get_formatter()->column_width(20);
   ioApp.footer(
       "A FILE named \"-\" is standard input. \"lyra VERB --help\" explains a verb.\n"
-      "Exit code: 0 done, 1 the input or output cannot be used, 2 wrong usage.");
+      "Exit code: 0 done, 1 the input or output cannot be used, 2 wrong usage, 3 the answer is "
+      "no.");
 }
 
 }  // namespace
@@ -31,6 +32,12 @@ std::span<const Verb> Verbs() {
       {"specs", "List the pairs of products that a computation was asked to check", DeclareSpecs},
       {"links", "List the clash documents that a federator document links", DeclareLinks},
       {"convert", "Write a whole document in another format", DeclareConvert},
+      {"diff", "Say what is new, changed or resolved since an older result", DeclareDiff},
+      {"carry", "Take the decisions of an older result over to a newer one", DeclareCarry},
+      {"group", "Show which interferences belong together", DeclareGroup},
+      {"review", "Decide in bulk, take in a review file, merge reviews", DeclareReview},
+      {"rules", "Settle what is accepted by design", DeclareRules},
+      {"gate", "Say whether a result may pass, with reports for build servers", DeclareGate},
       {"merge", "Merge clash documents into one", DeclareMerge},
       {"federate", "Write a federator document that links clash documents", DeclareFederate},
       {"report", "Write a result as an XML report with a style sheet", DeclareReport},

@@ -60,6 +60,16 @@ void ClashDocumentEdit::SetRetrieve(const ElementHandle& inInterference,
   SetWord(inInterference, "RetrieveInf", inRetrieve);
 }
 
+void ClashDocumentEdit::SetStatusAsWritten(const ElementHandle& inInterference,
+                                           const std::string& inText) {
+  DOM_Element(inInterference.element_).setAttribute("Status", DocumentString(inText));
+}
+
+void ClashDocumentEdit::SetRetrieveAsWritten(const ElementHandle& inInterference,
+                                             const std::string& inText) {
+  DOM_Element(inInterference.element_).setAttribute("RetrieveInf", DocumentString(inText));
+}
+
 void ClashDocumentEdit::SetOnlyChild(const ElementHandle& inParent, const char* inName,
                                      const char* inAttribute, const std::string& inValue) {
   DOM_Node parent = inParent.element_;
@@ -74,7 +84,17 @@ void ClashDocumentEdit::SetOnlyChild(const ElementHandle& inParent, const char* 
 
 void ClashDocumentEdit::SetComment(const ElementHandle& inInterference,
                                    const std::string& inComment) {
-  SetOnlyChild(inInterference, "Comment", "Value", inComment);
+  DOM_Node interference = inInterference.element_;
+  DOM_Node kept = FirstElement(interference, "Comment");
+  if (kept.isNull() || inComment.empty())
+    return SetOnlyChild(inInterference, "Comment", "Value", inComment);
+  // The last one counts; it keeps whatever else it has.
+  for (DOM_Node next = ElementFrom(kept.getNextSibling(), "Comment"); !next.isNull();
+       next = ElementFrom(kept.getNextSibling(), "Comment")) {
+    interference.removeChild(kept);
+    kept = next;
+  }
+  DOM_Element(kept).setAttribute("Value", DocumentString(inComment));
 }
 
 void ClashDocumentEdit::SetPicture(const ElementHandle& inInterference,

@@ -33,6 +33,9 @@ class ZOR_TOOLKIT_EXPORT ClashDocumentEdit {
   void SetStatus(const ElementHandle& inInterference, const std::string& inStatus);
   /// @param inRetrieve "Old" or "New", likewise.
   void SetRetrieve(const ElementHandle& inInterference, const std::string& inRetrieve);
+  /// The words of an interference as they are to stand, in whatever language.
+  void SetStatusAsWritten(const ElementHandle& inInterference, const std::string& inText);
+  void SetRetrieveAsWritten(const ElementHandle& inInterference, const std::string& inText);
   /// An empty comment takes the "Comment" elements out.
   void SetComment(const ElementHandle& inInterference, const std::string& inComment);
   /// The one "Picture"; an empty reference takes all out.

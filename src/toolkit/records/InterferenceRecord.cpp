@@ -314,6 +314,13 @@ void ForEachInterference(ClashDocument& ioDocument, RecordPart inPart,
   });
 }
 
+InterferenceRecord ReadRow(ClashDocument& ioDocument, const DOM_Node& inInterference) {
+  const DOM_Node parent = inInterference.getParentNode();
+  const bool isInSet = parent.getNodeName().equals("ClashResult");
+  return Read(ioDocument, PlacedInterference{0, isInSet ? parent : DOM_Node(), inInterference},
+              RecordPart::kRow);
+}
+
 InterferenceRecord ReadInterference(ClashDocument& ioDocument, long long inNumber) {
   std::optional<PlacedInterference> found;
   int count = 0;

@@ -103,6 +103,10 @@ enum class RecordPart { kAll, kRow };
 ZOR_TOOLKIT_EXPORT void ForEachInterference(
     ClashDocument& ioDocument, RecordPart inPart,
     const std::function<void(const InterferenceRecord& inRecord)>& inVisit);
+
+/// What a row shows of one "Interference" of the document; its number stays 0.
+ZOR_TOOLKIT_EXPORT InterferenceRecord ReadRow(ClashDocument& ioDocument,
+                                              const DOM_Node& inInterference);
 /// The interference of a number. Raises Error, which says how many there are, when there is none of
 /// that number.
 ZOR_TOOLKIT_EXPORT InterferenceRecord ReadInterference(ClashDocument& ioDocument,

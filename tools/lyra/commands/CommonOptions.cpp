@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstdlib>
 #include <span>
+#include <sstream>
 
 #include "lyra/Arguments.h"
 #include "lyra/CommandErrors.h"
@@ -30,6 +31,36 @@ void CheckReference(const char* inOption, const std::string& inText) {
   if (inText.find("?>") != std::string::npos)
     throw UsageError(std::string(inOption) + ": must not hold \"?>\"");
 }
+
+class OnlyConditions {
+ public:
+  void Add(const std::string& inCondition) {
+    const std::size_t equals = inCondition.find('=');
+    const std::string name = inCondition.substr(0, equals);
+    const std::string word = equals == std::string::npos ? "" : inCondition.substr(equals + 1);
+    if (word.empty())
+      throw UsageError("--only: a condition is such as type=clash, not \"" + inCondition + "\"");
+    if (name == "type")
+      options_.types.push_back(word);
+    else if (name == "status")
+      options_.statuses.push_back(word);
+    else if (name == "result")
+      SetOnce(name, word, options_.result);
+    else if (name == "product")
+      SetOnce(name, word, options_.product);
+    else
+      throw UsageError("--only: unknown word \"" + name +
+                       "\"; known are type, status, result, product");
+  }
+  ZORToolkit::RecordFilter Filter() const { return lyra::FilterOf(options_); }
+
+ private:
+  static void SetOnce(const std::string& inName, const std::string& inWord, std::string& ioText) {
+    if (!ioText.empty()) throw UsageError("--only: " + inName + " is given twice");
+    ioText = inWord;
+  }
+  FilterOptions options_;
+};
 
 }  // namespace
 
@@ -82,6 +113,15 @@ void PrologueOptions::Check() const {
     throw UsageError("--type-name: \"" + typeName + "\" is no name in XML");
   if (!hasDeclaration && !(dtd.empty() && styleSheet.empty()))
     throw UsageError("--no-prologue leaves no place for --dtd and --xsl");
+}
+
+ZORToolkit::RecordFilter FilterOfConditions(const std::vector<std::string>& inLists) {
+  OnlyConditions conditions;
+  for (const std::string& list : inLists) {
+    std::istringstream parts(list);
+    for (std::string part; std::getline(parts, part, ',');) conditions.Add(part);
+  }
+  return conditions.Filter();
 }
 
 }  // namespace lyra

@@ -39,6 +39,9 @@ struct FilterOptions {
 
 /// Raises UsageError for a word that is not known.
 ZORToolkit::RecordFilter FilterOf(const FilterOptions& inOptions);
+/// From conditions such as "type=clash,status=relevant": type, status, result and product, each as
+/// the options of `lyra list` take it. Several words of one kind are alternatives. Raises UsageError.
+ZORToolkit::RecordFilter FilterOfConditions(const std::vector<std::string>& inLists);
 
 /// The document type, the style sheet and the XML declaration as options of a verb.
 struct PrologueOptions : ZORToolkit::Prologue {

@@ -1,7 +1,6 @@
 // lyra publish RESULT --model MODEL -o DIR
 #include <algorithm>
 #include <memory>
-#include <sstream>
 #include <thread>
 
 #include "lyra/Verbs.h"
@@ -28,47 +27,6 @@ struct PublishOptions {
   std::optional<long long> jobs;
   bool resume = false;
 };
-
-/// From conditions such as "type=clash,status=relevant": type, status, result and product, each as
-/// the options of `lyra list` take it. Several words of one kind are alternatives.
-class OnlyConditions {
- public:
-  void Add(const std::string& inCondition) {
-    const std::size_t equals = inCondition.find('=');
-    const std::string name = inCondition.substr(0, equals);
-    const std::string word = equals == std::string::npos ? "" : inCondition.substr(equals + 1);
-    if (word.empty())
-      throw UsageError("--only: a condition is such as type=clash, not \"" + inCondition + "\"");
-    if (name == "type")
-      options_.types.push_back(word);
-    else if (name == "status")
-      options_.statuses.push_back(word);
-    else if (name == "result")
-      SetOnce(name, word, options_.result);
-    else if (name == "product")
-      SetOnce(name, word, options_.product);
-    else
-      throw UsageError("--only: unknown word \"" + name +
-                       "\"; known are type, status, result, product");
-  }
-  RecordFilter Filter() const { return FilterOf(options_); }
-
- private:
-  static void SetOnce(const std::string& inName, const std::string& inWord, std::string& ioText) {
-    if (!ioText.empty()) throw UsageError("--only: " + inName + " is given twice");
-    ioText = inWord;
-  }
-  FilterOptions options_;
-};
-
-RecordFilter FilterOfConditions(const std::vector<std::string>& inLists) {
-  OnlyConditions conditions;
-  for (const std::string& list : inLists) {
-    std::istringstream parts(list);
-    for (std::string part; std::getline(parts, part, ',');) conditions.Add(part);
-  }
-  return conditions.Filter();
-}
 
 int ProcessCount(const PublishOptions& inOptions) {
   if (!inOptions.jobs) return static_cast<int>(std::max(1U, std::thread::hardware_concurrency()));

@@ -61,9 +61,13 @@ std::string Description(const CommandTable& inTable) {
 }
 
 std::string ExitStatus() {
-  return ".SH EXIT STATUS\n" + Entry(Bold("0"), "Done.") +
-         Entry(Bold("1"), "The input or the output cannot be used.") +
-         Entry(Bold("2"), "Wrong usage.");
+  return ".SH EXIT STATUS\n" + Entry(Bold("0"), "Done, or passed.") +
+         Entry(Bold("1"),
+               "The input or the output cannot be used; of gate also: nothing could be judged.") +
+         Entry(Bold("2"), "Wrong usage.") +
+         Entry(Bold("3"),
+               "The answer is no: the gate failed, diff was given --exit-code and there are "
+               "differences, or a merge of reviews has conflicts.");
 }
 
 std::string Environment() {
@@ -81,6 +85,11 @@ std::string Examples() {
        {std::pair{"lyra list result.xml --type clash --status relevant",
                   "The clashes of a result that matter."},
         {"lyra show result.xml 3 --json | jq .products", "The two products of interference 3."},
+        {"lyra diff last-week.xml today.xml --exit-code",
+         "What became of the interferences; fails when anything differs."},
+        {"lyra gate today.xml --policy policy.toml --baseline last-week.xml --report "
+         "junit=gate.xml",
+         "Fails when today\'s result may not pass, with a report for the build server."},
         {"lyra publish result.xml --model assembly.stp -o page",
          "A page with pictures, page/index.html."}})
     examples += Entry(Bold(line), text);

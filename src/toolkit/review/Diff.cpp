@@ -1,0 +1,343 @@
+#include "toolkit/review/Diff.h"
+
+#include <algorithm>
+#include <cmath>
+#include <unordered_map>
+
+namespace ZORToolkit {
+namespace {
+
+constexpr char kBetweenAll[] = "Between all components";
+
+/// A product's own names and those of the assemblies above it.
+std::vector<std::string> NamesAndParents(const std::string& inId, const std::string& inAlias) {
+  constexpr std::string_view kSeparator = " --++-- ";
+  std::vector<std::string> names;
+  for (const std::string& name : {inId, inAlias}) {
+    if (name.empty() || (!names.empty() && name == inId)) continue;
+    names.push_back(name);
+    for (std::size_t at = name.rfind(kSeparator); at != std::string::npos && at > 0;
+         at = name.rfind(kSeparator, at - 1))
+      names.push_back(name.substr(0, at));
+  }
+  return names;
+}
+
+/// What a specification asked to check.
+class Coverage {
+ public:
+  explicit Coverage(const std::vector<SpecificationRecord>& inSpecifications) {
+    for (const SpecificationRecord& specification : inSpecifications) {
+      const auto& [first, second] = specification.products;
+      for (const std::string& a : {first.alias, first.id}) {
+        products_.insert(a);
+        for (const std::string& b : {second.alias, second.id}) {
+          products_.insert(b);
+          pairs_.insert(a + '\0' + b);
+          pairs_.insert(b + '\0' + a);
+        }
+      }
+    }
+  }
+
+  bool HasProduct(const ReviewProduct& inProduct) const {
+    return std::ranges::any_of(
+        NamesAndParents(inProduct.id, inProduct.alias),
+        [&](const std::string& inName) { return products_.contains(inName); });
+  }
+
+  bool HasPair(const ReviewProduct& inFirst, const ReviewProduct& inSecond) const {
+    const std::vector<std::string> seconds = NamesAndParents(inSecond.id, inSecond.alias);
+    for (const std::string& a : NamesAndParents(inFirst.id, inFirst.alias))
+      for (const std::string& b : seconds)
+        if (pairs_.contains(a + '\0' + b)) return true;
+    return false;
+  }
+
+ private:
+  std::unordered_set<std::string> products_, pairs_;
+};
+
+/// Says why the new computation did not look for an interference of the old result.
+class Comparability {
+ public:
+  Comparability(const ReviewedResult& inOld, const ReviewedResult& inNew,
+                const DiffOptions& inOptions, const ResultMatch& inMatch)
+      : old_(inOld),
+        new_(inNew),
+        options_(inOptions),
+        match_(inMatch),
+        oldCoverage_(inOld.specifications),
+        newCoverage_(inNew.specifications),
+        newClearance_(inNew.clearance.value) {
+    for (const ReviewRecord& record : new_.interferences) {
+      const std::optional<double>& clearance = record.clearance.value;
+      if (!clearance) continue;
+      if (!record.rule.empty()) clearanceOfRule_.try_emplace(record.rule, *clearance);
+      if (!inNew.clearance.value && record.rule.empty())
+        newClearance_ = std::max(*clearance, newClearance_.value_or(*clearance));
+    }
+  }
+
+  /// @return empty when it did look for it.
+  std::string WhyNot(const ReviewRecord& inOld) const {
+    if (new_.kind == DocumentKind::kInterference)
+      return "the new document holds a single interference";
+    for (const auto check :
+         {&Comparability::Products, &Comparability::Specification, &Comparability::Types,
+          &Comparability::Case, &Comparability::Clearance}) {
+      std::string reason = (this->*check)(inOld);
+      if (!reason.empty()) return reason;
+    }
+    return {};
+  }
+
+ private:
+  const ReviewProduct* ProductOf(const ReviewRecord& inOld, std::size_t inProduct) const {
+    const int product = inOld.products[inProduct];
+    return product < 0 ? nullptr : &old_.products[static_cast<std::size_t>(product)];
+  }
+
+  /// As the new result calls it, when that has it.
+  const ReviewProduct& InNew(const ReviewRecord& inOld, std::size_t inProduct) const {
+    const auto old = static_cast<std::size_t>(inOld.products[inProduct]);
+    const int partner = match_.productsOfOld[old].position;
+    return partner < 0 ? old_.products[old] : new_.products[static_cast<std::size_t>(partner)];
+  }
+
+  bool IsInNew(const ReviewRecord& inOld, std::size_t inProduct) const {
+    return match_.productsOfOld[static_cast<std::size_t>(inOld.products[inProduct])].position >= 0;
+  }
+
+  std::string Products(const ReviewRecord& inOld) const {
+    for (std::size_t i = 0; i < 2; ++i) {
+      const ReviewProduct* const product = ProductOf(inOld, i);
+      if (product == nullptr) continue;
+      const std::string name = "\"" + product->Name() + "\"";
+      if (options_.productsOfNewModel) {
+        const ReviewProduct& now = InNew(inOld, i);
+        const auto& model = *options_.productsOfNewModel;
+        if (!model.contains(now.id) && !model.contains(now.alias))
+          return name + " is not in the new model";
+      }
+      const bool wasSpecified = old_.specifications.empty() || oldCoverage_.HasProduct(*product);
+      if (!new_.specifications.empty() && wasSpecified && !IsInNew(inOld, i) &&
+          !newCoverage_.HasProduct(*product))
+        return name + " is not in the new specification";
+    }
+    return {};
+  }
+
+  std::string Specification(const ReviewRecord& inOld) const {
+    if (!new_.hasSpecification || ProductOf(inOld, 0) == nullptr || ProductOf(inOld, 1) == nullptr)
+      return {};
+    if (!oldCoverage_.HasPair(*ProductOf(inOld, 0), *ProductOf(inOld, 1))) return {};
+    if (newCoverage_.HasPair(InNew(inOld, 0), InNew(inOld, 1)) ||
+        newCoverage_.HasPair(*ProductOf(inOld, 0), *ProductOf(inOld, 1)))
+      return {};
+    return "the pair is not in the new specification";
+  }
+
+  /// "Clearance + Contact + Clash": the words are the result types in some language.
+  std::string Types(const ReviewRecord& inOld) const {
+    if (new_.computedTypes.empty() || new_.computedTypes == old_.computedTypes) return {};
+    if (!newTypes_) newTypes_ = TypesIn(new_.computedTypes);
+    if (newTypes_->contains(inOld.type) || newTypes_->contains("error")) return {};
+    return "the new computation looked for \"" + new_.computedTypes + "\" only";
+  }
+
+  static std::unordered_set<std::string> TypesIn(const std::string& inText) {
+    std::unordered_set<std::string> types;
+    for (std::size_t begin = 0; begin <= inText.size();) {
+      const std::size_t end = std::min(inText.find('+', begin), inText.size());
+      types.insert(TypeNamed(inText.substr(begin, end - begin)));
+      begin = end + 1;
+    }
+    return types;
+  }
+
+  /// As the library's reader understands the word in any language.
+  static std::string TypeNamed(const std::string& inWord) {
+    std::string escaped;
+    for (const char byte : inWord) {
+      if (byte == '<')
+        escaped += "&lt;";
+      else if (byte == '&')
+        escaped += "&amp;";
+      else if (byte == '"')
+        escaped += "&quot;";
+      else
+        escaped += byte;
+    }
+    ClashDocument document("word",
+                           "<?xml version=\"1.0\" encoding=\"UTF-8\"?><InterferenceElement>"
+                           "<Interference ResultType=\"" +
+                               escaped + "\"/></InterferenceElement>");
+    return ReadForReview(document).interferences.at(0).type;
+  }
+
+  std::string Case(const ReviewRecord& inOld) const {
+    const auto nameOf = [](const ReviewedResult& inResult, int inCase) {
+      return inCase < 0 ? std::string()
+                        : inResult.computationCases[static_cast<std::size_t>(inCase)];
+    };
+    const std::string was = nameOf(old_, inOld.computationCase);
+    if (was.empty()) return {};
+    std::string other;
+    for (const std::string& name : new_.computationCases) {
+      if (name == was || name == kBetweenAll) return {};
+      if (!name.empty()) other = name;
+    }
+    if (other.empty()) return {};
+    return "computed as \"" + was + "\" then, as \"" + other + "\" now";
+  }
+
+  std::string Clearance(const ReviewRecord& inOld) const {
+    if (inOld.type != "Clearance" || !inOld.clearance.value) return {};
+    std::optional<double> now = newClearance_;
+    if (!inOld.rule.empty()) {
+      const auto rule = clearanceOfRule_.find(inOld.rule);
+      now = rule == clearanceOfRule_.end() ? std::nullopt : std::optional(rule->second);
+    }
+    if (!now || *now >= *inOld.clearance.value - 1e-9) return {};
+    return "the clearance was " + inOld.clearance.text + " and is " + Number(*now).text + " now";
+  }
+
+  const ReviewedResult& old_;
+  const ReviewedResult& new_;
+  const DiffOptions& options_;
+  const ResultMatch& match_;
+  Coverage oldCoverage_, newCoverage_;
+  std::optional<double> newClearance_;
+  std::unordered_map<std::string, double> clearanceOfRule_;
+  mutable std::optional<std::unordered_set<std::string>> newTypes_;
+};
+
+std::string PlacementText(const ReviewProduct& inProduct,
+                          const std::optional<Placement>& inPlacement) {
+  std::string text = inProduct.Name() + " at";
+  for (std::size_t i = 9; i < 12; ++i) text += " " + Number((*inPlacement)[i]).text;
+  constexpr Placement kUnturned{1, 0, 0, 0, 1, 0, 0, 0, 1};
+  if (std::equal(inPlacement->begin(), inPlacement->begin() + 9, kUnturned.begin())) return text;
+  text += ", turned";
+  for (std::size_t i = 0; i < 9; ++i) text += " " + Number((*inPlacement)[i]).text;
+  return text;
+}
+
+class Differ {
+ public:
+  Differ(const ReviewedResult& inOld, const ReviewedResult& inNew, const DiffOptions& inOptions)
+      : old_(inOld), new_(inNew), options_(inOptions) {}
+
+  ResultDiff Run() {
+    diff_.match = MatchResults(old_, new_, options_);
+    const std::vector<std::string> newIds = StableIds(new_), oldIds = StableIds(old_);
+    for (std::size_t i = 0; i < new_.interferences.size(); ++i) AddNew(i, newIds[i]);
+    const Comparability comparability(old_, new_, options_, diff_.match);
+    for (std::size_t i = 0; i < old_.interferences.size(); ++i) {
+      const ResultMatch::Partner& partner = diff_.match.interferencesOfOld[i];
+      if (partner.position >= 0) continue;
+      const std::string whyNot = comparability.WhyNot(old_.interferences[i]);
+      Add({whyNot.empty() ? DiffClass::kResolved : DiffClass::kNotComparable,
+           oldIds[i],
+           static_cast<int>(i),
+           -1,
+           whyNot.empty() ? partner.reason : whyNot,
+           {}});
+    }
+    return std::move(diff_);
+  }
+
+ private:
+  void Add(DiffEntry inEntry) {
+    ++diff_.counts[static_cast<std::size_t>(inEntry.itsClass)];
+    diff_.entries.push_back(std::move(inEntry));
+  }
+
+  void AddNew(std::size_t inPosition, const std::string& inId) {
+    const ResultMatch::Partner& partner = diff_.match.interferencesOfNew[inPosition];
+    DiffEntry entry{DiffClass::kNew, inId, partner.position, static_cast<int>(inPosition),
+                    partner.reason,  {}};
+    if (partner.position >= 0) {
+      entry.changes = ChangesOf(old_.interferences[static_cast<std::size_t>(partner.position)],
+                                new_.interferences[inPosition]);
+      entry.itsClass = entry.changes.empty() ? DiffClass::kPersisting : DiffClass::kChanged;
+    }
+    Add(std::move(entry));
+  }
+
+  std::vector<Change> ChangesOf(const ReviewRecord& inOld, const ReviewRecord& inNew) const {
+    std::vector<Change> changes;
+    const auto compare = [&](const char* inWhat, const std::string& inFrom, const std::string& inTo,
+                             bool inIsSubstantial) {
+      if (inFrom != inTo) changes.push_back({inWhat, inFrom, inTo, inIsSubstantial});
+    };
+    compare("type", inOld.type, inNew.type, true);
+    if (!IsSameValue(inOld.value, inNew.value))
+      changes.push_back({"value", inOld.value.text, inNew.value.text, true});
+    ComparePlacements(inOld, inNew, changes);
+    compare("rule", inOld.rule, inNew.rule, true);
+    compare("status", inOld.status, inNew.status, false);
+    compare("comment", inOld.comment, inNew.comment, false);
+    return changes;
+  }
+
+  bool IsSameValue(const Number& inOld, const Number& inNew) const {
+    if (inOld.text == inNew.text) return true;
+    if (!inOld.value || !inNew.value) return false;
+    constexpr double kRounding = 1e-9;
+    return std::abs(*inOld.value - *inNew.value) <= options_.tolerance + kRounding;
+  }
+
+  void ComparePlacements(const ReviewRecord& inOld, const ReviewRecord& inNew,
+                         std::vector<Change>& ioChanges) const {
+    const bool isSwapped = IsSwapped(inOld, inNew);
+    bool isSubstantial = false, isKnown = false;
+    for (std::size_t i = 0; i < 2; ++i) {
+      const std::size_t j = isSwapped ? 1 - i : i;
+      const auto &from = inOld.placements[i], &to = inNew.placements[j];
+      if (Motion(from, to) <= options_.tolerance) continue;
+      if (!isKnown) isSubstantial = RelativeMotion(inOld, inNew, isSwapped) > options_.tolerance;
+      isKnown = true;
+      ioChanges.push_back({"placement", PlacementText(ProductOf(old_, inOld.products[i]), from),
+                           PlacementText(ProductOf(new_, inNew.products[j]), to), isSubstantial});
+    }
+  }
+
+  /// Whether the old first product is the new second one.
+  bool IsSwapped(const ReviewRecord& inOld, const ReviewRecord& inNew) const {
+    const int first = inOld.products[0];
+    const int partner =
+        first < 0 ? -1 : diff_.match.productsOfOld[static_cast<std::size_t>(first)].position;
+    return partner != inNew.products[0];
+  }
+
+  static const ReviewProduct& ProductOf(const ReviewedResult& inResult, int inProduct) {
+    return inResult.products[static_cast<std::size_t>(inProduct)];
+  }
+
+  const ReviewedResult& old_;
+  const ReviewedResult& new_;
+  const DiffOptions& options_;
+  ResultDiff diff_;
+};
+
+}  // namespace
+
+const char* Name(DiffClass inClass) {
+  constexpr const char* kNames[] = {"new", "persisting", "changed", "resolved", "notComparable"};
+  return kNames[static_cast<std::size_t>(inClass)];
+}
+
+bool DiffEntry::IsReopened() const { return std::ranges::any_of(changes, &Change::isSubstantial); }
+
+bool ResultDiff::HasDifferences() const {
+  return Count(DiffClass::kPersisting) != static_cast<int>(entries.size());
+}
+
+ResultDiff Diff(const ReviewedResult& inOld, const ReviewedResult& inNew,
+                const DiffOptions& inOptions) {
+  return Differ(inOld, inNew, inOptions).Run();
+}
+
+}  // namespace ZORToolkit

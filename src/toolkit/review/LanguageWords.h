@@ -1,0 +1,29 @@
+// Words of clash results in all languages that there are message catalogues of; for the toolkit's
+// own sources.
+#ifndef ZOR_TOOLKIT_REVIEW_LANGUAGE_WORDS_H
+#define ZOR_TOOLKIT_REVIEW_LANGUAGE_WORDS_H
+
+#include <string>
+#include <vector>
+
+namespace ZORToolkit {
+
+/// @return what a status ("Relevant", "Irrelevant", "Not inspected") or an age ("Old", "New") is
+/// in English, whatever its language; empty for another text.
+std::string EnglishWord(const std::string& inText);
+
+/// The language of a document, by the words that it uses: the current one when that knows them all.
+class DocumentLanguage {
+ public:
+  /// @param inWords statuses and ages as the document has them.
+  explicit DocumentLanguage(const std::vector<std::string>& inWords);
+  /// @return an English word in this language; another text as it stands.
+  std::string Translate(const std::string& inEnglish) const;
+
+ private:
+  int language_ = 0;  // a place in the table of languages
+};
+
+}  // namespace ZORToolkit
+
+#endif

@@ -1,0 +1,486 @@
+#include "toolkit/review/Diff.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <set>
+
+#include "toolkit/review/EditedResults.h"
+
+namespace {
+
+using namespace ZORToolkit;
+using namespace review_tests;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::Not;
+
+const DiffEntry& OfNew(const ResultDiff& inDiff, int inPosition) {
+  return *std::ranges::find(inDiff.entries, inPosition, &DiffEntry::newPosition);
+}
+
+std::vector<std::string> Whats(const DiffEntry& inEntry) {
+  std::vector<std::string> whats;
+  for (const Change& change : inEntry.changes) whats.push_back(change.what);
+  return whats;
+}
+
+/// A bolt in a plate.
+TestResult OnePair() {
+  TestResult result;
+  result.products = {{"a --++-- bolt_1", "bolt", {0, 0, 0}},
+                     {"a --++-- plate_1", "plate", {5, 0, 0}}};
+  result.interferences = {{.truth = 0, .first = 0, .second = 1, .place = {1, 2, 3}}};
+  return result;
+}
+
+// Reading
+
+std::vector<std::string> SamplePaths() {
+  std::vector<std::string> paths;
+  for (const char* const folder : {"/samples", "/tests/golden/inputs"})
+    for (const auto& entry :
+         std::filesystem::directory_iterator(std::string(ZOR_SOURCE_DIR) + folder))
+      if (entry.path().extension() == ".xml") paths.push_back(entry.path());
+  return paths;
+}
+
+TEST(ReviewRecords, SayWhatTheInterferenceRecordsSay) {
+  int compared = 0;
+  for (const std::string& path : SamplePaths()) {
+    ClashDocument document(path);
+    if (!document.HasInterferences()) continue;
+    const ReviewedResult result = ReadForReview(document);
+    std::size_t i = 0;
+    ForEachInterference(document, RecordPart::kAll, [&](const InterferenceRecord& inRecord) {
+      ASSERT_LT(i, result.interferences.size());
+      const ReviewRecord& record = result.interferences[i++];
+      EXPECT_EQ(inRecord.index, record.index);
+      EXPECT_EQ(inRecord.type, record.type);
+      EXPECT_EQ(inRecord.value.text, record.value.text);
+      EXPECT_EQ(inRecord.value.value, record.value.value);
+      EXPECT_EQ(inRecord.clearance.text, record.clearance.text);
+      EXPECT_EQ(inRecord.rule.name, record.rule);
+      EXPECT_EQ(inRecord.comment, record.comment);
+      if (inRecord.status != "error") {
+        EXPECT_EQ(inRecord.status, record.status);
+      }
+      EXPECT_EQ(inRecord.computationCase,
+                result.computationCases[static_cast<std::size_t>(record.computationCase)]);
+      for (std::size_t k = 0; k < 2; ++k) {
+        const ProductRecord& product = inRecord.products[k];
+        ASSERT_EQ(product.exists, record.products[k] >= 0);
+        if (!product.exists) continue;
+        const ReviewProduct& itself = result.products[static_cast<std::size_t>(record.products[k])];
+        EXPECT_EQ(product.id, itself.id);
+        if (product.whyMisread.empty() && record.placements[k]) {
+          EXPECT_EQ(product.placement, *record.placements[k]);
+        }
+      }
+      ++compared;
+    });
+    EXPECT_EQ(i, result.interferences.size());
+  }
+  EXPECT_GT(compared, 1500);
+}
+
+TEST(ReviewRecords, WordsOfOtherLanguagesAreUnderstood) {
+  ClashDocument document(ZOR_SOURCE_DIR "/samples/dissonance.clash.xml");  // in French
+  const ReviewedResult result = ReadForReview(document);
+  EXPECT_EQ("Not inspected", result.interferences[0].status);
+  EXPECT_EQ("New", result.interferences[0].retrieve);
+  ASSERT_TRUE(result.interferences[0].placements[0]);  // with decimal commas
+}
+
+// Identifiers
+
+TEST(StableIds, DoNotDependOnOrderPlaceOfTheAssemblyOrWords) {
+  std::mt19937 random(3);
+  const TestResult was = RandomResult(random, 30, 120);
+  TestResult is = was;
+  for (TestProduct& product : is.products) product.at[2] += 1234.5;
+  std::ranges::shuffle(is.interferences, random);
+  for (TestInterference& one : is.interferences) {
+    one.status = "Pertinent";
+    std::replace(one.value.begin(), one.value.end(), '.', ',');
+  }
+  const Loaded oldOne(was), newOne(is);
+  const std::vector<std::string> oldIds = StableIds(oldOne.result),
+                                 newIds = StableIds(newOne.result);
+  EXPECT_EQ(oldIds.size(), std::set(oldIds.begin(), oldIds.end()).size());
+  for (std::size_t i = 0; i < newIds.size(); ++i)
+    EXPECT_EQ(oldIds[static_cast<std::size_t>(is.interferences[i].truth)], newIds[i]);
+}
+
+TEST(StableIds, OrderOfTheTwoProductsDoesNotCount) {
+  const TestResult was = OnePair();
+  TestResult is = was;
+  std::swap(is.interferences[0].first, is.interferences[0].second);
+  is.interferences[0].place = {-4, 2, 3};  // the same place from the plate
+  EXPECT_EQ(StableIds(Loaded(was).result), StableIds(Loaded(is).result));
+  is.interferences[0].place = {40, 2, 3};
+  EXPECT_NE(StableIds(Loaded(was).result), StableIds(Loaded(is).result));
+}
+
+TEST(StableIds, AreUniqueAmongAHundredOfOnePairWithoutGeometry) {
+  TestResult result = OnePair();
+  result.interferences[0].hasPlace = false;
+  result.interferences.resize(100, result.interferences[0]);
+  const Loaded loaded(result);
+  const std::vector<std::string> ids = StableIds(loaded.result);
+  EXPECT_EQ(100u, std::set(ids.begin(), ids.end()).size());
+  EXPECT_EQ(1u, std::set({PairId(loaded.result, loaded.result.interferences[0]),
+                          PairId(loaded.result, loaded.result.interferences[99])})
+                    .size());
+}
+
+// Classes
+
+TEST(Diff, SameResultPersists) {
+  std::mt19937 random(4);
+  const TestResult result = RandomResult(random, 20, 100);
+  const ResultDiff diff = DiffOf(result, result);
+  EXPECT_EQ(100, diff.Count(DiffClass::kPersisting));
+  EXPECT_FALSE(diff.HasDifferences());
+}
+
+TEST(Diff, SamplePersistsAgainstItself) {
+  for (const std::string& path : SamplePaths()) {
+    ClashDocument document(path);
+    if (!document.HasInterferences()) continue;
+    const ReviewedResult result = ReadForReview(document);
+    const ResultDiff diff = Diff(result, result);
+    EXPECT_FALSE(diff.HasDifferences()) << path;
+    for (const DiffEntry& entry : diff.entries) EXPECT_EQ(entry.oldPosition, entry.newPosition);
+  }
+}
+
+TEST(Diff, EachChangeIsNamed) {
+  const TestResult was = OnePair();
+  TestResult is = was;
+  is.interferences[0].type = "Contact";
+  is.interferences[0].value = "0";
+  is.interferences[0].rule = "R";
+  is.interferences[0].status = "Relevant";
+  is.interferences[0].comment = "c";
+  is.products[1].at[0] = 6;
+  const ResultDiff diff = DiffOf(was, is);
+  EXPECT_THAT(Whats(OfNew(diff, 0)),
+              ElementsAre("type", "value", "placement", "rule", "status", "comment"));
+  EXPECT_EQ(DiffClass::kChanged, OfNew(diff, 0).itsClass);
+  EXPECT_TRUE(OfNew(diff, 0).IsReopened());
+}
+
+TEST(Diff, ValueWithinTheTolerancePersists) {
+  const TestResult was = OnePair();
+  TestResult is = was;
+  is.interferences[0].value = "-1,05";
+  const Loaded oldOne(was), newOne(is);
+  DiffOptions options;
+  EXPECT_TRUE(Diff(oldOne.result, newOne.result, options).HasDifferences());
+  options.tolerance = 0.05;
+  EXPECT_FALSE(Diff(oldOne.result, newOne.result, options).HasDifferences());
+}
+
+TEST(Diff, MovedSubAssemblyKeepsItsInterferencesAndDecisions) {
+  std::mt19937 random(5);
+  const TestResult was = RandomResult(random, 14, 60);
+  TestResult is = was;
+  for (TestProduct& product : is.products)
+    if (product.path.starts_with("assembly_1")) product.at[1] += 300;
+  const ResultDiff diff = DiffOf(was, is);
+  EXPECT_EQ(60, diff.Count(DiffClass::kPersisting) + diff.Count(DiffClass::kChanged));
+  for (const DiffEntry& entry : diff.entries) {
+    const TestInterference& one = is.interferences[static_cast<std::size_t>(entry.newPosition)];
+    EXPECT_EQ(entry.oldPosition, entry.newPosition);
+    const bool isFirstIn = one.first >= 7, isSecondIn = one.second >= 7;
+    EXPECT_EQ(isFirstIn || isSecondIn, entry.itsClass == DiffClass::kChanged);
+    EXPECT_EQ(isFirstIn != isSecondIn, entry.IsReopened());
+  }
+}
+
+TEST(Diff, RenamedAndReorderedProductsAreFoundByPartAndPlacement) {
+  const TestResult was = OnePair();
+  TestResult is = was;
+  is.products[0].path = "a --++-- screw_9";
+  const ResultDiff renamed = DiffOf(was, is);
+  EXPECT_FALSE(renamed.HasDifferences());
+  EXPECT_THAT(renamed.entries[0].reason, HasSubstr("same part"));
+
+  is.products[0].path = "b --++-- c --++-- bolt_1";  // moved under another assembly
+  is.products[0].at[0] = 40;
+  const ResultDiff moved = DiffOf(was, is);
+  EXPECT_EQ(1, moved.Count(DiffClass::kChanged));
+  EXPECT_THAT(moved.entries[0].reason, HasSubstr("same last name and part"));
+}
+
+TEST(Diff, EqualNamesInTwoAssembliesAreTheNearest) {
+  TestResult was = OnePair();
+  was.products.push_back({"b --++-- bolt_1", "bolt", {500, 0, 0}});
+  was.products.push_back({"b --++-- plate_1", "plate", {505, 0, 0}});
+  was.interferences.push_back({.truth = 1, .first = 2, .second = 3, .place = {1, 2, 3}});
+  TestResult is = was;
+  for (TestProduct& product : is.products)  // both assemblies get other names, in other order
+    product.path = (product.at[0] < 100 ? "z" : "y") + product.path.substr(1);
+  std::swap(is.interferences[0], is.interferences[1]);
+  const ResultDiff diff = DiffOf(was, is);
+  EXPECT_FALSE(diff.HasDifferences());
+  EXPECT_EQ(1, OfNew(diff, 0).oldPosition);
+}
+
+TEST(Diff, SwappedEqualBoltsAreStableAndSaidToBeSo) {
+  TestResult was = OnePair();
+  was.products.push_back({"a --++-- bolt_2", "bolt", {50, 0, 0}});
+  was.interferences.push_back({.truth = 1, .first = 2, .second = 1, .place = {1, 2, 3}});
+  TestResult is = was;
+  std::swap(is.products[0].at, is.products[2].at);
+  const ResultDiff diff = DiffOf(was, is);
+  EXPECT_EQ(2, diff.Count(DiffClass::kChanged));
+  EXPECT_THAT(diff.entries[0].reason, HasSubstr("may have changed places"));
+  EXPECT_EQ(0, OfNew(diff, 0).oldPosition);
+}
+
+TEST(Diff, AlikeWithoutGeometryAreTakenInOrderAndSaidToBeSo) {
+  TestResult was = OnePair();
+  was.interferences[0].hasPlace = false;
+  was.interferences.resize(100, was.interferences[0]);
+  TestResult is = was;
+  is.interferences.resize(98);
+  const ResultDiff diff = DiffOf(was, is);
+  EXPECT_EQ(98, diff.Count(DiffClass::kPersisting));
+  EXPECT_EQ(2, diff.Count(DiffClass::kResolved));
+  EXPECT_THAT(diff.entries[0].reason, HasSubstr("alike"));
+}
+
+TEST(Diff, AnotherPlaceOfThePairIsAnotherInterference) {
+  const TestResult was = OnePair();
+  TestResult is = was;
+  is.interferences[0].place = {300, 2, 3};
+  const ResultDiff diff = DiffOf(was, is);
+  EXPECT_EQ(1, diff.Count(DiffClass::kNew));
+  EXPECT_EQ(1, diff.Count(DiffClass::kResolved));
+}
+
+TEST(Diff, EmptyResultsHaveNoDifferences) {
+  TestResult empty = OnePair();
+  empty.interferences.clear();
+  EXPECT_FALSE(DiffOf(empty, empty).HasDifferences());
+  EXPECT_EQ(1, DiffOf(OnePair(), empty).Count(DiffClass::kResolved));
+  EXPECT_EQ(1, DiffOf(empty, OnePair()).Count(DiffClass::kNew));
+}
+
+// Not comparable
+
+std::string WhyNotComparable(const TestResult& inOld, const TestResult& inNew) {
+  const ResultDiff diff = DiffOf(inOld, inNew);
+  EXPECT_EQ(1, diff.Count(DiffClass::kNotComparable));
+  return diff.entries.empty() ? "" : diff.entries.back().reason;
+}
+
+std::string SpecificationOf(const std::string& inFirst, const std::string& inSecond) {
+  return "<Specification><ProdListe1 Alias='" + inFirst + "'/><ProdListe2 Alias='" + inSecond +
+         "'/></Specification>";
+}
+
+TEST(Diff, WhatTheSpecificationLacksIsNotComparable) {
+  TestResult was = OnePair(), is = OnePair();
+  is.interferences.clear();
+  is.specification = "<ProductsInSpec>" + SpecificationOf("x", "y") + "</ProductsInSpec>";
+  EXPECT_THAT(WhyNotComparable(was, is), HasSubstr("not in the new specification"));
+  was.specification = "<ProductsInSpec>" + SpecificationOf("a", "a --++-- plate_1") +
+                      "</ProductsInSpec>";  // an assembly stands for what is in it
+  EXPECT_THAT(WhyNotComparable(was, is), HasSubstr("not in the new specification"));
+  is.specification = was.specification;
+  EXPECT_EQ(1, DiffOf(was, is).Count(DiffClass::kResolved));
+}
+
+TEST(Diff, SpecificationThatNeverHadThePairSaysNothing) {
+  TestResult was = OnePair(), is = OnePair();
+  is.interferences.clear();
+  was.specification = is.specification =
+      "<ProductsInSpec>" + SpecificationOf("x", "y") + "</ProductsInSpec>";
+  EXPECT_EQ(1, DiffOf(was, is).Count(DiffClass::kResolved));
+}
+
+TEST(Diff, SmallerClearanceIsNotComparable) {
+  TestResult was = OnePair(), is = OnePair();
+  was.interferences[0].type = "Clearance";
+  was.interferences[0].value = "1.5";
+  is.interferences.clear();
+  is.clearance = "1";
+  EXPECT_THAT(WhyNotComparable(was, is), HasSubstr("clearance was 2 and is 1"));
+  is.clearance = "2,0";
+  EXPECT_EQ(1, DiffOf(was, is).Count(DiffClass::kResolved));
+}
+
+TEST(Diff, OtherKindsOfComputationAreNotComparable) {
+  TestResult was = OnePair(), is = OnePair();
+  is.interferences.clear();
+  is.types = "Kontakt + Abstand";
+  EXPECT_THAT(WhyNotComparable(was, is), HasSubstr("Kontakt + Abstand"));
+  is.types = "Jeu + Contact + Collision";
+  EXPECT_EQ(1, DiffOf(was, is).Count(DiffClass::kResolved));
+  is.computationCase = "Inside one selection";
+  EXPECT_THAT(WhyNotComparable(was, is), HasSubstr("Inside one selection"));
+}
+
+TEST(Diff, ProductMissingFromTheNewModelIsNotComparable) {
+  const TestResult was = OnePair();
+  TestResult is = was;
+  is.interferences.clear();
+  const Loaded oldOne(was), newOne(is);
+  DiffOptions options;
+  options.productsOfNewModel = {"a --++-- bolt_1"};
+  const ResultDiff diff = Diff(oldOne.result, newOne.result, options);
+  EXPECT_THAT(diff.entries[0].reason, HasSubstr("plate_1\" is not in the new model"));
+}
+
+TEST(Diff, SingleInterferenceDocumentResolvesNothingElse) {
+  const Loaded was(OnePair());
+  const Loaded is("<InterferenceElement><Interference/></InterferenceElement>");
+  const ResultDiff diff = Diff(was.result, is.result);
+  EXPECT_EQ(1, diff.Count(DiffClass::kNotComparable));
+  EXPECT_EQ(1, diff.Count(DiffClass::kNew));
+}
+
+// Truth by construction
+
+/// What a seeded edit makes of a result, and what is true of each interference of it.
+struct Edited {
+  TestResult result;
+  std::map<int, std::set<std::string>> changed;  // what, by truth
+  std::set<int> added, removed;
+};
+
+Edited Edit(const TestResult& inResult, std::mt19937& ioRandom) {
+  Edited edited{inResult, {}, {}, {}};
+  TestResult& result = edited.result;
+  const auto below = [&](std::size_t inLimit) { return ioRandom() % inLimit; };
+  const auto any = [&]() -> TestInterference& {
+    return result.interferences[below(result.interferences.size())];
+  };
+  int nextTruth = 100000;
+  for (int i = 0; i < 12; ++i) {
+    switch (below(9)) {
+      case 0: {
+        const std::size_t which = below(result.interferences.size());
+        const int truth = result.interferences[which].truth;
+        if (!edited.added.erase(truth)) edited.removed.insert(truth);
+        edited.changed.erase(truth);
+        result.interferences.erase(result.interferences.begin() +
+                                   static_cast<std::ptrdiff_t>(which));
+        break;
+      }
+      case 1: {
+        TestInterference one = any();
+        one.truth = nextTruth++;
+        one.place[1] = 5000 + 25.0 * one.truth;  // another place of the pair
+        edited.added.insert(one.truth);
+        result.interferences.push_back(one);
+        break;
+      }
+      case 2: {
+        TestInterference& one = any();
+        one.value = std::to_string(static_cast<int>(below(900)) + 100);
+        edited.changed[one.truth].insert("value");
+        break;
+      }
+      case 3: {
+        TestInterference& one = any();
+        one.type = one.type == "Clash" ? "Contact" : "Clash";
+        auto& whats = edited.changed[one.truth];
+        if (!whats.erase("type")) whats.insert("type");
+        if (one.truth < 100000 &&
+            one.type != inResult.interferences[static_cast<std::size_t>(one.truth)].type)
+          whats.insert("type");
+        break;
+      }
+      case 4: {
+        TestInterference& one = any();
+        one.rule = "rule " + std::to_string(below(1000));
+        edited.changed[one.truth].insert("rule");
+        break;
+      }
+      case 5:
+        std::ranges::shuffle(result.interferences, ioRandom);
+        break;
+      case 6:  // renamed, with part and placement as they were
+        result.products[below(result.products.size())].path =
+            "elsewhere --++-- renamed_" + std::to_string(ioRandom());
+        break;
+      case 7: {
+        const std::size_t product = below(result.products.size());
+        result.products[product].at[1] += 500;
+        for (const TestInterference& one : result.interferences)
+          if (one.first == static_cast<int>(product) || one.second == static_cast<int>(product))
+            edited.changed[one.truth].insert("placement");
+        break;
+      }
+      default: {  // the two products the other way round, at the same place
+        TestInterference& one = any();
+        std::swap(one.first, one.second);
+        for (std::size_t k = 0; k < 3; ++k)
+          one.place[k] += result.products[static_cast<std::size_t>(one.second)].at[k] -
+                          result.products[static_cast<std::size_t>(one.first)].at[k];
+      }
+    }
+  }
+  return edited;
+}
+
+TEST(Diff, ClassesAreRightForRandomEdits) {
+  std::mt19937 random(20);
+  int seen[kDiffClassCount] = {};
+  for (int round = 0; round < 200; ++round) {
+    const TestResult was = RandomResult(random, 25, 80);
+    const Edited edited = Edit(was, random);
+    // Renamed and moved at once: nothing says any more which product it was.
+    bool isDecidable = true;
+    for (std::size_t i = 0; i < was.products.size(); ++i)
+      isDecidable = isDecidable && (was.products[i].path == edited.result.products[i].path ||
+                                    was.products[i].at == edited.result.products[i].at);
+    if (!isDecidable) continue;
+    const ResultDiff diff = DiffOf(was, edited.result);
+    for (const DiffEntry& entry : diff.entries) {
+      ++seen[static_cast<std::size_t>(entry.itsClass)];
+      if (entry.newPosition < 0) {
+        EXPECT_EQ(DiffClass::kResolved, entry.itsClass);
+        EXPECT_TRUE(edited.removed.contains(entry.oldPosition)) << "round " << round;
+        continue;
+      }
+      const int truth =
+          edited.result.interferences[static_cast<std::size_t>(entry.newPosition)].truth;
+      if (edited.added.contains(truth)) {
+        EXPECT_EQ(DiffClass::kNew, entry.itsClass) << "round " << round;
+        continue;
+      }
+      EXPECT_EQ(truth, entry.oldPosition) << "round " << round << ": " << entry.reason;
+      const std::vector<std::string> whats = Whats(entry);
+      const auto changed = edited.changed.find(truth);
+      EXPECT_EQ(changed == edited.changed.end() ? std::set<std::string>() : changed->second,
+                std::set(whats.begin(), whats.end()))
+          << "round " << round << ": " << entry.reason;
+    }
+  }
+  EXPECT_GT(seen[0], 100);
+  EXPECT_GT(seen[1], 1000);
+  EXPECT_GT(seen[2], 100);
+  EXPECT_GT(seen[3], 100);
+}
+
+TEST(Diff, PairWithFiveThousandOnBothSidesIsMatched) {
+  std::mt19937 random(6);
+  TestResult was = OnePair();
+  was.interferences.resize(5000, was.interferences[0]);
+  for (std::size_t i = 0; i < was.interferences.size(); ++i)
+    was.interferences[i].place = {20.0 * static_cast<double>(i % 70),
+                                  20.0 * static_cast<double>(i / 70), 0};
+  TestResult is = was;
+  for (TestInterference& one : is.interferences) one.place[2] += 0.5;
+  std::ranges::shuffle(is.interferences, random);
+  const ResultDiff diff = DiffOf(was, is);
+  EXPECT_EQ(5000, diff.Count(DiffClass::kPersisting));
+}
+
+}  // namespace

@@ -1,0 +1,158 @@
+// lyra diff OLD NEW
+#include <memory>
+
+#include "lyra/CommandErrors.h"
+#include "lyra/Verbs.h"
+#include "lyra/commands/CommonOptions.h"
+#include "lyra/commands/ReviewInput.h"
+#include "lyra/terminal/Csv.h"
+#include "lyra/terminal/Table.h"
+
+namespace lyra {
+using namespace ZORToolkit;
+namespace {
+
+constexpr int kDiffer = 3;
+
+struct DiffVerbOptions {
+  std::string oldFile, newFile;
+  CompareOptions compare;
+  bool json = false, csv = false, all = false, exitCode = false;
+};
+
+struct Compared {
+  const ReviewedResult& oldResult;
+  const ReviewedResult& newResult;
+  ResultDiff diff;
+};
+
+std::string IndexText(int inPosition) {
+  return inPosition < 0 ? "" : std::to_string(inPosition + 1);
+}
+
+OrderedJson IndexJson(int inPosition) {
+  return inPosition < 0 ? OrderedJson(nullptr) : OrderedJson(inPosition + 1);
+}
+
+OrderedJson ToJson(const DiffEntry& inEntry) {
+  OrderedJson changes = OrderedJson::array();
+  for (const Change& change : inEntry.changes)
+    changes.push_back({{"what", change.what}, {"from", change.from}, {"to", change.to}});
+  return {{"id", inEntry.id},
+          {"old", IndexJson(inEntry.oldPosition)},
+          {"new", IndexJson(inEntry.newPosition)},
+          {"reason", inEntry.reason},
+          {"changes", changes}};
+}
+
+void PrintJson(const Compared& inCompared, Output& ioOutput) {
+  const char* separator = "{";
+  for (std::size_t i = 0; i < kDiffClassCount; ++i) {
+    const auto itsClass = static_cast<DiffClass>(i);
+    ioOutput.Write(std::string(separator) + "\"" + Name(itsClass) + "\":[");
+    separator = ",\n";
+    const char* lineBegin = "\n";
+    for (const DiffEntry& entry : inCompared.diff.entries) {
+      if (entry.itsClass != itsClass) continue;
+      ioOutput.Write(lineBegin + JsonLine(ToJson(entry)));
+      lineBegin = ",\n";
+    }
+    ioOutput.Write(*lineBegin == ',' ? "\n]" : "]");
+  }
+  ioOutput.Write("}\n");
+}
+
+/// The interference as it is now, or was where it is no more.
+std::pair<const ReviewedResult*, const ReviewRecord*> Shown(const Compared& inCompared,
+                                                            const DiffEntry& inEntry) {
+  const bool isOld = inEntry.newPosition < 0;
+  const ReviewedResult& result = isOld ? inCompared.oldResult : inCompared.newResult;
+  const int position = isOld ? inEntry.oldPosition : inEntry.newPosition;
+  return {&result, &result.interferences[static_cast<std::size_t>(position)]};
+}
+
+std::string ChangesText(const DiffEntry& inEntry) {
+  std::string text;
+  for (const Change& change : inEntry.changes) {
+    if (!text.empty()) text += "; ";
+    text += change.what + " " + change.from + " -> " + change.to;
+  }
+  return text.empty() ? inEntry.reason : text;
+}
+
+std::vector<std::string> Cells(const Compared& inCompared, const DiffEntry& inEntry) {
+  const auto [result, record] = Shown(inCompared, inEntry);
+  std::vector<std::string> cells{Name(inEntry.itsClass), IndexText(inEntry.oldPosition),
+                                 IndexText(inEntry.newPosition), record->type, record->value.text};
+  for (const int product : record->products)
+    cells.push_back(product < 0 ? "" : result->products[static_cast<std::size_t>(product)].Name());
+  cells.push_back(ChangesText(inEntry));
+  return cells;
+}
+
+void PrintCsv(const Compared& inCompared, Output& ioOutput) {
+  ioOutput.Write(CsvRow({"Class", "Old", "New", "Type", "Value", "First product", "Second product",
+                         "Changes or reason", "Id", "Reason"}));
+  for (const DiffEntry& entry : inCompared.diff.entries) {
+    std::vector<std::string> cells = Cells(inCompared, entry);
+    cells.push_back(entry.id);
+    cells.push_back(entry.reason);
+    if (ioOutput.IsTerminal())
+      for (std::string& cell : cells) cell = Printable(cell);
+    ioOutput.Write(CsvRow(cells));
+  }
+}
+
+void PrintTable(const Compared& inCompared, bool inIsAll, Output& ioOutput) {
+  std::vector<TableColumn> columns;
+  for (const char* const header : {"Class", "Old", "New", "Type", "Value", "First product",
+                                   "Second product", "Changes or reason"})
+    columns.push_back({header});
+  columns[1].align = columns[2].align = columns[4].align = TableColumn::Align::kRight;
+  columns[5].cut = columns[6].cut = Cut::kStart;
+  Table table(columns);
+  for (const DiffEntry& entry : inCompared.diff.entries)
+    if (inIsAll || entry.itsClass != DiffClass::kPersisting) table.Add(Cells(inCompared, entry));
+  table.Print(ioOutput);
+  const ResultDiff& diff = inCompared.diff;
+  const auto count = [&](DiffClass inClass) { return std::to_string(diff.Count(inClass)); };
+  ioOutput.Write("\n" + count(DiffClass::kNew) + " new, " + count(DiffClass::kPersisting) +
+                 " persisting, " + count(DiffClass::kChanged) + " changed, " +
+                 count(DiffClass::kResolved) + " resolved, " + count(DiffClass::kNotComparable) +
+                 " not comparable\n");
+}
+
+int Diff(const DiffVerbOptions& inOptions, Output& ioOutput) {
+  if (inOptions.json && inOptions.csv)
+    throw UsageError("diff: --json and --csv exclude each other");
+  const DiffOptions options = inOptions.compare.Get();
+  ChooseLanguage(inOptions.compare.language);
+  ClashDocument oldDocument(inOptions.oldFile);
+  const ReviewedResult oldResult = ReadForReview(oldDocument);
+  ClashDocument newDocument(inOptions.newFile);
+  const ReviewedResult newResult = ReadForReview(newDocument);
+  const Compared compared{oldResult, newResult, ZORToolkit::Diff(oldResult, newResult, options)};
+  if (inOptions.json)
+    PrintJson(compared, ioOutput);
+  else if (inOptions.csv)
+    PrintCsv(compared, ioOutput);
+  else
+    PrintTable(compared, inOptions.all, ioOutput);
+  return inOptions.exitCode && compared.diff.HasDifferences() ? kDiffer : 0;
+}
+
+}  // namespace
+
+VerbAction DeclareDiff(Arguments& ioArguments) {
+  const auto options = std::make_shared<DiffVerbOptions>();
+  ioArguments.Positional("OLD", options->oldFile, "A clash result, or - for standard input");
+  ioArguments.Positional("NEW", options->newFile, "The result of a later computation");
+  ioArguments.Flag("--json", options->json, "Print one JSON document");
+  ioArguments.Flag("--csv", options->csv, "Print comma-separated values");
+  ioArguments.Flag("--all", options->all, "Show persisting interferences in the table too");
+  ioArguments.Flag("--exit-code", options->exitCode, "Exit with 3 when there are differences");
+  options->compare.Declare(ioArguments);
+  return [options](Output& ioOutput) { return Diff(*options, ioOutput); };
+}
+
+}  // namespace lyra

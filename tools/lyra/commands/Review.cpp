@@ -1,0 +1,232 @@
+// lyra carry OLD NEW -o OUT, lyra review set|apply|merge … -o OUT
+#include <algorithm>
+#include <cstdio>
+#include <memory>
+#include <unordered_set>
+
+#include "foundation/ReadWholeFile.h"
+#include "lyra/CommandErrors.h"
+#include "lyra/Verbs.h"
+#include "lyra/commands/CommonOptions.h"
+#include "lyra/commands/GroupOptions.h"
+#include "lyra/commands/ReviewInput.h"
+#include "lyra/terminal/Table.h"
+#include "toolkit/review/Carry.h"
+
+namespace lyra {
+using namespace ZORToolkit;
+namespace {
+
+constexpr int kConflicts = 3;
+constexpr const char* kSettableStatuses[] = {"relevant", "irrelevant", "not-inspected"};
+constexpr const char* kPreferences[] = {"mine", "theirs"};
+
+// carry
+
+struct CarryOptions {
+  std::string oldFile, newFile, output;
+  CompareOptions compare;
+  bool keepChanged = false, verbose = false;
+};
+
+int Carry(const CarryOptions& inOptions, Output& ioOutput) {
+  const DiffOptions options = inOptions.compare.Get();
+  ChooseLanguage(inOptions.compare.language);
+  const ReviewInput was(inOptions.oldFile);
+  ReviewInput is(inOptions.newFile);
+  if (was.bytes == is.bytes) {  // it was not computed again
+    WriteReviewed(is, false, inOptions.output, ioOutput);
+    return 0;
+  }
+  const CarryPlan plan =
+      PlanCarry(was.result, is.result, Diff(was.result, is.result, options), inOptions.keepChanged);
+  const int changed = ApplyReviewEdits(is.document, is.result, plan.edits);
+  WriteReviewed(is, changed > 0, inOptions.output, ioOutput);
+  if (inOptions.verbose)
+    std::fprintf(stderr,
+                 "%d decisions carried over, %d reopened, %d others replaced, %d left behind with "
+                 "what is resolved or not comparable\n",
+                 plan.carried, plan.reopened, plan.replaced, plan.left);
+  return 0;
+}
+
+// review
+
+struct ReviewOptions {
+  std::string action, status, group, output, prefer, language;
+  std::vector<std::string> files, only, comments;
+  GroupVerbOptions grouping;
+  bool json = false;
+};
+
+void RequireFiles(const ReviewOptions& inOptions, std::size_t inCount, const char* inFiles) {
+  if (inOptions.files.size() != inCount)
+    throw UsageError("review " + inOptions.action + ": takes " + inFiles);
+}
+
+/// Where a list goes when the document itself goes to standard output.
+void PrintList(const std::string& inText, const ReviewOptions& inOptions, Output& ioOutput) {
+  if (inOptions.output != "-") return ioOutput.Write(inText);
+  std::fputs(inText.c_str(), stderr);
+}
+
+Preference PreferenceOf(const ReviewOptions& inOptions) {
+  if (inOptions.prefer.empty()) return Preference::kNone;
+  return ChosenWord("--prefer", inOptions.prefer, kPreferences) == 0 ? Preference::kMine
+                                                                     : Preference::kTheirs;
+}
+
+void PrintConflicts(const std::vector<ReviewConflict>& inConflicts, const ReviewOptions& inOptions,
+                    Output& ioOutput) {
+  std::string text;
+  if (inOptions.json) {
+    std::vector<OrderedJson> rows;
+    for (const ReviewConflict& conflict : inConflicts)
+      rows.push_back({{"id", conflict.id},
+                      {"index", conflict.position + 1},
+                      {"what", conflict.what},
+                      {"base", conflict.base},
+                      {"mine", conflict.mine},
+                      {"theirs", conflict.theirs}});
+    return PrintList(JsonRows(rows) + "\n", inOptions, ioOutput);
+  }
+  for (const ReviewConflict& conflict : inConflicts)
+    text += Printable("conflict: interference " + std::to_string(conflict.position + 1) + ", " +
+                      conflict.what + ": \"" + conflict.base + "\" became \"" + conflict.mine +
+                      "\" here and \"" + conflict.theirs + "\" there") +
+            "\n";
+  PrintList(text, inOptions, ioOutput);
+}
+
+/// @return the interferences that the options choose, by position.
+std::vector<int> ChosenPositions(const ReviewOptions& inOptions, ReviewInput& ioInput) {
+  std::unordered_set<int> ofGroup;
+  if (!inOptions.group.empty()) {
+    const auto groups =
+        GroupInterferences(ioInput.result, StableIds(ioInput.result), inOptions.grouping.Get());
+    const InterferenceGroup* const group = FindGroup(groups, inOptions.group);
+    if (group == nullptr)
+      throw InputError(ioInput.document.Name() + ": there is no group " + inOptions.group);
+    ofGroup.insert(group->members.begin(), group->members.end());
+  }
+  const RecordFilter filter = FilterOfConditions(inOptions.only);
+  std::vector<int> positions;
+  ForEachInterference(ioInput.document, filter.NeedsLabels() ? RecordPart::kAll : RecordPart::kRow,
+                      [&](const InterferenceRecord& inRecord) {
+                        const int position = inRecord.index - 1;
+                        if (!inOptions.group.empty() && !ofGroup.contains(position)) return;
+                        if (filter.Accepts(inRecord)) positions.push_back(position);
+                      });
+  return positions;
+}
+
+int Set(const ReviewOptions& inOptions, Output& ioOutput) {
+  RequireFiles(inOptions, 1, "one RESULT");
+  if (inOptions.only.empty() && inOptions.group.empty())
+    throw UsageError("review set: --only or --group must choose interferences");
+  if (inOptions.status.empty() && inOptions.comments.empty())
+    throw UsageError("review set: --status or --comment must say what to set");
+  constexpr const char* kStatuses[] = {"Relevant", "Irrelevant", "Not inspected"};
+  ReviewEdit edit;
+  if (!inOptions.status.empty())
+    edit.status = kStatuses[ChosenWord("--status", inOptions.status, kSettableStatuses)];
+  if (!inOptions.comments.empty()) edit.comment = inOptions.comments.back();
+  ReviewInput input(inOptions.files[0]);
+  std::vector<ReviewEdit> edits;
+  for (const int position : ChosenPositions(inOptions, input)) {
+    edit.position = position;
+    edits.push_back(edit);
+  }
+  const int changed = ApplyReviewEdits(input.document, input.result, edits);
+  WriteReviewed(input, changed > 0, inOptions.output, ioOutput);
+  PrintList(std::to_string(edits.size()) + " chosen, " + std::to_string(changed) + " changed\n",
+            inOptions, ioOutput);
+  return 0;
+}
+
+int Apply(const ReviewOptions& inOptions, Output& ioOutput) {
+  RequireFiles(inOptions, 2, "a RESULT and a REVIEW.json");
+  ReviewInput input(inOptions.files[0]);
+  const std::string& path = inOptions.files[1];
+  const ReviewFile review = ReadReviewFile(path, BytesOfInput(path));
+  if (!review.hash.empty() && review.hash != DocumentHash(input.bytes))
+    std::fputs("note: the review was made of another state of the result\n", stderr);
+  const ApplyPlan plan = PlanApply(input.result, review, PreferenceOf(inOptions));
+  const int changed = ApplyReviewEdits(input.document, input.result, plan.edits);
+  WriteReviewed(input, changed > 0, inOptions.output, ioOutput);
+  for (const ReviewEntry& entry : plan.unknown)
+    std::fprintf(stderr, "note: the result has no interference %s (%d in the review)\n",
+                 Printable(entry.id).c_str(), entry.index);
+  if (inOptions.json || !plan.conflicts.empty())
+    PrintConflicts(plan.conflicts, inOptions, ioOutput);
+  return plan.conflicts.empty() || !inOptions.prefer.empty() ? 0 : kConflicts;
+}
+
+int Merge(const ReviewOptions& inOptions, Output& ioOutput) {
+  RequireFiles(inOptions, 3, "BASE, MINE and THEIRS");
+  const Preference preference = PreferenceOf(inOptions);
+  const ReviewInput base(inOptions.files[0]);
+  ReviewInput mine(inOptions.files[1]);
+  const ReviewInput theirs(inOptions.files[2]);
+  const MergePlan plan = PlanMerge(base.result, mine.result, theirs.result, preference);
+  const int changed = ApplyReviewEdits(mine.document, mine.result, plan.edits);
+  WriteReviewed(mine, changed > 0, inOptions.output, ioOutput);
+  if (plan.missing > 0)
+    std::fprintf(stderr, "note: %d decisions of %s are on interferences that %s has not\n",
+                 plan.missing, Printable(inOptions.files[2]).c_str(),
+                 Printable(inOptions.files[1]).c_str());
+  if (inOptions.json || !plan.conflicts.empty())
+    PrintConflicts(plan.conflicts, inOptions, ioOutput);
+  return plan.conflicts.empty() || preference != Preference::kNone ? 0 : kConflicts;
+}
+
+int Review(const ReviewOptions& inOptions, Output& ioOutput) {
+  constexpr const char* kActions[] = {"set", "apply", "merge"};
+  constexpr int (*kDo[])(const ReviewOptions&, Output&) = {Set, Apply, Merge};
+  const std::size_t action = ChosenWord("review", inOptions.action, kActions);
+  ChooseLanguage(inOptions.language);
+  return kDo[action](inOptions, ioOutput);
+}
+
+}  // namespace
+
+VerbAction DeclareCarry(Arguments& ioArguments) {
+  const auto options = std::make_shared<CarryOptions>();
+  ioArguments.Positional("OLD", options->oldFile, "The reviewed result, or - for standard input");
+  ioArguments.Positional("NEW", options->newFile, "The result of a later computation");
+  ioArguments.RequiredText("-o,--output", "OUT", options->output,
+                           "Where NEW is written with the decisions of OLD");
+  ioArguments.Flag("--keep-changed", options->keepChanged,
+                   "Leave settled what changed, instead of reopening it");
+  ioArguments.Flag("-v,--verbose", options->verbose,
+                   "Say on standard error what became of the decisions");
+  options->compare.Declare(ioArguments);
+  return [options](Output& ioOutput) { return Carry(*options, ioOutput); };
+}
+
+VerbAction DeclareReview(Arguments& ioArguments) {
+  const auto options = std::make_shared<ReviewOptions>();
+  ioArguments.Positional("ACTION", options->action,
+                         "set: decide in bulk; apply: take in a review file; merge: three ways");
+  ioArguments.Positionals("FILE", options->files,
+                          "set: RESULT; apply: RESULT REVIEW.json; merge: BASE MINE THEIRS");
+  ioArguments.RequiredText("-o,--output", "OUT", options->output, "Where the result is written");
+  ioArguments.Texts("--only", "CONDITIONS", options->only,
+                    "set: those such as type=clash,product=bolt; several words are alternatives");
+  ioArguments.Text("--group", "ID", options->group,
+                   "set: those of a group that lyra group shows with the same options");
+  options->grouping.Declare(ioArguments);
+  ioArguments.Text("--status", "STATUS", options->status,
+                   "set: relevant, irrelevant or not-inspected");
+  ioArguments.Words("--status", kSettableStatuses);
+  ioArguments.Texts("--comment", "TEXT", options->comments,
+                    "set: the comment; an empty one takes it out");
+  ioArguments.Text("--prefer", "SIDE", options->prefer,
+                   "apply, merge: whose decision counts where both differ, mine or theirs");
+  ioArguments.Words("--prefer", kPreferences);
+  ioArguments.Flag("--json", options->json, "apply, merge: print the conflicts as JSON");
+  ioArguments.Language(options->language);
+  return [options](Output& ioOutput) { return Review(*options, ioOutput); };
+}
+
+}  // namespace lyra

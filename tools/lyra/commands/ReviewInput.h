@@ -1,0 +1,61 @@
+// What the verbs that compare and settle results have in common.
+#ifndef ZOR_TOOLS_LYRA_COMMANDS_REVIEW_INPUT_H
+#define ZOR_TOOLS_LYRA_COMMANDS_REVIEW_INPUT_H
+
+#include <nlohmann/json.hpp>
+#include <string>
+
+#include "lyra/Arguments.h"
+#include "lyra/terminal/Output.h"
+#include "toolkit/review/Diff.h"
+
+namespace lyra {
+
+using OrderedJson = nlohmann::ordered_json;
+
+/// The bytes of a file, or of standard input for "-". Raises FileError.
+std::string BytesOfInput(const std::string& inPath);
+
+/// A result with its bytes, which are written where nothing changes.
+struct ReviewInput {
+  /// @param inPath a file, or "-" for standard input. Raises InputError or FileError.
+  explicit ReviewInput(const std::string& inPath);
+
+  std::string bytes;
+  ZORToolkit::ClashDocument document;
+  ZORToolkit::ReviewedResult result;
+
+ private:
+  ReviewInput(const std::string& inPath, std::string inBytes);
+};
+
+/// Writes a result: as it was read when nothing in it changed, else as the document is now.
+void WriteReviewed(ReviewInput& ioInput, bool inIsChanged, const std::string& inPath,
+                   Output& ioOutput);
+
+/// A length in millimetres, not negative. Raises UsageError.
+/// @param inText with a decimal point or comma; empty for inDefault.
+double LengthOf(const char* inOption, const std::string& inText, double inDefault);
+
+/// The options of how results are compared.
+struct CompareOptions {
+  std::string tolerance, place, language;
+
+  void Declare(Arguments& ioArguments);
+  /// Raises UsageError.
+  ZORToolkit::DiffOptions Get() const;
+};
+
+/// One line of JSON text, safe to print on a terminal, without line feed.
+std::string JsonLine(const OrderedJson& inJson);
+/// An array of such lines.
+template <class Rows>
+std::string JsonRows(const Rows& inRows) {
+  std::string text = "[";
+  for (const OrderedJson& row : inRows) text += (text.size() > 1 ? ",\n" : "\n") + JsonLine(row);
+  return text + (text.size() > 1 ? "\n]" : "]");
+}
+
+}  // namespace lyra
+
+#endif
