@@ -88,3 +88,15 @@ TEST(DOMString, ConstantsMayBeCopiedByThreads) {
   for (std::thread& thread : threads) thread.join();
   EXPECT_TRUE(constant.equals("constant"));
 }
+
+TEST(DOMString, UnitsOfADocumentsTextOutliveTheCopyThatWasAsked) {
+  const DOM_Document document = support::ParseText("<a k='v\xC3\xA9'/>");
+  const DOMString value = document.getDocumentElement().getAttribute("k");
+  const ZORUC2Bytes* units = nullptr;
+  {
+    const DOMString copy = value;
+    units = copy.rawBuffer();
+  }
+  EXPECT_EQ(units, value.rawBuffer());
+  EXPECT_EQ(std::u16string_view(units, value.length()), u"v\u00E9");
+}
