@@ -21,31 +21,6 @@ bool StartsWith(const char* inPlace, std::string_view inText) {
   return std::memcmp(inPlace, inText.data(), inText.size()) == 0;
 }
 
-/// Takes one pseudo-attribute of an XML declaration, with the blanks before it.
-/// @return whether there is one of that name; outValue is then its value.
-bool TakePseudoAttribute(const char*& ioPlace, std::string_view inName,
-                         std::string_view& outValue) {
-  const char* at = AfterBlanks(ioPlace);
-  if (at == ioPlace || !StartsWith(at, inName)) return false;
-  at = AfterBlanks(at + inName.size());
-  if (*at != '=') return false;
-  at = AfterBlanks(at + 1);
-  const char quote = *at;
-  if (quote != '"' && quote != '\'') return false;
-  const char* const value = ++at;
-  while (*at != quote && *at > ' ') ++at;
-  if (*at != quote) return false;
-  outValue = {value, static_cast<std::size_t>(at - value)};
-  ioPlace = at + 1;
-  return true;
-}
-
-bool IsUtf8(std::string_view inEncoding) {
-  constexpr std::string_view kName = "utf-8";
-  return std::equal(inEncoding.begin(), inEncoding.end(), kName.begin(), kName.end(),
-                    [](char inA, char inB) { return inA == inB || (inA | 0x20) == inB; });
-}
-
 }  // namespace
 
 Utf8FastPath::Utf8FastPath(ByteReader& ioReader, DOM_Tree& ioTree)
@@ -102,16 +77,9 @@ void Utf8FastPath::Stop(const char* inPlace) const {
 // ---- the document
 
 void Utf8FastPath::ReadDeclaration() {
-  if (!StartsWith(at_, "<?xml") || !IsBlank(at_[5])) return;
-  const char* at = at_ + 5;
-  std::string_view value;
-  if (!TakePseudoAttribute(at, "version", value) || value != "1.0") throw NeedsFullScanner();
-  if (TakePseudoAttribute(at, "encoding", value) && !IsUtf8(value)) throw NeedsFullScanner();
-  if (TakePseudoAttribute(at, "standalone", value) && value != "yes" && value != "no")
-    throw NeedsFullScanner();
-  at = AfterBlanks(at);
-  if (at[0] != '?' || at[1] != '>') throw NeedsFullScanner();
-  at_ = at + 2;
+  const char* const end = EndOfUtf8Declaration(at_);
+  if (end == nullptr) throw NeedsFullScanner();
+  at_ = end;
 }
 
 void Utf8FastPath::ReadContent() {

@@ -1,6 +1,7 @@
 #include "default_platform/xml/XMLChars.h"
 
 #include <algorithm>
+#include <cstring>
 #include <iterator>
 
 namespace {
@@ -80,4 +81,52 @@ void AppendUtf16(char32_t inCharacter, std::u16string& ioText) {
     ioText += static_cast<char16_t>(0xD7C0 + (inCharacter >> 10));
     ioText += static_cast<char16_t>(0xDC00 + (inCharacter & 0x3FF));
   }
+}
+
+// ---- the declaration
+
+namespace {
+
+bool StartsWith(const char* inText, std::string_view inBegin) {
+  return std::strncmp(inText, inBegin.data(), inBegin.size()) == 0;
+}
+
+/// Takes one pseudo-attribute of an XML declaration, with the blanks before it.
+/// @return whether there is one of that name; outValue is then its value.
+bool TakePseudoAttribute(const char*& ioPlace, std::string_view inName,
+                         std::string_view& outValue) {
+  const char* at = AfterBlanks(ioPlace);
+  if (at == ioPlace || !StartsWith(at, inName)) return false;
+  at = AfterBlanks(at + inName.size());
+  if (*at != '=') return false;
+  at = AfterBlanks(at + 1);
+  const char quote = *at;
+  if (quote != '"' && quote != '\'') return false;
+  const char* const value = ++at;
+  while (*at != quote && *at > ' ') ++at;
+  if (*at != quote) return false;
+  outValue = {value, static_cast<std::size_t>(at - value)};
+  ioPlace = at + 1;
+  return true;
+}
+
+bool IsUtf8(std::string_view inEncoding) {
+  constexpr std::string_view kName = "utf-8";
+  return std::equal(inEncoding.begin(), inEncoding.end(), kName.begin(), kName.end(),
+                    [](char inA, char inB) { return inA == inB || (inA | 0x20) == inB; });
+}
+
+}  // namespace
+
+const char* EndOfUtf8Declaration(const char* inText) {
+  constexpr std::string_view kBegin = "<?xml";
+  if (!StartsWith(inText, kBegin) || !IsBlank(inText[kBegin.size()])) return inText;
+  const char* at = inText + kBegin.size();
+  std::string_view value;
+  if (!TakePseudoAttribute(at, "version", value) || value != "1.0") return nullptr;
+  if (TakePseudoAttribute(at, "encoding", value) && !IsUtf8(value)) return nullptr;
+  if (TakePseudoAttribute(at, "standalone", value) && value != "yes" && value != "no")
+    return nullptr;
+  at = AfterBlanks(at);
+  return at[0] == '?' && at[1] == '>' ? at + 2 : nullptr;
 }

@@ -1,4 +1,4 @@
-// The characters of XML 1.0, fifth edition, and how they are encoded.
+// The characters of XML 1.0, fifth edition, how they are encoded, and the declaration of that.
 #ifndef ZOR_DEFAULT_PLATFORM_XML_XMLCHARS_H
 #define ZOR_DEFAULT_PLATFORM_XML_XMLCHARS_H
 
@@ -34,5 +34,10 @@ int DigitOf(char inByte, int inBase);
 /// @return its number of bytes; 0 when they are ill-formed.
 int DecodeUtf8Character(const char* inPlace, char32_t& outCharacter);
 void AppendUtf16(char32_t inCharacter, std::u16string& ioText);
+
+/// @param inText a document's begin, ended by a byte 0.
+/// @return where its XML declaration ends; inText when it has none; null for one that is wrong, or
+/// that declares another version than 1.0 or another encoding than UTF-8.
+const char* EndOfUtf8Declaration(const char* inText);
 
 #endif

@@ -37,3 +37,21 @@ TEST(XMLChars, XmlIsAReservedTargetInAnyCase) {
   EXPECT_FALSE(IsReservedTarget(u"xml-stylesheet"));
   EXPECT_FALSE(IsReservedTarget(u"xm"));
 }
+
+TEST(XMLChars, DeclarationsOfUtf8EndWhereTheyEnd) {
+  const auto rest = [](const char* inText) {
+    const char* const end = EndOfUtf8Declaration(inText);
+    return std::string(end == nullptr ? "refused" : end);
+  };
+  EXPECT_EQ(rest("<a/>"), "<a/>");
+  EXPECT_EQ(rest(""), "");
+  EXPECT_EQ(rest("<?xml-stylesheet?>"), "<?xml-stylesheet?>");
+  EXPECT_EQ(rest("<?xml version='1.0'?><a/>"), "<a/>");
+  EXPECT_EQ(rest("<?xml\tversion = \"1.0\" encoding='Utf-8' standalone='no' ?>b"), "b");
+  for (const char* const other :
+       {"<?xml version='1.1'?>", "<?xml version='1.0' encoding='latin1'?>",
+        "<?xml encoding='utf-8'?>", "<?xml version='1.0' standalone='maybe'?>",
+        "<?xml version='1.0'", "<?xml version='1.0?>", "<?xml version='1.0'encoding='utf-8'?>",
+        "<?xml "})
+    EXPECT_EQ(rest(other), "refused") << other;
+}
