@@ -12,13 +12,13 @@ namespace {
 constexpr std::size_t kBlock = 8;
 
 bool IsAsciiBlock(const char* inBytes) {
-  std::uint64_t block;
+  std::uint64_t block = 0;
   std::memcpy(&block, inBytes, kBlock);
   return (block & 0x8080808080808080u) == 0;
 }
 
 bool IsAsciiBlock(const char16_t* inUnits) {
-  std::uint64_t low, high;
+  std::uint64_t low = 0, high = 0;
   std::memcpy(&low, inUnits, kBlock);
   std::memcpy(&high, inUnits + 4, kBlock);
   return ((low | high) & 0xFF80FF80FF80FF80u) == 0;
@@ -36,7 +36,7 @@ void CopyAsciiBlocks(std::basic_string_view<From> inText, std::size_t& ioPositio
 }
 
 inline char32_t NextOfUtf16(std::u16string_view inUnits, std::size_t& ioPosition) {
-  char32_t character;
+  char32_t character = 0;
   U16_NEXT_OR_FFFD(inUnits.data(), ioPosition, inUnits.size(), character);
   return character;
 }
@@ -51,7 +51,7 @@ inline char* Encode(char32_t inCharacter, char* outBytes) {
 
 bool IsUtf8(std::string_view inBytes) {
   for (std::size_t position = 0; position < inBytes.size();) {
-    UChar32 character;
+    UChar32 character = 0;
     U8_NEXT(inBytes.data(), position, inBytes.size(), character);
     if (character < 0) return false;
   }
@@ -65,7 +65,7 @@ std::size_t DecodeUtf8(std::string_view inBytes, char16_t* outUnits) {
     // A block that is not all ASCII, or the last few bytes, goes character by character.
     const std::size_t blockEnd = std::min(position + kBlock, inBytes.size());
     while (position < blockEnd) {
-      UChar32 character;
+      UChar32 character = 0;
       U8_NEXT_OR_FFFD(inBytes.data(), position, inBytes.size(), character);
       std::size_t count = 0;
       U16_APPEND_UNSAFE(units, count, character);
@@ -92,7 +92,7 @@ char32_t NextCharacter(std::u16string_view inUnits, std::size_t& ioPosition) {
 }
 
 char32_t NextCharacter(std::string_view inBytes, std::size_t& ioPosition) {
-  char32_t character;
+  char32_t character = 0;
   U8_NEXT_OR_FFFD(inBytes.data(), ioPosition, inBytes.size(), character);
   return character;
 }
