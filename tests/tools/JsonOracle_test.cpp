@@ -158,11 +158,18 @@ std::vector<Json> Records(const std::string& inSample, const Words& inWords) {
   return records;
 }
 
+/// A record without its identifier, which no other reading knows.
+std::string TextWithoutId(Json inRecord) {
+  EXPECT_EQ(inRecord.at("id").get<std::string>().size(), 16u);
+  inRecord.erase("id");
+  return inRecord.dump();
+}
+
 void ExpectSame(const Json& inActual, const std::vector<Json>& inExpected) {
   ASSERT_EQ(inActual.size(), inExpected.size());
   ASSERT_GT(inExpected.size(), 0u);
   for (std::size_t i = 0; i < inExpected.size(); ++i)
-    ASSERT_EQ(inActual[i].dump(), inExpected[i].dump());
+    ASSERT_EQ(TextWithoutId(inActual[i]), inExpected[i].dump());
 }
 
 class JsonOfSample : public testing::TestWithParam<std::string> {};
@@ -197,7 +204,7 @@ TEST_P(JsonOfSample, ShowOfFirstMiddleAndLastAgrees) {
   for (const std::size_t number : {std::size_t{1}, records.size() / 2, records.size()}) {
     const CommandResult result = RunCommand({"show", "--json", GetParam(), std::to_string(number)});
     ASSERT_EQ(result.code, 0) << result.error;
-    EXPECT_EQ(Json::parse(result.out).dump(), records[number - 1].dump());
+    EXPECT_EQ(TextWithoutId(Json::parse(result.out)), records[number - 1].dump());
   }
 }
 

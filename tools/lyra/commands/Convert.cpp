@@ -4,6 +4,7 @@
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/RecordsJson.h"
+#include "toolkit/review/Match.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -26,9 +27,12 @@ void WriteArray(const char* inName, const Records& inRecords, Output& ioOutput) 
 void WriteInterferences(ClashDocument& ioDocument, Output& ioOutput) {
   ioOutput.Write(",\n\"interferences\":");
   JsonArray array(ioOutput);
-  if (ioDocument.HasInterferences())
-    ForEachInterference(ioDocument, RecordPart::kAll,
-                        [&](const InterferenceRecord& inRecord) { array.Add(inRecord); });
+  if (ioDocument.HasInterferences()) {
+    const std::vector<std::string> ids = StableIds(ReadForReview(ioDocument));
+    ForEachInterference(ioDocument, RecordPart::kAll, [&](const InterferenceRecord& inRecord) {
+      array.Add(IdentifiedRecord{inRecord, ids[static_cast<std::size_t>(inRecord.index - 1)]});
+    });
+  }
   array.Finish();
 }
 

@@ -7,6 +7,7 @@
 #include "lyra/commands/RecordsJson.h"
 #include "lyra/terminal/Csv.h"
 #include "lyra/terminal/Table.h"
+#include "toolkit/review/Match.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -53,9 +54,11 @@ void ForEachAccepted(ClashDocument& ioDocument, const RecordFilter& inFilter, Re
 }
 
 void PrintJson(ClashDocument& ioDocument, const RecordFilter& inFilter, Output& ioOutput) {
+  const std::vector<std::string> ids = StableIds(ReadForReview(ioDocument));
   JsonArray array(ioOutput);
-  ForEachAccepted(ioDocument, inFilter, RecordPart::kAll,
-                  [&](const InterferenceRecord& inRecord) { array.Add(inRecord); });
+  ForEachAccepted(ioDocument, inFilter, RecordPart::kAll, [&](const InterferenceRecord& inRecord) {
+    array.Add(IdentifiedRecord{inRecord, ids[static_cast<std::size_t>(inRecord.index - 1)]});
+  });
   array.Finish();
   ioOutput.Write("\n");
 }

@@ -78,29 +78,31 @@ Json ArrayJson(const Records& inRecords) {
   return array;
 }
 
-Json ToJson(const InterferenceRecord& inRecord) {
-  return {{"index", inRecord.index},
-          {"result", inRecord.result},
-          {"name", inRecord.name},
-          {"value", inRecord.value.text},
-          {"type", inRecord.type},
-          {"clearance", inRecord.clearance.text},
-          {"status", inRecord.status},
-          {"computationCase", inRecord.computationCase},
-          {"retrieve", inRecord.retrieve},
+Json ToJson(const IdentifiedRecord& inIdentified) {
+  const InterferenceRecord& record = inIdentified.record;
+  return {{"index", record.index},
+          {"id", inIdentified.id},
+          {"result", record.result},
+          {"name", record.name},
+          {"value", record.value.text},
+          {"type", record.type},
+          {"clearance", record.clearance.text},
+          {"status", record.status},
+          {"computationCase", record.computationCase},
+          {"retrieve", record.retrieve},
           {"rule",
-           {{"name", inRecord.rule.name},
-            {"clearance", inRecord.rule.clearance.text},
-            {"severity", inRecord.rule.severity},
-            {"penetrationCandidate", inRecord.rule.penetrationCandidate}}},
-          {"products", ArrayJson(inRecord.products)},
-          {"comment", inRecord.comment},
-          {"picture", inRecord.picture},
+           {{"name", record.rule.name},
+            {"clearance", record.rule.clearance.text},
+            {"severity", record.rule.severity},
+            {"penetrationCandidate", record.rule.penetrationCandidate}}},
+          {"products", ArrayJson(record.products)},
+          {"comment", record.comment},
+          {"picture", record.picture},
           {"geometry",
-           {{"curveLength", inRecord.curveLength.text},
-            {"value", inRecord.distance.text},
-            {"points", PointsJson(inRecord.points)}}},
-          {"viewpoint", ToJson(inRecord.viewpoint)}};
+           {{"curveLength", record.curveLength.text},
+            {"value", record.distance.text},
+            {"points", PointsJson(record.points)}}},
+          {"viewpoint", ToJson(record.viewpoint)}};
 }
 
 Json ToJson(const DocumentRecord& inRecord) {
@@ -164,7 +166,7 @@ std::string LineOf(const Json& inValue) {
 
 }  // namespace
 
-std::string JsonText(const InterferenceRecord& inRecord) { return LineOf(ToJson(inRecord)); }
+std::string JsonText(const IdentifiedRecord& inRecord) { return LineOf(ToJson(inRecord)); }
 std::string JsonText(const DocumentRecord& inRecord) { return LineOf(ToJson(inRecord)); }
 std::string JsonText(const ComponentRecord& inRecord) { return LineOf(ToJson(inRecord)); }
 std::string JsonText(const SpecificationRecord& inRecord) { return LineOf(ToJson(inRecord)); }

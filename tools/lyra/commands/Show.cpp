@@ -6,6 +6,7 @@
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/RecordsJson.h"
 #include "lyra/terminal/KeyValueList.h"
+#include "toolkit/review/Match.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -112,7 +113,9 @@ int Show(const ShowOptions& inOptions, Output& ioOutput) {
   ClashDocument document(inOptions.file);
   const InterferenceRecord record = ReadInterference(document, inOptions.number);
   if (inOptions.json)
-    ioOutput.Write(JsonText(record) + "\n");
+    ioOutput.Write(JsonText({record, StableIds(ReadForReview(document))
+                                         .at(static_cast<std::size_t>(record.index - 1))}) +
+                   "\n");
   else
     PrintText(record, ioOutput);
   return 0;
