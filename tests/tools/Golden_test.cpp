@@ -37,6 +37,7 @@ std::vector<GoldenCase> Cases() {
       {"help_publish", {"publish", "--help"}},
       {"help_tree", {"tree", "--help"}},
       {"help_render", {"render", "--help"}},
+      {"help_detect", {"detect", "--help"}},
       {"help_path", {"path", "--help"}},
       {"help_escape", {"escape", "--help"}},
       {"help_filename", {"filename", "--help"}},

@@ -37,6 +37,11 @@ void Arguments::Texts(const char* inNames, const char* inValue, std::vector<std:
       ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll);
 }
 
+void Arguments::TwoTexts(const char* inNames, const char* inValues,
+                         std::vector<std::string>& outTexts, const char* inHelp) {
+  app_.add_option(inNames, outTexts, inHelp)->type_name(inValues)->expected(2);
+}
+
 void Arguments::RequiredText(const char* inNames, const char* inValue, std::string& outText,
                              const char* inHelp) {
   app_.add_option(inNames, outText, inHelp)->required()->type_name(inValue);

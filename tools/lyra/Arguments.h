@@ -39,6 +39,9 @@ class Arguments {
   /// May be given several times.
   void Texts(const char* inNames, const char* inValue, std::vector<std::string>& outTexts,
              const char* inHelp);
+  /// Two words after one name; both or none.
+  void TwoTexts(const char* inNames, const char* inValues, std::vector<std::string>& outTexts,
+                const char* inHelp);
   void RequiredText(const char* inNames, const char* inValue, std::string& outText,
                     const char* inHelp);
   void Number(const char* inNames, const char* inValue, std::optional<long long>& outNumber,

@@ -41,6 +41,7 @@ VerbAction DeclareReport(Arguments& ioArguments);
 VerbAction DeclarePublish(Arguments& ioArguments);
 VerbAction DeclareTree(Arguments& ioArguments);
 VerbAction DeclareRender(Arguments& ioArguments);
+VerbAction DeclareDetect(Arguments& ioArguments);
 VerbAction DeclarePath(Arguments& ioArguments);
 VerbAction DeclareEscape(Arguments& ioArguments);
 VerbAction DeclareFilename(Arguments& ioArguments);

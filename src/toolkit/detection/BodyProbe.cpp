@@ -4,6 +4,7 @@ namespace ZORDetection {
 namespace {
 
 constexpr double kSamePoint = 1e-7;
+constexpr double kClearlyBelow = 0.5;  // cosine
 
 }  // namespace
 
@@ -119,7 +120,8 @@ bool BodyProbe::IsInside(const gp_XYZ& inPoint, const BodyFoot& inFoot) const {
   const gp_XYZ away = inPoint - inFoot.foot.point;
   const double scale = away.Modulus() * inFoot.normal.Modulus();
   // Baerentzen, Aanaes: Signed distance computation using the angle weighted pseudonormal, 2005.
-  return scale > 0 && away * inFoot.normal < -0.02 * scale;
+  // Where edges have an error one of their faces may be missing from the normal.
+  return scale > 0 && away * inFoot.normal < -kClearlyBelow * scale;
 }
 
 Depth BodyProbe::DepthOf(const gp_XYZ& inPoint) {

@@ -232,8 +232,7 @@ class Search {
     std::ranges::sort(failures_, {}, &std::pair<std::size_t, std::string>::first);
     for (const auto& [task, reason] : failures_) {
       const Task& of = tasks_.Tasks()[task];
-      findings_.unjudged.push_back(
-          {of.firstPart, false, "against part " + std::to_string(of.secondPart) + ": " + reason});
+      findings_.unjudged.push_back({of.firstPart, of.secondPart, false, reason});
     }
   }
 

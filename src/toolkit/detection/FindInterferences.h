@@ -5,6 +5,7 @@
 #include <array>
 #include <cstdint>
 #include <functional>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -71,7 +72,8 @@ struct Interference {
 /// Something that could not be judged.
 struct Unjudged {
   std::uint32_t part = 0;
-  bool isWholePart = true;  ///< nothing of the part was checked
+  std::optional<std::uint32_t> other;  ///< the part against which it could not be judged
+  bool isWholePart = true;             ///< nothing of the part was checked
   std::string reason;
 };
 

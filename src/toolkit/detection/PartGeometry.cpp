@@ -28,7 +28,8 @@ namespace {
 constexpr double kDeflectionShare = 0.003;  // of the part's size
 constexpr double kMaxDeflection = 0.5;      // millimetres
 constexpr double kAngle = 0.45;             // radians
-constexpr double kSafety = 1.5;             // a measured deflection is one at a few points
+constexpr double kSinglePrecision = 6e-8;
+constexpr double kSafety = 1.5;  // a measured deflection is one at a few points
 
 bool HasSurface(const TopoDS_Face& inFace) {
   TopLoc_Location location;
@@ -201,7 +202,9 @@ class ShapeReading {
     for (const TopoDS_Shape& sheet : sheets_) AddBody(sheet, false);
     AddTriangleBodies();
     if (facesWithoutTriangles_ != 0)
-      part_.problems.push_back({0, part_.bodies.empty(),
+      part_.problems.push_back({0,
+                                {},
+                                part_.bodies.empty(),
                                 std::to_string(facesWithoutTriangles_) +
                                     (facesWithoutTriangles_ == 1 ? " face without triangles"
                                                                  : " faces without triangles")});
@@ -282,6 +285,11 @@ class ShapeReading {
   }
 
   void AddTriangleBodies() {
+    // Such formats have numbers of single precision.
+    double largest = 0;
+    for (const gp_XYZ& point : points_)
+      for (int i = 1; i <= 3; ++i) largest = std::max(largest, std::abs(point.Coord(i)));
+    part_.pointPrecision = std::max(part_.pointPrecision, largest * kSinglePrecision);
     for (Body& body : BodiesOfTriangles(points_, triangles_))
       part_.bodies.push_back(std::move(body));
   }
@@ -314,13 +322,13 @@ PartGeometry GeometryOf(const Part& inPart, double inMeshSize) {
     OCC_CATCH_SIGNALS
     Read(inPart, inMeshSize, part);
   } catch (const Standard_Failure& failure) {
-    part.problems.push_back({0, part.bodies.empty(), failure.GetMessageString()});
+    part.problems.push_back({0, {}, part.bodies.empty(), failure.GetMessageString()});
   } catch (const std::exception& error) {
-    part.problems.push_back({0, part.bodies.empty(), error.what()});
+    part.problems.push_back({0, {}, part.bodies.empty(), error.what()});
   }
   for (const Body& body : part.bodies) part.box.Add(body.box);
   if (part.bodies.empty() && part.problems.empty())
-    part.problems.push_back({0, true, "no triangles"});
+    part.problems.push_back({0, {}, true, "no triangles"});
   return part;
 }
 

@@ -2,6 +2,7 @@
 
 #include <unistd.h>
 
+#include <algorithm>
 #include <cstdio>
 
 #include "lyra/terminal/SafeText.h"
@@ -26,12 +27,14 @@ ProgressLine::ProgressLine(const std::string& inWork)
 
 ProgressLine::~ProgressLine() { Clear(); }
 
-void ProgressLine::Show(double inDone) {
+void ProgressLine::Show(double inDone, const std::string& inRemark) {
   const int percent = static_cast<int>(inDone * 100);
   if (!isTerminal_ || percent == percent_) return;
   percent_ = percent;
-  std::fprintf(stderr, "\r%s %3d%%", work_.c_str(), percent);
-  width_ = DisplayWidth(work_) + 5;
+  const int width = DisplayWidth(work_) + 5 + DisplayWidth(inRemark);
+  std::fprintf(stderr, "\r%s %3d%%%s%*s", work_.c_str(), percent, inRemark.c_str(),
+               std::max(width_ - width, 0), "");
+  width_ = std::max(width_, width);
 }
 
 // Without terminal sequences, which not every terminal knows.
@@ -46,15 +49,18 @@ void ProgressLine::Warn(const std::string& inWarning) {
   std::fprintf(stderr, "lyra: warning: %s\n", Printable(inWarning).c_str());
 }
 
-std::string DrawingText(std::size_t inDone, std::size_t inAll, double inSeconds) {
-  const std::string text =
-      "drawing " + std::to_string(inDone) + " of " + std::to_string(inAll) + " interferences";
-  if (inDone == 0 || !(inSeconds > 0)) return text;
+std::string RateText(std::size_t inDone, std::size_t inAll, double inSeconds) {
+  if (inDone == 0 || !(inSeconds > 0)) return "";
   const double rate = static_cast<double>(inDone) / inSeconds;
   char perSecond[32];
   std::snprintf(perSecond, sizeof perSecond, "%.1f", rate);
-  return text + ", " + perSecond + " a second, " +
+  return std::string(", ") + perSecond + " a second, " +
          Duration(static_cast<double>(inAll - inDone) / rate) + " left";
+}
+
+std::string DrawingText(std::size_t inDone, std::size_t inAll, double inSeconds) {
+  return "drawing " + std::to_string(inDone) + " of " + std::to_string(inAll) + " interferences" +
+         RateText(inDone, inAll, inSeconds);
 }
 
 DrawingProgress::DrawingProgress() : isTerminal_(isatty(STDERR_FILENO) == 1) {}

@@ -19,7 +19,8 @@ class ProgressLine {
   ProgressLine& operator=(const ProgressLine&) = delete;
 
   /// @param inDone the share that is done, 0 to 1.
-  void Show(double inDone);
+  /// @param inRemark follows the percentage.
+  void Show(double inDone, const std::string& inRemark = {});
   /// Writes a warning on a line of its own, terminal or not.
   void Warn(const std::string& inWarning);
 
@@ -31,6 +32,10 @@ class ProgressLine {
   int percent_ = -1;  // shown last
   int width_ = 0;     // of what stands on the line
 };
+
+/// ", 8.3 a second, 47 s left"; empty before anything is done.
+/// @param inSeconds since the work began.
+std::string RateText(std::size_t inDone, std::size_t inAll, double inSeconds);
 
 /// "drawing 12 of 400, 8.3 a second, 47 s left".
 /// @param inSeconds since the work began.

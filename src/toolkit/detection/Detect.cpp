@@ -1,0 +1,346 @@
+#include "toolkit/detection/Detect.h"
+
+#include <algorithm>
+#include <cmath>
+#include <filesystem>
+#include <map>
+#include <memory>
+#include <thread>
+
+#include "default_platform/OpenModel.h"
+#include "foundation/PluginLoader.h"
+#include "platform/product_structure/ZORIAlias.h"
+#include "toolkit/Error.h"
+#include "toolkit/detection/ModelInterferences.h"
+#include "toolkit/records/DocumentText.h"
+
+namespace ZORToolkit {
+namespace {
+
+constexpr const char* kSeparator = " --++-- ";
+constexpr double kRigid = 1e-6;
+
+/// A pattern with "*" and "?" against a whole text.
+bool Matches(std::string_view inPattern, std::string_view inText) {
+  std::size_t pattern = 0, text = 0, star = std::string_view::npos, resume = 0;
+  while (text < inText.size()) {
+    if (pattern < inPattern.size() && inPattern[pattern] == '*') {
+      star = pattern++;
+      resume = text;
+    } else if (pattern < inPattern.size() &&
+               (inPattern[pattern] == '?' || inPattern[pattern] == inText[text])) {
+      ++pattern;
+      ++text;
+    } else if (star != std::string_view::npos) {
+      pattern = star + 1;
+      text = ++resume;
+    } else {
+      return false;
+    }
+  }
+  while (pattern < inPattern.size() && inPattern[pattern] == '*') ++pattern;
+  return pattern == inPattern.size();
+}
+
+/// A leaf of the tree, and what it counts as.
+struct Leaf {
+  std::size_t unit = 0;  ///< of the units
+  std::uint32_t part = 0;
+  ZORMathTransformation rootFromProduct;
+};
+
+struct Unit {
+  DetectedProduct product;
+  std::vector<std::string> names;  ///< paths and part names that patterns are held against
+};
+
+bool MatchesAny(const std::vector<std::string>& inPatterns, const Unit& inUnit) {
+  return std::ranges::any_of(inPatterns, [&](const std::string& pattern) {
+    return std::ranges::any_of(inUnit.names,
+                               [&](const std::string& name) { return Matches(pattern, name); });
+  });
+}
+
+/// Collects leaves and units of an opened model.
+class TreeReading {
+ public:
+  TreeReading(const ZORIProduct_var& inRoot, const DetectionOptions& inOptions)
+      : options_(inOptions) {
+    const ZORIAlias_var alias = inRoot;
+    if (!alias.IsNull()) rootAlias_ = Utf8(alias->GetAlias());
+    Visit(inRoot, {}, {}, 0, std::nullopt);
+  }
+
+  const std::string& RootAlias() const { return rootAlias_; }
+  const std::vector<Leaf>& Leaves() const { return leaves_; }
+  const std::vector<Unit>& Units() const { return units_; }
+  const std::map<std::uint32_t, std::string>& PartNames() const { return partNames_; }
+
+ private:
+  void Visit(const ZORIProduct_var& inProduct, const std::string& inPath,
+             std::vector<std::string> inNames, int inLevel, std::optional<std::size_t> inUnit) {
+    ZORDefault::ProductInfo info;
+    if (!ZORDefault::GetProductInfo(inProduct.GetInterface(), info)) return;
+    const std::string path =
+        inLevel == 0 ? "" : (inPath.empty() ? "" : inPath + kSeparator) + Utf8(info.alias);
+    const std::string partName = Utf8(info.partName);
+    partNames_.emplace(static_cast<std::uint32_t>(info.part), partName);
+    if (inLevel > 0) inNames.push_back(path);
+    if (inLevel > 0 && !partName.empty()) inNames.push_back(partName);
+    const std::unique_ptr<ZORListValZORBaseUnknown_var> children(
+        inProduct->GetChildren("ZORIProduct"));
+    const int count = children ? children->Size() : 0;
+    const bool isLeaf = count == 0;
+    if (!inUnit && (options_.level ? inLevel == *options_.level || isLeaf : isLeaf) &&
+        inLevel > 0) {
+      inUnit = units_.size();
+      Unit unit{{path, partName, {}}, inNames};
+      info.rootFromProduct.GetCoefficients(unit.product.rootFromProduct.data());
+      units_.push_back(std::move(unit));
+    }
+    if (isLeaf) {
+      if (inUnit && !info.isAssembly)
+        leaves_.push_back({*inUnit, static_cast<std::uint32_t>(info.part), info.rootFromProduct});
+      return;
+    }
+    for (int i = 1; i <= count; ++i) {
+      const ZORIProduct_var child = (*children)[i];
+      Visit(child, path, inNames, inLevel + 1, inUnit);
+    }
+  }
+
+  const DetectionOptions& options_;
+  std::string rootAlias_;
+  std::vector<Leaf> leaves_;
+  std::vector<Unit> units_;
+  std::map<std::uint32_t, std::string> partNames_;
+};
+
+bool IsRigid(const ZORMathTransformation& inPlacement) {
+  std::array<double, 12> m{};
+  inPlacement.GetCoefficients(m.data());
+  for (std::size_t i = 0; i < 3; ++i)
+    for (std::size_t j = i; j < 3; ++j) {
+      double product = 0;
+      for (std::size_t k = 0; k < 3; ++k) product += m[3 * i + k] * m[3 * j + k];
+      if (!(std::abs(product - (i == j ? 1 : 0)) <= kRigid)) return false;
+    }
+  return inPlacement.GetMatrix().Determinant() > 0;
+}
+
+ZORDetection::Placement ToPlacement(const ZORMathTransformation& inPlacement) {
+  std::array<double, 12> m{};
+  inPlacement.GetCoefficients(m.data());
+  ZORDetection::Placement placement{};
+  for (std::size_t row = 0; row < 3; ++row)
+    for (std::size_t column = 0; column < 4; ++column) placement[row][column] = m[3 * column + row];
+  return placement;
+}
+
+ZORDetection::FindInModelFunction* LoadKernel(std::string& outReason) {
+  void* const function = ZORFoundation::FindPluginFunction(
+      ZORDetection::kDetectionLibrary, ZORDetection::kFindInModelName, outReason);
+  return reinterpret_cast<ZORDetection::FindInModelFunction*>(function);
+}
+
+/// Which units are looked at, and which of them against which.
+class Selection {
+ public:
+  Selection(const std::string& inModel, const DetectionOptions& inOptions,
+            const std::vector<Unit>& inUnits) {
+    for (const Unit& unit : inUnits) {
+      const bool isIn = (inOptions.only.empty() || MatchesAny(inOptions.only, unit)) &&
+                        !MatchesAny(inOptions.ignore, unit);
+      const bool isFirst = !inOptions.between || MatchesAny({inOptions.between->first}, unit);
+      const bool isSecond = !inOptions.between || MatchesAny({inOptions.between->second}, unit);
+      isFirst_.push_back(isIn && isFirst);
+      isSecond_.push_back(isIn && isSecond);
+    }
+    for (const auto* side : {&isFirst_, &isSecond_})
+      if (std::ranges::find(*side, true) == side->end())
+        throw Error(inModel + ": no product is selected");
+  }
+
+  bool IsSelected(std::size_t inUnit) const { return isFirst_[inUnit] || isSecond_[inUnit]; }
+  bool IsWanted(std::size_t inUnit, std::size_t inOther) const {
+    return inUnit != inOther &&
+           ((isFirst_[inUnit] && isSecond_[inOther]) || (isFirst_[inOther] && isSecond_[inUnit]));
+  }
+
+ private:
+  std::vector<bool> isFirst_, isSecond_;
+};
+
+DetectedInterference ToInterference(const ZORDetection::Interference& inFound) {
+  DetectedInterference found;
+  found.kind = inFound.kind == ZORDetection::Kind::kClash ? DetectedInterference::Kind::kClash
+               : inFound.kind == ZORDetection::Kind::kContact
+                   ? DetectedInterference::Kind::kContact
+                   : DetectedInterference::Kind::kClearance;
+  found.value = inFound.value;
+  found.points = inFound.points;
+  found.curveLength = inFound.curveLength;
+  found.curve = inFound.curve;
+  found.isDuplicate = inFound.isDuplicate;
+  found.isSheetInSolid = inFound.isSheetInSolid;
+  if (inFound.hasMeshPrecision) found.meshPrecision = inFound.precision;
+  return found;
+}
+
+/// What is worse counts for two products of several parts.
+void Merge(DetectedInterference inFound, DetectedInterference& ioBest) {
+  const bool isSameKind = inFound.kind == ioBest.kind;
+  const bool isWorse = isSameKind ? inFound.value < ioBest.value : inFound.kind < ioBest.kind;
+  if (isWorse) std::swap(inFound, ioBest);
+  if (isSameKind && ioBest.kind != DetectedInterference::Kind::kClearance) {
+    ioBest.curveLength += inFound.curveLength;
+    ioBest.curve.insert(ioBest.curve.end(), inFound.curve.begin(), inFound.curve.end());
+  }
+  ioBest.isDuplicate = ioBest.isDuplicate && inFound.isDuplicate;
+  if (inFound.meshPrecision)
+    ioBest.meshPrecision = std::max(ioBest.meshPrecision.value_or(0), *inFound.meshPrecision);
+}
+
+class Detection {
+ public:
+  Detection(const std::string& inModel, const DetectionOptions& inOptions,
+            const TreeReading& inTree)
+      : model_(inModel),
+        options_(inOptions),
+        tree_(inTree),
+        selection_(inModel, inOptions, inTree.Units()) {}
+
+  DetectionResult Run() {
+    ChooseLeaves();
+    result_.model = std::filesystem::path(model_).filename().string();
+    result_.document = tree_.RootAlias();
+    result_.tolerance = options_.tolerance;
+    result_.contactGap = options_.contactGap;
+    result_.clearance = options_.clearance;
+    result_.computationCase =
+        options_.between ? "Between two selections" : "Between all components";
+    for (const Unit& unit : tree_.Units()) result_.products.push_back(unit.product);
+    const ZORDetection::Findings findings = Find();
+    AddFindings(findings);
+    AddUnjudged(findings);
+    return std::move(result_);
+  }
+
+ private:
+  void ChooseLeaves() {
+    std::vector<bool> isSeen(tree_.Units().size());
+    for (const Leaf& leaf : tree_.Leaves()) {
+      if (!selection_.IsSelected(leaf.unit)) continue;
+      if (!isSeen[leaf.unit]) ++result_.productsChecked;
+      isSeen[leaf.unit] = true;
+      if (!IsRigid(leaf.rootFromProduct)) {
+        result_.unjudged.push_back("the product \"" + tree_.Units()[leaf.unit].product.path +
+                                   "\": its placement changes its size");
+        continue;
+      }
+      chosen_.push_back(leaf);
+      products_.push_back({leaf.part, ToPlacement(leaf.rootFromProduct)});
+    }
+    if (result_.productsChecked < 2) throw Error(model_ + ": there are not two products to check");
+  }
+
+  ZORDetection::Findings Find() {
+    ZORDetection::Options options;
+    options.tolerance = options_.tolerance;
+    options.contactGap = options_.contactGap;
+    options.clearance = options_.clearance;
+    options.sheets = options_.sheets == SheetsMean::kClash     ? ZORDetection::SheetPolicy::kClash
+                     : options_.sheets == SheetsMean::kContact ? ZORDetection::SheetPolicy::kContact
+                                                               : ZORDetection::SheetPolicy::kIgnore;
+    options.threads = options_.threads != 0 ? options_.threads
+                                            : std::max(1U, std::thread::hardware_concurrency());
+    options.progress = options_.progress;
+    options.isWanted = [this](std::uint32_t first, std::uint32_t second) {
+      return selection_.IsWanted(chosen_[first].unit, chosen_[second].unit);
+    };
+    std::string reason;
+    ZORDetection::Findings findings;
+    auto* const kernel = LoadKernel(reason);
+    if (kernel == nullptr) throw Error(model_ + ": cannot be checked: " + reason);
+    if (!kernel(model_, products_, options, findings, reason)) throw Error(model_ + ": " + reason);
+    return findings;
+  }
+
+  void AddFindings(const ZORDetection::Findings& inFindings) {
+    std::map<std::pair<std::size_t, std::size_t>, DetectedInterference> byUnits;
+    for (const ZORDetection::Interference& found : inFindings.interferences) {
+      DetectedInterference interference = ToInterference(found);
+      interference.first = chosen_[found.first].unit;
+      interference.second = chosen_[found.second].unit;
+      const auto [place, isNew] =
+          byUnits.try_emplace({interference.first, interference.second}, interference);
+      if (!isNew) Merge(interference, place->second);
+    }
+    for (auto& [units, interference] : byUnits)
+      result_.interferences.push_back(std::move(interference));
+    result_.pairsNear = inFindings.pairsChecked;
+    result_.isStopped = inFindings.isStopped;
+  }
+
+  std::string NameOfPart(std::uint32_t inPart) const {
+    const auto name = tree_.PartNames().find(inPart);
+    return "the part \"" + (name == tree_.PartNames().end() ? "" : name->second) + '"';
+  }
+
+  void AddUnjudged(const ZORDetection::Findings& inFindings) {
+    std::map<std::uint32_t, bool> isWhole;
+    for (const ZORDetection::Unjudged& unjudged : inFindings.unjudged) {
+      std::string line = NameOfPart(unjudged.part);
+      if (unjudged.other) line += " against " + NameOfPart(*unjudged.other);
+      result_.unjudged.push_back(line + ": " + unjudged.reason);
+      if (unjudged.isWholePart) isWhole[unjudged.part] = true;
+    }
+    std::size_t judged = 0;
+    for (const Leaf& leaf : chosen_) judged += isWhole.contains(leaf.part) ? 0 : 1;
+    if (judged < 2) throw Error(model_ + ": nothing could be checked: " + FirstReason());
+    if (options_.warn)
+      for (const std::string& line : result_.unjudged)
+        options_.warn(model_ + ": not checked: " + line);
+  }
+
+  std::string FirstReason() const {
+    return result_.unjudged.empty() ? "no two products have geometry" : result_.unjudged.front();
+  }
+
+  const std::string& model_;
+  const DetectionOptions& options_;
+  const TreeReading& tree_;
+  const Selection selection_;
+  std::vector<Leaf> chosen_;
+  std::vector<ZORDetection::Product> products_;
+  DetectionResult result_;
+};
+
+}  // namespace
+
+std::string FindFault(const DetectionOptions& inOptions) {
+  const auto isLength = [](double length) { return std::isfinite(length) && length >= 0; };
+  if (!isLength(inOptions.tolerance)) return "the tolerance must be a length, 0 or more";
+  if (!isLength(inOptions.contactGap)) return "the contact gap must be a length, 0 or more";
+  if (!isLength(inOptions.clearance)) return "the clearance must be a length, 0 or more";
+  if (inOptions.clearance > 0 && inOptions.contactGap > inOptions.clearance)
+    return "the contact gap must not be above the clearance";
+  if (inOptions.level && *inOptions.level < 1) return "the level must be 1 or more";
+  return "";
+}
+
+DetectionResult Detect(const std::string& inModel, const DetectionOptions& inOptions) {
+  if (const std::string fault = FindFault(inOptions); !fault.empty()) throw Error(fault);
+  ZORDefault::ModelOptions modelOptions;
+  modelOptions.progress = inOptions.readingProgress;
+  modelOptions.warn = inOptions.warn;
+  try {
+    const ZORDefault::OpenedModel opened = ZORDefault::OpenModel(inModel, modelOptions);
+    const TreeReading tree(opened.root, inOptions);
+    return Detection(inModel, inOptions, tree).Run();
+  } catch (const ZORDefault::ModelError& error) {
+    throw Error(error.what());
+  }
+}
+
+}  // namespace ZORToolkit

@@ -1,0 +1,95 @@
+// Computes a clash result from a CAD model.
+#ifndef ZOR_TOOLKIT_DETECTION_DETECT_H
+#define ZOR_TOOLKIT_DETECTION_DETECT_H
+
+#include <array>
+#include <cstddef>
+#include <functional>
+#include <optional>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "ZORToolkitExport.h"
+
+namespace ZORToolkit {
+
+/// What a surface that encloses nothing means when it enters a solid deeper than the tolerance.
+enum class SheetsMean { kClash, kContact, kNothing };
+
+/// Lengths in millimetres; texts in UTF-8. Patterns have "*" for any text and "?" for any character;
+/// they are held against the alias path and the part name of a product and of the assemblies above.
+struct DetectionOptions {
+  double tolerance = 0.01;   ///< a clash is deeper; not negative
+  double contactGap = 1e-5;  ///< products that are at most this far apart touch; not negative
+  double clearance = 0;      ///< 0: clearances are not looked for; else not below the contact gap
+  /// Products at this level below the root (1: its children) count as one with all below them;
+  /// otherwise the leaves of the tree are looked at.
+  std::optional<int> level;
+  std::vector<std::string> only;    ///< products that match one of them; empty: all
+  std::vector<std::string> ignore;  ///< but none that matches one of these
+  std::optional<std::pair<std::string, std::string>> between;  ///< one selection against another
+  SheetsMean sheets = SheetsMean::kClash;
+  unsigned threads = 0;  ///< 0: as many as there are processors
+
+  std::function<void(double)> readingProgress;             ///< told the share, 0 to 1; may be empty
+  std::function<bool(std::size_t, std::size_t)> progress;  ///< told pairs done of all; false: stop
+  std::function<void(const std::string&)> warn;            ///< told in one line; may be empty
+};
+
+struct DetectedProduct {
+  std::string path;      ///< aliases from below the root, joined by " --++-- "
+  std::string partName;  ///< may be empty
+  /// The columns of its rotation, then its translation.
+  std::array<double, 12> rootFromProduct{};
+};
+
+struct DetectedInterference {
+  enum class Kind { kClash, kContact, kClearance };
+  std::size_t first = 0, second = 0;  ///< of the products of the result
+  Kind kind = Kind::kContact;
+  double value = 0;  ///< minus the depth of a clash, 0, or the distance
+  std::array<std::array<double, 3>, 2> points{};
+  double curveLength = 0;
+  std::vector<std::array<double, 3>> curve;
+  bool isDuplicate = false;  ///< the same geometry at the same place
+  bool isSheetInSolid = false;
+  std::optional<double> meshPrecision;  ///< by how much triangles that had to do may be off
+};
+
+struct DetectionResult {
+  std::string model;     ///< the file's name
+  std::string document;  ///< the root's alias
+  std::vector<DetectedProduct> products;
+  std::vector<DetectedInterference> interferences;  ///< each pair once, in tree order
+  /// What could not be judged, one line each.
+  std::vector<std::string> unjudged;
+  std::size_t productsChecked = 0, pairsNear = 0;
+  bool isStopped = false;
+  double tolerance = 0, contactGap = 0, clearance = 0;
+  std::string computationCase;
+};
+
+struct CalendarDate {
+  int day = 1, month = 1, year = 1970;
+};
+
+/// What is wrong with the lengths of the options, one line; empty when nothing is.
+ZOR_TOOLKIT_EXPORT std::string FindFault(const DetectionOptions& inOptions);
+
+/// Finds all interferences of a STEP, IGES, glTF, GLB, OBJ or STL file. The number of threads does not
+/// change the result.
+/// Raises Error when the model cannot be read, when there are not two products to check, or when a
+/// selection is empty.
+ZOR_TOOLKIT_EXPORT DetectionResult Detect(const std::string& inModel,
+                                          const DetectionOptions& inOptions);
+
+/// Writes a clash result of version 1.2.
+/// @param inPath UTF-8; the file is made or overwritten.
+/// Raises Error when it cannot be written.
+ZOR_TOOLKIT_EXPORT void WriteClashResult(const DetectionResult& inResult,
+                                         const CalendarDate& inDate, const std::string& inPath);
+
+}  // namespace ZORToolkit
+
+#endif

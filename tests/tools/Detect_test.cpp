@@ -1,0 +1,100 @@
+// Clash results computed from CAD models, from a shell.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <fstream>
+#include <iterator>
+
+#include "tools/Command.h"
+
+using testing::AllOf;
+using testing::HasSubstr;
+using testing::Not;
+
+namespace {
+
+const std::string kModel = "samples/as1-oc-214.stp";
+
+std::string BytesOf(const std::string& inPath) {
+  std::ifstream stream(inPath, std::ios::binary);
+  return {std::istreambuf_iterator<char>(stream), {}};
+}
+
+TEST(Detect, ResultReadsAsAnyOther) {
+  const CommandResult detected = RunCommand({"detect", kModel, "-o", "-"});
+  ASSERT_EQ(detected.code, 0) << detected.error;
+  EXPECT_THAT(detected.out, AllOf(HasSubstr("NbInterf=\"32\""), Not(HasSubstr("NotChecked"))));
+  TemporaryDirectory directory;
+  const std::string result = directory.Path("as1.clash.xml");
+  const CommandResult written = RunCommand({"detect", kModel, "-o", result});
+  EXPECT_EQ(written.out, "0 clashes, 32 contacts, 0 clearances between 18 products\n");
+  const CommandResult list = RunCommand({"list", "--type", "contact", result});
+  EXPECT_EQ(list.code, 0) << list.error;
+  EXPECT_THAT(list.out, HasSubstr("rod-assembly_1 --++-- nut_2"));
+}
+
+TEST(Detect, AnyNumberOfJobsGivesTheSameBytes) {
+  TemporaryDirectory directory;
+  const std::string one = directory.Path("one.xml"), three = directory.Path("three.xml");
+  ASSERT_EQ(RunCommand({"detect", kModel, "-o", one, "--jobs", "1", "--clearance", "5"}).code, 0);
+  ASSERT_EQ(RunCommand({"detect", kModel, "-o", three, "--jobs", "3", "--clearance", "5"}).code, 0);
+  EXPECT_EQ(BytesOf(one), BytesOf(three));
+  EXPECT_FALSE(BytesOf(one).empty());
+}
+
+TEST(Detect, SelectionsNarrowTheSearch) {
+  const auto summary = [](const char* option, const char* value) {
+    return RunCommand({"detect", kModel, "-o", "/dev/null", option, value}).out;
+  };
+  EXPECT_EQ(summary("--only", "*bolt_*"),
+            "0 clashes, 0 contacts, 0 clearances between 6 products\n");
+  EXPECT_EQ(summary("--ignore", "nut"),
+            "0 clashes, 16 contacts, 0 clearances between 10 products\n");
+  EXPECT_EQ(summary("--level", "1"), "0 clashes, 4 contacts, 0 clearances between 4 products\n");
+  const CommandResult between =
+      RunCommand({"detect", kModel, "-o", "-", "--between", "plate", "l-bracket"});
+  EXPECT_THAT(between.out, AllOf(HasSubstr("NbInterf=\"2\""), Not(HasSubstr("ShapeName=\"nut\""))));
+}
+
+TEST(Detect, EmptySelectionIsToldAsSuch) {
+  const CommandResult result = RunCommand({"detect", kModel, "-o", "/dev/null", "--only", "none"});
+  EXPECT_EQ(result.code, 1);
+  EXPECT_THAT(result.error, HasSubstr("no product is selected"));
+}
+
+TEST(Detect, ImpossibleLengthsAreWrongUsage) {
+  for (const char* length : {"nan", "-1", "inf", "1mm", "", "1e999"})
+    EXPECT_EQ(
+        RunCommand({"detect", kModel, "-o", "/dev/null", "--tolerance=" + std::string(length)})
+            .code,
+        2)
+        << length;
+  EXPECT_EQ(
+      RunCommand({"detect", kModel, "-o", "/dev/null", "--contact-gap", "2", "--clearance", "1"})
+          .code,
+      2);
+  EXPECT_EQ(RunCommand({"detect", kModel, "-o", "/dev/null", "--level", "0"}).code, 2);
+  EXPECT_EQ(RunCommand({"detect", kModel, "-o", "/dev/null", "--jobs", "0"}).code, 2);
+  EXPECT_EQ(RunCommand({"detect", kModel, "-o", "/dev/null", "--sheets", "fold"}).code, 2);
+}
+
+TEST(Detect, MissingModelLeavesTheOldResult) {
+  TemporaryDirectory directory;
+  const std::string result = directory.Path("old.xml");
+  std::ofstream(result) << "old";
+  const CommandResult detected = RunCommand({"detect", "no/such.stp", "-o", result});
+  EXPECT_EQ(detected.code, 1);
+  EXPECT_THAT(detected.error, HasSubstr("no/such.stp: does not exist"));
+  EXPECT_EQ(BytesOf(result), "old");
+}
+
+TEST(Detect, NothingToCheckIsAFailure) {
+  TemporaryDirectory directory;
+  const std::string model = directory.Path("one.stl");
+  std::ofstream(model) << "solid one\nfacet normal 0 0 1\nouter loop\nvertex 0 0 0\n"
+                          "vertex 1 0 0\nvertex 0 1 0\nendloop\nendfacet\nendsolid one\n";
+  const CommandResult detected = RunCommand({"detect", model, "-o", "/dev/null"});
+  EXPECT_EQ(detected.code, 1);
+}
+
+}  // namespace

@@ -1,0 +1,141 @@
+// lyra detect MODEL -o RESULT
+#include "toolkit/detection/Detect.h"
+
+#include <algorithm>
+#include <charconv>
+#include <chrono>
+#include <cstdlib>
+#include <ctime>
+#include <memory>
+
+#include "lyra/CommandErrors.h"
+#include "lyra/Verbs.h"
+#include "lyra/commands/CommonOptions.h"
+#include "lyra/terminal/Progress.h"
+
+namespace lyra {
+using namespace ZORToolkit;
+namespace {
+
+constexpr const char* kSheetWords[] = {"clash", "contact", "ignore"};
+constexpr long long kMaxJobs = 1024;
+
+struct DetectOptions {
+  std::string file, result, tolerance = "0.01", contactGap = "0.00001", clearance = "0",
+                            sheets = "clash";
+  std::optional<long long> level, jobs;
+  std::vector<std::string> only, ignore, between;
+};
+
+double LengthOf(const char* inOption, const std::string& inText) {
+  double length = 0;
+  const char* const end = inText.data() + inText.size();
+  const auto [stop, error] = std::from_chars(inText.data(), end, length);
+  if (error != std::errc() || stop != end)
+    throw UsageError(std::string(inOption) + ": \"" + inText + "\" is no length in millimetres");
+  return length;
+}
+
+DetectionOptions ToDetection(const DetectOptions& inOptions) {
+  DetectionOptions options;
+  options.tolerance = LengthOf("--tolerance", inOptions.tolerance);
+  options.contactGap = LengthOf("--contact-gap", inOptions.contactGap);
+  options.clearance = LengthOf("--clearance", inOptions.clearance);
+  constexpr long long kMaxLevel = 1000000;
+  if (inOptions.level)
+    options.level = static_cast<int>(std::clamp<long long>(*inOptions.level, 0, kMaxLevel));
+  if (inOptions.jobs && (*inOptions.jobs < 1 || *inOptions.jobs > kMaxJobs))
+    throw UsageError("--jobs: must be 1 to " + std::to_string(kMaxJobs));
+  options.threads = static_cast<unsigned>(inOptions.jobs.value_or(0));
+  options.only = inOptions.only;
+  options.ignore = inOptions.ignore;
+  if (!inOptions.between.empty()) options.between = {inOptions.between[0], inOptions.between[1]};
+  constexpr SheetsMean kMeanings[] = {SheetsMean::kClash, SheetsMean::kContact,
+                                      SheetsMean::kNothing};
+  options.sheets = kMeanings[ChosenWord("--sheets", inOptions.sheets, kSheetWords)];
+  if (const std::string fault = FindFault(options); !fault.empty()) throw UsageError(fault);
+  return options;
+}
+
+/// Of today, or of what makes builds repeat.
+CalendarDate Today() {
+  std::time_t time = std::time(nullptr);
+  if (const char* const epoch = std::getenv("SOURCE_DATE_EPOCH"))
+    time = static_cast<std::time_t>(std::strtoll(epoch, nullptr, 10));
+  std::tm parts{};
+  gmtime_r(&time, &parts);
+  return {parts.tm_mday, parts.tm_mon + 1, parts.tm_year + 1900};
+}
+
+DetectionResult DetectWithProgress(const DetectOptions& inOptions, DetectionOptions inDetection) {
+  const auto reading = std::make_unique<ProgressLine>("reading " + inOptions.file);
+  ProgressLine checking("checking " + inOptions.file);
+  const auto start = std::chrono::steady_clock::now();
+  inDetection.readingProgress = [&](double done) { reading->Show(done); };
+  inDetection.warn = [&](const std::string& warning) { checking.Warn(warning); };
+  inDetection.progress = [&](std::size_t done, std::size_t all) {
+    const double seconds =
+        std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+    checking.Show(static_cast<double>(done) / static_cast<double>(all),
+                  RateText(done, all, seconds));
+    return true;
+  };
+  return Detect(inOptions.file, inDetection);
+}
+
+std::string Counted(std::size_t inCount, const char* inOne, const char* inMany) {
+  return std::to_string(inCount) + ' ' + (inCount == 1 ? inOne : inMany);
+}
+
+std::string Summary(const DetectionResult& inResult) {
+  std::size_t counts[3] = {};
+  for (const DetectedInterference& found : inResult.interferences)
+    ++counts[static_cast<std::size_t>(found.kind)];
+  return Counted(counts[0], "clash", "clashes") + ", " + Counted(counts[1], "contact", "contacts") +
+         ", " + Counted(counts[2], "clearance", "clearances") + " between " +
+         Counted(inResult.productsChecked, "product", "products") + "\n";
+}
+
+int Run(const DetectOptions& inOptions, Output& ioOutput) {
+  if (inOptions.file == "-") throw InputError("-: a model cannot be read from standard input");
+  const DetectionOptions detection = ToDetection(inOptions);
+  { const OutputFile probe(inOptions.result); }  // fails at once where nothing can be written
+  const DetectionResult result = DetectWithProgress(inOptions, detection);
+  OutputFile file(inOptions.result);
+  WriteClashResult(result, Today(), file.Path());
+  file.Finish(ioOutput);
+  if (inOptions.result != "-") ioOutput.Write(Summary(result));
+  return 0;
+}
+
+}  // namespace
+
+VerbAction DeclareDetect(Arguments& ioArguments) {
+  const auto options = std::make_shared<DetectOptions>();
+  ioArguments.Positional("MODEL", options->file, "A STEP, IGES, glTF, OBJ or STL file");
+  ioArguments.RequiredText("-o,--output", "RESULT", options->result, "The clash result to write");
+  ioArguments.Text("--tolerance", "MM", options->tolerance,
+                   "Products that enter each other deeper than this clash (default: 0.01)");
+  ioArguments.Text("--contact-gap", "MM", options->contactGap,
+                   "Products at most this far apart touch (default: 0.00001)");
+  ioArguments.Text("--clearance", "MM", options->clearance,
+                   "Products at most this far apart are too near (default: 0, which is off)");
+  ioArguments.Number("--level", "N", options->level,
+                     "Products N levels below the root count as one with all below them");
+  ioArguments.Texts("--only", "PATTERN", options->only,
+                    "Only products whose path or part name, or that of an assembly above, is like "
+                    "this, with * and ?; may be given several times");
+  ioArguments.Texts("--ignore", "PATTERN", options->ignore,
+                    "No products that are like this; may be given several times");
+  ioArguments.TwoTexts("--between", "PATTERN", options->between,
+                       "Only products like the first against products like the second");
+  ioArguments.Text("--sheets", "WORD", options->sheets,
+                   "What a surface without an inside means that enters a solid: clash (default), "
+                   "contact or ignore");
+  ioArguments.Words("--sheets", kSheetWords);
+  ioArguments.Number("--jobs", "N", options->jobs,
+                     "Threads to work with (default: one for each processor)");
+  return [options](Output& ioOutput) { return Run(*options, ioOutput); };
+}
+
+}  // namespace lyra
