@@ -216,11 +216,11 @@ class Comparability {
 std::string PlacementText(const ReviewProduct& inProduct,
                           const std::optional<Placement>& inPlacement) {
   std::string text = inProduct.Name() + " at";
-  for (std::size_t i = 9; i < 12; ++i) text += " " + Number((*inPlacement)[i]).text;
+  for (std::size_t i = 9; i < 12; ++i) text.append(1, ' ').append(Number((*inPlacement)[i]).text);
   constexpr Placement kUnturned{1, 0, 0, 0, 1, 0, 0, 0, 1};
   if (std::equal(inPlacement->begin(), inPlacement->begin() + 9, kUnturned.begin())) return text;
   text += ", turned";
-  for (std::size_t i = 0; i < 9; ++i) text += " " + Number((*inPlacement)[i]).text;
+  for (std::size_t i = 0; i < 9; ++i) text.append(1, ' ').append(Number((*inPlacement)[i]).text);
   return text;
 }
 

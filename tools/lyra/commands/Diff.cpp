@@ -46,11 +46,11 @@ OrderedJson ToJson(const DiffEntry& inEntry) {
 }
 
 void PrintJson(const Compared& inCompared, Output& ioOutput) {
-  const char* separator = "{";
+  std::string begin = "{";
   for (std::size_t i = 0; i < kDiffClassCount; ++i) {
     const auto itsClass = static_cast<DiffClass>(i);
-    ioOutput.Write(std::string(separator) + "\"" + Name(itsClass) + "\":[");
-    separator = ",\n";
+    ioOutput.Write(begin.append("\"").append(Name(itsClass)).append("\":["));
+    begin = ",\n";
     const char* lineBegin = "\n";
     for (const DiffEntry& entry : inCompared.diff.entries) {
       if (entry.itsClass != itsClass) continue;
@@ -116,7 +116,8 @@ void PrintTable(const Compared& inCompared, bool inIsAll, Output& ioOutput) {
   table.Print(ioOutput);
   const ResultDiff& diff = inCompared.diff;
   const auto count = [&](DiffClass inClass) { return std::to_string(diff.Count(inClass)); };
-  ioOutput.Write("\n" + count(DiffClass::kNew) + " new, " + count(DiffClass::kPersisting) +
+  ioOutput.Write("\n");
+  ioOutput.Write(count(DiffClass::kNew) + " new, " + count(DiffClass::kPersisting) +
                  " persisting, " + count(DiffClass::kChanged) + " changed, " +
                  count(DiffClass::kResolved) + " resolved, " + count(DiffClass::kNotComparable) +
                  " not comparable\n");
