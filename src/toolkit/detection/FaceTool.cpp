@@ -202,7 +202,7 @@ double FaceTool::CurveFoot(int inEdge, const gp_XYZ& inPoint, double inGuess) {
   return t;
 }
 
-void FaceTool::TryEdges(const gp_XYZ& inPoint, FaceFoot& ioFoot) {
+void FaceTool::TryEdges(const gp_XYZ& inPoint, bool inWithSeams, FaceFoot& ioFoot) {
   ioFoot.distance = std::numeric_limits<double>::infinity();
   struct Near {
     int edge;
@@ -212,6 +212,7 @@ void FaceTool::TryEdges(const gp_XYZ& inPoint, FaceFoot& ioFoot) {
   std::vector<Near> near;
   for (std::size_t i = 0; i < face_.edges.size(); ++i) {
     const BorderEdge& edge = face_.edges[i];
+    if (edge.isSeam && !inWithSeams) continue;
     Near nearest{static_cast<int>(i), 0, std::numeric_limits<double>::infinity(), 0};
     for (std::size_t k = 0; k + 1 < edge.nodes.size(); ++k) {
       const gp_XYZ &start = body_.nodes[edge.nodes[k]], &end = body_.nodes[edge.nodes[k + 1]];
@@ -253,7 +254,7 @@ FaceFoot FaceTool::Foot(const gp_XYZ& inPoint, const gp_XY& inGuess) {
   foot.distance = (foot.point - inPoint).Modulus();
   if (IsInTrims(foot.point, foot.parameters)) return foot;
   const FaceFoot outside = foot;
-  TryEdges(inPoint, foot);
+  TryEdges(inPoint, true, foot);
   // A face without a usable border keeps the foot on its surface.
   return std::isfinite(foot.distance) ? foot : outside;
 }

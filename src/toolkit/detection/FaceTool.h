@@ -33,6 +33,13 @@ class FaceTool {
   /// @param inGuess where on the surface to begin.
   FaceFoot Foot(const gp_XYZ& inPoint, const gp_XY& inGuess);
 
+  /// From a point to the nearest of the face's edges but its seams; infinite without any.
+  double BorderDistance(const gp_XYZ& inPoint) {
+    FaceFoot foot;
+    TryEdges(inPoint, false, foot);
+    return foot.distance;
+  }
+
   /// The foot on the surface, wherever the trims are.
   gp_XY SurfaceFoot(const gp_XYZ& inPoint, const gp_XY& inGuess) const;
 
@@ -54,7 +61,7 @@ class FaceTool {
   gp_XY NewtonFoot(const gp_XYZ& inPoint, gp_XY inGuess) const;
   bool IsInOutline(gp_XY inParameters) const;
   bool IsInByKernel(const gp_XY& inParameters);
-  void TryEdges(const gp_XYZ& inPoint, FaceFoot& ioFoot);
+  void TryEdges(const gp_XYZ& inPoint, bool inWithSeams, FaceFoot& ioFoot);
   double CurveFoot(int inEdge, const gp_XYZ& inPoint, double inGuess);
 
   const Body& body_;

@@ -99,11 +99,12 @@ void BodyPair::AddBorderOnOther(std::size_t inSide, Verdict& ioVerdict) {
     const BodyFoot foot = other.probe.Nearest(there, 2 * gap);
     if (foot.distance > gap) return false;
     // A border on a border is counted with the first body's.
-    return inSide == 0 || foot.foot.edge < 0;
+    return inSide == 0 || other.probe.Tool(foot.face).BorderDistance(there) > gap;
   };
   for (const std::uint32_t face : faces) {
     for (std::size_t e = 0; e < body.faces[face].edges.size(); ++e) {
       const BorderEdge& edge = body.faces[face].edges[e];
+      if (edge.isSeam) continue;
       const BRepAdaptor_Curve& curve = self.probe.Tool(face).Curve(static_cast<int>(e));
       const gp_XYZ middle =
           curve.Value((curve.FirstParameter() + curve.LastParameter()) / 2).XYZ() * 1e4;

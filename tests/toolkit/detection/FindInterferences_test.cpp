@@ -142,6 +142,20 @@ TEST(FindInterferences, ContactIsInTheMiddleOfItsPatch) {
   EXPECT_NEAR(found.curveLength, 16, 1e-3);
 }
 
+TEST(FindInterferences, BordersThatCoincideCountOnce) {
+  const Findings cubes = FindIn({Cube(0, 0, 0), Cube(10, 0, 0)});
+  ASSERT_EQ(cubes.interferences.size(), 1U);
+  EXPECT_NEAR(cubes.interferences[0].curveLength, 40, 1e-3);
+}
+
+TEST(FindInterferences, SeamsAreNoBorders) {
+  const TopoDS_Shape hole =
+      Minus(Block(-10, -10, 0, 20, 20, 10), Rod(gp_Pnt(0, 0, -1), gp::DZ(), 3, 12));
+  const Findings findings = FindIn({hole, Rod(gp_Pnt(0, 0, -5), gp::DZ(), 3, 20)});
+  ASSERT_EQ(findings.interferences.size(), 1U);
+  EXPECT_NEAR(findings.interferences[0].curveLength, 2 * 2 * M_PI * 3, 0.01);
+}
+
 TEST(FindInterferences, CrossingHasItsExactLength) {
   const Findings findings =
       FindIn({Block(0, 0, 0, 200, 200, 10), Rod(gp_Pnt(50, 60, -20), gp::DZ(), 3, 25)});
