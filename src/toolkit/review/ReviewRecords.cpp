@@ -11,21 +11,27 @@
 namespace ZORToolkit {
 namespace {
 
-DOMString AttributeOf(const DOM_Node& inElement, const char* inName) {
-  return inElement.getAttributes().getNamedItem(inName).getNodeValue();
+// Texts are taken out of the document: its own units would be kept by it from then on.
+ZORUnicodeString AttributeOf(const DOM_Node& inElement, const char* inName) {
+  return inElement.getAttributes()
+      .getNamedItem(inName)
+      .getNodeValue()
+      .DOMStringToZORUnicodeString();
 }
 
-std::u16string_view Units(const DOMString& inText) { return {inText.rawBuffer(), inText.length()}; }
+std::u16string_view Units(const ZORUnicodeString& inText) {
+  return {inText.ConvertToUCChar(), static_cast<std::size_t>(inText.GetLengthInChar())};
+}
 
-std::string Text(const DOMString& inText) {
+std::string Text(const ZORUnicodeString& inText) {
   const std::u16string_view units = Units(inText);
   if (std::ranges::all_of(units, [](char16_t inUnit) { return inUnit < 0x80; }))
     return std::string(units.begin(), units.end());
-  return Utf8(inText.DOMStringToZORUnicodeString());
+  return Utf8(inText);
 }
 
 /// A number as a record has it, by the short way where its text is a plain decimal number.
-std::optional<double> NumberIn(const DOMString& inText) {
+std::optional<double> NumberIn(const ZORUnicodeString& inText) {
   char digits[40];
   const std::u16string_view units = Units(inText);
   if (units.size() < sizeof digits) {
@@ -40,7 +46,7 @@ std::optional<double> NumberIn(const DOMString& inText) {
     const auto [end, error] = std::from_chars(digits, digits + count, value);
     if (isPlain && error == std::errc() && end == digits + count) return value;
   }
-  return Number(inText.DOMStringToZORUnicodeString()).value;
+  return Number(inText).value;
 }
 
 bool ReadTriple(const DOM_Node& inNode, const std::array<const char*, 3>& inNames,
@@ -63,10 +69,10 @@ std::optional<Placement> PlacementIn(const DOM_Node& inMatrix) {
       isWhole = ReadTriple(inChild, {"Ux", "Uy", "Uz"}, &placement[9]) && isWhole;
       found |= 8;
     } else if (name.equals("Vector")) {
-      const DOMString column = AttributeOf(inChild, "CorrespondingData");
+      const ZORUnicodeString column = AttributeOf(inChild, "CorrespondingData");
       for (unsigned int i = 0; i < 3; ++i) {
         constexpr const char* kColumns[] = {"Rx", "Ry", "Rz"};
-        if (!column.equals(kColumns[i])) continue;
+        if (column != kColumns[i]) continue;
         isWhole = ReadTriple(inChild, {"Vx", "Vy", "Vz"}, &placement[3 * i]) && isWhole;
         found |= 1u << i;
       }
@@ -145,7 +151,7 @@ class ReviewReader {
     ReviewRecord& record = result_.interferences.emplace_back();
     record.index = static_cast<int>(result_.interferences.size());
     record.element = ElementHandle(inElement);
-    const DOMString value = AttributeOf(inElement, "Value");
+    const ZORUnicodeString value = AttributeOf(inElement, "Value");
     record.value.text = Text(value);
     record.value.value = NumberIn(value);
     SetNumber(AttributeOf(inElement, "DistanceClearance"), record.clearance);
@@ -155,7 +161,7 @@ class ReviewReader {
   }
 
   /// As the reader answers numbers: with the first comma made a point.
-  static void SetNumber(const DOMString& inText, Number& outNumber) {
+  static void SetNumber(const ZORUnicodeString& inText, Number& outNumber) {
     outNumber.text = Text(inText);
     const std::size_t comma = outNumber.text.find(',');
     if (comma != std::string::npos) outNumber.text[comma] = '.';
@@ -199,8 +205,8 @@ class ReviewReader {
         ioRecord.comment = Text(AttributeOf(inChild, "Value"));
       } else if (name.equals("ViolatedRule")) {
         ioRecord.rule = Text(AttributeOf(inChild, "Name"));
-        const DOMString clearance = AttributeOf(inChild, "Clearance");
-        if (clearance.length() != 0) SetNumber(clearance, ioRecord.clearance);
+        const ZORUnicodeString clearance = AttributeOf(inChild, "Clearance");
+        if (clearance.GetLengthInChar() != 0) SetNumber(clearance, ioRecord.clearance);
         ioRecord.computationCase = CaseOf(Text(AttributeOf(inChild, "TypeCalc")));
       }
     });
@@ -213,7 +219,7 @@ class ReviewReader {
   }
 
   int ProductOf(const DOM_Node& inProduct, const std::optional<Placement>& inPlacement) {
-    const DOMString id = AttributeOf(inProduct, "DescriptionID");
+    const ZORUnicodeString id = AttributeOf(inProduct, "DescriptionID");
     productKey_.assign(Units(id));
     if (productKey_.empty()) {
       productKey_ = u'\0';
