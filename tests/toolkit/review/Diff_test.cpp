@@ -20,10 +20,10 @@ const DiffEntry& OfNew(const ResultDiff& inDiff, int inPosition) {
   return *std::ranges::find(inDiff.entries, inPosition, &DiffEntry::newPosition);
 }
 
-std::vector<std::string> Whats(const DiffEntry& inEntry) {
-  std::vector<std::string> whats;
-  for (const Change& change : inEntry.changes) whats.push_back(change.what);
-  return whats;
+std::vector<std::string> KindsOfChange(const DiffEntry& inEntry) {
+  std::vector<std::string> kinds;
+  for (const Change& change : inEntry.changes) kinds.push_back(change.what);
+  return kinds;
 }
 
 /// A bolt in a plate.
@@ -166,7 +166,7 @@ TEST(Diff, EachChangeIsNamed) {
   is.interferences[0].comment = "c";
   is.products[1].at[0] = 6;
   const ResultDiff diff = DiffOf(was, is);
-  EXPECT_THAT(Whats(OfNew(diff, 0)),
+  EXPECT_THAT(KindsOfChange(OfNew(diff, 0)),
               ElementsAre("type", "value", "placement", "rule", "status", "comment"));
   EXPECT_EQ(DiffClass::kChanged, OfNew(diff, 0).itsClass);
   EXPECT_TRUE(OfNew(diff, 0).IsReopened());
@@ -389,11 +389,11 @@ Edited Edit(const TestResult& inResult, std::mt19937& ioRandom) {
       case 3: {
         TestInterference& one = any();
         one.type = one.type == "Clash" ? "Contact" : "Clash";
-        auto& whats = edited.changed[one.truth];
-        if (!whats.erase("type")) whats.insert("type");
+        auto& kinds = edited.changed[one.truth];
+        if (!kinds.erase("type")) kinds.insert("type");
         if (one.truth < 100000 &&
             one.type != inResult.interferences[static_cast<std::size_t>(one.truth)].type)
-          whats.insert("type");
+          kinds.insert("type");
         break;
       }
       case 4: {
@@ -456,10 +456,10 @@ TEST(Diff, ClassesAreRightForRandomEdits) {
         continue;
       }
       EXPECT_EQ(truth, entry.oldPosition) << "round " << round << ": " << entry.reason;
-      const std::vector<std::string> whats = Whats(entry);
+      const std::vector<std::string> kinds = KindsOfChange(entry);
       const auto changed = edited.changed.find(truth);
       EXPECT_EQ(changed == edited.changed.end() ? std::set<std::string>() : changed->second,
-                std::set(whats.begin(), whats.end()))
+                std::set(kinds.begin(), kinds.end()))
           << "round " << round << ": " << entry.reason;
     }
   }

@@ -81,8 +81,8 @@ TEST(Rules, FirstRuleCountsAndItsReasonBecomesTheComment) {
 }
 
 TEST(Rules, WhatIsNotKnownIsRefusedWithItsPlace) {
-  EXPECT_THAT(ReasonFor(ReadRules, "[[accept]]\nname='n'\nreason='r'\n  produkt='x'\n"),
-              HasSubstr("f.toml:4:3: unknown key \"produkt\"; known are"));
+  EXPECT_THAT(ReasonFor(ReadRules, "[[accept]]\nname='n'\nreason='r'\n  colour='x'\n"),
+              HasSubstr("f.toml:4:3: unknown key \"colour\"; known are"));
   EXPECT_THAT(ReasonFor(ReadRules, "[[accept]]\nname='n'\nreason='r'\ntype=['clash','x']"),
               HasSubstr("f.toml:4:6: \"type\": unknown word \"x\""));
   EXPECT_THAT(ReasonFor(ReadRules, "[[accept]]\nname='n'"), HasSubstr("\"reason\" is missing"));
@@ -162,8 +162,8 @@ TEST(Gate, TooMuchThatIsNotComparableFails) {
 }
 
 TEST(Gate, PolicyThatIsNotKnownIsRefusedWithItsPlace) {
-  EXPECT_THAT(ReasonFor(ReadPolicy, "[[limit]]\nname='l'\nmaks=1"),
-              HasSubstr("f.toml:3:1: unknown key \"maks\""));
+  EXPECT_THAT(ReasonFor(ReadPolicy, "[[limit]]\nname='l'\nmost=1"),
+              HasSubstr("f.toml:3:1: unknown key \"most\""));
   EXPECT_THAT(ReasonFor(ReadPolicy, "limits=1\n[[limit]]\nname='l'"),
               HasSubstr("f.toml:1:1: unknown key \"limits\""));
   EXPECT_THAT(ReasonFor(ReadPolicy, "[[limit]]\nname='l'\nmax=-1"), HasSubstr("f.toml:3:5"));
