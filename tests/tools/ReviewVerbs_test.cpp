@@ -146,8 +146,8 @@ TEST(ReviewVerb, MergeKeepsBothAndListsConflicts) {
   const std::string out = directory.Path("out.xml"), mine = directory.Path("mine.xml"),
                     theirs = directory.Path("theirs.xml"), other = directory.Path("other.xml");
   const auto set = [&](const std::string& inOnly, const std::string& inStatus,
-                       const std::string& inOut) {
-    RunCommand({"review", "set", kAs1, "--only", inOnly, "--status", inStatus, "-o", inOut});
+                       const std::string& inTarget) {
+    RunCommand({"review", "set", kAs1, "--only", inOnly, "--status", inStatus, "-o", inTarget});
   };
   set("product=nut_1", "irrelevant", mine);
   set("product=plate", "relevant", theirs);
@@ -193,11 +193,11 @@ TEST(RulesVerb, SaysWhatEachRuleDid) {
   EXPECT_EQ(result.code, 0) << result.error;
   EXPECT_THAT(result.out, HasSubstr("moon  matched nothing"));
   const std::string wrong =
-      directory.Write("wrong.toml", "[[accept]]\nname='x'\nreason='y'\nnamme='z'\n");
+      directory.Write("wrong.toml", "[[accept]]\nname='x'\nreason='y'\ncolour='z'\n");
   const CommandResult refused =
       RunCommand({"rules", kAs1, "--rules", wrong, "-o", directory.Path("out.xml")});
   EXPECT_EQ(refused.code, 1);
-  EXPECT_THAT(refused.error, HasSubstr("wrong.toml:4:1: unknown key \"namme\""));
+  EXPECT_THAT(refused.error, HasSubstr("wrong.toml:4:1: unknown key \"colour\""));
 }
 
 TEST(GateVerb, ExitCodesAndReportsOfOneRun) {
