@@ -124,7 +124,9 @@ AtomicFile::AtomicFile(const std::string& inPath, const AtomicFileOptions& inOpt
     const fs::path folder = fs::temp_directory_path(ignored);
     temporary_.emplace(folder.empty() ? "/tmp" : folder.string(), kOwnerOnly, path_);
   } else {
-    temporary_.emplace(FolderOf(target_), isNew_ ? options_.modeOfNew : kOwnerOnly, path_);
+    const bool isElsewhere = !options_.temporaryFolder.empty() && target_ == path_;
+    temporary_.emplace(isElsewhere ? options_.temporaryFolder : FolderOf(target_),
+                       isNew_ ? options_.modeOfNew : kOwnerOnly, path_);
   }
 }
 

@@ -54,6 +54,9 @@ struct AtomicFileOptions {
   bool mayReplace = true;  ///< otherwise an existing file is refused (EEXIST)
   /// Flush the bytes to disk before the rename. Not worth the wait for what can be made again.
   bool isSynchronised = true;
+  /// Where the new file is until then, on the same file system; empty: beside the old one. Not for
+  /// what a link leads to.
+  std::string temporaryFolder{};
 };
 
 /// Replaces a file by a new one that is written beside it. Until Commit succeeds the old file is

@@ -46,6 +46,8 @@ void RemoveAndEnd(int inSignal) {
   const pid_t self = getpid();
   for (const Slot& slot : slots)
     if (slot.owner == self) unlink(slot.path);
+  for (const Slot& slot : slots)  // folders, which are empty only now
+    if (slot.owner == self) rmdir(slot.path);
   EndBySignal(inSignal);
 }
 

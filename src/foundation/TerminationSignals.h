@@ -13,10 +13,11 @@ namespace ZORFoundation {
 /// library leaves its host's signals alone.
 ZOR_FOUNDATION_EXPORT void HandleTerminationSignals();
 
-/// While this lives, a termination signal removes a file, if the program handles such signals.
+/// While this lives, a termination signal removes a file or a folder that is empty by then, if the
+/// program handles such signals.
 class ZOR_FOUNDATION_EXPORT RemoveOnSignal {
  public:
-  /// @param inPath lives as long as this; the file need not exist yet.
+  /// @param inPath lives as long as this; it need not exist yet.
   explicit RemoveOnSignal(const char* inPath) noexcept;
   ~RemoveOnSignal();
   RemoveOnSignal(const RemoveOnSignal&) = delete;

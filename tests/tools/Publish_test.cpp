@@ -1,6 +1,7 @@
 // Publications: pages that hold everything and nothing dangerous, pictures that are whole.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include <algorithm>
 #include <filesystem>
@@ -301,7 +302,7 @@ TEST_F(Publish, KilledRunGoesOn) {
            kResult + " & for i in {1..1000}; do ls " + folder_ +
            "/pictures/*.jpg && break; sleep 0.01; done; kill -9 $!");
   EXPECT_EQ(RunSmall({"--resume"}).code, 0);
-  const CommandResult difference = RunShell("diff -r -x '.zorlyra-*' " + whole + " " + folder_);
+  const CommandResult difference = RunShell("diff -r " + whole + " " + folder_);
   EXPECT_EQ(difference.code, 0) << difference.out;
 }
 
@@ -399,6 +400,31 @@ TEST_F(Publish, StyleSheetGetsNoEntityOfAFile) {
   if (fs::exists(folder_ + "/index.html")) {
     EXPECT_THAT(Page(), Not(HasSubstr("SECRET")));
   }
+}
+
+TEST_F(Publish, StyleSheetThatIsNoFileIsRefusedAtOnce) {
+  const std::string pipe = directory_.Path("pipe");
+  ASSERT_EQ(mkfifo(pipe.c_str(), 0600), 0);
+  for (const std::string& sheet : {pipe, std::string("/dev/zero"), std::string("/dev/null")}) {
+    const CommandResult result = Run({kResult, "--xsl", sheet});
+    EXPECT_EQ(result.code, 1);
+    EXPECT_EQ(result.error, "lyra: " + sheet + ": is not a regular file\n");
+  }
+  EXPECT_FALSE(fs::exists(folder_));
+}
+
+TEST_F(Publish, EmptyStyleSheetIsRefused) {
+  const std::string sheet = directory_.Write("empty.xsl", "");
+  const CommandResult result = Run({kResult, "--xsl", sheet});
+  EXPECT_EQ(result.code, 1);
+  EXPECT_EQ(result.error, "lyra: " + sheet + ": the style sheet is empty\n");
+  EXPECT_FALSE(fs::exists(folder_));
+}
+
+TEST_F(Publish, StyleSheetBeyondTheLimitIsRefused) {
+  const std::string sheet = directory_.Write("large.xsl", "");
+  fs::resize_file(sheet, (std::uintmax_t{64} << 20) + 1);
+  EXPECT_EQ(Run({kResult, "--xsl", sheet}).error, "lyra: " + sheet + ": File too large\n");
 }
 
 TEST_F(Publish, StyleSheetWritesNoFile) {

@@ -187,12 +187,134 @@ TEST_F(PublishedPictures, TerminatedRunGoesOn) {
 
 TEST_F(PublishedPictures, WhatAKilledRunLeftUnfinishedGoes) {
   ASSERT_EQ(Run(NutAndRod("", "")).code, 0);
-  for (const char* name :
-       {"out/.zorlyra-fedcba9876543210", "out/pictures/.zorlyra-0123456789abcdef",
-        "out/pictures/.drawing_1.jpg", "out/pictures/.drawing_1_SubItf_12.png", "out/.mine",
-        "out/pictures/.mine"})
-    directory_.Write(name, "unfinished");
+  for (const char* folder : {"out", "out/pictures"}) {
+    const std::string work = std::string(folder) + "/.lyra-unfinished";
+    fs::create_directory(directory_.Path(work));
+    for (const char* name : {"/lock", "/.zorlyra-fedcba9876543210", "/interference_1.jpg"})
+      directory_.Write(work + name, "unfinished");
+  }
   ASSERT_EQ(Run(NutAndRod("", ""), {"--resume"}).code, 0);
-  EXPECT_THAT(Hidden(folder_), testing::ElementsAre(".mine"));
-  EXPECT_THAT(Hidden(folder_ + "/pictures"), testing::ElementsAre(".mine"));
+  EXPECT_THAT(Hidden(folder_), IsEmpty());
+  EXPECT_THAT(Hidden(folder_ + "/pictures"), IsEmpty());
+}
+
+TEST_F(PublishedPictures, UnfinishedFilesOfOthersStay) {
+  ASSERT_EQ(Run(NutAndRod("", "")).code, 0);
+  for (const char* name : {"out/.zorlyra-fedcba9876543210", "out/pictures/.mine",
+                           "out/pictures/.zorlyra-0123456789abcdef"})
+    directory_.Write(name, "unfinished");
+  ASSERT_EQ(Run(NutAndRod("", "")).code, 0);
+  EXPECT_THAT(Hidden(folder_), testing::ElementsAre(".zorlyra-fedcba9876543210"));
+  EXPECT_THAT(Hidden(folder_ + "/pictures"),
+              testing::UnorderedElementsAre(".mine", ".zorlyra-0123456789abcdef"));
+}
+
+TEST_F(PublishedPictures, ProcessesThatDrawEndWithAKilledRun) {
+  // In a session of its own, whose processes can be told from others'.
+  const CommandResult result =
+      RunShell("setsid lyra publish --jobs 3 --size 1500x1000 --model " + std::string(kModel) +
+               " -o " + folder_ + " samples/as1.clash.xml & for i in {1..3000}; do ls " + folder_ +
+               "/pictures/*.jpg >/dev/null 2>&1 && break; sleep 0.01; done; kill -9 $!; wait $!;"
+               " sleep 0.3; ps -s $! -o stat= | grep -vc Z; ls " +
+               folder_ + "/pictures >" + directory_.Path("first") + "; sleep 1; ls " + folder_ +
+               "/pictures | diff - " + directory_.Path("first"));
+  EXPECT_EQ(result.out, "0\n");
+  EXPECT_EQ(result.code, 0);
+}
+
+TEST_F(PublishedPictures, AKilledRunsPicturesAreNotMixedWithThoseOfTheNext) {
+  RunEndedBy("KILL");
+  const std::vector<std::string> words = {
+      "publish", "samples/as1.clash.xml", "--model", kModel, "--size", "90x60", "-o"};
+  std::vector<std::string> here = words, elsewhere = words;
+  here.push_back(folder_);
+  elsewhere.push_back(directory_.Path("whole"));
+  EXPECT_EQ(RunCommand(here).error, "");
+  ASSERT_EQ(RunCommand(elsewhere).code, 0);
+  EXPECT_EQ(RunShell("diff -r " + directory_.Path("whole") + " " + folder_).out, "");
+}
+
+// Folders that others use
+
+TEST_F(PublishedPictures, FolderThatAnotherPublishesIntoIsRefused) {
+  ASSERT_EQ(Run(NutAndRod("", "")).code, 0);
+  const std::string before = RunShell("cd " + folder_ + " && find . -type f | xargs md5sum").out;
+  fs::create_directory(folder_ + "/.lyra-unfinished");
+  const CommandResult result =
+      RunShell("flock " + folder_ + "/.lyra-unfinished/lock lyra publish -o " + folder_ +
+               " samples/as1.clash.xml");
+  EXPECT_EQ(result.code, 1);
+  EXPECT_EQ(result.error, "lyra: " + folder_ + ": another lyra publishes into this folder\n");
+  fs::remove_all(folder_ + "/.lyra-unfinished");
+  EXPECT_EQ(RunShell("cd " + folder_ + " && find . -type f | xargs md5sum").out, before);
+}
+
+TEST_F(PublishedPictures, OfTwoAtOnceOnePublishes) {
+  const std::string publish = "lyra publish --jobs 1 --size 1500x1000 --model " +
+                              std::string(kModel) + " -o " + folder_ + " samples/as1.clash.xml";
+  const CommandResult result =
+      RunShell(publish + " & for i in {1..3000}; do ls " + folder_ +
+               "/pictures/*.jpg >/dev/null 2>&1 && break; sleep 0.01; done; " + publish +
+               "; echo $?; wait $!; echo $?");
+  EXPECT_EQ(result.out, "1\n" + folder_ + "/index.html: 32 interferences, 32 with a picture\n0\n");
+  EXPECT_EQ(result.error, "lyra: " + folder_ + ": another lyra publishes into this folder\n");
+}
+
+TEST_F(PublishedPictures, PictureOfAnotherIsNeverReplaced) {
+  fs::create_directories(folder_ + "/pictures");
+  const std::string picture = directory_.Write("out/pictures/interference_1.jpg", "another's");
+  for (const std::vector<std::string>& more :
+       {std::vector<std::string>(), std::vector<std::string>{"--resume"}}) {
+    const CommandResult result = Run(NutAndRod("", ""), more);
+    EXPECT_EQ(result.code, 1);
+    EXPECT_THAT(result.error, HasSubstr("lyra: " + picture + ": is in the way of a picture"));
+    EXPECT_EQ(ReadFile(picture), "another's");
+    EXPECT_FALSE(fs::exists(folder_ + "/index.html"));
+    EXPECT_FALSE(fs::exists(Picture(".lyra-publish")));
+  }
+}
+
+TEST_F(PublishedPictures, PicturesOfOthersStay) {
+  fs::create_directories(folder_ + "/pictures");
+  directory_.Write("out/pictures/interference_2.jpg", "another's");
+  directory_.Write("out/pictures/interference_1.png", "another's");
+  ASSERT_EQ(Run(NutAndRod("", "")).code, 0);
+  ASSERT_EQ(Run(NutAndRod("", "")).code, 0);
+  EXPECT_EQ(BytesOf("interference_2.jpg"), "another's");
+  EXPECT_EQ(BytesOf("interference_1.png"), "another's");
+}
+
+TEST_F(PublishedPictures, OwnPicturesThatAreNotDrawnAnyMoreGo) {
+  ASSERT_EQ(RunCommand({"publish", "samples/as1.clash.xml", "--model", kModel, "--size", "90x60",
+                        "-o", folder_})
+                .code,
+            0);
+  ASSERT_EQ(Run(NutAndRod("", "")).code, 0);
+  EXPECT_TRUE(fs::exists(Picture("interference_1.jpg")));
+  EXPECT_FALSE(fs::exists(Picture("interference_32.jpg")));
+}
+
+// Former versions drew without a list; what they drew was theirs.
+TEST_F(PublishedPictures, StampWithoutAListStandsForThePicturesThatAreDrawn) {
+  ASSERT_EQ(Run(NutAndRod("", "")).code, 0);
+  const std::string stamp = BytesOf(".lyra-publish");
+  directory_.Write("out/pictures/.lyra-publish", stamp.substr(0, stamp.find("drawn")));
+  directory_.Write("out/pictures/interference_1.jpg", "former");
+  directory_.Write("out/pictures/interference_9.jpg", "another's");
+  ASSERT_EQ(Run(NutAndRod("", ""), {"--resume"}).code, 0);
+  EXPECT_EQ(BytesOf("interference_1.jpg"), "former");
+  directory_.Write("out/pictures/.lyra-publish", "result of before\n");
+  ASSERT_EQ(Run(NutAndRod("", "")).code, 0);
+  EXPECT_NE(BytesOf("interference_1.jpg"), "former");
+  EXPECT_EQ(BytesOf("interference_9.jpg"), "another's");
+  EXPECT_EQ(BytesOf(".lyra-publish"), stamp);
+}
+
+TEST_F(PublishedPictures, ListOfAStampLeadsNowhereElse) {
+  ASSERT_EQ(Run(NutAndRod("", "")).code, 0);
+  directory_.Write("out/kept.jpg", "kept");
+  const std::string stamp = BytesOf(".lyra-publish");
+  directory_.Write("out/pictures/.lyra-publish", "else " + stamp + "\n../kept.jpg");
+  ASSERT_EQ(Run(NutAndRod("", "")).code, 0);
+  EXPECT_EQ(ReadFile(folder_ + "/kept.jpg"), "kept");
 }

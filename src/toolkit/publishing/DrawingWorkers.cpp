@@ -1,7 +1,9 @@
 #include "toolkit/publishing/DrawingWorkers.h"
 
 #include <fcntl.h>
+#include <signal.h>
 #include <sys/mman.h>
+#include <sys/prctl.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -71,7 +73,12 @@ struct Pipe {
   int reader, writer;
 };
 
-// When nobody reads any more the command has ended, so there is nothing to draw for.
+/// Lets this process end with its parent, however that ends: nothing is written for nobody.
+void EndWith(pid_t inParent) {
+  prctl(PR_SET_PDEATHSIG, SIGKILL);
+  if (getppid() != inParent) _exit(1);  // ended before that took effect
+}
+
 [[noreturn]] void Work(const DrawingWork& inWork, const ZORFoundation::StopRequest& inStop,
                        SharedCounter& ioNext, const Pipe& inPipe) {
   int code = 0;
@@ -111,10 +118,14 @@ bool EndedWell(pid_t inProcess) {
 int DrawOnce(int inProcesses, const DrawingWork& inWork, const ZORFoundation::StopRequest& inStop,
              SharedCounter& ioNext, std::size_t& ioDone) {
   Pipe pipe;
+  const pid_t self = getpid();
   std::vector<pid_t> processes;
   for (int i = 0; i < inProcesses; ++i) {
     const pid_t process = fork();
-    if (process == 0) Work(inWork, inStop, ioNext, pipe);
+    if (process == 0) {
+      EndWith(self);
+      Work(inWork, inStop, ioNext, pipe);
+    }
     if (process > 0) processes.push_back(process);
   }
   if (processes.empty()) FailToStart();

@@ -3,25 +3,33 @@
 #define ZOR_TOOLKIT_PUBLISHING_PICTURESTORE_H
 
 #include <filesystem>
+#include <set>
 #include <string>
 #include <vector>
+
+#include "toolkit/publishing/WorkFolder.h"
 
 namespace ZORToolkit {
 
 /// Pictures appear whole or not at all, and a main one after its small ones, so one that is there is
-/// done. A stamp beside them says what
-/// they were drawn from. Raises std::filesystem::filesystem_error for what cannot be read or made.
+/// done. A stamp beside them says what they were drawn from and lists them: a picture that is not
+/// listed is somebody else's, and is neither replaced nor removed. Raises Error,
+/// ZORFoundation::FileError, and std::filesystem::filesystem_error for what cannot be read or made.
 class PictureStore {
  public:
   /// @param inPublication the publication's folder, which has or gets the folder "pictures".
   /// @param inEnding      of main pictures and previews: ".jpg" or ".png".
   PictureStore(const std::filesystem::path& inPublication, const std::string& inEnding);
 
-  const std::filesystem::path& Folder() const { return folder_; }
+  /// Where pictures are drawn, under the names that they will have.
+  const std::string& DrawingFolder() const { return work_.Path(); }
   /// Makes the folder ready. The pictures that are there stay only when they are to be gone on with
-  /// and were drawn from what the stamp says.
+  /// and were drawn from what the stamp says. Raises Error, with nothing changed, where somebody
+  /// else's picture stands in the place of one of these interferences.
   /// @return false when they were to stay and could not.
-  bool Prepare(const std::string& inStamp, bool inGoesOn) const;
+  bool Prepare(const std::string& inStamp, bool inGoesOn, const std::set<std::string>& inNumbers);
+  /// Lists, in order, the pictures that are there in the end.
+  void Settle(const std::string& inStamp) const;
 
   // Names within the folder
   std::string PictureName(int inNumber) const;
@@ -30,24 +38,24 @@ class PictureStore {
   /// The small pictures that are there beside a main one, in their order.
   std::vector<std::string> ThumbnailNames(int inNumber) const;
 
-  /// The name under which a main picture is drawn, and the small ones beside it.
-  std::string UnfinishedName(int inNumber) const;
-  /// Gives what was drawn its names.
+  /// Puts what was drawn in its place: a main picture with its small ones, or a preview.
   void Finish(int inNumber) const;
+  void FinishPreview(int inNumber, std::size_t inProduct) const;
 
   bool Has(const std::string& inName) const;
   /// The name if there is such a picture, as the page refers to it; else empty.
   std::string Reference(const std::string& inName) const;
 
  private:
-  std::vector<std::string> ThumbnailsBeside(const std::string& inStem) const;
+  std::vector<std::string> ThumbnailsIn(const std::filesystem::path& inFolder, int inNumber) const;
+  std::set<std::string> PicturesOf(const std::set<std::string>& inNumbers) const;
+  void WriteStamp(const std::string& inStamp, const std::set<std::string>& inNames) const;
+  void TakeOver(const std::vector<std::string>& inNames) const;
 
-  std::filesystem::path folder_;
+  std::filesystem::path shownFolder_, folder_;  // as given, absolute
   std::string ending_;
+  WorkFolder work_;
 };
-
-/// Removes what runs that were killed left unfinished in a publication's folder and its pictures'.
-void RemoveUnfinishedFiles(const std::filesystem::path& inPublication);
 
 }  // namespace ZORToolkit
 

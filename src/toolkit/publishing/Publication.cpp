@@ -13,6 +13,7 @@
 #include "toolkit/publishing/DrawingWorkers.h"
 #include "toolkit/publishing/PictureStore.h"
 #include "toolkit/publishing/PublishedFiles.h"
+#include "toolkit/publishing/WorkFolder.h"
 #include "toolkit/records/DocumentText.h"
 
 namespace fs = std::filesystem;
@@ -98,7 +99,7 @@ class Deviations {
   std::string whyMovedBack_;
 };
 
-/// Draws in the folder of the pictures, which is the current one: no text has to carry its path.
+/// Draws in the folder of unfinished pictures, which is the current one: no text has to carry its path.
 class PictureDrawing {
  public:
   PictureDrawing(int inNumber, const ResolvedInterference& inResolved, const PictureStore& inStore,
@@ -112,9 +113,9 @@ class PictureDrawing {
   void Draw() const {
     for (std::size_t i = 0; i < 2; ++i) DrawPreview(i);
     if (store_.Has(store_.PictureName(number_))) return;
-    PrintPictures::PrintListVisuToFile(
-        scene_.products[0], kFound, scene_.products[1], kFound, scene_.interference,
-        FromUtf8(store_.UnfinishedName(number_)), format_, size_.width, size_.height, 1, 0);
+    PrintPictures::PrintListVisuToFile(scene_.products[0], kFound, scene_.products[1], kFound,
+                                       scene_.interference, FromUtf8(store_.PictureName(number_)),
+                                       format_, size_.width, size_.height, 1, 0);
     store_.Finish(number_);
   }
 
@@ -127,6 +128,7 @@ class PictureDrawing {
     PrintPictures::PrintListVisuToFilePreview(scene_.products[inProduct], kFound, FromUtf8(name),
                                               format_, std::max(1, size_.width / 2),
                                               std::max(1, size_.height / 2), 1, 0);
+    store_.FinishPreview(number_, inProduct);
   }
 
   int number_;
@@ -167,12 +169,11 @@ class Publication {
   }
 
   Published Make(const std::function<ZORIProduct_var()>& inOpenModel) {
-    fs::create_directories(options_.folder);
-    RemoveUnfinishedFiles(options_.folder);
+    const WorkFolder work(options_.folder);
     Published made;
     if (!options_.model.empty()) made.failures = Draw(inOpenModel());
     EditResult();
-    WritePublishedFiles(options_, styleSheet_, result_, published_);
+    WritePublishedFiles(options_, styleSheet_, result_, published_, work.Path());
     made.page = Utf8(FromUtf8((fs::path(options_.folder) / kPageFile).string()));
     made.interferences = published_.interferences.size();
     for (const PublishedInterference& each : published_.interferences)
@@ -217,15 +218,20 @@ class Publication {
 
   /// @return how many interferences got no picture although the model has one of their products.
   std::size_t Draw(const ZORIProduct_var& inRoot) {
-    const PictureStore store(options_.folder,
-                             options_.format == PictureFormat::kPng ? ".png" : ".jpg");
+    PictureStore store(options_.folder, options_.format == PictureFormat::kPng ? ".png" : ".jpg");
     Resolve(inRoot);
-    if (!store.Prepare(Stamp(), options_.resume) && options_.warn)
-      options_.warn("the pictures that are there show something else: all are drawn");
     std::vector<std::size_t> wanted;
-    for (std::size_t n = 0; n < resolved_.size(); ++n)
-      if (resolved_[n].HasProduct()) wanted.push_back(n);
+    std::set<std::string> numbers;
+    for (std::size_t n = 0; n < resolved_.size(); ++n) {
+      if (!resolved_[n].HasProduct()) continue;
+      wanted.push_back(n);
+      numbers.insert(std::to_string(published_.interferences[n].number));
+    }
+    const std::string stamp = Stamp();
+    if (!store.Prepare(stamp, options_.resume, numbers) && options_.warn)
+      options_.warn("the pictures that are there show something else: all are drawn");
     if (!wanted.empty()) DrawInProcesses(options_.processes, WorkOn(wanted, store));
+    store.Settle(stamp);
     std::size_t failures = 0;
     for (const std::size_t n : wanted) failures += TakeReferences(n, store) ? 0 : 1;
     return failures;
@@ -237,7 +243,7 @@ class Publication {
     work.draw = [&](std::size_t inWantedIndex) {
       const std::size_t n = inWanted[inWantedIndex];
       try {
-        fs::current_path(inStore.Folder());
+        fs::current_path(inStore.DrawingFolder());
         PictureDrawing(published_.interferences[n].number, resolved_[n], inStore, options_).Draw();
       } catch (const std::exception&) {
         // Its picture is not there, which is what is looked for at the end.

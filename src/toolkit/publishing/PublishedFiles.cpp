@@ -19,6 +19,7 @@ namespace {
 constexpr char kReportFile[] = "report.xml";
 constexpr char kReportStyleSheet[] = "clash-report.xsl";
 constexpr char kReportType[] = "clash-report.dtd";
+constexpr std::uint64_t kMaxStyleSheetSize = std::uint64_t{64} << 20;
 
 /// Of the library that applies style sheets, loaded when the first one is.
 template <typename Function>
@@ -51,10 +52,10 @@ std::string FileNameOf(const PageStyleSheet& inSheet) {
 }
 
 void WriteReportFile(const ClashDocument& inDocument, const std::string& inStyleSheet,
-                     const std::string& inPath) {
+                     const std::string& inPath, const ZORFoundation::AtomicFileOptions& inOptions) {
   Prologue prologue;
   prologue.styleSheet = inStyleSheet;
-  ZORFoundation::AtomicFile file(inPath);
+  ZORFoundation::AtomicFile file(inPath, inOptions);
   if (FAILED(WriteReport(inDocument, prologue, file.Temporary().Utf8Path())))
     throw Error(inPath + ": the file could not be written");
   file.Commit();
@@ -65,7 +66,10 @@ void WriteReportFile(const ClashDocument& inDocument, const std::string& inStyle
 PageStyleSheet::PageStyleSheet(const std::string& inPath)
     : path(inPath.empty() ? StyleSheetOfSetting() : inPath) {
   if (path.empty()) return;
-  text = ZORFoundation::ReadWholeFile(path).bytes;
+  ZORFoundation::ReadOptions limit;
+  limit.maxSize = kMaxStyleSheetSize;
+  text = ZORFoundation::ReadWholeFile(path, limit).bytes;
+  if (text.empty()) throw Error(path + ": the style sheet is empty");
   const std::string name = FileNameOf(*this);
   if (name == kReportFile || name == kPageFile || name == kReportType)
     throw Error(path + ": a style sheet of this name would take the place of another");
@@ -73,20 +77,24 @@ PageStyleSheet::PageStyleSheet(const std::string& inPath)
 }
 
 void WritePublishedFiles(const PublicationOptions& inOptions, const PageStyleSheet& inSheet,
-                         const ClashDocument& inDocument, const PublishedResult& inPublished) {
+                         const ClashDocument& inDocument, const PublishedResult& inPublished,
+                         const std::string& inWorkFolder) {
+  ZORFoundation::AtomicFileOptions written;
+  written.temporaryFolder = inWorkFolder;
   const std::string folder = inOptions.folder + "/", styleSheet = FileNameOf(inSheet);
-  WriteReportFile(inDocument, styleSheet, folder + kReportFile);
+  WriteReportFile(inDocument, styleSheet, folder + kReportFile, written);
   ZORFoundation::WriteWholeFile(folder + kReportType,
-                                PageFunction<ShippedTextFunction>(kReportTypeName)());
+                                PageFunction<ShippedTextFunction>(kReportTypeName)(), written);
   ZORFoundation::WriteWholeFile(folder + styleSheet,
                                 inSheet.path.empty()
                                     ? PageFunction<ShippedTextFunction>(kReportStyleSheetName)()
-                                    : inSheet.text);
+                                    : inSheet.text,
+                                written);
   const std::string name = inSheet.path.empty() ? "clash-page.xsl" : inSheet.path;
   const Page page = MakePage({AnnotatedReport(inDocument, inPublished), inSheet.text, name});
   if (!page.messages.empty() && inOptions.warn)
     inOptions.warn(name + ": " + page.messages.substr(0, page.messages.find('\n')));
-  ZORFoundation::WriteWholeFile(folder + kPageFile, page.bytes);
+  ZORFoundation::WriteWholeFile(folder + kPageFile, page.bytes, written);
 }
 
 }  // namespace ZORToolkit

@@ -21,9 +21,11 @@ struct PageStyleSheet {
   std::string text;
 };
 
-/// Writes report, page and what they need. Raises Error.
+/// Writes report, page and what they need. Raises Error and ZORFoundation::FileError.
+/// @param inWorkFolder where files are until they are whole.
 void WritePublishedFiles(const PublicationOptions& inOptions, const PageStyleSheet& inSheet,
-                         const ClashDocument& inDocument, const PublishedResult& inPublished);
+                         const ClashDocument& inDocument, const PublishedResult& inPublished,
+                         const std::string& inWorkFolder);
 
 }  // namespace ZORToolkit
 

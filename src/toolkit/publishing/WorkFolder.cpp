@@ -1,0 +1,77 @@
+#include "toolkit/publishing/WorkFolder.h"
+
+#include <fcntl.h>
+#include <sys/file.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <chrono>
+#include <thread>
+#include <vector>
+
+#include "foundation/FileError.h"
+#include "toolkit/Error.h"
+
+namespace fs = std::filesystem;
+
+namespace ZORToolkit {
+namespace {
+
+constexpr char kWorkFolder[] = ".lyra-unfinished";
+constexpr char kLockFile[] = "lock";
+
+/// Whoever ends removes the lock, so a file that was locked may be no longer the one of its name.
+bool IsStillThere(int inDescriptor, const std::string& inPath) {
+  struct stat here {
+  }, there{};
+  return fstat(inDescriptor, &here) == 0 && stat(inPath.c_str(), &there) == 0 &&
+         here.st_ino == there.st_ino && here.st_dev == there.st_dev;
+}
+
+}  // namespace
+
+WorkFolder::WorkFolder(const fs::path& inFolder)
+    : path_(fs::absolute(inFolder / kWorkFolder).string()), lockPath_(path_ + "/" + kLockFile) {
+  fs::create_directories(inFolder);
+  Lock(inFolder);
+  removeLock_.emplace(lockPath_.c_str());
+  removeFolder_.emplace(path_.c_str());
+  RemoveFiles();
+}
+
+WorkFolder::~WorkFolder() {
+  try {
+    RemoveFiles();
+  } catch (const std::exception&) {
+    // The next run tries again.
+  }
+  unlink(lockPath_.c_str());  // while it is locked
+  rmdir(path_.c_str());
+}
+
+// Waits a moment, since the drawing processes of one that was killed end a little after it.
+void WorkFolder::Lock(const fs::path& inFolder) {
+  using Clock = std::chrono::steady_clock;
+  const auto end = Clock::now() + std::chrono::milliseconds(500);
+  for (;; std::this_thread::sleep_for(std::chrono::milliseconds(10))) {
+    fs::create_directory(path_);
+    lock_ = ZORFoundation::Descriptor(
+        open(lockPath_.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK, 0666));
+    const bool isLocked = lock_.IsOpen() && flock(lock_.Get(), LOCK_EX | LOCK_NB) == 0;
+    if (isLocked && IsStillThere(lock_.Get(), lockPath_)) return;
+    if (!isLocked && errno != EWOULDBLOCK && errno != ENOENT)
+      throw ZORFoundation::FileError(lockPath_, errno);
+    if (Clock::now() > end)
+      throw Error(inFolder.string() + ": another lyra publishes into this folder");
+  }
+}
+
+void WorkFolder::RemoveFiles() const {
+  std::vector<fs::path> files;
+  for (const fs::directory_entry& entry : fs::directory_iterator(path_))
+    if (entry.path() != lockPath_) files.push_back(entry.path());
+  for (const fs::path& file : files) fs::remove(file);
+}
+
+}  // namespace ZORToolkit
