@@ -115,12 +115,21 @@ TEST(LinksCheck, EachProblemIsNamed) {
   ASSERT_EQ(said.size(), 8u);
   EXPECT_EQ(said[0], "ok");
   EXPECT_EQ(said[1], "missing");
-  EXPECT_THAT(said[2], StartsWith("unreadable: "));
+  EXPECT_THAT(said[2], testing::ContainsRegex("^unreadable: [^ ]"));
   EXPECT_EQ(said[3], "wrong kind: a component list");
   EXPECT_EQ(said[4], "listed twice");
   EXPECT_EQ(said[5], "missing: the link is empty");
   EXPECT_EQ(said[6], "missing: unknown logical name");
   EXPECT_EQ(said[7], "ok");
+}
+
+TEST(LinksCheck, ReasonOfWhatIsNoFileIsNamed) {
+  const Project project;
+  project.Write("all.xml", Linking("<Element Link='/dev/null'/><Element Link='loop.xml'/>"));
+  RunShell("ln -s loop.xml " + project.Path("loop.xml"));
+  EXPECT_THAT(project.Check("all.xml", 1),
+              testing::ElementsAre(StartsWith("unreadable: is not a regular file"),
+                                   "unreadable: Too many levels of symbolic links"));
 }
 
 TEST(LinksCheck, SoundDocumentEndsWell) {

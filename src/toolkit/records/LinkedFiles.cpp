@@ -32,16 +32,16 @@ std::string WithSlashes(std::string inPath) {
 
 std::string WhatIsWrongWith(const std::string& inPath) {
   if (inPath.empty()) return "missing: unknown logical name";
-  std::error_code ignored;
-  if (!fs::exists(inPath, ignored)) return "missing";
+  std::error_code error;  // such as a loop of links, which opening the file names
+  if (!fs::exists(inPath, error) && !error) return "missing";
   try {
     const ClashDocument document(inPath);
     return document.HasInterferences() ? ""
                                        : std::string("wrong kind: ") + Description(document.Kind());
-  } catch (const Error& error) {
-    const std::string reason = error.what();
-    return "unreadable: " +
-           (reason.starts_with(inPath) ? reason.substr(inPath.size() + 1) : reason);
+  } catch (const Error& failure) {
+    std::string reason = failure.what();
+    if (reason.starts_with(inPath + ":")) reason.erase(0, inPath.size() + 1);
+    return "unreadable: " + reason.substr(std::min(reason.size(), reason.find_first_not_of(' ')));
   }
 }
 
