@@ -43,6 +43,10 @@ TEST(Usage, VersionIsPrinted) {
 
 TEST(Usage, NothingAtAllIsWrong) { ExpectWrongUsage({}, "a verb is missing"); }
 TEST(Usage, UnknownVerbIsWrong) { ExpectWrongUsage({"inform"}, "unknown verb \"inform\""); }
+TEST(Usage, UnknownVerbWithHelpIsWrong) {
+  ExpectWrongUsage({"inform", "--help"}, "unknown verb \"inform\"");
+  ExpectWrongUsage({"--help", "inform"}, "unknown verb \"inform\"");
+}
 TEST(Usage, UnknownOptionIsWrong) { ExpectWrongUsage({"--fast"}, "unknown option \"--fast\""); }
 TEST(Usage, MissingFileArgumentIsWrong) { ExpectWrongUsage({"list"}, "list: FILE is required"); }
 
@@ -53,6 +57,19 @@ TEST(Usage, UnknownOptionOfAVerbIsWrong) {
 
 TEST(Usage, NumberThatIsNoneIsWrong) {
   ExpectWrongUsage({"show", "samples/as1.clash.xml", "one"}, "show: Could not convert: N = one");
+}
+
+TEST(Usage, EmptyNameOfAFileIsWrong) {
+  for (const std::string option : {"--model", "--xsl"})
+    ExpectWrongUsage({"publish", "-o", "nowhere", "samples/as1.clash.xml", option, ""},
+                     "publish: " + option + ": must not be empty");
+}
+
+TEST(Usage, LimitThatIsNoneIsWrong) {
+  for (const std::string option : {"--limit-time", "--limit-memory"})
+    for (const char* limit : {"0", "-1", "1000001"})
+      ExpectWrongUsage({"tree", "samples/as1-oc-214.stp", option, limit},
+                       option + ": 1 to 1000000");
 }
 
 TEST(Usage, UnknownFormatIsWrong) {

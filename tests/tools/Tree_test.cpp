@@ -235,3 +235,34 @@ TEST(HeavyLibraries, TreeLoadsNoneSinceModelsAreReadByAnotherProcess) {
   for (const char* heavy : {"libZORRayCaster", "libTK", "libembree"})
     EXPECT_THAT(libraries, Not(HasSubstr(heavy)));
 }
+
+// Limits
+
+TEST(Tree, ModelThatTakesTooMuchIsOneLine) {
+  const CommandResult result =
+      RunShell("XDG_CACHE_HOME=/dev/null lyra tree --limit-memory 1 " + kModel);
+  EXPECT_EQ(result.code, 1);
+  EXPECT_EQ(result.out, "");
+  EXPECT_THAT(result.error, MatchesRegex("lyra: " + kModel + ": takes more than 1 MB to read; .*\n"));
+}
+
+TEST(Tree, StrictRefusesADamagedModel) {
+  const TemporaryDirectory directory;
+  const std::string model = directory.Path("a.stp");
+  RunShell("sed 5895d " + kModel + " > " + model);  // a point of an edge
+  const std::string damage = model + ": is damaged: 4 entities of the file could not be built\n";
+  const CommandResult lenient = RunWithCache({"tree", model});
+  EXPECT_EQ(lenient.code, 0);
+  EXPECT_THAT(lenient.error, HasSubstr("lyra: warning: " + damage));
+  for (const char* verb : {"tree", "render", "publish"}) {
+    std::vector<std::string> words = {verb, "--strict"};
+    if (verb == std::string("publish"))
+      words.insert(words.end(), {"samples/as1.clash.xml", "--model"});
+    words.push_back(model);
+    if (verb != std::string("tree"))
+      words.insert(words.end(), {"-o", directory.Path(verb + std::string(".png"))});
+    const CommandResult strict = RunWithCache(words);
+    EXPECT_EQ(strict.code, 1) << verb;
+    EXPECT_EQ(strict.error, "lyra: " + damage) << verb;
+  }
+}

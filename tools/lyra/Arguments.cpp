@@ -47,6 +47,15 @@ void Arguments::RequiredText(const char* inNames, const char* inValue, std::stri
   app_.add_option(inNames, outText, inHelp)->required()->type_name(inValue);
 }
 
+void Arguments::NonEmptyText(const char* inNames, const char* inValue, std::string& outText,
+                             const char* inHelp) {
+  Text(inNames, inValue, outText, inHelp);
+  const std::string name = inNames;
+  app_.get_option(name.substr(name.rfind(',') + 1))
+      ->check(CLI::Validator(
+          [](std::string& inText) { return inText.empty() ? "must not be empty" : ""; }, ""));
+}
+
 void Arguments::Number(const char* inNames, const char* inValue,
                        std::optional<long long>& outNumber, const char* inHelp) {
   app_.add_option(inNames, outNumber, inHelp)->type_name(inValue);

@@ -44,6 +44,9 @@ class Arguments {
                 const char* inHelp);
   void RequiredText(const char* inNames, const char* inValue, std::string& outText,
                     const char* inHelp);
+  /// One that is given must not be empty, as for files.
+  void NonEmptyText(const char* inNames, const char* inValue, std::string& outText,
+                    const char* inHelp);
   void Number(const char* inNames, const char* inValue, std::optional<long long>& outNumber,
               const char* inHelp);
   /// The language of the message catalogues, for verbs that translate words of documents.

@@ -40,6 +40,14 @@ std::string UsageReason(const CLI::App& inApp, const CLI::ParseError& inError) {
   return (isOption ? "unknown option \"" : "unknown verb \"") + unread.front() + "\"";
 }
 
+/// Before a verb only options may stand, also where help is asked for. @return empty without one.
+std::string WordInPlaceOfVerb(const CLI::App& inApp) {
+  if (!inApp.get_subcommands().empty()) return {};
+  for (const std::string& word : inApp.remaining())
+    if (!word.starts_with('-')) return word;
+  return {};
+}
+
 int Act(const std::vector<DeclaredVerb>& inVerbs, Output& ioOutput) {
   for (const DeclaredVerb& verb : inVerbs)
     if (verb.app->parsed()) return verb.act(ioOutput);
@@ -52,6 +60,8 @@ int ParseAndAct(int inCount, char** inArguments, Output& ioOutput) {
   try {
     app.parse(inCount, inArguments);
   } catch (const CLI::CallForHelp&) {
+    if (const std::string word = WordInPlaceOfVerb(app); !word.empty())
+      return ComplainOfUsage("unknown verb \"" + word + "\"");
     ioOutput.Write(app.help());
     return 0;
   } catch (const CLI::CallForVersion& version) {

@@ -7,6 +7,7 @@
 
 #include "default_platform/OpenModel.h"
 #include "foundation/Vector3.h"
+#include "lyra/Arguments.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/terminal/Progress.h"
 #include "toolkit/records/DocumentText.h"
@@ -90,10 +91,33 @@ Quaternion QuaternionOf(const double* inColumns) {
 
 }  // namespace
 
-ZORDefault::OpenedModel OpenModelFile(const std::string& inPath) {
+void ModelReading::Declare(Arguments& ioArguments) {
+  ioArguments.Number("--limit-time", "SECONDS", seconds,
+                     "Processor time that reading the model may take (default: by its size)");
+  ioArguments.Number("--limit-memory", "MB", megabytes,
+                     "Memory that reading the model may take (default: by its size)");
+  ioArguments.Flag("--strict", isStrict,
+                   "Refuse a model of which something cannot be read, instead of a warning");
+}
+
+void ModelReading::Check() const {
+  constexpr long long kMost = 1'000'000;
+  const auto check = [](const char* inOption, const std::optional<long long>& inLimit) {
+    if (inLimit && (*inLimit < 1 || *inLimit > kMost))
+      throw UsageError(std::string(inOption) + ": 1 to " + std::to_string(kMost));
+  };
+  check("--limit-time", seconds);
+  check("--limit-memory", megabytes);
+}
+
+ZORDefault::OpenedModel OpenModelFile(const std::string& inPath, const ModelReading& inReading) {
+  inReading.Check();
   if (inPath == "-") throw InputError("-: a model cannot be read from standard input");
   ProgressLine progress("reading " + inPath);
   ZORDefault::ModelOptions options;
+  options.isStrict = inReading.isStrict;
+  options.maxSeconds = static_cast<double>(inReading.seconds.value_or(0));
+  options.maxMemory = static_cast<std::uint64_t>(inReading.megabytes.value_or(0)) << 20;
   options.progress = [&](double inDone) { progress.Show(inDone); };
   options.warn = [&](const std::string& inWarning) { progress.Warn(inWarning); };
   try {

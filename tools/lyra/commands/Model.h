@@ -16,10 +16,22 @@
 
 namespace lyra {
 
+class Arguments;
+
+/// How a model is read, for the verbs that open one.
+struct ModelReading {
+  std::optional<long long> seconds, megabytes;  ///< nothing: by the size of the file
+  bool isStrict = false;
+
+  void Declare(Arguments& ioArguments);
+  /// Raises UsageError for a limit that is none.
+  void Check() const;
+};
+
 /// Opens a model. What was mended or left out is told on standard error, progress too when that is
 /// a terminal. Raises InputError with the reason for what cannot be opened, and for "-": a model is
 /// always a file.
-ZORDefault::OpenedModel OpenModelFile(const std::string& inPath);
+ZORDefault::OpenedModel OpenModelFile(const std::string& inPath, const ModelReading& inReading);
 
 /// A product on the way from the root to the one that is visited.
 struct ProductLevel {

@@ -26,6 +26,7 @@ struct PublishOptions {
   std::vector<std::string> only;
   std::optional<long long> jobs;
   bool resume = false;
+  ModelReading reading;
 };
 
 int ProcessCount(const PublishOptions& inOptions) {
@@ -55,6 +56,7 @@ PublicationOptions ToolkitOptions(const PublishOptions& inOptions) {
 
 int Publish(const PublishOptions& inOptions, Output& ioOutput) {
   PublicationOptions options = ToolkitOptions(inOptions);
+  inOptions.reading.Check();
   ChooseLanguage(inOptions.language);
   ClashDocument document(inOptions.file);
   options.warn = [](const std::string& inWarning) {
@@ -65,7 +67,7 @@ int Publish(const PublishOptions& inOptions, Output& ioOutput) {
     std::optional<DrawingProgress> progress;
     options.drawn = [&](std::size_t inDone, std::size_t inAll) { progress->Show(inDone, inAll); };
     made = ZORToolkit::Publish(document, options, [&] {
-      const ZORIProduct_var root = OpenModelFile(inOptions.model).root;
+      const ZORIProduct_var root = OpenModelFile(inOptions.model, inOptions.reading).root;
       progress.emplace();
       return root;
     });
@@ -85,8 +87,8 @@ VerbAction DeclarePublish(Arguments& ioArguments) {
   ioArguments.Positional("RESULT", options->file, "A clash result, or - for standard input");
   ioArguments.RequiredText("-o,--output", "DIR", options->directory,
                            "The folder that gets the page, the report and the pictures");
-  ioArguments.Text("--model", "MODEL", options->model,
-                   "The model that the pictures show: a STEP, IGES, glTF, OBJ or STL file");
+  ioArguments.NonEmptyText("--model", "MODEL", options->model,
+                           "The model that the pictures show: a STEP, IGES, glTF, OBJ or STL file");
   ioArguments.Texts("--only", "CONDITIONS", options->only,
                     "Only some, such as type=clash,status=relevant; also result= and product=");
   ioArguments.Text("--size", "WxH", options->size,
@@ -100,11 +102,13 @@ VerbAction DeclarePublish(Arguments& ioArguments) {
   ioArguments.Text("--positions", "WHOSE", options->positions,
                    "Where products stand in pictures: as the result (default) or the model says");
   ioArguments.Words("--positions", kPositions);
-  ioArguments.Text("--xsl", "FILE", options->styleSheet,
-                   "A style sheet of your own for the page (default: the setting XslTemplate)");
+  ioArguments.NonEmptyText(
+      "--xsl", "FILE", options->styleSheet,
+      "A style sheet of your own for the page (default: the setting XslTemplate)");
   ioArguments.Number("--jobs", "N", options->jobs,
                      "Processes that draw (default: as many as processors)");
   ioArguments.Flag("--resume", options->resume, "Keep the pictures of a run that was ended early");
+  options->reading.Declare(ioArguments);
   ioArguments.Language(options->language);
   return [options](Output& ioOutput) { return Publish(*options, ioOutput); };
 }

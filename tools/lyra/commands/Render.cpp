@@ -22,6 +22,7 @@ struct RenderOptions {
   std::string file, picture, size, view = "iso";
   std::vector<std::string> products;
   bool keepBackground = false;
+  ModelReading reading;
 };
 
 /// The products of an alias, from the root on.
@@ -96,8 +97,9 @@ int Render(const RenderOptions& inOptions, Output& ioOutput) {
   picture.view = ViewOf(inOptions.view);
   picture.keepsBackground = inOptions.keepBackground;
   if (!inOptions.size.empty()) picture.size = SizeOf(inOptions.size);
+  inOptions.reading.Check();
   { const OutputFile probe(inOptions.picture); }  // fails at once where nothing can be written
-  const ZORIProduct_var root = OpenModelFile(inOptions.file).root;
+  const ZORIProduct_var root = OpenModelFile(inOptions.file, inOptions.reading).root;
   Scene scene;
   Fill(scene, inOptions, root);
   OutputFile file(inOptions.picture);
@@ -125,6 +127,7 @@ VerbAction DeclareRender(Arguments& ioArguments) {
   ioArguments.Words("--view", kViewWords);
   ioArguments.Flag("--keep-background", options->keepBackground,
                    "A soft gradient behind the products instead of white");
+  options->reading.Declare(ioArguments);
   return [options](Output& ioOutput) { return Render(*options, ioOutput); };
 }
 

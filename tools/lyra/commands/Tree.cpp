@@ -19,6 +19,7 @@ struct TreeOptions {
   std::string file;
   std::optional<long long> depth;
   bool json = false, leaves = false;
+  ModelReading reading;
 };
 
 // The lines that lead to a product, then its alias.
@@ -102,7 +103,7 @@ int Tree(const TreeOptions& inOptions, Output& ioOutput) {
   if (inOptions.depth.value_or(0) < 0) throw UsageError("tree: --depth cannot be negative");
   if (inOptions.leaves && inOptions.depth)
     throw UsageError("tree: --depth and --leaves exclude each other");
-  const ZORIProduct_var root = OpenModelFile(inOptions.file).root;
+  const ZORIProduct_var root = OpenModelFile(inOptions.file, inOptions.reading).root;
   const std::size_t depth =
       inOptions.depth ? static_cast<std::size_t>(*inOptions.depth) : kAllLevels;
   if (inOptions.leaves)
@@ -121,6 +122,7 @@ VerbAction DeclareTree(Arguments& ioArguments) {
   ioArguments.Flag("--leaves", options->leaves,
                    "Only products that carry geometry, by their paths from below the root");
   ioArguments.Flag("--json", options->json, "Print all of it as JSON");
+  options->reading.Declare(ioArguments);
   return [options](Output& ioOutput) { return Tree(*options, ioOutput); };
 }
 
