@@ -226,6 +226,29 @@ TEST_F(AtomicFileTest, LinkInACircleIsRefusedAndStays) {
   EXPECT_TRUE(fs::is_symlink(Path("one")));
 }
 
+TEST_F(AtomicFileTest, TemporaryFolderHoldsTheNewFileUntilCommit) {
+  fs::create_directory(Path("work"));
+  ZORFoundation::AtomicFileOptions options;
+  options.temporaryFolder = Path("work");
+  AtomicFile file(Path("a"), options);
+  file.Write("new");
+  EXPECT_EQ(NamesIn(Path("work")).size(), 1u);
+  ExpectNames({"work"});
+  file.Commit();
+  EXPECT_TRUE(fs::is_empty(Path("work")));
+  EXPECT_EQ(ReadFile(Path("a")), "new");
+}
+
+TEST_F(AtomicFileTest, TemporaryFolderIsNotForWhatALinkLeadsTo) {
+  for (const char* folder : {"work", "real"}) fs::create_directory(Path(folder));
+  fs::create_symlink("real/a", Path("link"));
+  ZORFoundation::AtomicFileOptions options;
+  options.temporaryFolder = Path("work");
+  const AtomicFile file(Path("link"), options);
+  EXPECT_EQ(NamesIn(Path("real")).size(), 1u);
+  EXPECT_TRUE(fs::is_empty(Path("work")));
+}
+
 TEST_F(AtomicFileTest, DeviceIsWrittenIntoAndStays) {
   if (geteuid() != 0) GTEST_SKIP() << "making a device is for root";
   constexpr dev_t kNull = 0x103;  // what /dev/null is

@@ -39,6 +39,35 @@ TEST(TerminationSignals, InterruptLeavesNoUnfinishedFile) { ExpectNothingLeftBy(
 TEST(TerminationSignals, TerminationLeavesNoUnfinishedFile) { ExpectNothingLeftBy(SIGTERM); }
 TEST(TerminationSignals, ClosedTerminalLeavesNoUnfinishedFile) { ExpectNothingLeftBy(SIGHUP); }
 
+TEST(TerminationSignals, FolderGoesWithItsUnfinishedFiles) {
+  const TemporaryFolder folder;
+  const std::string work = folder.FilePath("work");
+  EXPECT_EXIT(
+      {
+        HandleTerminationSignals();
+        const RemoveOnSignal removeFolder(work.c_str());
+        std::filesystem::create_directory(work);
+        const AtomicFile file(work + "/report.xml");
+        raise(SIGTERM);
+      },
+      testing::KilledBySignal(SIGTERM), "");
+  EXPECT_TRUE(std::filesystem::is_empty(folder.path));
+}
+
+TEST(TerminationSignals, FolderThatHoldsMoreStays) {
+  const TemporaryFolder folder;
+  const std::string work = folder.FilePath("work");
+  std::filesystem::create_directories(work + "/more");
+  EXPECT_EXIT(
+      {
+        HandleTerminationSignals();
+        const RemoveOnSignal removeFolder(work.c_str());
+        raise(SIGTERM);
+      },
+      testing::KilledBySignal(SIGTERM), "");
+  EXPECT_TRUE(std::filesystem::exists(work + "/more"));
+}
+
 TEST(TerminationSignals, FinishedFileStays) {
   const TemporaryFolder folder;
   EXPECT_EXIT(
