@@ -243,7 +243,17 @@ TEST(Tree, ModelThatTakesTooMuchIsOneLine) {
       RunShell("XDG_CACHE_HOME=/dev/null lyra tree --limit-memory 1 " + kModel);
   EXPECT_EQ(result.code, 1);
   EXPECT_EQ(result.out, "");
-  EXPECT_THAT(result.error, MatchesRegex("lyra: " + kModel + ": takes more than 1 MB to read; .*\n"));
+  EXPECT_THAT(result.error,
+              MatchesRegex("lyra: " + kModel + ": takes more than 1 MB to read; .*\n"));
+}
+
+TEST(Tree, LimitOfTheSettingsHoldsWhereNoneIsGiven) {
+  const TemporaryDirectory directory;
+  directory.Write("ModelReading.toml", "LimitMemory = 1\n");
+  const std::string tree =
+      "XDG_CACHE_HOME=/dev/null ZOR_SETTINGS_PATH=" + directory.Path("") + " lyra tree " + kModel;
+  EXPECT_THAT(RunShell(tree).error, HasSubstr("takes more than 1 MB to read"));
+  EXPECT_EQ(RunShell(tree + " --limit-memory 1000").error, "");
 }
 
 TEST(Tree, StrictRefusesADamagedModel) {

@@ -10,6 +10,7 @@
 #include "lyra/Arguments.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/terminal/Progress.h"
+#include "platform/system/ZORSettingRepository.h"
 #include "toolkit/records/DocumentText.h"
 
 namespace lyra {
@@ -89,6 +90,15 @@ Quaternion QuaternionOf(const double* inColumns) {
   return turn;
 }
 
+/// A limit that is not given is the setting's, if that is one. @return 0 without either.
+long long LimitOf(const std::optional<long long>& inGiven, const char* inSetting) {
+  if (inGiven) return *inGiven;
+  int limit = 0;
+  ZORSettingRepository* const settings = ZORSettingRepository::GetRepository("ModelReading");
+  if (settings == nullptr || FAILED(settings->ReadSetting(inSetting, &limit, 1))) return 0;
+  return std::max(0, limit);
+}
+
 }  // namespace
 
 void ModelReading::Declare(Arguments& ioArguments) {
@@ -116,8 +126,8 @@ ZORDefault::OpenedModel OpenModelFile(const std::string& inPath, const ModelRead
   ProgressLine progress("reading " + inPath);
   ZORDefault::ModelOptions options;
   options.isStrict = inReading.isStrict;
-  options.maxSeconds = static_cast<double>(inReading.seconds.value_or(0));
-  options.maxMemory = static_cast<std::uint64_t>(inReading.megabytes.value_or(0)) << 20;
+  options.maxSeconds = static_cast<double>(LimitOf(inReading.seconds, "LimitTime"));
+  options.maxMemory = static_cast<std::uint64_t>(LimitOf(inReading.megabytes, "LimitMemory")) << 20;
   options.progress = [&](double inDone) { progress.Show(inDone); };
   options.warn = [&](const std::string& inWarning) { progress.Warn(inWarning); };
   try {

@@ -20,7 +20,7 @@ class Arguments;
 
 /// How a model is read, for the verbs that open one.
 struct ModelReading {
-  std::optional<long long> seconds, megabytes;  ///< nothing: by the size of the file
+  std::optional<long long> seconds, megabytes;  ///< nothing: the settings, else by its size
   bool isStrict = false;
 
   void Declare(Arguments& ioArguments);
