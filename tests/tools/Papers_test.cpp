@@ -118,8 +118,9 @@ Words InFish(const std::string& inLine) {
 TEST(Help, TellsVerbsAndOptionsToTheseTests) {
   EXPECT_THAT(Verbs(), IsSupersetOf({"info", "list", "publish", "filename"}));
   EXPECT_THAT(OptionsOf(""), ElementsAre("--help", "--lang", "--version", "-h"));
-  EXPECT_THAT(OptionsOf("render"), ElementsAre("--help", "--keep-background", "--output",
-                                               "--product", "--size", "--view", "-h", "-o"));
+  EXPECT_THAT(OptionsOf("render"),
+              ElementsAre("--help", "--keep-background", "--limit-memory", "--limit-time",
+                          "--output", "--product", "--size", "--strict", "--view", "-h", "-o"));
 }
 
 TEST(ManualPage, HasTheUsualSectionsInTheirOrder) {
