@@ -143,8 +143,12 @@ void ExpectAgreement(const std::string& inPath, int inStride = 1) {
       if (judgement.thickness > 2 * options.tolerance) {
         EXPECT_EQ(interference.kind, Kind::kClash) << judgement.volume;
       }
-      if (judgement.volume == 0) EXPECT_EQ(interference.kind, Kind::kContact) << interference.value;
-      if (interference.kind == Kind::kClash) EXPECT_GT(judgement.volume, 0) << interference.value;
+      if (judgement.volume == 0) {
+        EXPECT_EQ(interference.kind, Kind::kContact) << interference.value;
+      }
+      if (interference.kind == Kind::kClash) {
+        EXPECT_GT(judgement.volume, 0) << interference.value;
+      }
     }
   EXPECT_GT(near, 0);
 }
