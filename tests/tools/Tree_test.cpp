@@ -239,6 +239,9 @@ TEST(HeavyLibraries, TreeLoadsNoneSinceModelsAreReadByAnotherProcess) {
 // Limits
 
 TEST(Tree, ModelThatTakesTooMuchIsOneLine) {
+#ifdef __SANITIZE_ADDRESS__
+  GTEST_SKIP() << "the address sanitizer needs the address space that would be limited";
+#endif
   const CommandResult result =
       RunShell("XDG_CACHE_HOME=/dev/null lyra tree --limit-memory 1 " + kModel);
   EXPECT_EQ(result.code, 1);
@@ -248,6 +251,9 @@ TEST(Tree, ModelThatTakesTooMuchIsOneLine) {
 }
 
 TEST(Tree, LimitOfTheSettingsHoldsWhereNoneIsGiven) {
+#ifdef __SANITIZE_ADDRESS__
+  GTEST_SKIP() << "the address sanitizer needs the address space that would be limited";
+#endif
   const TemporaryDirectory directory;
   directory.Write("ModelReading.toml", "LimitMemory = 1\n");
   const std::string tree =
