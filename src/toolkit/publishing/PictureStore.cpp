@@ -36,7 +36,7 @@ struct Stamp {
 std::optional<Stamp> ReadStamp(const fs::path& inPath) {
   const auto file = ZORFoundation::TryReadWholeFile(inPath.string());
   if (!file) return std::nullopt;
-  const std::size_t start = file->bytes.find("\n" + std::string(kListStart));
+  const std::size_t start = file->bytes.find(std::string(1, '\n').append(kListStart));
   if (start == std::string::npos) return Stamp{file->bytes, std::nullopt};
   Stamp stamp{file->bytes.substr(0, start + 1), std::set<std::string>()};
   std::istringstream lines(file->bytes.substr(start + 1));
@@ -49,7 +49,7 @@ std::optional<Stamp> ReadStamp(const fs::path& inPath) {
 /// A line feed comes first, so that a line that was cut off spoils none but itself.
 std::string ListText(const std::vector<std::string>& inNames) {
   std::string text;
-  for (const std::string& name : inNames) text += "\n" + name;
+  for (const std::string& name : inNames) text.append(1, '\n').append(name);
   return text;
 }
 
