@@ -47,9 +47,9 @@ constexpr std::u16string_view ReplacementOf(char16_t inUnit) {
 template <TextConverter kConverter>
 constexpr bool IsReplaced(char16_t inUnit) {
   return [inUnit]<std::size_t... kRow>(std::index_sequence<kRow...>) {
-    return ((!kCharacterRows[kRow].replacement[kConverter].empty() &
-             (kCharacterRows[kRow].character == inUnit)) |
-            ...);
+    return ((int{!kCharacterRows[kRow].replacement[kConverter].empty()} &
+             int{kCharacterRows[kRow].character == inUnit}) |
+            ...) != 0;
   }
   (std::make_index_sequence<kCharacterRows.size()>());
 }

@@ -97,6 +97,7 @@ class SpawnRequest {
     posix_spawnattr_setsigmask(&attributes_, &signals);
     posix_spawnattr_setflags(&attributes_, POSIX_SPAWN_SETSIGDEF | POSIX_SPAWN_SETSIGMASK);
     std::vector<char*> arguments;
+    arguments.reserve(inArguments.size() + 1);
     for (const std::string& argument : inArguments)
       arguments.push_back(const_cast<char*>(argument.c_str()));
     arguments.push_back(nullptr);

@@ -12,7 +12,7 @@ namespace {
 
 using ZORFoundation::Length;
 using ZORFoundation::Lerp;
-using ZORFoundation::operator-;
+using ZORFoundation::operator-;  // NOLINT(misc-unused-using-decls): used, through a concept
 
 bool IsFinite(const ZOR3DBoundingSphere& inSphere) {
   return ZORFoundation::IsFinite(inSphere.centre) && std::isfinite(inSphere.radius);

@@ -17,7 +17,7 @@ struct ZOR3DBoundingSphere {
  private:
 #endif
   ZORMathVector centre;
-  double radius = -1;
+  [[maybe_unused]] double radius = -1;
 };
 
 #endif

@@ -509,8 +509,9 @@ void BodyPair::CollectDeep(std::size_t inSide, std::vector<gp_XYZ>& outStarts) {
   for (const auto& [depth, point] : found) {
     if (outStarts.size() >= 2 || depth < 0.8 * found.front().first) break;
     const gp_XYZ common = Moved(self.commonFromThis, point);
+    const double apart = 0.5 * depth;
     const bool isNew = std::ranges::all_of(
-        outStarts, [&](const gp_XYZ& start) { return (start - common).Modulus() > 0.5 * depth; });
+        outStarts, [&](const gp_XYZ& start) { return (start - common).Modulus() > apart; });
     if (isNew) outStarts.push_back(common);
   }
 }

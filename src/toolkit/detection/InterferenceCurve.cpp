@@ -8,9 +8,8 @@ namespace {
 
 constexpr int kMaxSteps = 12;
 constexpr std::size_t kMaxCurvePoints = 200;
-constexpr int kPieces = 4;           // of a chord of a border
-constexpr int kHalvings = 20;        // of a piece at the end of a border
-constexpr double kCoincidence = 10;  // contact gaps: borders nearer than that count once
+constexpr int kPieces = 4;     // of a chord of a border
+constexpr int kHalvings = 20;  // of a piece at the end of a border
 
 }  // namespace
 

@@ -277,7 +277,7 @@ class ShapeReading {
   }
 
   void AddBody(const TopoDS_Shape& inShape, bool inIsSolid) {
-    BRepMesh_IncrementalMesh(inShape, deflection_, false, angle_, false);
+    const BRepMesh_IncrementalMesh meshing(inShape, deflection_, false, angle_, false);
     BodyBuilder builder(inIsSolid);
     for (TopExp_Explorer face(inShape, TopAbs_FACE); face.More(); face.Next())
       if (!builder.Add(TopoDS::Face(face.Current()))) ++facesWithoutTriangles_;

@@ -45,6 +45,7 @@ class Soup {
         (VolumeOf(members) < 0 ? cavities : hulls).push_back(std::move(members));
     }
     std::vector<Body> bodies;
+    bodies.reserve(hulls.size() + 1);
     for (auto& hull : hulls) bodies.push_back(BodyOf(hull, true));
     for (auto& cavity : cavities) PlaceCavity(cavity, hulls, bodies);
     if (!open.empty()) bodies.push_back(BodyOf(open, false));

@@ -54,6 +54,7 @@ void ReadAttributes(const DOM_Node& inComponent, ComponentRecord& outRecord) {
 std::vector<ShapeRecord> ReadShapes(ZORClashParsing& ioReader, int inPosition) {
   std::vector<ShapeRecord> shapes;
   const int count = ioReader.GetNbShapes(inPosition);
+  if (count > 0) shapes.reserve(static_cast<std::size_t>(count));
   const auto text = [&](int inShape, const char* inName) {
     return Utf8(ioReader.GetShapeAttrValue(inPosition, inShape, inName));
   };

@@ -12,6 +12,7 @@ namespace {
 
 std::vector<std::string> Keys(const std::vector<std::string>& inWords) {
   std::vector<std::string> keys;
+  keys.reserve(inWords.size());
   for (const std::string& word : inWords) keys.push_back(WordKey(word));
   return keys;
 }

@@ -169,7 +169,7 @@ class Solver {
 
   void Assign(int inRow, int inColumn, bool inIsAmbiguous) {
     result_.columnOfRow[static_cast<std::size_t>(inRow)] = inColumn;
-    result_.isAmbiguous[static_cast<std::size_t>(inRow)] = inIsAmbiguous;
+    result_.isAmbiguous[static_cast<std::size_t>(inRow)] = inIsAmbiguous ? 1 : 0;
     rowOfColumn_[static_cast<std::size_t>(inColumn)] = inRow;
   }
 

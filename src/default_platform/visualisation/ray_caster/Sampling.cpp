@@ -252,9 +252,10 @@ void AdaptiveSampling::CastRow(const SurfacePass& inPass, int inY) {
     const std::int32_t first = firstSamples_[Place(x, inY)];
     if (first == kNotRefined) continue;
     for (int i = 0; i < kSamples; ++i) {
+      const int column = i % kSide, row = i / kSide;
       points[pixelCount * kSamples + i] = {
-          static_cast<float>(x) + 0.25F + 0.5F * static_cast<float>(i % kSide),
-          static_cast<float>(inY) + 0.25F + 0.5F * static_cast<float>(i / kSide)};
+          static_cast<float>(x) + 0.25F + 0.5F * static_cast<float>(column),
+          static_cast<float>(inY) + 0.25F + 0.5F * static_cast<float>(row)};
     }
     targets[pixelCount++] = samples_.get() + first;
     if (pixelCount == kPixelsAtOnce) castWaiting();
