@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include "toolkit/records/Glob.h"
+
 namespace {
 
 using namespace ZORToolkit;
@@ -20,6 +22,15 @@ TEST(CaseFolded, MakesLettersOfAllCasesEqual) {
   EXPECT_EQ(CaseFolded("ΣΣ"), CaseFolded("σς"));
   EXPECT_NE(CaseFolded("a"), CaseFolded("b"));
   EXPECT_EQ("😀", CaseFolded("😀"));
+}
+
+TEST(MatchesGlob, TakesCharactersNotBytes) {
+  EXPECT_TRUE(MatchesGlob("Stra?e*", "Straße 1"));
+  EXPECT_TRUE(MatchesGlob("*a*b", "aabab"));
+  EXPECT_TRUE(MatchesGlob("**", ""));
+  EXPECT_FALSE(MatchesGlob("Stra??e", "Straße"));
+  EXPECT_FALSE(MatchesGlob("?", ""));
+  EXPECT_FALSE(MatchesGlob("a", "ab"));
 }
 
 TEST(RecordFilter, WithoutConditionsAcceptsAll) { EXPECT_TRUE(RecordFilter().Accepts({})); }

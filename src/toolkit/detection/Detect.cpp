@@ -13,34 +13,13 @@
 #include "toolkit/Error.h"
 #include "toolkit/detection/ModelInterferences.h"
 #include "toolkit/records/DocumentText.h"
+#include "toolkit/records/Glob.h"
 
 namespace ZORToolkit {
 namespace {
 
 constexpr const char* kSeparator = " --++-- ";
 constexpr double kRigid = 1e-6;
-
-/// A pattern with "*" and "?" against a whole text.
-bool Matches(std::string_view inPattern, std::string_view inText) {
-  std::size_t pattern = 0, text = 0, star = std::string_view::npos, resume = 0;
-  while (text < inText.size()) {
-    if (pattern < inPattern.size() && inPattern[pattern] == '*') {
-      star = pattern++;
-      resume = text;
-    } else if (pattern < inPattern.size() &&
-               (inPattern[pattern] == '?' || inPattern[pattern] == inText[text])) {
-      ++pattern;
-      ++text;
-    } else if (star != std::string_view::npos) {
-      pattern = star + 1;
-      text = ++resume;
-    } else {
-      return false;
-    }
-  }
-  while (pattern < inPattern.size() && inPattern[pattern] == '*') ++pattern;
-  return pattern == inPattern.size();
-}
 
 /// A leaf of the tree, and what it counts as.
 struct Leaf {
@@ -55,10 +34,8 @@ struct Unit {
 };
 
 bool MatchesAny(const std::vector<std::string>& inPatterns, const Unit& inUnit) {
-  return std::ranges::any_of(inPatterns, [&](const std::string& pattern) {
-    return std::ranges::any_of(inUnit.names,
-                               [&](const std::string& name) { return Matches(pattern, name); });
-  });
+  return std::ranges::any_of(
+      inUnit.names, [&](const std::string& name) { return MatchesAnyGlob(inPatterns, name); });
 }
 
 /// Collects leaves and units of an opened model.

@@ -2,39 +2,11 @@
 
 #include <algorithm>
 
+#include "toolkit/records/Glob.h"
 #include "toolkit/review/TomlFile.h"
 
 namespace ZORToolkit {
 namespace {
-
-/// In time of pattern times text, without recursion: only the last "*" is ever taken up again.
-bool MatchesPattern(std::string_view inPattern, std::string_view inText) {
-  std::size_t p = 0, t = 0, star = std::string_view::npos, resume = 0;
-  while (t < inText.size()) {
-    if (p < inPattern.size() && inPattern[p] == '*') {
-      star = p++;
-      resume = t;
-    } else if (p < inPattern.size() && inPattern[p] == '?') {
-      ++p;
-      for (++t; t < inText.size() && (inText[t] & 0xC0) == 0x80; ++t) {  // one character of UTF-8
-      }
-    } else if (p < inPattern.size() && inPattern[p] == inText[t]) {
-      ++p;
-      ++t;
-    } else if (star != std::string_view::npos) {
-      p = star + 1;
-      t = ++resume;
-    } else {
-      return false;
-    }
-  }
-  return std::ranges::all_of(inPattern.substr(p), [](char inSign) { return inSign == '*'; });
-}
-
-bool MatchesAny(const std::vector<std::string>& inPatterns, std::string_view inText) {
-  return std::ranges::any_of(
-      inPatterns, [&](const std::string& inPattern) { return MatchesPattern(inPattern, inText); });
-}
 
 std::string_view LastName(std::string_view inPath) {
   constexpr std::string_view kSeparator = " --++-- ";
@@ -44,10 +16,11 @@ std::string_view LastName(std::string_view inPath) {
 
 bool HoldsFor(const ReviewProduct& inProduct, const std::vector<std::string>& inProducts,
               const std::vector<std::string>& inParts) {
-  if (!inParts.empty() && !MatchesAny(inParts, inProduct.part)) return false;
+  if (!inParts.empty() && !MatchesAnyGlob(inParts, inProduct.part)) return false;
   if (inProducts.empty()) return true;
   for (const std::string* const name : {&inProduct.id, &inProduct.alias})
-    if (MatchesAny(inProducts, *name) || MatchesAny(inProducts, LastName(*name))) return true;
+    if (MatchesAnyGlob(inProducts, *name) || MatchesAnyGlob(inProducts, LastName(*name)))
+      return true;
   return false;
 }
 
@@ -60,7 +33,7 @@ bool IsAmong(const std::vector<std::string>& inWords, const std::string& inWord)
 bool InterferenceCondition::Holds(const ReviewedResult& inResult,
                                   const ReviewRecord& inRecord) const {
   if (!IsAmong(types, inRecord.type) || !IsAmong(statuses, inRecord.status)) return false;
-  if (!rules.empty() && !MatchesAny(rules, inRecord.rule)) return false;
+  if (!rules.empty() && !MatchesAnyGlob(rules, inRecord.rule)) return false;
   const std::optional<double>& value = inRecord.value.value;
   if (minValue && !(value && *value >= *minValue)) return false;
   if (maxValue && !(value && *value <= *maxValue)) return false;
