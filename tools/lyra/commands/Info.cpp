@@ -8,6 +8,7 @@
 #include "lyra/commands/RecordsJson.h"
 #include "lyra/terminal/KeyValueList.h"
 #include "lyra/terminal/SafeText.h"
+#include "lyra/terminal/Table.h"
 #include "toolkit/records/DocumentRecords.h"
 
 namespace lyra {
@@ -92,6 +93,33 @@ void PrintText(const DocumentRecord& inRecord, Output& ioOutput) {
   list.Print(ioOutput);
 }
 
+void PrintText(const BcfProject& inProject, const std::string& inFile, Output& ioOutput) {
+  KeyValueList list(inFile);
+  list.Add("Kind", "BCF file, version " + inProject.version);
+  list.Add("Project", inProject.name.empty() ? inProject.guid : inProject.name);
+  list.Add("Topics", std::to_string(inProject.topics.size()));
+  list.Print(ioOutput);
+  if (inProject.topics.empty()) return;
+  constexpr TableColumn::Align kRight = TableColumn::Align::kRight;
+  Table table({{"Title"},
+               {"Type"},
+               {"Status"},
+               {"Comments", kRight},
+               {"Viewpoints", kRight},
+               {"Snapshots", kRight},
+               {"GUID"}});
+  for (const BcfTopic& topic : inProject.topics)
+    table.Add({topic.title, topic.type, topic.status, std::to_string(topic.comments.size()),
+               std::to_string(topic.viewpoints.size()), std::to_string(topic.Snapshots()),
+               topic.guid});
+  ioOutput.Write("\n");
+  table.Print(ioOutput);
+}
+
+void PrintText(const DocumentRecord& inRecord, const std::string&, Output& ioOutput) {
+  PrintText(inRecord, ioOutput);
+}
+
 /// Prints records as they come: an array when there may be several.
 class Printer {
  public:
@@ -99,14 +127,15 @@ class Printer {
     if (options_.json && options_.files.size() > 1) array_ = std::make_unique<JsonArray>(output_);
   }
 
-  void Print(const DocumentRecord& inRecord) {
+  template <class Record>
+  void Print(const Record& inRecord, const std::string& inFile) {
     if (array_) {
       array_->Add(inRecord);
     } else if (options_.json) {
       output_.Write(JsonText(inRecord) + "\n");
     } else {
       if (!isFirst_) output_.Write("\n");
-      PrintText(inRecord, output_);
+      PrintText(inRecord, inFile, output_);
     }
     isFirst_ = false;
   }
@@ -128,15 +157,17 @@ int Info(const InfoOptions& inOptions, Output& ioOutput) {
   Printer printer(inOptions, ioOutput);
   int code = 0;
   for (const std::string& path : inOptions.files) {
-    std::optional<DocumentRecord> record;
     try {
-      ClashDocument file(path);
-      record = ReadDocument(file);
+      if (LooksLikeBcf(path)) {
+        printer.Print(ReadBcf(path), path);
+      } else {
+        ClashDocument file(path);
+        printer.Print(ReadDocument(file), path);
+      }
     } catch (const InputError& error) {
       std::fprintf(stderr, "lyra: %s\n", Printable(error.what()).c_str());
       code = 1;
     }
-    if (record) printer.Print(*record);
   }
   printer.Finish();
   return code;
@@ -146,7 +177,8 @@ int Info(const InfoOptions& inOptions, Output& ioOutput) {
 
 VerbAction DeclareInfo(Arguments& ioArguments) {
   const auto options = std::make_shared<InfoOptions>();
-  ioArguments.Positionals("FILE", options->files, "Clash results, or - for standard input");
+  ioArguments.Positionals("FILE", options->files,
+                          "Clash results or BCF files, or - for standard input");
   ioArguments.Flag("--json", options->json, "Print JSON: an object, of several files an array");
   return [options](Output& ioOutput) { return Info(*options, ioOutput); };
 }

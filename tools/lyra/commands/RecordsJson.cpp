@@ -71,6 +71,14 @@ Json ToJson(const LinkedProduct& inProduct) {
   return {{"name", inProduct.name}, {"id", inProduct.id}, {"url", inProduct.url}};
 }
 
+Json ToJson(const BcfTopic& inTopic) {
+  return {{"guid", inTopic.guid},
+          {"title", inTopic.title},
+          {"comments", inTopic.comments.size()},
+          {"viewpoints", inTopic.viewpoints.size()},
+          {"snapshots", inTopic.Snapshots()}};
+}
+
 template <class Records>
 Json ArrayJson(const Records& inRecords) {
   Json array = Json::array();
@@ -172,6 +180,9 @@ std::string JsonText(const ComponentRecord& inRecord) { return LineOf(ToJson(inR
 std::string JsonText(const SpecificationRecord& inRecord) { return LineOf(ToJson(inRecord)); }
 std::string JsonText(const LinkRecord& inRecord) { return LineOf(ToJson(inRecord)); }
 std::string JsonText(const ModelProductRecord& inRecord) { return LineOf(ToJson(inRecord)); }
+std::string JsonText(const BcfProject& inProject) {
+  return LineOf({{"version", inProject.version}, {"topics", ArrayJson(inProject.topics)}});
+}
 
 JsonArray::JsonArray(Output& ioOutput) : output_(ioOutput) { output_.Write("["); }
 

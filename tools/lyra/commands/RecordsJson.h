@@ -6,6 +6,7 @@
 
 #include "lyra/commands/Model.h"
 #include "lyra/terminal/Output.h"
+#include "toolkit/exchange/BcfFile.h"
 #include "toolkit/records/DocumentRecords.h"
 
 namespace lyra {
@@ -24,6 +25,7 @@ std::string JsonText(const ZORToolkit::ComponentRecord& inRecord);
 std::string JsonText(const ZORToolkit::SpecificationRecord& inRecord);
 std::string JsonText(const ZORToolkit::LinkRecord& inRecord);
 std::string JsonText(const ModelProductRecord& inRecord);
+std::string JsonText(const ZORToolkit::BcfProject& inProject);
 
 /// Writes a JSON array record by record, one a line, so that no more than one is in memory.
 class JsonArray {
