@@ -74,9 +74,7 @@ int ParseAndAct(int inCount, char** inArguments, Output& ioOutput) {
   return Act(line.verbs, ioOutput);
 }
 
-}  // namespace
-
-int RunLyra(int inCount, char** inArguments) {
+int RunAndReport(int inCount, char** inArguments) {
   // A reader that goes away shows as a failed write, so that work can stop in good order.
   std::signal(SIGPIPE, SIG_IGN);
   std::signal(SIGXFSZ, SIG_IGN);  // likewise a file that may not grow any further
@@ -93,11 +91,23 @@ int RunLyra(int inCount, char** inArguments) {
   } catch (const ZORFoundation::Interrupted& interrupted) {
     ZORFoundation::EndBySignal(interrupted.signal);
   } catch (const std::bad_alloc&) {
-    Complain("there is not enough memory");
+    throw;
   } catch (const std::exception& error) {
     Complain(error.what());
   }
   return kUnusable;
+}
+
+}  // namespace
+
+// Reporting an error may also lack memory; this line needs none.
+int RunLyra(int inCount, char** inArguments) {
+  try {
+    return RunAndReport(inCount, inArguments);
+  } catch (const std::bad_alloc&) {
+    std::fputs("lyra: there is not enough memory\n", stderr);
+    return kUnusable;
+  }
 }
 
 }  // namespace lyra

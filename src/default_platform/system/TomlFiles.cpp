@@ -6,6 +6,7 @@
 #include <optional>
 
 #include "foundation/PluginLoader.h"
+#include "foundation/TomlNesting.h"
 #include "platform/system/ZORGetEnv.h"
 
 namespace ZORDefault {
@@ -90,6 +91,7 @@ FileCache<TomlTable>& SettingFiles() {
 }  // namespace
 
 std::shared_ptr<const TomlTable> ParseToml(std::string_view inText) {
+  if (ZORFoundation::FindTooDeepToml(inText)) return nullptr;
   try {
     auto table = std::make_shared<TomlTable>();
     for (const auto& [key, node] : toml::parse(inText))

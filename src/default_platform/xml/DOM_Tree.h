@@ -206,7 +206,7 @@ class DOM_Tree {
   bool IsRootOf(Node inNode, DetachedNodes::Group inGroup) const;
   void ListRoot(Node inNode, DetachedNodes::Group inGroup);
   std::vector<Node> ParentlessRoots(DetachedNodes::Group inGroup) const;
-  void Reclaim(DetachedNodes::Group inGroup);
+  void Reclaim(DetachedNodes::Group inGroup) noexcept;
   void FreeSubtree(Node inRoot);
   void FreeOne(Node inNode);
   void NoteChange(Node inNode) {

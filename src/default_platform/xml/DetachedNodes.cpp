@@ -4,8 +4,10 @@
 
 #include "default_platform/xml/DOM_Tree.h"
 
+// Room to free every group is made beforehand: the last handle goes in a destructor.
 DetachedNodes::Group DetachedNodes::NewGroup() {
   if (freeGroups_.empty()) {
+    if (freeGroups_.capacity() <= groups_.size()) freeGroups_.reserve(2 * groups_.size() + 16);
     groups_.emplace_back();
     return static_cast<Group>(groups_.size() - 1);
   }
@@ -14,7 +16,7 @@ DetachedNodes::Group DetachedNodes::NewGroup() {
   return group;
 }
 
-void DetachedNodes::FreeGroup(Group inGroup) {
+void DetachedNodes::FreeGroup(Group inGroup) noexcept {
   GroupRecord& group = groups_[inGroup];
   group.handles = 0;
   group.nodes = 0;
@@ -125,8 +127,10 @@ void DOM_Tree::Join(Node inParent, Node inChild) {
   EndGroupWhenUnused(group);
 }
 
-void DOM_Tree::Reclaim(DetachedNodes::Group inGroup) {
-  for (const Node root : ParentlessRoots(inGroup)) FreeSubtree(root);
+// What is freed is no root any more, so each is freed once.
+void DOM_Tree::Reclaim(DetachedNodes::Group inGroup) noexcept {
+  for (const Node root : detached_.RootsOf(inGroup))
+    if (IsRootOf(root, inGroup) && At(root).parent == 0) FreeSubtree(root);
   detached_.FreeGroup(inGroup);
 }
 

@@ -21,7 +21,7 @@ class DetachedNodes {
   void RemoveNode(Node inNode);
   /// Puts a node of another group into this one, with its handles.
   void MoveNode(Node inNode, Group inGroup);
-  void FreeGroup(Group inGroup);
+  void FreeGroup(Group inGroup) noexcept;
 
   void Hold(Node inNode) {
     Entry& entry = EntryOf(inNode);

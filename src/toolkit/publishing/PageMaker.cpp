@@ -11,6 +11,7 @@
 #include <cstdarg>
 #include <cstdio>
 #include <memory>
+#include <new>
 #include <string_view>
 #include <utility>
 
@@ -34,15 +35,60 @@ using Context = std::unique_ptr<xsltTransformContext, Freer<xsltFreeTransformCon
 // Both libraries report in pieces of a line.
 void Collect(void* ioText, const char* inFormat, ...) __attribute__((format(printf, 2, 3)));
 void Collect(void* ioText, const char* inFormat, ...) {
-  constexpr std::size_t kMost = 1 << 16;
+  constexpr std::size_t kMaxText = 1 << 16;
   std::string& text = *static_cast<std::string*>(ioText);
   char piece[4096];
   va_list arguments;
   va_start(arguments, inFormat);
   const int length = std::vsnprintf(piece, sizeof piece, inFormat, arguments);
   va_end(arguments);
-  if (length > 0 && text.size() < kMost) text += piece;
+  if (length <= 0 || text.size() >= kMaxText) return;
+  try {
+    text += piece;
+  } catch (const std::bad_alloc&) {
+    // Nothing may be thrown through a library of C.
+  }
 }
+
+/// Notices when memory is lacking: the libraries then leave out a part of the page and say nothing.
+/// From the first page on, memory comes through here from where it came from before; this library
+/// is never unloaded.
+class AllocationWatch {
+ public:
+  /// Forgets what failed in this thread so far.
+  static void Start() {
+    static const Former once;
+    hasFailed_ = false;
+  }
+  static bool HasFailed() { return hasFailed_; }
+
+ private:
+  struct Former {
+    Former() {
+      xmlMemGet(&free, &allocate, &reallocate, &duplicate);
+      former_ = this;
+      xmlMemSetup(free, Allocate, Reallocate, Duplicate);
+    }
+    xmlFreeFunc free = nullptr;
+    xmlMallocFunc allocate = nullptr;
+    xmlReallocFunc reallocate = nullptr;
+    xmlStrdupFunc duplicate = nullptr;
+  };
+  static void* Noted(void* inBlock, std::size_t inSize) {
+    if (inBlock == nullptr && inSize > 0) hasFailed_ = true;
+    return inBlock;
+  }
+  static void* Allocate(std::size_t inSize) { return Noted(former_->allocate(inSize), inSize); }
+  static void* Reallocate(void* inBlock, std::size_t inSize) {
+    return Noted(former_->reallocate(inBlock, inSize), inSize);
+  }
+  static char* Duplicate(const char* inText) {
+    return static_cast<char*>(Noted(former_->duplicate(inText), 1));
+  }
+
+  static inline thread_local bool hasFailed_ = false;
+  static inline const Former* former_ = nullptr;
+};
 
 std::string FirstLine(const std::string& inText) { return inText.substr(0, inText.find('\n')); }
 
@@ -137,9 +183,11 @@ bool MakePage(const PageRequest& inRequest, Page& outPage) {
 
 ZOR_PAGE_EXPORT bool ZORMakePage(const ZORToolkit::PageRequest& inRequest,
                                  ZORToolkit::Page& outPage) {
+  ZORToolkit::AllocationWatch::Start();
   const bool isMade = ZORToolkit::MakePage(inRequest, outPage);
   xmlSetGenericErrorFunc(nullptr, nullptr);
   xsltSetGenericErrorFunc(nullptr, nullptr);
+  if (ZORToolkit::AllocationWatch::HasFailed()) throw std::bad_alloc();
   if (!isMade) {
     outPage.reason = ZORToolkit::FirstLine(outPage.messages);
     if (outPage.reason.empty()) outPage.reason = "the style sheet makes no page";

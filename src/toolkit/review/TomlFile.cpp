@@ -6,6 +6,8 @@
 #include <cctype>
 #include <set>
 
+#include "foundation/TomlNesting.h"
+
 namespace ZORToolkit {
 
 struct TomlTable::Data {
@@ -37,6 +39,9 @@ TomlTable::TomlTable(TomlTable&&) noexcept = default;
 TomlTable::~TomlTable() = default;
 
 TomlTable TomlTable::Parse(const std::string& inName, std::string_view inText) {
+  if (const auto place = ZORFoundation::FindTooDeepToml(inText))
+    throw Error(inName + ":" + std::to_string(place->line) + ":" + std::to_string(place->column) +
+                ": " + ZORFoundation::kTomlTooDeep);
   try {
     auto document = std::make_shared<const toml::table>(toml::parse(inText, inName));
     const toml::table* const table = document.get();

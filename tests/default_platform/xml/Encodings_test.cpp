@@ -103,6 +103,37 @@ TEST(Encodings, WideEncodingDeclaredInBytewiseTextIsPassedOver) {
   ExpectRead(TextWith(kAll, "UCS-4"), kAll);
 }
 
+TEST(Encodings, BytesThatAreNoneOfTheEncodingAreRefusedWithTheirPlace) {
+  const struct {
+    const char* declared;
+    const char* bytes;
+    const char* reason;
+  } cases[] = {
+      {"GB18030", "\x81 ", "invalid byte 81 in the encoding gb18030"},
+      {"GB18030", "\xFF", "invalid byte FF in the encoding gb18030"},
+      {"ISO-8859-7", "\xFF", "invalid byte FF in the encoding iso-8859-7"},
+      {"windows-1255", "\xD9", "invalid byte D9 in the encoding windows-1255"},
+      {"ISO-2022-JP", "\x1B$B\xFF\xFF\x1B(B", "invalid bytes FF FF in the encoding iso-2022-jp"},
+      {"UTF-7", "\xFF", "invalid byte FF in the encoding utf-7"},
+      {"Shift_JIS", "\x81 ", "invalid byte 81 in the encoding shift_jis"},
+      {"EUC-JP", "\xA4", "invalid byte A4 in the encoding euc-jp"},
+  };
+  for (const auto& one : cases) {
+    SCOPED_TRACE(one.declared);
+    const std::string text = TextWith("v\n" + std::string(one.bytes), one.declared);
+    EXPECT_EQ(ParseErrorOf(text), std::string("LIDPipodIBM:3:2: ") + one.reason);
+    // Far behind the beginning, and as the very last byte.
+    const std::string far = TextWith("v" + std::string(100'000, '\n') + one.bytes, one.declared);
+    EXPECT_EQ(ParseErrorOf(far), std::string("LIDPipodIBM:100002:2: ") + one.reason);
+  }
+  EXPECT_NE(ParseErrorOf(TextWith("v", "GB18030") + "\n\x81"), "");
+}
+
+TEST(Encodings, ReplacementCharacterOfTheTextItselfIsRead) {
+  ExpectRead(TextWith("\x84\x31\xA4\x37", "GB18030"), "\xEF\xBF\xBD");
+  ExpectRead(TextWith("+//0-", "UTF-7"), "\xEF\xBF\xBD");
+}
+
 TEST(Encodings, UnknownEncodingIsRefused) {
   EXPECT_NE(ParseErrorOf(TextWith("v", "no-such-encoding")), "");
   EXPECT_NE(ParseErrorOf(TextWith("v", "-")), "");

@@ -1,17 +1,15 @@
 #include "default_platform/xml/full_scanner/XercesScanner.h"
 
-#include <algorithm>
 #include <new>
 #include <string_view>
 #include <xercesc/framework/XMLErrorCodes.hpp>
 #include <xercesc/internal/XMLScanner.hpp>
-#include <xercesc/sax/InputSource.hpp>
 #include <xercesc/sax/Locator.hpp>
-#include <xercesc/util/BinInputStream.hpp>
 #include <xercesc/util/OutOfMemoryException.hpp>
 #include <xercesc/util/PlatformUtils.hpp>
 #include <xercesc/util/XMLUniDefs.hpp>
 
+#include "default_platform/xml/full_scanner/DocumentEntity.h"
 #include "foundation/Utf8.h"
 #include "platform/xml/DOM_Node.h"
 
@@ -34,84 +32,6 @@ struct EmptyDocument {};
 std::u16string_view View(const char16_t* inText) {
   return inText == nullptr ? std::u16string_view() : std::u16string_view(inText);
 }
-
-bool IsSameIgnoringCase(std::string_view inA, std::string_view inLower) {
-  return std::equal(
-      inA.begin(), inA.end(), inLower.begin(), inLower.end(),
-      [](char inUnit, char inSmall) { return inUnit == inSmall || (inUnit | 0x20) == inSmall; });
-}
-
-/// Whether a document that begins so is in UTF-8.
-bool IsUtf8(std::string_view inBegin) {
-  constexpr std::string_view kMark = "\xEF\xBB\xBF";
-  if (inBegin.starts_with(kMark)) inBegin.remove_prefix(kMark.size());
-  if (inBegin.empty() || std::string_view("< \t\r\n").find(inBegin[0]) == std::string_view::npos ||
-      (inBegin.size() > 1 && inBegin[1] == '\0'))
-    return false;
-  if (!inBegin.starts_with("<?xml")) return true;
-  const std::string_view declaration = inBegin.substr(0, inBegin.find("?>"));
-  const std::size_t encoding = declaration.find("encoding");
-  if (encoding == std::string_view::npos) return true;
-  const std::size_t quote = declaration.find_first_of("'\"", encoding);
-  if (quote == std::string_view::npos) return true;
-  const std::size_t end = declaration.find(declaration[quote], quote + 1);
-  const std::string_view name = declaration.substr(quote + 1, end - quote - 1);
-  return IsSameIgnoringCase(name, "utf-8") || IsSameIgnoringCase(name, "utf8");
-}
-
-/// Whether a byte begins a sequence of UTF-8 beyond Unicode, as far as its bytes are there.
-bool IsBeyondUnicode(const XMLByte* inPlace, const XMLByte* inEnd) {
-  if (*inPlace < 0xF5 || *inPlace > 0xF7) return false;
-  const XMLByte* const end = std::min(inPlace + 4, inEnd);
-  return std::all_of(inPlace + 1, end, [](XMLByte inByte) { return (inByte & 0xC0) == 0x80; });
-}
-
-/// Hands bytes to the library. In UTF-8 it drops sequences that begin with F5 to F7, which are beyond
-/// Unicode: it gets a byte instead that it refuses.
-class ReaderStream : public xercesc::BinInputStream {
- public:
-  explicit ReaderStream(ByteReader& ioReader) : reader_(ioReader) {}
-  XMLFilePos curPos() const override { return reader_.BytesRead(); }
-  XMLSize_t readBytes(XMLByte* const outBytes, const XMLSize_t inMax) override {
-    const bool isFirst = reader_.BytesRead() == 0;
-    const std::size_t kept = held_.size();
-    std::copy(held_.begin(), held_.end(), outBytes);
-    held_.clear();
-    const std::size_t added = reader_.Read(outBytes + kept, inMax - kept);
-    XMLByte* const end = outBytes + kept + added;
-    if (isFirst) isUtf8_ = IsUtf8({reinterpret_cast<const char*>(outBytes), added});
-    if (!isUtf8_) return kept + added;
-    for (XMLByte* at = outBytes; at != end; ++at) {
-      if (!IsBeyondUnicode(at, end)) continue;
-      if (end - at < 4 && added != 0 && at != outBytes) {  // the rest of it comes next
-        held_.assign(at, end);
-        return static_cast<XMLSize_t>(at - outBytes);
-      }
-      if (end - at >= 4) *at = 0xFF;
-    }
-    return kept + added;
-  }
-  const XMLCh* getContentType() const override { return nullptr; }
-
- private:
-  ByteReader& reader_;
-  bool isUtf8_ = false;
-  std::vector<XMLByte> held_;
-};
-
-/// Gives a reader to the library as its one and only entity.
-class ReaderEntity : public xercesc::InputSource {
- public:
-  ReaderEntity(ByteReader& ioReader, const std::string& inName) : reader_(ioReader) {
-    std::u16string name(inName.size(), u'\0');
-    name.resize(ZORFoundation::DecodeUtf8(inName, name.data()));
-    setSystemId(name.c_str());
-  }
-  xercesc::BinInputStream* makeStream() const override { return new ReaderStream(reader_); }
-
- private:
-  ByteReader& reader_;
-};
 
 /// A reason of the library as one line of narrow text.
 std::string OneLineReason(const char16_t* inText) {
@@ -163,13 +83,16 @@ void XercesScanner::Scan(const std::string& inName) {
 
 void XercesScanner::RunScanner(const std::string& inName) {
   try {
-    parse(ReaderEntity(reader_, inName));
+    entity_.emplace(reader_, inName);
+    parse(*entity_);
   } catch (const ScannerMemoryExhausted& failure) {
     throw ScanFailure{failure.line, failure.column, failure.reason};
   } catch (const xercesc::OutOfMemoryException&) {
     throw ScanFailure{0, 0, "out of memory"};
   } catch (const std::bad_alloc&) {
     throw ScanFailure{0, 0, "out of memory"};
+  } catch (const LibraryPanic&) {
+    throw ScanFailure{0, 0, "the XML library gave up"};
   } catch (const xercesc::XMLException& failure) {
     throw ScanFailure{0, 0, OneLineReason(failure.getMessage())};
   } catch (const xercesc::SAXException& failure) {
@@ -358,6 +281,8 @@ void XercesScanner::error(const unsigned int inCode, const XMLCh* const inDomain
   if (inCode == xercesc::XMLErrs::EmptyMainEntity &&
       View(inDomain) == View(xercesc::XMLUni::fgXMLErrDomain))
     throw EmptyDocument();
+  if (View(inText).find(u"FFFF") != std::u16string_view::npos && !entity_->Fault().empty())
+    throw ScanFailure{inLine, inColumn, entity_->Fault()};
   throw ScanFailure{inLine, inColumn, OneLineReason(inText)};
 }
 
@@ -369,13 +294,21 @@ xercesc::InputSource* XercesScanner::resolveEntity(xercesc::XMLResourceIdentifie
 
 namespace {
 
-// Never ended: documents may be read while the process ends.
+// Unless told otherwise, the library ends the whole process.
+class ThrowingPanicHandler final : public xercesc::PanicHandler {
+  void panic(const PanicReasons) override { throw LibraryPanic(); }
+};
+
+// Never ended: documents may be read while the process ends. Never tried again: what a failure leaves
+// behind is half prepared.
 bool PrepareLibrary() {
   static const bool isReady = [] {
     try {
-      xercesc::XMLPlatformUtils::Initialize();
+      static ThrowingPanicHandler panicHandler;
+      xercesc::XMLPlatformUtils::Initialize(xercesc::XMLUni::fgXercescDefaultLocale, nullptr,
+                                            &panicHandler);
       return true;
-    } catch (const xercesc::XMLException&) {
+    } catch (...) {  // the library raises several types that have nothing in common
       return false;
     }
   }();
@@ -395,6 +328,10 @@ extern "C" __attribute__((visibility("default"))) bool ZORScanAnyDocument(ByteRe
     return true;
   } catch (const ScanFailure& failure) {
     outFailure = failure;
-    return false;
+  } catch (const xercesc::OutOfMemoryException&) {  // no std::exception, which hosts expect
+    throw std::bad_alloc();
+  } catch (const LibraryPanic&) {
+    throw std::bad_alloc();  // the only reason left once the library is prepared
   }
+  return false;
 }

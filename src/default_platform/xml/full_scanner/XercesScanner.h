@@ -3,6 +3,7 @@
 #define ZOR_DEFAULT_PLATFORM_XML_FULL_SCANNER_XERCESSCANNER_H
 
 #include <array>
+#include <optional>
 #include <string>
 #include <unordered_map>
 #include <vector>
@@ -12,7 +13,11 @@
 
 #include "default_platform/xml/FullScanner.h"
 #include "default_platform/xml/full_scanner/DoctypeRecorder.h"
+#include "default_platform/xml/full_scanner/DocumentEntity.h"
 #include "default_platform/xml/full_scanner/ScannerMemory.h"
+
+/// Raised where the library would end the process.
+struct LibraryPanic {};
 
 /// Listens to Xerces-C's scanner and passes on what it reports: the library's own tree would take
 /// five times the time and the memory. One object reads one document.
@@ -98,6 +103,7 @@ class XercesScanner : private xercesc::SAXParser {
   [[noreturn]] void FailHere(const std::string& inReason) const;
 
   ByteReader& reader_;
+  std::optional<DocumentEntity> entity_;
   ScanSink& sink_;
   xercesc::HandlerBase unused_;
   xercesc::SecurityManager limits_;
