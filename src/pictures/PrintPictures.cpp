@@ -272,24 +272,23 @@ void PrintPictures::PrintListVisuToFilePreview(ZORIProduct_var inProduct, ZORUni
 void PrintPictures::TakeRepImage(ZORRep* inScene, ZORUnicodeString inImagePath,
                                  ZORUnicodeString inFormat, int inWidth, int inHeight,
                                  int inViewMode, int inKeepBackground) {
-  if (!inScene) return;
-  auto* const image = new ZORPrint3DRepImage(static_cast<ZOR3DRep*>(inScene), inWidth, inHeight);
-  SetUpSupport(image->GetSupport(), inKeepBackground != 0, inViewMode == 1);
-  image->GetViewpoint()->Reframe(static_cast<float>(inWidth), static_cast<float>(inHeight), 1.0F,
-                                 1.0F);
-  Capture(*image, inFormat, inImagePath);
-  image->Release();
+  const auto frameAll = [&](ZORPrint3DRepImage& ioImage) {
+    ioImage.GetViewpoint()->Reframe(static_cast<float>(inWidth), static_cast<float>(inHeight), 1.0F,
+                                    1.0F);
+  };
+  CaptureRep(
+      inScene,
+      {inImagePath, inFormat, inWidth, inHeight, inViewMode == 1, inKeepBackground != 0, true},
+      frameAll);
 }
 
-// By contract a print image that could not be rasterised is not released.
 void PrintPictures::TakeRepImage(ZORRep* inScene, ZORUnicodeString inImagePath,
                                  ZOR3DViewpoint* inViewpoint, ZORUnicodeString inFormat,
                                  int inWidth, int inHeight, int inViewMode, int inKeepBackground) {
-  if (!inScene) return;
-  auto* const image = new ZORPrint3DRepImage(static_cast<ZOR3DRep*>(inScene), inWidth, inHeight);
-  SetUpSupport(image->GetSupport(), inKeepBackground != 0, inViewMode == 1);
-  *image->GetViewpoint() = *inViewpoint;
-  if (Capture(*image, inFormat, inImagePath)) image->Release();
+  CaptureRep(
+      inScene,
+      {inImagePath, inFormat, inWidth, inHeight, inViewMode == 1, inKeepBackground != 0, false},
+      [&](ZORPrint3DRepImage& ioImage) { *ioImage.GetViewpoint() = *inViewpoint; });
 }
 
 // From the root down: the highest ancestor that imposes a colour wins.

@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <initializer_list>
+#include <stdexcept>
 #include <string>
 #include <utility>
 
@@ -21,7 +22,12 @@ HRESULT writeResult = S_OK;
 ZOR3DRep* shown = nullptr;
 ZORMathVector eye;  // of the print image when it was rasterised
 
-void Note(const std::string& inCall) { calls += inCall + ";"; }
+std::string raising;  // how the call begins that raises an error
+
+void Note(const std::string& inCall) {
+  calls += inCall + ";";
+  if (!raising.empty() && inCall.starts_with(raising)) throw std::runtime_error(inCall);
+}
 
 std::string Numbers(std::initializer_list<double> inNumbers) {
   std::string text;
@@ -120,6 +126,19 @@ TEST_F(TakeRepImage, ThroughAViewpointDrawsFromItsPlace) {
   EXPECT_EQ(1, eye.x);
   EXPECT_EQ(2, eye.y);
   EXPECT_EQ(3, eye.z);
+}
+
+TEST_F(TakeRepImage, ErrorsReachTheCallerAndLeaveNothingBehind) {
+  for (const auto& [call, releases] : {std::pair{"write", "pixels released;image released;"},
+                                       {"rasterise", "rasterise;image released;"},
+                                       {"mode 2", "mode 2=0;image released;"}}) {
+    calls.clear();
+    raising = call;
+    EXPECT_THROW(ZORLyraXMLServices::TakeRepImage(rep, "picture.jpg", viewpoint, 0),
+                 std::runtime_error);
+    raising.clear();
+    EXPECT_TRUE(calls.ends_with(releases)) << calls;
+  }
 }
 
 TEST_F(TakeRepImage, NullRepresentationDoesNothing) {
