@@ -5,7 +5,6 @@
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/ReviewInput.h"
-#include "lyra/terminal/Csv.h"
 #include "lyra/terminal/Table.h"
 
 namespace lyra {

@@ -5,9 +5,9 @@
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
+#include "toolkit/records/DocumentRecords.h"
 #include "toolkit/records/DocumentText.h"
 #include "toolkit/records/InterferenceRecord.h"
-#include "toolkit/records/LinkedFiles.h"
 
 namespace lyra {
 using namespace ZORToolkit;

@@ -6,7 +6,6 @@
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
 #include "lyra/commands/RecordsJson.h"
-#include "lyra/terminal/KeyValueList.h"
 #include "lyra/terminal/SafeText.h"
 #include "lyra/terminal/Table.h"
 #include "toolkit/records/DocumentRecords.h"

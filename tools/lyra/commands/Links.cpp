@@ -4,7 +4,7 @@
 #include "lyra/Verbs.h"
 #include "lyra/commands/RecordsJson.h"
 #include "lyra/terminal/Table.h"
-#include "toolkit/records/LinkedFiles.h"
+#include "toolkit/records/DocumentRecords.h"
 
 namespace lyra {
 using namespace ZORToolkit;

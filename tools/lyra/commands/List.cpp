@@ -5,7 +5,6 @@
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/RecordsJson.h"
-#include "lyra/terminal/Csv.h"
 #include "lyra/terminal/Table.h"
 #include "toolkit/review/Match.h"
 

@@ -5,7 +5,7 @@
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/RecordsJson.h"
-#include "lyra/terminal/KeyValueList.h"
+#include "lyra/terminal/Table.h"
 #include "toolkit/review/Match.h"
 
 namespace lyra {

@@ -3,6 +3,7 @@
 #define ZOR_TOOLS_LYRA_MANUAL_COMMAND_TABLE_H
 
 #include <string>
+#include <string_view>
 #include <vector>
 
 namespace lyra {
@@ -43,6 +44,20 @@ struct CommandTable {
 };
 
 CommandTable TableOfCommand();
+
+/// The manual page, in the macros of man(7).
+std::string ManualPage(const CommandTable& inTable);
+
+// What a shell reads to complete the command's words.
+std::string BashCompletion(const CommandTable& inTable);
+std::string ZshCompletion(const CommandTable& inTable);
+std::string FishCompletion(const CommandTable& inTable);
+
+// Small pieces of text
+std::string Joined(const std::vector<std::string>& inTexts, std::string_view inBetween);
+std::string Replaced(std::string inText, std::string_view inOld, std::string_view inNew);
+/// With a backslash before each of these characters.
+std::string Escaped(std::string_view inText, std::string_view inCharacters);
 
 }  // namespace lyra
 

@@ -1,4 +1,4 @@
-#include "lyra/manual/Papers.h"
+#include "lyra/manual/CommandTable.h"
 
 namespace lyra {
 namespace {

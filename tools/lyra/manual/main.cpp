@@ -3,7 +3,7 @@
 #include <exception>
 #include <string>
 
-#include "lyra/manual/Papers.h"
+#include "lyra/manual/CommandTable.h"
 
 namespace {
 

@@ -1,8 +1,11 @@
-// A table of texts in aligned columns.
+// Tables and lists of texts, as people and programs read them.
 #ifndef ZOR_TOOLS_LYRA_TERMINAL_TABLE_H
 #define ZOR_TOOLS_LYRA_TERMINAL_TABLE_H
 
+#include <initializer_list>
 #include <string>
+#include <string_view>
+#include <utility>
 #include <vector>
 
 #include "lyra/terminal/Output.h"
@@ -34,6 +37,30 @@ class Table {
   std::vector<int> natural_;  // widths of the widest texts
   std::vector<std::vector<std::string>> rows_;
 };
+
+/// Collects what is known of one thing and prints it under a heading.
+class KeyValueList {
+ public:
+  /// @param inHeading, inValue as documents have them: they are made printable here.
+  explicit KeyValueList(const std::string& inHeading);
+  /// A pair whose value is empty is left out.
+  void Add(const std::string& inName, const std::string& inValue);
+  void Add(std::initializer_list<std::pair<const char*, const std::string&>> inPairs);
+  /// A line of its own for a group of the pairs that follow.
+  void AddGroup(const std::string& inName);
+  void Print(Output& ioOutput) const;
+
+ private:
+  std::string heading_;
+  std::vector<std::pair<std::string, std::string>> pairs_;  // a group has no value
+};
+
+/// A text as a cell: quoted where it must be. A text that a spreadsheet would take for a formula,
+/// because it begins with = + - @, a tab or a carriage return and is no plain number, gets an
+/// apostrophe in front.
+std::string CsvCell(std::string_view inText);
+/// The cells joined by commas, with the line end that the format asks for.
+std::string CsvRow(const std::vector<std::string>& inCells);
 
 }  // namespace lyra
 
