@@ -7,7 +7,7 @@
 #include <string>
 #include <string_view>
 
-#include "foundation/FileError.h"
+#include "foundation/Descriptor.h"
 #include "foundation/TerminationSignals.h"
 
 namespace ZORFoundation {

@@ -1,9 +1,12 @@
-// Open files. The functions return 0, or the errno value of what failed.
+// Open files. The functions return 0, or the errno value of what failed; others raise it as FileError.
 #ifndef ZOR_FOUNDATION_DESCRIPTOR_H
 #define ZOR_FOUNDATION_DESCRIPTOR_H
 
 #include <cstddef>
+#include <stdexcept>
+#include <string>
 #include <string_view>
+#include <system_error>
 #include <utility>
 
 #include "ZORFoundationExport.h"
@@ -40,6 +43,27 @@ class Descriptor {
 
 /// Copies the rest of one open file into another.
 ZOR_FOUNDATION_EXPORT int CopyBytes(int inSource, int inTarget);
+
+/// A file operation failed. Its text is "PATH: REASON".
+class ZOR_FOUNDATION_EXPORT FileError : public std::runtime_error {
+ public:
+  /// @param inCode an errno value, whose text is the reason.
+  FileError(const std::string& inPath, int inCode)
+      : FileError(inPath, inCode, std::generic_category().message(inCode)) {}
+  FileError(const std::string& inPath, int inCode, const std::string& inReason)
+      : std::runtime_error(inPath + ": " + inReason), reasonStart_(inPath.size() + 2) {
+    code_ = inCode;
+  }
+
+  /// The errno value; ESPIPE for what is neither a file nor a folder, EFBIG for what is too large.
+  int Code() const { return code_; }
+  std::string Path() const { return std::string(what(), reasonStart_ - 2); }
+  std::string Reason() const { return what() + reasonStart_; }
+
+ private:
+  std::size_t reasonStart_;
+  int code_ = 0;
+};
 
 }  // namespace ZORFoundation
 

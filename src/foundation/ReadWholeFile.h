@@ -8,7 +8,6 @@
 #include <string>
 
 #include "foundation/Descriptor.h"
-#include "foundation/FileError.h"
 
 namespace ZORFoundation {
 

@@ -1,6 +1,6 @@
-#include "lyra/terminal/Csv.h"
-
 #include <gtest/gtest.h>
+
+#include "lyra/terminal/Table.h"
 
 using lyra::CsvCell;
 using lyra::CsvRow;

@@ -6,7 +6,7 @@
 #include <optional>
 
 #include "foundation/AtomicFile.h"
-#include "foundation/FileError.h"
+#include "foundation/Descriptor.h"
 #include "foundation/Hash.h"
 #include "foundation/ReadWholeFile.h"
 #include "platform/system/ZORGetEnv.h"

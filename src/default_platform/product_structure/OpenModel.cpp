@@ -9,7 +9,7 @@
 #include "default_platform/product_structure/ModelDocument.h"
 #include "default_platform/product_structure/ModelFormat.h"
 #include "default_platform/product_structure/ModelReader.h"
-#include "foundation/FileError.h"
+#include "foundation/Descriptor.h"
 #include "foundation/ReadWholeFile.h"
 
 namespace ZORDefault {

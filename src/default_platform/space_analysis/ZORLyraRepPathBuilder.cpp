@@ -3,13 +3,9 @@
 #include "default_platform/product_structure/Product.h"
 #include "default_platform/system/ObjectCounters.h"
 #include "platform/visualisation/ZORI3DGeoVisu.h"
+#include "platform/visualisation/ZORRepPath.h"
 
 namespace {
-
-ZORDefault::ObjectCounter& Counter() {
-  static ZORDefault::ObjectCounter& counter = ZORDefault::CounterOf("ZORLyraRepPathBuilder");
-  return counter;
-}
 
 ZORIProduct_var RootOf(const ZORIProduct_var& inProduct) {
   ZORIProduct_var root = inProduct;
@@ -32,14 +28,16 @@ ZORIProduct_var Resolve(const ZORIProduct_var& inProduct, const ZORUnicodeString
 
 }  // namespace
 
-ZORLyraRepPathBuilder::ZORLyraRepPathBuilder(int) { ++Counter().built; }
+ZORLyraRepPathBuilder::ZORLyraRepPathBuilder(int) {
+  ++ZORDefault::CounterOf<ZORLyraRepPathBuilder>("ZORLyraRepPathBuilder").built;
+}
 
 ZORLyraRepPathBuilder::~ZORLyraRepPathBuilder() {
   for (ZORRepPath* const path : paths_) {
     path->builder_ = nullptr;
     delete path;
   }
-  ++Counter().released;
+  ++ZORDefault::CounterOf<ZORLyraRepPathBuilder>("ZORLyraRepPathBuilder").released;
 }
 
 HRESULT ZORLyraRepPathBuilder::GetRepPathFromSpecObjV4(ZORIProduct_var inProduct,
@@ -54,3 +52,17 @@ HRESULT ZORLyraRepPathBuilder::GetRepPathFromSpecObjV4(ZORIProduct_var inProduct
   paths_.push_back(outPath);
   return S_OK;
 }
+
+ZORRepPath::ZORRepPath(ZORLyraRepPathBuilder* inBuilder, ZORRep* inRep)
+    : builder_(inBuilder), reps_{inRep} {
+  ++ZORDefault::CounterOf<ZORRepPath>("ZORRepPath").built;
+}
+
+ZORRepPath::~ZORRepPath() {
+  if (builder_) std::erase(builder_->paths_, this);
+  ++ZORDefault::CounterOf<ZORRepPath>("ZORRepPath").released;
+}
+
+void ZORRepPath::Rewind() { next_ = 0; }
+
+ZORRep* ZORRepPath::NextChildRep() { return next_ < reps_.size() ? reps_[next_++] : nullptr; }

@@ -25,6 +25,13 @@ struct ObjectCounter {
 /// The counter of a class, made when it is first asked for; lives until the process ends.
 ZOR_PLATFORM_EXPORT ObjectCounter& CounterOf(const char* inClassName);
 
+/// The same for a given class, which has no base of ours.
+template <class Class>
+ObjectCounter& CounterOf(const char* inClassName) {
+  static ObjectCounter& counter = CounterOf(inClassName);
+  return counter;
+}
+
 /// Base of a class whose objects are counted:
 ///   class PrintImage : public ZORPrint3DRepImage, private CountedObject<PrintImage>
 /// with a public `static const char* CountedName()`. A class derived from a counted class is

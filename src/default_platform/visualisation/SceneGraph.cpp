@@ -6,6 +6,7 @@
 #include "default_platform/system/ObjectCounters.h"
 #include "default_platform/visualisation/BoundingSphere.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
+#include "platform/visualisation/ZORIVisProperties.h"
 #include "platform/visualisation/ZORRep.h"
 
 ZORRep::ZORRep() = default;
@@ -50,11 +51,6 @@ void PlacedMeshRep::Accept(ZOR3DSceneVisitor& ioVisitor) const { ioVisitor.Visit
 
 namespace {
 
-ZORDefault::ObjectCounter& Counter() {
-  static ZORDefault::ObjectCounter& counter = ZORDefault::CounterOf("ZOR3DBagRep");
-  return counter;
-}
-
 void AddTo(ZORDefault::BoundingSphere& ioSphere, const ZOR3DRep& inRep) {
   if (const auto* const bag = dynamic_cast<const ZOR3DBagRep*>(&inRep)) {
     for (const ZOR3DRep* const child : bag->GetChildren()) AddTo(ioSphere, *child);
@@ -67,8 +63,8 @@ void AddTo(ZORDefault::BoundingSphere& ioSphere, const ZOR3DRep& inRep) {
 
 }  // namespace
 
-ZOR3DBagRep::ZOR3DBagRep() { ++Counter().built; }
-ZOR3DBagRep::~ZOR3DBagRep() { ++Counter().released; }
+ZOR3DBagRep::ZOR3DBagRep() { ++ZORDefault::CounterOf<ZOR3DBagRep>("ZOR3DBagRep").built; }
+ZOR3DBagRep::~ZOR3DBagRep() { ++ZORDefault::CounterOf<ZOR3DBagRep>("ZOR3DBagRep").released; }
 
 void ZOR3DBagRep::AddChild(ZORRep* inChild) {
   if (auto* const child = dynamic_cast<ZOR3DRep*>(inChild)) children_.push_back(child);
@@ -144,3 +140,31 @@ std::vector<MeshInstance> CollectMeshInstances(const ZOR3DRep& inRep) {
 }
 
 }  // namespace ZORDefault
+
+HRESULT ZORVisPropertiesValues::GetInheritance(int inPropertyType, unsigned int& outFlag) const {
+  if (inPropertyType != kColour) return E_INVALIDARG;
+  if (!hasColour_) return E_FAIL;
+  outFlag = colourInheritance_;
+  return S_OK;
+}
+
+HRESULT ZORVisPropertiesValues::GetColor(unsigned int& outRed, unsigned int& outGreen,
+                                         unsigned int& outBlue) const {
+  if (!hasColour_) return E_FAIL;
+  outRed = colour_[0];
+  outGreen = colour_[1];
+  outBlue = colour_[2];
+  return S_OK;
+}
+
+void ZORVisPropertiesValues::SetColor(unsigned int inRed, unsigned int inGreen,
+                                      unsigned int inBlue) {
+  hasColour_ = true;
+  colour_[0] = inRed;
+  colour_[1] = inGreen;
+  colour_[2] = inBlue;
+}
+
+void ZORVisPropertiesValues::SetInheritance(int inPropertyType, unsigned int inFlag) {
+  if (inPropertyType == kColour) colourInheritance_ = inFlag;
+}

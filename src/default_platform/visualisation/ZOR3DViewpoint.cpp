@@ -14,11 +14,6 @@ namespace {
 constexpr double kDefaultAngle = 30 * 3.14159265358979323846 / 180;
 constexpr double kDefaultDistance = 100;
 
-ZORDefault::ObjectCounter& Counter() {
-  static ZORDefault::ObjectCounter& counter = ZORDefault::CounterOf("ZOR3DViewpoint");
-  return counter;
-}
-
 /// The sphere with non-finite values replaced.
 ZOR3DBoundingSphere Framed(const ZOR3DBoundingSphere& inSphere) {
   return {ZORFoundation::IsFinite(inSphere.centre) ? inSphere.centre : ZORMathVector(),
@@ -35,11 +30,11 @@ ZOR3DViewpoint::ZOR3DViewpoint()
       viewHeight(kDefaultDistance) {
   up = ZORDefault::NormalizeOr({-1, -1, 2}, up);
   origin = {-sight.x * focusDistance, -sight.y * focusDistance, -sight.z * focusDistance};
-  ++Counter().built;
+  ++ZORDefault::CounterOf<ZOR3DViewpoint>("ZOR3DViewpoint").built;
 }
 
 ZOR3DViewpoint::ZOR3DViewpoint(const ZOR3DViewpoint& inOther) : ZORBaseUnknown(inOther) {
-  ++Counter().built;
+  ++ZORDefault::CounterOf<ZOR3DViewpoint>("ZOR3DViewpoint").built;
   *this = inOther;
 }
 
@@ -56,7 +51,9 @@ ZOR3DViewpoint& ZOR3DViewpoint::operator=(const ZOR3DViewpoint& inOther) {
   return *this;
 }
 
-ZOR3DViewpoint::~ZOR3DViewpoint() { ++Counter().released; }
+ZOR3DViewpoint::~ZOR3DViewpoint() {
+  ++ZORDefault::CounterOf<ZOR3DViewpoint>("ZOR3DViewpoint").released;
+}
 
 void ZOR3DViewpoint::Reframe(float inWidth, float inHeight, float inWidthScale, float inHeightScale,
                              const ZOR3DBoundingSphere& inSphere) {

@@ -10,7 +10,7 @@
 #include <thread>
 #include <vector>
 
-#include "foundation/FileError.h"
+#include "foundation/Descriptor.h"
 #include "toolkit/Error.h"
 
 namespace fs = std::filesystem;

@@ -1,4 +1,4 @@
-// What a document says besides its interferences.
+// What a document says besides its interferences, and the files that it links.
 #ifndef ZOR_TOOLKIT_RECORDS_DOCUMENT_RECORDS_H
 #define ZOR_TOOLKIT_RECORDS_DOCUMENT_RECORDS_H
 
@@ -81,6 +81,19 @@ ZOR_TOOLKIT_EXPORT std::vector<ComponentRecord> ReadComponents(ClashDocument& io
 ZOR_TOOLKIT_EXPORT std::vector<SpecificationRecord> ReadSpecifications(ClashDocument& ioDocument);
 /// Empty for a document that is no federator document.
 ZOR_TOOLKIT_EXPORT std::vector<LinkRecord> ReadLinks(ClashDocument& ioDocument);
+
+/// The reference by which a federator document links a file: relative to the federator document
+/// where the file's path is relative. @param inFederator "-" stands in the current directory.
+ZOR_TOOLKIT_EXPORT std::string LinkTo(const std::string& inFile, const std::string& inFederator);
+/// The path of a linked file: logical names are resolved, and what is relative is so to the
+/// federator document. Empty when there is no such path.
+ZOR_TOOLKIT_EXPORT std::string LinkedPath(const std::string& inLink,
+                                          const std::string& inFederator);
+
+/// For each link what is wrong with it: missing, unreadable, of the wrong kind or listed twice;
+/// empty when nothing is.
+ZOR_TOOLKIT_EXPORT std::vector<std::string> CheckLinks(const std::vector<LinkRecord>& inLinks,
+                                                       const std::string& inFederator);
 
 }  // namespace ZORToolkit
 

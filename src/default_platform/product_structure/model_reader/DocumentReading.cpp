@@ -17,16 +17,24 @@
 #include <STEPCAFControl_Controller.hxx>
 #include <STEPCAFControl_ExternFile.hxx>
 #include <STEPCAFControl_Reader.hxx>
+#include <Standard_Failure.hxx>
 #include <TopoDS_Compound.hxx>
 #include <TopoDS_Face.hxx>
+#include <TopoDS_Shape.hxx>
 #include <Transfer_TransientProcess.hxx>
 #include <XCAFDoc_DocumentTool.hxx>
 #include <XCAFDoc_ShapeTool.hxx>
 #include <XSControl_TransferReader.hxx>
 #include <XSControl_WorkSession.hxx>
 #include <algorithm>
+#include <exception>
 #include <filesystem>
 #include <string_view>
+
+#include "default_platform/ModelShapes.h"
+#include "default_platform/product_structure/ModelFormat.h"
+#include "default_platform/product_structure/model_reader/TreeWalk.h"
+#include "foundation/ReadWholeFile.h"
 
 namespace ZORDefault {
 namespace {
@@ -218,6 +226,32 @@ LoadedDocument ReadDocument(const ModelRequest& inRequest, const Message_Progres
   loaded.document = NewDocument();
   if (!Read(inRequest, inProgress, inTellStage, loaded)) loaded.document.Nullify();
   return loaded;
+}
+
+bool ReadModelShapes(const std::string& inPath, std::vector<TopoDS_Shape>& outShapes,
+                     std::string& outReason) try {
+  ModelRequest request;
+  request.path = std::filesystem::absolute(inPath).string();
+  request.format = DecideFormat(inPath, ZORFoundation::ReadWholeFile(inPath).bytes, outReason);
+  if (request.format == ModelFormat::kUnknown) return false;
+  PrepareReaders();
+  const LoadedDocument loaded = ReadDocument(request, {});
+  if (loaded.document.IsNull()) {
+    outReason = std::string("cannot be read as ") + NameOfFormat(request.format);
+    return false;
+  }
+  ModelData model;
+  std::vector<TopoDS_Shape> shapes;
+  for (const TDF_Label& label : WalkTree(loaded.document, model))
+    shapes.push_back(label.IsNull() ? TopoDS_Shape() : XCAFDoc_ShapeTool::GetShape(label));
+  outShapes = std::move(shapes);
+  return true;
+} catch (const Standard_Failure& failure) {
+  outReason = failure.GetMessageString();
+  return false;
+} catch (const std::exception& error) {
+  outReason = error.what();
+  return false;
 }
 
 }  // namespace ZORDefault

@@ -2,11 +2,14 @@
 #ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_MESHBUILDER_H
 #define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_MESHBUILDER_H
 
+#include <TDF_Label.hxx>
 #include <TopTools_IndexedMapOfShape.hxx>
 #include <array>
 #include <cstdint>
 #include <gp_XYZ.hxx>
 #include <vector>
+
+#include "default_platform/product_structure/ModelData.h"
 
 namespace ZORDefault {
 
@@ -53,6 +56,12 @@ void AddSurfaceEdges(const TopoDS_Shape& inShape, const TopTools_IndexedMapOfSha
                      const std::vector<std::uint32_t>& inFirstPoints, MeshBuilder& ioBuilder);
 
 inline constexpr std::uint32_t kNoPoints = 0xFFFFFFFF;
+
+/// Fills the part's mesh, its area, and its counts of what has no triangles. On failure the part has
+/// no mesh.
+/// @param inDeflection as a share of the diagonal of the part's box.
+/// @return false when the kernel raised an error. Raises std::bad_alloc.
+bool MeshPart(const TDF_Label& inPart, double inDeflection, ModelPart& ioPart);
 
 }  // namespace ZORDefault
 

@@ -1,5 +1,3 @@
-#include "default_platform/product_structure/model_reader/PartMeshing.h"
-
 #include <BRepBndLib.hxx>
 #include <BRepMesh_IncrementalMesh.hxx>
 #include <BRep_Tool.hxx>

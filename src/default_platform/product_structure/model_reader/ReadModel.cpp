@@ -1,5 +1,8 @@
 // The program that reads models: damaged ones may crash the CAD kernel, which must not be in a host's
 // process.
+#include <signal.h>
+#include <sys/prctl.h>
+#include <sys/resource.h>
 #include <unistd.h>
 
 #include <Message_ProgressIndicator.hxx>
@@ -7,6 +10,8 @@
 #include <Standard_Failure.hxx>
 #include <Standard_OutOfMemory.hxx>
 #include <algorithm>
+#include <cmath>
+#include <cstddef>
 #include <cstdlib>
 #include <exception>
 #include <filesystem>
@@ -16,9 +21,8 @@
 
 #include "default_platform/product_structure/model_reader/DocumentReading.h"
 #include "default_platform/product_structure/model_reader/FileDoor.h"
+#include "default_platform/product_structure/model_reader/MeshBuilder.h"
 #include "default_platform/product_structure/model_reader/ModelChecks.h"
-#include "default_platform/product_structure/model_reader/PartMeshing.h"
-#include "default_platform/product_structure/model_reader/ProcessLimits.h"
 #include "default_platform/product_structure/model_reader/TreeWalk.h"
 #include "foundation/Descriptor.h"
 #include "foundation/ReadWholeFile.h"
@@ -173,6 +177,32 @@ int Refuse(const std::string& inReason) {
   return Answer(ModelReaderProtocol::kExitRefused, inReason);
 }
 
+void SetLimit(__rlimit_resource inResource, double inSoft, double inHard) {
+  rlimit limit;
+  if (getrlimit(inResource, &limit) != 0) return;
+  // A lower limit of whoever started this process stays.
+  const auto lower = [&limit](double inWanted) {
+    return inWanted < static_cast<double>(limit.rlim_max) ? static_cast<rlim_t>(inWanted)
+                                                          : limit.rlim_max;
+  };
+  limit = {lower(inSoft), lower(inHard)};
+  setrlimit(inResource, &limit);
+}
+
+/// Limits this process's processor time and memory, and ends it with its parent. An allocation that
+/// fails ends it too, see malloc below: the kernel would go on and leave out what it had no memory
+/// for.
+void SetProcessLimits(const ModelLimits& inLimits) {
+  const double seconds = std::ceil(inLimits.seconds);
+  SetLimit(RLIMIT_CPU, seconds, seconds + 1);
+  SetLimit(RLIMIT_CORE, 0, 0);
+#ifndef __SANITIZE_ADDRESS__  // which maps far more than it uses
+  const auto memory = static_cast<double>(inLimits.memory);
+  SetLimit(RLIMIT_DATA, memory, memory);
+#endif
+  prctl(PR_SET_PDEATHSIG, SIGKILL);
+}
+
 int Run(char** inArguments) try {
   ModelRequest request;
   request.format = static_cast<ModelFormat>(std::atoi(inArguments[1]));
@@ -202,6 +232,30 @@ int Run(char** inArguments) try {
 // A crash of the kernel ends this process by its signal, as it does without the sanitizer.
 extern "C" __attribute__((visibility("default"))) const char* __asan_default_options() {
   return "handle_segv=0:handle_sigbus=0:handle_sigfpe=0";
+}
+#else
+// A program's own functions come before those of the C library, for all libraries that it loads.
+extern "C" {
+
+void* __libc_malloc(std::size_t inSize);
+void* __libc_calloc(std::size_t inCount, std::size_t inSize);
+void* __libc_realloc(void* inOld, std::size_t inSize);
+
+static void* Checked(void* inBlock) {
+  if (inBlock == nullptr) _exit(ZORDefault::ModelReaderProtocol::kExitOutOfMemory);
+  return inBlock;
+}
+
+__attribute__((visibility("default"))) void* malloc(std::size_t inSize) {
+  return Checked(__libc_malloc(inSize));
+}
+__attribute__((visibility("default"))) void* calloc(std::size_t inCount, std::size_t inSize) {
+  return Checked(__libc_calloc(inCount, inSize));
+}
+__attribute__((visibility("default"))) void* realloc(void* inOld, std::size_t inSize) {
+  void* const block = __libc_realloc(inOld, inSize);
+  return inSize == 0 ? block : Checked(block);
+}
 }
 #endif
 

@@ -36,7 +36,7 @@ struct View {
   Vector3f RayDirection(RasterPoint inPoint) const {
     return isPerspective ? InPlane(inPoint, 1) : Vector3f{0, 0, 1};
   }
-  /// Perspective: 1 / depth; orthographic: -depth. Matrix3f in raster space along lines and over planes.
+  /// Perspective: 1 / depth; orthographic: -depth. Linear in raster space along lines and over planes.
   float InverseDepth(float inDepth) const { return isPerspective ? 1 / inDepth : -inDepth; }
   /// The change of inverse depth over a depth of one pixel's size.
   float InverseDepthPerPixel(float inInverseDepth) const {
