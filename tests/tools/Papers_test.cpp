@@ -199,8 +199,9 @@ TEST(BashCompletion, OffersTheWordsAfterAnEqualsSign) {
 }
 
 TEST(BashCompletion, FindsTheVerbBehindTheLanguage) {
-  EXPECT_THAT(InBash({"lyra", "--lang", "fr", "convert", "--to", ""}), ElementsAre("json"));
-  EXPECT_THAT(InBash({"lyra", "--lang", "=", "fr", "convert", "--to", ""}), ElementsAre("json"));
+  EXPECT_THAT(InBash({"lyra", "--lang", "fr", "convert", "--to", ""}), ElementsAre("json", "bcf"));
+  EXPECT_THAT(InBash({"lyra", "--lang", "=", "fr", "convert", "--to", ""}),
+              ElementsAre("json", "bcf"));
 }
 
 TEST(BashCompletion, LeavesFilesToTheShell) {
@@ -256,7 +257,7 @@ TEST(FishCompletion, HasEveryOptionOfEveryVerb) {
 TEST(FishCompletion, OffersVerbsOptionsAndWords) {
   if (!HasShell("fish")) GTEST_SKIP() << "there is no fish";
   EXPECT_EQ(InFish("lyra "), Verbs());
-  EXPECT_THAT(InFish("lyra --lang fr convert --to "), ElementsAre("json"));
+  EXPECT_THAT(InFish("lyra --lang fr convert --to "), ElementsAre("bcf", "json"));
   EXPECT_THAT(InFish("lyra list --type c"), ElementsAre("clash", "clearance", "contact"));
   EXPECT_THAT(InFish("lyra render --k"), ElementsAre("--keep-background"));
 }

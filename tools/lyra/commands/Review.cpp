@@ -1,4 +1,4 @@
-// lyra carry OLD NEW -o OUT, lyra review set|apply|merge … -o OUT
+// lyra carry OLD NEW -o OUT, lyra review set|apply|merge|import … -o OUT
 #include <algorithm>
 #include <cstdio>
 #include <memory>
@@ -9,6 +9,7 @@
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/GroupOptions.h"
+#include "lyra/commands/ReviewImport.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Table.h"
 #include "toolkit/review/Carry.h"
@@ -180,9 +181,16 @@ int Merge(const ReviewOptions& inOptions, Output& ioOutput) {
   return plan.conflicts.empty() || preference != Preference::kNone ? 0 : kConflicts;
 }
 
+int Import(const ReviewOptions& inOptions, Output& ioOutput) {
+  RequireFiles(inOptions, 2, "a RESULT and what was made of it, such as FILE.bcf");
+  return ImportReview({inOptions.files[0], inOptions.files[1], inOptions.output,
+                       inOptions.grouping.Get(), inOptions.json},
+                      ioOutput);
+}
+
 int Review(const ReviewOptions& inOptions, Output& ioOutput) {
-  constexpr const char* kActions[] = {"set", "apply", "merge"};
-  constexpr int (*kDo[])(const ReviewOptions&, Output&) = {Set, Apply, Merge};
+  constexpr const char* kActions[] = {"set", "apply", "merge", "import"};
+  constexpr int (*kDo[])(const ReviewOptions&, Output&) = {Set, Apply, Merge, Import};
   const std::size_t action = ChosenWord("review", inOptions.action, kActions);
   ChooseLanguage(inOptions.language);
   return kDo[action](inOptions, ioOutput);
@@ -207,10 +215,14 @@ VerbAction DeclareCarry(Arguments& ioArguments) {
 VerbAction DeclareReview(Arguments& ioArguments) {
   const auto options = std::make_shared<ReviewOptions>();
   ioArguments.Positional("ACTION", options->action,
-                         "set: decide in bulk; apply: take in a review file; merge: three ways");
-  ioArguments.Positionals("FILE", options->files,
-                          "set: RESULT; apply: RESULT REVIEW.json; merge: BASE MINE THEIRS");
-  ioArguments.RequiredText("-o,--output", "OUT", options->output, "Where the result is written");
+                         "set: decide in bulk; apply: take in a review file; merge: three ways; "
+                         "import: make a review file of what was done in other tools");
+  ioArguments.Positionals(
+      "FILE", options->files,
+      "set: RESULT; apply: RESULT REVIEW.json; merge: BASE MINE THEIRS; import: "
+      "RESULT FILE.bcf");
+  ioArguments.RequiredText("-o,--output", "OUT", options->output,
+                           "Where the result, or the review file of import, is written");
   ioArguments.Texts("--only", "CONDITIONS", options->only,
                     "set: those such as type=clash,product=bolt; several words are alternatives");
   ioArguments.Text("--group", "ID", options->group,
@@ -224,7 +236,8 @@ VerbAction DeclareReview(Arguments& ioArguments) {
   ioArguments.Text("--prefer", "SIDE", options->prefer,
                    "apply, merge: whose decision counts where both differ, mine or theirs");
   ioArguments.Words("--prefer", kPreferences);
-  ioArguments.Flag("--json", options->json, "apply, merge: print the conflicts as JSON");
+  ioArguments.Flag("--json", options->json,
+                   "apply, merge: print the conflicts as JSON; import: what became of it");
   ioArguments.Language(options->language);
   return [options](Output& ioOutput) { return Review(*options, ioOutput); };
 }

@@ -1,0 +1,261 @@
+// What other tools get from the command, and what comes back from them.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <fstream>
+#include <nlohmann/json.hpp>
+#include <regex>
+
+#include "toolkit/exchange/WrittenArchive.h"
+#include "tools/Command.h"
+
+using nlohmann::json;
+using testing::AllOf;
+using testing::HasSubstr;
+using testing::MatchesRegex;
+using testing::Not;
+using testing::SizeIs;
+using testing::StartsWith;
+
+namespace {
+
+namespace fs = std::filesystem;
+
+constexpr char kResult[] = "samples/as1.clash.xml";
+
+/// Runs the command, which succeeds.
+std::string Lyra(const std::vector<std::string>& inArguments) {
+  const CommandResult result = RunCommand(inArguments);
+  EXPECT_EQ(result.code, 0) << result.error;
+  return result.out;
+}
+
+json ListOf(const std::string& inResult) { return json::parse(Lyra({"list", "--json", inResult})); }
+
+/// The files of an archive in a folder of their own, validated against the official schemas.
+void ExpectValid(const std::string& inArchive, const std::string& inVersion) {
+  if (OfficialFolder().empty()) return;
+  const TemporaryDirectory folder;
+  std::map<std::string, std::string> filesOfSchema;
+  int number = 0;
+  for (const auto& [name, bytes] : ReadArchive(inArchive)) {
+    const std::string file = fs::path(name).filename();
+    const std::string schema = file == "markup.bcf"       ? "markup"
+                               : file == "viewpoint.bcfv" ? "visinfo"
+                               : file == "bcf.version"    ? "version"
+                               : file == "project.bcfp"   ? "project"
+                               : file == "documents.xml"  ? "documents"
+                               : file == "extensions.xml" ? "extensions"
+                                                          : "";
+    if (schema.empty()) continue;
+    filesOfSchema[schema] += " " + folder.Write(std::to_string(++number) + ".xml", bytes);
+  }
+  EXPECT_EQ(filesOfSchema.size(), inVersion == "3.0" ? 6u : 4u);
+  for (const auto& [schema, files] : filesOfSchema) {
+    const CommandResult checked = RunShell("xmllint --noout --schema " + OfficialFolder() +
+                                           "/schemas/" + inVersion + "/" + schema + ".xsd" + files);
+    EXPECT_EQ(checked.code, 0) << schema << ": " << checked.error;
+  }
+}
+
+std::vector<std::string> NamesIn(const std::string& inArchive, const std::string& inEnding) {
+  std::vector<std::string> names;
+  for (const auto& [name, bytes] : ReadArchive(inArchive))
+    if (name.ends_with(inEnding)) names.push_back(name);
+  return names;
+}
+
+std::string Replaced(const std::string& inText, const std::string& inOld,
+                     const std::string& inNew) {
+  const std::size_t at = inText.find(inOld);
+  EXPECT_NE(at, std::string::npos) << inOld;
+  if (at == std::string::npos) return inText;
+  return inText.substr(0, at) + inNew + inText.substr(at + inOld.size());
+}
+
+/// The archive with what an edit makes of the markup of the topic whose title begins so.
+template <class Edit>
+std::string EditedBcf(const std::string& inArchive, const std::string& inTitle, bool inKeepsResult,
+                      const Edit& inEdit) {
+  Entries entries;
+  int edited = 0;
+  for (auto& [name, bytes] : ReadArchive(inArchive)) {
+    const bool isIt =
+        name.ends_with("markup.bcf") && bytes.find("<Title>" + inTitle) != std::string::npos;
+    edited += isIt ? 1 : 0;
+    if (inKeepsResult || name.find(".clash.xml") == std::string::npos)
+      entries.emplace_back(name, isIt ? inEdit(bytes) : bytes);
+  }
+  EXPECT_EQ(edited, 1);
+  return WriteArchive("edited.bcf", entries);
+}
+
+std::string Work(std::string inMarkup) {
+  inMarkup = Replaced(inMarkup, "TopicStatus=\"Not inspected\"", "TopicStatus=\"Closed\"");
+  inMarkup = Replaced(inMarkup, "<CreationDate>", "<Labels>Piping</Labels><CreationDate>");
+  inMarkup = Replaced(inMarkup, "<Description>",
+                      "<ModifiedDate>2026-12-01T10:00:00Z</ModifiedDate>"
+                      "<ModifiedAuthor>eva@example.com</ModifiedAuthor>"
+                      "<AssignedTo>jo@example.com</AssignedTo><Description>");
+  return Replaced(inMarkup, "<Viewpoints",
+                  "<Comment Guid=\"11111111-2222-3333-4444-555555555555\">"
+                  "<Date>2026-12-01T10:00:00Z</Date><Author>eva@example.com</Author>"
+                  "<Comment>Moved by 5 mm &amp; done</Comment></Comment><Viewpoints");
+}
+
+}  // namespace
+
+TEST(ConvertToBcf, WritesWhatTheOfficialSchemasAllow) {
+  const TemporaryDirectory folder;
+  for (const std::string version : {"2.1", "3.0"}) {
+    SCOPED_TRACE(version);
+    const std::string file = folder.Path(version + ".bcf");
+    const std::vector<std::string> call = {
+        "convert",       kResult,  "--to",    "bcf",
+        "--bcf-version", version,  "--model", "samples/as1-oc-214.stp",
+        "--size",        "120x80", "-o",      file};
+    EXPECT_THAT(Lyra(call), AllOf(HasSubstr("32 topics of 32 interferences, 32 with a picture"),
+                                  HasSubstr("BCF has no place for:\n  value (32)")));
+    ExpectValid(file, version);
+    const auto entries = ReadArchive(file);
+    EXPECT_THAT(NamesIn(file, "/viewpoint.bcfv"), SizeIs(32));
+    for (const std::string& picture : NamesIn(file, "/snapshot.png"))
+      EXPECT_THAT(entries.at(picture), AllOf(StartsWith("\x89PNG"), SizeIs(testing::Gt(300))));
+    const std::string view = entries.at(NamesIn(file, "/viewpoint.bcfv").front());
+    EXPECT_THAT(view, AllOf(Not(HasSubstr("ClippingPlane")), HasSubstr("<FieldOfView>")));
+    EXPECT_EQ(view.find("<AspectRatio>1.5</AspectRatio>") != std::string::npos, version == "3.0");
+    EXPECT_EQ(entries.at("bcf.version").find("DetailedVersion") == std::string::npos,
+              version == "3.0");
+    const json info = json::parse(Lyra({"info", "--json", file}));
+    EXPECT_EQ(info["version"], version);
+    ASSERT_THAT(info["topics"], SizeIs(32));
+    for (const json& topic : info["topics"]) {
+      EXPECT_THAT(topic["guid"].get<std::string>(), MatchesRegex("[0-9a-f-]{36}"));
+      EXPECT_EQ(topic["viewpoints"], 1);
+      EXPECT_EQ(topic["snapshots"], 1);
+    }
+    const std::string again = ReadBytes(file);
+    Lyra(call);
+    EXPECT_EQ(again, ReadBytes(file)) << "the same input makes the same bytes";
+  }
+}
+
+TEST(ConvertToBcf, WritesATopicForEachGroup) {
+  const TemporaryDirectory folder;
+  const std::string file = folder.Path("groups.bcf");
+  const json written = json::parse(Lyra(
+      {"convert", kResult, "--to", "bcf", "--group", "--json", "--size", "60x40", "-o", file}));
+  ExpectValid(file, "2.1");
+  EXPECT_EQ(written["topics"], json::parse(Lyra({"group", "--json", kResult})).size());
+  EXPECT_EQ(written["interferences"], 32);
+  EXPECT_EQ(written["notCarried"][0]["what"], "value");
+  EXPECT_EQ(written["notCarried"][0]["count"], 32);
+  EXPECT_EQ(json::parse(ReadFile(folder.Write(
+                "r.json", Lyra({"review", "import", kResult, file, "-o", "-"}))))["entries"],
+            json::array());
+}
+
+TEST(ConvertToBcf, TopicsKeepTheirGuidsWhenTheResultIsComputedAgain) {
+  const TemporaryDirectory folder;
+  const std::string shorter = folder.Path("shorter.xml");
+  std::string text = ReadFile(std::string(ZOR_SOURCE_DIR "/") + kResult);
+  const std::size_t first = text.find("<Interference "),
+                    second = text.find("<Interference ", first + 1);
+  folder.Write("shorter.xml", text.substr(0, first) + text.substr(second));
+  const auto guids = [&](const std::string& inResult) {
+    const std::string file = folder.Path("guids.bcf");
+    Lyra({"convert", inResult, "--to", "bcf", "--size", "60x40", "-o", file});
+    return NamesIn(file, "/markup.bcf");
+  };
+  const auto before = guids(kResult), after = guids(shorter);
+  EXPECT_THAT(after, SizeIs(before.size() - 1));
+  EXPECT_TRUE(std::includes(before.begin(), before.end(), after.begin(), after.end()));
+}
+
+TEST(ReviewImport, BringsTheWorkOfAnotherToolBack) {
+  const TemporaryDirectory folder;
+  const std::string file = folder.Path("a.bcf"), review = folder.Path("review.json"),
+                    result = folder.Path("reviewed.xml");
+  Lyra({"convert", kResult, "--to", "bcf", "--size", "60x40", "-o", file});
+  for (const bool keepsResult : {true, false}) {
+    const std::string edited = EditedBcf(file, "Contact 3:", keepsResult, Work);
+    EXPECT_THAT(Lyra({"review", "import", kResult, edited, "-o", review}),
+                HasSubstr("32 known, 1 changed"));
+    const json entries = json::parse(ReadFile(review))["entries"];
+    ASSERT_THAT(entries, SizeIs(1));
+    EXPECT_EQ(entries[0]["index"], 3);
+    EXPECT_EQ(entries[0]["baseStatus"], "Not inspected");
+    EXPECT_EQ(entries[0]["status"], "Irrelevant");
+    EXPECT_EQ(entries[0]["assignee"], "jo@example.com");
+    EXPECT_EQ(entries[0]["labels"], json({"Piping"}));
+    EXPECT_EQ(entries[0]["who"], "eva@example.com");
+    EXPECT_EQ(entries[0]["comment"],
+              "to be checked with the supplier\n"
+              "Moved by 5 mm & done (eva@example.com, 2026-12-01)\n"
+              "Assigned to jo@example.com\nLabels: Piping");
+  }
+  Lyra({"review", "apply", kResult, review, "-o", result});
+  EXPECT_EQ(ListOf(result)[2]["status"], "Irrelevant");
+  const json was = ListOf(kResult), is = ListOf(result);
+  for (std::size_t i = 0; i < was.size(); ++i)
+    if (i != 2) {
+      EXPECT_EQ(was[i], is[i]);
+    }
+  // What is in the result already is not brought twice.
+  EXPECT_THAT(
+      Lyra({"review", "import", result, EditedBcf(file, "Contact 3:", true, Work), "-o", review}),
+      HasSubstr("32 known"));
+  EXPECT_EQ(json::parse(ReadFile(review))["entries"][0].value("comment", ""), "");
+}
+
+TEST(ReviewImport, SaysWhatItDoesNotKnow) {
+  const TemporaryDirectory folder;
+  const std::string file = WriteArchive(
+      "foreign.bcf",
+      {{"bcf.version", "<Version VersionId='2.1'/>"},
+       {"a/markup.bcf", "<Markup><Topic Guid='1'><Title>Theirs</Title></Topic></Markup>"}});
+  EXPECT_THAT(Lyra({"review", "import", kResult, file, "-o", folder.Path("r.json")}),
+              AllOf(HasSubstr("the topic \"Theirs\" is of no interference"), HasSubstr("0 known")));
+}
+
+TEST(ConvertToBcf, RefusesWhatCannotBeWritten) {
+  const TemporaryDirectory folder;
+  const auto refusal = [&](std::vector<std::string> inRest) {
+    inRest.insert(inRest.begin(), {"convert", kResult, "--to", "bcf"});
+    const CommandResult result = RunCommand(inRest);
+    EXPECT_NE(result.code, 0);
+    return result.error;
+  };
+  EXPECT_THAT(refusal({}), HasSubstr("--output must name the file"));
+  EXPECT_THAT(refusal({"--size", "1600x900", "-o", folder.Path("a")}), HasSubstr("1500 pixels"));
+  EXPECT_THAT(refusal({"--bcf-version", "4", "-o", folder.Path("a")}), HasSubstr("2.1, 3.0"));
+  EXPECT_THAT(refusal({"-o", folder.Path("no/where.bcf")}), HasSubstr("No such file"));
+  EXPECT_FALSE(fs::exists(folder.Path("a")));
+}
+
+TEST(ConvertToBcf, IsReadByAReaderThatNobodyHereWrote) {
+  const std::string modules = ZOR_BINARY_DIR "/peers/node_modules";
+  if (!fs::exists(modules + "/@parametricos/bcf-js"))
+    GTEST_SKIP() << "npm install --prefix build/peers @parametricos/bcf-js has not been run";
+  const TemporaryDirectory folder;
+  const std::string file = folder.Path("a.bcf");
+  Lyra({"convert", kResult, "--to", "bcf", "--size", "60x40", "-o", file});
+  const std::string program = folder.Write("read.cjs", R"(
+const {BcfReader} = require('@parametricos/bcf-js/dist/2.1');
+const reader = new BcfReader();
+reader.read(require('fs').readFileSync(process.argv[2])).then(async () => {
+  let components = 0, pictures = 0;
+  for (const markup of reader.markups) {
+    const view = markup.viewpoints[0];
+    components += view.components.selection.length;
+    pictures += (await markup.getViewpointSnapshot(view)).length > 60 ? 1 : 0;
+  }
+  const first = reader.markups.find(markup => markup.topic.title.startsWith('Contact 3:'));
+  console.log([reader.markups.length, components, pictures, first.topic.topic_status,
+               first.topic.comments[0].comment].join('|'));
+});
+)");
+  const CommandResult read = RunShell("NODE_PATH='" + modules + "' node " + program + " " + file);
+  EXPECT_EQ(read.out, "32|64|32|Not inspected|to be checked with the supplier\n") << read.error;
+}

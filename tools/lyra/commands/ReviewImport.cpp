@@ -1,0 +1,49 @@
+#include "lyra/commands/ReviewImport.h"
+
+#include <cstdio>
+
+#include "foundation/ReadWholeFile.h"
+#include "lyra/CommandErrors.h"
+#include "lyra/commands/ReviewInput.h"
+#include "lyra/terminal/SafeText.h"
+#include "toolkit/exchange/ReviewImport.h"
+
+namespace lyra {
+using namespace ZORToolkit;
+namespace {
+
+/// What became of the work, where the review file does not go.
+void Report(const ReviewImportOptions& inOptions, const ImportedReview& inReview,
+            Output& ioOutput) {
+  std::string text;
+  if (inOptions.json) {
+    text = JsonLine({{"file", inOptions.file},
+                     {"seen", inReview.seen},
+                     {"changed", inReview.entries.size()},
+                     {"notes", inReview.notes}}) +
+           "\n";
+  } else {
+    for (const std::string& note : inReview.notes) text += "note: " + Printable(note) + "\n";
+    text += std::to_string(inReview.seen) + " known, " + std::to_string(inReview.entries.size()) +
+            " changed\n";
+  }
+  if (inOptions.output == "-")
+    std::fputs(text.c_str(), stderr);
+  else
+    ioOutput.Write(text);
+}
+
+}  // namespace
+
+int ImportReview(const ReviewImportOptions& inOptions, Output& ioOutput) {
+  ReviewInput input(inOptions.result);
+  const ImportedReview review =
+      ImportBcf(input.result, ReadBcf(inOptions.file), inOptions.grouping);
+  OutputFile output(inOptions.output);
+  ZORFoundation::WriteWholeFile(output.Path(), ReviewFileText(review, DocumentHash(input.bytes)));
+  output.Finish(ioOutput);
+  Report(inOptions, review, ioOutput);
+  return 0;
+}
+
+}  // namespace lyra
