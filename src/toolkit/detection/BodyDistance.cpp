@@ -1,5 +1,5 @@
 // Least distance of two bodies that do not enter each other.
-#include <set>
+#include <map>
 
 #include "toolkit/detection/BodyPair.h"
 
@@ -8,7 +8,8 @@ namespace {
 
 constexpr int kMaxAlternations = 12;
 constexpr int kMaxNewtonSteps = 25;
-constexpr std::size_t kMaxStarts = 8;
+constexpr std::size_t kMaxStarts = 40, kMaxStartsOfFaces = 3;
+constexpr double kStartsApart = 20;  // in errors of the triangles
 
 /// A surface, a curve or a point that moves with up to two parameters; the part of a boundary on which a
 /// foot lies.
@@ -232,7 +233,7 @@ void BodyPair::Alternate(gp_XYZ inFirst) {
       if (!onA.IsFound()) return true;
       inFirst = onA.foot.point;
       KeepDistance(inFirst, second);
-      if (last - onA.distance <= 1e-12 * (1 + last)) return true;
+      if (onA.distance >= last - 1e-12 * (1 + onA.distance)) return true;
       last = onA.distance;
       if (distance_ < 1e-12) return true;
     }
@@ -252,14 +253,20 @@ void BodyPair::FindDistance() {
     for (const NearTriangles& near : near_) KeepDistance(near.closest[0], near.closest[1]);
     return;
   }
-  std::set<std::array<std::uint32_t, 2>> faces;
-  std::size_t starts = 0;
+  // Two faces may come near each other in several places.
+  std::map<std::array<std::uint32_t, 2>, std::vector<gp_XYZ>> starts;
+  std::size_t count = 0;
   for (const NearTriangles& near : near_) {
-    if (near.lower >= distance_ || starts >= kMaxStarts) break;
-    const std::array<std::uint32_t, 2> pair{a.body().triangles[near.triangles[0]].face,
-                                            b.body().triangles[near.triangles[1]].face};
-    if (!faces.insert(pair).second) continue;
-    ++starts;
+    if (near.lower >= distance_ || count >= kMaxStarts) break;
+    std::vector<gp_XYZ>& known = starts[{a.body().triangles[near.triangles[0]].face,
+                                         b.body().triangles[near.triangles[1]].face}];
+    const double apart = kStartsApart * (near.distance - near.lower);
+    const auto isClose = [&](const gp_XYZ& start) {
+      return (start - near.closest[0]).Modulus() <= apart;
+    };
+    if (known.size() >= kMaxStartsOfFaces || std::ranges::any_of(known, isClose)) continue;
+    known.push_back(near.closest[0]);
+    ++count;
     const BodyFoot start = a.probe.Nearest(near.closest[0]);
     if (start.IsFound()) Alternate(start.foot.point);
   }
@@ -276,8 +283,9 @@ std::optional<Verdict> BodyPair::DistanceVerdict() {
     if (options_.withCurves) AddPatch(verdict);
     return verdict;
   }
-  if (distance_ > options_.clearance) return std::nullopt;
+  if (distance_ > options_.clearance + kRounding) return std::nullopt;
   verdict.kind = Kind::kClearance;
+  verdict.distance = std::min(distance_, options_.clearance);
   return verdict;
 }
 

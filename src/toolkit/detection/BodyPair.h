@@ -10,6 +10,18 @@
 
 namespace ZORDetection {
 
+inline constexpr double kInfinity = std::numeric_limits<double>::infinity();
+inline constexpr double kRounding = 1e-7;  // of what was computed, millimetres
+
+/// Evenly spread members of a list, all of a short one.
+template <typename Item>
+std::vector<Item> Thinned(const std::vector<Item>& inItems, std::size_t inMax) {
+  if (inItems.size() <= inMax) return inItems;
+  std::vector<Item> thinned;
+  for (std::size_t i = 0; i < inMax; ++i) thinned.push_back(inItems[i * inItems.size() / inMax]);
+  return thinned;
+}
+
 /// What was found between two bodies, in the frame of the first one's part.
 struct Verdict {
   Kind kind = Kind::kContact;

@@ -125,6 +125,7 @@ class Selection {
  public:
   Selection(const std::string& inModel, const DetectionOptions& inOptions,
             const std::vector<Unit>& inUnits) {
+    if (inUnits.size() < 2) throw Error(inModel + ": there are not two products to check");
     for (const Unit& unit : inUnits) {
       const bool isIn = (inOptions.only.empty() || MatchesAny(inOptions.only, unit)) &&
                         !MatchesAny(inOptions.ignore, unit);

@@ -157,6 +157,9 @@ class Search {
   }
 
  private:
+  /// Farther apart than this nothing is looked for.
+  double Reach() const { return std::max(options_.contactGap, options_.clearance) + 2 * kRounding; }
+
   const PartGeometry& GeometryOfProduct(std::uint32_t inProduct) const {
     return geometries_[products_[inProduct].part];
   }
@@ -164,7 +167,7 @@ class Search {
   void CollectPairs() {
     std::vector<Box> boxes;
     std::vector<std::uint32_t> owners;
-    const double reach = std::max(options_.contactGap, options_.clearance) / 2;
+    const double reach = Reach() / 2;
     for (std::uint32_t i = 0; i < products_.size(); ++i) {
       motions_.push_back(ToMotion(products_[i].rootFromProduct));
       const PartGeometry& part = GeometryOfProduct(i);
@@ -253,7 +256,7 @@ class Search {
   std::optional<Verdict> VerdictOf(const Task& inTask, ProbeCache& ioProbes) const {
     const PartGeometry &first = geometries_[inTask.firstPart],
                        &second = geometries_[inTask.secondPart];
-    const double reach = std::max(options_.contactGap, options_.clearance);
+    const double reach = Reach();
     const double precision = first.pointPrecision + second.pointPrecision;
     std::vector<Box> boxes;
     for (const Body& body : second.bodies)

@@ -75,12 +75,7 @@ void BodyPair::AddCrossingCurve(Verdict& ioVerdict) {
     ioVerdict.curveLength += length;
     ioVerdict.curve.push_back(((*ends)[0] + (*ends)[1]) * 0.5);
   }
-  if (ioVerdict.curve.size() > kMaxCurvePoints) {
-    std::vector<gp_XYZ> thinned;
-    for (std::size_t i = 0; i < kMaxCurvePoints; ++i)
-      thinned.push_back(ioVerdict.curve[i * ioVerdict.curve.size() / kMaxCurvePoints]);
-    ioVerdict.curve = std::move(thinned);
-  }
+  ioVerdict.curve = Thinned(ioVerdict.curve, kMaxCurvePoints);
 }
 
 /// The parts of one body's edges that lie on the other body.
@@ -177,12 +172,7 @@ void BodyPair::AddPatch(Verdict& ioVerdict) {
     if (onFirst.IsFound() && IsOnBoth(onFirst.foot.point, gap_)) best = onFirst.foot.point;
     ioVerdict.points = {best, best};
   }
-  if (ioVerdict.curve.size() > kMaxCurvePoints) {
-    std::vector<gp_XYZ> thinned;
-    for (std::size_t i = 0; i < kMaxCurvePoints; ++i)
-      thinned.push_back(ioVerdict.curve[i * ioVerdict.curve.size() / kMaxCurvePoints]);
-    ioVerdict.curve = std::move(thinned);
-  }
+  ioVerdict.curve = Thinned(ioVerdict.curve, kMaxCurvePoints);
 }
 
 }  // namespace ZORDetection
