@@ -82,6 +82,17 @@ struct Matrix3 {
   }
 };
 
+/// Whether a map only turns, or turns and mirrors: its columns have length 1 and stand at right
+/// angles. False where a number is none.
+template <class Number>
+bool IsOrthonormal(const Matrix3<Number>& inMap, Number inTolerance) {
+  for (int i = 0; i < 3; ++i)
+    for (int j = 0; j <= i; ++j)
+      if (!(std::abs(Dot(inMap.columns[i], inMap.columns[j]) - (i == j ? 1 : 0)) <= inTolerance))
+        return false;
+  return true;
+}
+
 /// A linear map, then a translation. Named by what it leads to and from: cameraFromModel *
 /// modelFromPart is cameraFromPart.
 template <class Number>

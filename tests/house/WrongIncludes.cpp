@@ -35,9 +35,11 @@ const Part* PartOf(const std::string& inPath) {
                    "ZORToolkitExport|third-party")},
       Part{Pattern("src/windows/.*"), Pattern("include/.*|src/platform/.*|windows")},
       Part{Pattern("src/.*"), Pattern("include/.*|src/platform/.*|src/[^/]*|ZORLyraExport")},
+      // Documents are read and changed through the toolkit.
       Part{Pattern("tools/.*"),
-           Pattern("include/.*|src/platform/(?!xml/).*|src/(foundation|toolkit)/.*|"
-                   "src/default_platform/[^/]*|third-party")},
+           Pattern(
+               "include/(?!ZORClashParsing).*|src/platform/(?!xml/).*|src/(foundation|toolkit)/.*|"
+               "src/default_platform/[^/]*|third-party")},
   };
   for (const Part& part : kParts) {
     if (std::regex_match(inPath, part.files)) return &part;

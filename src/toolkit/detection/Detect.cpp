@@ -9,6 +9,7 @@
 
 #include "default_platform/OpenModel.h"
 #include "foundation/PluginLoader.h"
+#include "foundation/Vector3.h"
 #include "platform/product_structure/ZORIAlias.h"
 #include "toolkit/Error.h"
 #include "toolkit/detection/ModelInterferences.h"
@@ -96,13 +97,9 @@ class TreeReading {
 bool IsRigid(const ZORMathTransformation& inPlacement) {
   std::array<double, 12> m{};
   inPlacement.GetCoefficients(m.data());
-  for (std::size_t i = 0; i < 3; ++i)
-    for (std::size_t j = i; j < 3; ++j) {
-      double product = 0;
-      for (std::size_t k = 0; k < 3; ++k) product += m[3 * i + k] * m[3 * j + k];
-      if (!(std::abs(product - (i == j ? 1 : 0)) <= kRigid)) return false;
-    }
-  return inPlacement.GetMatrix().Determinant() > 0;
+  const ZORFoundation::Matrix3<double> linear = {
+      {{m[0], m[1], m[2]}, {m[3], m[4], m[5]}, {m[6], m[7], m[8]}}};
+  return IsOrthonormal(linear, kRigid) && inPlacement.GetMatrix().Determinant() > 0;
 }
 
 ZORDetection::Placement ToPlacement(const ZORMathTransformation& inPlacement) {

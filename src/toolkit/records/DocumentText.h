@@ -5,15 +5,24 @@
 #include <string>
 #include <string_view>
 
-#include "ZORToolkitExport.h"
 #include "platform/system/ZORUnicodeString.h"
 
 namespace ZORToolkit {
 
 /// Always valid UTF-8: lone surrogates become U+FFFD.
-ZOR_TOOLKIT_EXPORT std::string Utf8(const ZORUnicodeString& inText);
+inline std::string Utf8(const ZORUnicodeString& inText) {
+  std::string bytes(3 * static_cast<std::size_t>(inText.GetLengthInChar()), '\0');
+  std::size_t count = 0;
+  inText.ConvertToUTF8(bytes.data(), &count);
+  bytes.resize(count);
+  return bytes;
+}
 /// Bytes that are no UTF-8 become U+FFFD.
-ZOR_TOOLKIT_EXPORT ZORUnicodeString FromUtf8(std::string_view inBytes);
+inline ZORUnicodeString FromUtf8(std::string_view inBytes) {
+  ZORUnicodeString text;
+  text.BuildFromUTF8(inBytes.data(), inBytes.size());
+  return text;
+}
 
 }  // namespace ZORToolkit
 

@@ -85,23 +85,6 @@ ZORUnicodeString LastSegment(const ZORUnicodeString& inPath) {
   return last;
 }
 
-// The reader gives labels for the interferences under result sets only.
-void ReadLabels(ZORClashParsing& ioReader, const PlacedInterference& inPlaced,
-                InterferenceRecord& ioRecord) {
-  ZORUnicodeString labels[2], previews[2];
-  DOM_Node copy;
-  if (!inPlaced.set.isNull())
-    ioReader.GetithInterference(inPlaced.number, copy, labels[0], labels[1], previews[0],
-                                previews[1]);
-  for (std::size_t i = 0; i < 2; ++i) {
-    ProductRecord& product = ioRecord.products[i];
-    if (!product.exists) continue;
-    product.label = inPlaced.set.isNull()
-                        ? Utf8(LastSegment(FromUtf8(product.alias))) + " -- " + product.shape
-                        : Utf8(labels[i]);
-  }
-}
-
 /// Three numbers of a "Matrix" as the reader takes them: -1 for what is none. It hands placements
 /// out for whole documents only, and for as many interferences as these declare.
 void ReadTriple(const DOM_Node& inNode, const std::array<const char*, 3>& inNames,
@@ -177,8 +160,11 @@ void ReadChildren(const PlacedInterference& inPlaced, const ReaderTexts& inTexts
     if (products[i].isNull()) continue;
     ioRecord.products[i] = ProductOf(inTexts, i, products[i]);
     if (inPart == RecordPart::kRow) continue;
-    ioRecord.products[i].preview = AttributeText(products[i], "Preview");
-    ReadPlacement(products[i], ioRecord.products[i]);
+    ProductRecord& product = ioRecord.products[i];
+    // As the reader makes it, which would copy the whole element.
+    product.label = Utf8(LastSegment(FromUtf8(product.alias))) + " -- " + product.shape;
+    product.preview = AttributeText(products[i], "Preview");
+    ReadPlacement(products[i], product);
   }
 }
 
@@ -226,7 +212,6 @@ InterferenceRecord Read(ClashDocument& ioDocument, const PlacedInterference& inP
   record.curveLength = Number(texts.curveLength);
   record.distance = Number(texts.distance);
   record.viewpoint = ViewpointOf(texts);
-  ReadLabels(ioDocument.Reader(), inPlaced, record);
   return record;
 }
 

@@ -51,12 +51,13 @@ ZORMathTransformation TransformationOf(const Placement& inPlacement) {
 /// Within what six digits and rounding leave of one.
 bool IsRotation(const Placement& inPlacement) {
   constexpr double kTolerance = 1e-3;
-  const ZORMathVector columns[] = {VectorAt(inPlacement, 0), VectorAt(inPlacement, 3),
-                                   VectorAt(inPlacement, 6)};
-  for (int i = 0; i < 3; ++i)
-    for (int j = 0; j <= i; ++j)
-      if (!(std::fabs(Dot(columns[i], columns[j]) - (i == j ? 1 : 0)) < kTolerance)) return false;
-  return Dot(Cross(columns[0], columns[1]), columns[2]) > 0;
+  const auto column = [&](std::size_t inFirst) {
+    return ZORFoundation::Vector3d{inPlacement[inFirst], inPlacement[inFirst + 1],
+                                   inPlacement[inFirst + 2]};
+  };
+  const ZORFoundation::Matrix3<double> rotation = {{column(0), column(3), column(6)}};
+  const auto& [x, y, z] = rotation.columns;
+  return IsOrthonormal(rotation, kTolerance) && Dot(Cross(x, y), z) > 0;
 }
 
 std::string WhyNoneIsTrusted(const InterferenceRecord& inRecord,

@@ -54,15 +54,6 @@ ZORFoundation::Vector3d VectorAt(const Placement& inPlacement, std::size_t inFir
   return {inPlacement[inFirst], inPlacement[inFirst + 1], inPlacement[inFirst + 2]};
 }
 
-/// Whether the three columns have length 1 and stand at right angles.
-bool IsRigid(const ZORFoundation::Matrix3<double>& inMatrix) {
-  const auto& columns = inMatrix.columns;
-  for (int i = 0; i < 3; ++i)
-    for (int j = i; j < 3; ++j)
-      if (!(std::abs(Dot(columns[i], columns[j]) - (i == j ? 1 : 0)) < kRigid)) return false;
-  return true;
-}
-
 /// A rotation as w and a vector, w not negative; from the largest of the four numbers, so that no
 /// small one is divided by (Shepperd's method).
 struct Quaternion {
@@ -174,7 +165,7 @@ std::string TurnShown(const Placement& inPlacement) {
   const ZORFoundation::Matrix3<double> matrix = {
       {VectorAt(inPlacement, 0), VectorAt(inPlacement, 3), VectorAt(inPlacement, 6)}};
   const auto& [x, y, z] = matrix.columns;
-  if (!IsRigid(matrix)) return "scaled";
+  if (!IsOrthonormal(matrix, kRigid)) return "scaled";
   if (Dot(Cross(x, y), z) < 0) return "mirrored";
   const Quaternion turn = QuaternionOf(inPlacement.data());
   const auto& [i, j, k] = turn.vector;

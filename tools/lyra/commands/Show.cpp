@@ -1,5 +1,4 @@
 // lyra show FILE N
-#include <charconv>
 #include <memory>
 
 #include "lyra/Verbs.h"
@@ -24,15 +23,8 @@ std::string Joined(const NumberTriple& inTriple) {
   return isEmpty ? "" : x.text + ", " + y.text + ", " + z.text;
 }
 
-std::string NumberShown(double inNumber) {
-  char digits[32];
-  const auto end = std::to_chars(digits, digits + sizeof digits, inNumber).ptr;
-  return std::string(digits, end);
-}
-
 std::string TripleShown(const double* inTriple) {
-  return NumberShown(inTriple[0]) + ", " + NumberShown(inTriple[1]) + ", " +
-         NumberShown(inTriple[2]);
+  return Joined({Number(inTriple[0]), Number(inTriple[1]), Number(inTriple[2])});
 }
 
 void AddPlacement(const Placement& inPlacement, KeyValueList& ioList) {

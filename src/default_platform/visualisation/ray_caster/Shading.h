@@ -15,7 +15,7 @@ using ZORFoundation::Vector3f;
 using Matrix3f = ZORFoundation::Matrix3<float>;
 using Transform3f = ZORFoundation::Transform<float>;
 
-/// Matrix3f RGB and opacity.
+/// Linear RGB and opacity.
 struct SurfaceColour {
   Vector3f albedo{0, 0, 0};
   float opacity = 1;
