@@ -28,6 +28,7 @@ class Writer {
 };
 
 /// Reads what a Writer wrote. After the first piece that is not there all others are empty too.
+/// By hand, since cereal gives a vector its size before it knows that so many bytes follow.
 class Reader {
  public:
   explicit Reader(std::string_view inBytes) : bytes_(inBytes) {}

@@ -139,7 +139,7 @@ class Child {
   pid_t process_;
 };
 
-/// Follows the lines by which the reader tells how far it is.
+/// Follows the lines by which the reader reports how far it is.
 class StatusLines {
  public:
   explicit StatusLines(const std::function<void(double)>& inProgress) : progress_(inProgress) {}

@@ -177,10 +177,10 @@ ChosenView LookClosely(const ShownProducts& inProducts, const ChosenView& inBest
   };
   std::vector<std::pair<int, ZORMathVector>> sights;
   for (const ZORMathVector& sight : ManyDirections()) sights.emplace_back(look(sight, 1), sight);
-  constexpr std::size_t kMost = 8;
-  std::ranges::partial_sort(sights, sights.begin() + kMost, std::ranges::greater(),
+  constexpr std::size_t kMaxCandidates = 8;
+  std::ranges::partial_sort(sights, sights.begin() + kMaxCandidates, std::ranges::greater(),
                             &std::pair<int, ZORMathVector>::first);
-  for (std::size_t i = 0; i < kMost; ++i)
+  for (std::size_t i = 0; i < kMaxCandidates; ++i)
     for (const double share : {0.5, 0.25, 0.125}) look(sights[i].second, share);
   return best;
 }

@@ -9,8 +9,8 @@ namespace {
 
 ZORIProduct_var RootOf(const ZORIProduct_var& inProduct) {
   ZORIProduct_var root = inProduct;
-  for (ZORIProduct_var father = root; !father.IsNull(); father = father->GetFatherProduct())
-    root = father;
+  for (ZORIProduct_var parent = root; !parent.IsNull(); parent = parent->GetFatherProduct())
+    root = parent;
   return root;
 }
 

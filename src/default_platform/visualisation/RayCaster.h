@@ -41,15 +41,17 @@ struct IdBufferPixel {
   float depth = 0;             ///< along the camera's forward axis
 };
 
-enum class PictureFormat { kJpeg, kPng };
+/// Makes a picture file of 8-bit sRGB pixels, rows from the top.
+/// @return its bytes; empty when out of memory. Raises std::bad_alloc.
+typedef std::string EncodeFunction(int inWidth, int inHeight, const std::uint8_t* inPixels);
 
-/// The plugin's operations. They raise nothing, and return false when out of memory.
+/// The plugin's operations. Those that return false when out of memory raise nothing.
 struct RayCaster {
   /// @param outPixels 8-bit sRGB, rows from the top.
   bool (*render)(const PictureRequest& inRequest, std::vector<std::uint8_t>& outPixels);
   bool (*renderIdBuffer)(const PictureRequest& inRequest, std::vector<IdBufferPixel>& outPixels);
-  bool (*encode)(PictureFormat inFormat, int inWidth, int inHeight, const std::uint8_t* inPixels,
-                 std::string& outBytes);
+  EncodeFunction* encodeJpeg;
+  EncodeFunction* encodePng;
 };
 
 typedef const RayCaster* GetRayCasterFunction();

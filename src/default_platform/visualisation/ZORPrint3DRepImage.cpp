@@ -1,10 +1,8 @@
 #include "platform/visualisation/ZORPrint3DRepImage.h"
 
 #include <algorithm>
-#include <array>
 #include <cctype>
 #include <new>
-#include <optional>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -23,10 +21,10 @@ bool IsSameWord(std::string_view inA, std::string_view inB) {
   });
 }
 
-std::optional<ZORDefault::PictureFormat> FormatOf(std::string_view inName) {
-  if (IsSameWord(inName, "JPEG")) return ZORDefault::PictureFormat::kJpeg;
-  if (IsSameWord(inName, "PNG")) return ZORDefault::PictureFormat::kPng;
-  return std::nullopt;
+/// The encoder of a format's name; null for none.
+ZORDefault::EncodeFunction* ZORDefault::RayCaster::*EncoderFor(std::string_view inName) {
+  if (IsSameWord(inName, "JPEG")) return &ZORDefault::RayCaster::encodeJpeg;
+  return IsSameWord(inName, "PNG") ? &ZORDefault::RayCaster::encodePng : nullptr;
 }
 
 bool HoldsAllPixels(int inWidth, int inHeight, std::size_t inByteCount) {
@@ -103,13 +101,13 @@ HRESULT ZORPixelImage::Prepare(int inDepth) {
 }
 
 HRESULT ZORPixelImage::Write(const ZORString& inFormat, const ZORString& inPath) const try {
-  const auto format = FormatOf(inFormat.CastToCharPtr());
-  if (!format) return E_INVALIDARG;
+  const auto encoder = EncoderFor(inFormat.CastToCharPtr());
+  if (!encoder) return E_INVALIDARG;
   if (!HoldsAllPixels(width_, height_, pixels_.size())) return E_FAIL;
   const ZORDefault::RayCaster* const rayCaster = ZORDefault::LoadRayCaster();
-  std::string bytes;
-  if (!rayCaster || !rayCaster->encode(*format, width_, height_, pixels_.data(), bytes))
-    return E_FAIL;
+  if (!rayCaster) return E_FAIL;
+  const std::string bytes = (rayCaster->*encoder)(width_, height_, pixels_.data());
+  if (bytes.empty()) return E_FAIL;
   // A picture can be made again, so nobody waits for the disk.
   ZORFoundation::WriteWholeFile(inPath.CastToCharPtr(), bytes, {.isSynchronised = false});
   return S_OK;

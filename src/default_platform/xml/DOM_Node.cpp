@@ -82,7 +82,7 @@ void CheckDocumentChildren(const DOM_Tree& inTree, DOM_Tree::Node inChild, DOM_T
       RefusePlace("the root cannot stand before the document type");
     if (kind == DOM_Node::DOCUMENT_TYPE_NODE && inTree.At(at).kind == DOM_Node::ELEMENT_NODE &&
         !isAfter)
-      RefusePlace("the document type cannot stand behind the root");
+      RefusePlace("the document type cannot come after the root");
   }
 }
 

@@ -49,7 +49,7 @@ std::unique_ptr<ClashDocument> LoadNew(const std::string& inPath, const std::str
   try {
     return std::make_unique<ClashDocument>(inPath);
   } catch (const InputError&) {
-    // The library does not tell when writing an opened file fails.
+    // The library does not report when writing an opened file fails.
     throw InputError(inOutput + ": the file could not be written");
   }
 }

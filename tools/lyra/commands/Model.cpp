@@ -102,10 +102,10 @@ void ModelReading::Declare(Arguments& ioArguments) {
 }
 
 void ModelReading::Check() const {
-  constexpr long long kMost = 1'000'000;
+  constexpr long long kMaxLimit = 1'000'000;
   const auto check = [](const char* inOption, const std::optional<long long>& inLimit) {
-    if (inLimit && (*inLimit < 1 || *inLimit > kMost))
-      throw UsageError(std::string(inOption) + ": 1 to " + std::to_string(kMost));
+    if (inLimit && (*inLimit < 1 || *inLimit > kMaxLimit))
+      throw UsageError(std::string(inOption) + ": 1 to " + std::to_string(kMaxLimit));
   };
   check("--limit-time", seconds);
   check("--limit-memory", megabytes);

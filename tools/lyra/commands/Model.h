@@ -28,7 +28,7 @@ struct ModelReading {
   void Check() const;
 };
 
-/// Opens a model. What was mended or left out is told on standard error, progress too when that is
+/// Opens a model. What was repaired or left out is reported on standard error, progress too when that is
 /// a terminal. Raises InputError with the reason for what cannot be opened, and for "-": a model is
 /// always a file.
 ZORDefault::OpenedModel OpenModelFile(const std::string& inPath, const ModelReading& inReading);

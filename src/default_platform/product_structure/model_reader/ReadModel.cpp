@@ -39,23 +39,23 @@ struct Refusal {
   std::string reason;
 };
 
-void TellStatus(const std::string& inLine) {
+void ReportStatus(const std::string& inLine) {
   std::size_t written = 0;
   ZORFoundation::WriteAll(ModelReaderProtocol::kStatus, inLine + '\n', written);
 }
 
-/// Tells of every hundredth that is done.
+/// Reports every hundredth that is done.
 class Progress : public Message_ProgressIndicator {
  protected:
   void Show(const Message_ProgressScope&, const Standard_Boolean) override {
     const int done = static_cast<int>(100 * std::min(GetPosition(), 1.0));
-    if (done <= told_) return;
-    told_ = done;
-    TellStatus(std::to_string(done));
+    if (done <= reported_) return;
+    reported_ = done;
+    ReportStatus(std::to_string(done));
   }
 
  private:
-  int told_ = 0;
+  int reported_ = 0;
 };
 
 /// Messages of the kernel may have several lines.
@@ -78,7 +78,7 @@ void MeshParts(const std::vector<TDF_Label>& inLabels, double inDeflection,
   for (std::size_t i = 0; i < inLabels.size(); ++i, scope.Next()) {
     ModelPart& part = ioModel.parts[i];
     if (part.isAssembly) continue;
-    TellStatus("tessellating its part \"" + ToUtf8(part.name) + '"');
+    ReportStatus("tessellating its part \"" + ToUtf8(part.name) + '"');
     if (!MeshPart(inLabels[i], inDeflection, part)) ioModel.hadFailure = true;
   }
 }
@@ -134,14 +134,14 @@ bool HasGeometry(const ModelData& inModel) {
 }
 
 ModelData Read(const ModelRequest& inRequest, std::string_view inBytes) {
-  TellStatus(std::string("reading its ") + NameOfFormat(inRequest.format) + " data");
+  ReportStatus(std::string("reading its ") + NameOfFormat(inRequest.format) + " data");
   if (const std::string fault = FindFault(inRequest, inBytes); !fault.empty())
     throw Refusal{OneLine(fault.c_str())};
   PrepareReaders();
   Handle(Progress) progress = new Progress();
   Message_ProgressScope scope(progress->Start(), nullptr, kReadingShare + kMeshingShare);
   const LoadedDocument loaded = ReadDocument(inRequest, scope.Next(kReadingShare),
-                                             [](const char* stage) { TellStatus(stage); });
+                                             [](const char* stage) { ReportStatus(stage); });
   if (const std::string file = FirstNonRegularFile(); !file.empty())
     throw Refusal{OneLine(("names " + file + ", which is no file").c_str())};
   if (loaded.document.IsNull())

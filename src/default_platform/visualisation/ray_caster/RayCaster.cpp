@@ -174,7 +174,8 @@ bool WritePng(png_structp inWriter, png_infop inInfo, int inWidth, int inHeight,
   return true;
 }
 
-/// @return the file's bytes; empty when out of memory.
+// Optimised Huffman tables would make files 5 % smaller; TurboJPEG 2 has them by an environment
+// variable of the whole process alone. Progressive files, 10 % smaller, take 7 ms more each.
 std::string EncodeJpeg(int inWidth, int inHeight, const std::uint8_t* inPixels) {
   const std::unique_ptr<void, int (*)(tjhandle)> compressor(tjInitCompress(), &tjDestroy);
   unsigned char* bytes = nullptr;
@@ -211,20 +212,12 @@ bool RenderIds(const PictureRequest& inRequest,
   return false;
 }
 
-bool Encode(ZORDefault::PictureFormat inFormat, int inWidth, int inHeight,
-            const std::uint8_t* inPixels, std::string& outBytes) try {
-  outBytes = inFormat == ZORDefault::PictureFormat::kJpeg ? EncodeJpeg(inWidth, inHeight, inPixels)
-                                                          : EncodePng(inWidth, inHeight, inPixels);
-  return !outBytes.empty();
-} catch (const std::exception&) {
-  return false;
-}
-
 }  // namespace
 }  // namespace ZORRayCaster
 
 extern "C" __attribute__((visibility("default"))) const ZORDefault::RayCaster* ZORGetRayCaster() {
   static constexpr ZORDefault::RayCaster kRayCaster{&ZORRayCaster::Render, &ZORRayCaster::RenderIds,
-                                                    &ZORRayCaster::Encode};
+                                                    &ZORRayCaster::EncodeJpeg,
+                                                    &ZORRayCaster::EncodePng};
   return &kRayCaster;
 }
