@@ -86,14 +86,6 @@ ZORMetaClass* ModelDocument::GetClass() const {
   return meta;
 }
 
-unsigned int ModelDocument::AddReference() { return ++referenceCount_; }
-
-unsigned int ModelDocument::ReleaseReference() {
-  const unsigned int left = --referenceCount_;
-  if (left == 0) delete this;
-  return left;
-}
-
 bool ModelDocument::Holds(ZORBaseUnknown* inComponent) const {
   const ZORInterfaceHandle<ProductIdentity> product = ZORBaseUnknown_var(inComponent);
   return !product.IsNull() && &product->GetProduct().GetDocument() == this;

@@ -17,11 +17,10 @@
 namespace ZORDefault {
 
 /// Owns a model and its products. Deleted with the last reference to itself or to any of them.
-class ModelDocument final : public FacetedComponent, private CountedObject<ModelDocument> {
+class ModelDocument final : public CountedComponent, private CountedObject<ModelDocument> {
  public:
   static const char* CountedName() { return "ModelDocument"; }
 
-  /// Has one reference at first.
   /// @param inFileName the root's name where it has none.
   ModelDocument(ModelData inModel, const std::u16string& inFileName);
   ModelDocument(const ModelDocument&) = delete;
@@ -29,8 +28,6 @@ class ModelDocument final : public FacetedComponent, private CountedObject<Model
 
   ZORBaseUnknown* FindFacet(const IID& inInterface) override;
   ZORMetaClass* GetClass() const override;
-  unsigned int AddReference() override;
-  unsigned int ReleaseReference() override;
 
   ZORDocument* GetInterface() { return &document_; }
   Product& GetRoot() { return *products_.front(); }
@@ -38,13 +35,9 @@ class ModelDocument final : public FacetedComponent, private CountedObject<Model
   const ZORUnicodeString& GetAlias(std::size_t inProduct) const { return aliases_[inProduct]; }
 
  private:
-  class ProvidersFacet final : public Facet<ZORIProviders> {
-   public:
-    explicit ProvidersFacet(ModelDocument& inOwner) : Facet(inOwner), self_(inOwner) {}
+  struct ProvidersFacet final : Facet<ZORIProviders, ModelDocument> {
+    using Facet::Facet;
     HRESULT AddProvider(const IID& inInterface, ZORBaseUnknown* inProvider) override;
-
-   private:
-    ModelDocument& self_;
   };
   struct Provider {
     IID interfaceId;
@@ -52,10 +45,8 @@ class ModelDocument final : public FacetedComponent, private CountedObject<Model
     ZORBaseUnknown_var reference;  // empty for the document's own products
   };
 
-  ~ModelDocument() = default;
   bool Holds(ZORBaseUnknown* inComponent) const;
 
-  unsigned int referenceCount_ = 1;
   ModelData model_;
   std::vector<ZORUnicodeString> aliases_;
   std::vector<std::unique_ptr<Product>> products_;

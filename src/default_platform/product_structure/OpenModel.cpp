@@ -123,7 +123,6 @@ OpenedModel OpenModel(const std::string& inPath, const ModelOptions& inOptions) 
   auto* const document = new ModelDocument(std::move(model), NameOfFile(inPath));
   opened.document = ZORDocument_var(document->GetInterface());
   opened.root = ZORIProduct_var(document->GetRoot().GetInterface());
-  document->ReleaseReference();  // the handles have theirs
   return opened;
 }
 

@@ -68,73 +68,41 @@ class Product final : public FacetedComponent, private CountedObject<Product> {
   bool HasGeometry() const { return GetPart().mesh != nullptr; }
 
  private:
-  class ProductFacet final : public Facet<ZORIProduct> {
-   public:
-    explicit ProductFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+  struct ProductFacet final : Facet<ZORIProduct, Product> {
+    using Facet::Facet;
     ZORListValZORBaseUnknown_var* GetChildren(const char* inInterfaceName) override;
     ZORIProduct_var GetFatherProduct() override;
-
-   private:
-    Product& self_;
   };
-  class InSessionFacet final : public Facet<ZORIProductInSession> {
-   public:
-    explicit InSessionFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+  struct InSessionFacet final : Facet<ZORIProductInSession, Product> {
+    using Facet::Facet;
     HRESULT GetRepresentationName(int& outState, int inShown, ZORUnicodeString& outName) override;
     HRESULT GetRepresentation(int& outState, int inShown, ZORBaseUnknown_var& outRep) override;
-
-   private:
-    Product& self_;
   };
-  class AliasFacet final : public Facet<ZORIAlias> {
-   public:
-    explicit AliasFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+  struct AliasFacet final : Facet<ZORIAlias, Product> {
+    using Facet::Facet;
     ZORUnicodeString GetAlias() override { return self_.GetAlias(); }
-
-   private:
-    Product& self_;
   };
-  class SpecObjectFacet final : public Facet<ZORISpecObject> {
-   public:
-    explicit SpecObjectFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+  struct SpecObjectFacet final : Facet<ZORISpecObject, Product> {
+    using Facet::Facet;
     ZORISpecObject* GetFather() override;
-
-   private:
-    Product& self_;
   };
-  class LinkableFacet final : public Facet<ZORILinkableObject> {
-   public:
-    explicit LinkableFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+  struct LinkableFacet final : Facet<ZORILinkableObject, Product> {
+    using Facet::Facet;
     ZORDocument* GetDocument() override;
-
-   private:
-    Product& self_;
   };
-  class GeoVisuFacet final : public Facet<ZORI3DGeoVisu> {
-   public:
-    explicit GeoVisuFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+  struct GeoVisuFacet final : Facet<ZORI3DGeoVisu, Product> {
+    using Facet::Facet;
     ZORRep* GetRep() override;
-
-   private:
-    Product& self_;
   };
-  class VisPropertiesFacet final : public Facet<ZORIVisProperties> {
-   public:
-    explicit VisPropertiesFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+  struct VisPropertiesFacet final : Facet<ZORIVisProperties, Product> {
+    using Facet::Facet;
     HRESULT GetPropertiesAtt(ZORVisPropertiesValues& outValues, int inProperties, int inGeometry,
                              int inReserved, int inAlsoReserved) override;
     HRESULT SetPropertiesAtt(const ZORVisPropertiesValues& inValues) override;
-
-   private:
-    Product& self_;
   };
-  class IdentityFacet final : public Facet<ProductIdentity> {
-   public:
-    explicit IdentityFacet(Product& inOwner) : Facet(inOwner), self_(inOwner) {}
+  struct IdentityFacet final : Facet<ProductIdentity, Product> {
+    using Facet::Facet;
     Product& GetProduct() override { return self_; }
-
-   private:
-    Product& self_;
   };
 
   void MakeRep();

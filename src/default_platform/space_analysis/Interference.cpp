@@ -22,13 +22,13 @@ ZORMetaClass* ClassNamed(const char* inName, unsigned int inSize) {
 }
 
 /// One point of an interference, which it keeps alive.
-class SubInterference final : public FacetedComponent, private CountedObject<SubInterference> {
+class SubInterference final : public CountedComponent, private CountedObject<SubInterference> {
  public:
   static const char* CountedName() { return "SubInterference"; }
 
   SubInterference(Interference& inOwner, std::size_t inPoint)
       : owner_(inOwner.GetInterface()),
-        self_(inOwner),
+        interference_(inOwner),
         point_(inPoint),
         subInterference_(*this),
         specObject_(*this) {}
@@ -42,44 +42,27 @@ class SubInterference final : public FacetedComponent, private CountedObject<Sub
     static ZORMetaClass* const meta = ClassNamed("ZORSubInterference", sizeof(SubInterference));
     return meta;
   }
-  unsigned int AddReference() override { return ++referenceCount_; }
-  unsigned int ReleaseReference() override {
-    const unsigned int left = --referenceCount_;
-    if (left == 0) delete this;
-    return left;
-  }
   ZORISpecObject* GetInterface() { return &specObject_; }
 
  private:
-  class SubInterferenceFacet final : public Facet<ZORISiSubInterference> {
-   public:
-    explicit SubInterferenceFacet(SubInterference& inOwner) : Facet(inOwner), part_(inOwner) {}
+  struct SubInterferenceFacet final : Facet<ZORISiSubInterference, SubInterference> {
+    using Facet::Facet;
     int FillViewpoint(ZOR3DViewpoint* ioViewpoint) override {
       if (!ioViewpoint) return 0;
-      part_.self_.FillPointViewpoint(part_.point_, *ioViewpoint);
+      self_.interference_.FillPointViewpoint(self_.point_, *ioViewpoint);
       return 1;
     }
-
-   private:
-    SubInterference& part_;
   };
-  class SpecObjectFacet final : public Facet<ZORISpecObject> {
-   public:
-    explicit SpecObjectFacet(SubInterference& inOwner) : Facet(inOwner), part_(inOwner) {}
+  struct SpecObjectFacet final : Facet<ZORISpecObject, SubInterference> {
+    using Facet::Facet;
     ZORISpecObject* GetFather() override {
-      part_.self_.AddReference();
-      return part_.self_.GetSpecObject();
+      self_.interference_.AddReference();
+      return self_.interference_.GetSpecObject();
     }
-
-   private:
-    SubInterference& part_;
   };
 
-  ~SubInterference() = default;
-
-  unsigned int referenceCount_ = 0;
   ZORISiInterference_var owner_;
-  Interference& self_;
+  Interference& interference_;
   std::size_t point_;
   SubInterferenceFacet subInterference_;
   SpecObjectFacet specObject_;
@@ -171,12 +154,6 @@ ZORBaseUnknown* Interference::FindFacet(const IID& inInterface) {
 ZORMetaClass* Interference::GetClass() const {
   static ZORMetaClass* const meta = ClassNamed("ZORInterference", sizeof(Interference));
   return meta;
-}
-
-unsigned int Interference::ReleaseReference() {
-  const unsigned int left = --referenceCount_;
-  if (left == 0) delete this;
-  return left;
 }
 
 const ChosenView& Interference::GetView() {

@@ -17,11 +17,10 @@
 namespace ZORDefault {
 
 /// Its elements and sub-interferences are the points that differ. Ends with its last reference, sub-interferences' included.
-class Interference final : public FacetedComponent, private CountedObject<Interference> {
+class Interference final : public CountedComponent, private CountedObject<Interference> {
  public:
   static const char* CountedName() { return "Interference"; }
 
-  /// Made without a reference.
   /// @param inProducts empty where one is missing.
   Interference(const InterferenceGeometry& inGeometry,
                const std::array<ZORIProduct_var, 2>& inProducts, const SceneColour& inMarkerColour);
@@ -30,8 +29,6 @@ class Interference final : public FacetedComponent, private CountedObject<Interf
 
   ZORBaseUnknown* FindFacet(const IID& inInterface) override;
   ZORMetaClass* GetClass() const override;
-  unsigned int AddReference() override { return ++referenceCount_; }
-  unsigned int ReleaseReference() override;
 
   ZORISiInterference* GetInterface() { return &interference_; }
   ZORISpecObject* GetSpecObject() { return &specObject_; }
@@ -41,9 +38,8 @@ class Interference final : public FacetedComponent, private CountedObject<Interf
   void FillPointViewpoint(std::size_t inPoint, ZOR3DViewpoint& ioViewpoint);
 
  private:
-  class InterferenceFacet final : public Facet<ZORISiInterference> {
-   public:
-    explicit InterferenceFacet(Interference& inOwner) : Facet(inOwner), self_(inOwner) {}
+  struct InterferenceFacet final : Facet<ZORISiInterference, Interference> {
+    using Facet::Facet;
     int* GetFlags() override;
     int GetElementCount() override { return static_cast<int>(self_.geometry_.points.size()); }
     void SetFlags(const int* inFlags) override;
@@ -51,30 +47,20 @@ class Interference final : public FacetedComponent, private CountedObject<Interf
     double* GetGeometricResult() override;
     void GetSubInterferences(ZORListValZORISpecObject_var& ioList) override;
     int GetSubInterferenceCount() override { return GetElementCount(); }
-
-   private:
-    Interference& self_;
   };
-  class GeoVisuFacet final : public Facet<ZORI3DGeoVisu> {
-   public:
-    explicit GeoVisuFacet(Interference& inOwner) : Facet(inOwner), self_(inOwner) {}
+  struct GeoVisuFacet final : Facet<ZORI3DGeoVisu, Interference> {
+    using Facet::Facet;
     ZORRep* GetRep() override { return self_.MakeRep(); }
-
-   private:
-    Interference& self_;
   };
-  class SpecObjectFacet final : public Facet<ZORISpecObject> {
-   public:
-    explicit SpecObjectFacet(Interference& inOwner) : Facet(inOwner) {}
+  struct SpecObjectFacet final : Facet<ZORISpecObject, Interference> {
+    using Facet::Facet;
     ZORISpecObject* GetFather() override { return nullptr; }
   };
 
-  ~Interference() = default;
   /// Of the stored viewpoint when there is one, else chosen; worked out when it is first needed.
   const ChosenView& GetView();
   ChosenView StoredView() const;
 
-  unsigned int referenceCount_ = 0;
   InterferenceGeometry geometry_;
   std::array<ZORIProduct_var, 2> products_;
   SceneColour markerColour_;

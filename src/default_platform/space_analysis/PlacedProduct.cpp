@@ -27,7 +27,7 @@ ZORMathTransformation Inverse(const ZORMathTransformation& inPlacement) {
   return result;
 }
 
-class PlacedProduct final : public FacetedComponent, private CountedObject<PlacedProduct> {
+class PlacedProduct final : public CountedComponent, private CountedObject<PlacedProduct> {
  public:
   static const char* CountedName() { return "PlacedProduct"; }
 
@@ -55,46 +55,34 @@ class PlacedProduct final : public FacetedComponent, private CountedObject<Place
     return inInterface == ZORIVisProperties::ClassId() ? &visProperties_ : nullptr;
   }
   ZORMetaClass* GetClass() const override { return original_->GetMetaObject(); }
-  unsigned int AddReference() override { return ++referenceCount_; }
-  unsigned int ReleaseReference() override {
-    const unsigned int left = --referenceCount_;
-    if (left == 0) delete this;
-    return left;
-  }
   ZORIProduct* GetInterface() { return &product_; }
 
  private:
   /// All interfaces but those of what is shown are the model's product's.
   template <class Interface>
-  class PlacedFacet : public Facet<Interface> {
-   public:
-    explicit PlacedFacet(PlacedProduct& inOwner) : Facet<Interface>(inOwner), self_(inOwner) {}
+  struct PlacedFacet : Facet<Interface, PlacedProduct> {
+    using Base = Facet<Interface, PlacedProduct>;
+    using Base::Base;
+    using Base::QueryInterface;
     HRESULT QueryInterface(const IID& inInterface, void** outInterface) override {
-      if (self_.FindFacet(inInterface))
-        return Facet<Interface>::QueryInterface(inInterface, outInterface);
-      return self_.original_->QueryInterface(inInterface, outInterface);
+      if (this->self_.FindFacet(inInterface))
+        return Base::QueryInterface(inInterface, outInterface);
+      return this->self_.original_->QueryInterface(inInterface, outInterface);
     }
-    using Facet<Interface>::QueryInterface;
-
-   protected:
-    PlacedProduct& self_;
   };
-  class ProductFacet final : public PlacedFacet<ZORIProduct> {
-   public:
+  struct ProductFacet final : PlacedFacet<ZORIProduct> {
     using PlacedFacet::PlacedFacet;
     ZORListValZORBaseUnknown_var* GetChildren(const char* inInterfaceName) override {
       return self_.original_->GetChildren(inInterfaceName);
     }
     ZORIProduct_var GetFatherProduct() override { return self_.original_->GetFatherProduct(); }
   };
-  class GeoVisuFacet final : public PlacedFacet<ZORI3DGeoVisu> {
-   public:
+  struct GeoVisuFacet final : PlacedFacet<ZORI3DGeoVisu> {
     using PlacedFacet::PlacedFacet;
     ZORRep* GetRep() override { return self_.rep_; }
   };
 
-  class VisPropertiesFacet final : public PlacedFacet<ZORIVisProperties> {
-   public:
+  struct VisPropertiesFacet final : PlacedFacet<ZORIVisProperties> {
     using PlacedFacet::PlacedFacet;
     HRESULT GetPropertiesAtt(ZORVisPropertiesValues& outValues, int inProperties, int inGeometry,
                              int inReserved, int inAlsoReserved) override {
@@ -110,7 +98,7 @@ class PlacedProduct final : public FacetedComponent, private CountedObject<Place
     }
   };
 
-  ~PlacedProduct() {
+  ~PlacedProduct() override {
     if (rep_) rep_->Destroy();
     for (PlacedMeshRep* const mesh : meshes_) mesh->Destroy();
   }
@@ -125,7 +113,6 @@ class PlacedProduct final : public FacetedComponent, private CountedObject<Place
     }
   }
 
-  unsigned int referenceCount_ = 0;
   ZORIProduct_var original_;
   ZORVisPropertiesValues properties_;
   ZOR3DBagRep* rep_ = nullptr;

@@ -32,30 +32,48 @@ class FacetedComponent {
   ~FacetedComponent() = default;
 };
 
+/// One that is made without a reference and ends with its last.
+class CountedComponent : public FacetedComponent {
+ public:
+  unsigned int AddReference() final { return ++referenceCount_; }
+  unsigned int ReleaseReference() final {
+    const unsigned int left = --referenceCount_;
+    if (left == 0) delete this;
+    return left;
+  }
+
+ protected:
+  virtual ~CountedComponent() = default;
+
+ private:
+  unsigned int referenceCount_ = 0;
+};
+
 /// One interface of a component. It is a part of the component's object: its references are the
 /// component's, and every facet leads to every other, by identifier and by name. Facets have their
 /// interface as only base, so that a pointer to one is the pointer to the interface.
-template <class Interface>
+/// @tparam Owner the component's own class.
+template <class Interface, class Owner = FacetedComponent>
 class Facet : public Interface {
  public:
-  explicit Facet(FacetedComponent& inOwner) : owner_(&inOwner) {}
+  explicit Facet(Owner& inOwner) : self_(inOwner) {}
 
   using Interface::QueryInterface;  // by name
   HRESULT QueryInterface(const IID& inInterface, void** outInterface) override {
     if (!outInterface) return E_INVALIDARG;
-    *outInterface = owner_->FindFacet(inInterface);
+    *outInterface = self_.FindFacet(inInterface);
     if (!*outInterface) return E_NOINTERFACE;
-    owner_->AddReference();
+    self_.AddReference();
     return S_OK;
   }
-  unsigned int AddRef() override { return owner_->AddReference(); }
-  unsigned int Release() override { return owner_->ReleaseReference(); }
-  ZORMetaClass* GetMetaObject() const override { return owner_->GetClass(); }
+  unsigned int AddRef() override { return self_.AddReference(); }
+  unsigned int Release() override { return self_.ReleaseReference(); }
+  ZORMetaClass* GetMetaObject() const override { return self_.GetClass(); }
   /// The facet that is the component's identity.
-  ZORBaseUnknown* GetImpl() const override { return owner_->FindFacet(ZORBaseUnknown::ClassId()); }
+  ZORBaseUnknown* GetImpl() const override { return self_.FindFacet(ZORBaseUnknown::ClassId()); }
 
- private:
-  FacetedComponent* owner_;
+ protected:
+  Owner& self_;
 };
 
 }  // namespace ZORDefault
