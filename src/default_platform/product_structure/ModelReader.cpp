@@ -18,6 +18,7 @@
 #include <cstring>
 #include <optional>
 #include <system_error>
+#include <utility>
 
 #include "foundation/Descriptor.h"
 #include "foundation/PluginLoader.h"
@@ -89,7 +90,7 @@ class SpawnRequest {
   pid_t Spawn(const std::vector<std::string>& inArguments) {
     for (const int standard : {0, 1, 2})
       posix_spawn_file_actions_addopen(&actions_, standard, "/dev/null", O_RDWR, 0);
-    posix_spawn_file_actions_addclosefrom_np(&actions_, ModelReaderProtocol::kStatus + 1);
+    posix_spawn_file_actions_addclosefrom_np(&actions_, ModelReaderProtocol::kTask + 1);
     sigset_t signals;
     sigfillset(&signals);
     posix_spawnattr_setsigdefault(&attributes_, &signals);
@@ -122,6 +123,7 @@ class Child {
   Child(const Child&) = delete;
   Child& operator=(const Child&) = delete;
 
+  void AskToEnd() { kill(process_, SIGTERM); }
   void Kill() {
     kill(process_, SIGKILL);
     Wait();
@@ -142,43 +144,61 @@ class Child {
 /// Follows the lines by which the reader reports how far it is.
 class StatusLines {
  public:
-  explicit StatusLines(const std::function<void(double)>& inProgress) : progress_(inProgress) {}
+  StatusLines(const std::function<void(double)>& inProgress,
+              const std::function<bool(std::string_view)>& inTell)
+      : progress_(inProgress), tell_(inTell) {}
 
-  void Add(std::string_view inText) {
+  /// @return false when the reader is to end.
+  bool Add(std::string_view inText) {
+    bool goesOn = true;
     for (const char byte : inText) {
-      if (byte != '\n') {
+      if (byte != '\n')
         line_ += byte;
-        continue;
-      }
-      if (std::isdigit(static_cast<unsigned char>(line_.front())) == 0)
-        stage_ = line_;
-      else if (progress_)
-        progress_(std::atoi(line_.c_str()) / 100.0);
-      line_.clear();
+      else
+        goesOn = AddLine() && goesOn;
     }
+    return goesOn;
   }
   const std::string& Stage() const { return stage_; }
+  bool IsModelRead() const { return isModelRead_; }
 
  private:
+  bool AddLine() {
+    const std::string line = std::exchange(line_, {});
+    if (line.starts_with('=')) {
+      isModelRead_ = true;
+      return !tell_ || tell_(std::string_view(line).substr(1));
+    }
+    if (std::isdigit(static_cast<unsigned char>(line.front())) == 0)
+      stage_ = line;
+    else if (progress_)
+      progress_(std::atoi(line.c_str()) / 100.0);
+    return true;
+  }
+
   const std::function<void(double)>& progress_;
+  const std::function<bool(std::string_view)>& tell_;
   std::string line_;
   std::string stage_ = "starting";
+  bool isModelRead_ = false;
 };
 
 /// @return false when the time is over before the reader has ended.
-bool FollowUntilEnd(const Descriptor& inStatus, Clock::time_point inDeadline,
+bool FollowUntilEnd(const Descriptor& inStatus, Clock::time_point inDeadline, Child& ioChild,
                     StatusLines& ioLines) {
   for (;;) {
     const auto left =
-        std::chrono::duration_cast<std::chrono::milliseconds>(inDeadline - Clock::now());
-    if (left.count() <= 0) return false;
+        std::chrono::duration_cast<std::chrono::milliseconds>(inDeadline - Clock::now()).count();
+    if (left <= 0 && !ioLines.IsModelRead()) return false;
     pollfd waiting{inStatus.Get(), POLLIN, 0};
-    const int ready = poll(&waiting, 1, static_cast<int>(std::min<long>(left.count(), 1 << 30)));
+    const bool isForEver = ioLines.IsModelRead();
+    const int ready =
+        poll(&waiting, 1, isForEver ? -1 : static_cast<int>(std::min<long>(left, 1 << 30)));
     if (ready <= 0) continue;  // the time is over, or a signal came
     char buffer[4096];
     const ssize_t count = read(inStatus.Get(), buffer, sizeof buffer);
     if (count == 0) return true;
-    if (count > 0) ioLines.Add({buffer, static_cast<std::size_t>(count)});
+    if (count > 0 && !ioLines.Add({buffer, static_cast<std::size_t>(count)})) ioChild.AskToEnd();
   }
 }
 
@@ -194,8 +214,9 @@ std::string Seconds(double inSeconds) {
 
 [[noreturn]] void RaiseExcess(ModelErrorKind inKind, const std::string& inLimit,
                               const StatusLines& inLines) {
-  throw ModelReaderError{
-      inKind, "takes more than " + inLimit + " to read; stopped while " + inLines.Stage()};
+  throw ModelReaderError{inKind, "takes more than " + inLimit +
+                                     (inLines.IsModelRead() ? " to work on" : " to read") +
+                                     "; stopped while " + inLines.Stage()};
 }
 
 /// Raises why the reader ended without an answer.
@@ -204,9 +225,10 @@ void CheckEnd(int inStatus, const ModelLimits& inLimits, const StatusLines& inLi
     const int signal = WTERMSIG(inStatus);
     if (signal == SIGXCPU)
       RaiseExcess(ModelErrorKind::kTimeLimit, Seconds(inLimits.seconds), inLines);
-    throw ModelReaderError{ModelErrorKind::kCrash, std::string("cannot be read: the CAD kernel ") +
-                                                       "crashed (" + sigabbrev_np(signal) +
-                                                       ") while " + inLines.Stage()};
+    throw ModelReaderError{
+        ModelErrorKind::kCrash,
+        std::string("cannot be ") + (inLines.IsModelRead() ? "worked on" : "read") +
+            ": the CAD kernel crashed (" + sigabbrev_np(signal) + ") while " + inLines.Stage()};
   }
   const int code = WEXITSTATUS(inStatus);
   if (code == ModelReaderProtocol::kExitOutOfMemory)
@@ -233,9 +255,10 @@ ModelLimits LimitsFor(const ModelOptions& inOptions, std::size_t inFileSize) {
 }
 
 std::string ReadModelInChild(const ModelRequest& inRequest, std::string_view inBytes,
-                             const ModelLimits& inLimits) {
-  const std::string reader = ZORFoundation::LibraryDirectory() + kModelReaderPath;
+                             const ModelLimits& inLimits, const ModelProgram& inProgram) {
+  const std::string reader = ZORFoundation::LibraryDirectory() + inProgram.path;
   const Descriptor model = MemoryFile(inBytes);
+  const Descriptor task = MemoryFile(inProgram.task);
   const Descriptor result = MemoryFile({});
   Pipe status = MakePipe();
   char deflection[32];
@@ -244,18 +267,19 @@ std::string ReadModelInChild(const ModelRequest& inRequest, std::string_view inB
   request.Give(model, ModelReaderProtocol::kModel);
   request.Give(result, ModelReaderProtocol::kResult);
   request.Give(status.write, ModelReaderProtocol::kStatus);
+  request.Give(task, ModelReaderProtocol::kTask);
   const pid_t process = request.Spawn({reader, std::to_string(static_cast<int>(inRequest.format)),
                                        deflection, std::to_string(inLimits.memory),
                                        std::to_string(inLimits.seconds), inRequest.path});
   if (process < 0) RaiseSystemError(("the model reader " + reader).c_str(), -process);
   Child child(process);
   status.write.Close();
-  StatusLines lines(inRequest.progress);
+  StatusLines lines(inRequest.progress, inProgram.tell);
   // Processor time is what is limited, so that a busy machine changes nothing; a reader that waits
   // for ever is stopped all the same.
   const auto deadline = Clock::now() + std::chrono::milliseconds(static_cast<std::int64_t>(
                                            1000 * (5 + 10 * std::min(inLimits.seconds, 1e6))));
-  if (!FollowUntilEnd(status.read, deadline, lines)) {
+  if (!FollowUntilEnd(status.read, deadline, child, lines)) {
     child.Kill();
     RaiseExcess(ModelErrorKind::kTimeLimit, Seconds(inLimits.seconds), lines);
   }

@@ -7,6 +7,7 @@
 #include <string>
 #include <string_view>
 
+#include "default_platform/ModelProgram.h"
 #include "default_platform/OpenModel.h"
 #include "default_platform/product_structure/ModelFormat.h"
 
@@ -28,16 +29,19 @@ struct ModelLimits {
 /// The limits of the options; where they have none, those for a file of this size.
 ModelLimits LimitsFor(const ModelOptions& inOptions, std::size_t inFileSize);
 
-/// The reader, a program that lies in this folder beside our libraries. Its arguments are the
-/// format's number, the deflection, the memory in bytes and the model's path. What it opens by
-/// itself it may read from the model's folder alone.
+/// The reader, a program that lies in this folder beside our libraries. Its arguments, and those of
+/// others that read a model, are the format's number, the deflection, the memory in bytes, the
+/// seconds and the model's path. What it opens by itself it may read from the model's folder alone.
 inline constexpr char kModelReaderPath[] = "/ZORLyra/zor-model-reader";
 
-/// The descriptors that the reader is given, and its exit codes.
+/// The descriptors that such a program is given, and its exit codes.
 struct ModelReaderProtocol {
   static constexpr int kModel = 3;   ///< the model's bytes
   static constexpr int kResult = 4;  ///< takes an encoded model, or why there is none
-  static constexpr int kStatus = 5;  ///< takes lines: a percentage, or what is done from then on
+  /// Takes lines: a percentage, what is done from then on, or "=" and what the caller is told. After
+  /// one of these the model is read and time has no limit.
+  static constexpr int kStatus = 5;
+  static constexpr int kTask = 6;  ///< what is to be done with the model, if anything
   static constexpr int kExitRead = 0;
   static constexpr int kExitRefused = 2;
   static constexpr int kExitOutOfMemory = 3;
@@ -50,9 +54,12 @@ struct ModelReaderError {
 };
 
 /// Reads a model from its bytes. Several may be read at a time.
-/// @return the model, encoded. Raises ModelReaderError, and what the progress function raises.
+/// @param inProgram of which only the path is used for the reader.
+/// @return the model, encoded, or what else the program answers. Raises ModelReaderError, and what the
+///         functions raise.
 std::string ReadModelInChild(const ModelRequest& inRequest, std::string_view inBytes,
-                             const ModelLimits& inLimits);
+                             const ModelLimits& inLimits,
+                             const ModelProgram& inProgram = {kModelReaderPath, {}, 0, {}});
 
 }  // namespace ZORDefault
 

@@ -5,6 +5,7 @@
 #include <filesystem>
 #include <optional>
 
+#include "default_platform/ModelProgram.h"
 #include "default_platform/product_structure/ModelCache.h"
 #include "default_platform/product_structure/ModelDocument.h"
 #include "default_platform/product_structure/ModelFormat.h"
@@ -110,6 +111,17 @@ ModelError::ModelError(const std::string& inPath, const std::string& inReason,
       kind_(inKind) {}
 
 ModelError::~ModelError() = default;
+
+std::string RunOnModel(const std::string& inPath, const ModelProgram& inProgram,
+                       const ModelOptions& inOptions) try {
+  const std::string bytes = ReadBytes(inPath);
+  ModelLimits limits = LimitsFor(inOptions, bytes.size());
+  if (inOptions.maxMemory == 0) limits.memory += inProgram.memory;
+  return ReadModelInChild(RequestFor(inPath, CheckedFormat(inPath, bytes), inOptions), bytes,
+                          limits, inProgram);
+} catch (const ModelReaderError& error) {
+  throw ModelError(inPath, error.reason, error.kind);
+}
 
 OpenedModel OpenModel(const std::string& inPath, const ModelOptions& inOptions) {
   if (!(inOptions.deflection > 0 && inOptions.deflection <= kMaxDeflection))

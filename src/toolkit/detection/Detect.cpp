@@ -2,17 +2,18 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstdio>
 #include <filesystem>
 #include <map>
 #include <memory>
 #include <thread>
 
+#include "default_platform/ModelProgram.h"
 #include "default_platform/OpenModel.h"
-#include "foundation/PluginLoader.h"
 #include "foundation/Vector3.h"
 #include "platform/product_structure/ZORIAlias.h"
 #include "toolkit/Error.h"
-#include "toolkit/detection/ModelInterferences.h"
+#include "toolkit/detection/DetectionTask.h"
 #include "toolkit/records/DocumentText.h"
 #include "toolkit/records/Glob.h"
 
@@ -111,12 +112,6 @@ ZORDetection::Placement ToPlacement(const ZORMathTransformation& inPlacement) {
   return placement;
 }
 
-ZORDetection::FindInModelFunction* LoadKernel(std::string& outReason) {
-  void* const function = ZORFoundation::FindPluginFunction(
-      ZORDetection::kDetectionLibrary, ZORDetection::kFindInModelName, outReason);
-  return reinterpret_cast<ZORDetection::FindInModelFunction*>(function);
-}
-
 /// Which units are looked at, and which of them against which.
 class Selection {
  public:
@@ -137,10 +132,8 @@ class Selection {
   }
 
   bool IsSelected(std::size_t inUnit) const { return isFirst_[inUnit] || isSecond_[inUnit]; }
-  bool IsWanted(std::size_t inUnit, std::size_t inOther) const {
-    return inUnit != inOther &&
-           ((isFirst_[inUnit] && isSecond_[inOther]) || (isFirst_[inOther] && isSecond_[inUnit]));
-  }
+  bool IsFirst(std::size_t inUnit) const { return isFirst_[inUnit]; }
+  bool IsSecond(std::size_t inUnit) const { return isSecond_[inUnit]; }
 
  private:
   std::vector<bool> isFirst_, isSecond_;
@@ -174,6 +167,18 @@ void Merge(DetectedInterference inFound, DetectedInterference& ioBest) {
   ioBest.isDuplicate = ioBest.isDuplicate && inFound.isDuplicate;
   if (inFound.meshPrecision)
     ioBest.meshPrecision = std::max(ioBest.meshPrecision.value_or(0), *inFound.meshPrecision);
+}
+
+// What finding may take besides reading, in bytes, where there is no limit of the user's.
+constexpr std::uint64_t kMemory = std::uint64_t{1} << 30, kMemoryPerThread = 64 << 20,
+                        kMemoryPerProduct = 16 << 10;
+
+ZORDefault::ModelOptions ModelOptionsOf(const DetectionOptions& inOptions) {
+  ZORDefault::ModelOptions options;
+  options.maxSeconds = inOptions.maxSeconds;
+  options.maxMemory = inOptions.maxMemory;
+  options.isStrict = inOptions.isStrict;
+  return options;
 }
 
 class Detection {
@@ -214,13 +219,16 @@ class Detection {
         continue;
       }
       chosen_.push_back(leaf);
-      products_.push_back({leaf.part, ToPlacement(leaf.rootFromProduct)});
+      task_.products.push_back({{leaf.part, ToPlacement(leaf.rootFromProduct)},
+                                static_cast<std::uint32_t>(leaf.unit),
+                                selection_.IsFirst(leaf.unit),
+                                selection_.IsSecond(leaf.unit)});
     }
     if (result_.productsChecked < 2) throw Error(model_ + ": there are not two products to check");
   }
 
   ZORDetection::Findings Find() {
-    ZORDetection::Options options;
+    ZORDetection::Options& options = task_.options;
     options.tolerance = options_.tolerance;
     options.contactGap = options_.contactGap;
     options.clearance = options_.clearance;
@@ -229,16 +237,21 @@ class Detection {
                                                                : ZORDetection::SheetPolicy::kIgnore;
     options.threads = options_.threads != 0 ? options_.threads
                                             : std::max(1U, std::thread::hardware_concurrency());
-    options.progress = options_.progress;
-    options.isWanted = [this](std::uint32_t first, std::uint32_t second) {
-      return selection_.IsWanted(chosen_[first].unit, chosen_[second].unit);
-    };
-    std::string reason;
-    ZORDetection::Findings findings;
-    auto* const kernel = LoadKernel(reason);
-    if (kernel == nullptr) throw Error(model_ + ": cannot be checked: " + reason);
-    if (!kernel(model_, products_, options, findings, reason)) throw Error(model_ + ": " + reason);
-    return findings;
+    ZORDefault::ModelProgram program;
+    program.path = ZORDetection::kInterferenceFinderPath;
+    program.task = Encode(task_);
+    program.memory =
+        kMemory + kMemoryPerThread * options.threads + kMemoryPerProduct * task_.products.size();
+    program.tell = [this](std::string_view line) { return Tell(std::string(line)); };
+    return ZORDetection::DecodeFindings(
+        ZORDefault::RunOnModel(model_, program, ModelOptionsOf(options_)));
+  }
+
+  /// @param inLine the verdicts that are done, and all of them.
+  bool Tell(const std::string& inLine) const {
+    std::size_t done = 0, all = 0;
+    return !options_.progress || std::sscanf(inLine.c_str(), "%zu %zu", &done, &all) != 2 ||
+           all == 0 || options_.progress(done, all);
   }
 
   void AddFindings(const ZORDetection::Findings& inFindings) {
@@ -257,9 +270,14 @@ class Detection {
     result_.isStopped = inFindings.isStopped;
   }
 
+  /// A part without a name is called by the first product that shows it.
   std::string NameOfPart(std::uint32_t inPart) const {
     const auto name = tree_.PartNames().find(inPart);
-    return "the part \"" + (name == tree_.PartNames().end() ? "" : name->second) + '"';
+    if (name != tree_.PartNames().end() && !name->second.empty())
+      return "the part \"" + name->second + '"';
+    const auto leaf = std::ranges::find(chosen_, inPart, &Leaf::part);
+    return "the part of \"" +
+           (leaf == chosen_.end() ? "" : tree_.Units()[leaf->unit].product.path) + '"';
   }
 
   void AddUnjudged(const ZORDetection::Findings& inFindings) {
@@ -287,7 +305,7 @@ class Detection {
   const TreeReading& tree_;
   const Selection selection_;
   std::vector<Leaf> chosen_;
-  std::vector<ZORDetection::Product> products_;
+  ZORDetection::DetectionTask task_;
   DetectionResult result_;
 };
 
@@ -306,7 +324,7 @@ std::string FindFault(const DetectionOptions& inOptions) {
 
 DetectionResult Detect(const std::string& inModel, const DetectionOptions& inOptions) {
   if (const std::string fault = FindFault(inOptions); !fault.empty()) throw Error(fault);
-  ZORDefault::ModelOptions modelOptions;
+  ZORDefault::ModelOptions modelOptions = ModelOptionsOf(inOptions);
   modelOptions.progress = inOptions.readingProgress;
   modelOptions.warn = inOptions.warn;
   try {

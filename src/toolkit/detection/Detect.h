@@ -4,6 +4,7 @@
 
 #include <array>
 #include <cstddef>
+#include <cstdint>
 #include <functional>
 #include <optional>
 #include <string>
@@ -31,6 +32,10 @@ struct DetectionOptions {
   std::optional<std::pair<std::string, std::string>> between;  ///< one selection against another
   SheetsMean sheets = SheetsMean::kClash;
   unsigned threads = 0;  ///< 0: as many as there are processors
+  /// Processor time in seconds and memory in bytes that reading the model may take; 0: by its size.
+  double maxSeconds = 0;
+  std::uint64_t maxMemory = 0;
+  bool isStrict = false;  ///< a model of which something cannot be read is an error, not a warning
 
   std::function<void(double)> readingProgress;             ///< told the share, 0 to 1; may be empty
   std::function<bool(std::size_t, std::size_t)> progress;  ///< told pairs done of all; false: stop
@@ -77,8 +82,8 @@ struct CalendarDate {
 /// What is wrong with the lengths of the options, one line; empty when nothing is.
 ZOR_TOOLKIT_EXPORT std::string FindFault(const DetectionOptions& inOptions);
 
-/// Finds all interferences of a STEP, IGES, glTF, GLB, OBJ or STL file. The number of threads does not
-/// change the result.
+/// Finds all interferences of a STEP, IGES, glTF, GLB, OBJ or STL file, in a process of its own, so that
+/// a damaged file cannot crash the caller's. The number of threads does not change the result.
 /// Raises Error when the model cannot be read, when there are not two products to check, or when a
 /// selection is empty.
 ZOR_TOOLKIT_EXPORT DetectionResult Detect(const std::string& inModel,

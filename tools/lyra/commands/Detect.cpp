@@ -11,6 +11,7 @@
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
+#include "lyra/commands/Model.h"
 #include "lyra/terminal/Progress.h"
 
 namespace lyra {
@@ -25,6 +26,7 @@ struct DetectOptions {
                             sheets = "clash";
   std::optional<long long> level, jobs;
   std::vector<std::string> only, ignore, between;
+  ModelReading reading;
 };
 
 double LengthOf(const char* inOption, const std::string& inText) {
@@ -54,6 +56,11 @@ DetectionOptions ToDetection(const DetectOptions& inOptions) {
                                       SheetsMean::kNothing};
   options.sheets = kMeanings[ChosenWord("--sheets", inOptions.sheets, kSheetWords)];
   if (const std::string fault = FindFault(options); !fault.empty()) throw UsageError(fault);
+  inOptions.reading.Check();
+  const ZORDefault::ModelOptions reading = inOptions.reading.Options();
+  options.maxSeconds = reading.maxSeconds;
+  options.maxMemory = reading.maxMemory;
+  options.isStrict = reading.isStrict;
   return options;
 }
 
@@ -135,6 +142,7 @@ VerbAction DeclareDetect(Arguments& ioArguments) {
   ioArguments.Words("--sheets", kSheetWords);
   ioArguments.Number("--jobs", "N", options->jobs,
                      "Threads to work with (default: one for each processor)");
+  options->reading.Declare(ioArguments);
   return [options](Output& ioOutput) { return Run(*options, ioOutput); };
 }
 

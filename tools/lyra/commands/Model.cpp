@@ -111,14 +111,19 @@ void ModelReading::Check() const {
   check("--limit-memory", megabytes);
 }
 
+ZORDefault::ModelOptions ModelReading::Options() const {
+  ZORDefault::ModelOptions options;
+  options.isStrict = isStrict;
+  options.maxSeconds = static_cast<double>(LimitOf(seconds, "LimitTime"));
+  options.maxMemory = static_cast<std::uint64_t>(LimitOf(megabytes, "LimitMemory")) << 20;
+  return options;
+}
+
 ZORDefault::OpenedModel OpenModelFile(const std::string& inPath, const ModelReading& inReading) {
   inReading.Check();
   if (inPath == "-") throw InputError("-: a model cannot be read from standard input");
   ProgressLine progress("reading " + inPath);
-  ZORDefault::ModelOptions options;
-  options.isStrict = inReading.isStrict;
-  options.maxSeconds = static_cast<double>(LimitOf(inReading.seconds, "LimitTime"));
-  options.maxMemory = static_cast<std::uint64_t>(LimitOf(inReading.megabytes, "LimitMemory")) << 20;
+  ZORDefault::ModelOptions options = inReading.Options();
   options.progress = [&](double inDone) { progress.Show(inDone); };
   options.warn = [&](const std::string& inWarning) { progress.Warn(inWarning); };
   try {

@@ -26,6 +26,8 @@ struct ModelReading {
   void Declare(Arguments& ioArguments);
   /// Raises UsageError for a limit that is none.
   void Check() const;
+  /// With the limits of the settings where none is given.
+  ZORDefault::ModelOptions Options() const;
 };
 
 /// Opens a model. What was repaired or left out is reported on standard error, progress too when that is

@@ -228,12 +228,11 @@ LoadedDocument ReadDocument(const ModelRequest& inRequest, const Message_Progres
   return loaded;
 }
 
-bool ReadModelShapes(const std::string& inPath, std::vector<TopoDS_Shape>& outShapes,
+bool ReadModelShapes(const std::string& inPath, int inFormat, std::vector<TopoDS_Shape>& outShapes,
                      std::string& outReason) try {
   ModelRequest request;
-  request.path = std::filesystem::absolute(inPath).string();
-  request.format = DecideFormat(inPath, ZORFoundation::ReadWholeFile(inPath).bytes, outReason);
-  if (request.format == ModelFormat::kUnknown) return false;
+  request.path = inPath;
+  request.format = static_cast<ModelFormat>(inFormat);
   PrepareReaders();
   const LoadedDocument loaded = ReadDocument(request, {});
   if (loaded.document.IsNull()) {

@@ -1,0 +1,147 @@
+#include "toolkit/detection/DetectionTask.h"
+
+#include <cstring>
+#include <stdexcept>
+#include <type_traits>
+
+namespace ZORDetection {
+namespace {
+
+/// Turns values into bytes.
+class Packer {
+ public:
+  template <typename Value>
+  void operator()(const Value& inValue) {
+    static_assert(std::is_trivially_copyable_v<Value>);
+    bytes_.append(reinterpret_cast<const char*>(&inValue), sizeof inValue);
+  }
+  void operator()(const std::string& inText) {
+    (*this)(inText.size());
+    bytes_ += inText;
+  }
+  template <typename Item>
+  void operator()(const std::vector<Item>& inItems) {
+    (*this)(inItems.size());
+    for (const Item& item : inItems) Pass(*this, item);
+  }
+  template <typename Packing, typename Item>
+  static void Pass(Packing& ioPacking, Item& ioItem) {
+    if constexpr (requires { Fields(ioPacking, ioItem); })
+      Fields(ioPacking, ioItem);
+    else
+      ioPacking(ioItem);
+  }
+  std::string Take() { return std::move(bytes_); }
+
+ private:
+  std::string bytes_;
+};
+
+/// And back, in the same order.
+class Unpacker {
+ public:
+  explicit Unpacker(std::string_view inBytes) : left_(inBytes) {}
+
+  template <typename Value>
+  void operator()(Value& outValue) {
+    static_assert(std::is_trivially_copyable_v<Value>);
+    std::memcpy(&outValue, Next(sizeof outValue).data(), sizeof outValue);
+  }
+  void operator()(std::string& outText) { outText = Next(Size()); }
+  template <typename Item>
+  void operator()(std::vector<Item>& outItems) {
+    const std::size_t size = Size();
+    if (size > left_.size()) Next(size);  // each item has a byte at least
+    outItems.resize(size);
+    for (Item& item : outItems) Packer::Pass(*this, item);
+  }
+
+ private:
+  std::size_t Size() {
+    std::size_t size = 0;
+    (*this)(size);
+    return size;
+  }
+  std::string_view Next(std::size_t inSize) {
+    if (inSize > left_.size()) throw std::runtime_error("the answer was cut off");
+    const std::string_view next = left_.substr(0, inSize);
+    left_.remove_prefix(inSize);
+    return next;
+  }
+
+  std::string_view left_;
+};
+
+// One list of fields serves both directions.
+
+template <typename Packing, typename Item>
+requires std::is_same_v<std::remove_const_t<Item>, Interference>
+void Fields(Packing& ioPacking, Item& ioItem) {
+  ioPacking(ioItem.first);
+  ioPacking(ioItem.second);
+  ioPacking(ioItem.kind);
+  ioPacking(ioItem.value);
+  ioPacking(ioItem.points);
+  ioPacking(ioItem.curveLength);
+  ioPacking(ioItem.curve);
+  ioPacking(ioItem.isDuplicate);
+  ioPacking(ioItem.isSheetInSolid);
+  ioPacking(ioItem.hasMeshPrecision);
+  ioPacking(ioItem.precision);
+}
+
+template <typename Packing, typename Item>
+requires std::is_same_v<std::remove_const_t<Item>, Unjudged>
+void Fields(Packing& ioPacking, Item& ioItem) {
+  ioPacking(ioItem.part);
+  ioPacking(ioItem.other);
+  ioPacking(ioItem.isWholePart);
+  ioPacking(ioItem.reason);
+}
+
+template <typename Packing, typename Item>
+requires std::is_same_v<std::remove_const_t<Item>, Findings>
+void Fields(Packing& ioPacking, Item& ioItem) {
+  ioPacking(ioItem.interferences);
+  ioPacking(ioItem.unjudged);
+  ioPacking(ioItem.pairsChecked);
+  ioPacking(ioItem.verdicts);
+  ioPacking(ioItem.isStopped);
+}
+
+template <typename Packing, typename Item>
+requires std::is_same_v<std::remove_const_t<Item>, DetectionTask>
+void Fields(Packing& ioPacking, Item& ioItem) {
+  ioPacking(ioItem.options.tolerance);
+  ioPacking(ioItem.options.contactGap);
+  ioPacking(ioItem.options.clearance);
+  ioPacking(ioItem.options.sheets);
+  ioPacking(ioItem.options.threads);
+  ioPacking(ioItem.options.meshSize);
+  ioPacking(ioItem.options.withCurves);
+  ioPacking(ioItem.products);
+}
+
+template <typename Item>
+std::string Packed(const Item& inItem) {
+  Packer packer;
+  Fields(packer, inItem);
+  return packer.Take();
+}
+
+template <typename Item>
+Item Unpacked(std::string_view inBytes) {
+  Item item;
+  Unpacker unpacker(inBytes);
+  Fields(unpacker, item);
+  return item;
+}
+
+}  // namespace
+
+std::string Encode(const DetectionTask& inTask) { return Packed(inTask); }
+DetectionTask DecodeTask(std::string_view inBytes) { return Unpacked<DetectionTask>(inBytes); }
+std::string Encode(const Findings& inFindings) { return Packed(inFindings); }
+Findings DecodeFindings(std::string_view inBytes) { return Unpacked<Findings>(inBytes); }
+
+}  // namespace ZORDetection

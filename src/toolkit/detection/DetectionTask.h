@@ -1,0 +1,38 @@
+// What the program that finds interferences in a model is told, and what it answers.
+#ifndef ZOR_TOOLKIT_DETECTION_DETECTIONTASK_H
+#define ZOR_TOOLKIT_DETECTION_DETECTIONTASK_H
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "toolkit/detection/FindInterferences.h"
+
+namespace ZORDetection {
+
+/// It lies in the folder of the model reader; see ZORDefault::ModelProgram.
+inline constexpr char kInterferenceFinderPath[] = "/ZORLyra/zor-interference-finder";
+
+struct TaskProduct {
+  Product product;         ///< its part's number is that of ProductInfo
+  std::uint32_t unit = 0;  ///< products of one unit are not looked at against each other
+  /// A pair is looked at when one of it is of the first selection and the other of the second.
+  bool isFirst = true, isSecond = true;
+};
+
+struct DetectionTask {
+  Options options;  ///< without its functions
+  std::vector<TaskProduct> products;
+};
+
+// Both run on one machine from one build, so numbers keep the bytes that they have in memory. Decoding
+// raises std::runtime_error for bytes that were cut off.
+
+std::string Encode(const DetectionTask& inTask);
+DetectionTask DecodeTask(std::string_view inBytes);
+std::string Encode(const Findings& inFindings);
+Findings DecodeFindings(std::string_view inBytes);
+
+}  // namespace ZORDetection
+
+#endif
