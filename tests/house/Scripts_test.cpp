@@ -4,8 +4,10 @@
 
 #include <filesystem>
 #include <fstream>
+#include <map>
 
 #include "house/Program.h"
+#include "support/PlatformFolder.h"
 
 using testing::ElementsAre;
 
@@ -42,21 +44,50 @@ TEST(RunReadmeCommands, RefusesAFileWithoutCommands) {
   EXPECT_THAT(RunScript("run-readme-commands", "no block\n"), ElementsAre("code 1"));
 }
 
-TEST(TestCounts, AreThoseOfTheReport) {
+namespace {
+/// What `test-counts` makes of this report of a run and of the reports that programs left of their cases.
+std::vector<std::string> Counts(const std::string& inReport,
+                                const std::map<std::string, std::string>& inPrograms = {}) {
+  const support::TemporaryFolder folder;
+  folder.WriteFile("run.xml", inReport);
+  for (const auto& [program, cases] : inPrograms) folder.WriteFile(program + ".xml", cases);
+  return house::LinesOf("bash " ZOR_SOURCE_DIR "/scripts/test-counts '" +
+                        folder.FilePath("run.xml") + "' '" + folder.path.string() +
+                        "' 2>/dev/null; echo code $?");
+}
+
+const char* const kCases =
+    "<testsuites tests=\"9\"><testsuite name=\"x\" tests=\"9\" failures=\"2\" disabled=\"1\" "
+    "skipped=\"3\" errors=\"0\">\n<testcase name=\"case\" "
+    "status=\"run\"/></testsuite></testsuites>";
+}  // namespace
+
+TEST(TestCounts, AreThoseOfTheRunWithoutReportsOfPrograms) {
   EXPECT_THAT(
-      RunScript("test-counts",
-                "<?xml version=\"1.0\"?>\n<testsuite name=\"x\"\n\ttests=\"9\"\n\tfailures=\"2\"\n"
-                "\tdisabled=\"1\"\n\tskipped=\"3\"\n>\n<testcase name=\"a\"/>\n</testsuite>\n"),
-      ElementsAre("3 2 4", "code 0"));
+      Counts("<testsuite>\n<testcase name=\"a\" status=\"run\"/>\n"
+             "<testcase name=\"b\"\tstatus=\"fail\">\n<testcase name=\"c\" status=\"notrun\">"
+             "<testcase name=\"d\" status=\"disabled\"></testsuite>"),
+      ElementsAre("1 1 2", "code 0"));
 }
 
-TEST(TestCounts, RefuseAReportWithoutCounts) {
-  EXPECT_THAT(RunScript("test-counts", "<testsuite name=\"x\" tests=\"9\">\n"),
+TEST(TestCounts, AreThoseOfTheCasesOfAProgram) {
+  EXPECT_THAT(Counts("<testcase name=\"a\" status=\"run\"/><testcase name=\"b\" status=\"fail\"/>",
+                     {{"b", kCases}}),
+              ElementsAre("4 2 4", "code 0"));
+}
+
+TEST(TestCounts, FailWithAProgramWhoseCasesAllPassed) {
+  EXPECT_THAT(
+      Counts("<testcase name=\"a\" status=\"fail\"/>",
+             {{"a", "<testsuite tests=\"5\" failures=\"0\" disabled=\"0\" skipped=\"0\">"}}),
+      ElementsAre("5 1 0", "code 0"));
+}
+
+TEST(TestCounts, RefuseReportsWithoutCounts) {
+  EXPECT_THAT(Counts(""), ElementsAre("code 1"));
+  EXPECT_THAT(Counts("<testcase name=\"a\">"), ElementsAre("code 1"));
+  EXPECT_THAT(Counts("<testcase name=\"a\" status=\"run\"/>", {{"a", "<testsuite tests=\"5\">"}}),
               ElementsAre("code 1"));
-}
-
-TEST(TestCounts, RefuseAnEmptyReport) {
-  EXPECT_THAT(RunScript("test-counts", ""), ElementsAre("code 1"));
 }
 
 namespace {
