@@ -7,6 +7,9 @@ target_compile_options(zor_compile_options INTERFACE
 if(ZOR_SANITIZE)
   add_compile_options(-fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)
   add_link_options(-fsanitize=address,undefined)
+  if(ZOR_FUZZ)
+    add_compile_options(-fsanitize=fuzzer-no-link)
+  endif()
   # The sanitizers' own code makes the compiler see uninitialised values in the standard library. The other builds warn.
   target_compile_options(zor_compile_options INTERFACE -Wno-maybe-uninitialized)
 endif()

@@ -43,11 +43,7 @@ void HandleAll(void (*inHandler)(int)) {
 
 // Handlers do nothing but what is async-signal-safe.
 void RemoveAndEnd(int inSignal) {
-  const pid_t self = getpid();
-  for (const Slot& slot : slots)
-    if (slot.owner == self) unlink(slot.path);
-  for (const Slot& slot : slots)  // folders, which are empty only now
-    if (slot.owner == self) rmdir(slot.path);
+  RemoveUnfinishedFiles();
   EndBySignal(inSignal);
 }
 
@@ -57,6 +53,14 @@ void NoteAndLetTheNextEnd(int inSignal) {
 }
 
 }  // namespace
+
+void RemoveUnfinishedFiles() noexcept {
+  const pid_t self = getpid();
+  for (const Slot& slot : slots)
+    if (slot.owner == self) unlink(slot.path);
+  for (const Slot& slot : slots)  // folders, which are empty only now
+    if (slot.owner == self) rmdir(slot.path);
+}
 
 void HandleTerminationSignals() { HandleAll(RemoveAndEnd); }
 

@@ -27,6 +27,10 @@ class ZOR_FOUNDATION_EXPORT RemoveOnSignal {
   std::size_t slot_;
 };
 
+/// What the handlers do before they end the process; async-signal-safe. For whoever ends it without
+/// destructors.
+ZOR_FOUNDATION_EXPORT void RemoveUnfinishedFiles() noexcept;
+
 /// While this lives the first termination signal is only recorded, so that work can stop cleanly;
 /// the next one ends the process. One at a time; inherited by forked processes.
 class ZOR_FOUNDATION_EXPORT StopRequest {

@@ -2,6 +2,7 @@
 
 #include <csignal>
 #include <cstdio>
+#include <cstdlib>
 #include <exception>
 #include <new>
 #include <string>
@@ -74,6 +75,26 @@ int ParseAndAct(int inCount, char** inArguments, Output& ioOutput) {
   return Act(line.verbs, ioOutput);
 }
 
+std::terminate_handler usualTermination = std::abort;
+
+void ComplainOfMemory() { std::fputs("lyra: there is not enough memory\n", stderr); }
+
+volatile bool hasLackedMemory = false;
+
+[[noreturn]] void NoteLackOfMemory() {
+  hasLackedMemory = true;
+  throw std::bad_alloc();
+}
+
+// The parser of the command line and the standard library allocate in functions that may raise
+// nothing.
+[[noreturn]] void ReportAndEnd() {
+  if (!hasLackedMemory) usualTermination();  // a mistake of ours, which is to be seen
+  ComplainOfMemory();
+  ZORFoundation::RemoveUnfinishedFiles();
+  std::_Exit(kUnusable);
+}
+
 int RunAndReport(int inCount, char** inArguments) {
   // A reader that goes away shows as a failed write, so that work can stop in good order.
   std::signal(SIGPIPE, SIG_IGN);
@@ -100,12 +121,14 @@ int RunAndReport(int inCount, char** inArguments) {
 
 }  // namespace
 
-// Reporting an error may also lack memory; this line needs none.
+// Reporting an error may also lack memory; these lines need none.
 int RunLyra(int inCount, char** inArguments) {
+  usualTermination = std::set_terminate(ReportAndEnd);
+  std::set_new_handler(NoteLackOfMemory);
   try {
     return RunAndReport(inCount, inArguments);
   } catch (const std::bad_alloc&) {
-    std::fputs("lyra: there is not enough memory\n", stderr);
+    ComplainOfMemory();
     return kUnusable;
   }
 }

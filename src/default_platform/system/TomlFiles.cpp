@@ -3,6 +3,7 @@
 #include <toml++/toml.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <optional>
 
 #include "foundation/PluginLoader.h"
@@ -89,6 +90,24 @@ FileCache<TomlTable>& SettingFiles() {
 }
 
 }  // namespace
+
+std::optional<ZORFoundation::WholeFile> ReadUnlessUnreadable(const std::string& inPath) {
+  try {
+    ZORFoundation::ReadOptions options;
+    options.maxSize = std::uint64_t{64} << 20;
+    return ZORFoundation::ReadWholeFile(inPath, options);
+  } catch (const ZORFoundation::FileError& error) {
+    switch (error.Code()) {
+      case EMFILE:
+      case ENFILE:
+      case ENOMEM:
+      case EIO:
+        throw;
+      default:
+        return std::nullopt;
+    }
+  }
+}
 
 std::shared_ptr<const TomlTable> ParseToml(std::string_view inText) {
   if (ZORFoundation::FindTooDeepToml(inText)) return nullptr;

@@ -49,6 +49,10 @@ std::optional<FoundFile> FindFirst(const std::vector<std::string>& inPaths);
 std::shared_ptr<const TomlTable> ReadSettingFile(std::string_view inFolder,
                                                  std::string_view inName);
 
+/// @return nothing for a file that is missing, not regular, too large or not for this user. Raises
+/// FileError for other reasons.
+std::optional<ZORFoundation::WholeFile> ReadUnlessUnreadable(const std::string& inPath);
+
 /// Caches the parsed content of files, reading one again only when its stamp has changed. A file
 /// written so recently that a second change could carry the same time is read again until it has
 /// settled.
@@ -60,7 +64,8 @@ class FileCache {
 
   explicit FileCache(Reader inReader) : reader_(inReader) {}
 
-  /// @return null when there is no file, or it cannot be read or parsed.
+  /// @return null when there is no file, or it cannot be read or parsed. Raises FileError when the
+  /// system is short of what reading takes: what the file says is not known then.
   Pointer Get(const std::optional<FoundFile>& inFile) {
     if (!inFile) return nullptr;
     const std::lock_guard lock(mutex_);
@@ -80,7 +85,7 @@ class FileCache {
     constexpr std::int64_t kSettlingTime = 50'000'000;  // some ticks of a file system's clock
     outEntry = Entry();
     const std::int64_t now = ZORFoundation::FileClockNow();
-    const auto file = ZORFoundation::TryReadWholeFile(inPath);
+    const auto file = ReadUnlessUnreadable(inPath);
     if (!file) return;
     outEntry.stamp = file->before;
     outEntry.isSettled = file->IsConsistent() && file->before.changed + kSettlingTime < now;

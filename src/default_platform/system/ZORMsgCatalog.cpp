@@ -1,6 +1,8 @@
 #include "platform/system/ZORMsgCatalog.h"
 
 #include <map>
+#include <mutex>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -61,27 +63,31 @@ std::string UserLanguage() {
 
 // The files that a catalogue may be, the first to be looked for first. Hosts ask for the same one a
 // hundred thousand times: the last answer holds as long as the environment does.
-const std::vector<std::string>& CandidatesOf(const char* inName) {
+std::shared_ptr<const std::vector<std::string>> CandidatesOf(const char* inName) {
   struct Search {
     std::string name, language, path;
-    std::vector<std::string> files;
+    std::shared_ptr<const std::vector<std::string>> files;
   };
-  thread_local Search last;
+  static std::mutex mutex;
+  static auto* const lastOfAll = new Search;
+  const std::lock_guard lock(mutex);
+  Search& last = *lastOfAll;
   const std::string language = UserLanguage();
   const char* const path = ZORGetEnv("ZOR_CATALOGUE_PATH");
   const std::string_view pathNow = path == nullptr ? "" : path;
   if (last.name == inName && last.language == language && last.path == pathNow) return last.files;
   const std::vector<std::string> directories = ZORDefault::CatalogueDirectories();
-  last = {inName, language, std::string(pathNow),
-          ZORDefault::TomlCandidates(directories, language + "/", inName)};
+  auto files = std::make_shared<std::vector<std::string>>(
+      ZORDefault::TomlCandidates(directories, language + "/", inName));
   for (std::string& file : ZORDefault::TomlCandidates(directories, "en/", inName))
-    last.files.push_back(std::move(file));
+    files->push_back(std::move(file));
+  last = Search{inName, language, std::string(pathNow), std::move(files)};
   return last.files;
 }
 
 MessagesPointer FindMessages(const char* inName) {
   if (!inName) return nullptr;
-  return CatalogueFiles().Get(ZORDefault::FindFirst(CandidatesOf(inName)));
+  return CatalogueFiles().Get(ZORDefault::FindFirst(*CandidatesOf(inName)));
 }
 
 }  // namespace

@@ -8,6 +8,7 @@
 #include <libxslt/xsltInternals.h>
 #include <libxslt/xsltutils.h>
 
+#include <csetjmp>
 #include <cstdarg>
 #include <cstdio>
 #include <memory>
@@ -19,18 +20,6 @@
 
 namespace ZORToolkit {
 namespace {
-
-template <auto Free>
-struct Freer {
-  template <class Item>
-  void operator()(Item* inItem) const {
-    Free(inItem);
-  }
-};
-using XmlDocument = std::unique_ptr<xmlDoc, Freer<xmlFreeDoc>>;
-using StyleSheet = std::unique_ptr<xsltStylesheet, Freer<xsltFreeStylesheet>>;
-using Security = std::unique_ptr<xsltSecurityPrefs, Freer<xsltFreeSecurityPrefs>>;
-using Context = std::unique_ptr<xsltTransformContext, Freer<xsltFreeTransformContext>>;
 
 // Both libraries report in pieces of a line.
 void Collect(void* ioText, const char* inFormat, ...) __attribute__((format(printf, 2, 3)));
@@ -50,21 +39,36 @@ void Collect(void* ioText, const char* inFormat, ...) {
   }
 }
 
-/// Notices when memory is lacking: the libraries then leave out a part of the page and say nothing.
-/// From the first page on, memory comes through here from where it came from before; this library
-/// is never unloaded.
-class AllocationWatch {
+/// Lack of memory ends a call of the libraries where it is noticed, with std::bad_alloc: they
+/// themselves go on with half a page, or crash. What such a call has built stays behind. From the
+/// first page on memory comes through here from where it came from before; this library is never
+/// unloaded.
+class MemoryGuard {
  public:
-  /// Forgets what failed in this thread so far.
-  static void Start() {
-    static const Former once;
-    hasFailed_ = false;
+  /// @param inCall must need no destructor.
+  template <class Call>
+  static auto Run(const Call& inCall) {
+    Install();
+    std::jmp_buf start;
+    if (setjmp(start) != 0) {  // NOLINT(cert-err52-cpp): an exception may not pass through C
+      start_ = nullptr;
+      isBroken_ = true;
+      throw std::bad_alloc();
+    }
+    start_ = &start;
+    const auto result = inCall();
+    start_ = nullptr;
+    return result;
   }
-  static bool HasFailed() { return hasFailed_; }
+
+  /// Whether what belongs to the libraries may be half built, so that it must not be taken apart.
+  static bool IsBroken() { return isBroken_; }
+  static void Start() { isBroken_ = false; }
 
  private:
   struct Former {
     Former() {
+      xmlInitParser();  // holds a lock meanwhile
       xmlMemGet(&free, &allocate, &reallocate, &duplicate);
       former_ = this;
       xmlMemSetup(free, Allocate, Reallocate, Duplicate);
@@ -74,20 +78,52 @@ class AllocationWatch {
     xmlReallocFunc reallocate = nullptr;
     xmlStrdupFunc duplicate = nullptr;
   };
-  static void* Noted(void* inBlock, std::size_t inSize) {
-    if (inBlock == nullptr && inSize > 0) hasFailed_ = true;
+  static void Install() { static const Former once; }
+  static void* Checked(void* inBlock, std::size_t inSize) {
+    if (inBlock == nullptr && inSize > 0 && start_ != nullptr)
+      std::longjmp(*start_, 1);  // NOLINT(cert-err52-cpp)
     return inBlock;
   }
-  static void* Allocate(std::size_t inSize) { return Noted(former_->allocate(inSize), inSize); }
+  static void* Allocate(std::size_t inSize) { return Checked(former_->allocate(inSize), inSize); }
   static void* Reallocate(void* inBlock, std::size_t inSize) {
-    return Noted(former_->reallocate(inBlock, inSize), inSize);
+    return Checked(former_->reallocate(inBlock, inSize), inSize);
   }
   static char* Duplicate(const char* inText) {
-    return static_cast<char*>(Noted(former_->duplicate(inText), 1));
+    return static_cast<char*>(Checked(former_->duplicate(inText), 1));
   }
 
-  static inline thread_local bool hasFailed_ = false;
+  // There from the start: the dynamic loader would allocate them at first use, and end the process
+  // where it cannot.
+  [[gnu::tls_model("initial-exec")]] static inline thread_local std::jmp_buf* start_ = nullptr;
+  [[gnu::tls_model("initial-exec")]] static inline thread_local bool isBroken_ = false;
   static inline const Former* former_ = nullptr;
+};
+
+template <auto Free>
+struct Freer {
+  template <class Item>
+  void operator()(Item* inItem) const {
+    if (!MemoryGuard::IsBroken()) Free(inItem);
+  }
+};
+using XmlDocument = std::unique_ptr<xmlDoc, Freer<xmlFreeDoc>>;
+using StyleSheet = std::unique_ptr<xsltStylesheet, Freer<xsltFreeStylesheet>>;
+using Security = std::unique_ptr<xsltSecurityPrefs, Freer<xsltFreeSecurityPrefs>>;
+using Context = std::unique_ptr<xsltTransformContext, Freer<xsltFreeTransformContext>>;
+
+/// Leads the libraries' messages to a text while this lives.
+class MessagesTo {
+ public:
+  explicit MessagesTo(std::string& ioText) {
+    xmlSetGenericErrorFunc(&ioText, Collect);
+    xsltSetGenericErrorFunc(&ioText, Collect);
+  }
+  ~MessagesTo() {
+    xmlSetGenericErrorFunc(nullptr, nullptr);
+    xsltSetGenericErrorFunc(nullptr, nullptr);
+  }
+  MessagesTo(const MessagesTo&) = delete;
+  MessagesTo& operator=(const MessagesTo&) = delete;
 };
 
 std::string FirstLine(const std::string& inText) { return inText.substr(0, inText.find('\n')); }
@@ -133,15 +169,17 @@ std::string WithVisibleDirections(const std::string& inText) {
 }
 
 xmlDocPtr Parse(const std::string& inBytes, const char* inName, int inOptions) {
-  return xmlReadMemory(inBytes.data(), static_cast<int>(inBytes.size()), inName, nullptr,
-                       XML_PARSE_NONET | inOptions);
+  return MemoryGuard::Run([&] {
+    return xmlReadMemory(inBytes.data(), static_cast<int>(inBytes.size()), inName, nullptr,
+                         XML_PARSE_NONET | inOptions);
+  });
 }
 
 StyleSheet ParseStyleSheet(const PageRequest& inRequest) {
   const std::string own = inRequest.styleSheet.empty() ? kPageStyleSheet : inRequest.styleSheet;
   XmlDocument document(Parse(own, inRequest.styleSheetName.c_str(), XML_PARSE_NOENT));
   if (!document) return nullptr;
-  StyleSheet sheet(xsltParseStylesheetDoc(document.get()));
+  StyleSheet sheet(MemoryGuard::Run([&] { return xsltParseStylesheetDoc(document.get()); }));
   if (!sheet) return nullptr;
   static_cast<void>(document.release());  // the style sheet's now
   return sheet->errors == 0 ? std::move(sheet) : nullptr;
@@ -149,24 +187,25 @@ StyleSheet ParseStyleSheet(const PageRequest& inRequest) {
 
 bool Apply(xsltStylesheet& inSheet, xmlDoc& inDocument, xsltSecurityPrefs& inSecurity,
            std::string& outBytes) {
-  const Context context(xsltNewTransformContext(&inSheet, &inDocument));
+  const Context context(
+      MemoryGuard::Run([&] { return xsltNewTransformContext(&inSheet, &inDocument); }));
   if (!context || xsltSetCtxtSecurityPrefs(&inSecurity, context.get()) != 0) return false;
-  const XmlDocument page(
-      xsltApplyStylesheetUser(&inSheet, &inDocument, nullptr, nullptr, nullptr, context.get()));
+  const XmlDocument page(MemoryGuard::Run([&] {
+    return xsltApplyStylesheetUser(&inSheet, &inDocument, nullptr, nullptr, nullptr, context.get());
+  }));
   if (!page || context->state != XSLT_STATE_OK) return false;
   xmlChar* bytes = nullptr;
   int length = 0;
-  if (xsltSaveResultToString(&bytes, &length, page.get(), &inSheet) != 0 || bytes == nullptr)
-    return false;
+  const int saved = MemoryGuard::Run(
+      [&] { return xsltSaveResultToString(&bytes, &length, page.get(), &inSheet); });
+  if (saved != 0 || bytes == nullptr) return false;
   outBytes.assign(reinterpret_cast<const char*>(bytes), static_cast<std::size_t>(length));
   xmlFree(bytes);
   return true;
 }
 
 bool MakePage(const PageRequest& inRequest, Page& outPage) {
-  xmlSetGenericErrorFunc(&outPage.messages, Collect);
-  xsltSetGenericErrorFunc(&outPage.messages, Collect);
-  const Security security(xsltNewSecurityPrefs());
+  const Security security(MemoryGuard::Run([] { return xsltNewSecurityPrefs(); }));
   if (!security) return false;
   RefuseTheOutside(*security);
   const StyleSheet sheet = ParseStyleSheet(inRequest);
@@ -183,11 +222,9 @@ bool MakePage(const PageRequest& inRequest, Page& outPage) {
 
 ZOR_PAGE_EXPORT bool ZORMakePage(const ZORToolkit::PageRequest& inRequest,
                                  ZORToolkit::Page& outPage) {
-  ZORToolkit::AllocationWatch::Start();
+  ZORToolkit::MemoryGuard::Start();
+  const ZORToolkit::MessagesTo messages(outPage.messages);
   const bool isMade = ZORToolkit::MakePage(inRequest, outPage);
-  xmlSetGenericErrorFunc(nullptr, nullptr);
-  xsltSetGenericErrorFunc(nullptr, nullptr);
-  if (ZORToolkit::AllocationWatch::HasFailed()) throw std::bad_alloc();
   if (!isMade) {
     outPage.reason = ZORToolkit::FirstLine(outPage.messages);
     if (outPage.reason.empty()) outPage.reason = "the style sheet makes no page";

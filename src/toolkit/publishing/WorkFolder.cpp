@@ -37,7 +37,12 @@ WorkFolder::WorkFolder(const fs::path& inFolder)
   Lock(inFolder);
   removeLock_.emplace(lockPath_.c_str());
   removeFolder_.emplace(path_.c_str());
-  RemoveFiles();
+  try {
+    RemoveFiles();
+  } catch (const std::exception&) {
+    RemoveFolder();
+    throw;
+  }
 }
 
 WorkFolder::~WorkFolder() {
@@ -46,6 +51,10 @@ WorkFolder::~WorkFolder() {
   } catch (const std::exception&) {
     // The next run tries again.
   }
+  RemoveFolder();
+}
+
+void WorkFolder::RemoveFolder() const {
   unlink(lockPath_.c_str());  // while it is locked
   rmdir(path_.c_str());
 }

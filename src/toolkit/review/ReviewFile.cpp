@@ -89,6 +89,8 @@ ReviewFile ReadReviewFile(const std::string& inName, std::string_view inBytes) {
     json = Json::parse(inBytes);
   } catch (const Json::parse_error& error) {
     throw Error(inName + ":" + PlaceOfByte(inBytes, error.byte) + ": is no JSON");
+  } catch (const Json::out_of_range&) {
+    throw Error(inName + ": holds a number that is too large");
   }
   Members members(json, inName);
   const std::string format = members.Text("format").value_or("");

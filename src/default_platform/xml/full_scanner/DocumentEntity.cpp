@@ -202,7 +202,7 @@ class IcuStream : public ReaderStream {
     UErrorCode error = U_ZERO_ERROR;
     // One unit stays free for the mark of a fault.
     ucnv_toUnicode(converter_.get(), &target, units_.data() + units_.size() - 1, &source_,
-                   sourceEnd_, nullptr, isLast_, &error);
+                   sourceEnd_, nullptr, static_cast<UBool>(isLast_), &error);
     if (U_FAILURE(error) && error != U_BUFFER_OVERFLOW_ERROR) {
       NoteFault();
       *target++ = 0xFFFF;
