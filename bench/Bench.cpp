@@ -19,13 +19,14 @@ namespace {
 namespace fs = std::filesystem;
 
 constexpr std::size_t kSmallDocument = 32;
+constexpr std::size_t kFewOfPair = 500, kManyOfPair = 5000;
 // Past this the other libraries' trees need more memory than most machines have.
 constexpr std::size_t kMostForPeers = 200'000;
 
 struct Options {
   std::vector<std::size_t> sizes = {1000, 10'000, 100'000};
   std::vector<std::string> benchmarks = {"load",  "loop", "merge",  "report", "dump",
-                                         "whole", "list", "escape", "start"};
+                                         "whole", "list", "review", "escape", "start"};
   std::size_t escapedCharacters = 100'000'000;
   int repeats = 5;
   std::string csv;
@@ -85,6 +86,7 @@ class Bench {
 
   void Run() {
     for (std::size_t size : options_.sizes) RunOnDocuments(size);
+    if (IsWanted("review")) RunPairs();
     if (IsWanted("escape")) {
       Compare("escape", options_.escapedCharacters,
               {{"ZORLyra", "escape-zorlyra"},
@@ -146,9 +148,26 @@ class Bench {
     if (IsWanted("whole"))
       Compare("whole", inSize, {{"ZORLyra", "whole-zorlyra"}},
               {clashes, Document("more.xml", inSize / 100, 5, WriteClashDocument), output});
+    if (IsWanted("review")) RunReview(inSize, clashes);
     if (IsWanted("list") && HasCommand())
       Compare("list", inSize, {{"lyra list --csv", "list-lyra"}, {"ZORLyra", "load-zorlyra"}},
               {clashes});
+  }
+
+  void RunReview(std::size_t inSize, const std::string& inClashes) {
+    const std::string later = Document("later.xml", inSize, 1, WriteRecomputedDocument);
+    Compare("diff", inSize, {{"ZORLyra", "diff-zorlyra"}}, {inClashes, later});
+    Compare("carry", inSize, {{"ZORLyra", "carry-zorlyra"}}, {inClashes, later});
+    Compare("group", inSize, {{"ZORLyra", "group-zorlyra"}}, {inClashes});
+    Compare("gate", inSize, {{"ZORLyra", "gate-zorlyra"}}, {inClashes});
+  }
+
+  // The same pair of products in hundreds and in thousands of interferences.
+  void RunPairs() {
+    for (const std::size_t size : {kFewOfPair, kManyOfPair})
+      Compare("pair", size, {{"ZORLyra", "diff-zorlyra"}},
+              {Document("pair.xml", size, 1, WritePairDocument),
+               Document("pair-later.xml", size, 2, WritePairDocument)});
   }
 
   bool HasCommand() const {
@@ -218,6 +237,7 @@ class Bench {
     PrintGrowth();
     PrintLoadRatios();
     PrintRatios();
+    PrintReviewRatios();
     if (startMeasured_) PrintStartTarget();
   }
 
@@ -284,6 +304,27 @@ class Bench {
       PrintTarget(std::string("append each character / CheckXMLString, ") + step,
                   Ratio("escape", characters, "append each", step, "ZORLyra", step), "at least",
                   10);
+  }
+
+  void PrintReviewRatios() const {
+    const std::size_t most = options_.sizes.back();
+    const auto time = [&](const char* inBenchmark, const char* inStep) {
+      return results_.Milliseconds(inBenchmark, "ZORLyra", most, inStep);
+    };
+    const double diff = time("diff", "read") + time("diff", "diff");
+    PrintTarget("diff / load of both", diff / time("diff", "load"), "at most", 0.5);
+    PrintTarget("diff with identifiers / load of both",
+                (diff + time("diff", "identifiers")) / time("diff", "load"), "at most", 0.5);
+    PrintTarget("carry / load of both", time("carry", "carry") / time("carry", "load"), "at most",
+                0.3);
+    PrintTarget("group / load", time("group", "group") / time("group", "load"), "at most", 0.3);
+    PrintTarget("gate / load", time("gate", "gate") / time("gate", "load"), "at most", 0.3);
+    const auto pair = [&](std::size_t inSize) {
+      return results_.Milliseconds("pair", "ZORLyra", inSize, "read") +
+             results_.Milliseconds("pair", "ZORLyra", inSize, "diff");
+    };
+    PrintTarget("diff of one pair, 5,000 interferences / 500", pair(kManyOfPair) / pair(kFewOfPair),
+                "at most", 10);
   }
 
   void PrintStartTarget() const {

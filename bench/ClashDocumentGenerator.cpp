@@ -1,6 +1,7 @@
 #include "ClashDocumentGenerator.h"
 
 #include <array>
+#include <sstream>
 #include <string>
 #include <string_view>
 
@@ -204,22 +205,78 @@ void AddComponent(std::size_t inNumber, Random& ioRandom, Pieces& ioText) {
   AddTriple("T", ioRandom, ioText);
   ioText << "    </ShapePosition>\n  </Component>\n";
 }
+
+void AddHead(std::size_t inCount, Pieces& ioText) {
+  ioText << "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n"
+            "<ClashElement Version=\"1.2\" ZORDocument=\"large\" Responsible=\"design review\">\n"
+            "  <Date Day=\"20\" Month=\"11\" Year=\"2026\"/>\n"
+            "  <ClashSpec Name=\"large\" Type=\"Clearance + Contact + Clash\" Clearance=\"2\"/>\n"
+            "  <ClashResult Name=\"large.Result.1\" ComputationCase=\"Between all components\" "
+            "NbInterf=\""
+         << inCount << "\">\n";
+}
+
+/// Replaces what stands between the quotes of an attribute's first occurrence.
+void SetAttribute(std::string_view inBegin, std::string_view inValue, std::string& ioText) {
+  const std::size_t begin = ioText.find(inBegin) + inBegin.size();
+  ioText.replace(begin, ioText.find('"', begin) - begin, inValue);
+}
+
+std::string Recomputed(std::string ioText, Random& ioRandom) {
+  SetAttribute(" Status=\"", kStates[0], ioText);
+  SetAttribute(" RetrieveInf=\"", kRetrieved[0], ioText);
+  const std::size_t edit = ioRandom.Below(100);
+  if (edit < 3) return {};
+  if (edit < 6) SetAttribute(" Value=\"", "-77.5", ioText);
+  if (edit == 6 || edit == 7)
+    for (std::size_t at = 0; (at = ioText.find("assembly_", at)) != std::string::npos;)
+      ioText.replace(at, 9, "other_");
+  if (edit == 8 || edit == 9) SetAttribute(" Vx=\"", "0.5", ioText);
+  return ioText;
+}
 }  // namespace
 
 void WriteClashDocument(std::size_t inCount, std::uint64_t inSeed, std::ostream& ioOut) {
   Random random(inSeed);
   Pieces text(ioOut);
-  text << "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n"
-          "<ClashElement Version=\"1.2\" ZORDocument=\"large\" Responsible=\"design review\">\n"
-          "  <Date Day=\"20\" Month=\"11\" Year=\"2026\"/>\n"
-          "  <ClashSpec Name=\"large\" Type=\"Clearance + Contact + Clash\" Clearance=\"2\"/>\n"
-          "  <ClashResult Name=\"large.Result.1\" ComputationCase=\"Between all components\" "
-          "NbInterf=\""
-       << inCount << "\">\n";
+  AddHead(inCount, text);
   for (std::size_t number = 1; number <= inCount; ++number) AddInterference(number, random, text);
   text << "  </ClashResult>\n";
   AddSpecifications(inCount / 10, random, text);
   text << "</ClashElement>\n";
+}
+
+void WriteRecomputedDocument(std::size_t inCount, std::uint64_t inSeed, std::ostream& ioOut) {
+  Random random(inSeed), edits(inSeed + 1);
+  Pieces text(ioOut);
+  AddHead(inCount, text);
+  for (std::size_t number = 1; number <= inCount; ++number) {
+    std::ostringstream interference;
+    {
+      Pieces pieces(interference);
+      AddInterference(number, random, pieces);
+    }
+    text << Recomputed(std::move(interference).str(), edits);
+  }
+  text << "  </ClashResult>\n";
+  AddSpecifications(inCount / 10, random, text);
+  text << "</ClashElement>\n";
+}
+
+void WritePairDocument(std::size_t inCount, std::uint64_t inSeed, std::ostream& ioOut) {
+  Random random(1);
+  Pieces text(ioOut);
+  AddHead(inCount, text);
+  for (std::size_t number = 1; number <= inCount; ++number) {
+    text << "    <Interference Value=\"-" << random.Below(50)
+         << "\" ResultTypeNoNLS=\"Clash\" Status=\"Not inspected\" RetrieveInf=\"New\">\n"
+            "      <Product DescriptionID=\"a\" Alias=\"a\" ShapeName=\"plate\"/>\n"
+            "      <Product DescriptionID=\"b\" Alias=\"b\" ShapeName=\"plate\"/>\n"
+            "      <GeometricAspect><Point Ux=\""
+         << random.Below(2000) << "." << inSeed % 10 << "\" Uy=\"" << random.Below(2000)
+         << "\" Uz=\"" << random.Below(200) << "\"/></GeometricAspect>\n    </Interference>\n";
+  }
+  text << "  </ClashResult>\n</ClashElement>\n";
 }
 
 void WriteComponentsDocument(std::size_t inCount, std::uint64_t inSeed, std::ostream& ioOut) {

@@ -24,7 +24,9 @@ Measurement FindMeasurement(const std::string& inName) {
       {"merge-xerces", MergeWithXerces},      {"report-zorlyra", ReportWithZORLyra},
       {"report-plain", ReportWithPlainText},  {"dump-zorlyra", DumpWithZORLyra},
       {"dump-xerces", DumpWithXerces},        {"escape-zorlyra", EscapeWithZORLyra},
-      {"escape-append", EscapeByCharacter},   {"escape-push-back", EscapeByPushBack}};
+      {"escape-append", EscapeByCharacter},   {"escape-push-back", EscapeByPushBack},
+      {"diff-zorlyra", DiffWithZORLyra},      {"carry-zorlyra", CarryWithZORLyra},
+      {"group-zorlyra", GroupWithZORLyra},    {"gate-zorlyra", GateWithZORLyra}};
   const auto found = kMeasurements.find(inName);
   return found == kMeasurements.end() ? nullptr : found->second;
 }

@@ -75,6 +75,14 @@ Steps DumpWithXerces(const Arguments& inArguments);
 Steps EscapeWithZORLyra(const Arguments& inArguments);
 Steps EscapeByCharacter(const Arguments& inArguments);
 Steps EscapeByPushBack(const Arguments& inArguments);
+/// Steps "load" of two documents, "read" for review, "diff" and "identifiers".
+Steps DiffWithZORLyra(const Arguments& inArguments);
+/// Steps "load" of two documents and "carry": read both, match, and set the decisions of the first
+/// in the second.
+Steps CarryWithZORLyra(const Arguments& inArguments);
+/// Steps "load" and "group", or "gate": read, and group or judge.
+Steps GroupWithZORLyra(const Arguments& inArguments);
+Steps GateWithZORLyra(const Arguments& inArguments);
 
 using Measurement = Steps (*)(const Arguments&);
 /// @return null for an unknown name.

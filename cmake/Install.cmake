@@ -33,7 +33,7 @@ install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit FILES_MATCHING P
   PATTERN "detection" EXCLUDE
   REGEX "/(DrawingWorkers|ElementWalk|PageMaker|PictureStore|PublishedFiles|ShippedTexts)[.]h$" EXCLUDE
   REGEX "/exchange/(BcfNames|ExchangeLibrary)[.]h$" EXCLUDE
-  REGEX "/review/(Assignment|Frames|LanguageWords|TomlFile)[.]h$" EXCLUDE)
+  REGEX "/review/(Assignment|Frames|HashInput|LanguageWords|PlaceClusters|ProductMatch|ReviewSource|TomlFile)[.]h$" EXCLUDE)
 install(FILES src/toolkit/detection/Detect.h DESTINATION ${headerDir}/toolkit/detection)
 install(FILES ${PROJECT_BINARY_DIR}/generated/ZORLyraExport.h ${PROJECT_BINARY_DIR}/generated/ZORPlatformExport.h
   ${PROJECT_BINARY_DIR}/generated/ZORToolkitExport.h

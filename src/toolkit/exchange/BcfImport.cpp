@@ -130,7 +130,7 @@ class BcfImporter {
     const auto found = positions_.find(inId);
     const ReviewRecord* const record =
         found == positions_.end() ? nullptr : &result_.interferences[found->second];
-    std::string comment = record == nullptr ? inBase.comment : record->comment;
+    std::string comment(record == nullptr ? inBase.comment : record->comment);
     const std::string before = comment;
     if (inChange.editedComment && comment == inBase.comment)
       comment = *inChange.editedComment;
@@ -143,7 +143,7 @@ class BcfImporter {
     entry.id = inId;
     entry.index = record == nullptr ? 0 : record->index;
     if (inChange.status) {
-      entry.baseStatus = StatusCalled(inBase.status);
+      entry.baseStatus = StatusCalled(std::string(inBase.status));
       entry.status = inChange.status;
     }
     if (comment != before) entry.comment = comment;

@@ -29,8 +29,8 @@ bool IsIfcGuid(const std::string& inText) {
 }
 
 std::string StatusOf(const ReviewRecord& inRecord) {
-  return inRecord.status == "Relevant" || inRecord.status == "Irrelevant" ? inRecord.status
-                                                                          : "Not inspected";
+  const bool isDecided = inRecord.status == "Relevant" || inRecord.status == "Irrelevant";
+  return std::string(isDecided ? inRecord.status : "Not inspected");
 }
 
 class TopicPlanner {
@@ -69,13 +69,13 @@ class TopicPlanner {
     for (const int member : ioTopic.members) {
       const ReviewRecord& record = Record(member);
       statuses.insert(StatusOf(record));
-      if (!record.rule.empty()) labels.insert(record.rule);
-      if (record.comment.empty() || !texts.insert(record.comment).second) continue;
+      if (!record.rule.empty()) labels.emplace(record.rule);
+      if (record.comment.empty() || !texts.emplace(record.comment).second) continue;
       const bool isFirst = ioTopic.comments.empty();
       ioTopic.comments.push_back(
           {GuidNamed("comment " + ioTopic.id +
                      (isFirst ? "" : " " + ids_[static_cast<std::size_t>(member)])),
-           record.comment});
+           std::string(record.comment)});
     }
     ioTopic.hasOneStatus = statuses.size() == 1;
     ioTopic.status = ioTopic.hasOneStatus ? *statuses.begin() : "Not inspected";

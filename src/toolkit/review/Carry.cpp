@@ -19,17 +19,18 @@ const ReviewRecord& RecordAt(const ReviewedResult& inResult, int inPosition) {
   return inResult.interferences[static_cast<std::size_t>(inPosition)];
 }
 
-std::string WithLine(const std::string& inText, const std::string& inLine) {
-  return inText.empty() ? inLine : inText + "\n" + inLine;
+std::string WithLine(std::string_view inText, const std::string& inLine) {
+  return inText.empty() ? inLine : std::string(inText) + "\n" + inLine;
 }
 
 /// "Reopened, was Relevant: value -2 -> -3.5".
-std::string ReopenedLine(const std::string& inStatus, const std::vector<Change>& inChanges) {
-  std::string line = "Reopened, was " + inStatus;
+std::string ReopenedLine(std::string_view inStatus, const std::vector<Change>& inChanges) {
+  std::string line = std::string("Reopened, was ").append(inStatus);
   const char* separator = ": ";
   for (const Change& change : inChanges) {
     if (!change.isSubstantial) continue;
-    line += separator + change.what + " " + change.from + " -> " + change.to;
+    line.append(separator).append(change.what).append(1, ' ').append(change.from);
+    line.append(" -> ").append(change.to);
     separator = "; ";
   }
   return line;
@@ -60,7 +61,7 @@ class CarryPlanner {
     const ReviewRecord& was = RecordAt(old_, inEntry.oldPosition);
     const ReviewRecord& is = RecordAt(new_, inEntry.newPosition);
     if (!IsDecided(was)) return;
-    if (!was.comment.empty()) ioEdit.comment = was.comment;
+    if (!was.comment.empty()) ioEdit.comment = std::string(was.comment);
     if (!IsSettled(was)) {
       ++plan_.carried;
     } else if (inEntry.IsReopened() && !keepChanged_) {
@@ -69,7 +70,7 @@ class CarryPlanner {
       ioEdit.comment = WithLine(was.comment, ReopenedLine(was.status, inEntry.changes));
     } else {
       ++plan_.carried;
-      ioEdit.status = was.status;
+      ioEdit.status = std::string(was.status);
     }
     const bool isOtherStatus = ioEdit.status && IsSettled(is) && is.status != *ioEdit.status;
     const bool isOtherComment =
@@ -92,7 +93,6 @@ class MergePlanner {
   MergePlan Plan() {
     const ResultMatch toBase = MatchResults(base_, mine_);
     const ResultMatch toTheirs = MatchResults(theirs_, mine_);
-    ids_ = StableIds(mine_);
     for (std::size_t i = 0; i < mine_.interferences.size(); ++i) {
       const int theirs = toTheirs.interferencesOfNew[i].position;
       if (theirs < 0) continue;
@@ -111,21 +111,23 @@ class MergePlanner {
     const ReviewRecord& mine = RecordAt(mine_, inPosition);
     ReviewEdit edit;
     edit.position = inPosition;
-    edit.status = Merged(inPosition, "status", inBase ? inBase->status : kNotInspected, mine.status,
-                         inTheirs.status);
-    edit.comment = Merged(inPosition, "comment", inBase ? inBase->comment : "", mine.comment,
-                          inTheirs.comment);
+    edit.status =
+        Merged(inPosition, "status", inBase ? inBase->status : std::string_view(kNotInspected),
+               mine.status, inTheirs.status);
+    edit.comment = Merged(inPosition, "comment", inBase ? inBase->comment : std::string_view(),
+                          mine.comment, inTheirs.comment);
     if (edit.status || edit.comment) plan_.edits.push_back(std::move(edit));
   }
 
   /// @return theirs where it is to be taken.
-  std::optional<std::string> Merged(int inPosition, const char* inWhat, const std::string& inBase,
-                                    const std::string& inMine, const std::string& inTheirs) {
+  std::optional<std::string> Merged(int inPosition, const char* inWhat, std::string_view inBase,
+                                    std::string_view inMine, std::string_view inTheirs) {
     if (inMine == inTheirs || inTheirs == inBase) return std::nullopt;
-    if (inMine == inBase) return inTheirs;
-    plan_.conflicts.push_back(
-        {inPosition, ids_[static_cast<std::size_t>(inPosition)], inWhat, inBase, inMine, inTheirs});
-    if (preference_ == Preference::kTheirs) return inTheirs;
+    if (inMine == inBase) return std::string(inTheirs);
+    if (ids_.empty()) ids_ = StableIds(mine_);
+    plan_.conflicts.push_back({inPosition, ids_[static_cast<std::size_t>(inPosition)], inWhat,
+                               std::string(inBase), std::string(inMine), std::string(inTheirs)});
+    if (preference_ == Preference::kTheirs) return std::string(inTheirs);
     return std::nullopt;
   }
 
@@ -149,10 +151,11 @@ int ApplyReviewEdits(ClashDocument& ioDocument, const ReviewedResult& inResult,
     const bool hasStatus = wanted.status && *wanted.status != record.status;
     const bool hasComment = wanted.comment && *wanted.comment != record.comment;
     const bool hasRetrieve = wanted.retrieve && *wanted.retrieve != record.retrieve;
-    if (hasStatus) edit.SetStatusAsWritten(record.element, language.Translate(*wanted.status));
+    if (hasStatus)
+      edit.SetStatusAsWritten(inResult.ElementOf(record), language.Translate(*wanted.status));
     if (hasRetrieve)
-      edit.SetRetrieveAsWritten(record.element, language.Translate(*wanted.retrieve));
-    if (hasComment) edit.SetComment(record.element, *wanted.comment);
+      edit.SetRetrieveAsWritten(inResult.ElementOf(record), language.Translate(*wanted.retrieve));
+    if (hasComment) edit.SetComment(inResult.ElementOf(record), *wanted.comment);
     count += hasStatus || hasComment || hasRetrieve;
   }
   return count;
@@ -188,8 +191,8 @@ ApplyPlan PlanApply(const ReviewedResult& inResult, const ReviewFile& inReview,
     const bool isStale = entry.status && entry.baseStatus && *entry.baseStatus != record.status &&
                          *entry.status != record.status;
     if (isStale)
-      plan.conflicts.push_back(
-          {found->second, entry.id, "status", *entry.baseStatus, record.status, *entry.status});
+      plan.conflicts.push_back({found->second, entry.id, "status", *entry.baseStatus,
+                                std::string(record.status), *entry.status});
     if (!isStale || inPreference == Preference::kTheirs) plan.edits.push_back(std::move(edit));
   }
   return plan;

@@ -4,20 +4,22 @@
 #include <cmath>
 #include <unordered_map>
 
+#include "foundation/Hash.h"
+#include "toolkit/review/ProductMatch.h"
+
 namespace ZORToolkit {
 namespace {
 
 constexpr char kBetweenAll[] = "Between all components";
 
 /// A product's own names and those of the assemblies above it.
-std::vector<std::string> NamesAndParents(const std::string& inId, const std::string& inAlias) {
-  constexpr std::string_view kSeparator = " --++-- ";
-  std::vector<std::string> names;
-  for (const std::string& name : {inId, inAlias}) {
+std::vector<std::string_view> NamesAndParents(std::string_view inId, std::string_view inAlias) {
+  std::vector<std::string_view> names;
+  for (const std::string_view name : {inId, inAlias}) {
     if (name.empty() || (!names.empty() && name == inId)) continue;
     names.push_back(name);
-    for (std::size_t at = name.rfind(kSeparator); at != std::string::npos && at > 0;
-         at = name.rfind(kSeparator, at - 1))
+    for (std::size_t at = name.rfind(kPathSeparator); at != std::string_view::npos && at > 0;
+         at = name.rfind(kPathSeparator, at - 1))
       names.push_back(name.substr(0, at));
   }
   return names;
@@ -26,36 +28,42 @@ std::vector<std::string> NamesAndParents(const std::string& inId, const std::str
 /// What a specification asked to check.
 class Coverage {
  public:
-  explicit Coverage(const std::vector<SpecificationRecord>& inSpecifications) {
-    for (const SpecificationRecord& specification : inSpecifications) {
+  explicit Coverage(const std::vector<SpecifiedPair>& inSpecifications) {
+    for (const SpecifiedPair& specification : inSpecifications) {
       const auto& [first, second] = specification.products;
-      for (const std::string& a : {first.alias, first.id}) {
+      for (const std::string_view a : {first.alias, first.id}) {
         products_.insert(a);
-        for (const std::string& b : {second.alias, second.id}) {
+        for (const std::string_view b : {second.alias, second.id}) {
           products_.insert(b);
-          pairs_.insert(a + '\0' + b);
-          pairs_.insert(b + '\0' + a);
+          pairs_.insert({a, b});
+          pairs_.insert({b, a});
         }
       }
     }
   }
 
   bool HasProduct(const ReviewProduct& inProduct) const {
-    return std::ranges::any_of(
-        NamesAndParents(inProduct.id, inProduct.alias),
-        [&](const std::string& inName) { return products_.contains(inName); });
+    return std::ranges::any_of(NamesAndParents(inProduct.id, inProduct.alias),
+                               [&](std::string_view inName) { return products_.contains(inName); });
   }
 
   bool HasPair(const ReviewProduct& inFirst, const ReviewProduct& inSecond) const {
-    const std::vector<std::string> seconds = NamesAndParents(inSecond.id, inSecond.alias);
-    for (const std::string& a : NamesAndParents(inFirst.id, inFirst.alias))
-      for (const std::string& b : seconds)
-        if (pairs_.contains(a + '\0' + b)) return true;
+    const std::vector<std::string_view> seconds = NamesAndParents(inSecond.id, inSecond.alias);
+    for (const std::string_view a : NamesAndParents(inFirst.id, inFirst.alias))
+      for (const std::string_view b : seconds)
+        if (pairs_.contains({a, b})) return true;
     return false;
   }
 
  private:
-  std::unordered_set<std::string> products_, pairs_;
+  typedef std::pair<std::string_view, std::string_view> Pair;
+  struct PairHash {
+    std::size_t operator()(const Pair& inPair) const {
+      return ZORFoundation::Hash64Of(inPair.first, ZORFoundation::Hash64Of(inPair.second));
+    }
+  };
+  std::unordered_set<std::string_view> products_;
+  std::unordered_set<Pair, PairHash> pairs_;
 };
 
 /// Says why the new computation did not look for an interference of the old result.
@@ -71,10 +79,12 @@ class Comparability {
         newCoverage_(inNew.specifications),
         newClearance_(inNew.clearance.value) {
     for (const ReviewRecord& record : new_.interferences) {
-      const std::optional<double>& clearance = record.clearance.value;
+      const bool isWanted =
+          record.rule.empty() ? !inNew.clearance.value : !clearanceOfRule_.contains(record.rule);
+      const std::optional<double> clearance = isWanted ? record.clearance.Value() : std::nullopt;
       if (!clearance) continue;
-      if (!record.rule.empty()) clearanceOfRule_.try_emplace(record.rule, *clearance);
-      if (!inNew.clearance.value && record.rule.empty())
+      if (!record.rule.empty()) clearanceOfRule_.emplace(record.rule, *clearance);
+      if (record.rule.empty())
         newClearance_ = std::max(*clearance, newClearance_.value_or(*clearance));
     }
   }
@@ -113,11 +123,11 @@ class Comparability {
     for (std::size_t i = 0; i < 2; ++i) {
       const ReviewProduct* const product = ProductOf(inOld, i);
       if (product == nullptr) continue;
-      const std::string name = "\"" + product->Name() + "\"";
+      const std::string name = std::string(1, '"').append(product->Name()).append(1, '"');
       if (options_.productsOfNewModel) {
         const ReviewProduct& now = InNew(inOld, i);
         const auto& model = *options_.productsOfNewModel;
-        if (!model.contains(now.id) && !model.contains(now.alias))
+        if (!model.contains(std::string(now.id)) && !model.contains(std::string(now.alias)))
           return name + " is not in the new model";
       }
       const bool wasSpecified = old_.specifications.empty() || oldCoverage_.HasProduct(*product);
@@ -142,7 +152,7 @@ class Comparability {
   std::string Types(const ReviewRecord& inOld) const {
     if (new_.computedTypes.empty() || new_.computedTypes == old_.computedTypes) return {};
     if (!newTypes_) newTypes_ = TypesIn(new_.computedTypes);
-    if (newTypes_->contains(inOld.type) || newTypes_->contains("error")) return {};
+    if (newTypes_->contains(std::string(inOld.type)) || newTypes_->contains("error")) return {};
     return "the new computation looked for \"" + new_.computedTypes + "\" only";
   }
 
@@ -173,7 +183,7 @@ class Comparability {
                            "<?xml version=\"1.0\" encoding=\"UTF-8\"?><InterferenceElement>"
                            "<Interference ResultType=\"" +
                                escaped + "\"/></InterferenceElement>");
-    return ReadForReview(document).interferences.at(0).type;
+    return std::string(ReadForReview(document).interferences.at(0).type);
   }
 
   std::string Case(const ReviewRecord& inOld) const {
@@ -193,14 +203,17 @@ class Comparability {
   }
 
   std::string Clearance(const ReviewRecord& inOld) const {
-    if (inOld.type != "Clearance" || !inOld.clearance.value) return {};
+    if (inOld.type != "Clearance") return {};
+    const std::optional<double> was = inOld.clearance.Value();
+    if (!was) return {};
     std::optional<double> now = newClearance_;
     if (!inOld.rule.empty()) {
       const auto rule = clearanceOfRule_.find(inOld.rule);
       now = rule == clearanceOfRule_.end() ? std::nullopt : std::optional(rule->second);
     }
-    if (!now || *now >= *inOld.clearance.value - 1e-9) return {};
-    return "the clearance was " + inOld.clearance.text + " and is " + Number(*now).text + " now";
+    if (!now || *now >= *was - 1e-9) return {};
+    return std::string("the clearance was ").append(inOld.clearance.text) + " and is " +
+           Number(*now).text + " now";
   }
 
   const ReviewedResult& old_;
@@ -209,40 +222,40 @@ class Comparability {
   const ResultMatch& match_;
   Coverage oldCoverage_, newCoverage_;
   std::optional<double> newClearance_;
-  std::unordered_map<std::string, double> clearanceOfRule_;
+  std::unordered_map<std::string_view, double> clearanceOfRule_;
   mutable std::optional<std::unordered_set<std::string>> newTypes_;
 };
 
-std::string PlacementText(const ReviewProduct& inProduct,
-                          const std::optional<Placement>& inPlacement) {
-  std::string text = inProduct.Name() + " at";
-  for (std::size_t i = 9; i < 12; ++i) text.append(1, ' ').append(Number((*inPlacement)[i]).text);
+std::string PlacementText(const ReviewProduct& inProduct, const Placement& inPlacement) {
+  std::string text = std::string(inProduct.Name()) + " at";
+  for (std::size_t i = 9; i < 12; ++i) text.append(1, ' ').append(Number(inPlacement[i]).text);
   constexpr Placement kUnturned{1, 0, 0, 0, 1, 0, 0, 0, 1};
-  if (std::equal(inPlacement->begin(), inPlacement->begin() + 9, kUnturned.begin())) return text;
+  if (std::equal(inPlacement.begin(), inPlacement.begin() + 9, kUnturned.begin())) return text;
   text += ", turned";
-  for (std::size_t i = 0; i < 9; ++i) text.append(1, ' ').append(Number((*inPlacement)[i]).text);
+  for (std::size_t i = 0; i < 9; ++i) text.append(1, ' ').append(Number(inPlacement[i]).text);
   return text;
 }
 
 class Differ {
  public:
   Differ(const ReviewedResult& inOld, const ReviewedResult& inNew, const DiffOptions& inOptions)
-      : old_(inOld), new_(inNew), options_(inOptions) {}
+      : old_(inOld), new_(inNew), motions_(inOld, inNew), options_(inOptions) {}
 
   ResultDiff Run() {
     diff_.match = MatchResults(old_, new_, options_);
-    const std::vector<std::string> newIds = StableIds(new_), oldIds = StableIds(old_);
-    for (std::size_t i = 0; i < new_.interferences.size(); ++i) AddNew(i, newIds[i]);
-    const Comparability comparability(old_, new_, options_, diff_.match);
+    diff_.entries.reserve(new_.interferences.size());
+    for (std::size_t i = 0; i < new_.interferences.size(); ++i) AddNew(i);
+    std::optional<Comparability> comparability;
     for (std::size_t i = 0; i < old_.interferences.size(); ++i) {
       const ResultMatch::Partner& partner = diff_.match.interferencesOfOld[i];
       if (partner.position >= 0) continue;
-      const std::string whyNot = comparability.WhyNot(old_.interferences[i]);
-      Add({whyNot.empty() ? DiffClass::kResolved : DiffClass::kNotComparable,
-           oldIds[i],
+      if (!comparability) comparability.emplace(old_, new_, options_, diff_.match);
+      std::string whyNot = comparability->WhyNot(old_.interferences[i]);
+      const bool isResolved = whyNot.empty();
+      Add({isResolved ? DiffClass::kResolved : DiffClass::kNotComparable,
            static_cast<int>(i),
            -1,
-           whyNot.empty() ? partner.reason : whyNot,
+           isResolved ? partner.reason : diff_.match.Keep(std::move(whyNot)),
            {}});
     }
     return std::move(diff_);
@@ -254,39 +267,42 @@ class Differ {
     diff_.entries.push_back(std::move(inEntry));
   }
 
-  void AddNew(std::size_t inPosition, const std::string& inId) {
+  void AddNew(std::size_t inPosition) {
     const ResultMatch::Partner& partner = diff_.match.interferencesOfNew[inPosition];
-    DiffEntry entry{DiffClass::kNew, inId, partner.position, static_cast<int>(inPosition),
-                    partner.reason,  {}};
+    DiffEntry entry{
+        DiffClass::kNew, partner.position, static_cast<int>(inPosition), partner.reason, {}};
     if (partner.position >= 0) {
       entry.changes = ChangesOf(old_.interferences[static_cast<std::size_t>(partner.position)],
-                                new_.interferences[inPosition]);
+                                new_.interferences[inPosition], partner.isUnmoved);
       entry.itsClass = entry.changes.empty() ? DiffClass::kPersisting : DiffClass::kChanged;
     }
     Add(std::move(entry));
   }
 
-  std::vector<Change> ChangesOf(const ReviewRecord& inOld, const ReviewRecord& inNew) const {
+  std::vector<Change> ChangesOf(const ReviewRecord& inOld, const ReviewRecord& inNew,
+                                bool inIsUnmoved) const {
     std::vector<Change> changes;
-    const auto compare = [&](const char* inWhat, const std::string& inFrom, const std::string& inTo,
+    const auto compare = [&](const char* inWhat, std::string_view inFrom, std::string_view inTo,
                              bool inIsSubstantial) {
-      if (inFrom != inTo) changes.push_back({inWhat, inFrom, inTo, inIsSubstantial});
+      if (inFrom != inTo)
+        changes.push_back({inWhat, std::string(inFrom), std::string(inTo), inIsSubstantial});
     };
     compare("type", inOld.type, inNew.type, true);
     if (!IsSameValue(inOld.value, inNew.value))
-      changes.push_back({"value", inOld.value.text, inNew.value.text, true});
-    ComparePlacements(inOld, inNew, changes);
+      compare("value", inOld.value.text, inNew.value.text, true);
+    if (!inIsUnmoved) ComparePlacements(inOld, inNew, changes);
     compare("rule", inOld.rule, inNew.rule, true);
     compare("status", inOld.status, inNew.status, false);
     compare("comment", inOld.comment, inNew.comment, false);
     return changes;
   }
 
-  bool IsSameValue(const Number& inOld, const Number& inNew) const {
+  bool IsSameValue(const WrittenNumber& inOld, const WrittenNumber& inNew) const {
     if (inOld.text == inNew.text) return true;
-    if (!inOld.value || !inNew.value) return false;
+    const std::optional<double> was = inOld.Value(), is = inNew.Value();
+    if (!was || !is) return false;
     constexpr double kRounding = 1e-9;
-    return std::abs(*inOld.value - *inNew.value) <= options_.tolerance + kRounding;
+    return std::abs(*was - *is) <= options_.tolerance + kRounding;
   }
 
   void ComparePlacements(const ReviewRecord& inOld, const ReviewRecord& inNew,
@@ -295,12 +311,15 @@ class Differ {
     bool isSubstantial = false, isKnown = false;
     for (std::size_t i = 0; i < 2; ++i) {
       const std::size_t j = isSwapped ? 1 - i : i;
-      const auto &from = inOld.placements[i], &to = inNew.placements[j];
-      if (Motion(from, to) <= options_.tolerance) continue;
-      if (!isKnown) isSubstantial = RelativeMotion(inOld, inNew, isSwapped) > options_.tolerance;
+      if (motions_.Of(inOld, i, inNew, j) <= options_.tolerance) continue;
+      if (!isKnown) isSubstantial = motions_.Relative(inOld, inNew, isSwapped) > options_.tolerance;
       isKnown = true;
-      ioChanges.push_back({"placement", PlacementText(ProductOf(old_, inOld.products[i]), from),
-                           PlacementText(ProductOf(new_, inNew.products[j]), to), isSubstantial});
+      ioChanges.push_back({"placement",
+                           PlacementText(ProductOf(old_, inOld.products[i]),
+                                         *old_.PlacementOf(inOld.productElements[i])),
+                           PlacementText(ProductOf(new_, inNew.products[j]),
+                                         *new_.PlacementOf(inNew.productElements[j])),
+                           isSubstantial});
     }
   }
 
@@ -318,6 +337,7 @@ class Differ {
 
   const ReviewedResult& old_;
   const ReviewedResult& new_;
+  Motions motions_;
   const DiffOptions& options_;
   ResultDiff diff_;
 };
@@ -338,6 +358,19 @@ bool ResultDiff::HasDifferences() const {
 ResultDiff Diff(const ReviewedResult& inOld, const ReviewedResult& inNew,
                 const DiffOptions& inOptions) {
   return Differ(inOld, inNew, inOptions).Run();
+}
+
+std::vector<std::string> EntryIds(const ResultDiff& inDiff, const ReviewedResult& inOld,
+                                  const ReviewedResult& inNew) {
+  std::vector<std::string> oldIds, newIds = StableIds(inNew), ids;
+  ids.reserve(inDiff.entries.size());
+  for (const DiffEntry& entry : inDiff.entries) {
+    const bool isOld = entry.newPosition < 0;
+    if (isOld && oldIds.empty()) oldIds = StableIds(inOld);
+    ids.push_back(isOld ? oldIds[static_cast<std::size_t>(entry.oldPosition)]
+                        : newIds[static_cast<std::size_t>(entry.newPosition)]);
+  }
+  return ids;
 }
 
 }  // namespace ZORToolkit

@@ -18,8 +18,8 @@ inline constexpr std::size_t kDiffClassCount = 5;
 ZOR_TOOLKIT_EXPORT const char* Name(DiffClass inClass);
 
 struct Change {
-  std::string what;      ///< "type", "value", "placement", "rule", "status" or "comment"
-  std::string from, to;  ///< for a person; a value and a word as the documents have them
+  std::string_view what;  ///< "type", "value", "placement", "rule", "status" or "comment"
+  std::string from, to;   ///< for a person; a value and a word as the documents have them
   /// Whether it is another interference to decide on: a type, a value, a rule, or a placement of one
   /// product against the other. Products that moved together do not make it one.
   bool isSubstantial = false;
@@ -27,9 +27,8 @@ struct Change {
 
 struct ZOR_TOOLKIT_EXPORT DiffEntry {
   DiffClass itsClass = DiffClass::kNew;
-  std::string id;  ///< the stable one in the new result; in the old one where there is no new
   int oldPosition = -1, newPosition = -1;  ///< in ReviewedResult::interferences, -1 for none
-  std::string reason;
+  std::string_view reason;                 ///< lives as long as the difference
   std::vector<Change> changes;
 
   /// Whether an old decision does not hold any more.
@@ -57,6 +56,11 @@ struct ZOR_TOOLKIT_EXPORT ResultDiff {
 /// pair in the old result too says nothing.
 ZOR_TOOLKIT_EXPORT ResultDiff Diff(const ReviewedResult& inOld, const ReviewedResult& inNew,
                                    const DiffOptions& inOptions = {});
+
+/// The stable identifier of each entry: in the new result, or in the old one where there is no new.
+ZOR_TOOLKIT_EXPORT std::vector<std::string> EntryIds(const ResultDiff& inDiff,
+                                                     const ReviewedResult& inOld,
+                                                     const ReviewedResult& inNew);
 
 }  // namespace ZORToolkit
 

@@ -50,6 +50,23 @@ inline double FrameDistance(const Frame& inA, const Frame& inB) {
   return Length(inA.translation - inB.translation) + (turn > kRounding ? kMetre * turn : 0);
 }
 
+/// Which cubic millimetre a coordinate is in. Designed coordinates are round, so cells do not begin
+/// at round ones.
+inline std::int64_t Cell(double inCoordinate) {
+  constexpr double kOffset = 0.2928932188;
+  return static_cast<std::int64_t>(std::floor(std::clamp(inCoordinate, -1e15, 1e15) + kOffset));
+}
+
+/// A place in the frame of a product; nothing when the product's placement is unknown or flat.
+inline std::optional<Point3> PlaceInFrame(const ReviewedResult& inResult, ElementNumber inProduct,
+                                          const Position& inPlace) {
+  const std::optional<Placement> placement = inResult.PlacementOf(inProduct);
+  if (!placement) return std::nullopt;
+  const std::optional<Frame> productFromWorld = Inverse(FrameOf(*placement));
+  if (!productFromWorld) return std::nullopt;
+  return *productFromWorld * ToPoint(inPlace);
+}
+
 }  // namespace ZORToolkit
 
 #endif

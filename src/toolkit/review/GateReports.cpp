@@ -13,15 +13,15 @@ const ReviewRecord& RecordAt(const GateReport& inReport, int inPosition) {
 }
 
 std::string ProductName(const GateReport& inReport, int inProduct) {
-  return inProduct < 0 ? std::string("(none)")
-                       : inReport.result.products[static_cast<std::size_t>(inProduct)].Name();
+  if (inProduct < 0) return "(none)";
+  return std::string(inReport.result.products[static_cast<std::size_t>(inProduct)].Name());
 }
 
 /// "3 Clash -1.5: bolt / plate".
 std::string LineOf(const GateReport& inReport, int inPosition) {
   const ReviewRecord& record = RecordAt(inReport, inPosition);
-  std::string line = std::to_string(record.index) + " " + record.type;
-  if (!record.value.text.empty()) line += " " + record.value.text;
+  std::string line = std::to_string(record.index).append(1, ' ').append(record.type);
+  if (!record.value.text.empty()) line.append(1, ' ').append(record.value.text);
   return line + ": " + ProductName(inReport, record.products[0]) + " / " +
          ProductName(inReport, record.products[1]);
 }
@@ -181,11 +181,12 @@ class SarifWriter {
         for (const int position : outcome.counted) results.push_back(Result(i, position));
       for (const int position : outcome.suppressed) {
         Json result = Result(i, position);
-        const std::string& comment = RecordAt(report_, position).comment;
+        const std::string_view comment = RecordAt(report_, position).comment;
         result["suppressions"] = Json::array(
             {{{"kind", "external"},
               {"status", "accepted"},
-              {"justification", comment.empty() ? "reviewed as irrelevant" : comment}}});
+              {"justification",
+               comment.empty() ? std::string_view("reviewed as irrelevant") : comment}}});
         results.push_back(std::move(result));
       }
     }

@@ -2,124 +2,88 @@
 
 #include <algorithm>
 #include <cmath>
-#include <map>
 #include <numeric>
 #include <tuple>
 #include <unordered_map>
 
-#include "foundation/Hash.h"
-#include "toolkit/review/Frames.h"
+#include "toolkit/review/HashInput.h"
+#include "toolkit/review/PlaceClusters.h"
 
 namespace ZORToolkit {
 namespace {
 
-constexpr std::string_view kSeparator = " --++-- ";
-
-std::string LastName(const std::string& inPath) {
-  const std::size_t at = inPath.rfind(kSeparator);
-  return at == std::string::npos ? inPath : inPath.substr(at + kSeparator.size());
-}
-
-std::string PartOf(const ReviewProduct& inProduct) {
+std::string_view PartOf(const ReviewProduct& inProduct) {
   return inProduct.part.empty() ? LastName(inProduct.Name()) : inProduct.part;
 }
 
-std::string AssemblyOf(const ReviewProduct& inProduct) {
-  const std::string& path =
-      inProduct.id.find(kSeparator) == std::string::npos ? inProduct.Name() : inProduct.id;
-  const std::size_t at = path.rfind(kSeparator);
-  return at == std::string::npos ? "(top)" : path.substr(0, at);
+std::string_view AssemblyOf(const ReviewProduct& inProduct) {
+  const bool hasPath = inProduct.id.find(kPathSeparator) != std::string_view::npos;
+  const std::string_view path = hasPath ? inProduct.id : inProduct.Name();
+  const std::size_t at = path.rfind(kPathSeparator);
+  return at == std::string_view::npos ? "(top)" : path.substr(0, at);
 }
 
-/// Joins what belongs together (B. A. Galler, M. J. Fischer, "An improved equivalence algorithm",
-/// 1964), with path halving.
-class DisjointSets {
+/// What products are grouped by, numbered in the order of the texts; 0 is the empty text, which is
+/// also that of a missing product.
+class ProductLabels {
  public:
-  explicit DisjointSets(std::size_t inCount) : parents_(inCount) {
-    std::iota(parents_.begin(), parents_.end(), std::size_t{0});
-  }
-  std::size_t Find(std::size_t inItem) {
-    while (parents_[inItem] != inItem) {
-      parents_[inItem] = parents_[parents_[inItem]];
-      inItem = parents_[inItem];
+  ProductLabels(const std::vector<ReviewProduct>& inProducts, GroupBy inBy) : texts_{""} {
+    if (inBy == GroupBy::kPlace) return;
+    numbers_.resize(inProducts.size());
+    std::unordered_map<std::string_view, int> known{{"", 0}};
+    for (std::size_t i = 0; i < inProducts.size(); ++i) {
+      const std::string_view text = TextOf(inProducts[i], inBy);
+      const auto [found, isNew] = known.try_emplace(text, static_cast<int>(texts_.size()));
+      if (isNew) texts_.push_back(text);
+      numbers_[i] = found->second;
     }
-    return inItem;
+    Sort();
   }
-  void Join(std::size_t inA, std::size_t inB) {
-    inA = Find(inA);
-    inB = Find(inB);
-    parents_[std::max(inA, inB)] = std::min(inA, inB);
+
+  int NumberOf(int inProduct) const {
+    return inProduct < 0 ? 0 : numbers_[static_cast<std::size_t>(inProduct)];
   }
+  std::string_view Text(std::uint32_t inNumber) const { return texts_[inNumber]; }
 
  private:
-  std::vector<std::size_t> parents_;
-};
+  static std::string_view TextOf(const ReviewProduct& inProduct, GroupBy inBy) {
+    if (inBy == GroupBy::kParts) return PartOf(inProduct);
+    return inBy == GroupBy::kAssemblies ? AssemblyOf(inProduct) : inProduct.Name();
+  }
 
-/// Clusters of points by single linkage. Points of one cell are always within the distance; cells
-/// are joined when a point of one is near a point of the other.
-class PlaceClusters {
- public:
-  PlaceClusters(const std::vector<Point3>& inPoints, double inDistance)
-      : points_(inPoints), distance_(inDistance), sets_(inPoints.size()) {
-    const double edge = std::max(inDistance, 1e-6) / std::sqrt(3.0);
-    for (std::size_t i = 0; i < inPoints.size(); ++i) {
-      const auto cell = [&](double inCoordinate) {
-        return static_cast<std::int64_t>(std::floor(std::clamp(inCoordinate / edge, -4e18, 4e18)));
-      };
-      const Cell at{cell(inPoints[i].x), cell(inPoints[i].y), cell(inPoints[i].z)};
-      std::vector<std::size_t>& inside = cells_[at];
-      if (!inside.empty()) sets_.Join(inside.front(), i);
-      inside.push_back(i);
+  void Sort() {
+    std::vector<int> order(texts_.size()), rank(texts_.size());
+    std::iota(order.begin(), order.end(), 0);
+    const auto text = [&](int inNumber) { return texts_[static_cast<std::size_t>(inNumber)]; };
+    std::ranges::sort(order, {}, text);
+    std::vector<std::string_view> sorted;
+    sorted.reserve(order.size());
+    for (const int number : order) {
+      rank[static_cast<std::size_t>(number)] = static_cast<int>(sorted.size());
+      sorted.push_back(text(number));
     }
-    for (const auto& [cell, inside] : cells_) JoinNeighbours(cell, inside);
-  }
-  std::size_t ClusterOf(std::size_t inPoint) { return sets_.Find(inPoint); }
-
- private:
-  typedef std::array<std::int64_t, 3> Cell;
-  struct CellHash {
-    std::size_t operator()(const Cell& inCell) const {
-      ZORFoundation::Hash64 hash;
-      for (const std::int64_t number : inCell) hash.Add(static_cast<std::uint64_t>(number));
-      return hash.Get();
-    }
-  };
-
-  void JoinNeighbours(const Cell& inCell, const std::vector<std::size_t>& inInside) {
-    for (std::int64_t x = 0; x <= 2; ++x)
-      for (std::int64_t y = -2; y <= 2; ++y)
-        for (std::int64_t z = -2; z <= 2; ++z) {
-          // Half of the neighbours: the others meet this cell from their side.
-          if (std::tuple(x, y, z) <= std::tuple(0, 0, 0)) continue;
-          const auto other = cells_.find({inCell[0] + x, inCell[1] + y, inCell[2] + z});
-          if (other != cells_.end()) JoinIfNear(inInside, other->second);
-        }
+    for (int& number : numbers_) number = rank[static_cast<std::size_t>(number)];
+    texts_.swap(sorted);
   }
 
-  void JoinIfNear(const std::vector<std::size_t>& inA, const std::vector<std::size_t>& inB) {
-    if (sets_.Find(inA.front()) == sets_.Find(inB.front())) return;
-    for (const std::size_t a : inA)
-      for (const std::size_t b : inB) {
-        if (ZORFoundation::Length(points_[a] - points_[b]) > distance_) continue;
-        sets_.Join(a, b);
-        return;
-      }
-  }
-
-  const std::vector<Point3>& points_;
-  double distance_;
-  DisjointSets sets_;
-  std::unordered_map<Cell, std::vector<std::size_t>, CellHash> cells_;
+  std::vector<std::string_view> texts_;
+  std::vector<int> numbers_;  // of each product
 };
 
 class Grouper {
  public:
   Grouper(const ReviewedResult& inResult, const std::vector<std::string>& inIds,
           const GroupOptions& inOptions)
-      : result_(inResult), ids_(inIds), options_(inOptions), counts_(inResult.products.size()) {
+      : result_(inResult), ids_(inIds), options_(inOptions) {
+    values_.reserve(result_.interferences.size());
     for (const ReviewRecord& record : result_.interferences)
-      for (const int product : record.products)
-        if (product >= 0) ++counts_[static_cast<std::size_t>(product)];
+      values_.push_back(record.value.Value());
+    labels_.reserve(options_.by.size());
+    for (const GroupBy by : options_.by) {
+      if (by == GroupBy::kPlace) ReadPlaces();
+      if (by == GroupBy::kProduct) CountProducts();
+      labels_.emplace_back(result_.products, by);
+    }
   }
 
   std::vector<InterferenceGroup> Run() const {
@@ -129,113 +93,172 @@ class Grouper {
   }
 
  private:
-  typedef std::map<std::string, std::vector<int>> Buckets;
+  /// Members with one key, in a list of them that is sorted by keys.
+  struct Bucket {
+    std::size_t begin, end;
+    double worst;
+    int first;
+  };
+  struct Keyed {
+    std::uint64_t key;
+    int member;
+    bool operator<(const Keyed& inOther) const {
+      return std::tie(key, member) < std::tie(inOther.key, inOther.member);
+    }
+  };
+  static constexpr std::uint64_t kNoPlace = ~std::uint64_t{0};
+
+  void ReadPlaces() {
+    if (!places_.empty()) return;
+    places_.reserve(result_.interferences.size());
+    for (const ReviewRecord& record : result_.interferences)
+      places_.push_back(result_.PlaceOf(record));
+  }
+
+  void CountProducts() {
+    counts_.assign(result_.products.size(), 0);
+    for (const ReviewRecord& record : result_.interferences)
+      for (const int product : record.products)
+        if (product >= 0) ++counts_[static_cast<std::size_t>(product)];
+  }
 
   std::vector<InterferenceGroup> Split(const std::vector<int>& inMembers, std::size_t inLevel,
                                        const std::string& inParentId) const {
-    if (inLevel == options_.by.size()) return {};
-    const GroupBy by = options_.by[inLevel];
     std::vector<InterferenceGroup> groups;
-    for (auto& [label, members] :
-         by == GroupBy::kPlace ? ByPlace(inMembers) : ByLabel(by, inMembers)) {
-      InterferenceGroup group;
-      group.by = by;
-      group.label = label;
-      group.members = members;
+    if (inLevel == options_.by.size()) return groups;
+    std::vector<Keyed> keyed = options_.by[inLevel] == GroupBy::kPlace
+                                   ? KeyedByPlace(inMembers)
+                                   : KeyedByLabel(inMembers, inLevel);
+    std::sort(keyed.begin(), keyed.end());
+    const std::vector<Bucket> buckets = BucketsOf(keyed);
+    groups.reserve(buckets.size());
+    for (const Bucket& bucket : buckets) {
+      InterferenceGroup& group = groups.emplace_back();
+      group.by = options_.by[inLevel];
+      group.members.reserve(bucket.end - bucket.begin);
+      for (std::size_t i = bucket.begin; i < bucket.end; ++i)
+        group.members.push_back(keyed[i].member);
+      group.label = LabelOf(keyed[bucket.begin], inLevel);
       Describe(group, inParentId);
       group.groups = Split(group.members, inLevel + 1, group.id);
-      groups.push_back(std::move(group));
     }
-    std::ranges::sort(groups, [](const InterferenceGroup& inA, const InterferenceGroup& inB) {
-      const auto order = [](const InterferenceGroup& inGroup) {
-        return std::tuple(-static_cast<std::ptrdiff_t>(inGroup.members.size()),
-                          inGroup.worst.value_or(HUGE_VAL), inGroup.members.front());
-      };
-      return order(inA) < order(inB);
-    });
     return groups;
+  }
+
+  /// The largest first; of equal size the worst, then that whose first member comes first.
+  std::vector<Bucket> BucketsOf(const std::vector<Keyed>& inKeyed) const {
+    std::vector<Bucket> buckets;
+    for (std::size_t begin = 0, end = 0; begin < inKeyed.size(); begin = end) {
+      double worst = HUGE_VAL;
+      for (; end < inKeyed.size() && inKeyed[end].key == inKeyed[begin].key; ++end)
+        worst = std::min(worst, ValueOf(inKeyed[end].member).value_or(HUGE_VAL));
+      buckets.push_back({begin, end, worst, inKeyed[begin].member});
+    }
+    const auto order = [](const Bucket& inBucket) {
+      const auto size = static_cast<std::ptrdiff_t>(inBucket.end - inBucket.begin);
+      return std::tuple(-size, inBucket.worst, inBucket.first);
+    };
+    std::ranges::sort(
+        buckets, [&](const Bucket& inA, const Bucket& inB) { return order(inA) < order(inB); });
+    return buckets;
   }
 
   const ReviewRecord& Record(int inPosition) const {
     return result_.interferences[static_cast<std::size_t>(inPosition)];
   }
-
-  Buckets ByLabel(GroupBy inBy, const std::vector<int>& inMembers) const {
-    Buckets buckets;
-    for (const int member : inMembers) buckets[LabelOf(inBy, Record(member))].push_back(member);
-    return buckets;
+  const std::optional<double>& ValueOf(int inPosition) const {
+    return values_[static_cast<std::size_t>(inPosition)];
+  }
+  const std::optional<Position>& PlaceOf(int inPosition) const {
+    return places_[static_cast<std::size_t>(inPosition)];
   }
 
-  std::string LabelOf(GroupBy inBy, const ReviewRecord& inRecord) const {
-    std::string texts[2];
-    int counts[2] = {-1, -1};
-    for (std::size_t i = 0; i < 2; ++i) {
-      if (inRecord.products[i] < 0) continue;
-      const auto product = static_cast<std::size_t>(inRecord.products[i]);
-      const ReviewProduct& record = result_.products[product];
-      texts[i] = inBy == GroupBy::kParts        ? PartOf(record)
-                 : inBy == GroupBy::kAssemblies ? AssemblyOf(record)
-                                                : record.Name();
-      counts[i] = counts_[product];
-    }
-    if (inBy == GroupBy::kProduct)
-      return std::pair(-counts[0], texts[0]) < std::pair(-counts[1], texts[1]) ? texts[0]
-                                                                               : texts[1];
-    if (texts[1] < texts[0]) std::swap(texts[0], texts[1]);
-    return texts[0] + " x " + texts[1];
-  }
-
-  Buckets ByPlace(const std::vector<int>& inMembers) const {
-    std::vector<Point3> points;
-    std::vector<int> placed;
-    Buckets buckets;
+  /// By the numbers of both labels, the lesser first; by the product that has more interferences by
+  /// that alone.
+  std::vector<Keyed> KeyedByLabel(const std::vector<int>& inMembers, std::size_t inLevel) const {
+    const ProductLabels& labels = labels_[inLevel];
+    std::vector<Keyed> keyed;
+    keyed.reserve(inMembers.size());
     for (const int member : inMembers) {
-      if (!Record(member).place) {
-        buckets["no place"].push_back(member);
-        continue;
+      const std::array<int, 2>& products = Record(member).products;
+      std::uint64_t numbers[2] = {0, 0};
+      for (std::size_t i = 0; i < 2; ++i)
+        numbers[i] = static_cast<std::uint64_t>(labels.NumberOf(products[i]));
+      if (options_.by[inLevel] == GroupBy::kProduct) {
+        const auto order = [&](std::size_t inProduct) {
+          const int product = products[inProduct];
+          const int count = product < 0 ? -1 : counts_[static_cast<std::size_t>(product)];
+          return std::pair(-count, numbers[inProduct]);
+        };
+        keyed.push_back({order(0) < order(1) ? numbers[0] : numbers[1], member});
+      } else {
+        keyed.push_back(
+            {std::min(numbers[0], numbers[1]) << 32 | std::max(numbers[0], numbers[1]), member});
       }
-      points.push_back(ToPoint(*Record(member).place));
-      placed.push_back(member);
     }
-    PlaceClusters clusters(points, options_.distance);
-    std::map<std::size_t, std::string> labels;
-    for (std::size_t i = 0; i < placed.size(); ++i) {
-      // A cluster is known by its first point.
-      std::string& label = labels[clusters.ClusterOf(i)];
-      if (label.empty()) label = PlaceLabel(points[i], labels.size());
-      buckets[label].push_back(placed[i]);
-    }
-    return buckets;
+    return keyed;
   }
 
-  static std::string PlaceLabel(const Point3& inPoint, std::size_t inNumber) {
-    const auto rounded = [](double inCoordinate) {
-      return Number(std::round(inCoordinate) + 0.0).text;
+  std::vector<Keyed> KeyedByPlace(const std::vector<int>& inMembers) const {
+    std::vector<Keyed> keyed;
+    keyed.reserve(inMembers.size());
+    std::vector<Point3> points;
+    for (const int member : inMembers) {
+      keyed.push_back({PlaceOf(member) ? points.size() : kNoPlace, member});
+      if (PlaceOf(member)) points.push_back(ToPoint(*PlaceOf(member)));
+    }
+    const std::vector<int> clusters = ClusterPlaces(points, options_.distance);
+    for (Keyed& one : keyed)
+      if (one.key != kNoPlace) one.key = static_cast<std::uint64_t>(clusters[one.key]);
+    return keyed;
+  }
+
+  /// @param inFirst the first member of the group.
+  std::string LabelOf(const Keyed& inFirst, std::size_t inLevel) const {
+    const GroupBy by = options_.by[inLevel];
+    const auto text = [&](std::uint64_t inNumber) {
+      return labels_[inLevel].Text(static_cast<std::uint32_t>(inNumber));
     };
-    return "place " + std::to_string(inNumber) + ", near " + rounded(inPoint.x) + " " +
-           rounded(inPoint.y) + " " + rounded(inPoint.z);
+    if (by == GroupBy::kProduct) return std::string(text(inFirst.key));
+    if (by != GroupBy::kPlace)
+      return std::string(text(inFirst.key >> 32)).append(" x ").append(text(inFirst.key));
+    if (inFirst.key == kNoPlace) return "no place";
+    std::string label = "place " + std::to_string(inFirst.key + 1) + ", near";
+    for (const double coordinate : *PlaceOf(inFirst.member))
+      label.append(1, ' ').append(Number(std::round(coordinate) + 0.0).text);
+    return label;
   }
 
   void Describe(InterferenceGroup& ioGroup, const std::string& inParentId) const {
-    const std::string* leastId = nullptr;
     for (const int member : ioGroup.members) {
-      const std::optional<double>& value = Record(member).value.value;
+      const std::optional<double>& value = ValueOf(member);
       if (ioGroup.representative < 0 || (value && (!ioGroup.worst || *value < *ioGroup.worst)))
         ioGroup.representative = member;
       if (value) ioGroup.worst = std::min(*value, ioGroup.worst.value_or(*value));
-      const std::string& id = ids_[static_cast<std::size_t>(member)];
-      if (leastId == nullptr || id < *leastId) leastId = &id;
     }
-    ZORFoundation::Hash64 hash;
-    hash.AddText(inParentId);
-    hash.AddText(Name(ioGroup.by));
-    hash.AddText(ioGroup.by == GroupBy::kPlace ? *leastId : ioGroup.label);
-    ioGroup.id = ZORFoundation::HexText(hash.Get());
+    // What is grouped by place has no other name than its interferences.
+    std::string_view identity = ioGroup.label;
+    if (ioGroup.by == GroupBy::kPlace) identity = LeastId(ioGroup.members);
+    HashInput input;
+    for (const std::string_view text :
+         {std::string_view(inParentId), std::string_view(Name(ioGroup.by)), identity})
+      input.AddText(text);
+    ioGroup.id = ZORFoundation::HexText(input.Hash());
+  }
+
+  std::string_view LeastId(const std::vector<int>& inMembers) const {
+    const auto id = [&](int inMember) -> std::string_view {
+      return ids_[static_cast<std::size_t>(inMember)];
+    };
+    return id(*std::ranges::min_element(inMembers, {}, id));
   }
 
   const ReviewedResult& result_;
   const std::vector<std::string>& ids_;
   const GroupOptions& options_;
+  std::vector<ProductLabels> labels_;  // of each level; none of places
+  std::vector<std::optional<double>> values_;
+  std::vector<std::optional<Position>> places_;
   std::vector<int> counts_;  // of the interferences of each product
 };
 

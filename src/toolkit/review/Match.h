@@ -2,21 +2,14 @@
 #ifndef ZOR_TOOLKIT_REVIEW_MATCH_H
 #define ZOR_TOOLKIT_REVIEW_MATCH_H
 
+#include <deque>
 #include <string>
+#include <string_view>
 #include <vector>
 
-#include "toolkit/review/ReviewRecords.h"
+#include "toolkit/review/StableIds.h"
 
 namespace ZORToolkit {
-
-/// A stable identifier for each interference, in their order: 16 hexadecimal digits made of its two
-/// products, whose order does not count, and of the cubic millimetre of its place in the frame of
-/// one of them; of several that agree in all that, of a number too. It does not depend on what else
-/// the result has, on languages, or on where an assembly stands. No two of a result are equal.
-ZOR_TOOLKIT_EXPORT std::vector<std::string> StableIds(const ReviewedResult& inResult);
-
-/// A stable identifier of the two products alone, likewise.
-ZOR_TOOLKIT_EXPORT std::string PairId(const ReviewedResult& inResult, const ReviewRecord& inRecord);
 
 struct MatchOptions {
   double tolerance = 0.001;  ///< below it two placements are the same; millimetres
@@ -26,11 +19,21 @@ struct MatchOptions {
 /// What one result is in the other, by positions in ReviewedResult.
 struct ResultMatch {
   struct Partner {
-    int position = -1;   ///< in the other result, -1 for none
-    std::string reason;  ///< why this one, or why none
+    int position = -1;        ///< in the other result, -1 for none
+    std::string_view reason;  ///< why this one, or why none; lives as long as the match
+    bool isUnmoved = false;   ///< placements and points of an interference are written alike
   };
   std::vector<Partner> productsOfOld, productsOfNew;
   std::vector<Partner> interferencesOfOld, interferencesOfNew;
+  std::deque<std::string> texts;  ///< those of the reasons that are not said of many
+
+  ResultMatch() = default;
+  ResultMatch(ResultMatch&&) = default;
+  ResultMatch& operator=(ResultMatch&&) = default;
+  ResultMatch(const ResultMatch&) = delete;
+  ResultMatch& operator=(const ResultMatch&) = delete;
+
+  std::string_view Keep(std::string inText) { return texts.emplace_back(std::move(inText)); }
 };
 
 /// Products are the same by identifier; of those left over by alias and part, then by the last name
@@ -42,14 +45,6 @@ struct ResultMatch {
 ZOR_TOOLKIT_EXPORT ResultMatch MatchResults(const ReviewedResult& inOld,
                                             const ReviewedResult& inNew,
                                             const MatchOptions& inOptions = {});
-
-/// How far the second product moved in the frame of the first from one placement of both to
-/// another, as seen a metre away; 0 when a placement is missing. Millimetres.
-ZOR_TOOLKIT_EXPORT double RelativeMotion(const ReviewRecord& inOld, const ReviewRecord& inNew,
-                                         bool inIsSwapped);
-/// How far a product moved, likewise.
-ZOR_TOOLKIT_EXPORT double Motion(const std::optional<Placement>& inOld,
-                                 const std::optional<Placement>& inNew);
 
 }  // namespace ZORToolkit
 

@@ -3,24 +3,46 @@
 #define ZOR_TOOLKIT_REVIEW_REVIEW_RECORDS_H
 
 #include <array>
+#include <cstdint>
+#include <memory>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
-#include "toolkit/records/DocumentRecords.h"
+#include "toolkit/records/InterferenceRecord.h"
 
 namespace ZORToolkit {
 
+class ReviewSource;
+
 typedef std::array<double, 3> Position;  ///< millimetres
+
+/// Between the names of a path of instances.
+inline constexpr std::string_view kPathSeparator = " --++-- ";
+inline std::string_view LastName(std::string_view inPath) {
+  const std::size_t at = inPath.rfind(kPathSeparator);
+  return at == std::string_view::npos ? inPath : inPath.substr(at + kPathSeparator.size());
+}
+
+/// A number as a document has it, understood when asked.
+struct ZOR_TOOLKIT_EXPORT WrittenNumber {
+  std::string_view text;  ///< empty where it is missing
+  /// As Number::value.
+  std::optional<double> Value() const;
+};
+
+/// Where something of a result stands in its document; 0 for nowhere.
+typedef std::uint32_t ElementNumber;
 
 /// A product, once for a result. Two are the same when their identifiers are; without identifiers,
 /// when alias and part are.
 struct ZOR_TOOLKIT_EXPORT ReviewProduct {
-  std::string id, alias, part;
-  std::optional<Placement> placement;  ///< the first in the result
+  std::string_view id, alias, part;
+  ElementNumber element = 0;  ///< the first in the result
 
   /// What a person calls it: its alias, or its identifier when it has none.
-  const std::string& Name() const { return alias.empty() ? id : alias; }
+  std::string_view Name() const { return alias.empty() ? id : alias; }
   /// What tells it from all others of its result.
   std::string Key() const;
 };
@@ -30,31 +52,57 @@ struct ZOR_TOOLKIT_EXPORT ReviewProduct {
 struct ReviewRecord {
   int index = 0;                        ///< the number in the document, from 1
   std::array<int, 2> products{-1, -1};  ///< positions in ReviewedResult::products, -1 for none
-  std::string type, status, retrieve, rule, comment;
-  int computationCase = -1;  ///< position in ReviewedResult::computationCases
-  Number value, clearance;
-  /// With decimal points or commas; nothing where the result has no whole, finite placement.
-  std::array<std::optional<Placement>, 2> placements;
-  std::optional<Position> place;  ///< the mean of its points
-  ElementHandle element;
+  int computationCase = -1;             ///< position in ReviewedResult::computationCases
+  std::string_view type, status, retrieve, rule, comment;
+  WrittenNumber value, clearance;
+  ElementNumber element = 0;
+  std::array<ElementNumber, 2> productElements{};
+  ElementNumber geometry = 0;  ///< the first of them
+  bool hasMoreGeometry = false;
 };
 
-struct ReviewedResult {
+/// Identifiers and aliases of the products of both sides of a specification.
+struct SpecifiedPair {
+  struct Names {
+    std::string_view alias, id;
+  };
+  std::array<Names, 2> products;
+};
+
+/// Its texts live as long as it, or a copy of it, does.
+struct ZOR_TOOLKIT_EXPORT ReviewedResult {
   std::string name;  ///< of the document
   DocumentKind kind = DocumentKind::kClash;
   std::vector<ReviewProduct> products;
   std::vector<ReviewRecord> interferences;    ///< in document order
   std::vector<std::string> computationCases;  ///< of result sets and of violated rules, each once
-  std::vector<SpecificationRecord> specifications;
+  std::vector<SpecifiedPair> specifications;
   bool hasSpecification = false;   ///< there is an element for them, however empty
   std::vector<std::string> words;  ///< statuses and ages as the document has them, some repeated
   /// "Type" and "Clearance" of the "ClashSpec".
   std::string computedTypes;
   Number clearance;
+  std::shared_ptr<const ReviewSource> source;
+
+  // Read from the document at each call
+  ElementHandle ElementOf(const ReviewRecord& inRecord) const;
+  /// With decimal points or commas; nothing where the product has no whole, finite placement.
+  std::optional<Placement> PlacementOf(ElementNumber inProduct) const;
+  /// The mean of its points.
+  std::optional<Position> PlaceOf(const ReviewRecord& inRecord) const;
+  /// Hashes of the texts of a product's placement and of an interference's points: equal ones are
+  /// equal, different ones may still be the same numbers. 0 where there are none.
+  std::uint64_t PlacementHash(const ReviewRecord& inRecord, std::size_t inProduct) const;
+  std::uint64_t PlacementHash(int inProduct) const;  ///< of the first placement of a product
+  std::uint64_t GeometryHash(const ReviewRecord& inRecord) const;
+  /// The position of a product of another result that is the same by identifier, -1 for none.
+  /// @param inProduct a position in that result.
+  /// @param inGuess a position in this one that is likely.
+  int FindProduct(const ReviewedResult& inOther, int inProduct, int inGuess = -1) const;
 };
 
-/// Reads all that reviewing needs, in one pass. Raises Error for a document of a kind that has no
-/// interferences. The document must outlive the handles' use.
+/// Reads all that reviewing needs, in one pass; numbers and placements wait until they are asked
+/// for. Raises Error for a document of a kind that has no interferences.
 ZOR_TOOLKIT_EXPORT ReviewedResult ReadForReview(ClashDocument& ioDocument);
 
 }  // namespace ZORToolkit

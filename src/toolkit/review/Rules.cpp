@@ -8,23 +8,16 @@
 namespace ZORToolkit {
 namespace {
 
-std::string_view LastName(std::string_view inPath) {
-  constexpr std::string_view kSeparator = " --++-- ";
-  const std::size_t at = inPath.rfind(kSeparator);
-  return at == std::string_view::npos ? inPath : inPath.substr(at + kSeparator.size());
-}
-
 bool HoldsFor(const ReviewProduct& inProduct, const std::vector<std::string>& inProducts,
               const std::vector<std::string>& inParts) {
   if (!inParts.empty() && !MatchesAnyGlob(inParts, inProduct.part)) return false;
   if (inProducts.empty()) return true;
-  for (const std::string* const name : {&inProduct.id, &inProduct.alias})
-    if (MatchesAnyGlob(inProducts, *name) || MatchesAnyGlob(inProducts, LastName(*name)))
-      return true;
+  for (const std::string_view name : {inProduct.id, inProduct.alias})
+    if (MatchesAnyGlob(inProducts, name) || MatchesAnyGlob(inProducts, LastName(name))) return true;
   return false;
 }
 
-bool IsAmong(const std::vector<std::string>& inWords, const std::string& inWord) {
+bool IsAmong(const std::vector<std::string>& inWords, std::string_view inWord) {
   return inWords.empty() || std::ranges::find(inWords, inWord) != inWords.end();
 }
 
@@ -34,9 +27,11 @@ bool InterferenceCondition::Holds(const ReviewedResult& inResult,
                                   const ReviewRecord& inRecord) const {
   if (!IsAmong(types, inRecord.type) || !IsAmong(statuses, inRecord.status)) return false;
   if (!rules.empty() && !MatchesAnyGlob(rules, inRecord.rule)) return false;
-  const std::optional<double>& value = inRecord.value.value;
-  if (minValue && !(value && *value >= *minValue)) return false;
-  if (maxValue && !(value && *value <= *maxValue)) return false;
+  if (minValue || maxValue) {
+    const std::optional<double> value = inRecord.value.Value();
+    if (minValue && !(value && *value >= *minValue)) return false;
+    if (maxValue && !(value && *value <= *maxValue)) return false;
+  }
   if (products.empty() && otherProducts.empty() && parts.empty() && otherParts.empty()) return true;
   static const ReviewProduct kNone;
   const auto product = [&](std::size_t inProduct) -> const ReviewProduct& {
@@ -82,7 +77,8 @@ RulesPlan PlanRules(const ReviewedResult& inResult, const std::vector<Acceptance
     ReviewEdit edit;
     edit.position = record.index - 1;
     edit.status = rule->status;
-    edit.comment = record.comment.empty() ? rule->reason : record.comment + "\n" + rule->reason;
+    edit.comment = rule->reason;
+    if (!record.comment.empty()) edit.comment = std::string(record.comment) + "\n" + rule->reason;
     plan.edits.push_back(std::move(edit));
   }
   return plan;

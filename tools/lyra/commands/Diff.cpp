@@ -23,6 +23,8 @@ struct Compared {
   const ReviewedResult& oldResult;
   const ReviewedResult& newResult;
   ResultDiff diff;
+
+  std::vector<std::string> Ids() const { return EntryIds(diff, oldResult, newResult); }
 };
 
 std::string IndexText(int inPosition) {
@@ -33,11 +35,11 @@ OrderedJson IndexJson(int inPosition) {
   return inPosition < 0 ? OrderedJson(nullptr) : OrderedJson(inPosition + 1);
 }
 
-OrderedJson ToJson(const DiffEntry& inEntry) {
+OrderedJson ToJson(const DiffEntry& inEntry, const std::string& inId) {
   OrderedJson changes = OrderedJson::array();
   for (const Change& change : inEntry.changes)
     changes.push_back({{"what", change.what}, {"from", change.from}, {"to", change.to}});
-  return {{"id", inEntry.id},
+  return {{"id", inId},
           {"old", IndexJson(inEntry.oldPosition)},
           {"new", IndexJson(inEntry.newPosition)},
           {"reason", inEntry.reason},
@@ -45,15 +47,17 @@ OrderedJson ToJson(const DiffEntry& inEntry) {
 }
 
 void PrintJson(const Compared& inCompared, Output& ioOutput) {
+  const std::vector<std::string> ids = inCompared.Ids();
   std::string begin = "{";
   for (std::size_t i = 0; i < kDiffClassCount; ++i) {
     const auto itsClass = static_cast<DiffClass>(i);
     ioOutput.Write(begin.append("\"").append(Name(itsClass)).append("\":["));
     begin = ",\n";
     const char* lineBegin = "\n";
-    for (const DiffEntry& entry : inCompared.diff.entries) {
+    for (std::size_t k = 0; k < ids.size(); ++k) {
+      const DiffEntry& entry = inCompared.diff.entries[k];
       if (entry.itsClass != itsClass) continue;
-      ioOutput.Write(lineBegin + JsonLine(ToJson(entry)));
+      ioOutput.Write(lineBegin + JsonLine(ToJson(entry, ids[k])));
       lineBegin = ",\n";
     }
     ioOutput.Write(*lineBegin == ',' ? "\n]" : "]");
@@ -74,17 +78,19 @@ std::string ChangesText(const DiffEntry& inEntry) {
   std::string text;
   for (const Change& change : inEntry.changes) {
     if (!text.empty()) text += "; ";
-    text += change.what + " " + change.from + " -> " + change.to;
+    text.append(change.what).append(1, ' ').append(change.from).append(" -> ").append(change.to);
   }
-  return text.empty() ? inEntry.reason : text;
+  return text.empty() ? std::string(inEntry.reason) : text;
 }
 
 std::vector<std::string> Cells(const Compared& inCompared, const DiffEntry& inEntry) {
   const auto [result, record] = Shown(inCompared, inEntry);
   std::vector<std::string> cells{Name(inEntry.itsClass), IndexText(inEntry.oldPosition),
-                                 IndexText(inEntry.newPosition), record->type, record->value.text};
+                                 IndexText(inEntry.newPosition), std::string(record->type),
+                                 std::string(record->value.text)};
   for (const int product : record->products)
-    cells.push_back(product < 0 ? "" : result->products[static_cast<std::size_t>(product)].Name());
+    cells.emplace_back(product < 0 ? ""
+                                   : result->products[static_cast<std::size_t>(product)].Name());
   cells.push_back(ChangesText(inEntry));
   return cells;
 }
@@ -92,10 +98,12 @@ std::vector<std::string> Cells(const Compared& inCompared, const DiffEntry& inEn
 void PrintCsv(const Compared& inCompared, Output& ioOutput) {
   ioOutput.Write(CsvRow({"Class", "Old", "New", "Type", "Value", "First product", "Second product",
                          "Changes or reason", "Id", "Reason"}));
-  for (const DiffEntry& entry : inCompared.diff.entries) {
+  const std::vector<std::string> ids = inCompared.Ids();
+  for (std::size_t i = 0; i < ids.size(); ++i) {
+    const DiffEntry& entry = inCompared.diff.entries[i];
     std::vector<std::string> cells = Cells(inCompared, entry);
-    cells.push_back(entry.id);
-    cells.push_back(entry.reason);
+    cells.push_back(ids[i]);
+    cells.emplace_back(entry.reason);
     if (ioOutput.IsTerminal())
       for (std::string& cell : cells) cell = Printable(cell);
     ioOutput.Write(CsvRow(cells));

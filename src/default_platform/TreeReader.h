@@ -1,0 +1,58 @@
+// A document's tree as it lies in memory, for whoever reads all of a large one.
+#ifndef ZOR_DEFAULT_PLATFORM_TREE_READER_H
+#define ZOR_DEFAULT_PLATFORM_TREE_READER_H
+
+#include "default_platform/xml/DOM_HandleAccess.h"
+
+namespace ZORDefault {
+
+/// Reads elements, attributes and texts without making a handle or a string of each: an element is
+/// a number, a name is a number, a text is its characters as they are stored. Numbers and texts are
+/// valid as long as the reader, which keeps the document alive; changes of the document are seen.
+class TreeReader {
+ public:
+  using Element = DOM_Tree::Node;  ///< 0 for none
+  using Name = DOM_Tree::Name;
+
+  /// @param inNode any node of the document, not null.
+  explicit TreeReader(const DOM_Node& inNode)
+      : handle_(inNode), tree_(DOM_HandleAccess::TreeOf(inNode)) {}
+
+  /// One more than the largest number of an element, or of a name.
+  Element ElementEnd() const { return tree_->NodeEnd(); }
+  Name NameEnd() const { return tree_->NameEnd(); }
+  std::u16string_view NameText(Name inName) const { return tree_->NameUnits(inName); }
+  Name NameOf(Element inElement) const { return tree_->At(inElement).name; }
+
+  static Element ElementOf(const DOM_Node& inNode) { return DOM_HandleAccess::NodeOf(inNode); }
+  DOM_Node Handle(Element inElement) const { return DOM_HandleAccess::Handle(tree_, inElement); }
+
+  /// Calls inVisit(Element, Name) for each child element in document order.
+  template <class Visit>
+  void ForEachChild(Element inElement, const Visit& inVisit) const {
+    for (DOM_Tree::Node child = tree_->FirstChild(inElement); child != 0;) {
+      const DOM_Tree::NodeRecord& record = tree_->At(child);
+      if (record.kind == DOM_Node::ELEMENT_NODE) inVisit(child, record.name);
+      child = record.next;
+    }
+  }
+
+  /// Calls inVisit(Name, const DOM_Text&) for each attribute in document order. Texts of one
+  /// document are Latin-1 where every character fits, so equal ones are equal bytes.
+  template <class Visit>
+  void ForEachAttribute(Element inElement, const Visit& inVisit) const {
+    for (DOM_Tree::Attribute at = tree_->At(inElement).firstAttribute; at != 0;) {
+      const DOM_Tree::AttributeRecord& record = tree_->AttributeAt(at);
+      inVisit(record.name, *tree_->Text(record.value));
+      at = record.next;
+    }
+  }
+
+ private:
+  DOM_Node handle_;
+  DOM_Tree* tree_;
+};
+
+}  // namespace ZORDefault
+
+#endif

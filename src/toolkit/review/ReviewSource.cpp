@@ -1,0 +1,359 @@
+#include "toolkit/review/ReviewSource.h"
+
+#include <algorithm>
+
+#include "foundation/Utf8.h"
+#include "toolkit/records/DocumentText.h"
+
+namespace ZORToolkit {
+namespace {
+
+struct KnownName {
+  std::string_view text;
+  Named named;
+};
+constexpr KnownName kNames[] = {
+    {"Alias", Named::kAlias},
+    {"ClashResult", Named::kClashResult},
+    {"ClashSpec", Named::kClashSpec},
+    {"Clearance", Named::kClearance},
+    {"Comment", Named::kComment},
+    {"ComputationCase", Named::kComputationCase},
+    {"CorrespondingData", Named::kCorrespondingData},
+    {"DescriptionID", Named::kDescriptionId},
+    {"DisplayableID", Named::kDisplayableId},
+    {"DistanceClearance", Named::kDistanceClearance},
+    {"GeometricAspect", Named::kGeometricAspect},
+    {"Interference", Named::kInterference},
+    {"Matrix", Named::kMatrix},
+    {"Name", Named::kName},
+    {"Point", Named::kPoint},
+    {"ProdListe1", Named::kProdListe1},
+    {"ProdListe2", Named::kProdListe2},
+    {"Product", Named::kProduct},
+    {"ProductsInSpec", Named::kProductsInSpec},
+    {"ResultType", Named::kResultType},
+    {"ResultTypeNoNLS", Named::kResultTypeNoNls},
+    {"RetrieveInf", Named::kRetrieveInf},
+    {"ShapeName", Named::kShapeName},
+    {"Specification", Named::kSpecification},
+    {"Status", Named::kStatus},
+    {"Type", Named::kType},
+    {"TypeCalc", Named::kTypeCalc},
+    {"Ux", Named::kUx},
+    {"Uy", Named::kUy},
+    {"Uz", Named::kUz},
+    {"Value", Named::kValue},
+    {"Vector", Named::kVector},
+    {"ViolatedRule", Named::kViolatedRule},
+    {"Vx", Named::kVx},
+    {"Vy", Named::kVy},
+    {"Vz", Named::kVz},
+};
+
+Named NamedAs(std::u16string_view inName) {
+  const auto known = std::ranges::find_if(
+      kNames, [&](const KnownName& inKnown) { return IsSameText(inName, inKnown.text); });
+  return known == std::end(kNames) ? Named::kOther : known->named;
+}
+
+constexpr std::size_t kFirstSlots = 256;
+constexpr std::uint64_t kFactor = 0x9E3779B97F4A7C15u;
+
+std::uint64_t Mix(std::uint64_t inHash, std::uint64_t inPart) {
+  inHash = (inHash ^ inPart) * kFactor;
+  return inHash ^ (inHash >> 31);
+}
+
+std::string EncodedLatin1(std::string_view inText) {
+  std::string encoded;
+  encoded.reserve(inText.size() + inText.size() / 4 + 4);
+  for (const char byte : inText) {
+    const auto code = static_cast<unsigned char>(byte);
+    if (code >= 0x80) encoded += static_cast<char>(0xC0 | (code >> 6));
+    encoded += static_cast<char>(code < 0x80 ? code : 0x80 | (code & 0x3F));
+  }
+  return encoded;
+}
+
+std::string EncodedUnits(std::u16string_view inUnits) {
+  std::string encoded(ZORFoundation::Utf8Length(inUnits), '\0');
+  ZORFoundation::EncodeUtf8(inUnits, encoded.data());
+  return encoded;
+}
+
+/// By the short way where the text is a plain decimal number: digits that fit a double exactly,
+/// divided by a power of ten that does, are rounded once and so rightly (W. D. Clinger, "How to read
+/// floating point numbers accurately", 1990).
+std::optional<double> PlainNumber(std::string_view inText) {
+  constexpr double kPowers[] = {1e0, 1e1, 1e2,  1e3,  1e4,  1e5,  1e6,  1e7,
+                                1e8, 1e9, 1e10, 1e11, 1e12, 1e13, 1e14, 1e15};
+  const char* at = inText.data();
+  const char* const end = at + inText.size();
+  const bool isNegative = at != end && *at == '-';
+  if (isNegative) ++at;
+  if (end - at > 16) return std::nullopt;  // with the point at most fifteen digits
+  std::uint64_t digits = 0;
+  const char* point = nullptr;
+  const char* const first = at;
+  for (; at != end; ++at) {
+    const unsigned int digit = static_cast<unsigned int>(*at) - '0';
+    if (digit <= 9) {
+      digits = digits * 10 + digit;
+    } else if ((*at == '.' || *at == ',') && point == nullptr && at != first) {
+      point = at;
+    } else {
+      return std::nullopt;
+    }
+  }
+  if (at == first || (point == nullptr && end - first > 15) ||
+      (point != nullptr && point + 1 == end))
+    return std::nullopt;
+  const double whole = static_cast<double>(digits);
+  const double value = point == nullptr ? whole : whole / kPowers[end - point - 1];
+  return isNegative ? -value : value;
+}
+
+std::optional<double> NumberIn(StoredText inText) {
+  if (inText == nullptr) return std::nullopt;
+  const TextView view = inText->View();
+  if (view.IsWide()) return Number(EncodedUnits(view.Units())).value;
+  const std::optional<double> plain = PlainNumber(view.Latin1());
+  return plain ? plain : Number(EncodedLatin1(view.Latin1())).value;
+}
+
+}  // namespace
+
+ReviewSource::ReviewSource(const DOM_Node& inRoot)
+    : tree_(inRoot), meanings_(tree_.NameEnd()), slots_(kFirstSlots) {
+  for (ZORDefault::TreeReader::Name name = 1; name < tree_.NameEnd(); ++name)
+    meanings_[name] = NamedAs(tree_.NameText(name));
+}
+
+StoredText ReviewSource::Attribute(Element inElement, Named inName) const {
+  StoredText found = nullptr;
+  ForEachAttribute(inElement, [&](Named inNamed, StoredText inText) {
+    if (inNamed == inName) found = inText;
+  });
+  return found;
+}
+
+std::string_view ReviewSource::Keep(std::string_view inText) {
+  constexpr std::size_t kBlock = std::size_t{64} * 1024;
+  if (inText.size() > room_) {
+    room_ = std::max(kBlock, inText.size());
+    blocks_.emplace_back(new char[room_]);
+    free_ = blocks_.back().get();
+  }
+  char* const kept = std::ranges::copy(inText, free_).out - inText.size();
+  free_ += inText.size();
+  room_ -= inText.size();
+  return {kept, inText.size()};
+}
+
+std::string_view ReviewSource::Text(StoredText inText) {
+  if (inText == nullptr) return {};
+  const TextView view = inText->View();
+  if (view.IsWide()) return Keep(EncodedUnits(view.Units()));
+  const std::string_view bytes = view.Latin1();
+  unsigned char all = 0;
+  for (const char byte : bytes) all |= static_cast<unsigned char>(byte);
+  return all < 0x80 ? bytes : Keep(EncodedLatin1(bytes));
+}
+
+// ---- products
+
+bool ReviewSource::IsSame(const ProductKey& inA, const ProductKey& inB) {
+  return inA.hash == inB.hash && std::ranges::equal(inA.texts, inB.texts, ZORToolkit::IsSame);
+}
+
+ReviewSource::ProductKey ReviewSource::KeyOf(StoredText inId, StoredText inAlias,
+                                             StoredText inPart) {
+  if (inId != nullptr && inId->Length() != 0) return {HashOf(inId), {inId, nullptr, nullptr}};
+  static constexpr DOM_Text kEmpty{0};
+  const auto text = [](StoredText inText) { return inText == nullptr ? &kEmpty : inText; };
+  const StoredText alias = text(inAlias), part = text(inPart);
+  return {Mix(HashOf(alias), HashOf(part)), {nullptr, alias, part}};
+}
+
+std::size_t ReviewSource::SlotOf(const ProductKey& inKey) const {
+  const std::size_t mask = slots_.size() - 1;
+  const auto tag = static_cast<std::uint32_t>(inKey.hash >> 32);
+  std::size_t slot = inKey.hash & mask;
+  while (slots_[slot].product != 0 &&
+         (slots_[slot].tag != tag || !IsSame(products_[slots_[slot].product - 1], inKey)))
+    slot = (slot + 1) & mask;
+  return slot;
+}
+
+int ReviewSource::Find(const ProductKey& inKey, int inGuess) const {
+  if (inGuess >= 0 && inGuess < ProductCount() && IsSame(Key(inGuess), inKey)) return inGuess;
+  return static_cast<int>(slots_[SlotOf(inKey)].product) - 1;
+}
+
+void ReviewSource::Add(const ProductKey& inKey) {
+  products_.push_back(inKey);
+  const auto count = static_cast<std::uint32_t>(products_.size());
+  if (products_.size() * 2 <= slots_.size()) {
+    slots_[SlotOf(inKey)] = {static_cast<std::uint32_t>(inKey.hash >> 32), count};
+    return;
+  }
+  slots_.assign(slots_.size() * 4, {});
+  const std::size_t mask = slots_.size() - 1;
+  for (std::uint32_t i = 0; i < count; ++i) {
+    std::size_t slot = products_[i].hash & mask;
+    while (slots_[slot].product != 0) slot = (slot + 1) & mask;
+    slots_[slot] = {static_cast<std::uint32_t>(products_[i].hash >> 32), i + 1};
+  }
+}
+
+// ---- geometry
+
+std::uint64_t ReviewSource::PlacementHash(Element inProduct) const {
+  std::uint64_t hash = 0;
+  ForEachChild(inProduct, [&](Element inMatrix, Named inNamed) {
+    if (inNamed != Named::kMatrix) return;
+    hash = Mix(hash, 1);
+    ForEachChild(inMatrix, [&](Element inPart, Named inPartNamed) {
+      hash = Mix(hash, static_cast<std::uint64_t>(inPartNamed));
+      ForEachAttribute(inPart, [&](Named inAttribute, StoredText inText) {
+        hash = Mix(hash, HashOf(inText) + static_cast<std::uint64_t>(inAttribute));
+      });
+    });
+  });
+  return hash;
+}
+
+std::uint64_t ReviewSource::FirstPlacementHash(int inProduct, Element inElement) const {
+  placementHashes_.resize(products_.size());
+  std::uint64_t& hash = placementHashes_[static_cast<std::size_t>(inProduct)];
+  if (hash == 0) hash = PlacementHash(inElement);
+  return hash;
+}
+
+std::uint64_t ReviewSource::PointsHash(Element inGeometry) const {
+  std::uint64_t hash = 0;
+  ForEachChild(inGeometry, [&](Element inPoint, Named inNamed) {
+    if (inNamed != Named::kPoint) return;
+    hash = Mix(hash, 1);
+    ForEachAttribute(inPoint, [&](Named inAttribute, StoredText inText) {
+      hash = Mix(hash, HashOf(inText) + static_cast<std::uint64_t>(inAttribute));
+    });
+  });
+  return hash;
+}
+
+/// The three attributes from inFirst on.
+bool ReviewSource::ReadTriple(Element inElement, Named inFirst, double* outTriple) const {
+  int count = 0;
+  ForEachAttribute(inElement, [&](Named inNamed, StoredText inText) {
+    const int place = static_cast<int>(inNamed) - static_cast<int>(inFirst);
+    if (place < 0 || place > 2) return;
+    const std::optional<double> number = NumberIn(inText);
+    if (!number) return;
+    outTriple[place] = *number;
+    ++count;
+  });
+  return count == 3;
+}
+
+std::optional<Placement> ReviewSource::PlacementIn(Element inMatrix) const {
+  Placement placement{};
+  unsigned int found = 0;  // a bit for each column and the translation
+  bool isWhole = true;
+  ForEachChild(inMatrix, [&](Element inChild, Named inNamed) {
+    if (inNamed == Named::kPoint) {
+      isWhole = ReadTriple(inChild, Named::kUx, &placement[9]) && isWhole;
+      found |= 8;
+    } else if (inNamed == Named::kVector) {
+      const StoredText column = Attribute(inChild, Named::kCorrespondingData);
+      for (unsigned int i = 0; i < 3; ++i) {
+        constexpr std::string_view kColumns[] = {"Rx", "Ry", "Rz"};
+        if (column == nullptr || column->IsWide() || column->View().Latin1() != kColumns[i])
+          continue;
+        isWhole = ReadTriple(inChild, Named::kVx, &placement[std::size_t{3} * i]) && isWhole;
+        found |= 1u << i;
+      }
+    }
+  });
+  if (!isWhole || found != 15) return std::nullopt;
+  return placement;
+}
+
+std::optional<Placement> ReviewSource::PlacementOf(Element inProduct) const {
+  std::optional<Placement> placement;
+  ForEachChild(inProduct, [&](Element inMatrix, Named inNamed) {
+    if (inNamed == Named::kMatrix) placement = PlacementIn(inMatrix);
+  });
+  return placement;
+}
+
+/// The mean of the points that have all their numbers.
+std::optional<Position> ReviewSource::PlaceOf(const ReviewRecord& inRecord) const {
+  Position sum{};
+  int count = 0;
+  ForEachGeometry(inRecord, [&](Element inGeometry) {
+    ForEachChild(inGeometry, [&](Element inPoint, Named inNamed) {
+      Position point{};
+      if (inNamed != Named::kPoint || !ReadTriple(inPoint, Named::kUx, point.data())) return;
+      for (std::size_t i = 0; i < 3; ++i) sum[i] += point[i];
+      ++count;
+    });
+  });
+  if (count == 0) return std::nullopt;
+  for (double& coordinate : sum) coordinate /= count;
+  return sum;
+}
+
+// ---- records
+
+std::optional<double> WrittenNumber::Value() const {
+  const std::optional<double> plain = PlainNumber(text);
+  return plain ? plain : Number(std::string(text)).value;
+}
+
+std::string ReviewProduct::Key() const {
+  if (!id.empty()) return std::string(id);
+  return std::string(1, '\0').append(alias).append(1, '\0').append(part);
+}
+
+ElementHandle ReviewedResult::ElementOf(const ReviewRecord& inRecord) const {
+  return ElementHandle(source->Tree().Handle(inRecord.element));
+}
+
+std::optional<Placement> ReviewedResult::PlacementOf(ElementNumber inProduct) const {
+  if (inProduct == 0) return std::nullopt;
+  return source->PlacementOf(inProduct);
+}
+
+std::optional<Position> ReviewedResult::PlaceOf(const ReviewRecord& inRecord) const {
+  return source->PlaceOf(inRecord);
+}
+
+std::uint64_t ReviewedResult::PlacementHash(int inProduct) const {
+  return source->FirstPlacementHash(inProduct,
+                                    products[static_cast<std::size_t>(inProduct)].element);
+}
+
+std::uint64_t ReviewedResult::PlacementHash(const ReviewRecord& inRecord,
+                                            std::size_t inProduct) const {
+  const int product = inRecord.products[inProduct];
+  if (product < 0) return 0;
+  const ElementNumber element = inRecord.productElements[inProduct];
+  if (products[static_cast<std::size_t>(product)].element == element) return PlacementHash(product);
+  return source->PlacementHash(element);
+}
+
+std::uint64_t ReviewedResult::GeometryHash(const ReviewRecord& inRecord) const {
+  std::uint64_t hash = 0;
+  source->ForEachGeometry(inRecord, [&](ElementNumber inGeometry) {
+    hash = Mix(hash, source->PointsHash(inGeometry));
+  });
+  return hash;
+}
+
+int ReviewedResult::FindProduct(const ReviewedResult& inOther, int inProduct, int inGuess) const {
+  return source->Find(inOther.source->Key(inProduct), inGuess);
+}
+
+}  // namespace ZORToolkit

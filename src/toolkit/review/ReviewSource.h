@@ -1,0 +1,156 @@
+// Where the records of a reviewed result come from; for the toolkit's own sources.
+#ifndef ZOR_TOOLKIT_REVIEW_REVIEW_SOURCE_H
+#define ZOR_TOOLKIT_REVIEW_REVIEW_SOURCE_H
+
+#include <array>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "default_platform/TreeReader.h"
+#include "toolkit/review/ReviewRecords.h"
+
+namespace ZORToolkit {
+
+/// The names of elements and attributes that reviewing reads.
+enum class Named : std::uint8_t {
+  kOther,
+  kAlias,
+  kClashResult,
+  kClashSpec,
+  kClearance,
+  kComment,
+  kComputationCase,
+  kCorrespondingData,
+  kDescriptionId,
+  kDisplayableId,
+  kDistanceClearance,
+  kGeometricAspect,
+  kInterference,
+  kMatrix,
+  kName,
+  kPoint,
+  kProdListe1,
+  kProdListe2,
+  kProduct,
+  kProductsInSpec,
+  kResultType,
+  kResultTypeNoNls,
+  kRetrieveInf,
+  kShapeName,
+  kSpecification,
+  kStatus,
+  kType,
+  kTypeCalc,
+  kUx,
+  kUy,
+  kUz,
+  kValue,
+  kVector,
+  kViolatedRule,
+  kVx,
+  kVy,
+  kVz
+};
+
+/// A text of the document as it is stored, null where it is missing.
+typedef const DOM_Text* StoredText;
+
+inline bool IsSame(StoredText inA, StoredText inB) {
+  if (inA == inB || inA == nullptr || inB == nullptr) return inA == inB;
+  return inA->head == inB->head && std::memcmp(inA + 1, inB + 1, inA->View().Bytes()) == 0;
+}
+inline std::uint64_t HashOf(StoredText inText) {
+  return HashOfBytes(inText + 1, inText->View().Bytes()) ^ inText->head;
+}
+
+/// The document's tree, the texts that it does not hold as UTF-8, and its products by what tells
+/// them apart.
+class ReviewSource {
+ public:
+  typedef ZORDefault::TreeReader::Element Element;
+
+  explicit ReviewSource(const DOM_Node& inRoot);
+
+  const ZORDefault::TreeReader& Tree() const { return tree_; }
+  template <class Visit>  // Visit(Element, Named)
+  void ForEachChild(Element inElement, const Visit& inVisit) const {
+    tree_.ForEachChild(inElement, [&](Element inChild, ZORDefault::TreeReader::Name inName) {
+      inVisit(inChild, Meaning(inName));
+    });
+  }
+  template <class Visit>  // Visit(Named, StoredText)
+  void ForEachAttribute(Element inElement, const Visit& inVisit) const {
+    tree_.ForEachAttribute(inElement,
+                           [&](ZORDefault::TreeReader::Name inName, const DOM_Text& inText) {
+                             inVisit(Meaning(inName), &inText);
+                           });
+  }
+  StoredText Attribute(Element inElement, Named inName) const;
+
+  /// As UTF-8; valid as long as this.
+  std::string_view Text(StoredText inText);
+  std::string_view Keep(std::string_view inText);
+
+  // Products
+  struct ProductKey {
+    std::uint64_t hash = 0;
+    std::array<StoredText, 3> texts{};  // the identifier alone, or alias and part after none
+  };
+  static ProductKey KeyOf(StoredText inId, StoredText inAlias, StoredText inPart);
+  /// The position of a product; -1 where there is none.
+  /// @param inGuess a position that is looked at first.
+  int Find(const ProductKey& inKey, int inGuess) const;
+  void Add(const ProductKey& inKey);  ///< one that there is not, at the next position
+  const ProductKey& Key(int inProduct) const {
+    return products_[static_cast<std::size_t>(inProduct)];
+  }
+  int ProductCount() const { return static_cast<int>(products_.size()); }
+
+  // Geometry
+  std::uint64_t PlacementHash(Element inProduct) const;
+  std::optional<Placement> PlacementOf(Element inProduct) const;
+  /// Of one "GeometricAspect".
+  std::uint64_t PointsHash(Element inGeometry) const;
+  /// Calls inVisit(Element) for each "GeometricAspect" of an interference.
+  template <class Visit>
+  void ForEachGeometry(const ReviewRecord& inRecord, const Visit& inVisit) const {
+    if (!inRecord.hasMoreGeometry) {
+      if (inRecord.geometry != 0) inVisit(inRecord.geometry);
+      return;
+    }
+    ForEachChild(inRecord.element, [&](Element inChild, Named inNamed) {
+      if (inNamed == Named::kGeometricAspect) inVisit(inChild);
+    });
+  }
+  std::optional<Position> PlaceOf(const ReviewRecord& inRecord) const;
+  /// That of the first placement of a product, worked out once.
+  std::uint64_t FirstPlacementHash(int inProduct, Element inElement) const;
+
+ private:
+  Named Meaning(ZORDefault::TreeReader::Name inName) const {
+    return inName < meanings_.size() ? meanings_[inName] : Named::kOther;
+  }
+  bool ReadTriple(Element inElement, Named inFirst, double* outTriple) const;
+  std::optional<Placement> PlacementIn(Element inMatrix) const;
+  static bool IsSame(const ProductKey& inA, const ProductKey& inB);
+  std::size_t SlotOf(const ProductKey& inKey) const;
+
+  ZORDefault::TreeReader tree_;
+  std::vector<Named> meanings_;                  // of each name of the document
+  std::vector<std::unique_ptr<char[]>> blocks_;  // of texts that are kept
+  char* free_ = nullptr;
+  std::size_t room_ = 0;
+  std::vector<ProductKey> products_;
+  mutable std::vector<std::uint64_t> placementHashes_;  // of products; 0 where not worked out yet
+  // Open addressing, a power of two; a position and one, and the upper half of the hash.
+  struct Slot {
+    std::uint32_t tag = 0, product = 0;
+  };
+  std::vector<Slot> slots_;
+};
+
+}  // namespace ZORToolkit
+
+#endif
