@@ -44,7 +44,7 @@ ZORPrint3DRepImage::ZORPrint3DRepImage(ZOR3DRep* inRep, int inWidth, int inHeigh
 }
 ZORPrint3DRepImage::~ZORPrint3DRepImage() {
   viewpoint_->Release();
-  Note("image released");
+  calls += "image released;";
 }
 ZORSupport* ZORPrint3DRepImage::GetSupport() { return hasSupport ? &support_ : nullptr; }
 ZOR3DViewpoint* ZORPrint3DRepImage::GetViewpoint() { return viewpoint_; }
@@ -63,7 +63,7 @@ void ZORSupport::SetViewMode(int inMode, int inValue) {
 
 ZORPixelImage::ZORPixelImage(int inWidth, int inHeight, std::vector<std::uint8_t> inPixels)
     : width_(inWidth), height_(inHeight), pixels_(std::move(inPixels)) {}
-ZORPixelImage::~ZORPixelImage() { Note("pixels released"); }
+ZORPixelImage::~ZORPixelImage() { calls += "pixels released;"; }
 HRESULT ZORPixelImage::Prepare(int inDepth) {
   Note("prepare " + std::to_string(inDepth));
   return S_OK;
