@@ -32,7 +32,7 @@ install(FILES src/default_platform/InterferenceScene.h src/default_platform/Open
 install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit FILES_MATCHING PATTERN "*.h"
   PATTERN "detection" EXCLUDE
   REGEX "/(DrawingWorkers|ElementWalk|PageMaker|PictureStore|PublishedFiles|ShippedTexts)[.]h$" EXCLUDE
-  REGEX "/exchange/(BcfNames|ExchangeLibrary)[.]h$" EXCLUDE
+  REGEX "/exchange/(BcfNames|BcfPictures|BcfTopics|DocumentTimes|ExchangeLibrary|ExchangeXml|SheetBase|XmlText)[.]h$" EXCLUDE
   REGEX "/review/(Assignment|Frames|HashInput|LanguageWords|PlaceClusters|ProductMatch|ReviewSource|TomlFile)[.]h$" EXCLUDE)
 install(FILES src/toolkit/detection/Detect.h DESTINATION ${headerDir}/toolkit/detection)
 install(FILES ${PROJECT_BINARY_DIR}/generated/ZORLyraExport.h ${PROJECT_BINARY_DIR}/generated/ZORPlatformExport.h

@@ -219,6 +219,105 @@ TEST(ReviewImport, SaysWhatItDoesNotKnow) {
               AllOf(HasSubstr("the topic \"Theirs\" is of no interference"), HasSubstr("0 known")));
 }
 
+TEST(ConvertToXlsx, WritesTypedCellsForEditing) {
+  const TemporaryDirectory folder;
+  const std::string file = folder.Path("a.xlsx");
+  const json written =
+      json::parse(Lyra({"convert", kResult, "--to", "xlsx", "--json", "-o", file}));
+  EXPECT_EQ(written["interferences"], 32);
+  EXPECT_EQ(written["pictures"], 0);
+  const auto entries = ReadArchive(file);
+  const std::string& sheet = entries.at("xl/worksheets/sheet1.xml");
+  EXPECT_THAT(sheet, AllOf(HasSubstr("state=\"frozen\""), HasSubstr("<autoFilter ref=\"A1:S33\""),
+                           HasSubstr("\"Not inspected,Relevant,Irrelevant\""),
+                           HasSubstr("<c r=\"B2\""), HasSubstr("<v>178</v>")));
+  EXPECT_THAT(sheet, HasSubstr("<cfRule type=\"cellIs\""));
+  for (const char* name : {"Interferences", "Summary", "Products", "Groups"})
+    EXPECT_THAT(entries.at("xl/workbook.xml"), HasSubstr("<sheet name=\"" + std::string(name)));
+  EXPECT_TRUE(entries.contains("xl/charts/chart1.xml"));
+  const std::string again = ReadBytes(file);
+  Lyra({"convert", kResult, "--to", "xlsx", "-o", file});
+  EXPECT_EQ(again, ReadBytes(file));
+  // What would be a formula is a text, and characters that XML has not come back.
+  const std::string hostile = "tests/golden/inputs/hostile.xml";
+  Lyra({"convert", hostile, "--to", "xlsx", "-o", file});
+  EXPECT_THAT(ReadArchive(file).at("xl/worksheets/sheet1.xml"), Not(HasSubstr("<f>")));
+  EXPECT_THAT(Lyra({"review", "import", hostile, file, "-o", folder.Path("r.json")}),
+              HasSubstr(" 0 changed"));
+}
+
+TEST(ConvertToXlsx, HasThumbnailsOfAModelOrOfAPage) {
+  const TemporaryDirectory folder;
+  const std::string file = folder.Path("a.xlsx"), page = folder.Path("page");
+  EXPECT_THAT(Lyra({"convert", kResult, "--to", "xlsx", "--only", "status=irrelevant", "--model",
+                    "samples/as1-oc-214.stp", "-o", file}),
+              HasSubstr("3 interferences, 3 with a picture"));
+  EXPECT_THAT(NamesIn(file, ".png"), SizeIs(3));
+  Lyra({"publish", kResult, "--only", "status=irrelevant", "--size", "60x40", "--model",
+        "samples/as1-oc-214.stp", "-o", page});
+  EXPECT_THAT(Lyra({"convert", kResult, "--to", "xlsx", "--page", page, "-o", file}),
+              HasSubstr("32 interferences, 3 with a picture"));
+}
+
+TEST(ReviewImport, BringsCellsOfASheetBack) {
+  const TemporaryDirectory folder;
+  const std::string file = folder.Path("a.xlsx"), review = folder.Path("r.json");
+  Lyra({"convert", kResult, "--to", "xlsx", "-o", file});
+  Entries entries;
+  for (auto& [name, bytes] : ReadArchive(file)) {
+    if (name == "xl/worksheets/sheet1.xml") {
+      const std::size_t first = bytes.find("<row r=\"2\""), second = bytes.find("<row r=\"3\"");
+      bytes.erase(first, second - first);
+      const std::size_t third = bytes.find("<row r=\"4\"");
+      bytes = bytes.substr(0, third) +
+              Replaced(Replaced(bytes.substr(third), "Not inspected", "irrelevant"),
+                       "to be checked with the supplier", "checked &amp; &lt;fine&gt;");
+    }
+    entries.emplace_back(name, bytes);
+  }
+  const auto expectEntry = [&](const std::string& inFile) {
+    Lyra({"review", "import", kResult, inFile, "-o", review});
+    const json changed = json::parse(ReadFile(review))["entries"];
+    ASSERT_THAT(changed, SizeIs(1));
+    EXPECT_EQ(changed[0]["index"], 3);
+    EXPECT_EQ(changed[0]["status"], "Irrelevant");
+    EXPECT_EQ(changed[0]["baseStatus"], "Not inspected");
+    EXPECT_EQ(changed[0]["comment"], "checked & <fine>");
+  };
+  expectEntry(WriteArchive("edited.xlsx", entries));
+  std::string csv = Lyra({"convert", kResult, "--to", "csv"});
+  csv =
+      Replaced(csv, "Not inspected,to be checked with the supplier", "IRRELEVANT,checked & <fine>");
+  expectEntry(folder.Write("edited.csv", csv));
+  // As a German spreadsheet saves it, with other columns in front, and only those that matter.
+  expectEntry(folder.Write(
+      "german.csv", "\xEF\xBB\xBF\"N\";Comment;STATUS;id\r\n9;\"checked & <fine>\";Irrelevant;" +
+                        ListOf(kResult)[2]["id"].get<std::string>() + "\r\n"));
+  Lyra({"review", "apply", kResult, review, "-o", folder.Path("result.xml")});
+  EXPECT_EQ(ListOf(folder.Path("result.xml"))[2]["comment"], "checked & <fine>");
+  EXPECT_THAT(
+      RunCommand({"review", "import", kResult, folder.Write("x.csv", "a,b\n1,2\n"), "-o", "-"})
+          .error,
+      HasSubstr("has no columns \"Id\""));
+}
+
+TEST(ConvertToXlsx, IsOpenedByAnotherSpreadsheet) {
+  if (RunShell("command -v soffice >/dev/null").code != 0)
+    GTEST_SKIP() << "libreoffice-calc-nogui is not installed";
+  const TemporaryDirectory folder;
+  const std::string file = folder.Path("a.xlsx");
+  Lyra({"convert", kResult, "--to", "xlsx", "-o", file});
+  for (const std::string format : {"pdf", "csv"}) {
+    const CommandResult made =
+        RunShell("HOME='" + folder.Path("") + "' soffice --headless --convert-to " + format +
+                 " --outdir '" + folder.Path("") + "' '" + file + "'");
+    EXPECT_EQ(made.code, 0) << made.error;
+  }
+  EXPECT_THAT(ReadFile(folder.Path("a.pdf")), StartsWith("%PDF"));
+  EXPECT_THAT(Lyra({"review", "import", kResult, folder.Path("a.csv"), "-o", folder.Path("r")}),
+              HasSubstr("32 known, 0 changed"));
+}
+
 TEST(ConvertToBcf, RefusesWhatCannotBeWritten) {
   const TemporaryDirectory folder;
   const auto refusal = [&](std::vector<std::string> inRest) {

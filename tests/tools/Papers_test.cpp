@@ -199,9 +199,10 @@ TEST(BashCompletion, OffersTheWordsAfterAnEqualsSign) {
 }
 
 TEST(BashCompletion, FindsTheVerbBehindTheLanguage) {
-  EXPECT_THAT(InBash({"lyra", "--lang", "fr", "convert", "--to", ""}), ElementsAre("json", "bcf"));
+  EXPECT_THAT(InBash({"lyra", "--lang", "fr", "convert", "--to", ""}),
+              ElementsAre("json", "bcf", "xlsx", "csv"));
   EXPECT_THAT(InBash({"lyra", "--lang", "=", "fr", "convert", "--to", ""}),
-              ElementsAre("json", "bcf"));
+              ElementsAre("json", "bcf", "xlsx", "csv"));
 }
 
 TEST(BashCompletion, LeavesFilesToTheShell) {
@@ -257,7 +258,7 @@ TEST(FishCompletion, HasEveryOptionOfEveryVerb) {
 TEST(FishCompletion, OffersVerbsOptionsAndWords) {
   if (!HasShell("fish")) GTEST_SKIP() << "there is no fish";
   EXPECT_EQ(InFish("lyra "), Verbs());
-  EXPECT_THAT(InFish("lyra --lang fr convert --to "), ElementsAre("bcf", "json"));
+  EXPECT_THAT(InFish("lyra --lang fr convert --to "), ElementsAre("bcf", "csv", "json", "xlsx"));
   EXPECT_THAT(InFish("lyra list --type c"), ElementsAre("clash", "clearance", "contact"));
   EXPECT_THAT(InFish("lyra render --k"), ElementsAre("--keep-background"));
 }

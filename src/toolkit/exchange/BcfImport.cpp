@@ -1,9 +1,9 @@
 #include <algorithm>
-#include <sstream>
 #include <unordered_map>
 
 #include "toolkit/exchange/BcfTopics.h"
 #include "toolkit/exchange/ReviewImport.h"
+#include "toolkit/exchange/SheetBase.h"
 #include "toolkit/review/Match.h"
 
 namespace ZORToolkit {
@@ -15,14 +15,6 @@ std::string Lower(std::string inText) {
                                           : static_cast<char>(inByte);
   });
   return inText;
-}
-
-/// White space counts as one blank, and not at all at the ends: tools rewrap texts.
-std::string Collapsed(const std::string& inText) {
-  std::istringstream words(inText);
-  std::string text;
-  for (std::string word; words >> word;) text.append(text.empty() ? "" : " ").append(word);
-  return text;
 }
 
 bool HasLine(const std::string& inText, const std::string& inLine) {

@@ -90,6 +90,31 @@ std::optional<PictureSize> SizeOfPng(const std::string& inPath) {
   return PictureSize{number(16), number(20)};
 }
 
+/// Looks for the frame's header among the segments (ITU T.81, annex B).
+std::optional<PictureSize> SizeOfPicture(const std::string& inPath) {
+  if (const std::optional<PictureSize> size = SizeOfPng(inPath)) return size;
+  std::ifstream file(inPath, std::ios::binary);
+  const auto byte = [&] { return static_cast<int>(static_cast<unsigned char>(file.get())); };
+  const auto number = [&] {
+    const int high = byte();
+    return high << 8 | byte();
+  };
+  if (!file || number() != 0xFFD8) return std::nullopt;
+  while (file && byte() == 0xFF) {
+    const int marker = byte();
+    const int length = number();
+    const bool isFrame =
+        marker >= 0xC0 && marker <= 0xCF && marker != 0xC4 && marker != 0xC8 && marker != 0xCC;
+    if (isFrame) {
+      byte();  // the precision
+      const int height = number();
+      return PictureSize{number(), height};
+    }
+    file.seekg(length - 2, std::ios::cur);
+  }
+  return std::nullopt;
+}
+
 std::string WhitePng() {
   static constexpr unsigned char kBytes[] = {
       0x89, 0x50, 0x4e, 0x47, 0x0d, 0x0a, 0x1a, 0x0a, 0x00, 0x00, 0x00, 0x0d, 0x49, 0x48,
@@ -108,12 +133,19 @@ SnapshotMaker::~SnapshotMaker() {
   if (!folder_.empty()) fs::remove_all(folder_, ignored);
 }
 
+std::string SnapshotMaker::PagePicture(int inNumber) const {
+  for (const char* const ending : {".png", ".jpg"}) {
+    const fs::path path = fs::path(options_.page) / "pictures" /
+                          ("interference_" + std::to_string(inNumber) + ending);
+    if (fs::exists(path)) return path.string();
+  }
+  return {};
+}
+
 std::string SnapshotMaker::ReadyPicture(const InterferenceRecord& inRecord, bool inHasModel) const {
   std::string path;
   if (!options_.page.empty())
-    path = (fs::path(options_.page) / "pictures" /
-            ("interference_" + std::to_string(inRecord.index) + ".png"))
-               .string();
+    path = PagePicture(inRecord.index);
   else if (!inHasModel && !inRecord.picture.empty())
     path = (resultFolder_ / inRecord.picture).string();
   if (path.empty()) return {};

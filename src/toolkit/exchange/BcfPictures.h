@@ -39,6 +39,8 @@ class SnapshotMaker {
   /// @return one for each record, in their order.
   std::vector<Snapshot> Make(const std::vector<const InterferenceRecord*>& inRecords,
                              const std::function<ZORIProduct_var()>& inOpenModel);
+  /// The picture of an interference on the published page; empty when there is none.
+  std::string PagePicture(int inNumber) const;
 
  private:
   std::string ReadyPicture(const InterferenceRecord& inRecord, bool inHasModel) const;
@@ -52,6 +54,8 @@ class SnapshotMaker {
 
 /// The size of a PNG picture; nothing for another file.
 std::optional<PictureSize> SizeOfPng(const std::string& inPath);
+/// The same of a PNG or a JPEG picture.
+std::optional<PictureSize> SizeOfPicture(const std::string& inPath);
 
 /// A white picture of one pixel.
 std::string WhitePng();

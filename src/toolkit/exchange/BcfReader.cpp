@@ -1,19 +1,13 @@
 #include <algorithm>
-#include <cctype>
 #include <map>
-#include <memory>
 #include <set>
 
 #include "foundation/PluginLoader.h"
 #include "foundation/ReadWholeFile.h"
-#include "platform/xml/DOMParser.h"
-#include "platform/xml/ZORXMLParseError.h"
-#include "platform/xml/ZORXMLParser.h"
-#include "toolkit/Error.h"
 #include "toolkit/exchange/BcfFile.h"
 #include "toolkit/exchange/BcfNames.h"
 #include "toolkit/exchange/ExchangeLibrary.h"
-#include "toolkit/records/ElementWalk.h"
+#include "toolkit/exchange/ExchangeXml.h"
 #include "toolkit/records/InterferenceRecord.h"
 
 namespace ZORToolkit {
@@ -28,14 +22,6 @@ void* ExchangeFunction(const char* inName) {
 
 namespace {
 
-std::string LowerCase(std::string_view inText) {
-  std::string text(inText);
-  std::ranges::transform(text, text.begin(), [](unsigned char inByte) {
-    return static_cast<char>(std::tolower(inByte));
-  });
-  return text;
-}
-
 std::string FileName(std::string_view inName) {
   return std::string(inName.substr(inName.rfind('/') + 1));
 }
@@ -43,56 +29,6 @@ std::string FileName(std::string_view inName) {
 std::string FolderOf(const std::string& inName) {
   const std::size_t slash = inName.rfind('/');
   return slash == std::string::npos ? "" : inName.substr(0, slash);
-}
-
-DOM_Node ParseXml(const std::string& inName, const std::string& inBytes) {
-  InputSource* made = nullptr;
-  const HRESULT result = ZORXMLParser::CreateMemBufInputSource(
-      reinterpret_cast<const unsigned char*>(inBytes.data()),
-      static_cast<unsigned int>(inBytes.size()), FromUtf8(inName), 0, made);
-  const std::unique_ptr<InputSource> source(made);
-  if (FAILED(result)) throw Error(inName + ": is too large");
-  DOMParser parser;
-  try {
-    parser.parse(*source);
-  } catch (const ZORXMLParseError& error) {
-    throw Error(inName + ":" + std::to_string(error.line) + ":" + std::to_string(error.column) +
-                ": " + error.reason);
-  }
-  if (!parser.getDocument().getDoctype().isNull())
-    throw Error(inName + ": has a document type, which no file of BCF has");
-  return parser.getDocument().getDocumentElement();
-}
-
-// Some writers give every element a prefix.
-std::string LocalName(const DOM_Node& inElement) {
-  const std::string name = Utf8(inElement.getNodeName().DOMStringToZORUnicodeString());
-  return name.substr(name.find(':') + 1);
-}
-
-template <class Visit>
-void ForEachLocal(const DOM_Node& inParent, const char* inName, const Visit& inVisit) {
-  ForEachElement(inParent, nullptr, [&](const DOM_Node& inChild) {
-    if (LocalName(inChild) == inName) inVisit(inChild);
-  });
-}
-
-DOM_Node Child(const DOM_Node& inParent, const char* inName) {
-  DOM_Node found;
-  ForEachLocal(inParent, inName, [&](const DOM_Node& inChild) {
-    if (found.isNull()) found = inChild;
-  });
-  return found;
-}
-
-/// All text inside an element.
-std::string TextOf(const DOM_Node& inElement) {
-  std::string text;
-  for (DOM_Node child = inElement.getFirstChild(); !child.isNull(); child = child.getNextSibling())
-    if (child.getNodeType() == DOM_Node::TEXT_NODE ||
-        child.getNodeType() == DOM_Node::CDATA_SECTION_NODE)
-      text += Utf8(child.getNodeValue().DOMStringToZORUnicodeString());
-  return text;
 }
 
 /// Without the white space around it, as names, words and numbers are meant.

@@ -55,6 +55,60 @@ typedef std::array<unsigned char, 16> Uuid;
 typedef void NameUuidFunction(const Uuid& inNamespace, const std::string& inName, Uuid& outUuid);
 inline constexpr char kNameUuidName[] = "ZORNameUuid";
 
+// Spreadsheets
+
+struct SheetColumn {
+  std::string header;
+  double width = 10;  ///< characters
+  bool isHidden = false, isEditable = false;
+};
+
+/// Cells that may hold some words only, or are coloured by the word that they hold.
+struct SheetWords {
+  std::size_t column = 0;
+  std::vector<std::string> words;
+  std::vector<std::uint32_t> colours;  ///< 0xRRGGBB of each word; empty for none
+  bool isChoice = false;               ///< a list of the words is offered, and others are refused
+};
+
+/// Bars beside a list of words and numbers.
+struct SheetChart {
+  std::string title;
+  std::size_t firstRow = 0, lastRow = 0, wordColumn = 0, numberColumn = 1, row = 0, column = 0;
+};
+
+struct SheetLayout {
+  std::string name;
+  std::vector<SheetColumn> columns;  ///< with a frozen header and a filter
+  std::size_t rows = 0;              ///< below the header
+  std::vector<SheetWords> words;
+  std::vector<SheetChart> charts;
+  double rowHeight = 0;  ///< points; 0 for the usual
+};
+
+/// Writes sheet after sheet, row after row from the top: nothing is kept of a row but on disk.
+class SpreadsheetWriter {
+ public:
+  virtual ~SpreadsheetWriter() = default;
+  virtual void AddSheet(const SheetLayout& inLayout) = 0;
+  // Of the last sheet; rows from 0, below the header
+  virtual void Text(std::size_t inRow, std::size_t inColumn, const std::string& inText) = 0;
+  virtual void Number(std::size_t inRow, std::size_t inColumn, double inNumber) = 0;
+  /// A PNG or JPEG picture, made as much smaller as the scale says.
+  virtual void Picture(std::size_t inRow, std::size_t inColumn, const std::string& inPath,
+                       double inScale) = 0;
+  /// @return a reason why the file is not written; empty when it is.
+  virtual std::string Finish() = 0;
+};
+
+/// @param inTime of creation, seconds since 1970.
+typedef SpreadsheetWriter* NewSpreadsheetFunction(const std::string& inPath, std::int64_t inTime);
+inline constexpr char kNewSpreadsheetName[] = "ZORNewSpreadsheet";
+
+/// The longest text of a cell, in bytes of UTF-8 that are surely no more characters than fit.
+inline constexpr std::size_t kMaxCellText = 32767;
+inline constexpr std::size_t kMaxSheetRows = 1048575;
+
 /// A function of that library. Raises Error when it is not there.
 void* ExchangeFunction(const char* inName);
 

@@ -42,6 +42,15 @@ struct ImportedReview {
 ZOR_TOOLKIT_EXPORT ImportedReview ImportBcf(const ReviewedResult& inResult, const BcfProject& inBcf,
                                             const GroupOptions& inGrouping);
 
+/// What was done in a sheet: an Office Open XML workbook, or text with commas, semicolons or tabs.
+/// Rows are known by the column "Id" alone, wherever they and their columns are. A status or comment
+/// that is not what the column "Base" says, or the result where there is no such column, was changed;
+/// an empty cell of a comment takes it out, an empty status says nothing.
+/// @param inPath what ends in .xlsx, else text. Raises Error for what is no such file or has no
+///               columns "Id" and "Status" or "Comment".
+ZOR_TOOLKIT_EXPORT ImportedReview ImportSheet(const ReviewedResult& inResult,
+                                              const std::string& inPath);
+
 /// The review file: "zorlyra-review/1".
 /// @param inHash of the result's file, see DocumentHash.
 ZOR_TOOLKIT_EXPORT std::string ReviewFileText(const ImportedReview& inReview,

@@ -1,4 +1,4 @@
-// lyra convert FILE --to json|bcf
+// lyra convert FILE --to json|bcf|xlsx|csv
 #include <algorithm>
 #include <cstdio>
 #include <memory>
@@ -13,14 +13,16 @@
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Progress.h"
 #include "lyra/terminal/SafeText.h"
+#include "lyra/terminal/Table.h"
 #include "toolkit/exchange/BcfWriter.h"
+#include "toolkit/exchange/ResultSheet.h"
 #include "toolkit/review/Match.h"
 
 namespace lyra {
 using namespace ZORToolkit;
 namespace {
 
-constexpr const char* kFormats[] = {"json", "bcf"};
+constexpr const char* kFormats[] = {"json", "bcf", "xlsx", "csv"};
 constexpr const char* kBcfVersions[] = {"2.1", "3.0"};
 
 struct ConvertOptions {
@@ -55,7 +57,6 @@ void WriteInterferences(ClashDocument& ioDocument, Output& ioOutput) {
 
 int ConvertToJson(const ConvertOptions& inOptions, Output& ioOutput) {
   if (!inOptions.output.empty()) throw UsageError("--output: JSON is written to standard output");
-  ChooseLanguage(inOptions.language);
   ClashDocument document(inOptions.file);
   ioOutput.Write("{\"info\":" + JsonText(ReadDocument(document)));
   WriteInterferences(document, ioOutput);
@@ -68,6 +69,8 @@ int ConvertToJson(const ConvertOptions& inOptions, Output& ioOutput) {
 
 // BCF
 
+int ProcessCount() { return static_cast<int>(std::max(1U, std::thread::hardware_concurrency())); }
+
 BcfOptions BcfOptionsOf(const ConvertOptions& inOptions) {
   BcfOptions options;
   options.version =
@@ -79,74 +82,158 @@ BcfOptions BcfOptionsOf(const ConvertOptions& inOptions) {
     throw UsageError("--size: a picture in a BCF file has at most " +
                      std::to_string(kMaxSnapshotSize) + " pixels a side");
   options.page = inOptions.page;
-  options.processes = static_cast<int>(std::max(1U, std::thread::hardware_concurrency()));
+  options.processes = ProcessCount();
   return options;
 }
 
-/// What became of the result: as a list for a person, or as JSON.
-std::string WrittenText(const ConvertOptions& inOptions, const BcfWritten& inWritten) {
-  if (inOptions.json) {
-    OrderedJson notCarried = OrderedJson::array();
-    for (const NotCarried& each : inWritten.notCarried)
-      notCarried.push_back({{"what", each.what}, {"count", each.count}, {"kept", each.kept}});
+OrderedJson ToJson(const std::vector<NotCarried>& inNotCarried) {
+  OrderedJson rows = OrderedJson::array();
+  for (const NotCarried& each : inNotCarried)
+    rows.push_back({{"what", each.what}, {"count", each.count}, {"kept", each.kept}});
+  return rows;
+}
+
+std::string TextOf(const std::vector<NotCarried>& inNotCarried, const std::string& inFormat) {
+  std::string text = inNotCarried.empty() ? "" : inFormat + " has no place for:\n";
+  for (const NotCarried& each : inNotCarried)
+    text += "  " + each.what + " (" + std::to_string(each.count) + ")" +
+            (each.kept.empty() ? "" : ": kept " + each.kept) + "\n";
+  return text;
+}
+
+/// Finishes the file, and says what became of the result where the file does not go.
+void Finish(OutputFile& ioFile, const ConvertOptions& inOptions, const std::string& inReport,
+            Output& ioOutput) {
+  ioFile.Finish(ioOutput);
+  if (inOptions.output == "-")
+    std::fputs(inReport.c_str(), stderr);
+  else
+    ioOutput.Write(inReport);
+}
+
+std::string ReportOf(const ConvertOptions& inOptions, const BcfWritten& inWritten) {
+  if (inOptions.json)
     return JsonLine({{"format", "bcf"},
                      {"version", inOptions.bcfVersion},
                      {"file", inOptions.output},
                      {"topics", inWritten.topics},
                      {"interferences", inWritten.interferences},
                      {"pictures", inWritten.pictures},
-                     {"notCarried", notCarried},
+                     {"notCarried", ToJson(inWritten.notCarried)},
                      {"warnings", inWritten.warnings}}) +
            "\n";
-  }
-  std::string text =
-      Printable(inOptions.output + ": " + std::to_string(inWritten.topics) + " topics of " +
-                std::to_string(inWritten.interferences) + " interferences, " +
-                std::to_string(inWritten.pictures) + " with a picture of their products") +
-      "\n";
-  if (!inWritten.notCarried.empty()) text += "BCF has no place for:\n";
-  for (const NotCarried& each : inWritten.notCarried)
-    text += "  " + each.what + " (" + std::to_string(each.count) + "): kept " + each.kept + "\n";
-  return text;
+  return Printable(inOptions.output + ": " + std::to_string(inWritten.topics) + " topics of " +
+                   std::to_string(inWritten.interferences) + " interferences, " +
+                   std::to_string(inWritten.pictures) + " with a picture of their products") +
+         "\n" + TextOf(inWritten.notCarried, "BCF");
 }
 
-int ConvertToBcf(const ConvertOptions& inOptions, Output& ioOutput) {
-  if (inOptions.output.empty()) throw UsageError("--to bcf: --output must name the file");
-  BcfOptions options = BcfOptionsOf(inOptions);
-  inOptions.reading.Check();
-  ChooseLanguage(inOptions.language);
-  options.resultBytes = BytesOfInput(inOptions.file);
-  ClashDocument document(inOptions.file, options.resultBytes);
-  OutputFile file(inOptions.output);
-  BcfWritten written;
-  {
-    std::optional<DrawingProgress> progress;
-    options.drawn = [&](std::size_t inDone, std::size_t inAll) {
-      if (progress) progress->Show(inDone, inAll);
-    };
-    const auto openModel = [&] {
-      const ZORIProduct_var root = OpenModelFile(inOptions.model, inOptions.reading).root;
-      progress.emplace();
+/// The document, and the model where pictures are to show one, with the progress of drawing.
+class Conversion {
+ public:
+  explicit Conversion(const ConvertOptions& inOptions)
+      : options_(inOptions),
+        bytes_(BytesOfInput(inOptions.file)),
+        document_(inOptions.file, bytes_),
+        file_(inOptions.output) {}
+
+  const std::string& Bytes() const { return bytes_; }
+  ClashDocument& Document() { return document_; }
+  OutputFile& File() { return file_; }
+  std::function<ZORIProduct_var()> ModelOpener() {
+    if (options_.model.empty()) return {};
+    return [this] {
+      const ZORIProduct_var root = OpenModelFile(options_.model, options_.reading).root;
+      progress_.emplace();
       return root;
     };
-    written = WriteBcf(document, options,
-                       inOptions.model.empty() ? std::function<ZORIProduct_var()>() : openModel,
-                       file.Path());
   }
+  std::function<void(std::size_t, std::size_t)> Drawn() {
+    return [this](std::size_t inDone, std::size_t inAll) {
+      if (progress_) progress_->Show(inDone, inAll);
+    };
+  }
+  void EndProgress() { progress_.reset(); }
+
+ private:
+  const ConvertOptions& options_;
+  std::string bytes_;
+  ClashDocument document_;
+  OutputFile file_;
+  std::optional<DrawingProgress> progress_;
+};
+
+int ConvertToBcf(const ConvertOptions& inOptions, Output& ioOutput) {
+  BcfOptions options = BcfOptionsOf(inOptions);
+  Conversion conversion(inOptions);
+  options.resultBytes = conversion.Bytes();
+  options.drawn = conversion.Drawn();
+  const BcfWritten written =
+      WriteBcf(conversion.Document(), options, conversion.ModelOpener(), conversion.File().Path());
+  conversion.EndProgress();
   for (const std::string& warning : written.warnings)
     std::fprintf(stderr, "lyra: warning: %s\n", Printable(warning).c_str());
-  file.Finish(ioOutput);
-  const std::string text = WrittenText(inOptions, written);
-  if (inOptions.output == "-")
-    std::fputs(text.c_str(), stderr);
-  else
-    ioOutput.Write(text);
+  Finish(conversion.File(), inOptions, ReportOf(inOptions, written), ioOutput);
+  return 0;
+}
+
+// Sheets
+
+int ConvertToXlsx(const ConvertOptions& inOptions, Output& ioOutput) {
+  SpreadsheetOptions options;
+  options.filter = FilterOfConditions(inOptions.only);
+  options.grouping = inOptions.grouping.Get();
+  options.page = inOptions.page;
+  options.processes = ProcessCount();
+  Conversion conversion(inOptions);
+  options.drawn = conversion.Drawn();
+  const SpreadsheetWritten written = WriteSpreadsheet(
+      conversion.Document(), options, conversion.ModelOpener(), conversion.File().Path());
+  conversion.EndProgress();
+  const std::string report =
+      inOptions.json
+          ? JsonLine({{"format", "xlsx"},
+                      {"file", inOptions.output},
+                      {"interferences", written.interferences},
+                      {"pictures", written.pictures},
+                      {"notCarried", ToJson(written.notCarried)},
+                      {"warnings", OrderedJson::array()}}) +
+                "\n"
+          : Printable(inOptions.output + ": " + std::to_string(written.interferences) +
+                      " interferences, " + std::to_string(written.pictures) + " with a picture") +
+                "\n" + TextOf(written.notCarried, "A sheet");
+  Finish(conversion.File(), inOptions, report, ioOutput);
+  return 0;
+}
+
+int ConvertToCsv(const ConvertOptions& inOptions, Output& ioOutput) {
+  if (!inOptions.output.empty()) throw UsageError("--output: CSV is written to standard output");
+  const RecordFilter filter = FilterOfConditions(inOptions.only);
+  ClashDocument document(inOptions.file);
+  document.RequireInterferences();
+  ioOutput.Write(CsvRow(SheetHeaders()));
+  std::vector<std::string> cells;
+  ForEachSheetRow(document, filter, [&](const std::vector<SheetCell>& inCells) {
+    cells.clear();
+    for (const SheetCell& cell : inCells) {
+      const std::string text = cell.number ? Number(*cell.number).text : cell.text;
+      cells.push_back(ioOutput.IsTerminal() ? Printable(text) : text);
+    }
+    ioOutput.Write(CsvRow(cells));
+  });
   return 0;
 }
 
 int Convert(const ConvertOptions& inOptions, Output& ioOutput) {
-  constexpr int (*kConvert[])(const ConvertOptions&, Output&) = {ConvertToJson, ConvertToBcf};
-  return kConvert[ChosenWord("--to", inOptions.format, kFormats)](inOptions, ioOutput);
+  constexpr int (*kConvert[])(const ConvertOptions&, Output&) = {ConvertToJson, ConvertToBcf,
+                                                                 ConvertToXlsx, ConvertToCsv};
+  const std::size_t format = ChosenWord("--to", inOptions.format, kFormats);
+  const bool isFile = inOptions.format == "bcf" || inOptions.format == "xlsx";
+  if (isFile && inOptions.output.empty())
+    throw UsageError("--to " + inOptions.format + ": --output must name the file");
+  inOptions.reading.Check();
+  ChooseLanguage(inOptions.language);
+  return kConvert[format](inOptions, ioOutput);
 }
 
 }  // namespace
@@ -155,25 +242,26 @@ VerbAction DeclareConvert(Arguments& ioArguments) {
   const auto options = std::make_shared<ConvertOptions>();
   ioArguments.Positional("FILE", options->file, "Any clash result, or - for standard input");
   ioArguments.RequiredText("--to", "FORMAT", options->format,
-                           "json: all of it in one document; bcf: a topic for each interference");
+                           "json: all of it in one document; bcf: a topic for each interference; "
+                           "xlsx: a workbook; csv: its rows");
   ioArguments.Words("--to", kFormats);
   ioArguments.NonEmptyText("-o,--output", "OUT", options->output,
-                           "bcf: the file to write, or - for standard output");
+                           "bcf, xlsx: the file to write, or - for standard output");
   ioArguments.Text("--bcf-version", "VERSION", options->bcfVersion, "bcf: 2.1 (default) or 3.0");
   ioArguments.Words("--bcf-version", kBcfVersions);
   ioArguments.Flag("--group", options->isGrouped,
                    "bcf: a topic for each group, as lyra group makes them");
   options->grouping.Declare(ioArguments);
   ioArguments.NonEmptyText("--model", "MODEL", options->model,
-                           "bcf: the model that the pictures show");
+                           "bcf, xlsx: the model that pictures show");
   ioArguments.NonEmptyText("--page", "DIR", options->page,
-                           "bcf: a published page whose PNG pictures are taken");
+                           "bcf, xlsx: a published page whose pictures are taken");
   ioArguments.Text("--size", "WxH", options->size,
                    "bcf: width and height of a picture in pixels (default: 756x506)");
   ioArguments.Texts(
       "--only", "CONDITIONS", options->only,
-      "bcf: only some, such as type=clash,status=relevant; also result= and product=");
-  ioArguments.Flag("--json", options->json, "bcf: print what became of the result as JSON");
+      "Not for json: only some, such as type=clash,status=relevant; also result= and product=");
+  ioArguments.Flag("--json", options->json, "bcf, xlsx: print what became of the result as JSON");
   options->reading.Declare(ioArguments);
   ioArguments.Language(options->language);
   return [options](Output& ioOutput) { return Convert(*options, ioOutput); };

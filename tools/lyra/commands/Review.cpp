@@ -220,7 +220,7 @@ VerbAction DeclareReview(Arguments& ioArguments) {
   ioArguments.Positionals(
       "FILE", options->files,
       "set: RESULT; apply: RESULT REVIEW.json; merge: BASE MINE THEIRS; import: "
-      "RESULT FILE.bcf");
+      "RESULT and FILE.bcf, .xlsx or .csv");
   ioArguments.RequiredText("-o,--output", "OUT", options->output,
                            "Where the result, or the review file of import, is written");
   ioArguments.Texts("--only", "CONDITIONS", options->only,

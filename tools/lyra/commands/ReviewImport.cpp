@@ -7,10 +7,17 @@
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/SafeText.h"
 #include "toolkit/exchange/ReviewImport.h"
+#include "toolkit/records/RecordFilter.h"
 
 namespace lyra {
 using namespace ZORToolkit;
 namespace {
+
+bool IsSheet(const std::string& inFile) {
+  const std::string name = CaseFolded(inFile);
+  const auto ends = [&](const char* inEnding) { return name.ends_with(inEnding); };
+  return ends(".xlsx") || ends(".csv") || ends(".tsv") || ends(".txt");
+}
 
 /// What became of the work, where the review file does not go.
 void Report(const ReviewImportOptions& inOptions, const ImportedReview& inReview,
@@ -38,7 +45,9 @@ void Report(const ReviewImportOptions& inOptions, const ImportedReview& inReview
 int ImportReview(const ReviewImportOptions& inOptions, Output& ioOutput) {
   ReviewInput input(inOptions.result);
   const ImportedReview review =
-      ImportBcf(input.result, ReadBcf(inOptions.file), inOptions.grouping);
+      IsSheet(inOptions.file)
+          ? ImportSheet(input.result, inOptions.file)
+          : ImportBcf(input.result, ReadBcf(inOptions.file), inOptions.grouping);
   OutputFile output(inOptions.output);
   ZORFoundation::WriteWholeFile(output.Path(), ReviewFileText(review, DocumentHash(input.bytes)));
   output.Finish(ioOutput);
