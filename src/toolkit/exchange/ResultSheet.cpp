@@ -46,18 +46,17 @@ const std::vector<std::string> kStatuses = {"Not inspected", "Relevant", "Irrele
 const std::vector<std::uint32_t> kStatusColours = {0xEDEDED, 0xF4B084, 0xC6E0B4};
 
 /// As much as a cell takes, cut between characters.
-std::string Fitting(const std::string& inText) {
-  if (inText.size() <= kMaxCellText) return inText;
+std::string Fitting(std::string_view inText) {
+  if (inText.size() <= kMaxCellText) return std::string(inText);
   std::size_t end = kMaxCellText;
   while (end > 0 && (inText[end] & 0xC0) == 0x80) --end;
-  return inText.substr(0, end);
+  return std::string(inText.substr(0, end));
 }
 
-/// A coordinate of the mean of the points, without what the mean's rounding leaves.
-std::optional<double> PlaceOf(const ReviewRecord& inRecord, std::size_t inAxis) {
+/// A coordinate, without what the rounding of a mean leaves.
+double Rounded(double inCoordinate) {
   constexpr double kDigits = 1e6;
-  if (!inRecord.place) return std::nullopt;
-  return std::round((*inRecord.place)[inAxis] * kDigits) / kDigits + 0.0;
+  return std::round(inCoordinate * kDigits) / kDigits + 0.0;
 }
 
 SheetCell CellOf(const Number& inNumber) { return {inNumber.text, inNumber.value}; }
@@ -92,7 +91,7 @@ class RowMaker {
     const auto& [first, second] = inRecord.products;
     const std::string comment = Fitting(review.comment);
     cells_.clear();
-    const auto text = [&](const std::string& inText) { cells_.push_back({Fitting(inText), {}}); };
+    const auto text = [&](std::string_view inText) { cells_.push_back({Fitting(inText), {}}); };
     text(ids_[position]);
     cells_.push_back({{}, inRecord.index});
     text(inRecord.type);
@@ -106,7 +105,9 @@ class RowMaker {
     text(second.shape);
     text(inRecord.rule.name);
     text(inRecord.rule.severity);
-    for (std::size_t i = 0; i < 3; ++i) cells_.push_back({{}, PlaceOf(review, i)});
+    const std::optional<Position> place = result_.PlaceOf(review);
+    for (std::size_t i = 0; i < 3; ++i)
+      cells_.push_back({{}, place ? std::optional(Rounded((*place)[i])) : std::nullopt});
     text(inRecord.result);
     text(inRecord.computationCase);
     text(BaseOf(review.status, comment));
@@ -127,7 +128,7 @@ struct Counts {
     ++all;
     const auto type = std::ranges::find(kTypes, inRecord.type);
     if (type != kTypes.end()) ++byType[type - kTypes.begin()];
-    const std::optional<double>& value = inRecord.value.value;
+    const std::optional<double> value = inRecord.value.Value();
     if (value) worst = std::min(*value, worst.value_or(*value));
   }
 };
@@ -239,7 +240,7 @@ class WorkbookMaker {
 
   void Count(const ReviewRecord& inRecord) {
     all_.Add(inRecord);
-    byStatus_[inRecord.status].Add(inRecord);
+    byStatus_[std::string(inRecord.status)].Add(inRecord);
     for (std::size_t i = 0; i < 2; ++i)
       if (inRecord.products[i] >= 0 && (i == 0 || inRecord.products[0] != inRecord.products[1]))
         byProduct_[inRecord.products[i]].Add(inRecord);
@@ -262,7 +263,7 @@ class WorkbookMaker {
     for (const auto& [status, counts] : byStatus_) WriteCounts(row++, status, 0, counts);
   }
 
-  void WriteCounts(std::size_t inRow, const std::string& inName, std::size_t inColumn,
+  void WriteCounts(std::size_t inRow, std::string_view inName, std::size_t inColumn,
                    const Counts& inCounts) {
     book_->Text(inRow, inColumn, Fitting(inName));
     book_->Number(inRow, inColumn + 1, inCounts.all);

@@ -4,6 +4,7 @@
 
 #include <sstream>
 #include <string>
+#include <string_view>
 
 #include "foundation/Hash.h"
 
@@ -12,21 +13,21 @@ namespace ZORToolkit {
 inline constexpr char kBaseHeader[] = "Base";
 
 /// White space counts as one blank, and not at all at the ends: tools rewrap texts.
-inline std::string Collapsed(const std::string& inText) {
-  std::istringstream words(inText);
+inline std::string Collapsed(std::string_view inText) {
+  std::istringstream words{std::string(inText)};
   std::string text;
   for (std::string word; words >> word;) text.append(text.empty() ? "" : " ").append(word);
   return text;
 }
 
-inline std::string CommentKey(const std::string& inComment) {
+inline std::string CommentKey(std::string_view inComment) {
   return inComment.empty() ? ""
                            : ZORFoundation::HexText(ZORFoundation::Hash64Of(Collapsed(inComment)));
 }
 
 /// The status and what tells one comment from another.
-inline std::string BaseOf(const std::string& inStatus, const std::string& inComment) {
-  return inStatus + "|" + CommentKey(inComment);
+inline std::string BaseOf(std::string_view inStatus, std::string_view inComment) {
+  return std::string(inStatus).append("|").append(CommentKey(inComment));
 }
 
 }  // namespace ZORToolkit

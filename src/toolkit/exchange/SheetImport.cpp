@@ -247,7 +247,7 @@ class SheetImporter {
     ImportedEntry entry;
     if (columns_->status)
       entry.status = Status(Cell(inRow, columns_->status), record,
-                            hasBase ? base.substr(0, bar) : record.status);
+                            hasBase ? base.substr(0, bar) : std::string(record.status));
     if (columns_->comment) {
       const std::string comment = Cell(inRow, columns_->comment);
       const std::string was = hasBase ? base.substr(bar + 1) : CommentKey(record.comment);
@@ -256,7 +256,7 @@ class SheetImporter {
     }
     if (!entry.status && !entry.comment) return;
     if (entry.status)
-      entry.baseStatus = StatusCalled(hasBase ? base.substr(0, bar) : record.status);
+      entry.baseStatus = StatusCalled(hasBase ? base.substr(0, bar) : std::string(record.status));
     entry.id = inId;
     entry.index = record.index;
     entries_[record.index] = std::move(entry);

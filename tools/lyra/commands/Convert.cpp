@@ -58,7 +58,7 @@ void WriteInterferences(ClashDocument& ioDocument, Output& ioOutput) {
 int ConvertToJson(const ConvertOptions& inOptions, Output& ioOutput) {
   if (!inOptions.output.empty()) throw UsageError("--output: JSON is written to standard output");
   ClashDocument document(inOptions.file);
-  ioOutput.Write("{\"info\":" + JsonText(ReadDocument(document)));
+  ioOutput.Write(JsonHeaderText("convert") + ",\n\"info\":" + JsonText(ReadDocument(document)));
   WriteInterferences(document, ioOutput);
   WriteArray("components", ReadComponents(document), ioOutput);
   WriteArray("specifications", ReadSpecifications(document), ioOutput);
@@ -111,17 +111,29 @@ void Finish(OutputFile& ioFile, const ConvertOptions& inOptions, const std::stri
     ioOutput.Write(inReport);
 }
 
+/// As JSON, with what only one format has.
+std::string JsonReport(const ConvertOptions& inOptions, const OrderedJson& inOfFormat,
+                       std::size_t inInterferences, std::size_t inPictures,
+                       const std::vector<NotCarried>& inNotCarried,
+                       const std::vector<std::string>& inWarnings) {
+  OrderedJson filters = OrderedJson::object();
+  if (!inOptions.only.empty()) filters["only"] = inOptions.only;
+  OrderedJson json = JsonHeader("exchange", filters);
+  json["format"] = inOptions.format;
+  json.update(inOfFormat);
+  json["file"] = inOptions.output;
+  json["interferences"] = inInterferences;
+  json["pictures"] = inPictures;
+  json["notCarried"] = ToJson(inNotCarried);
+  json["warnings"] = inWarnings;
+  return JsonLine(json) + "\n";
+}
+
 std::string ReportOf(const ConvertOptions& inOptions, const BcfWritten& inWritten) {
   if (inOptions.json)
-    return JsonLine({{"format", "bcf"},
-                     {"version", inOptions.bcfVersion},
-                     {"file", inOptions.output},
-                     {"topics", inWritten.topics},
-                     {"interferences", inWritten.interferences},
-                     {"pictures", inWritten.pictures},
-                     {"notCarried", ToJson(inWritten.notCarried)},
-                     {"warnings", inWritten.warnings}}) +
-           "\n";
+    return JsonReport(
+        inOptions, {{"bcfVersion", inOptions.bcfVersion}, {"topics", inWritten.topics}},
+        inWritten.interferences, inWritten.pictures, inWritten.notCarried, inWritten.warnings);
   return Printable(inOptions.output + ": " + std::to_string(inWritten.topics) + " topics of " +
                    std::to_string(inWritten.interferences) + " interferences, " +
                    std::to_string(inWritten.pictures) + " with a picture of their products") +
@@ -192,13 +204,8 @@ int ConvertToXlsx(const ConvertOptions& inOptions, Output& ioOutput) {
   conversion.EndProgress();
   const std::string report =
       inOptions.json
-          ? JsonLine({{"format", "xlsx"},
-                      {"file", inOptions.output},
-                      {"interferences", written.interferences},
-                      {"pictures", written.pictures},
-                      {"notCarried", ToJson(written.notCarried)},
-                      {"warnings", OrderedJson::array()}}) +
-                "\n"
+          ? JsonReport(inOptions, OrderedJson::object(), written.interferences, written.pictures,
+                       written.notCarried, {})
           : Printable(inOptions.output + ": " + std::to_string(written.interferences) +
                       " interferences, " + std::to_string(written.pictures) + " with a picture") +
                 "\n" + TextOf(written.notCarried, "A sheet");

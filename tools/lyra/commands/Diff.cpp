@@ -48,7 +48,7 @@ OrderedJson ToJson(const DiffEntry& inEntry, const std::string& inId) {
 
 void PrintJson(const Compared& inCompared, Output& ioOutput) {
   const std::vector<std::string> ids = inCompared.Ids();
-  std::string begin = "{";
+  std::string begin = JsonHeaderText("diff") + ",\n";
   for (std::size_t i = 0; i < kDiffClassCount; ++i) {
     const auto itsClass = static_cast<DiffClass>(i);
     ioOutput.Write(begin.append("\"").append(Name(itsClass)).append("\":["));

@@ -24,11 +24,12 @@ void Report(const ReviewImportOptions& inOptions, const ImportedReview& inReview
             Output& ioOutput) {
   std::string text;
   if (inOptions.json) {
-    text = JsonLine({{"file", inOptions.file},
-                     {"seen", inReview.seen},
-                     {"changed", inReview.entries.size()},
-                     {"notes", inReview.notes}}) +
-           "\n";
+    OrderedJson json = JsonHeader("import");
+    json["file"] = inOptions.file;
+    json["seen"] = inReview.seen;
+    json["changed"] = inReview.entries.size();
+    json["notes"] = inReview.notes;
+    text = JsonLine(json) + "\n";
   } else {
     for (const std::string& note : inReview.notes) text += "note: " + Printable(note) + "\n";
     text += std::to_string(inReview.seen) + " known, " + std::to_string(inReview.entries.size()) +

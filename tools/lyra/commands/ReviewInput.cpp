@@ -68,6 +68,20 @@ DiffOptions CompareOptions::Get() const {
   return options;
 }
 
+OrderedJson JsonHeader(const char* inName, const OrderedJson& inFilters) {
+  return {{"$schema", std::string("urn:zorlyra:schema:").append(inName)},
+          {"version", 1},
+          {"units", {{"length", "mm"}}},
+          {"tool", {{"name", "lyra"}, {"version", LYRA_VERSION}}},
+          {"filters", inFilters}};
+}
+
+std::string JsonHeaderText(const char* inName) {
+  std::string text = JsonLine(JsonHeader(inName));
+  text.pop_back();
+  return text;
+}
+
 std::string JsonLine(const OrderedJson& inJson) {
   return EscapedForJson(inJson.dump(-1, ' ', false, OrderedJson::error_handler_t::replace));
 }

@@ -46,6 +46,12 @@ struct CompareOptions {
   ZORToolkit::DiffOptions Get() const;
 };
 
+/// What every JSON document of the command that is an object begins with: which schema describes it
+/// (resources/NAME.schema.json), its version, the units, the tool, and the filters that were applied.
+OrderedJson JsonHeader(const char* inName, const OrderedJson& inFilters = OrderedJson::object());
+/// The same as text to write members behind: without the closing brace.
+std::string JsonHeaderText(const char* inName);
+
 /// One line of JSON text, safe to print on a terminal, without line feed.
 std::string JsonLine(const OrderedJson& inJson);
 /// An array of such lines.
