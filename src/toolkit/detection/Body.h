@@ -22,9 +22,10 @@ struct BorderEdge {
   std::vector<std::uint32_t> nodes;
   std::vector<double> parameters;  ///< on the edge's curve, one for each node
   double deflection = 0;           ///< largest distance between curve and chords
-  double tolerance = 0;            ///< as the file has it
-  bool isForward = true;           ///< the face lies on its left, seen against du x dv
-  bool isSeam = false;             ///< the face lies on both sides
+  double outlineError = 0;  ///< within it the chords in the face's outline do not say which side
+  double tolerance = 0;     ///< as the file has it
+  bool isForward = true;    ///< the face lies on its left, seen against du x dv
+  bool isSeam = false;      ///< the face lies on both sides
 };
 
 struct BodyFace {

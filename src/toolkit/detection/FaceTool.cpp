@@ -63,7 +63,7 @@ bool FaceTool::IsInTrims(const gp_XYZ& inPoint, const gp_XY& inParameters) {
   for (std::size_t i = 0; i < face_.edges.size(); ++i) {
     const BorderEdge& edge = face_.edges[i];
     if (edge.isSeam) continue;
-    const double band = edge.deflection + kSameEdge;
+    const double band = edge.outlineError + kSameEdge;
     for (std::size_t k = 0; k + 1 < edge.nodes.size(); ++k) {
       const gp_XYZ &start = body_.nodes[edge.nodes[k]], &end = body_.nodes[edge.nodes[k + 1]];
       const gp_XYZ foot = ClosestOnSegment(inPoint, start, end);

@@ -97,6 +97,7 @@ class BodyBuilder {
                 const TopLoc_Location& inLocation, std::uint32_t inFirst, BodyFace& ioFace) {
     bool isWhole = true;
     const TopoDS_Shape forward = inFace.Oriented(TopAbs_FORWARD);
+    const BRepAdaptor_Surface surface(TopoDS::Face(forward), false);
     for (TopExp_Explorer edges(forward, TopAbs_EDGE); edges.More(); edges.Next()) {
       const TopoDS_Edge& edge = TopoDS::Edge(edges.Current());
       if (edge.Orientation() == TopAbs_INTERNAL || edge.Orientation() == TopAbs_EXTERNAL) continue;
@@ -122,16 +123,7 @@ class BodyBuilder {
           ioFace.outline.push_back({body_.parameters[border.nodes[border.nodes.size() - 2]],
                                     body_.parameters[border.nodes.back()]});
       }
-      const BRepAdaptor_Curve curve(edge);
-      for (std::size_t i = 0; i + 1 < border.nodes.size(); ++i) {
-        const double middle = (border.parameters[i] + border.parameters[i + 1]) / 2;
-        const gp_XYZ foot =
-            ClosestOnSegment(curve.Value(middle).XYZ(), body_.nodes[border.nodes[i]],
-                             body_.nodes[border.nodes[i + 1]]);
-        border.deflection =
-            std::max(border.deflection, curve.Value(middle).XYZ().Subtracted(foot).Modulus());
-      }
-      border.deflection *= kSafety;
+      MeasureBorder(surface, border);
       ioFace.deflection = std::max(ioFace.deflection, border.deflection);
       ioFace.edges.push_back(std::move(border));
     }
@@ -140,6 +132,28 @@ class BodyBuilder {
     for (const auto& [start, end] : ioFace.outline)
       ioFace.outlineLow = gp_XY(std::min({ioFace.outlineLow.X(), start.X(), end.X()}),
                                 std::min({ioFace.outlineLow.Y(), start.Y(), end.Y()}));
+  }
+
+  /// How far the curve is from its chords in space, and from the surface's image of those in its
+  /// parameters: a straight line across a cone is a spiral there.
+  void MeasureBorder(const BRepAdaptor_Surface& inSurface, BorderEdge& ioBorder) const {
+    const BRepAdaptor_Curve curve(ioBorder.edge);
+    for (std::size_t i = 0; i + 1 < ioBorder.nodes.size(); ++i) {
+      const std::uint32_t from = ioBorder.nodes[i], to = ioBorder.nodes[i + 1];
+      for (const double share : {0.25, 0.5, 0.75}) {
+        const double parameter =
+            ioBorder.parameters[i] + share * (ioBorder.parameters[i + 1] - ioBorder.parameters[i]);
+        const gp_XYZ point = curve.Value(parameter).XYZ();
+        const gp_XYZ foot = ClosestOnSegment(point, body_.nodes[from], body_.nodes[to]);
+        ioBorder.deflection = std::max(ioBorder.deflection, (point - foot).Modulus());
+        const gp_XY at =
+            body_.parameters[from] + (body_.parameters[to] - body_.parameters[from]) * share;
+        const gp_XYZ image = inSurface.Value(at.X(), at.Y()).XYZ();
+        ioBorder.outlineError = std::max(ioBorder.outlineError, (point - image).Modulus());
+      }
+    }
+    ioBorder.deflection *= kSafety;
+    ioBorder.outlineError = kSafety * ioBorder.outlineError + ioBorder.deflection;
   }
 
   /// The tip of a cone is a point, but a side of the face's outline.

@@ -29,6 +29,20 @@ inline TopoDS_Shape Pin(double radius, double x = 0) {
 
 inline TopoDS_Shape ConeSolid() { return BRepPrimAPI_MakeCone(2, 5, 10).Shape(); }
 
+/// Without what lies beyond a plane beside its axis: borders that are nearly straight, but not in the
+/// cone's parameters.
+inline TopoDS_Shape ConeCutLengthwise() {
+  return Minus(BRepPrimAPI_MakeCone(5, 0.5, 10).Shape(), Block(0.4, -10, -1, 20, 20, 20));
+}
+
+/// A ball of radius 1 at a distance from that cone, beside its cut.
+inline TopoDS_Shape BallBesideCone(double distance) {
+  const double r = 5 - 0.45 * 5, x = 0.3, y = std::sqrt(r * r - x * x);
+  const gp_XYZ normal = gp_XYZ(x / r, y / r, 0.45) / std::sqrt(1 + 0.45 * 0.45);
+  const gp_XYZ centre = gp_XYZ(x, y, 5) + normal * (1 + distance);
+  return Ball(centre.X(), centre.Y(), centre.Z(), 1);
+}
+
 inline const gp_Pnt kOrigin(0, 0, 0);
 inline constexpr auto kNone = Expected::kNone;
 inline constexpr auto kClash = Expected::kClash;
@@ -100,6 +114,8 @@ inline std::vector<PairOfShapes> Pairs() {
       {"CrossingRodsIntoEachOther", Rod(gp_Pnt(-10, 0, 0), gp::DX(), 2, 20),
        Rod(gp_Pnt(0.3, -10, 4.9), gp::DY(), 3, 20), kClash, -0.1},
       {"ConeInItsCone", Minus(Block(-10, -10, 0, 20, 20, 10), ConeSolid()), ConeSolid(), kContact},
+      {"BallBesideACutCone", ConeCutLengthwise(), BallBesideCone(0.1), kClearance, 0.1, false, 1},
+      {"BallIntoACutCone", ConeCutLengthwise(), BallBesideCone(-0.05), kClash, -0.05},
       {"ThinRodThroughLargePlate", plate, Rod(gp_Pnt(37.3, 61.7, -20), gp::DZ(), 0.5, 50), kClash,
        -5},
       {"SlantedRodThroughLargePlate", plate,
