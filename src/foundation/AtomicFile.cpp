@@ -1,6 +1,7 @@
 #include "foundation/AtomicFile.h"
 
 #include <fcntl.h>
+#include <signal.h>
 #include <stdio.h>
 #include <sys/random.h>
 #include <sys/stat.h>
@@ -49,23 +50,52 @@ std::string FollowLinks(const std::string& inPath) {
   throw FileError(inPath, ELOOP);
 }
 
-void CopyExtendedAttributes(int inFrom, int inTo) {
+/// @return whether the new file has all of them.
+bool CopyExtendedAttributes(int inFrom, int inTo) {
   const ssize_t size = flistxattr(inFrom, nullptr, 0);
-  if (size <= 0) return;
+  if (size <= 0) return true;
+  bool isComplete = true;
   std::string names(static_cast<std::size_t>(size), '\0');
   names.resize(static_cast<std::size_t>(
       std::max<ssize_t>(0, flistxattr(inFrom, names.data(), names.size()))));
   for (std::size_t start = 0; start < names.size();) {
     const char* const name = names.data() + start;
     start = names.find('\0', start) + 1;
-    // Granted to the old content, not to whatever replaces it.
-    if (std::string_view(name) == "security.capability") continue;
-    const ssize_t count = fgetxattr(inFrom, name, nullptr, 0);
-    if (count < 0) continue;
+    // Granted to the old content, not to whatever replaces it, or given by the system's policy.
+    if (std::string_view(name).starts_with("security.")) continue;
+    const ssize_t count = std::max<ssize_t>(0, fgetxattr(inFrom, name, nullptr, 0));
     std::vector<char> value(static_cast<std::size_t>(count));
-    if (fgetxattr(inFrom, name, value.data(), value.size()) == count)
-      static_cast<void>(fsetxattr(inTo, name, value.data(), value.size(), 0));
+    isComplete = fgetxattr(inFrom, name, value.data(), value.size()) == count &&
+                 fsetxattr(inTo, name, value.data(), value.size(), 0) == 0 && isComplete;
   }
+  return isComplete;
+}
+
+/// Keeps termination signals of this thread waiting while a file is half written.
+class SignalsHeld {
+ public:
+  SignalsHeld() {
+    sigset_t signals;
+    sigemptyset(&signals);
+    for (const int signal : {SIGINT, SIGTERM, SIGHUP}) sigaddset(&signals, signal);
+    pthread_sigmask(SIG_BLOCK, &signals, &before_);
+  }
+  ~SignalsHeld() { pthread_sigmask(SIG_SETMASK, &before_, nullptr); }
+  SignalsHeld(const SignalsHeld&) = delete;
+  SignalsHeld& operator=(const SignalsHeld&) = delete;
+
+ private:
+  sigset_t before_;
+};
+
+/// Makes one open file's bytes those of another. @return 0 or an errno value.
+int Overwrite(int inSource, int inTarget) {
+  struct stat status {};
+  if (fstat(inSource, &status) != 0 || lseek(inSource, 0, SEEK_SET) != 0 ||
+      lseek(inTarget, 0, SEEK_SET) != 0)
+    return errno;
+  if (const int error = CopyBytes(inSource, inTarget); error != 0) return error;
+  return ftruncate(inTarget, status.st_size) != 0 || fsync(inTarget) != 0 ? errno : 0;
 }
 
 }  // namespace
@@ -145,21 +175,40 @@ void AtomicFile::CheckTarget() {
   isStream_ = !S_ISREG(status.st_mode);
 }
 
-void AtomicFile::KeepAttributes(int inDescriptor) const {
+/// @return false when the new file cannot have all that the old one has.
+bool AtomicFile::KeepAttributes(int inDescriptor) const {
   const ZORFoundation::Descriptor old(open(target_.c_str(), O_PATH | O_CLOEXEC));
   struct stat status {};
-  if (!old.IsOpen() || fstat(old.Get(), &status) != 0 || !S_ISREG(status.st_mode)) return;
+  if (!old.IsOpen() && errno != ENOENT) throw FileError(path_, errno);
+  if (!old.IsOpen() || fstat(old.Get(), &status) != 0 || !S_ISREG(status.st_mode)) return true;
   // Without the right to change the owner, the group may still be one of the process's own.
-  bool isOwnerKept = fchown(inDescriptor, status.st_uid, status.st_gid) == 0;
-  if (!isOwnerKept)
-    isOwnerKept = fchown(inDescriptor, static_cast<uid_t>(-1), status.st_gid) == 0 &&
-                  status.st_uid == geteuid();
-  // Set-user-id and set-group-id bits must not pass to another owner.
-  if (fchmod(inDescriptor, status.st_mode & (isOwnerKept ? 07777U : 0777U)) != 0)
-    throw FileError(path_, errno);
-  const ZORFoundation::Descriptor readable(
-      open(target_.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
-  if (readable.IsOpen()) CopyExtendedAttributes(readable.Get(), inDescriptor);
+  const bool isOwnerKept = fchown(inDescriptor, status.st_uid, status.st_gid) == 0 ||
+                           (status.st_uid == geteuid() &&
+                            fchown(inDescriptor, static_cast<uid_t>(-1), status.st_gid) == 0);
+  if (!isOwnerKept) return false;
+  if (fchmod(inDescriptor, status.st_mode & 07777U) != 0) throw FileError(path_, errno);
+  ZORFoundation::Descriptor present(open(target_.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
+  if (!present.IsOpen())
+    present = ZORFoundation::Descriptor(open(target_.c_str(), O_WRONLY | O_CLOEXEC | O_NONBLOCK));
+  if (!present.IsOpen()) throw FileError(path_, errno);
+  return CopyExtendedAttributes(present.Get(), inDescriptor);
+}
+
+/// The old bytes are in a file of their own until the new ones are on the disk.
+void AtomicFile::OverwriteTarget(int inDescriptor) const {
+  const ZORFoundation::Descriptor target(
+      open(target_.c_str(), O_RDWR | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK));
+  if (!target.IsOpen()) throw FileError(path_, errno);
+  TemporaryFile former(FolderOf(target_), 0600, path_);
+  if (const int error = Overwrite(target.Get(), former.Descriptor()); error != 0)
+    throw FileError(path_, error);
+  const SignalsHeld held;
+  const int error = Overwrite(inDescriptor, target.Get());
+  if (error == 0) return;
+  if (Overwrite(former.Descriptor(), target.Get()) == 0) throw FileError(path_, error);
+  const std::string kept = former.Path();
+  former.Release();
+  throw FileError(path_, error, "is damaged; what it held is in " + kept);
 }
 
 void AtomicFile::Commit() {
@@ -168,7 +217,7 @@ void AtomicFile::Commit() {
     return;
   }
   const int descriptor = temporary_->Reopen();
-  if (!isNew_) KeepAttributes(descriptor);
+  if (!isNew_ && !KeepAttributes(descriptor)) return OverwriteTarget(descriptor);
   // Some file systems report a full disk only here.
   if (options_.isSynchronised && fsync(descriptor) != 0) throw FileError(path_, errno);
   Rename();

@@ -62,9 +62,10 @@ struct AtomicFileOptions {
 /// Replaces a file by a new one that is written beside it. Until Commit succeeds the old file is
 /// untouched; if it never does, nothing is left of the new one unless the process is killed.
 ///
-/// The new file keeps the permissions of the old one and, where the system allows it, its owner,
-/// group, extended attributes and access control list. Symbolic links are followed, dangling ones
-/// included. A device or a pipe is never replaced: it receives the bytes at Commit.
+/// The new file keeps the owner, group, permissions, extended attributes and access control list of
+/// the old one. Where the system does not let it, the old file itself is overwritten at Commit, with
+/// a copy beside it until that is done, and its old bytes put back when it fails. Symbolic links are
+/// followed, dangling ones included. A device or a pipe is never replaced: it receives the bytes at Commit.
 ///
 /// The constructor already raises FileError where nothing could be written; every operation may
 /// raise std::bad_alloc.
@@ -82,7 +83,8 @@ class ZOR_FOUNDATION_EXPORT AtomicFile {
 
  private:
   void CheckTarget();
-  void KeepAttributes(int inDescriptor) const;
+  bool KeepAttributes(int inDescriptor) const;
+  void OverwriteTarget(int inDescriptor) const;
   void Rename();
   void CopyIntoTarget() const;
 

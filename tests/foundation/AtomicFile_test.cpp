@@ -12,6 +12,7 @@
 #include <csignal>
 #include <filesystem>
 #include <functional>
+#include <optional>
 #include <thread>
 
 #include "support/PlatformFolder.h"
@@ -365,6 +366,49 @@ TEST_F(AtomicFileTest, CommitKeepsOwnerAndGroup) {
   EXPECT_EQ(status.st_mode & 07777U, 04750U);
 }
 
+TEST_F(AtomicFileTest, FileOfAnotherOwnerStaysTheirs) {
+  if (geteuid() != 0) GTEST_SKIP() << "only root can become another user";
+  folder_.WriteFile("a", "old and longer");
+  chmod(folder_.path.c_str(), 0777);
+  ASSERT_EQ(chown(Path("a").c_str(), 1234, 12345), 0);
+  ASSERT_EQ(chmod(Path("a").c_str(), 0666), 0);
+  EXPECT_EXIT(
+      {
+        if (setuid(kNobody) != 0) std::_Exit(1);
+        std::_Exit(CodeOf([&] { WriteWholeFile(Path("a"), "new"); }));
+      },
+      testing::ExitedWithCode(0), "");
+  const struct stat status = StatusOf(Path("a"));
+  EXPECT_EQ(status.st_uid, 1234U);
+  EXPECT_EQ(status.st_gid, 12345U);
+  EXPECT_EQ(ReadFile(Path("a")), "new");
+  ExpectNames({"a"});
+}
+
+TEST_F(AtomicFileTest, FileOfAnotherOwnerIsWholeAgainWhenItCannotBeOverwritten) {
+  if (geteuid() != 0) GTEST_SKIP() << "only root can become another user";
+  folder_.WriteFile("a", "old");
+  chmod(folder_.path.c_str(), 0777);
+  ASSERT_EQ(chmod(Path("a").c_str(), 0666), 0);
+  EXPECT_EXIT(
+      {
+        if (setuid(kNobody) != 0) std::_Exit(1);
+        std::optional<AtomicFile> file(std::in_place, Path("a"));
+        file->Write(std::string(100'000, 'n'));
+        signal(SIGXFSZ, SIG_IGN);
+        rlimit limit{};
+        limit.rlim_cur = limit.rlim_max = 5000;
+        setrlimit(RLIMIT_FSIZE, &limit);
+        const int code = CodeOf([&] { file->Commit(); });
+        file.reset();
+        std::_Exit(code);
+      },
+      testing::ExitedWithCode(EFBIG), "");
+  EXPECT_EQ(ReadFile(Path("a")), "old");
+  EXPECT_EQ(StatusOf(Path("a")).st_uid, 0U);
+  ExpectNames({"a"});
+}
+
 TEST_F(AtomicFileTest, CommitPassesOnNoRightsOfAnotherOwnersProgram) {
   if (geteuid() != 0) GTEST_SKIP() << "only root can become another user";
   folder_.WriteFile("a", "old");
@@ -377,7 +421,7 @@ TEST_F(AtomicFileTest, CommitPassesOnNoRightsOfAnotherOwnersProgram) {
         std::_Exit(0);
       },
       testing::ExitedWithCode(0), "");
-  EXPECT_EQ(StatusOf(Path("a")).st_uid, kNobody);
+  EXPECT_EQ(StatusOf(Path("a")).st_uid, 0U);
   EXPECT_EQ(ModeOf(Path("a")), 0777U);
 }
 

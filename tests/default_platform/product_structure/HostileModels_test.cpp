@@ -151,9 +151,15 @@ std::string ObjWithFaceOf(int inCorners) {
 
 TEST(HostileModels, ObjFaceWithMoreCornersThanTheKernelHasRoomFor) {
   const Folder folder;
-  EXPECT_EQ(OpenAnew(folder.Write("a.obj", ObjWithFaceOf(1025))).reason,
-            "line 1026: a face has more than 1024 corners");
-  EXPECT_TRUE(OpenAnew(folder.Write("b.obj", ObjWithFaceOf(1000))).isOpened);
+  for (const int corners : {1000, 1024, 1025, 5000}) {
+    const Outcome outcome = OpenAnew(folder.Write("a.obj", ObjWithFaceOf(corners)));
+    EXPECT_TRUE(outcome.isOpened) << corners << ": " << outcome.reason;
+    EXPECT_THAT(outcome.warnings, testing::IsEmpty());
+  }
+  std::string missing = ObjWithFaceOf(2000);
+  missing.replace(missing.find("f 1"), 3, "f 9999");
+  EXPECT_EQ(OpenAnew(folder.Write("b.obj", missing)).reason,
+            "line 2001: a face refers to a missing vertex");
 }
 
 TEST(HostileModels, PipesAreRefusedUnderWhateverNameTheKernelReads) {

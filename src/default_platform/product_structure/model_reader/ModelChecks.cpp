@@ -1,6 +1,5 @@
 #include "default_platform/product_structure/model_reader/ModelChecks.h"
 
-#include <algorithm>
 #include <cmath>
 #include <cstdint>
 #include <cstring>
@@ -191,38 +190,6 @@ void CheckGltf(const ModelRequest& inRequest, std::string_view inBytes) {
   GltfNodes(scene).Check();
 }
 
-std::size_t CountWords(std::string_view inLine) {
-  constexpr char kSpace[] = " \t\r";
-  std::size_t count = 0;
-  for (std::size_t at = inLine.find_first_not_of(kSpace); at != std::string_view::npos; ++count)
-    at = inLine.find_first_not_of(kSpace, inLine.find_first_of(kSpace, at));
-  return count;
-}
-
-/// The kernel's reader writes the corners of a face into a block of fixed size.
-void CheckObj(std::string_view inBytes) {
-  constexpr std::size_t kMaxCorners = 1024;
-  std::size_t number = 0, start = 0, words = 0;
-  bool isFace = false, isContinued = false;
-  while (!inBytes.empty()) {
-    std::string_view line = inBytes.substr(0, inBytes.find('\n'));
-    inBytes.remove_prefix(std::min(line.size() + 1, inBytes.size()));
-    ++number;
-    line = line.substr(0, line.find_last_not_of(" \t\r") + 1);
-    if (!isContinued) {
-      line.remove_prefix(std::min(line.find_first_not_of(" \t"), line.size()));
-      isFace = line.starts_with("f ") || line.starts_with("f\t");
-      start = number;
-      words = 0;
-    }
-    isContinued = line.ends_with('\\');
-    if (isContinued) line.remove_suffix(1);
-    if (isFace && (words += CountWords(line)) > kMaxCorners + 1)
-      throw Fault{"line " + std::to_string(start) + ": a face has more than " +
-                  std::to_string(kMaxCorners) + " corners"};
-  }
-}
-
 constexpr double kTolerance = 1e-5;
 
 bool IsOne(double inScale) { return std::abs(inScale - 1) < kTolerance; }
@@ -255,7 +222,6 @@ std::string FindFault(const ModelRequest& inRequest, std::string_view inBytes) {
   try {
     if (inRequest.format == ModelFormat::kGltf || inRequest.format == ModelFormat::kGlb)
       CheckGltf(inRequest, inBytes);
-    if (inRequest.format == ModelFormat::kObj) CheckObj(inBytes);
   } catch (const Fault& fault) {
     return fault.reason;
   }

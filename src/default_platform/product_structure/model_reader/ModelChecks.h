@@ -9,8 +9,7 @@
 
 namespace ZORDefault {
 
-/// Looks for counts that the file cannot hold, for nodes that are their own descendants, and for
-/// faces with more corners than the kernel's reader has room for.
+/// Looks for counts that the file cannot hold and for nodes that are their own descendants.
 /// @return why the model cannot be read, one line; "" when nothing was found.
 std::string FindFault(const ModelRequest& inRequest, std::string_view inBytes);
 

@@ -14,8 +14,11 @@
 #include <exception>
 #include <limits>
 #include <new>
+#include <optional>
+#include <utility>
 
 #include "default_platform/product_structure/model_reader/FileDoor.h"
+#include "default_platform/product_structure/model_reader/ObjFaces.h"
 #include "foundation/Descriptor.h"
 #include "foundation/ReadWholeFile.h"
 
@@ -59,6 +62,16 @@ void SetProcessLimits(const ModelLimits& inLimits) {
   prctl(PR_SET_PDEATHSIG, SIGKILL);
 }
 
+/// What the kernel gets for the model's bytes.
+void Replace(std::string& ioBytes, std::string inOther) {
+  std::size_t written = 0;
+  if (ftruncate(ModelReaderProtocol::kModel, 0) != 0 ||
+      lseek(ModelReaderProtocol::kModel, 0, SEEK_SET) != 0 ||
+      ZORFoundation::WriteAll(ModelReaderProtocol::kModel, inOther, written) != 0)
+    throw std::bad_alloc();  // it is a file in memory
+  ioBytes = std::move(inOther);
+}
+
 int Run(char** inArguments) try {
   ModelRequest request;
   request.format = static_cast<ModelFormat>(std::atoi(inArguments[1]));
@@ -66,7 +79,10 @@ int Run(char** inArguments) try {
   SetProcessLimits({std::atof(inArguments[4]), std::strtoull(inArguments[3], nullptr, 10)});
   request.path = inArguments[5];
   lseek(ModelReaderProtocol::kModel, 0, SEEK_SET);
-  const std::string bytes = ZORFoundation::ReadToEnd(ModelReaderProtocol::kModel, request.path);
+  std::string bytes = ZORFoundation::ReadToEnd(ModelReaderProtocol::kModel, request.path);
+  if (request.format == ModelFormat::kObj)
+    if (std::optional<std::string> other = ObjWithoutLargeFaces(bytes))
+      Replace(bytes, *std::move(other));
   CloseDoorBehind(request.path, ModelReaderProtocol::kModel);
   return Answer(ModelReaderProtocol::kExitRead, AnswerTo(request, bytes));
 } catch (const Refusal& refusal) {
