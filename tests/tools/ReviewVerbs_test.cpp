@@ -6,7 +6,6 @@
 
 #include "tools/Command.h"
 
-using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::StartsWith;
 
@@ -200,6 +199,41 @@ TEST(RulesVerb, SaysWhatEachRuleDid) {
   EXPECT_THAT(refused.error, HasSubstr("wrong.toml:4:1: unknown key \"colour\""));
 }
 
+// By validators that others wrote; tests/support/schemas says where the schemas come from.
+CommandResult ValidateJUnit(const std::string& inPath) {
+  return RunShell("xmllint --noout --schema " ZOR_SOURCE_DIR "/tests/support/schemas/junit.xsd '" +
+                  inPath + "'");
+}
+CommandResult ValidateSarif(const std::string& inPath) {
+  return RunShell("/usr/bin/python3 -W ignore -m jsonschema -i '" + inPath +
+                  "' " ZOR_SOURCE_DIR "/tests/support/schemas/sarif-2.1.0-rtm.5.json");
+}
+
+TEST(GateVerb, ReportsAreValid) {
+  const TemporaryDirectory directory;
+  const std::string junit = directory.Path("gate.xml"), sarif = directory.Path("gate.sarif");
+  const std::string policies[] = {
+      "[[limit]]\nname='a < b & \"c\"'\n[[limit]]\nname='open'\nlevel='warning'\nmax=2\n"
+      "[[limit]]\nname='kept'\nmax=99\n",
+      "max-not-comparable=0\n[[limit]]\nname='new'\nclass=['new','changed']\n"};
+  const std::string empty =
+      directory.Write("empty 1.xml", "<ClashElement><ClashResult/></ClashElement>");
+  for (const std::string& policy : policies)
+    for (const std::string& result : {std::string(kAs1), std::string(kDissonance), empty}) {
+      RunCommand({"gate", result, "--policy", directory.Write("policy.toml", policy), "--baseline",
+                  kAs1, "--report", "junit=" + junit, "--report", "sarif=" + sarif});
+      EXPECT_EQ(ValidateJUnit(junit).code, 0) << result << ReadFile(junit);
+      const CommandResult validated = ValidateSarif(sarif);
+      EXPECT_EQ(validated.code, 0) << result << validated.out << validated.error;
+    }
+  std::string text = ReadFile(sarif);
+  text.replace(text.find("\"version\""), 9, "\"edition\"");
+  EXPECT_NE(ValidateSarif(directory.Write("bad.sarif", text)).code, 0);
+  text = ReadFile(junit);
+  text.replace(text.find(" tests="), 7, " checks=");
+  EXPECT_NE(ValidateJUnit(directory.Write("bad.xml", text)).code, 0);
+}
+
 TEST(GateVerb, ExitCodesAndReportsOfOneRun) {
   const TemporaryDirectory directory;
   const auto policy = [&](const std::string& inText) {
@@ -212,7 +246,6 @@ TEST(GateVerb, ExitCodesAndReportsOfOneRun) {
   EXPECT_EQ(failed.code, 3) << failed.error;
   EXPECT_THAT(failed.out, HasSubstr("FAILED  none: 29 found"));
   EXPECT_THAT(ReadFile(junit), HasSubstr("failures=\"1\""));
-  EXPECT_EQ(RunShell("xmllint --noout '" + junit + "'").code, 0);
   EXPECT_EQ(nlohmann::json::parse(ReadFile(sarif))["runs"][0]["results"].size(), 32);
   EXPECT_EQ(RunCommand({"gate", kAs1, "--policy", policy("[[limit]]\nname='l'\nmax=32\n")}).code,
             0);

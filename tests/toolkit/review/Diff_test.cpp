@@ -14,7 +14,6 @@ using namespace ZORToolkit;
 using namespace review_tests;
 using testing::ElementsAre;
 using testing::HasSubstr;
-using testing::Not;
 
 const DiffEntry& OfNew(const ResultDiff& inDiff, int inPosition) {
   return *std::ranges::find(inDiff.entries, inPosition, &DiffEntry::newPosition);
@@ -575,9 +574,11 @@ TEST(Diff, PairWithFiveThousandOnBothSidesIsMatched) {
   std::mt19937 random(6);
   TestResult was = OnePair();
   was.interferences.resize(5000, was.interferences[0]);
-  for (std::size_t i = 0; i < was.interferences.size(); ++i)
-    was.interferences[i].place = {20.0 * static_cast<double>(i % 70),
-                                  20.0 * static_cast<double>(i / 70), 0};
+  for (std::size_t i = 0; i < was.interferences.size(); ++i) {
+    const std::size_t column = i % 70, row = i / 70;
+    was.interferences[i].place = {20.0 * static_cast<double>(column),
+                                  20.0 * static_cast<double>(row), 0};
+  }
   TestResult is = was;
   for (TestInterference& one : is.interferences) one.place[2] += 0.5;
   std::ranges::shuffle(is.interferences, random);
