@@ -3,6 +3,9 @@
 //   NAME_fuzz [-max_total_time=SECONDS] [-seed=N] [-artifact_prefix=PATH] FILE|FOLDER…
 #include <signal.h>
 #include <unistd.h>
+#ifdef __SANITIZE_ADDRESS__
+#include <sanitizer/common_interface_defs.h>
+#endif
 
 #include <algorithm>
 #include <chrono>
@@ -181,7 +184,12 @@ void RunOne(const std::string& inInput) {
 int main(int inCount, char** inArguments) {
   const Options options = Parse(inCount, inArguments);
   artifactPath = options.artifactPrefix + "finding-" + std::to_string(getpid());
+#ifdef __SANITIZE_ADDRESS__  // which reports all other ends itself
+  __sanitizer_set_death_callback(KeepCurrent);
+  signal(SIGABRT, KeepAtSignal);
+#else
   for (const int deadly : {SIGABRT, SIGSEGV, SIGBUS, SIGFPE, SIGILL}) signal(deadly, KeepAtSignal);
+#endif
   const std::vector<std::string> corpus = ReadCorpus(options.corpus);
   const auto end =
       std::chrono::steady_clock::now() + std::chrono::duration<double>(options.seconds);
