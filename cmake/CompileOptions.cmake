@@ -11,7 +11,7 @@ if(ZOR_SANITIZE)
     add_compile_options(-fsanitize=fuzzer-no-link)
   endif()
   # The sanitizers' own code makes the compiler see uninitialised values in the standard library. The other builds warn.
-  target_compile_options(zor_compile_options INTERFACE -Wno-maybe-uninitialized)
+  target_compile_options(zor_compile_options INTERFACE $<$<CXX_COMPILER_ID:GNU>:-Wno-maybe-uninitialized>)
 endif()
 
 # zor_compile_lightly(file…): what runs once and takes long to compile, such as the reading of a command line, is not

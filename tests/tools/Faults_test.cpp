@@ -57,6 +57,7 @@ std::vector<VerbCase> Cases() {
       {"escape", {"escape", "a < b"}},
       {"filename", {"filename", "a/b"}},
       {"tree", {"tree", kModel}},
+      {"detect", {"detect", kModel, "--only", "rod*", "-o", "OUT"}},
       {"render", {"render", kModel, "--size", "32x24", "-o", "OUT.png"}},
       {"publish", {"publish", kTwoSets, "-o", "OUT"}, true},
       {"publish_pictures",
