@@ -42,6 +42,24 @@ TEST(Detect, AnyNumberOfJobsGivesTheSameBytes) {
   EXPECT_FALSE(BytesOf(one).empty());
 }
 
+TEST(Detect, WhatWasDecidedBeforeHolds) {
+  TemporaryDirectory directory;
+  const std::string result = directory.Path("as1.clash.xml");
+  ASSERT_EQ(RunCommand({"detect", kModel, "-o", result, "--only", "*bracket*"}).code, 0);
+  std::string decided = BytesOf(result);
+  const std::string open = "Status=\"Not inspected\"", settled = "Status=\"Irrelevant\"";
+  ASSERT_NE(decided.find(open), std::string::npos);
+  decided.replace(decided.find(open), open.size(), settled);
+  std::ofstream(result, std::ios::binary) << decided;
+  const CommandResult again =
+      RunCommand({"detect", kModel, "-o", result, "--only", "*bracket*", "--previous", result});
+  EXPECT_EQ(again.code, 0) << again.error;
+  const std::string bytes = BytesOf(result);
+  EXPECT_THAT(bytes, AllOf(HasSubstr(settled), HasSubstr(open), HasSubstr("RetrieveInf=\"Old\"")));
+  EXPECT_EQ(bytes.find(settled), bytes.rfind(settled));
+  EXPECT_EQ(RunCommand({"detect", kModel, "-o", "/dev/null", "--previous", "no/such.xml"}).code, 1);
+}
+
 TEST(Detect, SelectionsNarrowTheSearch) {
   const auto summary = [](const char* option, const char* value) {
     return RunCommand({"detect", kModel, "-o", "/dev/null", option, value}).out;

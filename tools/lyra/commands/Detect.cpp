@@ -12,7 +12,10 @@
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/Model.h"
+#include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Progress.h"
+#include "toolkit/records/ClashDocumentEdit.h"
+#include "toolkit/review/Carry.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -22,8 +25,8 @@ constexpr const char* kSheetWords[] = {"clash", "contact", "ignore"};
 constexpr long long kMaxJobs = 1024;
 
 struct DetectOptions {
-  std::string file, result, tolerance = "0.01", contactGap = "0.00001", clearance = "0",
-                            sheets = "clash";
+  std::string file, result, previous, tolerance = "0.01", contactGap = "0.00001", clearance = "0",
+                                      sheets = "clash";
   std::optional<long long> level, jobs;
   std::vector<std::string> only, ignore, between;
   ModelReading reading;
@@ -103,13 +106,25 @@ std::string Summary(const DetectionResult& inResult) {
          Counted(inResult.productsChecked, "product", "products") + "\n";
 }
 
+/// What was decided of an older result holds for a new one at this path too.
+void SettleAsBefore(const ReviewInput& inPrevious, const OutputFile& inFile) {
+  ReviewInput now(inFile.Path());
+  const CarryPlan plan =
+      PlanCarry(inPrevious.result, now.result, Diff(inPrevious.result, now.result));
+  if (ApplyReviewEdits(now.document, now.result, plan.edits) > 0)
+    inFile.Check(ClashDocumentEdit(now.document).Dump({}, inFile.Path()));
+}
+
 int Run(const DetectOptions& inOptions, Output& ioOutput) {
   if (inOptions.file == "-") throw InputError("-: a model cannot be read from standard input");
   const DetectionOptions detection = ToDetection(inOptions);
+  std::optional<ReviewInput> previous;
+  if (!inOptions.previous.empty()) previous.emplace(inOptions.previous);
   { const OutputFile probe(inOptions.result); }  // fails at once where nothing can be written
   const DetectionResult result = DetectWithProgress(inOptions, detection);
   OutputFile file(inOptions.result);
   WriteClashResult(result, Today(), file.Path());
+  if (previous) SettleAsBefore(*previous, file);
   file.Finish(ioOutput);
   if (inOptions.result != "-") ioOutput.Write(Summary(result));
   return 0;
@@ -140,6 +155,8 @@ VerbAction DeclareDetect(Arguments& ioArguments) {
                    "What a surface without an inside means that enters a solid: clash (default), "
                    "contact or ignore");
   ioArguments.Words("--sheets", kSheetWords);
+  ioArguments.Text("--previous", "RESULT", options->previous,
+                   "An older result: what was decided there holds here too, as lyra carry does");
   ioArguments.Number("--jobs", "N", options->jobs,
                      "Threads to work with (default: one for each processor)");
   options->reading.Declare(ioArguments);
