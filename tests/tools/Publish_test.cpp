@@ -376,6 +376,16 @@ TEST_F(Publish, BrokenStyleSheetIsRefusedBeforeAnythingIsWritten) {
   EXPECT_FALSE(fs::exists(folder_));
 }
 
+TEST_F(Publish, StyleSheetThatEndsWithoutAPageLeavesTheFormerFiles) {
+  ASSERT_EQ(Run({kResult}).code, 0);
+  const std::string report = ReadFile(folder_ + "/report.xml");
+  const CommandResult result = RunWithStyleSheet(
+      "<xsl:template match='/'><p/><xsl:message terminate='yes'>no</xsl:message></xsl:template>");
+  EXPECT_EQ(result.code, 1) << result.error;
+  EXPECT_EQ(ReadFile(folder_ + "/report.xml"), report);  // which would name own.xsl
+  EXPECT_FALSE(fs::exists(folder_ + "/own.xsl"));
+}
+
 TEST_F(Publish, MissingStyleSheetIsRefused) {
   EXPECT_EQ(Run({kResult, "--xsl", "no/such.xsl"}).code, 1);
 }

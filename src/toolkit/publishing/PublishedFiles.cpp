@@ -79,6 +79,11 @@ PageStyleSheet::PageStyleSheet(const std::string& inPath)
 void WritePublishedFiles(const PublicationOptions& inOptions, const PageStyleSheet& inSheet,
                          const ClashDocument& inDocument, const PublishedResult& inPublished,
                          const std::string& inWorkFolder) {
+  // First, since it may fail: the old publication stays as it was then.
+  const std::string name = inSheet.path.empty() ? "clash-page.xsl" : inSheet.path;
+  const Page page = MakePage({AnnotatedReport(inDocument, inPublished), inSheet.text, name});
+  if (!page.messages.empty() && inOptions.warn)
+    inOptions.warn(name + ": " + page.messages.substr(0, page.messages.find('\n')));
   ZORFoundation::AtomicFileOptions written;
   written.temporaryFolder = inWorkFolder;
   const std::string folder = inOptions.folder + "/", styleSheet = FileNameOf(inSheet);
@@ -90,10 +95,6 @@ void WritePublishedFiles(const PublicationOptions& inOptions, const PageStyleShe
                                     ? PageFunction<ShippedTextFunction>(kReportStyleSheetName)()
                                     : inSheet.text,
                                 written);
-  const std::string name = inSheet.path.empty() ? "clash-page.xsl" : inSheet.path;
-  const Page page = MakePage({AnnotatedReport(inDocument, inPublished), inSheet.text, name});
-  if (!page.messages.empty() && inOptions.warn)
-    inOptions.warn(name + ": " + page.messages.substr(0, page.messages.find('\n')));
   ZORFoundation::WriteWholeFile(folder + kPageFile, page.bytes, written);
 }
 
