@@ -163,19 +163,20 @@ std::vector<Snapshot> SnapshotMaker::Make(const std::vector<const InterferenceRe
   std::vector<std::size_t> wanted;
   InterferenceScenes scenes(hasModel ? inOpenModel() : ZORIProduct_var());
   for (std::size_t i = 0; i < inRecords.size(); ++i) {
-    resolved.push_back(scenes.Resolve(*inRecords[i], ProductPlaces::kResult));
+    ResolvedInterference shown = scenes.Resolve(*inRecords[i], ProductPlaces::kResult);
     Snapshot& snapshot = snapshots[i];
-    snapshot.colours = {Colour(resolved[i].products[0].colour, "46A0DC"),
-                        Colour(resolved[i].products[1].colour, "F0961E")};
+    snapshot.colours = {Colour(shown.products[0].colour, "46A0DC"),
+                        Colour(shown.products[1].colour, "F0961E")};
     snapshot.picture = ReadyPicture(*inRecords[i], hasModel);
-    snapshot.showsProducts = !snapshot.picture.empty() || resolved[i].HasProduct();
+    snapshot.showsProducts = !snapshot.picture.empty() || shown.HasProduct();
     snapshot.aspectRatio = kDefaultAspect;
     if (snapshot.picture.empty()) {
       wanted.push_back(i);
+      resolved.push_back(std::move(shown));
     } else {
       const PictureSize size = *SizeOfPng(snapshot.picture);
       snapshot.aspectRatio = static_cast<double>(size.width) / size.height;
-      snapshot.camera = CameraOf(MakeScene(resolved[i]), size);
+      snapshot.camera = CameraOf(MakeScene(shown), size);
     }
   }
   Draw(wanted, resolved, snapshots);
@@ -197,7 +198,7 @@ void SnapshotMaker::Draw(const std::vector<std::size_t>& inWanted,
   work.count = inWanted.size();
   work.draw = [&](std::size_t inNumber) {
     const std::size_t i = inWanted[inNumber];
-    const ZORDefault::InterferenceScene scene = MakeScene(inResolved[i]);
+    const ZORDefault::InterferenceScene scene = MakeScene(inResolved[inNumber]);
     const SnapshotCamera camera = CameraOf(scene, options_.size);
     std::ofstream(pathOf(i, ".camera"), std::ios::binary)
         .write(reinterpret_cast<const char*>(&camera), sizeof camera);

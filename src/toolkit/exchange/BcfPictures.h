@@ -44,6 +44,7 @@ class SnapshotMaker {
 
  private:
   std::string ReadyPicture(const InterferenceRecord& inRecord, bool inHasModel) const;
+  /// @param inResolved of those that are wanted, in their order.
   void Draw(const std::vector<std::size_t>& inWanted,
             const std::vector<ResolvedInterference>& inResolved,
             std::vector<Snapshot>& ioSnapshots);

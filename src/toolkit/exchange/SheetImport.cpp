@@ -88,7 +88,7 @@ class Workbook {
   void ForEachRow(const RowVisit& inVisit) {
     for (auto& [name, bytes] : sheets_) {
       const DOM_Node root = ParseXml(path_ + ": " + name, bytes);
-      bytes = std::string();
+      std::string().swap(bytes);  // an assignment would keep the memory
       bool goesOn = true;
       ForEachLocal(Child(root, "sheetData"), "row", [&](const DOM_Node& inRow) {
         if (!goesOn) return;

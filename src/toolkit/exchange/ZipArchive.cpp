@@ -139,7 +139,7 @@ class EntrySource {
       case ZIP_SOURCE_READ:
         return self->Read(static_cast<char*>(ioData), inLength);
       case ZIP_SOURCE_CLOSE:
-        self->bytes_ = std::string();
+        std::string().swap(self->bytes_);  // an assignment would keep the memory
         return 0;
       case ZIP_SOURCE_STAT:
         zip_stat_init(static_cast<zip_stat_t*>(ioData));
