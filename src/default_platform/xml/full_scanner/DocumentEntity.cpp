@@ -98,13 +98,13 @@ bool DecodesDeclaration(const std::string& inEncoding, std::string_view inBegin)
 /// The declared encoding when it is one that the library leaves to ICU, else empty.
 std::string EncodingForIcu(std::string_view inBegin) {
   // The library reads these itself; every byte is a character or is refused.
-  static constexpr std::array<std::string_view, 8> kOwn = {
+  static constexpr std::array<std::string_view, 8> kReadByLibrary = {
       "us-ascii", "ascii", "iso-8859-1", "latin1", "ebcdic-cp-us", "ibm037", "ibm1047", "ibm1140"};
   if ((!IsBytewise(inBegin) || IsUtf8(inBegin)) && !IsEbcdic(inBegin)) return {};
   std::string declared =
       DeclaredEncoding(IsEbcdic(inBegin) ? AsciiFromEbcdic(inBegin) : std::string(inBegin));
-  const bool isOwn = std::ranges::find(kOwn, declared) != kOwn.end();
-  return !isOwn && IsEncodingName(declared) && DecodesDeclaration(declared, inBegin)
+  const bool isReadByLibrary = std::ranges::find(kReadByLibrary, declared) != kReadByLibrary.end();
+  return !isReadByLibrary && IsEncodingName(declared) && DecodesDeclaration(declared, inBegin)
              ? declared
              : std::string();
 }
