@@ -31,7 +31,8 @@ install(FILES src/default_platform/InterferenceScene.h src/default_platform/Open
 # Not those of the CAD kernel's part, which is loaded by name, and of the toolkit's own sources.
 install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit FILES_MATCHING PATTERN "*.h"
   PATTERN "detection" EXCLUDE
-  REGEX "/(DrawingWorkers|ElementWalk|PageMaker|PictureStore|PublishedFiles|ShippedTexts)[.]h$" EXCLUDE
+  PATTERN "viewer" EXCLUDE
+  REGEX "/(Deviations|DrawingWorkers|ElementWalk|Manifest|PageData|PageLibrary|PageMaker|PictureDrawing|PictureSettings|PictureStore|PublishedFiles|ReferredPictures|ShippedTexts)[.]h$" EXCLUDE
   REGEX "/exchange/(BcfNames|BcfPictures|BcfTopics|DocumentTimes|ExchangeLibrary|ExchangeXml|SheetBase|XmlText)[.]h$" EXCLUDE
   REGEX "/review/(Assignment|Frames|HashInput|LanguageWords|PlaceClusters|ProductMatch|ReviewSource|TomlFile)[.]h$" EXCLUDE)
 install(FILES src/toolkit/detection/Detect.h DESTINATION ${headerDir}/toolkit/detection)

@@ -1,10 +1,13 @@
 <?xml version="1.0" encoding="UTF-8"?>
 <!-- Turns a report of a clash result into the page that "lyra publish" writes. Beside what a report
-     holds, that command gives to the root: page:model, a page:Type for each type and a page:Status
-     for each status, with page:word and page:count; to each interference: page:number, page:type,
-     page:status, page:picture, page:asInModel (why the picture does not have the result's placements)
-     and page:Thumbnail elements; to each of its two products: page:colour, page:preview and
-     page:missing. page:asInModel at the root says that no picture has them, as was asked for. Texts of the document are isolated (bdi), so that none can change
+     holds, that command gives to the root: page:model, page:policy (what the page may load), a
+     page:Type for each type and a page:Status for each status, with page:word and page:count, a
+     page:Cell for each type with a status, page:Style and page:Script (resources/page) and page:Data,
+     JSON for the script; to each interference: page:number, page:id, page:type, page:status,
+     page:picture, page:asInModel (why the picture does not have the result's placements) and
+     page:Thumbnail elements; to each of its two products: page:colour, page:preview and page:missing.
+     page:asInModel at the root says that no picture has them, as was asked for. A picture in the page
+     itself is referred to as "#id". Texts of the document are isolated (bdi), so that none can change
      the direction of what stands around it. -->
 <xsl:stylesheet version="1.0" xmlns:xsl="http://www.w3.org/1999/XSL/Transform"
                 xmlns:page="urn:zorlyra:page" exclude-result-prefixes="page">
@@ -13,11 +16,16 @@
 
   <xsl:variable name="interferences"
                 select="/ClashElement/ClashResult/Interference | /InterferenceElement/Interference[1]"/>
-  <xsl:variable name="hasPictures" select="boolean($interferences/@page:picture)"/>
+  <!-- Those of an older result that this one has no more. -->
+  <xsl:variable name="gone" select="/*/page:Gone/Interference"/>
+  <xsl:variable name="all" select="$interferences | $gone"/>
+  <xsl:variable name="hasBaseline" select="boolean(/*/@page:baseline)"/>
+  <xsl:variable name="hasPictures" select="boolean($all/@page:picture | $all/@page:before)"/>
   <xsl:variable name="mostPoints" select="100"/>
-  <!-- With more interferences than this, a script puts pictures in where they are seen: browsers take long
-       over tens of thousands of lazy ones. -->
-  <xsl:variable name="mostLazy" select="1000"/>
+  <xsl:variable name="mostWords" select="12"/>
+  <!-- With more interferences than this, a script puts sections and pictures in where they are seen: browsers
+       take long over thousands of them. -->
+  <xsl:variable name="mostLazy" select="500"/>
   <xsl:variable name="areMany" select="count($interferences) > $mostLazy"/>
 
   <xsl:variable name="title">
@@ -34,13 +42,14 @@
         <meta name="viewport" content="width=device-width, initial-scale=1"/>
         <meta name="color-scheme" content="light dark"/>
         <meta http-equiv="Content-Security-Policy"
-              content="default-src 'none'; img-src 'self' file: data:; style-src 'unsafe-inline'; script-src 'unsafe-inline'; form-action 'none'; base-uri 'none'"/>
+              content="{/*/@page:policy}"/>
         <link rel="icon" href="data:,"/>
-        <xsl:call-template name="style"/>
+        <style><xsl:value-of select="/*/page:Style"/></style>
       </head>
       <body>
         <xsl:apply-templates select="/ClashElement | /InterferenceElement"/>
-        <xsl:call-template name="script"/>
+        <script type="application/json" id="zor-data"><xsl:value-of select="/*/page:Data"/></script>
+        <script><xsl:value-of select="/*/page:Script"/></script>
       </body>
     </html>
   </xsl:template>
@@ -61,20 +70,18 @@
           <xsl:with-param name="value" select="@page:model"/>
         </xsl:call-template>
         <xsl:call-template name="fact">
+          <xsl:with-param name="name">Compared with</xsl:with-param>
+          <xsl:with-param name="value" select="@page:baseline"/>
+        </xsl:call-template>
+        <xsl:call-template name="fact">
           <xsl:with-param name="name">Interferences</xsl:with-param>
           <xsl:with-param name="value" select="count($interferences)"/>
         </xsl:call-template>
       </dl>
       <xsl:if test="$interferences">
-        <div class="charts">
-          <xsl:call-template name="chart">
-            <xsl:with-param name="name">Type</xsl:with-param>
-            <xsl:with-param name="counts" select="page:Type"/>
-          </xsl:call-template>
-          <xsl:call-template name="chart">
-            <xsl:with-param name="name">Status</xsl:with-param>
-            <xsl:with-param name="counts" select="page:Status"/>
-          </xsl:call-template>
+        <div class="overview">
+          <div><xsl:call-template name="matrix"/></div>
+          <xsl:if test="@page:map"><xsl:call-template name="map"/></xsl:if>
         </div>
       </xsl:if>
       <xsl:if test="@page:asInModel">
@@ -100,9 +107,9 @@
     </header>
     <main>
       <xsl:choose>
-        <xsl:when test="$interferences">
+        <xsl:when test="$all">
           <xsl:call-template name="table"/>
-          <xsl:for-each select="$interferences">
+          <xsl:for-each select="$all">
             <xsl:apply-templates select="." mode="section"/>
           </xsl:for-each>
         </xsl:when>
@@ -117,6 +124,17 @@
     <xsl:param name="value"/>
     <xsl:if test="$value != ''">
       <div><dt><xsl:value-of select="$name"/></dt><dd><bdi><xsl:value-of select="$value"/></bdi></dd></div>
+    </xsl:if>
+  </xsl:template>
+
+  <xsl:template name="length">
+    <xsl:param name="name"/>
+    <xsl:param name="value"/>
+    <xsl:if test="$value != ''">
+      <div>
+        <dt><xsl:value-of select="$name"/></dt>
+        <dd class="value"><xsl:call-template name="number"><xsl:with-param name="text" select="$value"/><xsl:with-param name="unit"> mm</xsl:with-param></xsl:call-template>&#160;mm</dd>
+      </div>
     </xsl:if>
   </xsl:template>
 
@@ -144,7 +162,7 @@
     <xsl:variable name="text">
       <xsl:value-of select="@Name"/>
       <xsl:if test="@Type != ''"><xsl:value-of select="concat(', ', @Type)"/></xsl:if>
-      <xsl:if test="@Clearance != ''"><xsl:value-of select="concat(', clearance ', @Clearance, ' mm')"/></xsl:if>
+      <xsl:if test="@Clearance != ''"><xsl:value-of select="concat(', clearance&#160;', @Clearance, '&#160;mm')"/></xsl:if>
     </xsl:variable>
     <xsl:call-template name="fact">
       <xsl:with-param name="name">Specification</xsl:with-param>
@@ -152,30 +170,109 @@
     </xsl:call-template>
   </xsl:template>
 
-  <!-- A bar whose parts are as long as their counts, and what they mean. -->
-  <xsl:template name="chart">
-    <xsl:param name="name"/>
-    <xsl:param name="counts"/>
-    <figure class="chart">
-      <figcaption><xsl:value-of select="$name"/></figcaption>
-      <div class="bar" aria-hidden="true">
-        <xsl:for-each select="$counts">
-          <xsl:variable name="class"><xsl:call-template name="class"><xsl:with-param name="word" select="@page:word"/></xsl:call-template></xsl:variable>
-          <span class="{$class}" style="flex-grow:{@page:count}"></span>
+  <!-- How many of each type have each status. Of very many words the most frequent ones. -->
+  <xsl:template name="matrix">
+    <xsl:variable name="root" select="."/>
+    <xsl:variable name="types" select="page:Type[position() &lt;= $mostWords]"/>
+    <xsl:variable name="statuses" select="page:Status[position() &lt;= $mostWords]"/>
+    <table id="matrix">
+      <caption>Interferences by type and status</caption>
+      <thead>
+        <tr>
+          <th scope="col">Type</th>
+          <xsl:for-each select="$statuses">
+            <th scope="col" class="number"><xsl:call-template name="short"><xsl:with-param name="text" select="@page:word"/></xsl:call-template></th>
+          </xsl:for-each>
+          <th scope="col" class="number">All</th>
+        </tr>
+      </thead>
+      <tbody>
+        <xsl:for-each select="$types">
+          <xsl:variable name="type" select="@page:word"/>
+          <xsl:variable name="class"><xsl:call-template name="class"><xsl:with-param name="word" select="$type"/></xsl:call-template></xsl:variable>
+          <tr>
+            <th scope="row"><span class="dot {$class}"></span><xsl:call-template name="short"><xsl:with-param name="text" select="$type"/></xsl:call-template></th>
+            <xsl:for-each select="$statuses">
+              <xsl:variable name="count" select="$root/page:Cell[@page:type = $type and @page:word = current()/@page:word]/@page:count"/>
+              <td class="number">
+                <xsl:choose>
+                  <xsl:when test="$count"><xsl:value-of select="$count"/></xsl:when>
+                  <xsl:otherwise><span class="none">0</span></xsl:otherwise>
+                </xsl:choose>
+              </td>
+            </xsl:for-each>
+            <td class="number all"><xsl:value-of select="@page:count"/></td>
+          </tr>
         </xsl:for-each>
+      </tbody>
+      <tfoot>
+        <tr>
+          <th scope="row">All</th>
+          <xsl:for-each select="$statuses"><td class="number"><xsl:value-of select="@page:count"/></td></xsl:for-each>
+          <td class="number all"><xsl:value-of select="count($interferences)"/></td>
+        </tr>
+      </tfoot>
+    </table>
+    <xsl:if test="count(page:Type) > $mostWords or count(page:Status) > $mostWords">
+      <p class="note">The most frequent types and statuses are counted here.</p>
+    </xsl:if>
+  </xsl:template>
+
+  <!-- The whole model, with a link where each interference is. -->
+  <xsl:template name="map">
+    <figure class="map">
+      <div>
+        <xsl:call-template name="image">
+          <xsl:with-param name="path" select="@page:map"/>
+          <xsl:with-param name="meaning">The whole model</xsl:with-param>
+        </xsl:call-template>
+        <svg class="points" viewBox="0 0 1000 {@page:mapHeight}" role="group" aria-label="Where the interferences are">
+          <xsl:for-each select="$interferences[@page:mapX]">
+            <xsl:variable name="class"><xsl:call-template name="class"><xsl:with-param name="word" select="@page:type"/></xsl:call-template></xsl:variable>
+            <a class="{$class}" href="#i{@page:number}" data-n="{@page:number}" aria-label="Interference {@page:number}">
+              <circle cx="{@page:mapX}" cy="{@page:mapY}" r="{16 - 9 * $areMany}"/>
+              <xsl:if test="not($areMany)"><text x="{@page:mapX}" y="{@page:mapY}" dy=".35em"><xsl:value-of select="@page:number"/></text></xsl:if>
+            </a>
+          </xsl:for-each>
+        </svg>
       </div>
-      <ul>
-        <xsl:for-each select="$counts">
-          <xsl:variable name="class"><xsl:call-template name="class"><xsl:with-param name="word" select="@page:word"/></xsl:call-template></xsl:variable>
-          <li>
-            <span class="dot {$class}"></span>
-            <strong><xsl:value-of select="@page:count"/></strong>
-            <xsl:text> </xsl:text>
-            <xsl:call-template name="short"><xsl:with-param name="text" select="@page:word"/></xsl:call-template>
-          </li>
-        </xsl:for-each>
-      </ul>
     </figure>
+  </xsl:template>
+
+  <!-- A number with three significant digits, its whole part kept; all of it where the pointer rests. -->
+  <xsl:template name="number">
+    <xsl:param name="text"/>
+    <xsl:param name="unit"/>
+    <xsl:variable name="number" select="number(translate($text, ',', '.'))"/>
+    <xsl:variable name="size" select="$number * (1 - 2 * ($number &lt; 0))"/>
+    <xsl:variable name="form">
+      <xsl:choose>
+        <xsl:when test="not($size > 0.00001) or $size > 1000000000000"/>
+        <xsl:when test="$size >= 99.95">0</xsl:when>
+        <xsl:when test="$size >= 9.995">0.0</xsl:when>
+        <xsl:when test="$size >= 0.9995">0.00</xsl:when>
+        <xsl:when test="$size >= 0.09995">0.000</xsl:when>
+        <xsl:when test="$size >= 0.009995">0.0000</xsl:when>
+        <xsl:when test="$size >= 0.0009995">0.00000</xsl:when>
+        <xsl:when test="$size >= 0.00009995">0.000000</xsl:when>
+        <xsl:otherwise>0.0000000</xsl:otherwise>
+      </xsl:choose>
+    </xsl:variable>
+    <xsl:variable name="rounded">
+      <xsl:if test="$form != ''"><xsl:value-of select="format-number($number, $form)"/></xsl:if>
+    </xsl:variable>
+    <xsl:choose>
+      <xsl:when test="$rounded != '' and string-length($rounded) &lt; string-length($text)">
+        <data value="{$text}" title="{$text}{$unit}">
+          <xsl:choose>
+            <xsl:when test="contains($text, ',')"><xsl:value-of select="translate($rounded, '.', ',')"/></xsl:when>
+            <xsl:otherwise><xsl:value-of select="$rounded"/></xsl:otherwise>
+          </xsl:choose>
+        </data>
+      </xsl:when>
+      <xsl:when test="$number = $number"><data value="{$text}"><xsl:value-of select="$text"/></data></xsl:when>
+      <xsl:otherwise><xsl:call-template name="short"><xsl:with-param name="text" select="$text"/></xsl:call-template></xsl:otherwise>
+    </xsl:choose>
   </xsl:template>
 
   <!-- Only known words become classes. -->
@@ -213,50 +310,109 @@
       <label>Search <input type="search" name="text" autocomplete="off"/></label>
       <label>Type <select name="type"><option value="">All</option></select></label>
       <label>Status <select name="status"><option value="">All</option></select></label>
+      <xsl:if test="$hasBaseline"><label>Change <select name="change"><option value="">All</option></select></label></xsl:if>
       <output aria-live="polite"></output>
     </form>
     <div class="wide">
       <table id="interferences">
-        <xsl:if test="$hasPictures"><xsl:attribute name="class">pictured</xsl:attribute></xsl:if>
+        <xsl:attribute name="class">
+          <xsl:if test="$hasPictures">pictured </xsl:if>
+          <xsl:if test="$hasBaseline">changes </xsl:if>
+          <xsl:if test="not($interferences/@Value != '')">no-value </xsl:if>
+          <xsl:if test="not($interferences/Product)">no-products </xsl:if>
+          <xsl:if test="not($interferences/ViolatedRule[last()]/@Name != '')">no-rule </xsl:if>
+          <xsl:if test="not($interferences/Comment[last()]/@Value != '')">no-comment</xsl:if>
+        </xsl:attribute>
         <thead>
           <tr>
             <th class="number" scope="col">N</th>
             <xsl:if test="$hasPictures"><th scope="col" class="plain">Picture</th></xsl:if>
             <th scope="col">Type</th>
-            <th class="number" scope="col">Value</th>
-            <th scope="col">Status</th>
-            <th scope="col">Products</th>
-            <th scope="col">Rule</th>
-            <th scope="col">Comment</th>
+            <th class="number value" scope="col" title="Millimetres">Value</th>
+            <th class="status" scope="col">Status</th>
+            <xsl:if test="$hasBaseline"><th class="change" scope="col">Change</th></xsl:if>
+            <th class="products" scope="col">Products</th>
+            <th class="rule" scope="col">Rule</th>
+            <th class="comment" scope="col">Comment</th>
           </tr>
         </thead>
-        <tbody><xsl:apply-templates select="$interferences" mode="row"/></tbody>
+        <tbody><xsl:apply-templates select="$all" mode="row"/></tbody>
       </table>
     </div>
   </xsl:template>
 
   <xsl:template match="Interference" mode="row">
-    <tr data-n="{@page:number}" data-type="{@page:type}" data-status="{@page:status}">
-      <td class="number"><a href="#i{@page:number}"><xsl:value-of select="@page:number"/></a></td>
+    <tr data-n="{@page:number}" data-id="{@page:id}" data-type="{@page:type}" data-status="{@page:status}">
+      <xsl:if test="$hasBaseline"><xsl:attribute name="data-change"><xsl:value-of select="@page:change"/></xsl:attribute></xsl:if>
+      <td class="number"><a href="#i{@page:number}"><xsl:call-template name="shownNumber"/></a></td>
       <xsl:if test="$hasPictures">
         <td class="thumb">
-          <xsl:if test="@page:picture">
+          <xsl:if test="@page:picture | @page:before">
             <a href="#i{@page:number}">
-              <xsl:call-template name="image"><xsl:with-param name="path" select="@page:picture"/></xsl:call-template>
+              <xsl:call-template name="image">
+                <xsl:with-param name="path" select="concat(@page:picture, substring(@page:before, 1, string-length(@page:before) * not(@page:picture)))"/>
+                <xsl:with-param name="meaning" select="concat('To interference ', @page:number)"/>
+                <xsl:with-param name="isLater" select="true()"/>
+              </xsl:call-template>
             </a>
           </xsl:if>
         </td>
       </xsl:if>
       <td><xsl:call-template name="type"/></td>
-      <td class="number"><xsl:call-template name="short"><xsl:with-param name="text" select="@Value"/></xsl:call-template></td>
-      <td><xsl:call-template name="short"><xsl:with-param name="text" select="@page:status"/></xsl:call-template></td>
+      <td class="number value"><xsl:call-template name="number"><xsl:with-param name="text" select="@Value"/><xsl:with-param name="unit"> mm</xsl:with-param></xsl:call-template></td>
+      <td class="status"><xsl:call-template name="short"><xsl:with-param name="text" select="@page:status"/></xsl:call-template></td>
+      <xsl:if test="$hasBaseline"><td class="change"><xsl:value-of select="@page:change"/></td></xsl:if>
       <td class="products">
         <xsl:apply-templates select="Product[1]" mode="name"/>
         <xsl:apply-templates select="Product[position() > 1][last()]" mode="name"/>
       </td>
-      <td><xsl:call-template name="short"><xsl:with-param name="text" select="ViolatedRule[last()]/@Name"/></xsl:call-template></td>
+      <td class="rule"><xsl:call-template name="short"><xsl:with-param name="text" select="ViolatedRule[last()]/@Name"/></xsl:call-template></td>
       <td class="comment"><xsl:call-template name="short"><xsl:with-param name="text" select="Comment[last()]/@Value"/></xsl:call-template></td>
     </tr>
+  </xsl:template>
+
+  <!-- Of the older result it is marked. -->
+  <xsl:template name="shownNumber">
+    <xsl:choose>
+      <xsl:when test="starts-with(@page:number, 'old-')"><xsl:value-of select="concat(substring(@page:number, 5), '′')"/></xsl:when>
+      <xsl:otherwise><xsl:value-of select="@page:number"/></xsl:otherwise>
+    </xsl:choose>
+  </xsl:template>
+
+  <!-- What became of it since the older result. -->
+  <xsl:template name="change">
+    <xsl:if test="@page:change">
+      <p class="became" data-change="{@page:change}">
+        <strong class="change"><xsl:value-of select="@page:change"/></strong>
+        <xsl:text> since </xsl:text>
+        <bdi><xsl:value-of select="/*/@page:baseline"/></bdi>
+        <xsl:if test="@page:reason">: <bdi><xsl:value-of select="@page:reason"/></bdi></xsl:if>
+      </p>
+      <xsl:if test="page:Change">
+        <ul class="became">
+          <xsl:for-each select="page:Change">
+            <li>
+              <xsl:value-of select="@page:what"/>
+              <xsl:text>: </xsl:text>
+              <xsl:call-template name="number"><xsl:with-param name="text" select="@page:from"/></xsl:call-template>
+              <xsl:text> → </xsl:text>
+              <xsl:call-template name="number"><xsl:with-param name="text" select="@page:to"/></xsl:call-template>
+            </li>
+          </xsl:for-each>
+        </ul>
+      </xsl:if>
+      <xsl:if test="@page:before">
+        <figure class="before">
+          <a class="zoom" href="{@page:before}">
+            <xsl:call-template name="image">
+              <xsl:with-param name="path" select="@page:before"/>
+              <xsl:with-param name="meaning" select="concat('Picture before, of ', @page:number)"/>
+            </xsl:call-template>
+          </a>
+          <figcaption class="note">Before</figcaption>
+        </figure>
+      </xsl:if>
+    </xsl:if>
   </xsl:template>
 
   <xsl:template match="Product" mode="name">
@@ -281,91 +437,101 @@
 
   <xsl:template name="swatch">
     <xsl:if test="@page:colour">
-      <span class="swatch" style="background:{@page:colour}" title="Colour in the picture"></span>
+      <svg class="swatch" viewBox="0 0 1 1" role="img" aria-label="Colour in the picture"><rect width="1" height="1" fill="{@page:colour}"/></svg>
     </xsl:if>
   </xsl:template>
 
   <!-- Sections -->
   <xsl:template match="Interference" mode="section">
     <section id="i{@page:number}" class="interference" data-n="{@page:number}">
-      <h2>
-        <a class="back" href="#interferences" title="To the table"><xsl:value-of select="@page:number"/></a>
-        <xsl:call-template name="type"/>
-        <xsl:if test="@Value != ''">
-          <span class="value"><bdi><xsl:value-of select="@Value"/></bdi> mm</span>
-        </xsl:if>
-        <span class="status"><bdi><xsl:value-of select="@page:status"/></bdi></span>
-      </h2>
-      <div class="body">
-        <xsl:if test="@page:picture">
-          <figure class="picture">
-            <a class="zoom" href="{@page:picture}">
-              <xsl:call-template name="image">
-                <xsl:with-param name="path" select="@page:picture"/>
-                <xsl:with-param name="meaning" select="concat('Picture of interference ', @page:number)"/>
-              </xsl:call-template>
-            </a>
-            <xsl:if test="page:Thumbnail">
-              <div class="thumbnails">
-                <xsl:for-each select="page:Thumbnail[position() &lt;= $mostPoints]">
-                  <a class="zoom" href="{@href}">
-                    <xsl:call-template name="image">
-                      <xsl:with-param name="path" select="@href"/>
-                      <xsl:with-param name="meaning" select="concat('Point ', position())"/>
-                    </xsl:call-template>
-                  </a>
-                </xsl:for-each>
-              </div>
-            </xsl:if>
-            <xsl:if test="@page:asInModel">
-              <figcaption class="note">As in the model: <bdi><xsl:value-of select="@page:asInModel"/></bdi></figcaption>
-            </xsl:if>
-          </figure>
-        </xsl:if>
-        <div class="details">
-          <xsl:choose>
-            <xsl:when test="Product">
-              <xsl:apply-templates select="Product[1]" mode="card"/>
-              <xsl:apply-templates select="Product[position() > 1][last()]" mode="card"/>
-            </xsl:when>
-            <xsl:otherwise><p class="note">The document names no product.</p></xsl:otherwise>
-          </xsl:choose>
-          <dl class="facts">
-            <xsl:call-template name="fact">
-              <xsl:with-param name="name">Name</xsl:with-param>
-              <xsl:with-param name="value" select="@Name"/>
-            </xsl:call-template>
-            <xsl:call-template name="fact">
-              <xsl:with-param name="name">Result</xsl:with-param>
-              <xsl:with-param name="value" select="../self::ClashResult/@Name"/>
-            </xsl:call-template>
-            <xsl:apply-templates select="ViolatedRule[last()]"/>
-            <xsl:if test="@DistanceClearance != ''">
-              <xsl:call-template name="fact">
-                <xsl:with-param name="name">Clearance</xsl:with-param>
-                <xsl:with-param name="value" select="concat(@DistanceClearance, ' mm')"/>
-              </xsl:call-template>
-            </xsl:if>
-            <xsl:apply-templates select="GeometricAspect[last()]"/>
-            <xsl:call-template name="fact">
-              <xsl:with-param name="name">Age</xsl:with-param>
-              <xsl:with-param name="value" select="@RetrieveInf"/>
-            </xsl:call-template>
-          </dl>
-          <xsl:if test="GeometricAspect/Point"><xsl:call-template name="points"/></xsl:if>
-          <xsl:if test="Comment[last()]/@Value != ''">
-            <blockquote><bdi><xsl:value-of select="Comment[last()]/@Value"/></bdi></blockquote>
-          </xsl:if>
-        </div>
-      </div>
+      <xsl:choose>
+        <xsl:when test="$areMany"><noscript class="later"><xsl:call-template name="section"/></noscript></xsl:when>
+        <xsl:otherwise><xsl:call-template name="section"/></xsl:otherwise>
+      </xsl:choose>
     </section>
+  </xsl:template>
+
+  <xsl:template name="section">
+    <h2>
+      <a class="back" href="#interferences" title="To the table"><xsl:call-template name="shownNumber"/></a>
+      <xsl:call-template name="type"/>
+      <xsl:if test="@Value != ''">
+        <span class="value"><xsl:call-template name="number"><xsl:with-param name="text" select="@Value"/><xsl:with-param name="unit"> mm</xsl:with-param></xsl:call-template>&#160;mm</span>
+      </xsl:if>
+      <span class="status"><bdi><xsl:value-of select="@page:status"/></bdi></span>
+    </h2>
+    <div class="body">
+      <xsl:if test="@page:picture">
+        <figure class="picture">
+          <a class="zoom" href="{@page:picture}">
+            <xsl:call-template name="image">
+              <xsl:with-param name="path" select="@page:picture"/>
+              <xsl:with-param name="meaning" select="concat('Picture of interference ', @page:number)"/>
+            </xsl:call-template>
+          </a>
+          <xsl:if test="page:Thumbnail">
+            <div class="thumbnails">
+              <xsl:for-each select="page:Thumbnail[position() &lt;= $mostPoints]">
+                <a class="zoom" href="{@href}">
+                  <xsl:call-template name="image">
+                    <xsl:with-param name="path" select="@href"/>
+                    <xsl:with-param name="meaning" select="concat('Point ', position())"/>
+                  </xsl:call-template>
+                </a>
+              </xsl:for-each>
+            </div>
+          </xsl:if>
+          <xsl:if test="@page:asInModel">
+            <figcaption class="note">As in the model: <bdi><xsl:value-of select="@page:asInModel"/></bdi></figcaption>
+          </xsl:if>
+        </figure>
+      </xsl:if>
+      <div class="details">
+        <xsl:call-template name="change"/>
+        <xsl:choose>
+          <xsl:when test="Product">
+            <xsl:apply-templates select="Product[1]" mode="card"/>
+            <xsl:apply-templates select="Product[position() > 1][last()]" mode="card"/>
+          </xsl:when>
+          <xsl:otherwise><p class="note">The document names no product.</p></xsl:otherwise>
+        </xsl:choose>
+        <dl class="facts">
+          <xsl:call-template name="fact">
+            <xsl:with-param name="name">Name</xsl:with-param>
+            <xsl:with-param name="value" select="@Name"/>
+          </xsl:call-template>
+          <xsl:call-template name="fact">
+            <xsl:with-param name="name">Result</xsl:with-param>
+            <xsl:with-param name="value" select="../self::ClashResult/@Name"/>
+          </xsl:call-template>
+          <xsl:apply-templates select="ViolatedRule[last()]"/>
+          <xsl:call-template name="length">
+            <xsl:with-param name="name">Clearance</xsl:with-param>
+            <xsl:with-param name="value" select="@DistanceClearance"/>
+          </xsl:call-template>
+          <xsl:apply-templates select="GeometricAspect[last()]"/>
+          <xsl:call-template name="fact">
+            <xsl:with-param name="name">Age</xsl:with-param>
+            <xsl:with-param name="value" select="@RetrieveInf"/>
+          </xsl:call-template>
+        </dl>
+        <xsl:if test="GeometricAspect/Point"><xsl:call-template name="points"/></xsl:if>
+        <xsl:if test="Comment[last()]/@Value != ''">
+          <blockquote><bdi><xsl:value-of select="Comment[last()]/@Value"/></bdi></blockquote>
+        </xsl:if>
+      </div>
+    </div>
   </xsl:template>
 
   <xsl:template name="image">
     <xsl:param name="path"/>
     <xsl:param name="meaning"/>
+    <xsl:param name="isLater" select="false()"/>
     <xsl:choose>
-      <xsl:when test="$areMany">
+      <xsl:when test="starts-with($path, '#')">
+        <svg class="image" role="img" aria-label="{$meaning}"><use href="{$path}"/></svg>
+      </xsl:when>
+      <xsl:when test="$areMany and $isLater">
         <noscript class="later"><img src="{$path}" alt="{$meaning}" loading="lazy" decoding="async"/></noscript>
       </xsl:when>
       <xsl:otherwise><img src="{$path}" alt="{$meaning}" loading="lazy" decoding="async"/></xsl:otherwise>
@@ -376,7 +542,10 @@
     <div class="card">
       <xsl:if test="@page:preview">
         <a class="zoom" href="{@page:preview}">
-          <xsl:call-template name="image"><xsl:with-param name="path" select="@page:preview"/></xsl:call-template>
+          <xsl:call-template name="image">
+            <xsl:with-param name="path" select="@page:preview"/>
+            <xsl:with-param name="meaning">Picture of the product</xsl:with-param>
+          </xsl:call-template>
         </a>
       </xsl:if>
       <div>
@@ -399,7 +568,7 @@
     <xsl:variable name="text">
       <xsl:value-of select="@Name"/>
       <xsl:if test="@Severity != ''"><xsl:value-of select="concat(', ', @Severity)"/></xsl:if>
-      <xsl:if test="@Clearance != ''"><xsl:value-of select="concat(', clearance ', @Clearance, ' mm')"/></xsl:if>
+      <xsl:if test="@Clearance != ''"><xsl:value-of select="concat(', clearance&#160;', @Clearance, '&#160;mm')"/></xsl:if>
     </xsl:variable>
     <xsl:call-template name="fact">
       <xsl:with-param name="name">Violated rule</xsl:with-param>
@@ -408,13 +577,11 @@
   </xsl:template>
 
   <xsl:template match="GeometricAspect">
-    <xsl:if test="@IntersectCurveLength != ''">
-      <xsl:call-template name="fact">
-        <xsl:with-param name="name">Curve length</xsl:with-param>
-        <xsl:with-param name="value" select="concat(@IntersectCurveLength, ' mm')"/>
-      </xsl:call-template>
-    </xsl:if>
-    <xsl:call-template name="fact">
+    <xsl:call-template name="length">
+      <xsl:with-param name="name">Curve length</xsl:with-param>
+      <xsl:with-param name="value" select="@IntersectCurveLength"/>
+    </xsl:call-template>
+    <xsl:call-template name="length">
       <xsl:with-param name="name">Measured value</xsl:with-param>
       <xsl:with-param name="value" select="@ExtractOrDistValue"/>
     </xsl:call-template>
@@ -433,7 +600,11 @@
       <ol>
         <xsl:for-each select="GeometricAspect/Point">
           <xsl:if test="position() &lt;= $mostPoints">
-            <li><bdi><xsl:value-of select="concat(@Ux, '  ', @Uy, '  ', @Uz)"/></bdi></li>
+            <li>
+              <span class="coordinate"><xsl:call-template name="number"><xsl:with-param name="text" select="@Ux"/></xsl:call-template></span>
+              <span class="coordinate"><xsl:call-template name="number"><xsl:with-param name="text" select="@Uy"/></xsl:call-template></span>
+              <span class="coordinate"><xsl:call-template name="number"><xsl:with-param name="text" select="@Uz"/></xsl:call-template></span>
+            </li>
           </xsl:if>
         </xsl:for-each>
       </ol>
@@ -441,194 +612,5 @@
         <p class="note"><xsl:value-of select="concat('The other ', $count - $mostPoints, ' are in report.xml.')"/></p>
       </xsl:if>
     </details>
-  </xsl:template>
-
-  <xsl:template name="style">
-    <style>
-:root { --ink:#1d2329; --soft:#66707a; --line:#e2e5e8; --paper:#fff; --panel:#f6f7f8; --accent:#1f5fa8;
-  --clash:#b3261e; --contact:#9a6200; --clearance:#1f6f9f; --relevant:#7a4fa3; --irrelevant:#8b959e; --open:#3d7a5a; --other:#6f7780; }
-@media (prefers-color-scheme: dark) { :root { --ink:#e4e7ea; --soft:#98a2ac; --line:#2f363d; --paper:#15191d; --panel:#1d2227; --accent:#83b6ee;
-  --clash:#f0857d; --contact:#e0ad55; --clearance:#74bde6; --relevant:#c3a0e6; --irrelevant:#7c868f; --open:#7fc29f; --other:#8e979f; } }
-* { box-sizing:border-box }
-body { margin:0 auto; padding:2rem clamp(1rem,4vw,3rem) 4rem; max-width:84rem; background:var(--paper); color:var(--ink);
-  font:15px/1.5 system-ui,-apple-system,"Segoe UI",Roboto,"Noto Sans",sans-serif; overflow-wrap:anywhere }
-a { color:var(--accent); text-decoration:none } a:hover { text-decoration:underline }
-:focus-visible { outline:2px solid var(--accent); outline-offset:2px }
-.kind { margin:0; color:var(--soft); font-size:.8rem; letter-spacing:.08em; text-transform:uppercase }
-h1 { margin:.1rem 0 1rem; font-size:1.9rem; line-height:1.2; font-weight:650 }
-.facts { display:flex; flex-wrap:wrap; gap:.7rem 2.2rem; margin:0 }
-.facts dt { color:var(--soft); font-size:.8rem } .facts dd { margin:0 }
-.charts { display:grid; grid-template-columns:repeat(auto-fit,minmax(17rem,1fr)); gap:1.2rem 2.5rem; margin:1.6rem 0 }
-.chart { margin:0 } .chart figcaption { color:var(--soft); font-size:.8rem; margin-bottom:.35rem }
-.bar { display:flex; gap:2px; height:.7rem; border-radius:.35rem; overflow:hidden }
-.bar span { flex-basis:3px; background:var(--c) }
-.chart ul { display:flex; flex-wrap:wrap; gap:.2rem 1.2rem; margin:.5rem 0 0; padding:0; list-style:none; font-size:.9rem }
-.dot { display:inline-block; width:.6rem; height:.6rem; border-radius:50%; background:var(--c); margin-right:.2rem }
-.clash { --c:var(--clash) } .contact { --c:var(--contact) } .clearance { --c:var(--clearance) } .other { --c:var(--other) }
-.relevant { --c:var(--relevant) } .irrelevant { --c:var(--irrelevant) } .open { --c:var(--open) }
-.type { color:var(--c); font-weight:600 }
-.notice { background:var(--panel); border-left:3px solid var(--contact); padding:.6rem .9rem; border-radius:.25rem }
-.missing { color:var(--contact); border:1px solid currentColor; border-radius:.25rem; font-size:.72rem; padding:0 .3rem; white-space:nowrap }
-.filters { display:flex; flex-wrap:wrap; gap:.6rem 1.2rem; align-items:center; margin:2rem 0 .6rem; color:var(--soft); font-size:.85rem }
-.filters[hidden] { display:none }
-.filters input,.filters select { font:inherit; color:var(--ink); background:var(--panel); border:1px solid var(--line); border-radius:.35rem; padding:.3rem .5rem; margin-left:.3rem; max-width:16rem }
-@media screen { h1,.facts dd,h2 > *,.card strong,.card .note,figcaption { max-height:9em; overflow:auto } h1 { max-height:7.2em } }
-.filters output { margin-left:auto }
-.wide { overflow-x:auto; margin-top:1rem }
-table { border-collapse:collapse; width:100%; font-size:.9rem }
-th,td { text-align:start; vertical-align:top; padding:.5rem .7rem; border-bottom:1px solid var(--line); overflow:clip }
-th { color:var(--soft); font-weight:600; font-size:.8rem; white-space:nowrap }
-th button { all:unset; cursor:pointer; color:inherit } th button:hover { color:var(--ink) }
-th button:focus-visible { outline:2px solid var(--accent) }
-th[aria-sort=ascending] button::after { content:" ↑" } th[aria-sort=descending] button::after { content:" ↓" }
-tbody tr:hover { background:var(--panel) }
-.number { text-align:right; font-variant-numeric:tabular-nums } .number:first-child { white-space:nowrap } td.comment { color:var(--soft) }
-/* Rows of fixed columns, so that of thousands only those are laid out that are seen. */
-@media screen {
-  table,thead,tbody { display:block } table { min-width:60rem }
-  tr { display:grid; grid-template-columns:var(--columns); --columns:3.5rem 7rem 6.8rem 8.5rem minmax(15rem,2fr) minmax(5rem,.6fr) minmax(9rem,1fr) }
-  .pictured tr { --columns:3.5rem 7.5rem 7rem 6.8rem 8.5rem minmax(15rem,2fr) minmax(5rem,.6fr) minmax(9rem,1fr) }
-  th,td { border:0 } tr { border-bottom:1px solid var(--line) } tr[hidden] { display:none }
-  tbody tr { content-visibility:auto; contain-intrinsic-size:auto 2.5rem } .pictured tbody tr { contain-intrinsic-size:auto 5.1rem }
-}
-img { background:#fff; border-radius:.3rem }
-.thumb a,.card a { min-height:64px } .thumb img,.card img { display:block; width:96px; height:64px; object-fit:cover; border:1px solid var(--line) }
-.swatch { display:inline-block; width:.75rem; height:.75rem; border-radius:.2rem; margin-right:.4rem; vertical-align:-.05rem; border:1px solid #0003; box-shadow:0 0 0 1px #fff3 }
-.interference { margin-top:2.5rem; padding-top:1.2rem; border-top:1px solid var(--line); scroll-margin-top:1rem }
-@media screen { .interference { content-visibility:auto; contain-intrinsic-size:auto 30rem } }
-h2 { display:flex; flex-wrap:wrap; align-items:baseline; gap:.3rem .9rem; margin:0 0 1rem; font-size:1.15rem; font-weight:600 }
-.back { font-variant-numeric:tabular-nums; color:var(--soft) } .value { font-variant-numeric:tabular-nums }
-.status { margin-left:auto; color:var(--soft); font-size:.85rem; font-weight:400 }
-.body { display:grid; grid-template-columns:minmax(0,3fr) minmax(0,2fr); gap:1.8rem }
-.details:first-child { grid-column:1/-1 }
-.picture { margin:0 } .picture > a img { display:block; width:100%; height:auto; aspect-ratio:756/506; object-fit:contain; border:1px solid var(--line) }
-.thumbnails { display:flex; flex-wrap:wrap; gap:.4rem; margin-top:.4rem } .thumbnails img { display:block; width:72px; height:50px; border:1px solid var(--line) }
-.card .product { display:flex; gap:.4rem; align-items:baseline } .card .swatch,.card .missing { flex:none; margin:0 } .card strong { min-width:0 }
-.card { display:flex; gap:.9rem; align-items:flex-start; margin-bottom:1rem } .card a { flex:none }
-.note { color:var(--soft); font-size:.85rem }
-details { margin-top:1rem; font-size:.85rem } summary { cursor:pointer; color:var(--soft) }
-details bdi { white-space:pre-wrap } details ol { margin:.4rem 0 0; padding-left:3rem; max-height:16rem; overflow:auto; font-variant-numeric:tabular-nums }
-blockquote { margin:1rem 0 0; padding:.6rem .9rem; background:var(--panel); border-radius:.35rem; white-space:pre-wrap; max-height:20rem; overflow:auto }
-dialog { padding:0; border:0; background:transparent; max-width:96vw; max-height:96vh } dialog img { display:block; max-width:96vw; max-height:94vh; cursor:zoom-out }
-dialog::backdrop { background:#000c }
-@media (max-width:50rem) { .body { grid-template-columns:1fr } .status { margin-left:0 } body { padding-top:1.2rem } }
-@media print {
-  :root { --ink:#000; --soft:#444; --line:#bbb; --paper:#fff; --panel:#f3f3f3; --accent:#000; --clash:#b3261e; --contact:#9a6200; --clearance:#1f6f9f; --relevant:#7a4fa3; --irrelevant:#8b959e; --open:#3d7a5a; --other:#6f7780 }
-  body { max-width:none; padding:0; font-size:10pt; print-color-adjust:exact; -webkit-print-color-adjust:exact }
-  .filters,.filters[hidden] { display:none } .wide { overflow:visible } thead { display:table-header-group } tr,.card,.picture { break-inside:avoid }
-  th button { display:contents } table { font-size:8pt } .thumb img { width:60px; height:40px } td.products { width:40% }
-  td:nth-last-child(6) { min-width:6.5em } td:nth-last-child(4) { min-width:8em } td:nth-last-child(2) { min-width:5.5em }
-  .body { grid-template-columns:minmax(0,1fr) minmax(0,1fr) } .status { margin-left:auto }
-  .interference { break-inside:avoid; margin-top:1rem; padding-top:.7rem } h2 { margin-bottom:.6rem }
-  blockquote,details ol { max-height:none; overflow:visible }
-}
-    </style>
-  </xsl:template>
-
-  <!-- Sorting, filtering and large pictures for who has scripts; the page says all without. -->
-  <xsl:template name="script">
-    <script>
-(() => {
-  'use strict';
-  const table = document.getElementById('interferences');
-  if (!table) return;
-  const body = table.tBodies[0];
-  const form = document.querySelector('.filters');
-  const rows = Array.from(body.rows, (row, place) => ({
-    row, place, text: row.textContent.toLowerCase(),
-    section: document.getElementById('i' + row.dataset.n) }));
-
-  const offer = (select, name) => {
-    for (const word of new Set(rows.map(item => item.row.dataset[name])))
-      select.append(new Option(word, word));
-    select.prepend(select.querySelector('option[value=""]'));
-    select.value = '';
-  };
-  offer(form.elements.type, 'type');
-  offer(form.elements.status, 'status');
-
-  const filter = () => {
-    const text = form.elements.text.value.trim().toLowerCase();
-    const type = form.elements.type.value, status = form.elements.status.value;
-    let shown = 0;
-    for (const { row, section, text: own } of rows) {
-      const fits = (!type || row.dataset.type === type) &amp;&amp; (!status || row.dataset.status === status) &amp;&amp; own.includes(text);
-      row.hidden = section.hidden = !fits;
-      shown += fits;
-    }
-    form.querySelector('output').value = shown + ' of ' + rows.length + ' shown';
-  };
-  form.addEventListener('input', filter);
-  form.addEventListener('submit', event => event.preventDefault());
-  form.hidden = false;
-  filter();
-
-  const keyOf = (row, column, isNumber) => {
-    const text = row.cells[column].textContent.trim();
-    if (!isNumber) return text;
-    const number = parseFloat(text.replace(',', '.'));
-    return Number.isNaN(number) ? Infinity : number;
-  };
-  const sort = (header, column) => {
-    const isNumber = header.classList.contains('number');
-    const down = header.getAttribute('aria-sort') === 'ascending';
-    for (const other of header.parentNode.cells) other.removeAttribute('aria-sort');
-    header.setAttribute('aria-sort', down ? 'descending' : 'ascending');
-    const order = new Intl.Collator(undefined, { numeric: true });
-    const compare = isNumber ? (a, b) => a &lt; b ? -1 : a > b ? 1 : 0 : order.compare;
-    const keyed = rows.map(item => ({ item, key: keyOf(item.row, column, isNumber) }));
-    keyed.sort((a, b) => (down ? compare(b.key, a.key) : compare(a.key, b.key)) || a.item.place - b.item.place);
-    body.append(...keyed.map(({ item }) => item.row));
-  };
-  Array.from(table.tHead.rows[0].cells).forEach((header, column) => {
-    if (header.classList.contains('plain')) return;
-    const button = document.createElement('button');
-    button.type = 'button';
-    button.textContent = header.textContent;
-    button.addEventListener('click', () => sort(header, column));
-    header.replaceChildren(button);
-  });
-
-  // Pictures of many are put in when their row or section comes near to being seen.
-  const putIn = place => {
-    for (const later of place.querySelectorAll('noscript.later'))
-      later.replaceWith(new DOMParser().parseFromString(later.textContent, 'text/html').body.firstChild);
-  };
-  if (document.querySelector('noscript.later')) {
-    const near = new IntersectionObserver(entries => {
-      for (const { isIntersecting, target } of entries) {
-        if (!isIntersecting) continue;
-        putIn(target);
-        near.unobserve(target);
-      }
-    }, { rootMargin: '100%' });
-    for (const { row, section } of rows) for (const place of [row, section]) near.observe(place);
-    addEventListener('beforeprint', () => putIn(document));
-  }
-
-  const dialog = document.createElement('dialog');
-  const large = document.createElement('img');
-  let current = null, all = null;
-  const links = () => Array.from(document.querySelectorAll('a.zoom')).filter(link => !link.closest('[hidden]'));
-  const show = link => { current = link; large.src = link.href; large.alt = link.firstElementChild.alt || ''; };
-  dialog.append(large);
-  dialog.addEventListener('click', () => dialog.close());
-  dialog.addEventListener('keydown', event => {
-    const step = { ArrowRight: 1, ArrowLeft: -1 }[event.key];
-    if (!step) return;
-    all ??= links();
-    show(all[(all.indexOf(current) + step + all.length) % all.length]);
-  });
-  document.body.append(dialog);
-  document.addEventListener('click', event => {
-    const link = event.target.closest('a.zoom');
-    if (!link || event.ctrlKey || event.metaKey || event.shiftKey || event.button) return;
-    event.preventDefault();
-    all = null;
-    show(link);
-    dialog.showModal();
-  });
-})();
-    </script>
   </xsl:template>
 </xsl:stylesheet>

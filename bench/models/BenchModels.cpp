@@ -12,7 +12,7 @@
 
 #include "ResultHash.h"
 #include "default_platform/OpenModel.h"
-#include "default_platform/visualisation/PartMesh.h"
+#include "default_platform/PartMesh.h"
 
 namespace {
 namespace fs = std::filesystem;

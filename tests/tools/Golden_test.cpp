@@ -35,6 +35,7 @@ std::vector<GoldenCase> Cases() {
       {"help_links", {"links", "--help"}},
       {"help_report", {"report", "--help"}},
       {"help_publish", {"publish", "--help"}},
+      {"help_extract", {"extract", "--help"}},
       {"help_tree", {"tree", "--help"}},
       {"help_render", {"render", "--help"}},
       {"help_detect", {"detect", "--help"}},

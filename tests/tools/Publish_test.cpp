@@ -92,10 +92,41 @@ TEST_F(Publish, SummaryCountsTypesAndStatuses) {
       PageOf(InOneSet("<Interference ResultType='Clash' Status='Relevant'/>"
                       "<Interference ResultType='Clash' Status='Relevant'/>"
                       "<Interference ResultType='Contact'/>"));
-  EXPECT_THAT(page, HasSubstr("<span class=\"clash\" style=\"flex-grow:2\">"));
-  EXPECT_THAT(page, HasSubstr("<strong>1</strong> <bdi>Contact</bdi>"));
-  EXPECT_THAT(page, HasSubstr("<strong>2</strong> <bdi>Relevant</bdi>"));
-  EXPECT_THAT(page, HasSubstr("<strong>1</strong> <bdi>Not stated</bdi>"));
+  EXPECT_THAT(page, HasSubstr("<span class=\"dot clash\"></span><bdi>Clash</bdi>"));
+  EXPECT_THAT(page, HasSubstr("<th scope=\"col\" class=\"number\"><bdi>Not stated</bdi></th>"));
+  EXPECT_EQ(Occurrences(page, "<td class=\"number\">2</td>"), 2u);  // relevant clashes, and all
+  EXPECT_EQ(Occurrences(page, "<span class=\"none\">0</span>"), 2u);
+  EXPECT_THAT(page, HasSubstr("<td class=\"number all\">3</td>"));
+}
+
+TEST_F(Publish, NumbersHaveThreeDigitsAndTheExactOneBeside) {
+  const std::string page = PageOf(InOneSet(
+      "<Interference Value='-0.123456'/><Interference Value='-12,3456'/>"
+      "<Interference Value='1234.56'/><Interference Value='0.5'/><Interference Value='99.96'/>"
+      "<Interference Value='0.00001234'/><Interference Value='deep'/>"));
+  for (const char* shown :
+       {"<data value=\"-0.123456\" title=\"-0.123456 mm\">-0.123</data>",
+        "<data value=\"-12,3456\" title=\"-12,3456 mm\">-12,3</data>", ">1235</data>",
+        "<data value=\"0.5\">0.5</data>", "title=\"99.96 mm\">100</data>", ">0.0000123</data>",
+        "<bdi>deep</bdi>"})
+    EXPECT_EQ(Occurrences(page, shown), 2u) << shown;  // in the row and in the section
+}
+
+TEST_F(Publish, EmptyColumnsAreHidden) {
+  const std::string page = PageOf(InOneSet("<Interference><Comment Value='c'/></Interference>"));
+  EXPECT_THAT(page, HasSubstr("class=\"no-value no-products no-rule \""));
+}
+
+TEST_F(Publish, PolicyAllowsNothingButThePageItself) {
+  Run({kResult});
+  const std::string page = Page();
+  const std::regex policy(
+      "content=\"default-src 'none'; img-src 'self' file: data:; "
+      "style-src 'sha256-[A-Za-z0-9+/]{43}='; script-src 'sha256-[A-Za-z0-9+/]{43}=' "
+      "'strict-dynamic'; form-action 'none'; base-uri 'none'\"");
+  EXPECT_TRUE(std::regex_search(page, policy));
+  EXPECT_THAT(page, Not(HasSubstr(" style=\"")));
+  EXPECT_FALSE(std::regex_search(page, std::regex("<[^>]* on[a-z]+=")));
 }
 
 TEST_F(Publish, ResultWithoutInterferencesHasAPage) {
@@ -158,7 +189,7 @@ TEST_F(Publish, MarkupInEveryFieldIsText) {
              "/><GeometricAspect" + with("IntersectCurveLength ExtractOrDistValue") + "><Point" +
              with("Ux Uy Uz") + "/></GeometricAspect><Comment" + with("Value") + "/><Picture" +
              with("HRef") + "/></Interference></ClashResult></ClashElement>");
-  EXPECT_EQ(Occurrences(page, "<script"), 1u);
+  EXPECT_EQ(Occurrences(page, "<script"), 3u);  // data, script and manifest
   EXPECT_EQ(Occurrences(page, "<script>evil"), 0u);
   EXPECT_GT(Occurrences(page, "&lt;script&gt;evil()"), 15u);
   EXPECT_EQ(Occurrences(page, "=\"\"'>"), 0u);
@@ -189,7 +220,7 @@ TEST_F(Publish, ManyPointsAreCounted) {
       InOneSet("<Interference><GeometricAspect>" + points + "</GeometricAspect></Interference>"));
   EXPECT_THAT(page, HasSubstr("10000 points"));
   EXPECT_THAT(page, HasSubstr("The other 9900 are in report.xml."));
-  EXPECT_EQ(Occurrences(page, "<li><bdi>"), 100u);
+  EXPECT_EQ(Occurrences(page, "<span class=\"coordinate\">"), 300u);
 }
 
 TEST_F(Publish, InterferencesWithoutProductsAreShown) {
@@ -231,7 +262,7 @@ TEST_F(Publish, EachInterferenceHasItsPictureAndItsPreviews) {
   }
   EXPECT_THAT(Report(), HasSubstr("<Picture HRef=\"pictures/interference_32.jpg\""));
   EXPECT_THAT(Report(), HasSubstr("Preview=\"pictures/interference_32_product_2.jpg\""));
-  EXPECT_EQ(Occurrences(Page(), "class=\"swatch\" style=\"background:#"), 4 * 32u);
+  EXPECT_EQ(Occurrences(Page(), "fill=\"#"), 4 * 32u);
 }
 
 TEST_F(Publish, FormatAndSizeAreAsAsked) {

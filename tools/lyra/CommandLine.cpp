@@ -42,6 +42,7 @@ std::span<const Verb> Verbs() {
       {"federate", "Write a federator document that links clash documents", DeclareFederate},
       {"report", "Write a result as an XML report with a style sheet", DeclareReport},
       {"publish", "Write a page of a result, with pictures of a CAD model", DeclarePublish},
+      {"extract", "Give back the result from which a page was made", DeclareExtract},
       {"detect", "Find the interferences of a CAD model", DeclareDetect},
       {"tree", "List the products of a CAD model", DeclareTree},
       {"render", "Draw a picture of a CAD model", DeclareRender},

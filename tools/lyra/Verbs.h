@@ -39,6 +39,7 @@ VerbAction DeclareMerge(Arguments& ioArguments);
 VerbAction DeclareFederate(Arguments& ioArguments);
 VerbAction DeclareReport(Arguments& ioArguments);
 VerbAction DeclarePublish(Arguments& ioArguments);
+VerbAction DeclareExtract(Arguments& ioArguments);
 VerbAction DeclareTree(Arguments& ioArguments);
 VerbAction DeclareRender(Arguments& ioArguments);
 VerbAction DeclareDetect(Arguments& ioArguments);

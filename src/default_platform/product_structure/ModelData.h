@@ -9,7 +9,7 @@
 #include <string_view>
 #include <vector>
 
-#include "default_platform/visualisation/PartMesh.h"
+#include "default_platform/PartMesh.h"
 #include "platform/mathematics/ZORMathTransformation.h"
 
 namespace ZORDefault {

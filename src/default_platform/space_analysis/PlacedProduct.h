@@ -2,7 +2,7 @@
 #ifndef ZOR_DEFAULT_PLATFORM_SPACE_ANALYSIS_PLACEDPRODUCT_H
 #define ZOR_DEFAULT_PLATFORM_SPACE_ANALYSIS_PLACEDPRODUCT_H
 
-#include "default_platform/visualisation/PartMesh.h"
+#include "default_platform/PartMesh.h"
 #include "platform/mathematics/ZORMathTransformation.h"
 #include "platform/product_structure/ZORIProduct.h"
 

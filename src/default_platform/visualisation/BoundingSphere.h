@@ -5,7 +5,7 @@
 #include <array>
 #include <vector>
 
-#include "default_platform/visualisation/PartMesh.h"
+#include "default_platform/PartMesh.h"
 
 namespace ZORDefault {
 

@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "ZORPlatformExport.h"
-#include "default_platform/visualisation/PartMesh.h"
+#include "default_platform/PartMesh.h"
 #include "platform/mathematics/ZORMathTransformation.h"
 #include "platform/visualisation/ZOR3DRep.h"
 

@@ -204,7 +204,7 @@ bool Apply(xsltStylesheet& inSheet, xmlDoc& inDocument, xsltSecurityPrefs& inSec
   return true;
 }
 
-bool MakePage(const PageRequest& inRequest, Page& outPage) {
+bool TryMakePage(const PageRequest& inRequest, Page& outPage) {
   const Security security(MemoryGuard::Run([] { return xsltNewSecurityPrefs(); }));
   if (!security) return false;
   RefuseTheOutside(*security);
@@ -216,21 +216,24 @@ bool MakePage(const PageRequest& inRequest, Page& outPage) {
 }
 
 }  // namespace
-}  // namespace ZORToolkit
 
-#define ZOR_PAGE_EXPORT extern "C" __attribute__((visibility("default")))
-
-ZOR_PAGE_EXPORT bool ZORMakePage(const ZORToolkit::PageRequest& inRequest,
-                                 ZORToolkit::Page& outPage) {
-  ZORToolkit::MemoryGuard::Start();
-  const ZORToolkit::MessagesTo messages(outPage.messages);
-  const bool isMade = ZORToolkit::MakePage(inRequest, outPage);
+bool MakePage(const PageRequest& inRequest, Page& outPage) {
+  MemoryGuard::Start();
+  const MessagesTo messages(outPage.messages);
+  const bool isMade = TryMakePage(inRequest, outPage);
   if (!isMade) {
-    outPage.reason = ZORToolkit::FirstLine(outPage.messages);
+    outPage.reason = FirstLine(outPage.messages);
     if (outPage.reason.empty()) outPage.reason = "the style sheet makes no page";
   }
   return isMade;
 }
 
-ZOR_PAGE_EXPORT const char* ZORReportStyleSheet() { return ZORToolkit::kReportStyleSheet; }
-ZOR_PAGE_EXPORT const char* ZORReportType() { return ZORToolkit::kReportType; }
+}  // namespace ZORToolkit
+
+extern "C" __attribute__((visibility("default"))) const ZORToolkit::PageLibrary* ZORPageLibrary() {
+  using namespace ZORToolkit;
+  static constexpr PageLibrary kLibrary = {
+      MakePage,   kPageStyle, kPageScript, kReportStyleSheet, kReportType,      Sha256,      Base64,
+      FromBase64, Gzip,       Gunzip,      WebpFromPng,       ReorderTriangles, SimplifyMesh};
+  return &kLibrary;
+}

@@ -3,6 +3,7 @@
 #include <fcntl.h>
 
 #include <cerrno>
+#include <cstdlib>
 #include <optional>
 #include <regex>
 #include <sstream>
@@ -20,11 +21,23 @@ constexpr char kFolder[] = "pictures";
 constexpr char kStampFile[] = ".lyra-publish";
 constexpr std::string_view kListStart = "drawn";
 
-/// The parts of a picture's name: the number of its interference, and what kind of picture it is.
-bool IsPictureName(const std::string& inName, std::smatch& outParts) {
+constexpr char kOverview[] = "overview";
+
+/// The parts of a picture's name: the number of its interference, negative in the baseline, 0 for the
+/// overview, and what kind of picture it is.
+struct PictureNameParts {
+  std::string number, kind;
+};
+
+std::optional<PictureNameParts> PartsOfName(const std::string& inName) {
   static const std::regex names(
-      R"(interference_(\d+)((?:_product_[12]|_SubItf_\d+)?\.(?:jpg|png|jpg\.png)))");
-  return std::regex_match(inName, outParts, names);
+      R"((interference|before)_(\d+)((?:_product_[12]|_SubItf_\d+)?\.(?:jpg|png|jpg\.png)))");
+  static const std::regex overviews(R"(overview(\.(?:jpg|png)))");
+  std::smatch parts;
+  if (std::regex_match(inName, parts, overviews)) return PictureNameParts{"0", parts[1]};
+  if (!std::regex_match(inName, parts, names)) return std::nullopt;
+  const bool isBefore = parts[1] == "before";
+  return PictureNameParts{std::string(isBefore ? "-" : "").append(parts[2]), parts[3]};
 }
 
 struct Stamp {
@@ -40,9 +53,8 @@ std::optional<Stamp> ReadStamp(const fs::path& inPath) {
   if (start == std::string::npos) return Stamp{file->bytes, std::nullopt};
   Stamp stamp{file->bytes.substr(0, start + 1), std::set<std::string>()};
   std::istringstream lines(file->bytes.substr(start + 1));
-  std::smatch parts;
   for (std::string line; std::getline(lines, line);)
-    if (IsPictureName(line, parts)) stamp.names->insert(line);
+    if (PartsOfName(line)) stamp.names->insert(line);
   return stamp;
 }
 
@@ -53,7 +65,11 @@ std::string ListText(const std::vector<std::string>& inNames) {
   return text;
 }
 
-std::string Stem(int inNumber) { return "interference_" + std::to_string(inNumber); }
+std::string Stem(int inNumber) {
+  if (inNumber == 0) return kOverview;
+  return std::string(inNumber < 0 ? "before_" : "interference_")
+      .append(std::to_string(std::abs(inNumber)));
+}
 
 bool HasBytes(const fs::path& inPath) {
   std::error_code error;
@@ -100,9 +116,9 @@ std::set<std::string> PictureStore::PicturesOf(const std::set<std::string>& inNu
   std::set<std::string> names;
   for (const fs::directory_entry& entry : fs::directory_iterator(folder_)) {
     const std::string name = entry.path().filename().string();
-    std::smatch parts;
-    if (!IsPictureName(name, parts) || !inNumbers.contains(parts[1])) continue;
-    const std::string kind = parts[2];
+    const std::optional<PictureNameParts> parts = PartsOfName(name);
+    if (!parts || !inNumbers.contains(parts->number)) continue;
+    const std::string& kind = parts->kind;
     if (kind == ending_ || kind == "_product_1" + ending_ || kind == "_product_2" + ending_ ||
         (ending_ == ".png" ? kind.starts_with("_SubItf_") && kind.ends_with(ending_)
                            : kind == ending_ + ".png"))

@@ -31,7 +31,8 @@ class PictureStore {
   /// Lists, in order, the pictures that are there in the end.
   void Settle(const std::string& inStamp) const;
 
-  // Names within the folder
+  // Names within the folder; of interferences, the overview of all has number 0, those of the
+  // baseline have negative ones
   std::string PictureName(int inNumber) const;
   /// @param inProduct 0 or 1.
   std::string PreviewName(int inNumber, std::size_t inProduct) const;

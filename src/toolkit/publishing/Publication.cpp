@@ -1,27 +1,44 @@
 #include "toolkit/publishing/Publication.h"
 
 #include <algorithm>
-#include <cstdlib>
 #include <filesystem>
+#include <regex>
 #include <set>
+#include <unordered_map>
+#include <utility>
 
 #include "PrintPictures.h"
-#include "default_platform/SettingOverride.h"
+#include "foundation/AtomicFile.h"
 #include "foundation/Hash.h"
-#include "platform/system/ZORSettingRepository.h"
-#include "platform/system/ZORSysSettingRepository.h"
+#include "foundation/ReadWholeFile.h"
+#include "foundation/Vector3.h"
+#include "platform/visualisation/ZOR3DRep.h"
+#include "platform/visualisation/ZORI3DGeoVisu.h"
+#include "toolkit/publishing/Deviations.h"
 #include "toolkit/publishing/DrawingWorkers.h"
+#include "toolkit/publishing/Manifest.h"
+#include "toolkit/publishing/OneFile.h"
+#include "toolkit/publishing/PageData.h"
+#include "toolkit/publishing/PageLibrary.h"
+#include "toolkit/publishing/PictureDrawing.h"
+#include "toolkit/publishing/PictureSettings.h"
 #include "toolkit/publishing/PictureStore.h"
 #include "toolkit/publishing/PublishedFiles.h"
+#include "toolkit/publishing/ReferredPictures.h"
 #include "toolkit/publishing/WorkFolder.h"
+#include "toolkit/publishing/viewer/PictureCamera.h"
+#include "toolkit/publishing/viewer/ViewerScene.h"
 #include "toolkit/records/DocumentText.h"
+#include "toolkit/review/Carry.h"
+#include "toolkit/review/Match.h"
 
 namespace fs = std::filesystem;
 
 namespace ZORToolkit {
 namespace {
 
-constexpr char kSettings[] = "ClashPublish", kZoomSetting[] = "PictureZoom";
+constexpr char kGeometryFolder[] = "viewer";
+constexpr int kOverview = 0;  // its number among the pictures
 
 /// A word that the reader could not understand is shown as the document has it.
 std::string ShownWord(const std::string& inWord, const std::string& inAsWritten) {
@@ -39,142 +56,64 @@ PublishedInterference PublishedOf(const InterferenceRecord& inRecord) {
   return published;
 }
 
-/// "1 product", "2 products".
-std::string Counted(std::size_t inCount, const std::string& inThing) {
-  return std::to_string(inCount) + " " + inThing + (inCount == 1 ? "" : "s");
-}
-
-/// A text of UTF-8 for one line among others.
-std::string Shortened(const std::string& inText) {
-  constexpr std::size_t kMaxShown = 160;
-  if (inText.size() <= kMaxShown) return inText;
-  std::size_t end = kMaxShown;
-  while (end > 0 && (inText[end] & 0xC0) == 0x80) --end;
-  return inText.substr(0, end) + "…";
-}
-
-/// Which of a set of texts there are: the first few and how many more.
-std::string Listed(const std::set<std::string>& inTexts) {
-  constexpr std::size_t kMaxListed = 3;
-  std::string list;
-  std::size_t listed = 0;
-  for (const std::string& text : inTexts) {
-    if (++listed > kMaxListed)
-      return list + " and " + std::to_string(inTexts.size() - kMaxListed) + " more";
-    list += (listed == 1 ? "\"" : ", \"") + Shortened(text) + "\"";
-  }
-  return list;
-}
-
-/// What is shown otherwise than the result has it.
-class Deviations {
- public:
-  void Add(int inNumber, const InterferenceRecord& inRecord,
-           const ResolvedInterference& inResolved) {
-    bool isComplete = true;
-    for (std::size_t i = 0; i < 2; ++i) {
-      const ResolvedProduct& product = inResolved.products[i];
-      if (!inRecord.products[i].exists || !product.shown.product.IsNull()) continue;
-      missing_.insert(product.path.empty() ? "(no name)" : product.path);
-      isComplete = false;
-    }
-    incomplete_ += isComplete ? 0 : 1;
-    const std::string& why = inResolved.whyAsInModel;
-    if (inResolved.HasProduct() && !why.empty() && movedBack_++ == 0)
-      whyMovedBack_ = std::to_string(inNumber) + ": " + Shortened(why);
-  }
-  void Report(const PublicationOptions& inOptions) const {
-    if (!inOptions.warn) return;
-    if (incomplete_ > 0)
-      inOptions.warn("the model lacks " + Counted(missing_.size(), "product") + " of " +
-                     Counted(incomplete_, "interference") + ": " + Listed(missing_));
-    if (movedBack_ > 0)
-      inOptions.warn("the products of " + Counted(movedBack_, "interference") +
-                     " are drawn where they stand in the model; interference " + whyMovedBack_);
-  }
-
- private:
-  std::set<std::string> missing_;
-  std::size_t incomplete_ = 0, movedBack_ = 0;
-  std::string whyMovedBack_;
+/// An interference of the baseline that has a picture of its own.
+struct Before {
+  InterferenceRecord record;
+  bool isGone = false;       // the result has it no more
+  std::size_t position = 0;  // among the published ones, or those that are gone
+  ResolvedInterference resolved;
 };
-
-/// Draws in the folder of unfinished pictures, which is the current one: no text has to carry its path.
-class PictureDrawing {
- public:
-  PictureDrawing(int inNumber, const ResolvedInterference& inResolved, const PictureStore& inStore,
-                 const PublicationOptions& inOptions)
-      : number_(inNumber),
-        scene_(MakeScene(inResolved)),
-        store_(inStore),
-        size_(inOptions.size),
-        format_(FormatName(inOptions.format)) {}
-
-  void Draw() const {
-    for (std::size_t i = 0; i < 2; ++i) DrawPreview(i);
-    if (store_.Has(store_.PictureName(number_))) return;
-    PrintPictures::PrintListVisuToFile(scene_.products[0], kFound, scene_.products[1], kFound,
-                                       scene_.interference, FromUtf8(store_.PictureName(number_)),
-                                       format_, size_.width, size_.height, 1, 0);
-    store_.Finish(number_);
-  }
-
- private:
-  static constexpr char kFound[] = "";  // no path: the products are found already
-
-  void DrawPreview(std::size_t inProduct) const {
-    const std::string name = store_.PreviewName(number_, inProduct);
-    if (scene_.products[inProduct].IsNull() || store_.Has(name)) return;
-    PrintPictures::PrintListVisuToFilePreview(scene_.products[inProduct], kFound, FromUtf8(name),
-                                              format_, std::max(1, size_.width / 2),
-                                              std::max(1, size_.height / 2), 1, 0);
-    store_.FinishPreview(number_, inProduct);
-  }
-
-  int number_;
-  ZORDefault::InterferenceScene scene_;
-  const PictureStore& store_;
-  PictureSize size_;
-  ZORUnicodeString format_;
-};
-
-/// The settings by which pictures differ.
-std::string PictureSettings() {
-  int zoom = 0, subInterferences = 0;
-  if (auto* const settings = ZORSettingRepository::GetRepository(kSettings))
-    settings->ReadSetting(kZoomSetting, &zoom, 1);
-  if (auto* const settings = ZORSysSettingRepository::GetRepository("Clash"))
-    settings->ReadAttr("ModeOfSubInterf", &subInterferences);
-  const char* const switchedOn = std::getenv("TRX_VELD_SUBINTERF");
-  return std::to_string(zoom) + " " + std::to_string(subInterferences) + " " +
-         (switchedOn != nullptr ? switchedOn : "");
-}
 
 class Publication {
  public:
-  Publication(ClashDocument& ioResult, const PublicationOptions& inOptions)
-      : result_(ioResult), options_(inOptions), styleSheet_(inOptions.styleSheet) {
-    if (inOptions.zoom) zoom_.emplace(kSettings, kZoomSetting, static_cast<int>(*inOptions.zoom));
+  /// @param inFolder where the files are made.
+  Publication(ClashDocument& ioResult, const PublicationOptions& inOptions,
+              const std::string& inFolder)
+      : result_(ioResult),
+        options_(inOptions),
+        folder_(inFolder),
+        styleSheet_(inOptions.styleSheet),
+        zoom_(inOptions),
+        review_(ReadForReview(ioResult)),
+        ids_(StableIds(review_)),
+        isShown_(ids_.size()),
+        pictures_(inOptions.isOneFile, inOptions.isCompact) {
     ZORFoundation::Hash64 hash;
     ForEachInterference(ioResult, RecordPart::kAll, [&](const InterferenceRecord& inRecord) {
       hash.Add(HashOf(inRecord));
-      if (inOptions.filter.Accepts(inRecord))
+      const bool isShown = inOptions.filter.Accepts(inRecord);
+      isShown_.at(static_cast<std::size_t>(inRecord.index - 1)) = isShown;
+      if (isShown)
         records_.push_back(inRecord);
       else
         others_.push_back(inRecord.element);
     });
     hash_ = hash.Get();
-    for (const InterferenceRecord& record : records_)
+    for (const InterferenceRecord& record : records_) {
       published_.interferences.push_back(PublishedOf(record));
+      published_.interferences.back().id = ids_[static_cast<std::size_t>(record.index - 1)];
+    }
+    if (inOptions.baseline != nullptr) Compare(*inOptions.baseline);
   }
 
   Published Make(const std::function<ZORIProduct_var()>& inOpenModel) {
-    const WorkFolder work(options_.folder);
+    const WorkFolder work(folder_);
     Published made;
     if (!options_.model.empty()) made.failures = Draw(inOpenModel());
+    published_.data = JsonOf(Data(), review_, ids_, isShown_);
     EditResult();
-    WritePublishedFiles(options_, styleSheet_, result_, published_, work.Path());
-    made.page = Utf8(FromUtf8((fs::path(options_.folder) / kPageFile).string()));
+    const std::string manifest = ManifestText();
+    const std::string page = MakePageOf(options_, styleSheet_, result_, published_);
+    fs::path path = options_.folder;
+    if (options_.isOneFile) {
+      WriteOneFile(page, manifest);
+    } else {
+      path /= kPageFile;
+      WriteGeometry(work.Path());
+      WritePublishedFiles(options_, styleSheet_, result_, WithManifest(page, manifest), manifest,
+                          work.Path());
+    }
+    made.page = Utf8(FromUtf8(path.string()));
     made.interferences = published_.interferences.size();
     for (const PublishedInterference& each : published_.interferences)
       made.pictures += each.picture.empty() ? 0 : 1;
@@ -182,6 +121,106 @@ class Publication {
   }
 
  private:
+  /// What became of each interference, and those that the result has no more.
+  void Compare(ClashDocument& ioBaseline) {
+    published_.baseline = options_.baselineName;
+    published_.baselineDocument = &ioBaseline;
+    const ReviewedResult old = ReadForReview(ioBaseline);
+    const ResultDiff diff = Diff(old, review_, options_.comparison);
+    std::unordered_map<int, const DiffEntry*> entryOfNew, entryOfOld;
+    for (const DiffEntry& entry : diff.entries)
+      (entry.newPosition < 0 ? entryOfOld[entry.oldPosition] : entryOfNew[entry.newPosition]) =
+          &entry;
+    std::unordered_map<int, std::size_t> shownOfOld;
+    for (std::size_t n = 0; n < published_.interferences.size(); ++n) {
+      PublishedInterference& published = published_.interferences[n];
+      const auto found = entryOfNew.find(published.number - 1);
+      if (found == entryOfNew.end()) continue;
+      TakeChange(*found->second, published);
+      if (found->second->itsClass == DiffClass::kChanged)
+        shownOfOld.emplace(found->second->oldPosition, n);
+    }
+    ForEachInterference(ioBaseline, RecordPart::kAll, [&](const InterferenceRecord& inRecord) {
+      const auto gone = entryOfOld.find(inRecord.index - 1);
+      const auto shown = shownOfOld.find(inRecord.index - 1);
+      if (gone != entryOfOld.end() && options_.filter.Accepts(inRecord)) {
+        published_.gone.push_back(PublishedOf(inRecord));
+        TakeChange(*gone->second, published_.gone.back());
+        before_.push_back({inRecord, true, published_.gone.size() - 1, {}});
+      } else if (shown != shownOfOld.end()) {
+        before_.push_back({inRecord, false, shown->second, {}});
+      }
+    });
+  }
+
+  static void TakeChange(const DiffEntry& inEntry, PublishedInterference& outPublished) {
+    const bool isComparable = inEntry.itsClass != DiffClass::kNotComparable;
+    outPublished.change = isComparable ? Name(inEntry.itsClass) : "not comparable";
+    outPublished.reason = inEntry.reason;
+    for (const Change& change : inEntry.changes)
+      outPublished.changes.push_back({std::string(change.what), change.from, change.to});
+  }
+
+  PageData Data() const {
+    PageData data;
+    data.document = options_.sourceName;
+    data.isOneFile = options_.isOneFile;
+    data.hasGeometry = !geometry_.empty();
+    if (options_.source.empty()) return data;
+    data.hash = DocumentHash(options_.source);
+    data.sha256 = HashedBytes({}, options_.source).sha256;
+    return data;
+  }
+
+  std::string ManifestText() const {
+    Manifest manifest = ManifestOf(options_, PictureSettings());
+    manifest.files = pictures_.Files();
+    for (const PageBlock& block : geometry_)
+      manifest.files.push_back(options_.isOneFile
+                                   ? HashedBytes(block.name, block.bytes)
+                                   : HashedBytes(GeometryPath(block), GeometryScript(block)));
+    return JsonOf(manifest);
+  }
+
+  /// A page by somebody else's style sheet may be no HTML, and then holds none.
+  std::string WithManifest(const std::string& inPage, const std::string& inManifest) const {
+    if (!styleSheet_.path.empty() && inPage.find("</body>") == std::string::npos) return inPage;
+    return PageWithBlocks(styleSheet_.path, inPage, {}, {}, inManifest);
+  }
+
+  static std::string GeometryPath(const PageBlock& inBlock) {
+    return std::string(kGeometryFolder) + "/" + inBlock.name + ".js";
+  }
+  static std::string GeometryScript(const PageBlock& inBlock) {
+    return "zorBlock(\"" + inBlock.name + "\",\"" + LoadPageLibrary().base64(inBlock.bytes) +
+           "\");\n";
+  }
+
+  /// Of a former publication none stays.
+  void WriteGeometry(const std::string& inWorkFolder) const {
+    static const std::regex names(R"((scene|part-\d+)\.js)");
+    const fs::path folder = fs::path(folder_) / kGeometryFolder;
+    if (fs::exists(folder))
+      for (const fs::directory_entry& entry : fs::directory_iterator(folder))
+        if (std::regex_match(entry.path().filename().string(), names)) fs::remove(entry.path());
+    if (geometry_.empty()) return;
+    fs::create_directories(folder);
+    ZORFoundation::AtomicFileOptions written;
+    written.temporaryFolder = inWorkFolder;
+    for (const PageBlock& block : geometry_)
+      ZORFoundation::WriteWholeFile(folder_ + "/" + GeometryPath(block), GeometryScript(block),
+                                    written);
+  }
+
+  void WriteOneFile(const std::string& inPage, const std::string& inManifest) const {
+    std::vector<PageBlock> blocks;
+    if (!options_.source.empty()) blocks.push_back({kSourceBlock, options_.source});
+    blocks.insert(blocks.end(), geometry_.begin(), geometry_.end());
+    ZORFoundation::WriteWholeFile(
+        options_.folder,
+        PageWithBlocks(styleSheet_.path, inPage, pictures_.Pictures(), blocks, inManifest));
+  }
+
   /// What the pictures are made from.
   std::string Stamp() const {
     const auto time = fs::last_write_time(options_.model).time_since_epoch().count();
@@ -213,12 +252,12 @@ class Publication {
       records_[n] = {};  // the geometry is in what was resolved
       resolved_.push_back(resolved);
     }
-    deviations.Report(options_);
+    deviations.Report(options_.warn);
   }
 
   /// @return how many interferences got no picture although the model has one of their products.
   std::size_t Draw(const ZORIProduct_var& inRoot) {
-    PictureStore store(options_.folder, options_.format == PictureFormat::kPng ? ".png" : ".jpg");
+    PictureStore store(folder_, options_.format == PictureFormat::kPng ? ".png" : ".jpg");
     Resolve(inRoot);
     std::vector<std::size_t> wanted;
     std::set<std::string> numbers;
@@ -227,20 +266,108 @@ class Publication {
       wanted.push_back(n);
       numbers.insert(std::to_string(published_.interferences[n].number));
     }
+    if (!wanted.empty()) numbers.insert("0");
+    ResolveBaseline(inRoot);
+    for (const Before& before : before_) numbers.insert(std::to_string(-before.record.index));
     const std::string stamp = Stamp();
     if (!store.Prepare(stamp, options_.resume, numbers) && options_.warn)
       options_.warn("the pictures that are there show something else: all are drawn");
+    overview_ = ShownRep(inRoot);
     if (!wanted.empty()) DrawInProcesses(options_.processes, WorkOn(wanted, store));
     store.Settle(stamp);
+    if (!wanted.empty()) MakeMap(store);
+    for (const Before& before : before_)
+      (before.isGone ? published_.gone : published_.interferences)[before.position].before =
+          pictures_.Refer(folder_, store.Reference(store.PictureName(-before.record.index)),
+                          options_.size);
     std::size_t failures = 0;
-    for (const std::size_t n : wanted) failures += TakeReferences(n, store) ? 0 : 1;
+    ViewerScene scene(inRoot, options_.size);
+    for (const std::size_t n : wanted) {
+      const bool isDrawn = TakeReferences(n, store);
+      failures += isDrawn ? 0 : 1;
+      if (isDrawn && options_.hasGeometry) AddToScene(n, store, scene);
+    }
+    TakeGeometry(scene);
     return failures;
+  }
+
+  static ZOR3DRep* ShownRep(const ZORIProduct_var& inProduct) {
+    const ZORI3DGeoVisu_var visible = inProduct;
+    return visible.IsNull() ? nullptr : static_cast<ZOR3DRep*>(visible->GetRep());
+  }
+
+  void ResolveBaseline(const ZORIProduct_var& inRoot) {
+    if (before_.empty()) return;
+    InterferenceScenes scenes(options_.openBaselineModel ? options_.openBaselineModel() : inRoot);
+    for (Before& before : before_) before.resolved = scenes.Resolve(before.record, options_.places);
+    std::erase_if(before_, [](const Before& inBefore) { return !inBefore.resolved.HasProduct(); });
+  }
+
+  void DrawBefore(const Before& inBefore, const PictureStore& inStore) const {
+    try {
+      fs::current_path(inStore.DrawingFolder());
+      PictureDrawing(-inBefore.record.index, inBefore.resolved, inStore, options_).DrawAlone();
+    } catch (const std::exception&) {
+      // As above.
+    }
+  }
+
+  void DrawOverview(const PictureStore& inStore) const {
+    const std::string name = inStore.PictureName(kOverview);
+    if (overview_ == nullptr || inStore.Has(name)) return;
+    try {
+      fs::current_path(inStore.DrawingFolder());
+      PrintPictures::TakeRepImage(overview_, FromUtf8(name), FormatName(options_.format),
+                                  options_.size.width, options_.size.height, 1, 0);
+      inStore.Finish(kOverview);
+    } catch (const std::exception&) {
+      // The page has no map then.
+    }
+  }
+
+  /// Where the interferences are in the overview: the middle of their points.
+  void MakeMap(const PictureStore& inStore) {
+    published_.map =
+        pictures_.Refer(folder_, inStore.Reference(inStore.PictureName(kOverview)), options_.size);
+    if (published_.map.empty()) return;
+    published_.mapRatio = static_cast<double>(options_.size.height) / options_.size.width;
+    const PictureCamera camera = OverviewCamera(*overview_, options_.size);
+    for (std::size_t n = 0; n < resolved_.size(); ++n) {
+      const std::vector<ZORMathVector>& points = resolved_[n].geometry.points;
+      if (points.empty()) continue;
+      using ZORFoundation::operator+, ZORFoundation::operator*;
+      ZORMathVector sum;
+      for (const ZORMathVector& point : points) sum = sum + point;
+      published_.interferences[n].mapPlace =
+          Seen(camera, options_.size, (1.0 / static_cast<double>(points.size())) * sum);
+    }
+  }
+
+  void AddToScene(std::size_t inIndex, const PictureStore& inStore, ViewerScene& ioScene) const {
+    const int number = published_.interferences[inIndex].number;
+    const auto text =
+        ZORFoundation::TryReadWholeFile(inStore.DrawingFolder() + "/" + CameraName(number));
+    if (!text) return;
+    if (const auto camera = CameraFrom(text->bytes))
+      ioScene.Add(std::to_string(number), resolved_[inIndex], *camera);
+  }
+
+  /// In one file it shares its room with the pictures.
+  void TakeGeometry(const ViewerScene& inScene) {
+    constexpr std::size_t kMaxPage = 25'000'000, kRoomForText = 3'000'000, kLeast = 1'000'000;
+    if (inScene.IsEmpty()) return;
+    std::size_t taken = kRoomForText;
+    for (const PagePicture& picture : pictures_.Pictures()) taken += picture.bytes.size() * 4 / 3;
+    geometry_ = inScene.Blocks(taken + kLeast < kMaxPage ? kMaxPage - taken : kLeast);
   }
 
   DrawingWork WorkOn(const std::vector<std::size_t>& inWanted, const PictureStore& inStore) const {
     DrawingWork work;
-    work.count = inWanted.size();
+    work.count = inWanted.size() + before_.size() + 1;  // the last one is the overview
     work.draw = [&](std::size_t inWantedIndex) {
+      if (inWantedIndex == inWanted.size() + before_.size()) return DrawOverview(inStore);
+      if (inWantedIndex >= inWanted.size())
+        return DrawBefore(before_[inWantedIndex - inWanted.size()], inStore);
       const std::size_t n = inWanted[inWantedIndex];
       try {
         fs::current_path(inStore.DrawingFolder());
@@ -250,20 +377,26 @@ class Publication {
       }
     };
     work.isDone = [&](std::size_t inDone) {
-      if (options_.drawn) options_.drawn(inDone, inWanted.size());
+      if (options_.drawn) options_.drawn(std::min(inDone, inWanted.size()), inWanted.size());
     };
     return work;
   }
 
   /// @return whether there is a picture.
   bool TakeReferences(std::size_t inIndex, const PictureStore& inStore) {
+    constexpr PictureSize kThumbnail{72, 50};
+    const PictureSize preview{std::max(1, options_.size.width / 2),
+                              std::max(1, options_.size.height / 2)};
     PublishedInterference& published = published_.interferences[inIndex];
-    published.picture = inStore.Reference(inStore.PictureName(published.number));
+    const auto refer = [&](const std::string& inName, PictureSize inSize) {
+      return pictures_.Refer(folder_, inStore.Reference(inName), inSize);
+    };
+    published.picture = refer(inStore.PictureName(published.number), options_.size);
     for (const std::string& name : inStore.ThumbnailNames(published.number))
-      published.thumbnails.push_back(inStore.Reference(name));
+      published.thumbnails.push_back(refer(name, kThumbnail));
     for (std::size_t i = 0; i < 2; ++i)
       if (!published.products[i].isMissing)
-        published.products[i].preview = inStore.Reference(inStore.PreviewName(published.number, i));
+        published.products[i].preview = refer(inStore.PreviewName(published.number, i), preview);
     return !published.picture.empty();
   }
 
@@ -282,8 +415,16 @@ class Publication {
 
   ClashDocument& result_;
   const PublicationOptions& options_;
+  std::string folder_;
   PageStyleSheet styleSheet_;
-  std::optional<ZORDefault::SettingOverride> zoom_;
+  ZoomOfOptions zoom_;
+  ReviewedResult review_;
+  std::vector<std::string> ids_;
+  std::vector<bool> isShown_;
+  ReferredPictures pictures_;
+  std::vector<PageBlock> geometry_;
+  std::vector<Before> before_;
+  ZOR3DRep* overview_ = nullptr;  // the model's
   std::vector<InterferenceRecord>
       records_;  // those that the filter accepts, until they are resolved
   std::vector<ElementHandle> others_;
@@ -297,9 +438,11 @@ class Publication {
 Published Publish(ClashDocument& ioResult, const PublicationOptions& inOptions,
                   const std::function<ZORIProduct_var()>& inOpenModel) {
   ioResult.RequireInterferences();
-  Publication publication(ioResult, inOptions);
   try {
-    return publication.Make(inOpenModel);
+    std::optional<ScratchFolder> scratch;
+    if (inOptions.isOneFile) scratch.emplace();
+    return Publication(ioResult, inOptions, scratch ? scratch->Path() : inOptions.folder)
+        .Make(inOpenModel);
   } catch (const fs::filesystem_error& error) {
     throw Error(error.path1().string() + ": " + error.code().message());
   }

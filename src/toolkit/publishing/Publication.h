@@ -6,9 +6,11 @@
 #include <functional>
 #include <optional>
 #include <string>
+#include <vector>
 
 #include "toolkit/publishing/PictureOptions.h"
 #include "toolkit/records/RecordFilter.h"
+#include "toolkit/review/Diff.h"
 #include "toolkit/scenes/InterferenceScenes.h"
 
 namespace ZORToolkit {
@@ -17,11 +19,25 @@ namespace ZORToolkit {
 enum class PictureZoom { kInterference = 0, kProducts = 1 };
 
 struct PublicationOptions {
-  std::string folder;      ///< made where it is missing
+  std::string folder;      ///< made where it is missing; the path of the page when isOneFile
+  bool isOneFile = false;  ///< pictures, geometry and the result stand in the page
+  std::string source;      ///< the bytes of the result; empty: the page cannot give it back
+  std::string sourceName;  ///< the name of its file
+  std::string filterText;  ///< what the filter was made from, for the manifest
+  std::string language;    ///< that was asked for, for the manifest
   std::string styleSheet;  ///< path; empty: the setting "XslTemplate", without it the page's own
   RecordFilter filter;
-  std::string model;  ///< path of the model that the pictures show; empty: no pictures
+  /// An older result: each interference says what became of it since. Lives as long as the call.
+  ClashDocument* baseline = nullptr;
+  std::string baselineSource,
+      baselineName;  ///< its bytes, for the manifest, and the name of its file
+  DiffOptions comparison;
+  /// The root of the model that the baseline's pictures show; empty: that of the result.
+  std::function<ZORIProduct_var()> openBaselineModel;
+  std::string model;        ///< path of the model that the pictures show; empty: no pictures
+  bool hasGeometry = true;  ///< the page can turn what its pictures show
   PictureFormat format = PictureFormat::kJpeg;
+  bool isCompact = false;  ///< in one file: pictures of PNG stand there as WebP
   PictureSize size;
   std::optional<PictureZoom> zoom;  ///< nothing: the setting "PictureZoom"
   ProductPlaces places = ProductPlaces::kResult;
@@ -39,6 +55,12 @@ struct Published {
   std::size_t pictures = 0;  ///< interferences with one
   std::size_t failures = 0;  ///< without one although the model has one of their products
 };
+
+/// What has changed since a publication was made, a line each: its result, its model, its settings,
+/// the version, a file that is missing or another. Empty when nothing has.
+/// @param inOptions those that would make it now; without a source only its files are looked at.
+/// Raises Error and ZORFoundation::FileError where there is none.
+ZOR_TOOLKIT_EXPORT std::vector<std::string> VerifyPublication(const PublicationOptions& inOptions);
 
 /// Publishes the interferences of a result that a filter accepts. Pictures are drawn in processes
 /// that start as copies of this one, which runs no other thread; a termination signal is raised as

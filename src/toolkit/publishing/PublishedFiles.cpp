@@ -2,13 +2,14 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <utility>
 
 #include "ZORLyraXMLServices.h"
 #include "foundation/AtomicFile.h"
-#include "foundation/PluginLoader.h"
 #include "foundation/ReadWholeFile.h"
 #include "platform/system/ZORSettingRepository.h"
-#include "toolkit/publishing/PageMaker.h"
+#include "toolkit/publishing/Manifest.h"
+#include "toolkit/publishing/PageLibrary.h"
 #include "toolkit/records/DocumentText.h"
 
 namespace fs = std::filesystem;
@@ -21,20 +22,25 @@ constexpr char kReportStyleSheet[] = "clash-report.xsl";
 constexpr char kReportType[] = "clash-report.dtd";
 constexpr std::uint64_t kMaxStyleSheetSize = std::uint64_t{64} << 20;
 
-/// Of the library that applies style sheets, loaded when the first one is.
-template <typename Function>
-Function* PageFunction(const char* inName) {
-  std::string reason;
-  void* const function = ZORFoundation::FindPluginFunction("libZORPage.so", inName, reason);
-  if (function == nullptr) throw Error("the library that makes pages cannot be loaded: " + reason);
-  return reinterpret_cast<Function*>(function);
-}
-
 Page MakePage(const PageRequest& inRequest) {
   Page page;
-  if (!PageFunction<MakePageFunction>(kMakePageName)(inRequest, page))
+  if (!LoadPageLibrary().makePage(inRequest, page))
     throw Error(inRequest.styleSheetName + ": " + page.reason);
   return page;
+}
+
+/// The page loads nothing but its own pictures, and runs nothing but its own script and what that
+/// puts in: the geometry, which in a folder stands in scripts, since a page from a disk can fetch
+/// nothing.
+std::string PolicyOf(const PublicationOptions& inOptions, const PublishedResult& inPublished) {
+  const PageLibrary& library = LoadPageLibrary();
+  const auto hash = [&](const std::string& inText) {
+    return std::string(" 'sha256-").append(library.base64(library.sha256(inText))).append("'");
+  };
+  const std::string pictures = inOptions.isOneFile ? "data:" : "'self' file: data:";
+  return "default-src 'none'; img-src " + pictures + "; style-src" + hash(inPublished.style) +
+         "; script-src" + hash(inPublished.script) +
+         " 'strict-dynamic'; form-action 'none'; base-uri 'none'";
 }
 
 /// A reference may be written with backslashes, as on other systems.
@@ -71,31 +77,37 @@ PageStyleSheet::PageStyleSheet(const std::string& inPath)
   text = ZORFoundation::ReadWholeFile(path, limit).bytes;
   if (text.empty()) throw Error(path + ": the style sheet is empty");
   const std::string name = FileNameOf(*this);
-  if (name == kReportFile || name == kPageFile || name == kReportType)
+  if (name == kReportFile || name == kPageFile || name == kReportType || name == kManifestFile)
     throw Error(path + ": a style sheet of this name would take the place of another");
   MakePage({"", text, path});
 }
 
-void WritePublishedFiles(const PublicationOptions& inOptions, const PageStyleSheet& inSheet,
-                         const ClashDocument& inDocument, const PublishedResult& inPublished,
-                         const std::string& inWorkFolder) {
-  // First, since it may fail: the old publication stays as it was then.
+// Comes before anything is written, since it may fail: the old publication stays as it was then.
+std::string MakePageOf(const PublicationOptions& inOptions, const PageStyleSheet& inSheet,
+                       const ClashDocument& inDocument, PublishedResult& ioPublished) {
+  ioPublished.style = LoadPageLibrary().pageStyle;
+  ioPublished.script = LoadPageLibrary().pageScript;
+  ioPublished.policy = PolicyOf(inOptions, ioPublished);
   const std::string name = inSheet.path.empty() ? "clash-page.xsl" : inSheet.path;
-  const Page page = MakePage({AnnotatedReport(inDocument, inPublished), inSheet.text, name});
+  Page page = MakePage({AnnotatedReport(inDocument, ioPublished), inSheet.text, name});
   if (!page.messages.empty() && inOptions.warn)
     inOptions.warn(name + ": " + page.messages.substr(0, page.messages.find('\n')));
+  return std::move(page.bytes);
+}
+
+void WritePublishedFiles(const PublicationOptions& inOptions, const PageStyleSheet& inSheet,
+                         const ClashDocument& inDocument, const std::string& inPage,
+                         const std::string& inManifest, const std::string& inWorkFolder) {
   ZORFoundation::AtomicFileOptions written;
   written.temporaryFolder = inWorkFolder;
   const std::string folder = inOptions.folder + "/", styleSheet = FileNameOf(inSheet);
+  const PageLibrary& library = LoadPageLibrary();
   WriteReportFile(inDocument, styleSheet, folder + kReportFile, written);
-  ZORFoundation::WriteWholeFile(folder + kReportType,
-                                PageFunction<ShippedTextFunction>(kReportTypeName)(), written);
-  ZORFoundation::WriteWholeFile(folder + styleSheet,
-                                inSheet.path.empty()
-                                    ? PageFunction<ShippedTextFunction>(kReportStyleSheetName)()
-                                    : inSheet.text,
-                                written);
-  ZORFoundation::WriteWholeFile(folder + kPageFile, page.bytes, written);
+  ZORFoundation::WriteWholeFile(folder + kReportType, library.reportType, written);
+  ZORFoundation::WriteWholeFile(
+      folder + styleSheet, inSheet.path.empty() ? library.reportStyleSheet : inSheet.text, written);
+  ZORFoundation::WriteWholeFile(folder + kManifestFile, inManifest, written);
+  ZORFoundation::WriteWholeFile(folder + kPageFile, inPage, written);
 }
 
 }  // namespace ZORToolkit

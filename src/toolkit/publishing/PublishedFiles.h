@@ -21,11 +21,15 @@ struct PageStyleSheet {
   std::string text;
 };
 
-/// Writes report, page and what they need. Raises Error and ZORFoundation::FileError.
+/// The page of a result. Raises Error.
+std::string MakePageOf(const PublicationOptions& inOptions, const PageStyleSheet& inSheet,
+                       const ClashDocument& inDocument, PublishedResult& ioPublished);
+
+/// Writes page, report and what they need. Raises Error and ZORFoundation::FileError.
 /// @param inWorkFolder where files are until they are whole.
 void WritePublishedFiles(const PublicationOptions& inOptions, const PageStyleSheet& inSheet,
-                         const ClashDocument& inDocument, const PublishedResult& inPublished,
-                         const std::string& inWorkFolder);
+                         const ClashDocument& inDocument, const std::string& inPage,
+                         const std::string& inManifest, const std::string& inWorkFolder);
 
 }  // namespace ZORToolkit
 

@@ -1,6 +1,7 @@
 #include "toolkit/publishing/ReportWriter.h"
 
 #include <algorithm>
+#include <cmath>
 #include <functional>
 #include <map>
 #include <span>
@@ -139,18 +140,22 @@ struct MarkerWriter {
   void End(const char* inName) const { services.CloseXMLMarker(inName); }
 };
 
+std::string GoneOf(const PublishedResult& inPublished);
+
 /// Puts a report, laid out as the library's writer does, and what a page knows besides into a text.
 class AnnotatingWriter {
  public:
-  AnnotatingWriter(const PublishedResult& inPublished, std::string& ioText)
-      : published_(inPublished), text_(ioText) {}
+  /// @param inInterferences those that are annotated.
+  AnnotatingWriter(const PublishedResult& inPublished,
+                   const std::vector<PublishedInterference>& inInterferences, std::string& ioText)
+      : published_(inPublished), interferences_(inInterferences), text_(ioText) {}
 
   void Begin(const DOM_Node& inElement, const char* inName) {
     text_.append("<").append(inName).append(" ");
     attributes_.clear();
     appended_.clear();
     const std::string_view name = inName;
-    if (open_.empty()) AnnotateRoot();
+    if (name == "ClashElement" || name == "InterferenceElement") AnnotateRoot();
     if (name == "Interference") AnnotateInterference(ElementHandle(inElement));
     if (name == "Product") AnnotateProduct(ElementHandle(inElement));
     name_ = inName;
@@ -168,6 +173,10 @@ class AnnotatingWriter {
     } else {
       text_.append(">").append(appended_).append("</").append(name_).append("> \n\n");
     }
+  }
+  /// Whether it is the next one that is annotated.
+  bool IsNext(const ElementHandle& inElement) const {
+    return next_ < interferences_.size() && interferences_[next_].element == inElement;
   }
   void End(const char* inName) {
     text_.append("\n").append(open_.back()).append("</").append(inName).append("> \n");
@@ -196,25 +205,79 @@ class AnnotatingWriter {
     }
   }
 
+  // How many of each type have each status.
+  void CountCells() {
+    std::map<std::pair<std::string, std::string>, std::size_t> counts;
+    for (const PublishedInterference& each : published_.interferences)
+      ++counts[{each.type, each.status}];
+    for (const auto& [words, count] : counts) {
+      appended_ += "<page:Cell ";
+      Set("page:type", words.first, appended_);
+      Set("page:word", words.second, appended_);
+      Set("page:count", std::to_string(count), appended_);
+      appended_ += "/>";
+    }
+  }
+
+  void AppendText(const char* inElement, const std::string& inText) {
+    appended_.append("<").append(inElement).append(">");
+    for (const char byte : inText) {
+      if (byte == '&')
+        appended_ += "&amp;";
+      else if (byte == '<')
+        appended_ += "&lt;";
+      else if (byte == '>')
+        appended_ += "&gt;";
+      else
+        appended_ += byte;
+    }
+    appended_.append("</").append(inElement).append(">");
+  }
+
   void AnnotateRoot() {
     text_ += "xmlns:page=\"urn:zorlyra:page\" ";
     Set("page:model", published_.model, attributes_);
+    Set("page:policy", published_.policy, attributes_);
+    Set("page:map", published_.map, attributes_);
+    if (!published_.map.empty())
+      Set("page:mapHeight", std::to_string(std::lround(1000 * published_.mapRatio)), attributes_);
     if (published_.isAsInModel) Set("page:asInModel", "yes", attributes_);
     Count("page:Type", &PublishedInterference::type);
     Count("page:Status", &PublishedInterference::status);
+    CountCells();
+    Set("page:baseline", published_.baseline, attributes_);
+    appended_ += GoneOf(published_);
+    AppendText("page:Style", published_.style);
+    AppendText("page:Script", published_.script);
+    AppendText("page:Data", published_.data);
   }
 
   void AnnotateInterference(const ElementHandle& inElement) {
     interference_ = nullptr;
-    if (next_ == published_.interferences.size() ||
-        !(published_.interferences[next_].element == inElement))
-      return;
-    interference_ = &published_.interferences[next_++];
-    Set("page:number", std::to_string(interference_->number), attributes_);
+    if (!IsNext(inElement)) return;
+    interference_ = &interferences_[next_++];
+    const std::string number = std::to_string(interference_->number);
+    Set("page:number", &interferences_ == &published_.gone ? "old-" + number : number, attributes_);
+    Set("page:change", interference_->change, attributes_);
+    Set("page:reason", interference_->reason, attributes_);
+    Set("page:before", interference_->before, attributes_);
+    for (const auto& [what, from, to] : interference_->changes) {
+      appended_ += "<page:Change ";
+      Set("page:what", what, appended_);
+      Set("page:from", from, appended_);
+      Set("page:to", to, appended_);
+      appended_ += "/>";
+    }
+    Set("page:id", interference_->id, attributes_);
     Set("page:type", interference_->type, attributes_);
     Set("page:status", interference_->status, attributes_);
     Set("page:picture", interference_->picture, attributes_);
     Set("page:asInModel", interference_->whyAsInModel, attributes_);
+    if (const auto& place = interference_->mapPlace) {
+      Set("page:mapX", std::to_string(std::lround(1000 * (*place)[0])), attributes_);
+      Set("page:mapY", std::to_string(std::lround(1000 * published_.mapRatio * (*place)[1])),
+          attributes_);
+    }
     for (const std::string& thumbnail : interference_->thumbnails) {
       appended_ += "<page:Thumbnail ";
       Set("href", thumbnail, appended_);
@@ -233,6 +296,7 @@ class AnnotatingWriter {
   }
 
   const PublishedResult& published_;
+  const std::vector<PublishedInterference>& interferences_;
   std::string& text_;
   std::string attributes_;  // of the element that is begun, behind its own
   std::string appended_;    // its elements, behind its own
@@ -264,6 +328,25 @@ void WriteElement(const DOM_Node& inElement, Writer& ioWriter) {
   for (; !child.isNull(); child = NextKnown(child.getNextSibling(), rule->children))
     WriteElement(child, ioWriter);
   ioWriter.End(rule->name);
+}
+
+/// The interferences of the baseline that the result has not, in a "page:Gone".
+std::string GoneOf(const PublishedResult& inPublished) {
+  if (inPublished.gone.empty() || inPublished.baselineDocument == nullptr) return {};
+  constexpr const char* kSets[] = {"ClashResult"};
+  std::string text = "<page:Gone>";
+  AnnotatingWriter writer(inPublished, inPublished.gone, text);
+  const auto writeAll = [&](const DOM_Node& inParent) {
+    DOM_Node child = NextKnown(inParent.getFirstChild(), kInterferenceOnly);
+    for (; !child.isNull(); child = NextKnown(child.getNextSibling(), kInterferenceOnly))
+      if (writer.IsNext(ElementHandle(child))) WriteElement(child, writer);
+  };
+  const DOM_Element root = inPublished.baselineDocument->Root();
+  writeAll(root);
+  for (DOM_Node set = NextKnown(root.getFirstChild(), kSets); !set.isNull();
+       set = NextKnown(set.getNextSibling(), kSets))
+    writeAll(set);
+  return text + "</page:Gone>";
 }
 
 }  // namespace
@@ -307,7 +390,7 @@ HRESULT WriteReport(const ClashDocument& inDocument, const Prologue& inPrologue,
 
 std::string AnnotatedReport(const ClashDocument& inDocument, const PublishedResult& inPublished) {
   std::string text = "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n";
-  AnnotatingWriter writer(inPublished, text);
+  AnnotatingWriter writer(inPublished, inPublished.interferences, text);
   WriteElement(inDocument.Root(), writer);
   return text;
 }

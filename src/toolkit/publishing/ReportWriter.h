@@ -3,6 +3,7 @@
 #define ZOR_TOOLKIT_PUBLISHING_REPORT_WRITER_H
 
 #include <array>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -32,10 +33,16 @@ struct PublishedProduct {
 struct PublishedInterference {
   ElementHandle element;
   int number = 0;  ///< in the whole result, from 1
+  std::string id;  ///< the stable one; may be empty
   std::string type, status;
   std::string picture;  ///< relative to the page; empty when there is none
   std::vector<std::string> thumbnails;
+  std::string change;  ///< since the baseline: "new", "persisting", …; empty without one
+  std::string reason;  ///< of the change
+  std::vector<std::array<std::string, 3>> changes;  ///< what changed, from what, to what
+  std::string before;        ///< the picture in the baseline, relative to the page; may be empty
   std::string whyAsInModel;  ///< why the picture does not have the result's placements; else empty
+  std::optional<std::array<double, 2>> mapPlace;  ///< shares of the map's width and height
   std::array<PublishedProduct, 2> products;
 };
 
@@ -43,7 +50,14 @@ struct PublishedInterference {
 struct PublishedResult {
   std::string model;         ///< name of the model; empty for none
   bool isAsInModel = false;  ///< all pictures have the model's placements, as was asked for
+  std::string map;           ///< the overview's picture, relative to the page; may be empty
+  double mapRatio = 1;       ///< its height by its width
+  std::string policy;        ///< what the page may load: a content security policy
+  std::string style, script, data;
   std::vector<PublishedInterference> interferences;  ///< in document order
+  std::string baseline;                              ///< its name; empty without one
+  const ClashDocument* baselineDocument = nullptr;
+  std::vector<PublishedInterference> gone;  ///< of the baseline, in its order
 };
 
 /// The elements of the report with what a page knows besides, as attributes and elements of the

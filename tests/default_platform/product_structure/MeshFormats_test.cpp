@@ -5,7 +5,7 @@
 #include <cmath>
 
 #include "default_platform/product_structure/OpenedModels.h"
-#include "default_platform/visualisation/PartMesh.h"
+#include "default_platform/PartMesh.h"
 
 using products::ChildrenOf;
 using products::FactsOf;

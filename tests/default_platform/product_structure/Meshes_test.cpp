@@ -8,7 +8,7 @@
 #include <numbers>
 
 #include "default_platform/product_structure/OpenedModels.h"
-#include "default_platform/visualisation/PartMesh.h"
+#include "default_platform/PartMesh.h"
 
 using products::FactsOf;
 

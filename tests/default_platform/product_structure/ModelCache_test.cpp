@@ -5,7 +5,7 @@
 #include <fstream>
 
 #include "default_platform/product_structure/OpenedModels.h"
-#include "default_platform/visualisation/PartMesh.h"
+#include "default_platform/PartMesh.h"
 
 using products::FactsOf;
 using products::Folder;

@@ -11,7 +11,7 @@
 
 #include "default_platform/product_structure/ModelWriting.h"
 #include "default_platform/product_structure/OpenedModels.h"
-#include "default_platform/visualisation/PartMesh.h"
+#include "default_platform/PartMesh.h"
 
 using products::FactsOf;
 using products::FindByAliasPath;

@@ -1,15 +1,21 @@
-// lyra publish RESULT --model MODEL -o DIR
+// lyra publish RESULT --model MODEL -o DIR|PAGE.html, lyra extract PAGE.html -o RESULT
 #include <algorithm>
+#include <filesystem>
+#include <fstream>
 #include <memory>
 #include <thread>
 
+#include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/Model.h"
 #include "lyra/commands/Picture.h"
+#include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Progress.h"
 #include "lyra/terminal/SafeText.h"
+#include "toolkit/publishing/OneFile.h"
 #include "toolkit/publishing/Publication.h"
+#include "toolkit/records/DocumentText.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -21,11 +27,11 @@ constexpr const char* kZooms[] = {"interference", "products"};  // by the settin
 constexpr const char* kPositions[] = {"result", "model"};
 
 struct PublishOptions {
-  std::string file, model, directory, styleSheet, size, format = "jpeg", zoom, positions = "result",
-                                                        language;
+  std::string file, model, directory, styleSheet, size, format, zoom, baseline, baselineModel,
+      positions = "result", language;
   std::vector<std::string> only;
   std::optional<long long> jobs;
-  bool resume = false;
+  bool resume = false, verify = false, flat = false;
   ModelReading reading;
 };
 
@@ -36,10 +42,25 @@ int ProcessCount(const PublishOptions& inOptions) {
   return static_cast<int>(*inOptions.jobs);
 }
 
+/// Whether a page in one file is meant, and not a folder.
+bool IsPage(const std::string& inPath) {
+  std::string ending = std::filesystem::path(inPath).extension().string();
+  std::ranges::transform(ending, ending.begin(), [](unsigned char inByte) {
+    return static_cast<char>(std::tolower(inByte));
+  });
+  return ending == ".html" && !std::filesystem::is_directory(inPath);
+}
+
+std::string FileNameOf(const std::string& inPath) {
+  return Utf8(FromUtf8(std::filesystem::path(inPath).filename().string()));
+}
+
 PublicationOptions ToolkitOptions(const PublishOptions& inOptions) {
   PublicationOptions options;
   options.filter = FilterOfConditions(inOptions.only);
-  const bool isPng = ChosenWord("--format", inOptions.format, kFormats) == 1;
+  options.isCompact = inOptions.format.empty() && IsPage(inOptions.directory);
+  const bool isPng = options.isCompact || (!inOptions.format.empty() &&
+                                           ChosenWord("--format", inOptions.format, kFormats) == 1);
   options.format = isPng ? PictureFormat::kPng : PictureFormat::kJpeg;
   if (!inOptions.size.empty()) options.size = SizeOf(inOptions.size);
   if (!inOptions.zoom.empty())
@@ -48,17 +69,50 @@ PublicationOptions ToolkitOptions(const PublishOptions& inOptions) {
   options.places = areModels ? ProductPlaces::kModel : ProductPlaces::kResult;
   options.processes = ProcessCount(inOptions);
   options.folder = inOptions.directory;
+  options.isOneFile = IsPage(inOptions.directory);
+  options.language = inOptions.language;
+  for (const std::string& only : inOptions.only)
+    options.filterText += (options.filterText.empty() ? "" : ",") + only;
   options.styleSheet = inOptions.styleSheet;
   options.model = inOptions.model;
   options.resume = inOptions.resume;
+  options.hasGeometry = !inOptions.flat;
   return options;
 }
 
+/// @return 0 when nothing has changed.
+int Verify(const PublicationOptions& inOptions, Output& ioOutput) {
+  constexpr int kChanged = 3;
+  const std::vector<std::string> lines = VerifyPublication(inOptions);
+  for (const std::string& line : lines) ioOutput.Write(Printable(line) + "\n");
+  if (lines.empty()) ioOutput.Write(Printable(inOptions.folder) + ": nothing has changed\n");
+  return lines.empty() ? 0 : kChanged;
+}
+
 int Publish(const PublishOptions& inOptions, Output& ioOutput) {
+  if (inOptions.directory.empty() && !inOptions.verify) throw UsageError("publish: -o is required");
   PublicationOptions options = ToolkitOptions(inOptions);
   inOptions.reading.Check();
   ChooseLanguage(inOptions.language);
-  ClashDocument document(inOptions.file);
+  if (inOptions.directory.empty()) {  // what is there, by itself
+    options.folder = inOptions.file;
+    return Verify(options, ioOutput);
+  }
+  options.source = BytesOfInput(inOptions.file);
+  options.sourceName = FileNameOf(inOptions.file);
+  if (!inOptions.baseline.empty()) {
+    options.baselineSource = BytesOfInput(inOptions.baseline);
+    options.baselineName = FileNameOf(inOptions.baseline);
+  }
+  if (inOptions.verify) return Verify(options, ioOutput);
+  std::optional<ClashDocument> baseline;
+  if (!inOptions.baseline.empty())
+    options.baseline = &baseline.emplace(inOptions.baseline, options.baselineSource);
+  if (!inOptions.baselineModel.empty())
+    options.openBaselineModel = [&] {
+      return OpenModelFile(inOptions.baselineModel, inOptions.reading).root;
+    };
+  ClashDocument document(inOptions.file, options.source);
   options.warn = [](const std::string& inWarning) {
     std::fprintf(stderr, "lyra: warning: %s\n", Printable(inWarning).c_str());
   };
@@ -80,20 +134,51 @@ int Publish(const PublishOptions& inOptions, Output& ioOutput) {
   return 0;
 }
 
+struct ExtractOptions {
+  std::string file, output;
+  bool manifest = false;
+};
+
+int Extract(const ExtractOptions& inOptions, Output& ioOutput) {
+  const PublishedPage page(inOptions.file, BytesOfInput(inOptions.file));
+  const std::string bytes = inOptions.manifest ? page.ManifestText() : page.Result();
+  OutputFile output(inOptions.output);
+  std::ofstream file(output.Path(), std::ios::binary);
+  file.write(bytes.data(), static_cast<std::streamsize>(bytes.size()));
+  output.Check(file.flush() ? S_OK : E_FAIL);
+  output.Finish(ioOutput);
+  return 0;
+}
+
 }  // namespace
+
+VerbAction DeclareExtract(Arguments& ioArguments) {
+  const auto options = std::make_shared<ExtractOptions>();
+  ioArguments.Positional("PAGE", options->file, "A page in one file, as lyra publish makes it");
+  ioArguments.RequiredText("-o,--output", "OUT", options->output, "Where the result is written");
+  ioArguments.Flag("--manifest", options->manifest,
+                   "Write what the page was made from instead, as JSON");
+  return [options](Output& ioOutput) { return Extract(*options, ioOutput); };
+}
 
 VerbAction DeclarePublish(Arguments& ioArguments) {
   const auto options = std::make_shared<PublishOptions>();
   ioArguments.Positional("RESULT", options->file, "A clash result, or - for standard input");
-  ioArguments.RequiredText("-o,--output", "DIR", options->directory,
-                           "The folder that gets the page, the report and the pictures");
+  ioArguments.NonEmptyText("-o,--output", "DIR", options->directory,
+                           "The folder that gets the page, the report and the pictures, or a name "
+                           "that ends in .html: everything in one file");
   ioArguments.NonEmptyText("--model", "MODEL", options->model,
                            "The model that the pictures show: a STEP, IGES, glTF, OBJ or STL file");
+  ioArguments.NonEmptyText("--baseline", "OLD", options->baseline,
+                           "An older result: each interference says what became of it since");
+  ioArguments.NonEmptyText("--baseline-model", "MODEL", options->baselineModel,
+                           "The model of its pictures (default: that of --model)");
   ioArguments.Texts("--only", "CONDITIONS", options->only,
                     "Only some, such as type=clash,status=relevant; also result= and product=");
   ioArguments.Text("--size", "WxH", options->size,
                    "Width and height of a picture in pixels (default: 756x506)");
-  ioArguments.Text("--format", "FORMAT", options->format, "jpeg (default) or png");
+  ioArguments.Text("--format", "FORMAT", options->format,
+                   "jpeg or png (default: jpeg; in one file WebP, which is smaller)");
   ioArguments.Words("--format", kFormats);
   ioArguments.Text("--zoom", "WHAT", options->zoom,
                    "What pictures are framed on: interference or products (default: the setting "
@@ -108,6 +193,10 @@ VerbAction DeclarePublish(Arguments& ioArguments) {
   ioArguments.Number("--jobs", "N", options->jobs,
                      "Processes that draw (default: as many as processors)");
   ioArguments.Flag("--resume", options->resume, "Keep the pictures of a run that was ended early");
+  ioArguments.Flag("--flat", options->flat,
+                   "Leave the geometry of the model out: pictures cannot be turned");
+  ioArguments.Flag("--verify", options->verify,
+                   "Make nothing; say what has changed since DIR was made (exit code 3)");
   options->reading.Declare(ioArguments);
   ioArguments.Language(options->language);
   return [options](Output& ioOutput) { return Publish(*options, ioOutput); };

@@ -7,7 +7,7 @@
 #include <memory>
 
 #include "default_platform/system/ObjectCounters.h"
-#include "default_platform/visualisation/PartMesh.h"
+#include "default_platform/PartMesh.h"
 
 namespace ZORRayCaster {
 

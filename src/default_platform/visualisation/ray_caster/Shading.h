@@ -4,7 +4,7 @@
 
 #include <cstdint>
 
-#include "default_platform/visualisation/PartMesh.h"
+#include "default_platform/PartMesh.h"
 #include "foundation/Vector3.h"
 
 namespace ZORRayCaster {

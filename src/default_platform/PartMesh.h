@@ -1,6 +1,6 @@
 // The drawn form of a part: triangles and edges.
-#ifndef ZOR_DEFAULT_PLATFORM_VISUALISATION_PARTMESH_H
-#define ZOR_DEFAULT_PLATFORM_VISUALISATION_PARTMESH_H
+#ifndef ZOR_DEFAULT_PLATFORM_PARTMESH_H
+#define ZOR_DEFAULT_PLATFORM_PARTMESH_H
 
 #include <array>
 #include <cstdint>

@@ -1,0 +1,12 @@
+// Beginning.
+
+if (table && form) {
+  startReview();
+  startGroups();
+  startTable();
+  startGrouping();
+  startKeys();
+  startViewer();
+  startMap();
+  watchRows();
+}

@@ -1,0 +1,49 @@
+#include "toolkit/publishing/ReferredPictures.h"
+
+#include <cerrno>
+#include <cstdlib>
+#include <filesystem>
+#include <utility>
+
+#include "foundation/ReadWholeFile.h"
+#include "toolkit/publishing/PageLibrary.h"
+
+namespace fs = std::filesystem;
+
+namespace ZORToolkit {
+
+ScratchFolder::ScratchFolder() : path_((fs::temp_directory_path() / "lyra-page-XXXXXX").string()) {
+  if (mkdtemp(path_.data()) == nullptr) throw ZORFoundation::FileError(path_, errno);
+}
+
+ScratchFolder::~ScratchFolder() {
+  std::error_code ignored;
+  fs::remove_all(path_, ignored);
+}
+
+std::string ReferredPictures::Refer(const std::string& inFolder, const std::string& inPath,
+                                    PictureSize inSize) {
+  if (inPath.empty()) return {};
+  std::string path(inFolder);
+  path.append("/").append(inPath);
+  std::string bytes = ZORFoundation::ReadWholeFile(path).bytes;
+  HashedFile file = HashedBytes(inPath, bytes);
+  if (!isOneFile_) {
+    files_.push_back(std::move(file));
+    return inPath;
+  }
+  if (isCompact_)
+    if (std::string webp = LoadPageLibrary().webpFromPng(bytes); !webp.empty()) {
+      bytes = std::move(webp);
+      file = HashedBytes(fs::path(inPath).replace_extension(".webp").string(), bytes);
+    }
+  const auto [place, isNew] =
+      ids_.try_emplace(file.sha256, std::string("zor-").append(file.sha256, 0, 20));
+  if (isNew) {
+    pictures_.push_back({place->second, file.name, std::move(bytes), inSize.width, inSize.height});
+    files_.push_back(std::move(file));
+  }
+  return "#" + place->second;
+}
+
+}  // namespace ZORToolkit

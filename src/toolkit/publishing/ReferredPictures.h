@@ -1,0 +1,52 @@
+// The pictures of a page, and a folder for them while they are drawn.
+#ifndef ZOR_TOOLKIT_PUBLISHING_REFERRED_PICTURES_H
+#define ZOR_TOOLKIT_PUBLISHING_REFERRED_PICTURES_H
+
+#include <map>
+#include <string>
+#include <vector>
+
+#include "toolkit/publishing/Manifest.h"
+#include "toolkit/publishing/OneFile.h"
+
+namespace ZORToolkit {
+
+/// A folder of this run's own that goes with it.
+class ScratchFolder {
+ public:
+  /// Raises ZORFoundation::FileError.
+  ScratchFolder();
+  ~ScratchFolder();
+  ScratchFolder(const ScratchFolder&) = delete;
+  ScratchFolder& operator=(const ScratchFolder&) = delete;
+
+  const std::string& Path() const { return path_; }
+
+ private:
+  std::string path_;
+};
+
+/// The pictures that a page refers to, with their hashes. In one file equal ones are one.
+class ReferredPictures {
+ public:
+  ReferredPictures(bool inIsOneFile, bool inIsCompact)
+      : isOneFile_(inIsOneFile), isCompact_(inIsCompact) {}
+
+  /// @param inPath below the folder, or empty.
+  /// @return how the page refers to it. Raises ZORFoundation::FileError.
+  std::string Refer(const std::string& inFolder, const std::string& inPath, PictureSize inSize);
+
+  const std::vector<HashedFile>& Files() const { return files_; }
+  /// Those that stand in one file.
+  const std::vector<PagePicture>& Pictures() const { return pictures_; }
+
+ private:
+  bool isOneFile_, isCompact_;
+  std::vector<HashedFile> files_;
+  std::vector<PagePicture> pictures_;
+  std::map<std::string, std::string> ids_;  // by hash
+};
+
+}  // namespace ZORToolkit
+
+#endif
