@@ -139,6 +139,7 @@ class WorkbookMaker {
                 const std::string& inPath)
       : about_(ReadDocument(ioResult)),
         options_(inOptions),
+        filter_(inOptions.filter.value_or(RecordFilter())),
         rows_(ioResult),
         result_(ioResult),
         book_(FindExchangeFunction<NewSpreadsheetFunction>(kNewSpreadsheetName)(
@@ -173,7 +174,7 @@ class WorkbookMaker {
     maker_ = std::make_unique<SnapshotMaker>(snapshotOptions_, about_.file);
     std::vector<InterferenceRecord> records;
     ForEachInterference(result_, RecordPart::kAll, [&](const InterferenceRecord& inRecord) {
-      if (options_.filter.Accepts(inRecord)) records.push_back(inRecord);
+      if (filter_.Accepts(inRecord)) records.push_back(inRecord);
     });
     if (!inOpenModel) {
       for (const InterferenceRecord& record : records)
@@ -187,12 +188,11 @@ class WorkbookMaker {
   }
 
   std::size_t CountAccepted() {
+    if (!options_.filter) return rows_.Result().interferences.size();
     std::size_t count = 0;
-    ForEachInterference(result_,
-                        options_.filter.NeedsLabels() ? RecordPart::kAll : RecordPart::kRow,
-                        [&](const InterferenceRecord& inRecord) {
-                          count += options_.filter.Accepts(inRecord) ? 1 : 0;
-                        });
+    ForEachInterference(
+        result_, filter_.NeedsLabels() ? RecordPart::kAll : RecordPart::kRow,
+        [&](const InterferenceRecord& inRecord) { count += filter_.Accepts(inRecord) ? 1 : 0; });
     return count;
   }
 
@@ -211,7 +211,7 @@ class WorkbookMaker {
     book_->AddSheet(layout);
     std::size_t row = 0;
     rows_.ForEach(
-        options_.filter, RecordPart::kRow,
+        filter_, RecordPart::kRow,
         [&](const InterferenceRecord& inRecord, const std::vector<SheetCell>& inCells) {
           WriteRow(row, inCells);
           if (hasPictures) WritePicture(row, inCells.size());
@@ -317,6 +317,7 @@ class WorkbookMaker {
 
   DocumentRecord about_;
   const SpreadsheetOptions& options_;
+  RecordFilter filter_;
   RowMaker rows_;
   ClashDocument& result_;
   std::unique_ptr<SpreadsheetWriter> book_;

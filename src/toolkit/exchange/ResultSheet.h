@@ -28,7 +28,7 @@ ZOR_TOOLKIT_EXPORT void ForEachSheetRow(
     const std::function<void(const std::vector<SheetCell>& inCells)>& inVisit);
 
 struct SpreadsheetOptions {
-  RecordFilter filter;
+  std::optional<RecordFilter> filter;  ///< nothing: all of them
   GroupOptions grouping;
   /// Thumbnails of a published page; empty: drawn when there is a model, else none.
   std::string page;

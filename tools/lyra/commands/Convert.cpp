@@ -193,7 +193,7 @@ int ConvertToBcf(const ConvertOptions& inOptions, Output& ioOutput) {
 
 int ConvertToXlsx(const ConvertOptions& inOptions, Output& ioOutput) {
   SpreadsheetOptions options;
-  options.filter = FilterOfConditions(inOptions.only);
+  if (!inOptions.only.empty()) options.filter = FilterOfConditions(inOptions.only);
   options.grouping = inOptions.grouping.Get();
   options.page = inOptions.page;
   options.processes = ProcessCount();
