@@ -1,6 +1,7 @@
 // The detection beside an independent judge of real assemblies: see judged/README.md.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <cstdlib>
 #include <filesystem>
