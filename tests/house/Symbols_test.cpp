@@ -111,7 +111,8 @@ Names LoadedFor(const std::string& inDocument) {
 TEST(Symbols, CommandReadsPlainDocumentsWithoutTheXmlLibrary) {
   const Names loaded = LoadedFor(ZOR_SOURCE_DIR "/samples/as1.clash.xml");
   EXPECT_THAT(loaded, Contains(testing::HasSubstr("libZORDefaultPlatform")));
-  for (const char* other : {"libxerces-c", "libZORXmlScanner", "libZORExchange", "libzip", "libcurl", "libgnutls", "libldap"})
+  for (const char* other : {"libxerces-c", "libZORXmlScanner", "libZORExchange", "libzip",
+                            "libcurl", "libgnutls", "libldap"})
     EXPECT_THAT(loaded, Not(Contains(testing::HasSubstr(other))));
 }
 

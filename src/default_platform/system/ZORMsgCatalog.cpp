@@ -1,8 +1,8 @@
 #include "platform/system/ZORMsgCatalog.h"
 
 #include <map>
-#include <mutex>
 #include <memory>
+#include <mutex>
 #include <string>
 #include <string_view>
 #include <utility>
