@@ -8,7 +8,7 @@
 #include <map>
 
 #include "default_platform/ModelShapes.h"
-#include "default_platform/product_structure/model_reader/ReaderProgram.h"
+#include "default_platform/ReaderProgram.h"
 #include "foundation/ReadWholeFile.h"
 #include "toolkit/detection/DetectionTask.h"
 

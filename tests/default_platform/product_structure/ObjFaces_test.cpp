@@ -5,7 +5,7 @@
 #include <cmath>
 #include <numbers>
 
-#include "default_platform/product_structure/model_reader/ReaderProgram.h"
+#include "default_platform/ReaderProgram.h"
 
 using ZORDefault::ObjWithoutLargeFaces;
 using ZORDefault::Point;

@@ -5,7 +5,7 @@
 #include <cmath>
 #include <cstdlib>
 
-#include "default_platform/product_structure/model_reader/ReaderProgram.h"
+#include "default_platform/ReaderProgram.h"
 
 namespace ZORDefault {
 namespace {

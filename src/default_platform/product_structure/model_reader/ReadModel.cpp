@@ -7,11 +7,11 @@
 #include <set>
 #include <vector>
 
+#include "default_platform/ReaderProgram.h"
 #include "default_platform/product_structure/model_reader/DocumentReading.h"
 #include "default_platform/product_structure/model_reader/FileDoor.h"
 #include "default_platform/product_structure/model_reader/MeshBuilder.h"
 #include "default_platform/product_structure/model_reader/ModelChecks.h"
-#include "default_platform/product_structure/model_reader/ReaderProgram.h"
 #include "default_platform/product_structure/model_reader/TreeWalk.h"
 #include "foundation/Utf8.h"
 

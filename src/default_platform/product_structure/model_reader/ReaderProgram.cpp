@@ -1,4 +1,4 @@
-#include "default_platform/product_structure/model_reader/ReaderProgram.h"
+#include "default_platform/ReaderProgram.h"
 
 #include <signal.h>
 #include <sys/prctl.h>

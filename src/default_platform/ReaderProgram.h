@@ -1,6 +1,6 @@
 // What all programs that read models have in common: limits, the one way to files, and how they answer.
-#ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_READERPROGRAM_H
-#define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_READERPROGRAM_H
+#ifndef ZOR_DEFAULT_PLATFORM_READERPROGRAM_H
+#define ZOR_DEFAULT_PLATFORM_READERPROGRAM_H
 
 #include <string>
 #include <string_view>
