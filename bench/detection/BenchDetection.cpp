@@ -6,8 +6,10 @@
 #include <BRepExtrema_DistShapeShape.hxx>
 #include <BRepPrimAPI_MakeBox.hxx>
 #include <BRepPrimAPI_MakeSphere.hxx>
+#include <Standard_Failure.hxx>
 #include <cstdio>
 #include <ctime>
+#include <exception>
 #include <functional>
 
 #include "toolkit/detection/Assembly.h"
@@ -69,9 +71,15 @@ void MeasureLattice(int inSide) {
 }  // namespace
 }  // namespace ZORDetection
 
-int main(int inCount, char** inArguments) {
+int main(int inCount, char** inArguments) try {
   std::setvbuf(stdout, nullptr, _IOLBF, 0);
   std::puts("model,products,near pairs,found,reading s,finding s,whole shapes s,ratio");
   if (inCount == 1) ZORDetection::MeasureLattice(47);
   for (int i = 1; i < inCount; ++i) ZORDetection::MeasureAssembly(inArguments[i]);
+} catch (const std::exception& error) {
+  std::fprintf(stderr, "%s\n", error.what());
+  return 1;
+} catch (const Standard_Failure& failure) {
+  std::fprintf(stderr, "%s\n", failure.GetMessageString());
+  return 1;
 }

@@ -9,6 +9,7 @@
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
+#include <exception>
 #include <map>
 
 #include "toolkit/detection/Assembly.h"
@@ -98,10 +99,16 @@ int Run(const std::string& inPath, double inClearance) {
 }  // namespace
 }  // namespace ZORDetection
 
-int main(int inCount, char** inArguments) {
+int main(int inCount, char** inArguments) try {
   if (inCount != 3) {
     std::fprintf(stderr, "usage: %s MODEL CLEARANCE\n", inArguments[0]);
     return 2;
   }
   return ZORDetection::Run(inArguments[1], std::atof(inArguments[2]));
+} catch (const std::exception& error) {
+  std::fprintf(stderr, "%s\n", error.what());
+  return 1;
+} catch (const Standard_Failure& failure) {
+  std::fprintf(stderr, "%s\n", failure.GetMessageString());
+  return 1;
 }
