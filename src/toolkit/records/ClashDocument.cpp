@@ -102,7 +102,7 @@ void ClashDocument::Load() {
   } catch (const std::bad_alloc&) {
     throw Error(name_ + ": there is not enough memory for this document");
   }
-  bytes_ = std::string();
+  std::string().swap(bytes_);  // an assignment would keep the memory
   if (Root().isNull()) throw Error(name_ + ": the document is empty");
   for (const KindName& known : kKinds) {
     if (rootName != known.rootName) continue;

@@ -144,12 +144,11 @@ std::string ReportOf(const ConvertOptions& inOptions, const BcfWritten& inWritte
 class Conversion {
  public:
   explicit Conversion(const ConvertOptions& inOptions)
-      : options_(inOptions),
-        bytes_(BytesOfInput(inOptions.file)),
-        document_(inOptions.file, bytes_),
-        file_(inOptions.output) {}
+      : options_(inOptions), document_(inOptions.file), file_(inOptions.output) {}
+  /// @param inBytes those of the file.
+  Conversion(const ConvertOptions& inOptions, const std::string& inBytes)
+      : options_(inOptions), document_(inOptions.file, inBytes), file_(inOptions.output) {}
 
-  const std::string& Bytes() const { return bytes_; }
   ClashDocument& Document() { return document_; }
   OutputFile& File() { return file_; }
   std::function<ZORIProduct_var()> ModelOpener() {
@@ -169,7 +168,6 @@ class Conversion {
 
  private:
   const ConvertOptions& options_;
-  std::string bytes_;
   ClashDocument document_;
   OutputFile file_;
   std::optional<DrawingProgress> progress_;
@@ -177,8 +175,8 @@ class Conversion {
 
 int ConvertToBcf(const ConvertOptions& inOptions, Output& ioOutput) {
   BcfOptions options = BcfOptionsOf(inOptions);
-  Conversion conversion(inOptions);
-  options.resultBytes = conversion.Bytes();
+  options.resultBytes = BytesOfInput(inOptions.file);
+  Conversion conversion(inOptions, options.resultBytes);
   options.drawn = conversion.Drawn();
   const BcfWritten written =
       WriteBcf(conversion.Document(), options, conversion.ModelOpener(), conversion.File().Path());
