@@ -151,9 +151,7 @@ Json ViewerScene::Content::ProductOf(
   if (found == spans.end()) return nullptr;
   const Span& span = found->second;
   Json json = {{"first", span.first}, {"end", span.end}};
-  if (inImposed)
-    json["colour"] = inProduct.colour;
-  else if (!inProduct.colour.empty() && inProduct.colour != span.ownColour)
+  if (inImposed || (!inProduct.colour.empty() && inProduct.colour != span.ownColour))
     json["colour"] = inProduct.colour;
   // Where the result places the product elsewhere than the model does: from where, and to where.
   if (const auto& placement = inProduct.shown.rootFromProduct) {
