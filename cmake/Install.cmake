@@ -33,7 +33,7 @@ install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit FILES_MATCHING P
   PATTERN "detection" EXCLUDE
   PATTERN "viewer" EXCLUDE
   REGEX "/(Deviations|DrawingWorkers|ElementWalk|Manifest|PageData|PageLibrary|PageMaker|PictureDrawing|PictureSettings|PictureStore|PublishedFiles|ReferredPictures|ShippedTexts)[.]h$" EXCLUDE
-  REGEX "/exchange/(BcfNames|BcfPictures|BcfTopics|DocumentTimes|ExchangeLibrary|ExchangeXml|SheetBase|XmlText)[.]h$" EXCLUDE
+  REGEX "/exchange/(BcfNames|BcfPictures|BcfTopics|BcfWords|DocumentTimes|ExchangeLibrary|ExchangeXml|SheetBase|XmlText)[.]h$" EXCLUDE
   REGEX "/review/(Assignment|Frames|HashInput|LanguageWords|PlaceClusters|ProductMatch|ReviewSource|TomlFile)[.]h$" EXCLUDE)
 install(FILES src/toolkit/detection/Detect.h DESTINATION ${headerDir}/toolkit/detection)
 install(FILES ${PROJECT_BINARY_DIR}/generated/ZORLyraExport.h ${PROJECT_BINARY_DIR}/generated/ZORPlatformExport.h

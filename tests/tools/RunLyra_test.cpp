@@ -74,7 +74,7 @@ TEST(Usage, LimitThatIsNoneIsWrong) {
 
 TEST(Usage, UnknownFormatIsWrong) {
   ExpectWrongUsage({"convert", "samples/as1.clash.xml", "--to", "yaml"},
-                   "--to: unknown word \"yaml\"; known are json");
+                   "--to: unknown word \"yaml\"; known are json, bcf, xlsx, csv");
 }
 
 TEST(Streams, StandardInputIsReadForADash) {

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <filesystem>
-#include <regex>
 #include <set>
 #include <unordered_map>
 #include <utility>
@@ -26,6 +25,7 @@
 #include "toolkit/publishing/PublishedFiles.h"
 #include "toolkit/publishing/ReferredPictures.h"
 #include "toolkit/publishing/WorkFolder.h"
+#include "toolkit/publishing/viewer/GeometryFiles.h"
 #include "toolkit/publishing/viewer/PictureCamera.h"
 #include "toolkit/publishing/viewer/ViewerScene.h"
 #include "toolkit/records/DocumentText.h"
@@ -37,7 +37,6 @@ namespace fs = std::filesystem;
 namespace ZORToolkit {
 namespace {
 
-constexpr char kGeometryFolder[] = "viewer";
 constexpr int kOverview = 0;  // its number among the pictures
 
 /// A word that the reader could not understand is shown as the document has it.
@@ -109,7 +108,7 @@ class Publication {
       WriteOneFile(page, manifest);
     } else {
       path /= kPageFile;
-      WriteGeometry(work.Path());
+      WriteGeometry(geometry_, folder_, work.Path());
       WritePublishedFiles(options_, styleSheet_, result_, WithManifest(page, manifest), manifest,
                           work.Path());
     }
@@ -186,30 +185,6 @@ class Publication {
   std::string WithManifest(const std::string& inPage, const std::string& inManifest) const {
     if (!styleSheet_.path.empty() && inPage.find("</body>") == std::string::npos) return inPage;
     return PageWithBlocks(styleSheet_.path, inPage, {}, {}, inManifest);
-  }
-
-  static std::string GeometryPath(const PageBlock& inBlock) {
-    return std::string(kGeometryFolder) + "/" + inBlock.name + ".js";
-  }
-  static std::string GeometryScript(const PageBlock& inBlock) {
-    return "zorBlock(\"" + inBlock.name + "\",\"" + LoadPageLibrary().base64(inBlock.bytes) +
-           "\");\n";
-  }
-
-  /// Of a former publication none stays.
-  void WriteGeometry(const std::string& inWorkFolder) const {
-    static const std::regex names(R"((scene|part-\d+)\.js)");
-    const fs::path folder = fs::path(folder_) / kGeometryFolder;
-    if (fs::exists(folder))
-      for (const fs::directory_entry& entry : fs::directory_iterator(folder))
-        if (std::regex_match(entry.path().filename().string(), names)) fs::remove(entry.path());
-    if (geometry_.empty()) return;
-    fs::create_directories(folder);
-    ZORFoundation::AtomicFileOptions written;
-    written.temporaryFolder = inWorkFolder;
-    for (const PageBlock& block : geometry_)
-      ZORFoundation::WriteWholeFile(folder_ + "/" + GeometryPath(block), GeometryScript(block),
-                                    written);
   }
 
   void WriteOneFile(const std::string& inPage, const std::string& inManifest) const {
@@ -424,9 +399,8 @@ class Publication {
   ReferredPictures pictures_;
   std::vector<PageBlock> geometry_;
   std::vector<Before> before_;
-  ZOR3DRep* overview_ = nullptr;  // the model's
-  std::vector<InterferenceRecord>
-      records_;  // those that the filter accepts, until they are resolved
+  ZOR3DRep* overview_ = nullptr;             // the model's
+  std::vector<InterferenceRecord> records_;  // that the filter accepts; empty once resolved
   std::vector<ElementHandle> others_;
   std::uint64_t hash_ = 0;
   std::vector<ResolvedInterference> resolved_;
