@@ -7,8 +7,8 @@
 #include <map>
 #include <numbers>
 
-#include "default_platform/product_structure/OpenedModels.h"
 #include "default_platform/PartMesh.h"
+#include "default_platform/product_structure/OpenedModels.h"
 
 using products::FactsOf;
 

@@ -4,8 +4,8 @@
 #include <filesystem>
 #include <fstream>
 
-#include "default_platform/product_structure/OpenedModels.h"
 #include "default_platform/PartMesh.h"
+#include "default_platform/product_structure/OpenedModels.h"
 
 using products::FactsOf;
 using products::Folder;

@@ -1,8 +1,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "default_platform/product_structure/OpenedModels.h"
 #include "default_platform/PartMesh.h"
+#include "default_platform/product_structure/OpenedModels.h"
 #include "default_platform/visualisation/SceneGraph.h"
 #include "platform/product_structure/ZORIAlias.h"
 #include "platform/product_structure/ZORILinkableObject.h"

@@ -9,9 +9,9 @@
 #include <numbers>
 #include <regex>
 
+#include "default_platform/PartMesh.h"
 #include "default_platform/product_structure/ModelWriting.h"
 #include "default_platform/product_structure/OpenedModels.h"
-#include "default_platform/PartMesh.h"
 
 using products::FactsOf;
 using products::FindByAliasPath;

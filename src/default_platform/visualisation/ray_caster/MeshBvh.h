@@ -6,8 +6,8 @@
 
 #include <memory>
 
-#include "default_platform/system/ObjectCounters.h"
 #include "default_platform/PartMesh.h"
+#include "default_platform/system/ObjectCounters.h"
 
 namespace ZORRayCaster {
 
