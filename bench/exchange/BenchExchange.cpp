@@ -17,6 +17,7 @@
 
 #include "ChildProcess.h"
 #include "ClashDocumentGenerator.h"
+#include "foundation/ScratchFolder.h"
 #include "toolkit/exchange/ResultSheet.h"
 
 namespace fs = std::filesystem;
@@ -24,21 +25,6 @@ namespace fs = std::filesystem;
 namespace {
 
 constexpr int kRepeats = 5;
-
-struct WorkFolder {
-  WorkFolder() {
-    std::string pattern = (fs::temp_directory_path() / "zor-bench-exchange-XXXXXX").string();
-    if (mkdtemp(pattern.data()) == nullptr) throw std::runtime_error("no folder to work in");
-    path = pattern;
-  }
-  ~WorkFolder() {
-    std::error_code ignored;
-    fs::remove_all(path, ignored);
-  }
-  WorkFolder(const WorkFolder&) = delete;
-  WorkFolder& operator=(const WorkFolder&) = delete;
-  fs::path path;
-};
 
 ChildOutcome Run(const std::vector<std::string>& inCommand) {
   ChildOutcome outcome = RunChild(inCommand);
@@ -104,8 +90,9 @@ void Report(const char* inName, const std::vector<double>& inOurs, double inPeak
 }
 
 int Bench(std::size_t inCount) {
-  const WorkFolder folder;
-  const auto path = [&](const char* inName) { return (folder.path / inName).string(); };
+  const ZORFoundation::ScratchFolder scratch;
+  const fs::path folder = scratch.Path();
+  const auto path = [&](const char* inName) { return (folder / inName).string(); };
   const std::string self = fs::read_symlink("/proc/self/exe").string();
   const std::string lyra = fs::path(self).parent_path() / "lyra", result = path("result.xml");
   {

@@ -20,6 +20,7 @@
 
 #include "ChildProcess.h"
 #include "ResultHash.h"
+#include "foundation/ScratchFolder.h"
 #include "publish/PhaseTimes.h"
 #include "publish/RepeatedResult.h"
 #include "support/ResultOnModel.h"
@@ -37,22 +38,6 @@ struct Options {
   std::string expect;
   std::size_t interferences = 1000;
   int jobs = 2;
-};
-
-/// Removed with all that it holds.
-struct WorkFolder {
-  WorkFolder() {
-    std::string pattern = (fs::temp_directory_path() / "zor-bench-publish-XXXXXX").string();
-    if (mkdtemp(pattern.data()) == nullptr) throw std::runtime_error("no folder to work in");
-    path = pattern;
-  }
-  ~WorkFolder() {
-    std::error_code ignored;
-    fs::remove_all(path, ignored);
-  }
-  WorkFolder(const WorkFolder&) = delete;
-  WorkFolder& operator=(const WorkFolder&) = delete;
-  fs::path path;
 };
 
 /// Milliseconds of processor time of all processes that were started here and have ended.
@@ -184,16 +169,17 @@ void PrintVisibility(const Options& inOptions) {
 }
 
 int Measure(const Options& inOptions) {
-  const WorkFolder folder;
-  PrepareEnvironment(folder.path);
+  const ZORFoundation::ScratchFolder scratch;
+  const fs::path folder = scratch.Path();
+  PrepareEnvironment(folder);
   const std::size_t different = WriteRepeatedResult(inOptions.result, inOptions.interferences,
-                                                    (folder.path / "result.xml").string());
-  const Run run = Publish(inOptions, folder.path);
+                                                    (folder / "result.xml").string());
+  const Run run = Publish(inOptions, folder);
   PrintTimes(inOptions, run);
   char hash[17];
   std::snprintf(hash, sizeof hash, "%016llx",
-                static_cast<unsigned long long>(HashOfPictures(
-                    folder.path / "page/pictures", inOptions.interferences, different)));
+                static_cast<unsigned long long>(
+                    HashOfPictures(folder / "page/pictures", inOptions.interferences, different)));
   std::printf("hash of the pictures: %s\n", hash);
   PrintVisibility(inOptions);
   if (inOptions.expect.empty() || inOptions.expect == hash) return 0;

@@ -1,6 +1,5 @@
 #include "toolkit/exchange/BcfPictures.h"
 
-#include <cstdlib>
 #include <fstream>
 
 #include "PrintPictures.h"
@@ -66,12 +65,6 @@ std::string Colour(const std::string& inColour, const char* inOther) {
   return colour;
 }
 
-fs::path NewFolder() {
-  std::string name = (fs::temp_directory_path() / "lyra-XXXXXX").string();
-  if (mkdtemp(name.data()) == nullptr) throw Error(name + ": the folder cannot be made");
-  return name;
-}
-
 constexpr double kDefaultAspect = 756.0 / 506.0;
 
 }  // namespace
@@ -127,11 +120,6 @@ std::string WhitePng() {
 
 SnapshotMaker::SnapshotMaker(const BcfOptions& inOptions, const std::string& inResultPath)
     : options_(inOptions), resultFolder_(fs::path(inResultPath).parent_path()) {}
-
-SnapshotMaker::~SnapshotMaker() {
-  std::error_code ignored;
-  if (!folder_.empty()) fs::remove_all(folder_, ignored);
-}
 
 std::string SnapshotMaker::PagePicture(int inNumber) const {
   for (const char* const ending : {".png", ".jpg"}) {
@@ -189,10 +177,10 @@ void SnapshotMaker::Draw(const std::vector<std::size_t>& inWanted,
                          const std::vector<ResolvedInterference>& inResolved,
                          std::vector<Snapshot>& ioSnapshots) {
   if (inWanted.empty()) return;
-  folder_ = NewFolder();
+  const ZORFoundation::ScratchFolder& folder = folder_.emplace();
   const ZORDefault::SettingOverride framesTheInterference("ClashPublish", "PictureZoom", 0);
   const auto pathOf = [&](std::size_t inIndex, const char* inEnding) {
-    return (folder_ / (std::to_string(inIndex) + inEnding)).string();
+    return folder.Path() + "/" + std::to_string(inIndex) + inEnding;
   };
   DrawingWork work;
   work.count = inWanted.size();

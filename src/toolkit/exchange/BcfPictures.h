@@ -4,9 +4,11 @@
 
 #include <array>
 #include <filesystem>
+#include <optional>
 #include <string>
 #include <vector>
 
+#include "foundation/ScratchFolder.h"
 #include "foundation/Vector3.h"
 #include "toolkit/exchange/BcfWriter.h"
 #include "toolkit/scenes/InterferenceScenes.h"
@@ -32,7 +34,6 @@ struct Snapshot {
 class SnapshotMaker {
  public:
   SnapshotMaker(const BcfOptions& inOptions, const std::string& inResultPath);
-  ~SnapshotMaker();
   SnapshotMaker(const SnapshotMaker&) = delete;
   SnapshotMaker& operator=(const SnapshotMaker&) = delete;
 
@@ -50,7 +51,8 @@ class SnapshotMaker {
             std::vector<Snapshot>& ioSnapshots);
 
   const BcfOptions& options_;
-  std::filesystem::path resultFolder_, folder_;
+  std::filesystem::path resultFolder_;
+  std::optional<ZORFoundation::ScratchFolder> folder_;  // once something is drawn
 };
 
 /// The size of a PNG picture; nothing for another file.

@@ -10,6 +10,7 @@
 #include "foundation/AtomicFile.h"
 #include "foundation/Hash.h"
 #include "foundation/ReadWholeFile.h"
+#include "foundation/ScratchFolder.h"
 #include "foundation/Vector3.h"
 #include "platform/visualisation/ZOR3DRep.h"
 #include "platform/visualisation/ZORI3DGeoVisu.h"
@@ -413,7 +414,7 @@ Published Publish(ClashDocument& ioResult, const PublicationOptions& inOptions,
                   const std::function<ZORIProduct_var()>& inOpenModel) {
   ioResult.RequireInterferences();
   try {
-    std::optional<ScratchFolder> scratch;
+    std::optional<ZORFoundation::ScratchFolder> scratch;
     if (inOptions.isOneFile) scratch.emplace();
     return Publication(ioResult, inOptions, scratch ? scratch->Path() : inOptions.folder)
         .Make(inOpenModel);

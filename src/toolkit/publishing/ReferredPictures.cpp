@@ -1,7 +1,5 @@
 #include "toolkit/publishing/ReferredPictures.h"
 
-#include <cerrno>
-#include <cstdlib>
 #include <filesystem>
 #include <utility>
 
@@ -11,15 +9,6 @@
 namespace fs = std::filesystem;
 
 namespace ZORToolkit {
-
-ScratchFolder::ScratchFolder() : path_((fs::temp_directory_path() / "lyra-page-XXXXXX").string()) {
-  if (mkdtemp(path_.data()) == nullptr) throw ZORFoundation::FileError(path_, errno);
-}
-
-ScratchFolder::~ScratchFolder() {
-  std::error_code ignored;
-  fs::remove_all(path_, ignored);
-}
 
 std::string ReferredPictures::Refer(const std::string& inFolder, const std::string& inPath,
                                     PictureSize inSize) {

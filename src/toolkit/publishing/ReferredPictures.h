@@ -1,4 +1,4 @@
-// The pictures of a page, and a folder for them while they are drawn.
+// The pictures of a page.
 #ifndef ZOR_TOOLKIT_PUBLISHING_REFERRED_PICTURES_H
 #define ZOR_TOOLKIT_PUBLISHING_REFERRED_PICTURES_H
 
@@ -10,21 +10,6 @@
 #include "toolkit/publishing/OneFile.h"
 
 namespace ZORToolkit {
-
-/// A folder of this run's own that goes with it.
-class ScratchFolder {
- public:
-  /// Raises ZORFoundation::FileError.
-  ScratchFolder();
-  ~ScratchFolder();
-  ScratchFolder(const ScratchFolder&) = delete;
-  ScratchFolder& operator=(const ScratchFolder&) = delete;
-
-  const std::string& Path() const { return path_; }
-
- private:
-  std::string path_;
-};
 
 /// The pictures that a page refers to, with their hashes. In one file equal ones are one.
 class ReferredPictures {
