@@ -58,13 +58,13 @@ const redraw = () => {
   if (isAsked) return;
   isAsked = true;
   delete drawing.canvas.dataset.still;
+  clearTimeout(stillTimer);
   requestAnimationFrame(time => {
     isAsked = false;
     const took = time - lastFrame;
     lastFrame = time;
     if (took < stillAfter) coarseness = Math.min(3, Math.max(1, coarseness * (took > slow ? 1.15 : 0.97)));
     drawNow(1 / coarseness);
-    clearTimeout(stillTimer);
     stillTimer = setTimeout(() => drawNow(2), stillAfter);
   });
 };
@@ -81,7 +81,7 @@ const drawNow = scale => {
     camera: view.camera, sphere: ghosts.length ? view.wholeSphere : view.sphere, section: view.section && sectionPlane(), solids, ghosts,
     points: view.pair.points, isDimension: view.pair.isDimension, marker: view.pair.markers, measured: view.measured,
   });
-  if (scale === 2) canvas.dataset.still = '1';
+  if (scale === 2 && !isAsked) canvas.dataset.still = '1';
 };
 
 // The section: a plane through the interference, which moves along its direction.

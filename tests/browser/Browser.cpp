@@ -157,7 +157,7 @@ json Browser::Value(const std::string& inExpression) {
 }
 
 bool Browser::Wait(const std::string& inExpression) {
-  const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
+  const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(30);
   while (Value(inExpression) != true) {
     if (std::chrono::steady_clock::now() > end) return false;
     std::this_thread::sleep_for(std::chrono::milliseconds(20));

@@ -20,7 +20,7 @@ class Browser {
   void Open(const std::string& inPath);
   /// The value of an expression, after a promise is kept. Not subject to the page's policy.
   nlohmann::json Value(const std::string& inExpression);
-  /// Waits until an expression holds. @return whether it did within ten seconds.
+  /// Waits until an expression holds. @return whether it did within half a minute.
   bool Wait(const std::string& inExpression);
 
   /// Presses and releases a key such as "j", "Enter" or "Escape".

@@ -82,7 +82,9 @@ window.agreement = async n => {
   image.src = document.querySelector(section.querySelector('.picture > a').getAttribute('href') +
                                      ' image').getAttribute('href');
   await image.decode();
-  for (let i = 0; i < 300 && !canvas.dataset.still; ++i) await new Promise(done => setTimeout(done, 10));
+  // A frame that still turns is coarser.
+  for (let i = 0; i < 3000 && !canvas.dataset.still; ++i) await new Promise(done => setTimeout(done, 10));
+  if (!canvas.dataset.still) throw new Error('the view does not come to rest');
   const colours = [...section.querySelectorAll('.card .swatch rect')].map(rect =>
       [1, 3, 5].map(i => parseInt(rect.getAttribute('fill').slice(i, i + 2), 16)));
   const classes = source => {
@@ -306,7 +308,7 @@ TEST_F(Page, OfFiveThousandIsUsableWithinASecond) {
   Open("many.html");
   const double opened = Value("performance.getEntriesByType('navigation')[0].loadEventEnd");
   RecordProperty("milliseconds to open", static_cast<int>(opened));
-  EXPECT_LT(opened, 20000);  // whatever else the machine does; docs/page.md has the figure
+  EXPECT_LT(opened, 60000);  // whatever else the machine does; docs/page.md has the figure
   Value("choose('type', 'Contact')");
   EXPECT_EQ(Text("shown().length"), "1667");
   browser_.Key("j");
