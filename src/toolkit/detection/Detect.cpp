@@ -117,7 +117,7 @@ class Selection {
  public:
   Selection(const std::string& inModel, const DetectionOptions& inOptions,
             const std::vector<Unit>& inUnits) {
-    if (inUnits.size() < 2) throw Error(inModel + ": there are not two products to check");
+    if (inUnits.size() < 2) throw Error(inModel, "there are not two products to check");
     for (const Unit& unit : inUnits) {
       const bool isIn = (inOptions.only.empty() || MatchesAny(inOptions.only, unit)) &&
                         !MatchesAny(inOptions.ignore, unit);
@@ -128,7 +128,7 @@ class Selection {
     }
     for (const auto* side : {&isFirst_, &isSecond_})
       if (std::ranges::find(*side, true) == side->end())
-        throw Error(inModel + ": no product is selected");
+        throw Error(inModel, "no product is selected");
   }
 
   bool IsSelected(std::size_t inUnit) const { return isFirst_[inUnit] || isSecond_[inUnit]; }
@@ -224,7 +224,7 @@ class Detection {
                                 selection_.IsFirst(leaf.unit),
                                 selection_.IsSecond(leaf.unit)});
     }
-    if (result_.productsChecked < 2) throw Error(model_ + ": there are not two products to check");
+    if (result_.productsChecked < 2) throw Error(model_, "there are not two products to check");
   }
 
   ZORDetection::Findings Find() {
@@ -290,7 +290,7 @@ class Detection {
     }
     std::size_t judged = 0;
     for (const Leaf& leaf : chosen_) judged += isWhole.contains(leaf.part) ? 0 : 1;
-    if (judged < 2) throw Error(model_ + ": nothing could be checked: " + FirstReason());
+    if (judged < 2) throw Error(model_, std::string("nothing could be checked: ") + FirstReason());
     if (options_.warn)
       for (const std::string& line : result_.unjudged)
         options_.warn(model_ + ": not checked: " + line);
@@ -332,7 +332,7 @@ DetectionResult Detect(const std::string& inModel, const DetectionOptions& inOpt
     const TreeReading tree(opened.root, inOptions);
     return Detection(inModel, inOptions, tree).Run();
   } catch (const ZORDefault::ModelError& error) {
-    throw Error(error.what());
+    throw Error(error.GetPath(), error.GetReason());
   }
 }
 

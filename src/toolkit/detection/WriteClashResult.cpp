@@ -145,7 +145,7 @@ void WriteClashResult(const DetectionResult& inResult, const CalendarDate& inDat
   std::ofstream stream(inPath, std::ios::binary | std::ios::trunc);
   ResultWriter(inResult, stream).Write(inDate);
   stream.close();
-  if (!stream) throw Error(inPath + ": cannot be written");
+  if (!stream) throw Error(inPath, "cannot be written");
 }
 
 }  // namespace ZORToolkit

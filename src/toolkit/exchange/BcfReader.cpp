@@ -247,7 +247,7 @@ class BcfCollector {
 
   BcfProject Finish() {
     if (!hasVersion_ && project_.topics.empty())
-      throw Error(path_ + ": is no BCF file: it has neither bcf.version nor a topic");
+      throw Error(path_, "is no BCF file: it has neither bcf.version nor a topic");
     if (project_.version.empty()) project_.version = isOfVersion3_ ? "3.0" : "2.1";
     for (BcfTopic& topic : project_.topics) FindFiles(topic);
     return std::move(project_);
@@ -308,14 +308,14 @@ BcfProject ReadBcf(const std::string& inPath) {
   try {
     ZORFoundation::OpenForReading(inPath);
   } catch (const ZORFoundation::FileError& error) {
-    throw Error(error.what());
+    throw Error(error.Path(), error.Reason());
   }
   BcfCollector collector(inPath);
   std::string reason;
   if (!FindExchangeFunction<ReadArchiveFunction>(kReadArchiveName)(
           inPath, &BcfCollector::Wants,
           [&](ArchiveEntry&& inEntry) { collector.Add(std::move(inEntry)); }, reason))
-    throw Error(inPath + ": " + reason);
+    throw Error(inPath, reason);
   return collector.Finish();
 }
 

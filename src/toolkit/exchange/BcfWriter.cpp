@@ -64,8 +64,9 @@ class BcfFileWriter {
   BcfWritten Write(const std::function<ZORIProduct_var()>& inOpenModel, const std::string& inPath) {
     constexpr std::size_t kFilesOfTopic = 3, kOtherFiles = 5;
     if (topics_.size() > (kMaxArchiveEntries - kOtherFiles) / kFilesOfTopic)
-      throw Error(about_.file + ": makes " + std::to_string(topics_.size()) +
-                  " topics, more than a BCF file has room for; group them, or choose some");
+      throw Error(about_.file,
+                  std::string("makes ") + std::to_string(topics_.size()) +
+                      " topics, more than a BCF file has room for; group them, or choose some");
     SnapshotMaker maker(options_, about_.file);
     std::vector<const InterferenceRecord*> shown;
     for (const PlannedTopic& topic : topics_) shown.push_back(&Record(topic.representative));
@@ -73,7 +74,7 @@ class BcfFileWriter {
     const BcfWritten written = Report();
     std::string reason;
     if (!FindExchangeFunction<WriteArchiveFunction>(kWriteArchiveName)(inPath, Entries(), reason))
-      throw Error(about_.file + ": the BCF file cannot be written: " + reason);
+      throw Error(about_.file, std::string("the BCF file cannot be written: ") + reason);
     return written;
   }
 

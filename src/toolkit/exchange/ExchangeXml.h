@@ -31,16 +31,15 @@ inline DOM_Node ParseXml(const std::string& inName, const std::string& inBytes) 
       reinterpret_cast<const unsigned char*>(inBytes.data()),
       static_cast<unsigned int>(inBytes.size()), FromUtf8(inName), 0, made);
   const std::unique_ptr<InputSource> source(made);
-  if (FAILED(result)) throw Error(inName + ": is too large");
+  if (FAILED(result)) throw Error(inName, "is too large");
   DOMParser parser;
   try {
     parser.parse(*source);
   } catch (const ZORXMLParseError& error) {
-    throw Error(inName + ":" + std::to_string(error.line) + ":" + std::to_string(error.column) +
-                ": " + error.reason);
+    throw Error(inName, error.reason, FilePlace{error.line, error.column});
   }
   if (!parser.getDocument().getDoctype().isNull())
-    throw Error(inName + ": has a document type, which no file of BCF has");
+    throw Error(inName, "has a document type, which no file of BCF has");
   return parser.getDocument().getDocumentElement();
 }
 

@@ -147,7 +147,7 @@ class WorkbookMaker {
 
   SpreadsheetWritten Write(const std::function<ZORIProduct_var()>& inOpenModel) {
     if (rows_.Result().interferences.size() > kMaxSheetRows)
-      throw Error(about_.file + ": has more interferences than a sheet has rows");
+      throw Error(about_.file, "has more interferences than a sheet has rows");
     FindPictures(inOpenModel);
     WriteInterferences();
     WriteSummary();
@@ -155,7 +155,7 @@ class WorkbookMaker {
     WriteGroups();
     const std::string reason = book_->Finish();
     if (!reason.empty())
-      throw Error(about_.file + ": the spreadsheet cannot be written: " + reason);
+      throw Error(about_.file, std::string("the spreadsheet cannot be written: ") + reason);
     written_.notCarried = {
         {"placements", static_cast<int>(written_.interferences), ""},
         {"points of contact, but for their mean", static_cast<int>(written_.interferences), ""},

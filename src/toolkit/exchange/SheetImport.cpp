@@ -80,8 +80,8 @@ class Workbook {
         sheets_[inEntry.name] = std::move(inEntry.bytes);
     };
     if (!FindExchangeFunction<ReadArchiveFunction>(kReadArchiveName)(inPath, wants, visit, reason))
-      throw Error(inPath + ": " + reason);
-    if (sheets_.empty()) throw Error(inPath + ": is no workbook: it has no sheet");
+      throw Error(inPath, reason);
+    if (sheets_.empty()) throw Error(inPath, "is no workbook: it has no sheet");
   }
 
   /// @param inVisit told the rows of a sheet; false for the header of one that is not meant.
@@ -205,7 +205,7 @@ class SheetImporter {
   }
 
   ImportedReview Finish() {
-    if (!columns_) throw Error(path_ + ": has no columns \"Id\" and \"Status\" or \"Comment\"");
+    if (!columns_) throw Error(path_, "has no columns \"Id\" and \"Status\" or \"Comment\"");
     for (auto& [number, entry] : entries_) review_.entries.push_back(std::move(entry));
     return std::move(review_);
   }
@@ -292,7 +292,7 @@ ImportedReview ImportSheet(const ReviewedResult& inResult, const std::string& in
     else
       ForEachTextRow(ZORFoundation::ReadWholeFile(inPath, {kMaxText, true}).bytes, take);
   } catch (const ZORFoundation::FileError& error) {
-    throw Error(error.what());
+    throw Error(error.Path(), error.Reason());
   }
   return importer.Finish();
 }

@@ -92,7 +92,7 @@ std::string JsonOf(const Manifest& inManifest) {
 Manifest ManifestFrom(const std::string& inName, const std::string& inJson) {
   try {
     const Json json = Json::parse(inJson);
-    if (json.at("format") != kFormat) throw Error(inName + ": is no manifest of a page");
+    if (json.at("format") != kFormat) throw Error(inName, "is no manifest of a page");
     Manifest manifest;
     manifest.version = json.at("version").get<std::string>();
     manifest.result = OptionalFileFrom(json, "result");
@@ -103,7 +103,7 @@ Manifest ManifestFrom(const std::string& inName, const std::string& inJson) {
     for (const Json& file : json.at("files")) manifest.files.push_back(FileFrom(file));
     return manifest;
   } catch (const Json::exception&) {
-    throw Error(inName + ": is no manifest of a page");
+    throw Error(inName, "is no manifest of a page");
   }
 }
 

@@ -47,7 +47,7 @@ std::string PageWithBlocks(const std::string& inName, const std::string& inPage,
                            const std::vector<PagePicture>& inPictures,
                            const std::vector<PageBlock>& inBlocks, const std::string& inManifest) {
   const std::size_t end = inPage.rfind("</body>");
-  if (end == std::string::npos) throw Error(inName + ": the style sheet makes no HTML page");
+  if (end == std::string::npos) throw Error(inName, "the style sheet makes no HTML page");
   const PageLibrary& library = LoadPageLibrary();
   std::string page = inPage.substr(0, end);
   if (!inPictures.empty()) {
@@ -78,7 +78,7 @@ std::optional<std::string_view> PublishedPage::ElementText(const std::string& in
 
 std::string PublishedPage::ManifestText() const {
   const auto text = ElementText(kManifestStart);
-  if (!text) throw Error(name_ + ": is no page of lyra publish, or is cut off");
+  if (!text) throw Error(name_, "is no page of lyra publish, or is cut off");
   return std::string(*text);
 }
 
@@ -99,10 +99,10 @@ std::optional<std::string> PublishedPage::Block(const std::string& inName) const
 std::string PublishedPage::Result() const {
   const Manifest manifest = ManifestFrom(name_, ManifestText());
   if (!manifest.result || bytes_.find(BlockStart(kSourceBlock)) == std::string::npos)
-    throw Error(name_ + ": the page holds no result; it was made with -o DIR");
+    throw Error(name_, "the page holds no result; it was made with -o DIR");
   const std::optional<std::string> result = Block(kSourceBlock);
   if (!result || Sha256Text(*result) != manifest.result->sha256)
-    throw Error(name_ + ": the result in the page is damaged: its hash is another");
+    throw Error(name_, "the result in the page is damaged: its hash is another");
   return *result;
 }
 

@@ -95,8 +95,8 @@ bool PictureStore::Prepare(const std::string& inStamp, bool inGoesOn,
   if (old) own = old->names.value_or(present);
   for (const std::string& name : present)
     if (!own.contains(name))
-      throw Error((shownFolder_ / name).string() +
-                  ": is in the way of a picture and was not drawn by lyra publish");
+      throw Error((shownFolder_ / name).string(),
+                  "is in the way of a picture and was not drawn by lyra publish");
   const bool isSame = old && old->text == inStamp;
   const bool stays = inGoesOn && isSame;
   if (!stays)

@@ -419,7 +419,7 @@ Published Publish(ClashDocument& ioResult, const PublicationOptions& inOptions,
     return Publication(ioResult, inOptions, scratch ? scratch->Path() : inOptions.folder)
         .Make(inOpenModel);
   } catch (const fs::filesystem_error& error) {
-    throw Error(error.path1().string() + ": " + error.code().message());
+    throw Error(error.path1().string(), error.code().message());
   }
 }
 

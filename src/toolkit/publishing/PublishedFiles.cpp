@@ -25,7 +25,7 @@ constexpr std::uint64_t kMaxStyleSheetSize = std::uint64_t{64} << 20;
 Page MakePage(const PageRequest& inRequest) {
   Page page;
   if (!LoadPageLibrary().makePage(inRequest, page))
-    throw Error(inRequest.styleSheetName + ": " + page.reason);
+    throw Error(inRequest.styleSheetName, page.reason);
   return page;
 }
 
@@ -63,7 +63,7 @@ void WriteReportFile(const ClashDocument& inDocument, const std::string& inStyle
   prologue.styleSheet = inStyleSheet;
   ZORFoundation::AtomicFile file(inPath, inOptions);
   if (FAILED(WriteReport(inDocument, prologue, file.Temporary().Utf8Path())))
-    throw Error(inPath + ": the file could not be written");
+    throw Error(inPath, "the file could not be written");
   file.Commit();
 }
 
@@ -75,10 +75,10 @@ PageStyleSheet::PageStyleSheet(const std::string& inPath)
   ZORFoundation::ReadOptions limit;
   limit.maxSize = kMaxStyleSheetSize;
   text = ZORFoundation::ReadWholeFile(path, limit).bytes;
-  if (text.empty()) throw Error(path + ": the style sheet is empty");
+  if (text.empty()) throw Error(path, "the style sheet is empty");
   const std::string name = FileNameOf(*this);
   if (name == kReportFile || name == kPageFile || name == kReportType || name == kManifestFile)
-    throw Error(path + ": a style sheet of this name would take the place of another");
+    throw Error(path, "a style sheet of this name would take the place of another");
   MakePage({"", text, path});
 }
 

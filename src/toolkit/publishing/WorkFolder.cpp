@@ -72,7 +72,7 @@ void WorkFolder::Lock(const fs::path& inFolder) {
     if (!isLocked && errno != EWOULDBLOCK && errno != ENOENT)
       throw ZORFoundation::FileError(lockPath_, errno);
     if (Clock::now() > end)
-      throw Error(inFolder.string() + ": another lyra publishes into this folder");
+      throw Error(inFolder.string(), "another lyra publishes into this folder");
   }
 }
 

@@ -38,8 +38,8 @@ void CheckRegularFile(const std::string& inPath) {
     ZORFoundation::OpenForReading(inPath);
   } catch (const ZORFoundation::FileError& error) {
     const bool isStream = error.Code() == ESPIPE;
-    throw Error(error.what() +
-                std::string(isStream ? " (what a pipe carries is read as \"-\")" : ""));
+    throw Error(error.Path(),
+                error.Reason() + (isStream ? " (what a pipe carries is read as \"-\")" : ""));
   }
 }
 
@@ -48,15 +48,8 @@ std::string ReadStandardInput() {
   try {
     return ZORFoundation::ReadToEnd(kStandardInput, "-", INT_MAX);
   } catch (const ZORFoundation::FileError& error) {
-    throw Error(error.Code() == EFBIG ? "-: is larger than 2 GB" : error.what());
+    throw Error("-", error.Code() == EFBIG ? "is larger than 2 GB" : error.Reason());
   }
-}
-
-std::string Place(const std::string& inName, const ZORXMLParseError& inError) {
-  std::string place = inName + ":";
-  if (inError.line != 0) place += std::to_string(inError.line) + ":";
-  if (inError.column != 0) place += std::to_string(inError.column) + ":";
-  return place;
 }
 
 }  // namespace
@@ -98,18 +91,19 @@ void ClashDocument::Load() {
     // This form of loading hands the tree out; a document without root shows by its missing root.
     reader_->LoadSequence(document_, rootName);
   } catch (const ZORXMLParseError& error) {
-    throw Error(Place(name_, error) + " " + error.reason);
+    throw Error(name_, error.reason, FilePlace{error.line, error.column});
   } catch (const std::bad_alloc&) {
-    throw Error(name_ + ": there is not enough memory for this document");
+    throw Error(name_, "there is not enough memory for this document");
   }
   std::string().swap(bytes_);  // an assignment would keep the memory
-  if (Root().isNull()) throw Error(name_ + ": the document is empty");
+  if (Root().isNull()) throw Error(name_, "the document is empty");
   for (const KindName& known : kKinds) {
     if (rootName != known.rootName) continue;
     kind_ = known.kind;
     return;
   }
-  throw Error(name_ + ": is no clash result: its root element is \"" + Utf8(rootName) + "\"");
+  throw Error(name_,
+              std::string("is no clash result: its root element is \"") + Utf8(rootName) + "\"");
 }
 
 std::string ClashDocument::Version() const {
@@ -121,8 +115,8 @@ std::string ClashDocument::Version() const {
 void ClashDocument::Require(std::initializer_list<DocumentKind> inKinds,
                             const char* inContent) const {
   if (std::find(inKinds.begin(), inKinds.end(), kind_) != inKinds.end()) return;
-  throw Error(name_ + ": " + Description(kind_) + " (\"" + RootName(kind_) + "\") has no " +
-              inContent);
+  throw Error(name_, std::string(Description(kind_)) + " (\"" + RootName(kind_) + "\") has no " +
+                         inContent);
 }
 
 }  // namespace ZORToolkit

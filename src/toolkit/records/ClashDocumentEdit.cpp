@@ -133,8 +133,8 @@ void ClashDocumentEdit::TakeIn(ClashDocument& inOther, std::string& ioTrace) {
   try {
     inOther.Reader().MergeDocuments(document_.Document(), inOther.Document(), trace);
   } catch (const DOM_DOMException& error) {
-    throw Error(inOther.Name() +
-                ": there is no result set to take its interferences: " + error.what());
+    throw Error(inOther.Name(),
+                std::string("there is no result set to take its interferences: ") + error.what());
   }
   ioTrace += Utf8(trace);
 }

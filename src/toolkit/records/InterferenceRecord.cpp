@@ -317,8 +317,19 @@ InterferenceRecord ReadInterference(ClashDocument& ioDocument, long long inNumbe
   const std::string held = count == 0   ? "no interference"
                            : count == 1 ? "1 interference"
                                         : std::to_string(count) + " interferences";
-  throw Error(ioDocument.Name() + ": there is no interference " + std::to_string(inNumber) +
-              ": the document has " + held);
+  throw Error(ioDocument.Name(), std::string("there is no interference ") +
+                                     std::to_string(inNumber) + ": the document has " + held);
+}
+
+InterferenceIndex::InterferenceIndex(ClashDocument& ioDocument) : document_(ioDocument) {
+  ForEachPlaced(ioDocument, [&](const PlacedInterference& inPlaced) {
+    places_.push_back({inPlaced.set, inPlaced.element});
+  });
+}
+
+InterferenceRecord InterferenceIndex::Read(int inNumber) const {
+  const Place& place = places_[static_cast<std::size_t>(inNumber - 1)];
+  return ZORToolkit::Read(document_, {inNumber, place.set, place.element}, RecordPart::kAll);
 }
 
 int CountInterferences(const ClashDocument& inDocument) {

@@ -116,6 +116,25 @@ ZOR_TOOLKIT_EXPORT InterferenceRecord ReadInterference(ClashDocument& ioDocument
 ZOR_TOOLKIT_EXPORT std::uint64_t HashOf(const InterferenceRecord& inRecord);
 ZOR_TOOLKIT_EXPORT int CountInterferences(const ClashDocument& inDocument);
 
+/// The interferences of a document by their numbers: found once, each read when it is asked for. It
+/// does not see interferences that an edit adds or takes out.
+class ZOR_TOOLKIT_EXPORT InterferenceIndex {
+ public:
+  /// @param ioDocument lives as long as this. Raises Error for a document of another kind.
+  explicit InterferenceIndex(ClashDocument& ioDocument);
+
+  int Count() const { return static_cast<int>(places_.size()); }
+  /// @param inNumber 1 to Count().
+  InterferenceRecord Read(int inNumber) const;
+
+ private:
+  struct Place {
+    DOM_Node set, element;
+  };
+  ClashDocument& document_;
+  std::vector<Place> places_;
+};
+
 }  // namespace ZORToolkit
 
 #endif

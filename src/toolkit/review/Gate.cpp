@@ -82,7 +82,7 @@ GatePolicy ReadPolicy(const std::string& inName, std::string_view inText) {
   file.ForEachTable("limit",
                     [&](TomlTable& ioTable) { policy.limits.push_back(LimitIn(ioTable)); });
   file.Finish();
-  if (policy.limits.empty()) throw Error(inName + ": has no limit; a limit begins with [[limit]]");
+  if (policy.limits.empty()) throw Error(inName, "has no limit; a limit begins with [[limit]]");
   return policy;
 }
 

@@ -58,7 +58,7 @@ std::vector<AcceptanceRule> ReadRules(const std::string& inName, std::string_vie
     rules.push_back(std::move(rule));
   });
   file.Finish();
-  if (rules.empty()) throw Error(inName + ": has no rule; a rule begins with [[accept]]");
+  if (rules.empty()) throw Error(inName, "has no rule; a rule begins with [[accept]]");
   return rules;
 }
 

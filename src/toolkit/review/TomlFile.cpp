@@ -19,9 +19,8 @@ struct TomlTable::Data {
 
 namespace {
 
-std::string Place(const std::string& inName, const toml::source_region& inSource) {
-  return inName + ":" + std::to_string(inSource.begin.line) + ":" +
-         std::to_string(inSource.begin.column) + ": ";
+FilePlace PlaceOf(const toml::source_region& inSource) {
+  return {inSource.begin.line, inSource.begin.column};
 }
 
 std::string WordKey(const std::string& inWord) {
@@ -40,22 +39,21 @@ TomlTable::~TomlTable() = default;
 
 TomlTable TomlTable::Parse(const std::string& inName, std::string_view inText) {
   if (const auto place = ZORFoundation::FindTooDeepToml(inText))
-    throw Error(inName + ":" + std::to_string(place->line) + ":" + std::to_string(place->column) +
-                ": " + ZORFoundation::kTomlTooDeep);
+    throw Error(inName, ZORFoundation::kTomlTooDeep, FilePlace{place->line, place->column});
   try {
     auto document = std::make_shared<const toml::table>(toml::parse(inText, inName));
     const toml::table* const table = document.get();
     return TomlTable(std::make_unique<Data>(Data{std::move(document), table, inName, {}}));
   } catch (const toml::parse_error& error) {
-    throw Error(Place(inName, error.source()) + std::string(error.description()));
+    throw Error(inName, std::string(error.description()), PlaceOf(error.source()));
   }
 }
 
 void TomlTable::Fail(const char* inKey, const std::string& inReason) const {
   const toml::node* const node = inKey == nullptr ? nullptr : data_->table->get(inKey);
   const toml::source_region& source = node == nullptr ? data_->table->source() : node->source();
-  throw Error(Place(data_->name, source) +
-              (inKey == nullptr ? "" : "\"" + std::string(inKey) + "\": ") + inReason);
+  const std::string key = inKey == nullptr ? "" : std::string("\"").append(inKey).append("\": ");
+  throw Error(data_->name, key + inReason, PlaceOf(source));
 }
 
 std::optional<std::string> TomlTable::Text(const char* inKey) {
@@ -150,8 +148,9 @@ void TomlTable::Finish() const {
     if (data_->known.contains(key.str())) continue;
     std::string known;
     for (const std::string& name : data_->known) known += (known.empty() ? "" : ", ") + name;
-    throw Error(Place(data_->name, key.source()) + "unknown key \"" + std::string(key.str()) +
-                "\"; known are " + known);
+    throw Error(data_->name,
+                std::string("unknown key \"").append(key.str()).append("\"; known are ") + known,
+                PlaceOf(key.source()));
   }
 }
 

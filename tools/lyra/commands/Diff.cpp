@@ -4,8 +4,10 @@
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
+#include "lyra/commands/JsonFields.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Table.h"
+#include "toolkit/review/ReviewFields.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -31,21 +33,6 @@ std::string IndexText(int inPosition) {
   return inPosition < 0 ? "" : std::to_string(inPosition + 1);
 }
 
-OrderedJson IndexJson(int inPosition) {
-  return inPosition < 0 ? OrderedJson(nullptr) : OrderedJson(inPosition + 1);
-}
-
-OrderedJson ToJson(const DiffEntry& inEntry, const std::string& inId) {
-  OrderedJson changes = OrderedJson::array();
-  for (const Change& change : inEntry.changes)
-    changes.push_back({{"what", change.what}, {"from", change.from}, {"to", change.to}});
-  return {{"id", inId},
-          {"old", IndexJson(inEntry.oldPosition)},
-          {"new", IndexJson(inEntry.newPosition)},
-          {"reason", inEntry.reason},
-          {"changes", changes}};
-}
-
 void PrintJson(const Compared& inCompared, Output& ioOutput) {
   const std::vector<std::string> ids = inCompared.Ids();
   std::string begin = JsonHeaderText("diff") + ",\n";
@@ -57,7 +44,7 @@ void PrintJson(const Compared& inCompared, Output& ioOutput) {
     for (std::size_t k = 0; k < ids.size(); ++k) {
       const DiffEntry& entry = inCompared.diff.entries[k];
       if (entry.itsClass != itsClass) continue;
-      ioOutput.Write(lineBegin + JsonLine(ToJson(entry, ids[k])));
+      ioOutput.Write(lineBegin + JsonLine(JsonOf(IdentifiedEntry{entry, ids[k]})));
       lineBegin = ",\n";
     }
     ioOutput.Write(*lineBegin == ',' ? "\n]" : "]");

@@ -5,9 +5,10 @@
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/GroupOptions.h"
+#include "lyra/commands/JsonFields.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Table.h"
-#include "toolkit/review/Match.h"
+#include "toolkit/review/ReviewFields.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -20,20 +21,6 @@ struct GroupOptionsOfVerb {
   GroupVerbOptions grouping;
   bool json = false;
 };
-
-OrderedJson ToJson(const InterferenceGroup& inGroup) {
-  OrderedJson members = OrderedJson::array(), groups = OrderedJson::array();
-  for (const int member : inGroup.members) members.push_back(member + 1);
-  for (const InterferenceGroup& inner : inGroup.groups) groups.push_back(ToJson(inner));
-  return {{"id", inGroup.id},
-          {"by", Name(inGroup.by)},
-          {"label", inGroup.label},
-          {"size", inGroup.members.size()},
-          {"members", members},
-          {"representative", inGroup.representative + 1},
-          {"worst", inGroup.worst ? OrderedJson(*inGroup.worst) : OrderedJson(nullptr)},
-          {"groups", groups}};
-}
 
 /// Groups inside one that hold no less than it are left out: they say nothing new.
 void AddRows(const std::vector<InterferenceGroup>& inGroups, int inDepth, Table& ioTable) {
@@ -55,7 +42,7 @@ int Group(const GroupOptionsOfVerb& inOptions, Output& ioOutput) {
   const auto groups = GroupInterferences(result, StableIds(result), options);
   if (inOptions.json) {
     std::vector<OrderedJson> rows;
-    for (const InterferenceGroup& group : groups) rows.push_back(ToJson(group));
+    for (const InterferenceGroup& group : groups) rows.push_back(JsonOf(group));
     ioOutput.Write(JsonRows(rows) + "\n");
     return 0;
   }

@@ -7,19 +7,13 @@
 #include "lyra/commands/Model.h"
 #include "lyra/terminal/Output.h"
 #include "toolkit/exchange/BcfFile.h"
-#include "toolkit/records/DocumentRecords.h"
+#include "toolkit/records/RecordFields.h"
 
 namespace lyra {
 
-/// An interference with its stable identifier.
-struct IdentifiedRecord {
-  const ZORToolkit::InterferenceRecord& record;
-  const std::string& id;
-};
-
 /// A record as one line of UTF-8 JSON, without line feed. Characters that could drive a terminal
 /// are escaped; bytes that are no UTF-8 become U+FFFD.
-std::string JsonText(const IdentifiedRecord& inRecord);
+std::string JsonText(const ZORToolkit::IdentifiedRecord& inRecord);
 std::string JsonText(const ZORToolkit::DocumentRecord& inRecord);
 std::string JsonText(const ZORToolkit::ComponentRecord& inRecord);
 std::string JsonText(const ZORToolkit::SpecificationRecord& inRecord);

@@ -1,0 +1,48 @@
+// The fields of differences and groups; see toolkit/records/RecordFields.h.
+#ifndef ZOR_TOOLKIT_REVIEW_REVIEW_FIELDS_H
+#define ZOR_TOOLKIT_REVIEW_REVIEW_FIELDS_H
+
+#include <string>
+
+#include "toolkit/records/RecordFields.h"
+#include "toolkit/review/Diff.h"
+#include "toolkit/review/Group.h"
+
+namespace ZORToolkit {
+
+/// An interference that a difference is about, with its stable identifier.
+struct IdentifiedEntry {
+  const DiffEntry& entry;
+  const std::string& id;
+};
+
+template <class Maker>
+auto ValueOf(Maker& m, const Change& inChange) {
+  return m.Object("what", m.Text(inChange.what), "from", m.Text(inChange.from), "to",
+                  m.Text(inChange.to));
+}
+
+template <class Maker>
+auto ValueOf(Maker& m, const IdentifiedEntry& inIdentified) {
+  const auto number = [&](int inPosition) {
+    return inPosition < 0 ? m.Null() : m.Integer(inPosition + 1);
+  };
+  const DiffEntry& entry = inIdentified.entry;
+  return m.Object("id", m.Text(inIdentified.id), "old", number(entry.oldPosition), "new",
+                  number(entry.newPosition), "reason", m.Text(entry.reason), "changes",
+                  m.Records(entry.changes));
+}
+
+template <class Maker>
+typename Maker::Value ValueOf(Maker& m, const InterferenceGroup& inGroup) {
+  return m.Object(
+      "id", m.Text(inGroup.id), "by", m.Text(Name(inGroup.by)), "label", m.Text(inGroup.label),
+      "size", m.Integer(static_cast<long long>(inGroup.members.size())), "members",
+      m.Array(inGroup.members, [&](int inPosition) { return m.Integer(inPosition + 1); }),
+      "representative", m.Integer(inGroup.representative + 1), "worst",
+      inGroup.worst ? m.Real(*inGroup.worst) : m.Null(), "groups", m.Records(inGroup.groups));
+}
+
+}  // namespace ZORToolkit
+
+#endif
