@@ -14,6 +14,7 @@
 #include "Measurement.h"
 #include "Results.h"
 #include "StartTimes.h"
+#include "foundation/ScratchFolder.h"
 
 namespace {
 namespace fs = std::filesystem;
@@ -39,27 +40,6 @@ struct Subject {
   const char* name;
   const char* measurement;
   Memory memory = kModest;
-};
-
-// A directory of our own, gone at the end.
-class Scratch {
- public:
-  Scratch() {
-    std::string pattern = (fs::temp_directory_path() / "zor_bench.XXXXXX").string();
-    if (mkdtemp(pattern.data()) == nullptr)
-      throw std::runtime_error("no directory can be made in " + fs::temp_directory_path().string());
-    path_ = pattern;
-  }
-  Scratch(const Scratch&) = delete;
-  Scratch& operator=(const Scratch&) = delete;
-  ~Scratch() {
-    std::error_code ignored;
-    fs::remove_all(path_, ignored);
-  }
-  const fs::path& Path() const { return path_; }
-
- private:
-  fs::path path_;
 };
 
 // The measuring process prints its steps, name last since it may hold spaces.
@@ -108,7 +88,7 @@ class Bench {
 
   std::string Document(const std::string& inName, std::size_t inCount, std::uint64_t inSeed,
                        void (*inWrite)(std::size_t, std::uint64_t, std::ostream&)) {
-    const fs::path path = scratch_.Path() / inName;
+    const fs::path path = fs::path(scratch_.Path()) / inName;
     std::ofstream file(path, std::ios::binary);
     inWrite(inCount, inSeed, file);
     if (!file.flush()) throw std::runtime_error("no room for the documents");
@@ -117,7 +97,7 @@ class Bench {
 
   void RunOnDocuments(std::size_t inSize) {
     const std::string clashes = Document("clashes.xml", inSize, 1, WriteClashDocument);
-    const std::string output = (scratch_.Path() / "output.xml").string();
+    const std::string output = scratch_.Path() + "/output.xml";
     if (IsWanted("load"))
       Compare("load", inSize,
               {{"ZORLyra", "load-zorlyra"},
@@ -337,7 +317,7 @@ class Bench {
   }
 
   Options options_;
-  Scratch scratch_;
+  const ZORFoundation::ScratchFolder scratch_;
   const std::string program_ = fs::read_symlink("/proc/self/exe").string();
   Results results_;
   bool startMeasured_ = false;

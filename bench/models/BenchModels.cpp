@@ -13,6 +13,7 @@
 #include "ResultHash.h"
 #include "default_platform/OpenModel.h"
 #include "default_platform/PartMesh.h"
+#include "foundation/ScratchFolder.h"
 
 namespace {
 namespace fs = std::filesystem;
@@ -79,8 +80,8 @@ int main(int inCount, char** inArguments) {
     return 2;
   }
   // A cache of this run's own, so that the first opening is one.
-  std::string cache = (fs::temp_directory_path() / "zor-bench-models-XXXXXX").string();
-  if (mkdtemp(cache.data()) == nullptr || setenv("XDG_CACHE_HOME", cache.c_str(), 1) != 0) return 1;
+  const ZORFoundation::ScratchFolder cache;
+  if (setenv("XDG_CACHE_HOME", cache.Path().c_str(), 1) != 0) return 1;
   std::printf("%-32s %12s %12s %8s  %-8s  hash\n", "model", "first ms", "cached ms", "ratio",
               "10 times");
   bool same = true;
@@ -90,6 +91,5 @@ int main(int inCount, char** inArguments) {
     std::fprintf(stderr, "zor_bench_models: %s\n", failure.what());
     same = false;
   }
-  fs::remove_all(cache);
   return same ? 0 : 1;
 }

@@ -19,6 +19,7 @@
 
 #include "ChildProcess.h"
 #include "PictureScenes.h"
+#include "foundation/ScratchFolder.h"
 #include "platform/visualisation/ZORPrint3DRepImage.h"
 
 namespace fs = std::filesystem;
@@ -28,19 +29,11 @@ namespace {
 constexpr int kPictures = 15;
 constexpr int kViewerRuns = 3;
 
-/// Removed with all that it holds. Models that are opened are cached in it.
-struct WorkFolder {
-  WorkFolder() : path((fs::temp_directory_path() / "zor-bench-pictures-XXXXXX").string()) {
-    if (!mkdtemp(path.data()) || setenv("XDG_CACHE_HOME", path.c_str(), 1) != 0)
-      throw std::runtime_error("no folder to work in");
+/// Models that are opened are cached in it.
+struct WorkFolder : ZORFoundation::ScratchFolder {
+  WorkFolder() {
+    if (setenv("XDG_CACHE_HOME", Path().c_str(), 1) != 0) throw std::runtime_error("no cache");
   }
-  ~WorkFolder() {
-    std::error_code ignored;
-    fs::remove_all(path, ignored);
-  }
-  WorkFolder(const WorkFolder&) = delete;
-  WorkFolder& operator=(const WorkFolder&) = delete;
-  std::string path;
 };
 
 /// The server must not start anew when a window's connection ends, or the next one may fail.
@@ -139,8 +132,8 @@ class Comparison {
   /// quickest of some runs, since both are timed by the clock on the wall.
   void WithViewer(const std::string& inScene) {
     if (!fs::exists("/usr/bin/f3d")) return;
-    const fs::path model = fs::path(folder_.path) / "scene.obj",
-                   picture = fs::path(folder_.path) / "f3d.png";
+    const fs::path model = fs::path(folder_.Path()) / "scene.obj",
+                   picture = fs::path(folder_.Path()) / "f3d.png";
     WriteObj(inScene, model);
     Times mine{INFINITY, INFINITY}, viewers{INFINITY, NAN};
     for (int run = 0; run < kViewerRuns; ++run) {

@@ -1,33 +1,10 @@
 // A model in the form of the cache: refused, or the same after writing it.
-#include "default_platform/product_structure/ModelData.h"
 #include "fuzz/Fuzz.h"
+#include "support/SmallModel.h"
 
 namespace {
 
 using ZORDefault::ModelData;
-
-/// An assembly of one part with a triangle and an edge.
-ModelData SmallModel() {
-  auto mesh = std::make_shared<PartMesh>();
-  mesh->points = {{0, 0, 0}, {1, 0, 0}, {0, 1, 0}};
-  mesh->normals = {{0, 0, 1}, {0, 0, 1}, {0, 0, 1}};
-  mesh->triangles = {{0, 1, 2}};
-  mesh->triangleColours = {0};
-  mesh->colours = {{10, 20, 30, 40}};
-  mesh->edgePoints = {{0, 0, 0}, {1, 0, 0}};
-  mesh->lineStarts = {0, 2};
-  ModelData model;
-  model.parts.resize(2);
-  model.parts[0].isAssembly = true;
-  model.parts[1].name = u"part";
-  model.parts[1].mesh = mesh;
-  model.products.resize(2);
-  model.products[1].parent = 0;
-  model.products[1].part = 1;
-  model.referencedFiles.push_back({"other.bin", ZORDefault::ReferencedFile::State::kRead, 42});
-  model.warnings = {"a warning"};
-  return model;
-}
 
 /// Changes bytes of an entry: three bytes of the input each, the place and the new byte. What is left
 /// over is added to the end.
@@ -51,7 +28,7 @@ void ReadAndWrite(const std::string& inEntry) {
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* inBytes, std::size_t inSize) {
-  static const std::string entry = EncodeModel(SmallModel());
+  static const std::string entry = EncodeModel(support::TwoInstances());
   const std::string bytes = fuzz::Text(inBytes, inSize);
   ReadAndWrite(bytes);
   ReadAndWrite(Patched(entry, bytes));

@@ -99,11 +99,14 @@ std::string Mutated(std::string inBytes, std::mt19937& ioRandom) {
 class ModelMutations : public testing::TestWithParam<const char*> {};
 
 TEST_P(ModelMutations, EndInAResultOrInOneLine) {
-  const char* const wanted = std::getenv("ZOR_MODEL_MUTATIONS");
-  const int count = wanted ? std::atoi(wanted) : 200;
+  const auto numberFrom = [](const char* variable, int otherwise) {
+    const char* const text = std::getenv(variable);
+    return text ? std::atoi(text) : otherwise;
+  };
+  const int count = numberFrom("ZOR_MODEL_MUTATIONS", 200);
   const Folder folder;
   const Seed seed = SeedOf(GetParam(), folder);
-  std::mt19937 random(20240607);
+  std::mt19937 random(static_cast<unsigned>(numberFrom("ZOR_MODEL_SEED", 20240607)));
   ZORDefault::ModelOptions options;
   options.useCache = false;
   options.maxSeconds = 2;
