@@ -21,6 +21,7 @@ struct BorderEdge {
   TopoDS_Edge edge;
   std::vector<std::uint32_t> nodes;
   std::vector<double> parameters;  ///< on the edge's curve, one for each node
+  Box box;                         ///< around the chords
   double deflection = 0;           ///< largest distance between curve and chords
   double outlineError = 0;  ///< within it the chords in the face's outline do not say which side
   double tolerance = 0;     ///< as the file has it

@@ -113,6 +113,10 @@ class BodyPair {
   bool MoveOntoBoth(const NearTriangles& inNear, gp_XYZ& ioPoint);
   bool IsOnBoth(const gp_XYZ& inPoint, double inGap);
   void AddBorderOnOther(std::size_t inSide, Verdict& ioVerdict);
+  bool IsBorderOnOther(std::size_t inSide, const gp_XYZ& inLocal);
+  void AddChordOnOther(std::size_t inSide, const BRepAdaptor_Curve& inCurve,
+                       const std::array<double, 2>& inEnds, std::size_t inPieces,
+                       Verdict& ioVerdict);
 
   bool IsDuplicate() const;
   void AddPrecision(Verdict& ioVerdict) const;

@@ -29,6 +29,13 @@ gp_XY BodyProbe::GuessAt(const Candidate& inCandidate) const {
   return guess;
 }
 
+/// The face's where it has one, else the triangle's.
+gp_XYZ BodyProbe::NormalAt(const Candidate& inCandidate, const FaceFoot& inFoot) {
+  if (body_.isExact)
+    if (const auto exact = Tool(inCandidate.face).NormalAt(inFoot.parameters)) return *exact;
+  return NormalOf(inCandidate.triangle);
+}
+
 /// All faces that may hold the nearest point, each with its nearest triangle.
 void BodyProbe::CollectFaces(const gp_XYZ& inPoint, double inBound,
                              std::vector<Candidate>& outFaces) const {
@@ -84,11 +91,8 @@ BodyFoot BodyProbe::Nearest(const gp_XYZ& inPoint, double inBound) {
     const double deflection = body_.faces[candidate.face].deflection;
     if (candidate.distance - deflection > best.distance + kSamePoint) continue;
     FaceFoot foot;
-    gp_XYZ normal = NormalOf(candidate.triangle);
     if (body_.isExact) {
-      FaceTool& tool = Tool(candidate.face);
-      foot = tool.Foot(inPoint, GuessAt(candidate));
-      if (const auto exact = tool.NormalAt(foot.parameters)) normal = *exact;
+      foot = Tool(candidate.face).Foot(inPoint, GuessAt(candidate));
     } else {
       foot.point = candidate.point;
       foot.distance = candidate.distance;
@@ -96,6 +100,8 @@ BodyFoot BodyProbe::Nearest(const gp_XYZ& inPoint, double inBound) {
     if (foot.distance > inBound) continue;
     const bool isSame =
         best.IsFound() && (foot.point - best.foot.point).SquareModulus() < kSamePoint * kSamePoint;
+    if (!isSame && foot.distance >= best.distance) continue;
+    const gp_XYZ normal = NormalAt(candidate, foot);
     if (isSame) best.normal += normal;
     if (foot.distance >= best.distance) continue;
     best.foot = foot;

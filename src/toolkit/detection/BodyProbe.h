@@ -55,6 +55,7 @@ class BodyProbe {
   void CollectFaces(const gp_XYZ& inPoint, double inBound, std::vector<Candidate>& outFaces) const;
   gp_XY GuessAt(const Candidate& inCandidate) const;
   gp_XYZ NormalOf(std::uint32_t inTriangle) const;
+  gp_XYZ NormalAt(const Candidate& inCandidate, const FaceFoot& inFoot);
   bool IsInside(const gp_XYZ& inPoint, const BodyFoot& inFoot) const;
 
   const Body& body_;

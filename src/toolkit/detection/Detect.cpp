@@ -22,6 +22,7 @@ namespace {
 
 constexpr const char* kSeparator = " --++-- ";
 constexpr double kRigid = 1e-6;
+constexpr std::size_t kMaxCurvePoints = 32;  // of one pair of parts
 
 /// A leaf of the tree, and what it counts as.
 struct Leaf {
@@ -148,7 +149,6 @@ DetectedInterference ToInterference(const ZORDetection::Interference& inFound) {
   found.value = inFound.value;
   found.points = inFound.points;
   found.curveLength = inFound.curveLength;
-  found.curve = inFound.curve;
   found.isDuplicate = inFound.isDuplicate;
   found.isSheetInSolid = inFound.isSheetInSolid;
   if (inFound.hasMeshPrecision) found.meshPrecision = inFound.precision;
@@ -255,9 +255,13 @@ class Detection {
   }
 
   void AddFindings(const ZORDetection::Findings& inFindings) {
+    std::vector<ZORDetection::Product> products;
+    for (const ZORDetection::TaskProduct& product : task_.products)
+      products.push_back(product.product);
     std::map<std::pair<std::size_t, std::size_t>, DetectedInterference> byUnits;
     for (const ZORDetection::Interference& found : inFindings.interferences) {
       DetectedInterference interference = ToInterference(found);
+      interference.curve = PointsAlong(inFindings, found, products, kMaxCurvePoints);
       interference.first = chosen_[found.first].unit;
       interference.second = chosen_[found.second].unit;
       const auto [place, isNew] =

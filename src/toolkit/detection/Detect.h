@@ -56,8 +56,8 @@ struct DetectedInterference {
   double value = 0;  ///< minus the depth of a clash, 0, or the distance
   std::array<std::array<double, 3>, 2> points{};
   double curveLength = 0;
-  std::vector<std::array<double, 3>> curve;
-  bool isDuplicate = false;  ///< the same geometry at the same place
+  std::vector<std::array<double, 3>> curve;  ///< some points along it
+  bool isDuplicate = false;                  ///< the same geometry at the same place
   bool isSheetInSolid = false;
   std::optional<double> meshPrecision;  ///< by how much triangles that had to do may be off
 };

@@ -84,6 +84,7 @@ void Fields(Packing& ioPacking, Item& ioItem) {
   ioPacking(ioItem.points);
   ioPacking(ioItem.curveLength);
   ioPacking(ioItem.curve);
+  ioPacking(ioItem.curveProduct);
   ioPacking(ioItem.isDuplicate);
   ioPacking(ioItem.isSheetInSolid);
   ioPacking(ioItem.hasMeshPrecision);
@@ -103,6 +104,7 @@ template <typename Packing, typename Item>
 requires std::is_same_v<std::remove_const_t<Item>, Findings>
 void Fields(Packing& ioPacking, Item& ioItem) {
   ioPacking(ioItem.interferences);
+  ioPacking(ioItem.curves);
   ioPacking(ioItem.unjudged);
   ioPacking(ioItem.pairsChecked);
   ioPacking(ioItem.verdicts);

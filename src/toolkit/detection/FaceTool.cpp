@@ -6,6 +6,7 @@ namespace ZORDetection {
 namespace {
 
 constexpr int kMaxSteps = 30;
+constexpr double kLastStep = 1e-8;  // of Newton's method, whose next would be about its square
 constexpr double kTrimTolerance = 1e-9;
 constexpr double kSameEdge = 1e-7;  // millimetres
 constexpr double kBand = 1e100;
@@ -64,6 +65,7 @@ bool FaceTool::IsInTrims(const gp_XYZ& inPoint, const gp_XY& inParameters) {
     const BorderEdge& edge = face_.edges[i];
     if (edge.isSeam) continue;
     const double band = edge.outlineError + kSameEdge;
+    if (edge.box.SquareDistance(inPoint) > band * band) continue;
     for (std::size_t k = 0; k + 1 < edge.nodes.size(); ++k) {
       const gp_XYZ &start = body_.nodes[edge.nodes[k]], &end = body_.nodes[edge.nodes[k + 1]];
       const gp_XYZ foot = ClosestOnSegment(inPoint, start, end);
@@ -142,6 +144,7 @@ gp_XY FaceTool::NewtonFoot(const gp_XYZ& inPoint, gp_XY inGuess) const {
     const gp_Vec r(point.XYZ() - inPoint);
     const double gu = r * du, gv = r * dv;
     double a = du * du + r * duu, b = du * dv + r * duv, c = dv * dv + r * dvv;
+    const bool isNewton = damping == 0 && a > 0 && a * c - b * b > 0;
     if (!(a > 0 && a * c - b * b > 0)) {
       a = du * du;
       b = du * dv;
@@ -162,7 +165,7 @@ gp_XY FaceTool::NewtonFoot(const gp_XYZ& inPoint, gp_XY inGuess) const {
       best = square;
       damping /= 10;
       if (damping < 1e-3) damping = 0;
-      if (length < 1e-11 * (1 + inPoint.Modulus())) break;
+      if (length < (isNewton ? kLastStep : 1e-11) * (1 + inPoint.Modulus())) break;
     } else {
       if (length < 1e-10 * (1 + inPoint.Modulus()) || damping > 1e8) break;
       damping = std::max(damping * 10, 1e-2);
@@ -182,6 +185,7 @@ double FaceTool::CurveFoot(int inEdge, const gp_XYZ& inPoint, double inGuess) {
     curve.D2(t, point, d1, d2);
     const gp_Vec r(point.XYZ() - inPoint);
     double slope = d1 * d1 + r * d2;
+    const bool isNewton = damping == 0 && slope > 0;
     if (!(slope > 0)) slope = d1 * d1;
     slope *= 1 + damping;
     if (!(slope > 0)) break;
@@ -193,7 +197,7 @@ double FaceTool::CurveFoot(int inEdge, const gp_XYZ& inPoint, double inGuess) {
       t = next;
       best = square;
       damping = damping < 1e-3 ? 0 : damping / 10;
-      if (length < 1e-11 * (1 + inPoint.Modulus())) break;
+      if (length < (isNewton ? kLastStep : 1e-11) * (1 + inPoint.Modulus())) break;
     } else {
       if (length < 1e-10 * (1 + inPoint.Modulus()) || damping > 1e8) break;
       damping = std::max(damping * 10, 1e-2);
@@ -210,9 +214,11 @@ void FaceTool::TryEdges(const gp_XYZ& inPoint, bool inWithSeams, FaceFoot& ioFoo
     double distance, parameter;
   };
   std::vector<Near> near;
+  double bound = std::numeric_limits<double>::infinity();  // some edge is at most this far away
   for (std::size_t i = 0; i < face_.edges.size(); ++i) {
     const BorderEdge& edge = face_.edges[i];
     if (edge.isSeam && !inWithSeams) continue;
+    if (std::sqrt(edge.box.SquareDistance(inPoint)) - edge.deflection > bound) continue;
     Near nearest{static_cast<int>(i), 0, std::numeric_limits<double>::infinity(), 0};
     for (std::size_t k = 0; k + 1 < edge.nodes.size(); ++k) {
       const gp_XYZ &start = body_.nodes[edge.nodes[k]], &end = body_.nodes[edge.nodes[k + 1]];
@@ -226,7 +232,9 @@ void FaceTool::TryEdges(const gp_XYZ& inPoint, bool inWithSeams, FaceFoot& ioFoo
       nearest.parameter =
           edge.parameters[k] + share * (edge.parameters[k + 1] - edge.parameters[k]);
     }
-    if (std::isfinite(nearest.distance)) near.push_back(nearest);
+    if (!std::isfinite(nearest.distance)) continue;
+    near.push_back(nearest);
+    bound = std::min(bound, nearest.distance + edge.deflection);
   }
   std::ranges::sort(near, {}, &Near::distance);
   for (const Near& candidate : near) {

@@ -1,6 +1,8 @@
 #include "toolkit/detection/FindInterferences.h"
 
 #include <Standard_Failure.hxx>
+#include <TopExp_Explorer.hxx>
+#include <TopoDS_Shape.hxx>
 #include <atomic>
 #include <map>
 #include <memory>
@@ -132,18 +134,44 @@ void Merge(Verdict&& inVerdict, std::optional<Verdict>& ioBest) {
   ioBest->precision = precision;
 }
 
+/// Runs some work in so many threads, the calling one among them, each of which takes the next item.
+template <typename Work>
+void InThreads(unsigned inCount, const Work& inWork) {
+  std::atomic<std::size_t> next{0};
+  std::vector<std::thread> threads;
+  for (unsigned i = 1; i < inCount; ++i) threads.emplace_back([&] { inWork(next); });
+  inWork(next);
+  for (std::thread& thread : threads) thread.join();
+}
+
+/// Whether two parts have a face or an edge in common, which keep their triangles.
+bool SharesTopology(const std::vector<Part>& inParts) {
+  std::unordered_map<const Standard_Transient*, const Part*> owners;
+  for (const Part& part : inParts) {
+    if (part.shape == nullptr || part.shape->IsNull()) continue;
+    for (const TopAbs_ShapeEnum kind : {TopAbs_FACE, TopAbs_EDGE})
+      for (TopExp_Explorer shapes(*part.shape, kind); shapes.More(); shapes.Next())
+        if (owners.try_emplace(shapes.Current().TShape().get(), &part).first->second != &part)
+          return true;
+  }
+  return false;
+}
+
 class Search {
  public:
   Search(const std::vector<Part>& inParts, const std::vector<Product>& inProducts,
          const Options& inOptions)
       : products_(inProducts), options_(inOptions) {
-    for (const Part& part : inParts) {
-      geometries_.push_back(GeometryOf(part, inOptions.meshSize));
-      for (Unjudged& problem : geometries_.back().problems) {
-        problem.part = static_cast<std::uint32_t>(geometries_.size() - 1);
+    geometries_.resize(inParts.size());
+    InThreads(SharesTopology(inParts) ? 1 : inOptions.threads, [&](std::atomic<std::size_t>& next) {
+      for (std::size_t i = next++; i < inParts.size(); i = next++)
+        geometries_[i] = GeometryOf(inParts[i], inOptions.meshSize);
+    });
+    for (std::size_t i = 0; i < geometries_.size(); ++i)
+      for (Unjudged& problem : geometries_[i].problems) {
+        problem.part = static_cast<std::uint32_t>(i);
         findings_.unjudged.push_back(std::move(problem));
       }
-    }
   }
 
   Findings Run() {
@@ -151,6 +179,8 @@ class Search {
     findings_.pairsChecked = pairs_.size();
     findings_.verdicts = tasks_.Tasks().size();
     JudgeTasks();
+    findings_.interferences.reserve(static_cast<std::size_t>(std::ranges::count_if(
+        pairs_, [this](const PairOfProducts& pair) { return verdicts_[pair.task].has_value(); })));
     for (const PairOfProducts& pair : pairs_)
       if (verdicts_[pair.task]) AddInterference(pair, *verdicts_[pair.task]);
     return std::move(findings_);
@@ -212,11 +242,10 @@ class Search {
 
   void JudgeTasks() {
     verdicts_.resize(tasks_.Tasks().size());
-    std::atomic<std::size_t> next{0};
     std::atomic<bool> isStopped{false};
     std::mutex progressMutex;
     std::size_t done = 0;
-    const auto work = [&] {
+    InThreads(options_.threads, [&](std::atomic<std::size_t>& next) {
       ProbeCache probes;
       while (!isStopped) {
         const std::size_t task = next++;
@@ -226,11 +255,7 @@ class Search {
         const std::lock_guard lock(progressMutex);
         if (!options_.progress(++done, verdicts_.size())) isStopped = true;
       }
-    };
-    std::vector<std::thread> threads;
-    for (unsigned i = 1; i < options_.threads; ++i) threads.emplace_back(work);
-    work();
-    for (std::thread& thread : threads) thread.join();
+    });
     findings_.isStopped = isStopped;
     std::ranges::sort(failures_, {}, &std::pair<std::size_t, std::string>::first);
     for (const auto& [task, reason] : failures_) {
@@ -291,13 +316,25 @@ class Search {
     if (inPair.isSwapped && found.kind == Kind::kClearance) std::swap(points[0], points[1]);
     for (std::size_t i = 0; i < 2; ++i) found.points[i] = ToPoint(Moved(rootFromCommon, points[i]));
     found.curveLength = inVerdict.curveLength;
-    for (const gp_XYZ& point : inVerdict.curve)
-      found.curve.push_back(ToPoint(Moved(rootFromCommon, point)));
+    found.curve = CurveOf(inPair.task, inVerdict);
+    found.curveProduct = inPair.isSwapped ? inPair.second : inPair.first;
     found.isDuplicate = inVerdict.isDuplicate;
     found.isSheetInSolid = inVerdict.isSheetInSolid;
     found.hasMeshPrecision = inVerdict.hasMeshPrecision;
     found.precision = inVerdict.precision;
-    findings_.interferences.push_back(std::move(found));
+    findings_.interferences.push_back(found);
+  }
+
+  /// @return its place in the findings, where each verdict's curve is once.
+  std::uint32_t CurveOf(std::size_t inTask, const Verdict& inVerdict) {
+    if (inVerdict.curve.empty()) return 0;
+    curves_.resize(verdicts_.size());
+    if (curves_[inTask] == 0) {
+      curves_[inTask] = static_cast<std::uint32_t>(findings_.curves.size());
+      std::vector<Point>& points = findings_.curves.emplace_back();
+      for (const gp_XYZ& point : inVerdict.curve) points.push_back(ToPoint(point));
+    }
+    return curves_[inTask];
   }
 
   const std::vector<Product>& products_;
@@ -307,6 +344,7 @@ class Search {
   TaskTable tasks_;
   std::vector<PairOfProducts> pairs_;
   std::vector<std::optional<Verdict>> verdicts_;
+  std::vector<std::uint32_t> curves_;  ///< of the verdicts, in the findings; 0: none yet
   std::vector<std::pair<std::size_t, std::string>> failures_;
   Findings findings_;
 };

@@ -61,9 +61,10 @@ struct Interference {
   /// Deepest point and its foot, the closest points, or twice the middle of the patch of contact.
   /// The first lies on the first product unless the second product is the one that goes deeper.
   std::array<Point, 2> points{};
-  double curveLength = 0;    ///< of the crossing, or of the border of the patch of contact
-  std::vector<Point> curve;  ///< points along it
-  bool isDuplicate = false;  ///< the same geometry at the same place
+  double curveLength = 0;          ///< of the crossing, or of the border of the patch of contact
+  std::uint32_t curve = 0;         ///< of the findings: points along it; see PointsAlong
+  std::uint32_t curveProduct = 0;  ///< in whose frame that curve is
+  bool isDuplicate = false;        ///< the same geometry at the same place
   bool isSheetInSolid = false;
   bool hasMeshPrecision = false;  ///< triangles were all there was
   double precision = 0;           ///< by how much such triangles may miss their surface
@@ -79,6 +80,8 @@ struct Unjudged {
 
 struct Findings {
   std::vector<Interference> interferences;  ///< in the order of the products
+  /// Shared by all interferences of the same parts in the same placement to each other; the first is empty.
+  std::vector<std::vector<Point>> curves{{}};
   std::vector<Unjudged> unjudged;
   std::size_t pairsChecked = 0;  ///< of products whose boxes come near
   std::size_t verdicts = 0;      ///< pairs of parts in different placements to each other
@@ -89,6 +92,25 @@ struct Findings {
 /// @return what was found up to a stop that `progress` asked for.
 Findings FindInterferences(const std::vector<Part>& inParts, const std::vector<Product>& inProducts,
                            const Options& inOptions);
+
+/// @param inProducts those that were looked at.
+/// @return at most inMax points along the interference's curve, evenly spread.
+inline std::vector<Point> PointsAlong(const Findings& inFindings,
+                                      const Interference& inInterference,
+                                      const std::vector<Product>& inProducts, std::size_t inMax) {
+  const std::vector<Point>& curve = inFindings.curves.at(inInterference.curve);
+  const Placement& placement = inProducts.at(inInterference.curveProduct).rootFromProduct;
+  const std::size_t count = curve.size() < inMax ? curve.size() : inMax;
+  std::vector<Point> points(count);
+  for (std::size_t i = 0; i < count; ++i) {
+    const Point& from = curve[i * curve.size() / count];
+    for (std::size_t k = 0; k < 3; ++k) {
+      const auto& [x, y, z, shift] = placement[k];
+      points[i][k] = x * from[0] + y * from[1] + z * from[2] + shift;
+    }
+  }
+  return points;
+}
 
 }  // namespace ZORDetection
 

@@ -8,8 +8,10 @@ namespace {
 
 constexpr int kMaxSteps = 12;
 constexpr std::size_t kMaxCurvePoints = 200;
-constexpr int kPieces = 4;     // of a chord of a border
-constexpr int kHalvings = 20;  // of a piece at the end of a border
+constexpr std::size_t kMinPieces = 24;  // of a border that are tried
+constexpr std::size_t kMaxPieces = 4;   // of one chord
+constexpr int kLengthPieces = 4;        // of such a piece, for its length
+constexpr int kHalvings = 20;           // of a piece at the end of a border
 
 }  // namespace
 
@@ -78,28 +80,23 @@ void BodyPair::AddCrossingCurve(Verdict& ioVerdict) {
   ioVerdict.curve = Thinned(ioVerdict.curve, kMaxCurvePoints);
 }
 
-/// The parts of one body's edges that lie on the other body.
+/// The parts of one body's edges that lie on the other body. Only chords of triangles that come near it can.
 void BodyPair::AddBorderOnOther(std::size_t inSide, Verdict& ioVerdict) {
-  Side &self = sides_[inSide], &other = sides_[1 - inSide];
-  const Body& body = self.body();
+  const Body& body = sides_[inSide].body();
   std::set<std::uint32_t> faces;
-  for (const NearTriangles& near : near_)
-    if (near.lower <= gap_) faces.insert(body.triangles[near.triangles[inSide]].face);
-  const double gap = std::max(gap_, 1e-6);
+  std::vector<bool> isNear(body.nodes.size());
+  for (const NearTriangles& near : near_) {
+    if (near.lower > gap_) continue;
+    const BodyTriangle& triangle = body.triangles[near.triangles[inSide]];
+    faces.insert(triangle.face);
+    for (const std::uint32_t node : triangle.nodes) isNear[node] = true;
+  }
   std::set<std::array<std::int64_t, 3>> counted;
-  const auto isOn = [&](const gp_XYZ& local) {
-    const gp_XYZ there = Moved(other.thisFromCommon, Moved(self.commonFromThis, local));
-    if (other.body().box.SquareDistance(there) > gap * gap) return false;
-    const BodyFoot foot = other.probe.Nearest(there, 2 * gap);
-    if (foot.distance > gap) return false;
-    // A border on a border is counted with the first body's.
-    return inSide == 0 || other.probe.Tool(foot.face).BorderDistance(there) > gap;
-  };
-  for (const std::uint32_t face : faces) {
+  for (const std::uint32_t face : faces)
     for (std::size_t e = 0; e < body.faces[face].edges.size(); ++e) {
       const BorderEdge& edge = body.faces[face].edges[e];
       if (edge.isSeam) continue;
-      const BRepAdaptor_Curve& curve = self.probe.Tool(face).Curve(static_cast<int>(e));
+      const BRepAdaptor_Curve& curve = sides_[inSide].probe.Tool(face).Curve(static_cast<int>(e));
       const gp_XYZ middle =
           curve.Value((curve.FirstParameter() + curve.LastParameter()) / 2).XYZ() * 1e4;
       // Two faces share an edge.
@@ -108,39 +105,57 @@ void BodyPair::AddBorderOnOther(std::size_t inSide, Verdict& ioVerdict) {
                    {std::llround(middle.X()), std::llround(middle.Y()), std::llround(middle.Z())})
                .second)
         continue;
-      const std::size_t chords = edge.parameters.size() - 1;
-      const std::size_t pieces = chords * static_cast<std::size_t>(kPieces);
-      const auto parameterAt = [&](std::size_t piece) {
-        const std::size_t chord = std::min(piece / kPieces, chords - 1);
-        const double share = static_cast<double>(piece - chord * kPieces) / kPieces;
-        return edge.parameters[chord] +
-               share * (edge.parameters[chord + 1] - edge.parameters[chord]);
-      };
-      double from = parameterAt(0);
-      bool isFromOn = isOn(curve.Value(from).XYZ());
-      for (std::size_t piece = 1; piece <= pieces; ++piece) {
-        const double to = parameterAt(piece);
-        const bool isToOn = isOn(curve.Value(to).XYZ());
-        double start = from, end = to;
-        if (isFromOn != isToOn) {
-          double on = isFromOn ? from : to, off = isFromOn ? to : from;
-          for (int i = 0; i < kHalvings; ++i) {
-            const double half = (on + off) / 2;
-            (isOn(curve.Value(half).XYZ()) ? on : off) = half;
-          }
-          (isFromOn ? end : start) = on;
-        }
-        const bool isCounted = (isFromOn || isToOn) && isOn(curve.Value((start + end) / 2).XYZ());
-        if (isCounted) {
-          const gp_XYZ a = curve.Value(start).XYZ(), b = curve.Value(end).XYZ();
-          const gp_XYZ m = curve.Value((start + end) / 2).XYZ();
-          ioVerdict.curveLength += (a - m).Modulus() + (m - b).Modulus();
-          ioVerdict.curve.push_back(Moved(self.commonFromThis, m));
-        }
-        from = to;
-        isFromOn = isToOn;
-      }
+      const std::size_t chords = edge.nodes.size() - 1;
+      const std::size_t pieces = std::min((kMinPieces + chords - 1) / chords, kMaxPieces);
+      for (std::size_t i = 0; i < chords; ++i)
+        if (isNear[edge.nodes[i]] && isNear[edge.nodes[i + 1]])
+          AddChordOnOther(inSide, curve, {edge.parameters[i], edge.parameters[i + 1]}, pieces,
+                          ioVerdict);
     }
+}
+
+bool BodyPair::IsBorderOnOther(std::size_t inSide, const gp_XYZ& inLocal) {
+  const Side &self = sides_[inSide], &other = sides_[1 - inSide];
+  const double gap = std::max(gap_, 1e-6);
+  const gp_XYZ there = Moved(other.thisFromCommon, Moved(self.commonFromThis, inLocal));
+  if (other.body().box.SquareDistance(there) > gap * gap) return false;
+  const BodyFoot foot = other.probe.Nearest(there, 2 * gap);
+  if (foot.distance > gap) return false;
+  // A border on a border is counted with the first body's.
+  return inSide == 0 || other.probe.Tool(foot.face).BorderDistance(there) > gap;
+}
+
+void BodyPair::AddChordOnOther(std::size_t inSide, const BRepAdaptor_Curve& inCurve,
+                               const std::array<double, 2>& inEnds, std::size_t inPieces,
+                               Verdict& ioVerdict) {
+  const auto pointAt = [&](double at) { return inCurve.Value(at).XYZ(); };
+  const auto isOn = [&](double at) { return IsBorderOnOther(inSide, pointAt(at)); };
+  double from = inEnds[0];
+  bool isFromOn = isOn(from);
+  for (std::size_t piece = 1; piece <= inPieces; ++piece) {
+    const double to = inEnds[0] + (inEnds[1] - inEnds[0]) * static_cast<double>(piece) /
+                                      static_cast<double>(inPieces);
+    const bool isToOn = isOn(to);
+    double start = from, end = to;
+    if (isFromOn != isToOn) {
+      double on = isFromOn ? from : to, off = isFromOn ? to : from;
+      for (int i = 0; i < kHalvings; ++i) {
+        const double half = (on + off) / 2;
+        (isOn(half) ? on : off) = half;
+      }
+      (isFromOn ? end : start) = on;
+    }
+    if ((isFromOn || isToOn) && isOn((start + end) / 2)) {
+      gp_XYZ last = pointAt(start);
+      for (int i = 1; i <= kLengthPieces; ++i) {
+        const gp_XYZ next = pointAt(start + (end - start) * i / kLengthPieces);
+        ioVerdict.curveLength += (next - last).Modulus();
+        last = next;
+      }
+      ioVerdict.curve.push_back(Moved(sides_[inSide].commonFromThis, pointAt((start + end) / 2)));
+    }
+    from = to;
+    isFromOn = isToOn;
   }
 }
 

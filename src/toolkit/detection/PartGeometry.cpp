@@ -119,6 +119,7 @@ class BodyBuilder {
       for (int i = 1; i <= polygon->NbNodes(); ++i) {
         border.nodes.push_back(inFirst + static_cast<std::uint32_t>(polygon->Node(i)) - 1);
         border.parameters.push_back(polygon->Parameter(i));
+        border.box.Add(body_.nodes[border.nodes.back()]);
         if (i > 1)
           ioFace.outline.push_back({body_.parameters[border.nodes[border.nodes.size() - 2]],
                                     body_.parameters[border.nodes.back()]});

@@ -1,24 +1,24 @@
 // Prints what the exact judge says of each near pair of an assembly, beside what the detection finds. Each pair is
 // judged in a process of its own: the Boolean operation sometimes crashes, or has no end.
+#include <sys/resource.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <BRepBndLib.hxx>
 #include <Bnd_Box.hxx>
-#include <Standard_Failure.hxx>
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
-#include <exception>
 #include <map>
 
 #include "toolkit/detection/Assembly.h"
 #include "toolkit/detection/ExactJudge.h"
+#include "toolkit/detection/ReportFailures.h"
 
 namespace ZORDetection {
 namespace {
 
-constexpr unsigned kMaxSeconds = 120;
+constexpr rlim_t kMaxSeconds = 120;  // of processor time
 
 /// @return false when it did not come to an end.
 bool JudgeInChild(const TopoDS_Shape& inFirst, const TopoDS_Shape& inSecond, double inFarthest,
@@ -28,7 +28,8 @@ bool JudgeInChild(const TopoDS_Shape& inFirst, const TopoDS_Shape& inSecond, dou
   std::fflush(stdout);
   const pid_t child = fork();
   if (child == 0) {
-    alarm(kMaxSeconds);
+    const rlimit limit{kMaxSeconds, kMaxSeconds};
+    setrlimit(RLIMIT_CPU, &limit);
     try {
       const Judgement judgement = JudgeExactly(inFirst, inSecond, inFarthest);
       if (write(ends[1], &judgement, sizeof judgement) != sizeof judgement) _exit(1);
@@ -99,16 +100,11 @@ int Run(const std::string& inPath, double inClearance) {
 }  // namespace
 }  // namespace ZORDetection
 
-int main(int inCount, char** inArguments) try {
+int main(int inCount, char** inArguments) {
   if (inCount != 3) {
     std::fprintf(stderr, "usage: %s MODEL CLEARANCE\n", inArguments[0]);
     return 2;
   }
-  return ZORDetection::Run(inArguments[1], std::atof(inArguments[2]));
-} catch (const std::exception& error) {
-  std::fprintf(stderr, "%s\n", error.what());
-  return 1;
-} catch (const Standard_Failure& failure) {
-  std::fprintf(stderr, "%s\n", failure.GetMessageString());
-  return 1;
+  return ZORDetection::ReportFailures(
+      [&] { return ZORDetection::Run(inArguments[1], std::atof(inArguments[2])); });
 }
