@@ -145,10 +145,12 @@ TEST(IncludeArrows, ToolkitSeesLibraryPlatformFrontHeadersAndFoundation) {
 TEST(IncludeArrows, CommandSeesTheToolkitAndWhatItStandsOn) {
   for (const char* include : {kTool, kToolkit, kPublic, kFront, kFoundation, kThirdParty}) {
     EXPECT_TRUE(MayInclude("tools/lyra/A.cpp", include)) << include;
+    EXPECT_EQ(MayInclude("python/A.cpp", include), include != kTool) << include;
   }
   // kPlatform is a header of XML.
   for (const char* include : {kGroup, kDefaultPlatform, kPlatform, "\"ZORClashParsing.h\""}) {
     EXPECT_FALSE(MayInclude("tools/lyra/A.cpp", include)) << include;
+    EXPECT_FALSE(MayInclude("python/A.cpp", include)) << include;
   }
 }
 

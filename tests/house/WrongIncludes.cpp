@@ -35,8 +35,8 @@ const Part* PartOf(const std::string& inPath) {
                    "ZORToolkitExport|third-party")},
       Part{Pattern("src/windows/.*"), Pattern("include/.*|src/platform/.*|windows")},
       Part{Pattern("src/.*"), Pattern("include/.*|src/platform/.*|src/[^/]*|ZORLyraExport")},
-      // Documents are read and changed through the toolkit.
-      Part{Pattern("tools/.*"),
+      // Documents are read and changed through the toolkit, by the command and by the Python module.
+      Part{Pattern("(tools|python)/.*"),
            Pattern(
                "include/(?!ZORClashParsing).*|src/platform/(?!xml/).*|src/(foundation|toolkit)/.*|"
                "src/default_platform/[^/]*|third-party")},

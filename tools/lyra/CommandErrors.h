@@ -2,8 +2,6 @@
 #ifndef ZOR_TOOLS_LYRA_COMMAND_ERRORS_H
 #define ZOR_TOOLS_LYRA_COMMAND_ERRORS_H
 
-#include <stdexcept>
-
 #include "toolkit/Error.h"
 
 namespace lyra {
@@ -12,10 +10,7 @@ namespace lyra {
 using InputError = ZORToolkit::Error;
 
 /// The command was called wrongly: one line on stderr, exit code 2.
-class UsageError : public std::runtime_error {
- public:
-  using std::runtime_error::runtime_error;
-};
+using UsageError = ZORToolkit::UsageError;
 
 }  // namespace lyra
 

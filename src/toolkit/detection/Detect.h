@@ -79,6 +79,9 @@ struct CalendarDate {
   int day = 1, month = 1, year = 1970;
 };
 
+/// Today's, or that of SOURCE_DATE_EPOCH, which makes builds repeat.
+ZOR_TOOLKIT_EXPORT CalendarDate DateOfWriting();
+
 /// What is wrong with the lengths of the options, one line; empty when nothing is.
 ZOR_TOOLKIT_EXPORT std::string FindFault(const DetectionOptions& inOptions);
 

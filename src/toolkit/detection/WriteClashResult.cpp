@@ -1,4 +1,6 @@
 #include <charconv>
+#include <cstdlib>
+#include <ctime>
 #include <fstream>
 
 #include "toolkit/Error.h"
@@ -139,6 +141,15 @@ class ResultWriter {
 };
 
 }  // namespace
+
+CalendarDate DateOfWriting() {
+  std::time_t time = std::time(nullptr);
+  if (const char* const epoch = std::getenv("SOURCE_DATE_EPOCH"))
+    time = static_cast<std::time_t>(std::strtoll(epoch, nullptr, 10));
+  std::tm parts{};
+  gmtime_r(&time, &parts);
+  return {parts.tm_mday, parts.tm_mon + 1, parts.tm_year + 1900};
+}
 
 void WriteClashResult(const DetectionResult& inResult, const CalendarDate& inDate,
                       const std::string& inPath) {

@@ -49,6 +49,11 @@ struct PublicationOptions {
   std::function<void(std::size_t inDone, std::size_t inAll)> drawn;
 };
 
+/// Publishes into a folder, or into one file where the path ends in ".html" and is no folder.
+ZOR_TOOLKIT_EXPORT void SetTarget(PublicationOptions& ioOptions, const std::string& inPath);
+/// The name of a file without its folder, UTF-8.
+ZOR_TOOLKIT_EXPORT std::string FileNameOf(const std::string& inPath);
+
 struct Published {
   std::string page;  ///< path of the page
   std::size_t interferences = 0;

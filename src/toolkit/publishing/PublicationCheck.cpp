@@ -1,4 +1,6 @@
 // Whether a publication is what would be made now.
+#include <algorithm>
+#include <cctype>
 #include <filesystem>
 #include <optional>
 #include <utility>
@@ -7,6 +9,7 @@
 #include "toolkit/publishing/Manifest.h"
 #include "toolkit/publishing/OneFile.h"
 #include "toolkit/publishing/PictureSettings.h"
+#include "toolkit/records/DocumentText.h"
 
 namespace fs = std::filesystem;
 
@@ -72,6 +75,19 @@ std::vector<std::string> VerifyPublication(const PublicationOptions& inOptions) 
       lines.push_back(file.name + ": changed");
   }
   return lines;
+}
+
+void SetTarget(PublicationOptions& ioOptions, const std::string& inPath) {
+  std::string ending = fs::path(inPath).extension().string();
+  std::ranges::transform(ending, ending.begin(), [](unsigned char inByte) {
+    return static_cast<char>(std::tolower(inByte));
+  });
+  ioOptions.folder = inPath;
+  ioOptions.isOneFile = ending == ".html" && !fs::is_directory(inPath);
+}
+
+std::string FileNameOf(const std::string& inPath) {
+  return Utf8(FromUtf8(fs::path(inPath).filename().string()));
 }
 
 }  // namespace ZORToolkit

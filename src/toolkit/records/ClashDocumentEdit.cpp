@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <iterator>
+#include <utility>
 
 #include "BuildPath.h"
 #include "ZORLyraXMLServices.h"
@@ -173,6 +174,21 @@ HRESULT ClashDocumentEdit::Dump(const Prologue& inPrologue, const std::string& i
   return ZORLyraXMLServices().DumpDocument(document_.Document(), FromUtf8(inPath),
                                            FromUtf8(inPrologue.dtd), StyleSheetOf(inPrologue),
                                            typeName, inPrologue.hasDeclaration ? 1 : 0, 0);
+}
+
+std::unique_ptr<ClashDocument> MergeClashes(const std::vector<std::string>& inPaths,
+                                            bool inSumsCounts, std::string& ioTrace) {
+  std::unique_ptr<ClashDocument> merged;
+  for (const std::string& path : inPaths) {
+    auto document = std::make_unique<ClashDocument>(path);
+    document->Require({DocumentKind::kClash}, "result sets");
+    if (merged)
+      ClashDocumentEdit(*merged).TakeIn(*document, ioTrace);
+    else
+      merged = std::move(document);
+  }
+  if (inSumsCounts && merged) ClashDocumentEdit(*merged).RecountInterferences();
+  return merged;
 }
 
 HRESULT CreateFederator(const Prologue& inPrologue, const std::string& inPath) {

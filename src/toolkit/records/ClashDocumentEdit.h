@@ -2,7 +2,9 @@
 #ifndef ZOR_TOOLKIT_RECORDS_CLASH_DOCUMENT_EDIT_H
 #define ZOR_TOOLKIT_RECORDS_CLASH_DOCUMENT_EDIT_H
 
+#include <memory>
 #include <string>
+#include <vector>
 
 #include "platform/system/ZORResult.h"
 #include "toolkit/records/DocumentRecords.h"
@@ -72,6 +74,13 @@ class ZOR_TOOLKIT_EXPORT ClashDocumentEdit {
 
   ClashDocument& document_;
 };
+
+/// Folds clash documents into one: the first takes in the others. Raises Error for a document of
+/// another kind.
+/// @param inSumsCounts declares the interferences that are there, not the sum of what was declared.
+/// @param ioTrace a line for each step is appended.
+ZOR_TOOLKIT_EXPORT std::unique_ptr<ClashDocument> MergeClashes(
+    const std::vector<std::string>& inPaths, bool inSumsCounts, std::string& ioTrace);
 
 /// Writes a federator document without links. @return as ClashDocumentEdit::Dump.
 ZOR_TOOLKIT_EXPORT HRESULT CreateFederator(const Prologue& inPrologue, const std::string& inPath);

@@ -3,6 +3,7 @@
 #define ZOR_TOOLKIT_RECORDS_RECORD_FILTER_H
 
 #include <optional>
+#include <span>
 #include <string>
 #include <vector>
 
@@ -33,6 +34,28 @@ class ZOR_TOOLKIT_EXPORT RecordFilter {
   std::vector<std::string> types_, statuses_;
   std::optional<std::string> result_, product_;
 };
+
+// As a user gives conditions
+
+inline constexpr const char* kTypeWords[] = {"clash", "contact", "clearance", "error"};
+inline constexpr const char* kStatusWords[] = {"relevant", "irrelevant", "not-inspected", "error"};
+
+/// What is said of a word that an option does not know.
+ZOR_TOOLKIT_EXPORT UsageError UnknownWord(const std::string& inOption, const std::string& inWord,
+                                          std::span<const char* const> inKnown);
+
+/// As given; empty for no condition.
+struct FilterOptions {
+  std::vector<std::string> types;     ///< of kTypeWords in any letter case
+  std::vector<std::string> statuses;  ///< of kStatusWords, likewise; also "not inspected"
+  std::string result, product;
+};
+
+/// Raises UsageError for a word that is not known.
+ZOR_TOOLKIT_EXPORT RecordFilter FilterOf(const FilterOptions& inOptions);
+/// From conditions such as "type=clash,status=relevant": type, status, result and product, each as
+/// the options of `lyra list` take it. Several words of one kind are alternatives. Raises UsageError.
+ZOR_TOOLKIT_EXPORT RecordFilter FilterOfConditions(const std::vector<std::string>& inLists);
 
 }  // namespace ZORToolkit
 

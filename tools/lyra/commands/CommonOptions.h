@@ -14,9 +14,12 @@
 
 namespace lyra {
 
-/// What is said of a word that an option does not know.
-UsageError UnknownWord(const std::string& inOption, const std::string& inWord,
-                       std::span<const char* const> inKnown);
+using ZORToolkit::FilterOf;
+using ZORToolkit::FilterOfConditions;
+using ZORToolkit::FilterOptions;
+using ZORToolkit::kStatusWords;
+using ZORToolkit::kTypeWords;
+using ZORToolkit::UnknownWord;
 
 /// @return the place of a word among those that an option knows. Raises UsageError.
 std::size_t ChosenWord(const std::string& inOption, const std::string& inWord,
@@ -26,22 +29,6 @@ std::size_t ChosenWord(const std::string& inOption, const std::string& inWord,
 /// leaves it as the environment has it. A locale such as "fr_CA.UTF-8" is a language too. Raises
 /// UsageError for a language that there are no catalogues of.
 void ChooseLanguage(const std::string& inLanguage);
-
-inline constexpr const char* kTypeWords[] = {"clash", "contact", "clearance", "error"};
-inline constexpr const char* kStatusWords[] = {"relevant", "irrelevant", "not-inspected", "error"};
-
-/// As given; empty for no condition.
-struct FilterOptions {
-  std::vector<std::string> types;     ///< of kTypeWords in any letter case
-  std::vector<std::string> statuses;  ///< of kStatusWords, likewise; also "not inspected"
-  std::string result, product;
-};
-
-/// Raises UsageError for a word that is not known.
-ZORToolkit::RecordFilter FilterOf(const FilterOptions& inOptions);
-/// From conditions such as "type=clash,status=relevant": type, status, result and product, each as
-/// the options of `lyra list` take it. Several words of one kind are alternatives. Raises UsageError.
-ZORToolkit::RecordFilter FilterOfConditions(const std::vector<std::string>& inLists);
 
 /// The document type, the style sheet and the XML declaration as options of a verb.
 struct PrologueOptions : ZORToolkit::Prologue {

@@ -4,8 +4,6 @@
 #include <algorithm>
 #include <charconv>
 #include <chrono>
-#include <cstdlib>
-#include <ctime>
 #include <memory>
 
 #include "lyra/CommandErrors.h"
@@ -14,8 +12,6 @@
 #include "lyra/commands/Model.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Progress.h"
-#include "toolkit/records/ClashDocumentEdit.h"
-#include "toolkit/review/Carry.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -67,16 +63,6 @@ DetectionOptions ToDetection(const DetectOptions& inOptions) {
   return options;
 }
 
-/// Of today, or of what makes builds repeat.
-CalendarDate Today() {
-  std::time_t time = std::time(nullptr);
-  if (const char* const epoch = std::getenv("SOURCE_DATE_EPOCH"))
-    time = static_cast<std::time_t>(std::strtoll(epoch, nullptr, 10));
-  std::tm parts{};
-  gmtime_r(&time, &parts);
-  return {parts.tm_mday, parts.tm_mon + 1, parts.tm_year + 1900};
-}
-
 DetectionResult DetectWithProgress(const DetectOptions& inOptions, DetectionOptions inDetection) {
   const auto reading = std::make_unique<ProgressLine>("reading " + inOptions.file);
   ProgressLine checking("checking " + inOptions.file);
@@ -106,15 +92,6 @@ std::string Summary(const DetectionResult& inResult) {
          Counted(inResult.productsChecked, "product", "products") + "\n";
 }
 
-/// What was decided of an older result holds for a new one at this path too.
-void SettleAsBefore(const ReviewInput& inPrevious, const OutputFile& inFile) {
-  ReviewInput now(inFile.Path());
-  const CarryPlan plan =
-      PlanCarry(inPrevious.result, now.result, Diff(inPrevious.result, now.result));
-  if (ApplyReviewEdits(now.document, now.result, plan.edits) > 0)
-    inFile.Check(ClashDocumentEdit(now.document).Dump({}, inFile.Path()));
-}
-
 int Run(const DetectOptions& inOptions, Output& ioOutput) {
   if (inOptions.file == "-") throw InputError("-: a model cannot be read from standard input");
   const DetectionOptions detection = ToDetection(inOptions);
@@ -123,8 +100,8 @@ int Run(const DetectOptions& inOptions, Output& ioOutput) {
   { const OutputFile probe(inOptions.result); }  // fails at once where nothing can be written
   const DetectionResult result = DetectWithProgress(inOptions, detection);
   OutputFile file(inOptions.result);
-  WriteClashResult(result, Today(), file.Path());
-  if (previous) SettleAsBefore(*previous, file);
+  WriteClashResult(result, DateOfWriting(), file.Path());
+  if (previous) file.Check(SettleAsBefore(*previous, file.Path()));
   file.Finish(ioOutput);
   if (inOptions.result != "-") ioOutput.Write(Summary(result));
   return 0;

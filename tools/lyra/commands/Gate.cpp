@@ -27,8 +27,8 @@ int Rules(const RulesOptions& inOptions, Output& ioOutput) {
       ReadRules(inOptions.rules, BytesOfInput(inOptions.rules));
   ReviewInput input(inOptions.file);
   const RulesPlan plan = PlanRules(input.result, rules);
-  const int changed = ApplyReviewEdits(input.document, input.result, plan.edits);
-  WriteReviewed(input, changed > 0, inOptions.output, ioOutput);
+  input.Apply(plan.edits);
+  WriteReviewed(input, inOptions.output, ioOutput);
   Table table({{"Settled", TableColumn::Align::kRight},
                {"Matched", TableColumn::Align::kRight},
                {"Rule"},

@@ -16,24 +16,15 @@ struct MergeOptions {
   bool sumCounts = false, withoutPrologue = false, verbose = false;
 };
 
-std::unique_ptr<ClashDocument> LoadClash(const std::string& inPath) {
-  auto document = std::make_unique<ClashDocument>(inPath);
-  document->Require({DocumentKind::kClash}, "result sets");
-  return document;
-}
-
 int Merge(MergeOptions& ioOptions, Output& ioOutput) {
   ioOptions.prologue.hasDeclaration = !ioOptions.withoutPrologue;
   ioOptions.prologue.Check();
   std::string trace;
-  const std::unique_ptr<ClashDocument> merged = LoadClash(ioOptions.files.front());
-  ClashDocumentEdit edit(*merged);
-  for (std::size_t i = 1; i < ioOptions.files.size(); ++i)
-    edit.TakeIn(*LoadClash(ioOptions.files[i]), trace);
+  const std::unique_ptr<ClashDocument> merged =
+      MergeClashes(ioOptions.files, ioOptions.sumCounts, trace);
   if (ioOptions.verbose) std::fputs(trace.c_str(), stderr);
-  if (ioOptions.sumCounts) edit.RecountInterferences();
   OutputFile output(ioOptions.output);
-  output.Check(edit.Dump(ioOptions.prologue, output.Path()));
+  output.Check(ClashDocumentEdit(*merged).Dump(ioOptions.prologue, output.Path()));
   output.Finish(ioOutput);
   return 0;
 }

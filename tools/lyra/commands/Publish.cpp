@@ -1,6 +1,5 @@
 // lyra publish RESULT --model MODEL -o DIR|PAGE.html, lyra extract PAGE.html -o RESULT
 #include <algorithm>
-#include <filesystem>
 #include <fstream>
 #include <memory>
 #include <thread>
@@ -15,7 +14,6 @@
 #include "lyra/terminal/SafeText.h"
 #include "toolkit/publishing/OneFile.h"
 #include "toolkit/publishing/Publication.h"
-#include "toolkit/records/DocumentText.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -42,23 +40,11 @@ int ProcessCount(const PublishOptions& inOptions) {
   return static_cast<int>(*inOptions.jobs);
 }
 
-/// Whether a page in one file is meant, and not a folder.
-bool IsPage(const std::string& inPath) {
-  std::string ending = std::filesystem::path(inPath).extension().string();
-  std::ranges::transform(ending, ending.begin(), [](unsigned char inByte) {
-    return static_cast<char>(std::tolower(inByte));
-  });
-  return ending == ".html" && !std::filesystem::is_directory(inPath);
-}
-
-std::string FileNameOf(const std::string& inPath) {
-  return Utf8(FromUtf8(std::filesystem::path(inPath).filename().string()));
-}
-
 PublicationOptions ToolkitOptions(const PublishOptions& inOptions) {
   PublicationOptions options;
   options.filter = FilterOfConditions(inOptions.only);
-  options.isCompact = inOptions.format.empty() && IsPage(inOptions.directory);
+  SetTarget(options, inOptions.directory);
+  options.isCompact = inOptions.format.empty() && options.isOneFile;
   const bool isPng = options.isCompact || (!inOptions.format.empty() &&
                                            ChosenWord("--format", inOptions.format, kFormats) == 1);
   options.format = isPng ? PictureFormat::kPng : PictureFormat::kJpeg;
@@ -68,8 +54,6 @@ PublicationOptions ToolkitOptions(const PublishOptions& inOptions) {
   const bool areModels = ChosenWord("--positions", inOptions.positions, kPositions) == 1;
   options.places = areModels ? ProductPlaces::kModel : ProductPlaces::kResult;
   options.processes = ProcessCount(inOptions);
-  options.folder = inOptions.directory;
-  options.isOneFile = IsPage(inOptions.directory);
   options.language = inOptions.language;
   for (const std::string& only : inOptions.only)
     options.filterText += (options.filterText.empty() ? "" : ",") + only;

@@ -12,7 +12,6 @@
 #include "lyra/commands/ReviewImport.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Table.h"
-#include "toolkit/review/Carry.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -35,15 +34,9 @@ int Carry(const CarryOptions& inOptions, Output& ioOutput) {
   ChooseLanguage(inOptions.compare.language);
   const ReviewInput was(inOptions.oldFile);
   ReviewInput is(inOptions.newFile);
-  if (was.bytes == is.bytes) {  // it was not computed again
-    WriteReviewed(is, false, inOptions.output, ioOutput);
-    return 0;
-  }
-  const CarryPlan plan =
-      PlanCarry(was.result, is.result, Diff(was.result, is.result, options), inOptions.keepChanged);
-  const int changed = ApplyReviewEdits(is.document, is.result, plan.edits);
-  WriteReviewed(is, changed > 0, inOptions.output, ioOutput);
-  if (inOptions.verbose)
+  const CarryPlan plan = CarryInto(is, was, options, inOptions.keepChanged);
+  WriteReviewed(is, inOptions.output, ioOutput);
+  if (inOptions.verbose && was.bytes != is.bytes)  // else it was not computed again
     std::fprintf(stderr,
                  "%d decisions carried over, %d reopened, %d others replaced, %d left behind with "
                  "what is resolved or not comparable\n",
@@ -138,8 +131,8 @@ int Set(const ReviewOptions& inOptions, Output& ioOutput) {
     edit.position = position;
     edits.push_back(edit);
   }
-  const int changed = ApplyReviewEdits(input.document, input.result, edits);
-  WriteReviewed(input, changed > 0, inOptions.output, ioOutput);
+  const int changed = input.Apply(edits);
+  WriteReviewed(input, inOptions.output, ioOutput);
   PrintList(std::to_string(edits.size()) + " chosen, " + std::to_string(changed) + " changed\n",
             inOptions, ioOutput);
   return 0;
@@ -153,8 +146,8 @@ int Apply(const ReviewOptions& inOptions, Output& ioOutput) {
   if (!review.hash.empty() && review.hash != DocumentHash(input.bytes))
     std::fputs("note: the review was made of another state of the result\n", stderr);
   const ApplyPlan plan = PlanApply(input.result, review, PreferenceOf(inOptions));
-  const int changed = ApplyReviewEdits(input.document, input.result, plan.edits);
-  WriteReviewed(input, changed > 0, inOptions.output, ioOutput);
+  input.Apply(plan.edits);
+  WriteReviewed(input, inOptions.output, ioOutput);
   for (const ReviewEntry& entry : plan.unknown)
     std::fprintf(stderr, "note: the result has no interference %s (%d in the review)\n",
                  Printable(entry.id).c_str(), entry.index);
@@ -170,8 +163,8 @@ int Merge(const ReviewOptions& inOptions, Output& ioOutput) {
   ReviewInput mine(inOptions.files[1]);
   const ReviewInput theirs(inOptions.files[2]);
   const MergePlan plan = PlanMerge(base.result, mine.result, theirs.result, preference);
-  const int changed = ApplyReviewEdits(mine.document, mine.result, plan.edits);
-  WriteReviewed(mine, changed > 0, inOptions.output, ioOutput);
+  mine.Apply(plan.edits);
+  WriteReviewed(mine, inOptions.output, ioOutput);
   if (plan.missing > 0)
     std::fprintf(stderr, "note: %d decisions of %s are on interferences that %s has not\n",
                  plan.missing, Printable(inOptions.files[2]).c_str(),

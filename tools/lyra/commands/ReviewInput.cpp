@@ -1,47 +1,14 @@
 #include "lyra/commands/ReviewInput.h"
 
-#include <unistd.h>
-
-#include <fstream>
-
-#include "foundation/ReadWholeFile.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/terminal/SafeText.h"
-#include "toolkit/records/ClashDocumentEdit.h"
 
 namespace lyra {
 using namespace ZORToolkit;
-namespace {
 
-constexpr std::uint64_t kMaxSize = 0x7fffffff;  // what the library reads from memory
-
-HRESULT WriteBytes(const std::string& inBytes, const std::string& inPath) {
-  std::ofstream file(inPath, std::ios::binary);
-  file.write(inBytes.data(), static_cast<std::streamsize>(inBytes.size()));
-  return file.flush() ? S_OK : E_FAIL;
-}
-
-}  // namespace
-
-std::string BytesOfInput(const std::string& inPath) {
-  if (inPath == "-") return ZORFoundation::ReadToEnd(STDIN_FILENO, "-", kMaxSize);
-  ZORFoundation::ReadOptions options;
-  options.maxSize = kMaxSize;
-  return ZORFoundation::ReadWholeFile(inPath, options).bytes;
-}
-
-ReviewInput::ReviewInput(const std::string& inPath) : ReviewInput(inPath, BytesOfInput(inPath)) {}
-
-ReviewInput::ReviewInput(const std::string& inPath, std::string inBytes)
-    : bytes(std::move(inBytes)), document(inPath, bytes), result(ReadForReview(document)) {}
-
-void WriteReviewed(ReviewInput& ioInput, bool inIsChanged, const std::string& inPath,
-                   Output& ioOutput) {
+void WriteReviewed(ReviewInput& ioInput, const std::string& inPath, Output& ioOutput) {
   OutputFile output(inPath);
-  if (inIsChanged)
-    output.Check(ClashDocumentEdit(ioInput.document).Dump({}, output.Path()));
-  else
-    output.Check(WriteBytes(ioInput.bytes, output.Path()));
+  output.Check(ioInput.Write(output.Path()));
   output.Finish(ioOutput);
 }
 

@@ -7,31 +7,17 @@
 
 #include "lyra/Arguments.h"
 #include "lyra/terminal/Output.h"
-#include "toolkit/review/Diff.h"
+#include "toolkit/review/ReviewedFile.h"
 
 namespace lyra {
 
 using OrderedJson = nlohmann::ordered_json;
 
-/// The bytes of a file, or of standard input for "-". Raises FileError.
-std::string BytesOfInput(const std::string& inPath);
-
-/// A result with its bytes, which are written where nothing changes.
-struct ReviewInput {
-  /// @param inPath a file, or "-" for standard input. Raises InputError or FileError.
-  explicit ReviewInput(const std::string& inPath);
-
-  std::string bytes;
-  ZORToolkit::ClashDocument document;
-  ZORToolkit::ReviewedResult result;
-
- private:
-  ReviewInput(const std::string& inPath, std::string inBytes);
-};
+using ZORToolkit::BytesOfInput;
+using ReviewInput = ZORToolkit::ReviewedFile;
 
 /// Writes a result: as it was read when nothing in it changed, else as the document is now.
-void WriteReviewed(ReviewInput& ioInput, bool inIsChanged, const std::string& inPath,
-                   Output& ioOutput);
+void WriteReviewed(ReviewInput& ioInput, const std::string& inPath, Output& ioOutput);
 
 /// A length in millimetres, not negative. Raises UsageError.
 /// @param inText with a decimal point or comma; empty for inDefault.

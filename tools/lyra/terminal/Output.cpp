@@ -11,12 +11,10 @@
 
 #include "foundation/ReadWholeFile.h"
 #include "lyra/CommandErrors.h"
-#include "platform/system/ZORFile.h"
 #include "platform/system/ZORGetEnv.h"
+#include "toolkit/records/WrittenFile.h"
 
 namespace lyra {
-
-using ZORFoundation::FileError;
 
 namespace {
 
@@ -65,13 +63,7 @@ OutputFile::OutputFile(const std::string& inPath) : path_(inPath) {
     file_.emplace(inPath);
 }
 
-void OutputFile::Check(HRESULT inResult) const {
-  if (SUCCEEDED(inResult)) return;
-  if (inResult == kZORFileNotFound) throw FileError(path_, ENOENT);
-  if (inResult == kZORFileAccessDenied) throw FileError(path_, EACCES);
-  if (inResult == kZORFileDiskFull) throw FileError(path_, ENOSPC);
-  throw FileError(path_, EIO, "the file could not be written");
-}
+void OutputFile::Check(HRESULT inResult) const { ZORToolkit::CheckWritten(inResult, path_); }
 
 void OutputFile::Finish(Output& ioOutput) {
   if (file_)
