@@ -1,56 +1,53 @@
-# What is installed, and how other projects find it. The installed tree can be moved as a whole: nothing in it holds an
+# What is installed, and how other projects find it; the components are packages of their own, see cmake/Packages.cmake. The installed tree can be moved as a whole: nothing in it holds an
 # absolute path.
 include(CMakePackageConfigHelpers)
 
 set(headerDir ${CMAKE_INSTALL_INCLUDEDIR}/ZORLyra)
 set(packageDir ${CMAKE_INSTALL_LIBDIR}/cmake/ZORLyra)
 
-# The default platform looks for its resources beside its own directory, in ../share/ZORLyra.
-cmake_path(GET CMAKE_INSTALL_LIBDIR PARENT_PATH libraryParent)
+# The default platform looks for its resources beside its own directory, in ../share/ZORLyra, and one folder further up,
+# since on some systems its directory is one of lib for the processor's kind.
 set(resourceDir share/ZORLyra)
-if(libraryParent)
-  set(resourceDir ${libraryParent}/share/ZORLyra)
-endif()
 
 file(RELATIVE_PATH binToLib /prefix/${CMAKE_INSTALL_BINDIR} /prefix/${CMAKE_INSTALL_LIBDIR})
 set_target_properties(ZORLyra ZORDefaultPlatform ZORFoundation ZORClashToolkit PROPERTIES INSTALL_RPATH "$ORIGIN")
 
 install(TARGETS ZORPlatformDeclarations ZORFoundation ZORDefaultPlatform ZORLyra ZORClashToolkit EXPORT ZORLyraTargets
-  RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR}
-  LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
-  ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR})
+  RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT libraries
+  LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT libraries NAMELINK_COMPONENT development
+  ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT development)
 if(TARGET lyra)
   set_target_properties(lyra PROPERTIES INSTALL_RPATH "$ORIGIN/${binToLib}")
-  install(TARGETS lyra RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+  install(TARGETS lyra RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT command)
 endif()
 
-install(DIRECTORY include/ DESTINATION ${headerDir} FILES_MATCHING PATTERN "*.h")
-install(DIRECTORY src/platform/ DESTINATION ${headerDir}/platform FILES_MATCHING PATTERN "*.h")
+install(DIRECTORY include/ DESTINATION ${headerDir} COMPONENT development FILES_MATCHING PATTERN "*.h")
+install(DIRECTORY src/platform/ DESTINATION ${headerDir}/platform COMPONENT development FILES_MATCHING PATTERN "*.h")
 install(FILES src/default_platform/InterferenceScene.h src/default_platform/OpenModel.h
-  src/default_platform/SettingOverride.h DESTINATION ${headerDir}/default_platform)
+  src/default_platform/SettingOverride.h DESTINATION ${headerDir}/default_platform COMPONENT development)
 # Not those of the CAD kernel's part, which is loaded by name, and of the toolkit's own sources.
-install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit FILES_MATCHING PATTERN "*.h"
+install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit COMPONENT development FILES_MATCHING PATTERN "*.h"
   PATTERN "detection" EXCLUDE
   PATTERN "viewer" EXCLUDE
   REGEX "/(Deviations|DrawingWorkers|ElementWalk|Manifest|PageData|PageLibrary|PageMaker|PictureDrawing|PictureSettings|PictureStore|PublishedFiles|ReferredPictures|ShippedTexts)[.]h$" EXCLUDE
   REGEX "/exchange/(BcfNames|BcfPictures|BcfTopics|BcfWords|DocumentTimes|ExchangeLibrary|ExchangeXml|SheetBase|XmlText)[.]h$" EXCLUDE
   REGEX "/review/(Assignment|Frames|HashInput|LanguageWords|PlaceClusters|ProductMatch|ReviewSource|TomlFile)[.]h$" EXCLUDE)
-install(FILES src/toolkit/detection/Detect.h DESTINATION ${headerDir}/toolkit/detection)
+install(FILES src/toolkit/detection/Detect.h DESTINATION ${headerDir}/toolkit/detection COMPONENT development)
 install(FILES ${PROJECT_BINARY_DIR}/generated/ZORLyraExport.h ${PROJECT_BINARY_DIR}/generated/ZORPlatformExport.h
   ${PROJECT_BINARY_DIR}/generated/ZORToolkitExport.h
-  DESTINATION ${headerDir})
-install(DIRECTORY resources/ DESTINATION ${resourceDir} OPTIONAL)
+  DESTINATION ${headerDir} COMPONENT development)
+install(DIRECTORY resources/ DESTINATION ${resourceDir} COMPONENT libraries OPTIONAL)
 
-install(EXPORT ZORLyraTargets NAMESPACE ZORLyra:: DESTINATION ${packageDir})
+install(EXPORT ZORLyraTargets NAMESPACE ZORLyra:: DESTINATION ${packageDir} COMPONENT development)
 configure_package_config_file(cmake/ZORLyraConfig.cmake.in ${PROJECT_BINARY_DIR}/generated/ZORLyraConfig.cmake
   INSTALL_DESTINATION ${packageDir})
 write_basic_package_version_file(${PROJECT_BINARY_DIR}/generated/ZORLyraConfigVersion.cmake
   COMPATIBILITY SameMinorVersion)
 install(FILES ${PROJECT_BINARY_DIR}/generated/ZORLyraConfig.cmake
   ${PROJECT_BINARY_DIR}/generated/ZORLyraConfigVersion.cmake
-  DESTINATION ${packageDir})
+  DESTINATION ${packageDir} COMPONENT development)
 
 file(RELATIVE_PATH pcToPrefix /prefix/${CMAKE_INSTALL_LIBDIR}/pkgconfig /prefix)
 string(REGEX REPLACE "/$" "" pcToPrefix "${pcToPrefix}")
 configure_file(cmake/zorlyra.pc.in ${PROJECT_BINARY_DIR}/generated/zorlyra.pc @ONLY)
-install(FILES ${PROJECT_BINARY_DIR}/generated/zorlyra.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)
+install(FILES ${PROJECT_BINARY_DIR}/generated/zorlyra.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig COMPONENT development)

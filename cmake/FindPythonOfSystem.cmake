@@ -1,0 +1,13 @@
+# pybind11, and the system's own Python whatever others come first in the path: the module is installed for that one.
+if(NOT DEFINED Python_EXECUTABLE AND EXISTS /usr/bin/python3)
+  set(Python_EXECUTABLE /usr/bin/python3)
+endif()
+set(PYBIND11_FINDPYTHON ON)
+set(ZOR_HAS_PYBIND11 OFF)
+find_package(Python QUIET COMPONENTS Interpreter Development.Module)
+if(Python_Development.Module_FOUND)
+  find_package(pybind11 QUIET)
+  if(pybind11_FOUND)
+    set(ZOR_HAS_PYBIND11 ON)
+  endif()
+endif()

@@ -1,0 +1,18 @@
+# Runs in cpack, on what was installed for the packages: adds to each its copyright and change logs, and compresses
+# what Debian wants compressed.
+foreach(component IN LISTS CPACK_COMPONENTS_ALL)
+  string(TOUPPER ${component} upper)
+  set(root ${CPACK_TEMPORARY_DIRECTORY}/${component}/usr)
+  set(papers ${root}/share/doc/${CPACK_DEBIAN_${upper}_PACKAGE_NAME})
+  file(MAKE_DIRECTORY ${papers})
+  configure_file(${CPACK_ZOR_SOURCE_DIR}/packaging/debian/copyright ${papers}/copyright COPYONLY)
+  configure_file(${CPACK_ZOR_SOURCE_DIR}/packaging/debian/changelog ${papers}/changelog.Debian COPYONLY)
+  configure_file(${CPACK_ZOR_SOURCE_DIR}/CHANGELOG.md ${papers}/changelog COPYONLY)
+  file(GLOB compressed ${papers}/changelog ${papers}/changelog.Debian ${root}/share/man/man*/*)
+  execute_process(COMMAND gzip -9nf ${compressed} COMMAND_ERROR_IS_FATAL ANY)
+  set(overrides ${CPACK_ZOR_SOURCE_DIR}/packaging/debian/${CPACK_DEBIAN_${upper}_PACKAGE_NAME}.lintian-overrides)
+  if(EXISTS ${overrides})
+    file(MAKE_DIRECTORY ${root}/share/lintian/overrides)
+    configure_file(${overrides} ${root}/share/lintian/overrides/${CPACK_DEBIAN_${upper}_PACKAGE_NAME} COPYONLY)
+  endif()
+endforeach()
