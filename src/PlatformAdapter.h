@@ -27,6 +27,16 @@ inline std::u16string_view UnitsOf(const DOMString& inText) {
   return {inText.rawBuffer(), inText.length()};
 }
 
+/// A text as UTF-8 if the platform keeps it so, valid as long as the text; else none.
+template <class Text>
+std::optional<std::string_view> Utf8Of(const Text& inText) {
+  if constexpr (requires(std::size_t & outCount) { inText.rawUTF8(outCount); }) {
+    std::size_t count = 0;
+    if (const char* const bytes = inText.rawUTF8(count)) return std::string_view(bytes, count);
+  }
+  return std::nullopt;
+}
+
 template <class String>
 void AppendUnits(String& ioText, std::u16string_view inUnits) {
   if constexpr (requires { ioText.AppendUTF16(inUnits.data(), inUnits.size()); }) {

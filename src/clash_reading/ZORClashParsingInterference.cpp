@@ -68,11 +68,11 @@ class InterferenceWords {
 
 void AppendPoint(const DOM_Node& inPoint, ZORUnicodeString& ioPoints) {
   const ElementAttributes attributes(inPoint);
-  if (ioPoints.GetLengthInChar() != 0) ioPoints += "/";
+  if (ioPoints.GetLengthInChar() != 0) adapter::AppendUnits(ioPoints, u"/");
   ioPoints += attributes.Number("Ux");
-  ioPoints += "/";
+  adapter::AppendUnits(ioPoints, u"/");
   ioPoints += attributes.Number("Uy");
-  ioPoints += "/";
+  adapter::AppendUnits(ioPoints, u"/");
   ioPoints += attributes.Number("Uz");
 }
 
@@ -231,7 +231,7 @@ void ZORClashParsing::GetInterferenceData(DOM_Node inInterference, ZORUnicodeStr
     const ElementAttributes product(inProduct);
     const bool first = ioFirstLabel.GetLengthInChar() == 0;
     ZORUnicodeString label = GetInstanceNameFromDID(product.Text(names::Alias));
-    label += " -- ";
+    adapter::AppendUnits(label, u" -- ");
     label += product.Text(names::ShapeName);
     (first ? ioFirstLabel : outSecondLabel) = label;
     (first ? outFirstPreview : outSecondPreview) = product.Text("Preview");

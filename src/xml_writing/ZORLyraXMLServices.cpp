@@ -1,10 +1,6 @@
 #include "ZORLyraXMLServices.h"
 
-#include <algorithm>
-#include <cstdlib>
 #include <fstream>
-#include <memory>
-#include <new>
 #include <string>
 #include <string_view>
 
@@ -19,6 +15,7 @@
 #include "platform/system/ZORSettingRepository.h"
 #include "platform/xml/DOMString.h"
 #include "platform/xml/ZORXMLParser.h"
+#include "xml_writing/DocumentBytes.h"
 #include "xml_writing/WriterState.h"
 
 namespace {
@@ -66,46 +63,6 @@ std::wstring ToWide(const ZORUnicodeString& inPath) {
   return wide;
 }
 
-/// A buffer of UTF-8, zeroed and large enough for any text of a given length: four bytes a unit. It
-/// comes from calloc, which maps the pages of a large block only as they are written.
-class Utf8Bytes {
- public:
-  /// Raises std::bad_alloc when there is no memory for texts of inLength units.
-  explicit Utf8Bytes(std::size_t inLength)
-      : bytes_(static_cast<char*>(std::calloc(4 * inLength + 4, 1))) {
-    if (bytes_ == nullptr) throw std::bad_alloc();
-  }
-  void Add(const ZORUnicodeString& inText) {
-    std::size_t count = 0;
-    inText.ConvertToUTF8(bytes_.get() + count_, &count);
-    count_ += count;
-  }
-  /// Converts a long text in slices that fit the cache, without a second copy of it.
-  void Add(std::u16string_view inUnits) {
-    constexpr std::size_t kSlice = std::size_t{64} * 1024;
-    ZORUnicodeString slice;
-    while (!inUnits.empty()) {
-      std::size_t count = std::min(inUnits.size(), kSlice);
-      const bool splitsPair = count < inUnits.size() && (inUnits[count - 1] & 0xFC00) == 0xD800;
-      if (splitsPair) --count;
-      slice.BuildFromUTF16(inUnits.data(), count);
-      Add(slice);
-      inUnits.remove_prefix(count);
-    }
-  }
-  HRESULT WriteTo(int inDescriptor) const {
-    std::size_t written = 0;
-    return ZORFWrite(inDescriptor, bytes_.get(), count_, &written);
-  }
-
- private:
-  struct Free {
-    void operator()(char* inBytes) const { std::free(inBytes); }
-  };
-  std::unique_ptr<char, Free> bytes_;
-  std::size_t count_ = 0;
-};
-
 /// The style-sheet reference and the document type of a dumped node, each after a line feed.
 ZORUnicodeString PrologueLines() {
   ZORUnicodeString lines;
@@ -119,29 +76,8 @@ ZORUnicodeString PrologueLines() {
   return lines;
 }
 
-/// A document as UTF-8: declaration and body, with the lines inserted after the first ">", or at the
-/// start if there is none.
-Utf8Bytes DocumentWithLines(std::u16string_view inDeclaration, std::u16string_view inLines,
-                            std::u16string_view inBody) {
-  Utf8Bytes document(inDeclaration.size() + inLines.size() + inBody.size());
-  const std::size_t inHead = inDeclaration.find(u'>') + 1;  // 0 where there is none
-  const std::size_t inRest = inHead > 0 ? 0 : inBody.find(u'>') + 1;
-  if (inRest > 0) {
-    document.Add(inDeclaration);
-    document.Add(inBody.substr(0, inRest));
-    document.Add(inLines);
-    document.Add(inBody.substr(inRest));
-  } else {
-    document.Add(inDeclaration.substr(0, inHead));
-    document.Add(inLines);
-    document.Add(inDeclaration.substr(inHead));
-    document.Add(inBody);
-  }
-  return document;
-}
-
 /// Opens a file, makes bytes of it and writes them.
-/// @param inMakeBytes  called when the file is open.
+/// @param inMakeBytes called when the file is open.
 /// @param outClosed the platform's code of closing, when the file was opened.
 template <class MakeBytes>
 HRESULT WriteFile(const ZORUnicodeString& inPath, const MakeBytes& inMakeBytes,
@@ -151,7 +87,9 @@ HRESULT WriteFile(const ZORUnicodeString& inPath, const MakeBytes& inMakeBytes,
   if (FAILED(opened)) return opened;
   Teardown close;
   close.Add([&] { outClosed = ZORFClose(descriptor); });
-  const HRESULT written = inMakeBytes().WriteTo(descriptor);
+  const std::string_view bytes = inMakeBytes();
+  std::size_t count = 0;
+  const HRESULT written = ZORFWrite(descriptor, bytes.data(), bytes.size(), &count);
   close.Run();
   return written;
 }
@@ -290,14 +228,13 @@ HRESULT ZORLyraXMLServices::CreateNewFederatorDocument(ZORUnicodeString inPath,
 
 int ZORLyraXMLServices::DumpDocument(ZORUnicodeString inPath) {
   HRESULT closed = S_OK;
-  const HRESULT written = WriteFile(
-      inPath,
-      [&] {
-        Utf8Bytes bytes(static_cast<std::size_t>(text_.GetLengthInChar()));
-        bytes.Add(text_);
-        return bytes;
-      },
-      closed);
+  Utf8Bytes bytes;
+  const auto convert = [&] {
+    bytes = Utf8Bytes(Utf8Bytes::MostOf(static_cast<std::size_t>(text_.GetLengthInChar())));
+    bytes.Add(text_);
+    return bytes.View();
+  };
+  const HRESULT written = WriteFile(inPath, convert, closed);
   return FAILED(written) ? written : closed;
 }
 
@@ -316,11 +253,10 @@ HRESULT ZORLyraXMLServices::DumpDocument(DOM_Node inNode, ZORUnicodeString inPat
     declaration.Append("\n");
   }
   // Converted before the file is opened, so that running out of memory leaves an old file intact.
-  const Utf8Bytes bytes = DocumentWithLines(
-      adapter::UnitsOf(declaration), adapter::UnitsOf(PrologueLines()), adapter::UnitsOf(body));
+  const DocumentBytes bytes(declaration, PrologueLines(), body);
   HRESULT ignored = S_OK;
   return WriteFile(
-      inPath, [&]() -> const Utf8Bytes& { return bytes; }, ignored);
+      inPath, [&] { return bytes.View(); }, ignored);
 }
 
 // The codes of the joins are ignored: copying a path that does not fit fails anyway.

@@ -25,6 +25,7 @@ constexpr bool HasAdditions = requires(Type inObject) {
 || requires(Type inObject) { inObject.Reserve(1); }
 || requires(Type inObject) { inObject.getChangeCount(); }
 || requires(Type inObject) { inObject.equals("text"); }
+|| requires(Type inObject, std::size_t& outCount) { inObject.rawUTF8(outCount); }
 || requires(Type inObject) { inObject.SignedValue(); }
 || requires(Type inObject) { inObject.ConvertToUC2Bytes(); }
 || requires(Type inObject) { inObject.GetInterface(); }
@@ -32,7 +33,7 @@ constexpr bool HasAdditions = requires(Type inObject) {
 || requires(Type inObject) { inObject.HasBackgroundColor(); };
 template <class Type>
 constexpr bool IsComparable = requires(Type inObject) {
-  inObject == inObject;
+  inObject == inObject;  // NOLINT(misc-redundant-expression)
 };
 template <class Settings>
 constexpr bool ReadsNumbers = requires(Settings& inSettings, double* outValue) {

@@ -2,9 +2,12 @@
 
 #include <algorithm>
 #include <atomic>
+#include <cstddef>
 #include <cstdlib>
 #include <cstring>
 #include <limits>
+#include <memory>
+#include <mutex>
 #include <new>
 #include <stdexcept>
 #include <utility>
@@ -14,18 +17,39 @@
 
 namespace {
 
-// The head of a text that strings own themselves. Counted atomically: such a string may be a
-// constant of the process that several threads copy.
-struct OwnedHead {
-  std::atomic<std::uint32_t> handles;
+// A text that strings own themselves. Counted atomically: such a string may be a constant of the
+// process that several threads copy.
+struct OwnedText {
+  std::atomic<std::uint32_t> handles{1};
+  bool isUtf8 = false;
+  DOM_Text text;  // of UTF-16; its units follow
 };
 
-std::size_t OwnedBytes(std::uint32_t inCount) {
-  return sizeof(OwnedHead) + sizeof(DOM_Text) + inCount * sizeof(char16_t);
+// A serialised document: large, and mostly taken as UTF-8 by who asked for it.
+struct Utf8Text : OwnedText {
+  MallocedBytes bytes;
+  std::size_t count = 0;
+  std::once_flag isWidened;
+  std::unique_ptr<char16_t[]> units;
+};
+
+OwnedText* OwnedOf(const DOM_Text* inText) {
+  char* const text = reinterpret_cast<char*>(const_cast<DOM_Text*>(inText));
+  return reinterpret_cast<OwnedText*>(text - offsetof(OwnedText, text));
 }
 
-OwnedHead* HeadOf(const DOM_Text* inText) {
-  return reinterpret_cast<OwnedHead*>(const_cast<DOM_Text*>(inText)) - 1;
+// Null for a text that is kept as UTF-16.
+Utf8Text* Utf8Of(const DOM_Text* inText) {
+  OwnedText* const owned = OwnedOf(inText);
+  return owned->isUtf8 ? static_cast<Utf8Text*>(owned) : nullptr;
+}
+
+DOM_Text* NewOwnedText(std::uint32_t inCount) {
+  void* const block = std::malloc(sizeof(OwnedText) + inCount * sizeof(char16_t));
+  if (block == nullptr) throw std::bad_alloc();
+  OwnedText* const owned = new (block) OwnedText;
+  owned->text.head = inCount;
+  return &owned->text;
 }
 
 DOM_Text* OwnedCopy(const ZORUC2Bytes* inUnits, std::size_t inCount) {
@@ -36,26 +60,37 @@ DOM_Text* OwnedCopy(const ZORUC2Bytes* inUnits, std::size_t inCount) {
   return text;
 }
 
+void ReleaseOwnedText(const DOM_Text* inText) {
+  if (OwnedOf(inText)->handles.fetch_sub(1, std::memory_order_acq_rel) != 1) return;
+  if (Utf8Text* const text = Utf8Of(inText))
+    delete text;
+  else
+    std::free(OwnedOf(inText));
+}
+
+const char16_t* UnitsOf(Utf8Text& ioText) {
+  std::call_once(ioText.isWidened, [&] {
+    ioText.units.reset(new char16_t[ioText.count]);
+    ZORFoundation::DecodeUtf8({ioText.bytes.get(), ioText.count}, ioText.units.get());
+  });
+  return ioText.units.get();
+}
+
+const char16_t* UnitsOf(const DOM_Text& inOwned) {
+  Utf8Text* const text = Utf8Of(&inOwned);
+  return text == nullptr ? inOwned.Units() : UnitsOf(*text);
+}
+
 }  // namespace
 
-DOM_Text* NewOwnedText(std::uint32_t inCount) {
-  void* const block = std::malloc(OwnedBytes(inCount));
-  if (block == nullptr) throw std::bad_alloc();
-  OwnedHead* const head = new (block) OwnedHead{1};
-  return new (head + 1) DOM_Text{inCount};
-}
-
-DOM_Text* ResizeOwnedText(DOM_Text* inOwned, std::uint32_t inCount) {
-  void* const block = std::realloc(HeadOf(inOwned), OwnedBytes(inCount));
-  if (block == nullptr) throw std::bad_alloc();
-  DOM_Text* const text = reinterpret_cast<DOM_Text*>(static_cast<OwnedHead*>(block) + 1);
-  text->head = inCount;
-  return text;
-}
-
-void ReleaseOwnedText(const DOM_Text* inOwned) {
-  OwnedHead* const head = HeadOf(inOwned);
-  if (head->handles.fetch_sub(1, std::memory_order_acq_rel) == 1) std::free(head);
+DOMString DOM_HandleAccess::StringOfUtf8(MallocedBytes inBytes, std::size_t inCount,
+                                         std::uint32_t inUnits) {
+  auto* const text = new Utf8Text;
+  text->isUtf8 = true;
+  text->text.head = inUnits;
+  text->bytes = std::move(inBytes);
+  text->count = inCount;
+  return DOMString(nullptr, &text->text);
 }
 
 DOMString::DOMString() : text_(nullptr), tree_(nullptr) {}
@@ -85,7 +120,7 @@ DOMString::DOMString(const DOMString& inOther) : text_(inOther.text_), tree_(inO
   if (tree_ != nullptr)
     tree_->Hold();
   else if (text_ != nullptr)
-    HeadOf(text_)->handles.fetch_add(1, std::memory_order_relaxed);
+    OwnedOf(text_)->handles.fetch_add(1, std::memory_order_relaxed);
 }
 
 DOMString::DOMString(DOMString&& ioOther) noexcept
@@ -113,7 +148,14 @@ unsigned int DOMString::length() const {
 
 const ZORUC2Bytes* DOMString::rawBuffer() const {
   if (length() == 0) return nullptr;
-  return tree_ == nullptr ? text_->Units() : tree_->Widen(*text_);
+  return tree_ == nullptr ? UnitsOf(*text_) : tree_->Widen(*text_);
+}
+
+const char* DOMString::rawUTF8(std::size_t& outCount) const {
+  const Utf8Text* const text = text_ == nullptr || tree_ != nullptr ? nullptr : Utf8Of(text_);
+  if (text == nullptr) return nullptr;
+  outCount = text->count;
+  return text->bytes.get();
 }
 
 bool DOMString::equals(const DOMString& inOther) const {

@@ -2,9 +2,17 @@
 #ifndef ZOR_DEFAULT_PLATFORM_XML_DOM_HANDLEACCESS_H
 #define ZOR_DEFAULT_PLATFORM_XML_DOM_HANDLEACCESS_H
 
+#include <cstdlib>
+#include <memory>
+
 #include "default_platform/xml/DOM_Tree.h"
 #include "platform/xml/DOMString.h"
 #include "platform/xml/DOM_Document.h"
+
+struct FreeBytes {
+  void operator()(char* inBytes) const { std::free(inBytes); }
+};
+using MallocedBytes = std::unique_ptr<char, FreeBytes>;
 
 /// The one door through which the default platform, and tests that count nodes, see what a handle
 /// refers to.
@@ -32,7 +40,7 @@ class DOM_HandleAccess {
   }
   static TextView View(const DOMString& inText) {
     if (inText.text_ == nullptr) return std::u16string_view();
-    return inText.tree_ == nullptr ? TextView(inText.text_->OwnedView()) : inText.text_->View();
+    return inText.tree_ == nullptr ? TextView(Units(inText)) : inText.text_->View();
   }
   static std::u16string_view Units(const DOMString& inText) {
     return {inText.rawBuffer(), inText.length()};
@@ -40,14 +48,9 @@ class DOM_HandleAccess {
   static TextRef TextFor(DOM_Tree& ioTree, const DOMString& inText) {
     return ioTree.AddText(View(inText));
   }
-  /// Makes a string of a block that was allocated by NewOwnedText.
-  static DOMString Adopt(DOM_Text* inOwned) { return DOMString(nullptr, inOwned); }
+  /// Makes a string of well-formed UTF-8, which is widened when its code units are asked for.
+  /// @param inUnits the number of its code units.
+  static DOMString StringOfUtf8(MallocedBytes inBytes, std::size_t inCount, std::uint32_t inUnits);
 };
-
-/// A counted text block for inCount code units with one handle, to be filled and adopted.
-DOM_Text* NewOwnedText(std::uint32_t inCount);
-/// The same block with room for another number of code units.
-DOM_Text* ResizeOwnedText(DOM_Text* inOwned, std::uint32_t inCount);
-void ReleaseOwnedText(const DOM_Text* inOwned);
 
 #endif

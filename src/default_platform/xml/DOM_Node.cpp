@@ -132,10 +132,13 @@ DOM_Node::DOM_Node(DOM_Node&& ioOther) noexcept
 DOM_Node& DOM_Node::operator=(const DOM_Node& inOther) { return *this = DOM_Node(inOther); }
 
 DOM_Node& DOM_Node::operator=(DOM_Node&& ioOther) noexcept {
-  DOM_Node taken(std::move(ioOther));
-  std::swap(tree_, taken.tree_);
-  std::swap(node_, taken.node_);
-  std::swap(attribute_, taken.attribute_);
+  if (this == &ioOther) return *this;
+  DOM_Tree* const tree = tree_;
+  const std::uint32_t node = node_;
+  tree_ = std::exchange(ioOther.tree_, nullptr);
+  node_ = std::exchange(ioOther.node_, 0);
+  attribute_ = std::exchange(ioOther.attribute_, 0);
+  if (tree != nullptr) tree->ReleaseNode(node);
   return *this;
 }
 
@@ -334,12 +337,13 @@ DOM_Node DOM_NamedNodeMap::getNamedItem(const DOMString& inName) const {
 }
 
 DOM_Node DOM_NamedNodeMap::getNamedItem(const char* inName) const {
-  const std::string_view name = inName == nullptr ? std::string_view() : inName;
-  if (!ZORFoundation::IsAscii(name)) return getNamedItem(DOMString(inName));
   if (isNull()) return DOM_Node();
+  const std::string_view name = inName == nullptr ? std::string_view() : inName;
   DOM_Tree* const tree = DOM_HandleAccess::TreeOf(element_);
   const DOM_Tree::Node element = DOM_HandleAccess::NodeOf(element_);
-  return DOM_HandleAccess::Handle(tree, element, tree->FindAttribute(element, name));
+  const DOM_Tree::Attribute attribute = tree->FindAttribute(element, name);
+  if (attribute == 0 && !ZORFoundation::IsAscii(name)) return getNamedItem(DOMString(inName));
+  return DOM_HandleAccess::Handle(tree, element, attribute);
 }
 
 // ---- refusals

@@ -11,6 +11,8 @@ std::uint64_t NextSerial() {
 
 // Shorter lists are walked each time, which costs less than an index of them.
 constexpr std::uint32_t kMaxWalk = 24;
+
+constexpr std::size_t kImportedTexts = 1024;
 }  // namespace
 
 DOM_Tree::DOM_Tree() : serial_(NextSerial()), names_(texts_) {
@@ -94,10 +96,10 @@ DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, TextView inName) con
   return attribute;
 }
 
-DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, std::string_view inLatin1) const {
+DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, std::string_view inAscii) const {
   Attribute attribute = At(inElement).firstAttribute;
   if (attribute == 0) return 0;
-  const Name name = names_.Find(inLatin1);
+  const Name name = names_.FindAscii(inAscii);
   if (name == 0) return 0;
   while (attribute != 0 && attributes_[attribute].name != name)
     attribute = attributes_[attribute].next;
@@ -159,12 +161,15 @@ DOM_Tree::Attribute DOM_Tree::AppendNewAttribute(Node inElement, Attribute inLas
 
 // ---- copying
 
+void DOM_Tree::ImportFrom(const DOM_Tree& inSource) {
+  if (&inSource == this || importSerial_ == inSource.serial_) return;
+  importSerial_ = inSource.serial_;
+  importedNames_.clear();
+  importedTexts_.assign(kImportedTexts, {});
+}
+
 DOM_Tree::Name DOM_Tree::NameFrom(const DOM_Tree& inSource, Name inName) {
   if (&inSource == this || inName == 0) return inName;
-  if (importSerial_ != inSource.serial_) {
-    importSerial_ = inSource.serial_;
-    importedNames_.clear();
-  }
   if (inName >= importedNames_.size()) importedNames_.resize(inSource.NameEnd());
   Name& name = importedNames_[inName];
   if (name == 0) name = names_.Intern(inSource.NameUnits(inName));
@@ -172,7 +177,10 @@ DOM_Tree::Name DOM_Tree::NameFrom(const DOM_Tree& inSource, Name inName) {
 }
 
 TextRef DOM_Tree::TextFrom(const DOM_Tree& inSource, TextRef inText) {
-  return &inSource == this ? inText : texts_.Add(inSource.texts_[inText].View());
+  if (&inSource == this) return inText;
+  ImportedText& known = importedTexts_[inText % kImportedTexts];
+  if (known.from != inText) known = {inText, texts_.AddStored(inSource.texts_[inText].View())};
+  return known.here;
 }
 
 DOM_Tree::Node DOM_Tree::CopyOne(const DOM_Tree& inSource, Node inNode,
@@ -182,16 +190,22 @@ DOM_Tree::Node DOM_Tree::CopyOne(const DOM_Tree& inSource, Node inNode,
   const Node copy = NewNode(from.kind, NameFrom(inSource, from.name), text);
   nodes_[copy].flags = kDetached;
   detached_.AddNode(copy, inGroup);
-  Attribute last = 0;
-  for (Attribute at = from.firstAttribute; at != 0; at = inSource.attributes_[at].next) {
-    const AttributeRecord& attribute = inSource.attributes_[at];
-    last = AppendNewAttribute(copy, last, NameFrom(inSource, attribute.name),
-                              TextFrom(inSource, attribute.value));
+  Attribute* link = &nodes_[copy].firstAttribute;
+  for (Attribute at = from.firstAttribute; at != 0;) {
+    const AttributeRecord attribute = inSource.attributes_[at];
+    const TextRef value = TextFrom(inSource, attribute.value);
+    const Name name = NameFrom(inSource, attribute.name);
+    *link = TakeAttribute();
+    AttributeRecord& record = attributes_[*link];
+    record = {value, name, 0};
+    link = &record.next;
+    at = attribute.next;
   }
   return copy;
 }
 
 DOM_Tree::Node DOM_Tree::Copy(const DOM_Tree& inSource, Node inNode, bool inDeep) {
+  ImportFrom(inSource);
   const DetachedNodes::Group group = detached_.NewGroup();
   const Node root = CopyOne(inSource, inNode, group);
   ListRoot(root, group);

@@ -141,7 +141,8 @@ class DOM_Tree {
   std::uint32_t AttributeCount(Node inElement);
   Attribute AttributeAtPosition(Node inElement, std::uint32_t inPosition);
   Attribute FindAttribute(Node inElement, TextView inName) const;
-  Attribute FindAttribute(Node inElement, std::string_view inLatin1) const;
+  /// Finds nothing by a name that is not ASCII.
+  Attribute FindAttribute(Node inElement, std::string_view inAscii) const;
   Node FirstChildOfKind(Node inParent, int inKind) const;
   const DOM_Text* NameText(Name inName) const { return names_.TextOf(inName); }
   std::u16string_view NameUnits(Name inName) const { return names_.UnitsOf(inName); }
@@ -193,6 +194,7 @@ class DOM_Tree {
   Node CopyOne(const DOM_Tree& inSource, Node inNode, DetachedNodes::Group inGroup);
   Name NameFrom(const DOM_Tree& inSource, Name inName);
   TextRef TextFrom(const DOM_Tree& inSource, TextRef inText);
+  void ImportFrom(const DOM_Tree& inSource);
 
   void LinkLast(Node inParent, Node inChild);
   void LinkBefore(Node inParent, Node inChild, Node inBefore);
@@ -237,9 +239,15 @@ class DOM_Tree {
   DetachedNodes detached_;
   PositionIndexes indexes_;
   AttributeCursor cursor_;
-  // What the names of the tree last copied from are here; 0 for one not met yet.
+  // What the names of the tree last copied from are here, 0 for one not met yet, and what some of
+  // its texts are: those it repeats are not looked for each time.
   std::uint64_t importSerial_ = 0;
   std::vector<Name> importedNames_;
+  struct ImportedText {
+    TextRef from = 0;
+    TextRef here = 0;
+  };
+  std::vector<ImportedText> importedTexts_;  // by the last bits of their number there
 };
 
 inline bool DOM_Tree::HasText(int inKind) {

@@ -152,12 +152,10 @@ void DOM_Tree::FreeSubtree(Node inRoot) {
 
 void DOM_Tree::FreeOne(Node inNode) {
   NodeRecord& record = nodes_[inNode];
-  Attribute attribute = record.firstAttribute;
-  while (attribute != 0) {
-    const Attribute next = attributes_[attribute].next;
-    attributes_[attribute].next = freeAttribute_;
-    freeAttribute_ = attribute;
-    attribute = next;
+  if (Attribute last = record.firstAttribute; last != 0) {
+    while (attributes_[last].next != 0) last = attributes_[last].next;
+    attributes_[last].next = freeAttribute_;
+    freeAttribute_ = record.firstAttribute;
   }
   if (cursor_.element == inNode) cursor_ = AttributeCursor();
   if (record.flags & kIndexed) indexes_.Drop(inNode);

@@ -4,6 +4,8 @@
 #include <limits>
 #include <stdexcept>
 
+#include "foundation/Utf8.h"
+
 namespace {
 
 constexpr std::size_t kFirstBlock = std::size_t{4} * 1024;
@@ -22,8 +24,7 @@ void TextView::CopyTo(char16_t* outUnits) const {
   if (isWide_) {
     std::copy_n(static_cast<const char16_t*>(units_), length_, outUnits);
   } else {
-    const auto* const bytes = static_cast<const unsigned char*>(units_);
-    for (std::size_t i = 0; i < length_; ++i) outUnits[i] = bytes[i];
+    WidenLatin1(Latin1(), outUnits);
   }
 }
 
@@ -145,11 +146,12 @@ std::size_t NameTable::SlotOf(std::u16string_view inName) const {
   return slot;
 }
 
-std::uint32_t NameTable::Find(std::string_view inLatin1) const {
-  const auto address = reinterpret_cast<std::uintptr_t>(inLatin1.data());
+std::uint32_t NameTable::FindAscii(std::string_view inName) const {
+  const auto address = reinterpret_cast<std::uintptr_t>(inName.data());
   std::uint32_t& found = found_[(address ^ (address >> 8)) % found_.size()];
-  if (found != 0 && IsSameText(UnitsOf(found), inLatin1)) return found;
-  const std::uint32_t name = slots_[SlotOf(TextView(inLatin1).ToUtf16())];
+  if (found != 0 && IsSameText(UnitsOf(found), inName)) return found;
+  if (!ZORFoundation::IsAscii(inName)) return 0;
+  const std::uint32_t name = slots_[SlotOf(TextView(inName).ToUtf16())];
   if (name != 0) found = name;
   return name;
 }

@@ -12,18 +12,12 @@
 #include <unordered_map>
 #include <vector>
 
+#include "default_platform/xml/Latin1.h"
+
 /// As ==, which the standard library does unit by unit.
 inline bool IsSameText(std::u16string_view inA, std::u16string_view inB) {
   return inA.size() == inB.size() &&
          (inA.empty() || std::memcmp(inA.data(), inB.data(), inA.size() * sizeof(char16_t)) == 0);
-}
-
-/// The same of UTF-16 and Latin-1.
-inline bool IsSameText(std::u16string_view inText, std::string_view inLatin1) {
-  if (inText.size() != inLatin1.size()) return false;
-  for (std::size_t i = 0; i < inLatin1.size(); ++i)
-    if (inText[i] != static_cast<unsigned char>(inLatin1[i])) return false;
-  return true;
 }
 
 /// Characters as they are stored: Latin-1 or UTF-16.
@@ -54,8 +48,8 @@ class TextView {
 bool IsSameText(TextView inA, TextView inB);
 
 /// An immutable text: this head, then its characters. The texts of a tree are Latin-1 where every
-/// character fits a byte, else UTF-16; equal ones are therefore equal bytes. Those that strings own
-/// (see DOMString.cpp) are always UTF-16, so that all 32 bits count their units.
+/// character fits a byte, else UTF-16; equal ones are therefore equal bytes. Of those that strings own
+/// (see DOMString.cpp) all 32 bits count the units.
 struct DOM_Text {
   static constexpr std::uint32_t kWide = std::uint32_t{1} << 31;
   static constexpr std::uint32_t kMaxLength = kWide - 1;  // of a tree's text
@@ -71,7 +65,6 @@ struct DOM_Text {
     if (IsWide()) return std::u16string_view(Units(), Length());
     return std::string_view(Latin1(), Length());
   }
-  std::u16string_view OwnedView() const { return {Units(), head}; }
 };
 
 /// Where a text lies in its store, in steps of four bytes; 0 for none.
@@ -94,6 +87,8 @@ class TextStore {
                                               (inText & (kPageSteps - 1)) * kStep);
   }
   TextRef Add(TextView inText);
+  /// As Add, of a text that a store keeps already.
+  TextRef AddStored(TextView inText);
   /// As Add. After a long run of different texts, as of numbers, only the last one is compared.
   TextRef Add(std::string_view inLatin1, TextSeries& ioSeries);
   /// As Add, as UTF-16 and without looking for an equal text.
@@ -107,7 +102,6 @@ class TextStore {
     std::uint64_t hash;
     TextRef text;
   };
-  TextRef AddStored(TextView inText);
   TextRef AddShared(TextView inText);
   TextRef AddUnshared(TextView inText);
   TextRef Allocate(std::size_t inBytes);
@@ -136,8 +130,8 @@ class NameTable {
 
   explicit NameTable(TextStore& ioTexts);
   std::uint32_t Intern(std::u16string_view inName);
-  /// @return 0 for a name that the document does not have.
-  std::uint32_t Find(std::string_view inLatin1) const;
+  /// @return 0 for a name that the document does not have, and for all that is not ASCII.
+  std::uint32_t FindAscii(std::string_view inName) const;
   const DOM_Text* TextOf(std::uint32_t inName) const { return names_[inName]; }
   std::u16string_view UnitsOf(std::uint32_t inName) const {
     return {names_[inName]->Units(), names_[inName]->Length()};
@@ -152,7 +146,8 @@ class NameTable {
   TextStore& texts_;
   std::vector<const DOM_Text*> names_;
   std::vector<std::uint32_t> slots_;  // open addressing; a power of two
-  // Readers ask for the same few names by the same literals: the last one found by each address.
+  // Readers ask for the same few names by the same literals: the last one found by each address,
+  // all ASCII.
   mutable std::array<std::uint32_t, 256> found_{};
 };
 

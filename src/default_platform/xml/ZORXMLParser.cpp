@@ -1,35 +1,18 @@
 #include "platform/xml/ZORXMLParser.h"
 
 #include <algorithm>
-#include <array>
 #include <limits>
+#include <string>
 #include <string_view>
-#include <type_traits>
 #include <vector>
 
 #include "default_platform/xml/ByteSource.h"
 #include "default_platform/xml/DOM_HandleAccess.h"
+#include "default_platform/xml/EscapedText.h"
 #include "default_platform/xml/XMLChars.h"
+#include "foundation/Utf8.h"
 
 namespace {
-
-/// Raised within this file only, for what no XML text can carry.
-struct NotSerialisable {};
-
-/// How a code unit is written.
-enum Treatment : unsigned char { kCopy, kEscape, kRefuse };
-
-/// The treatment of the ASCII units in one context. Beyond ASCII all contexts are alike.
-using AsciiTreatments = std::array<Treatment, 128>;
-
-constexpr AsciiTreatments Treatments(std::u16string_view inEscaped, bool inRefusesReturn) {
-  AsciiTreatments treatments{};
-  for (char16_t unit = 0; unit < 0x20; ++unit) treatments[unit] = kRefuse;
-  for (const char16_t unit : {u'\t', u'\n', u'\r'}) treatments[unit] = kCopy;
-  if (inRefusesReturn) treatments[u'\r'] = kRefuse;
-  for (const char16_t unit : inEscaped) treatments[unit] = kEscape;
-  return treatments;
-}
 
 constexpr AsciiTreatments kInText = Treatments(u"&<>\r", false);
 constexpr AsciiTreatments kInAttribute = Treatments(u"&<>\"\t\n\r", false);
@@ -37,77 +20,15 @@ constexpr AsciiTreatments kInSection = Treatments(u"\r", false);
 // A parser turns a carriage return into a line feed, and nothing can be escaped here.
 constexpr AsciiTreatments kVerbatim = Treatments(u"", true);
 
-std::u16string_view EscapeOf(char16_t inUnit) {
-  switch (inUnit) {
-    case u'&':
-      return u"&amp;";
-    case u'<':
-      return u"&lt;";
-    case u'>':
-      return u"&gt;";
-    case u'"':
-      return u"&quot;";
-    case u'\t':
-      return u"&#9;";
-    case u'\n':
-      return u"&#10;";
-    default:
-      return u"&#13;";
-  }
-}
-
-/// A text that grows; becomes a string without being copied.
-class TextBuffer {
- public:
-  TextBuffer() : text_(NewOwnedText(kFirstSize)), at_(text_->Units()), end_(at_ + kFirstSize) {}
-  ~TextBuffer() {
-    if (text_ != nullptr) ReleaseOwnedText(text_);
-  }
-  TextBuffer(const TextBuffer&) = delete;
-  TextBuffer& operator=(const TextBuffer&) = delete;
-
-  /// Makes room for inCount more units.
-  char16_t* Reserve(std::size_t inCount) {
-    if (static_cast<std::size_t>(end_ - at_) < inCount) Grow(inCount);
-    return at_;
-  }
-  void SetEnd(char16_t* inEnd) { at_ = inEnd; }
-  void Append(std::u16string_view inText) {
-    at_ = std::copy(inText.begin(), inText.end(), Reserve(inText.size()));
-  }
-  DOMString Finish() {
-    DOM_Text* const text = ResizeOwnedText(text_, static_cast<std::uint32_t>(Used()));
-    text_ = nullptr;
-    return DOM_HandleAccess::Adopt(text);
-  }
-
- private:
-  static constexpr std::uint32_t kFirstSize = 1024;
-  static constexpr std::size_t kMaxSize = std::numeric_limits<std::uint32_t>::max();
-
-  std::size_t Used() const { return static_cast<std::size_t>(at_ - text_->Units()); }
-  void Grow(std::size_t inCount) {
-    const std::size_t used = Used();
-    if (inCount > kMaxSize - used) throw NotSerialisable();
-    const std::size_t room = std::min(kMaxSize, std::max(used + inCount, used * 2));
-    text_ = ResizeOwnedText(text_, static_cast<std::uint32_t>(room));
-    at_ = text_->Units() + used;
-    end_ = text_->Units() + room;
-  }
-
-  DOM_Text* text_;
-  char16_t* at_;
-  char16_t* end_;
-};
+constexpr std::size_t kAroundName = 3;  // bytes of " Name=\"" but the name's
 
 class TreeWriter {
  public:
-  explicit TreeWriter(const DOM_Tree& inTree)
-      : tree_(inTree), isNameChecked_(inTree.NameEnd(), false) {}
+  explicit TreeWriter(const DOM_Tree& inTree) : tree_(inTree), names_(inTree.NameEnd()) {}
 
   void WriteNodes(DOM_Tree::Node inRoot);
   void WriteAttribute(const DOM_Tree::AttributeRecord& inAttribute);
-  DOMString Finish() { return buffer_.Finish(); }
+  DOMString Finish() { return text_.Finish(); }
 
  private:
   void Start(DOM_Tree::Node inNode);
@@ -119,13 +40,17 @@ class TreeWriter {
   void WriteDoctype(const DOM_Tree::NodeRecord& inRecord);
   void WriteIdLiteral(const DOM_Text& inText);
   void WriteName(DOM_Tree::Name inName);
-  void WriteEscaped(TextView inText, const AsciiTreatments& inTreatments);
-  template <class Unit>
-  void WriteUnits(std::basic_string_view<Unit> inText, const AsciiTreatments& inTreatments);
+
+  /// A name as UTF-8, as an attribute begins: " Name=\"".
+  struct NameText {
+    std::string start;
+    std::size_t units = 0;
+  };
+  const NameText& TextOf(DOM_Tree::Name inName);
 
   const DOM_Tree& tree_;
-  TextBuffer buffer_;
-  std::vector<bool> isNameChecked_;  // names known to be names of XML 1.0
+  EscapedText text_;
+  std::vector<NameText> names_;  // those met so far
 };
 
 void TreeWriter::WriteNodes(DOM_Tree::Node inRoot) {
@@ -152,7 +77,7 @@ void TreeWriter::Start(DOM_Tree::Node inNode) {
     case DOM_Node::ELEMENT_NODE:
       return StartElement(inNode);
     case DOM_Node::TEXT_NODE:
-      return WriteEscaped(tree_.Text(record.text)->View(), kInText);
+      return text_.Append(tree_.Text(record.text)->View(), kInText);
     case DOM_Node::CDATA_SECTION_NODE:
       return WriteSection(tree_.Text(record.text)->View().ToUtf16());
     case DOM_Node::COMMENT_NODE:
@@ -168,127 +93,76 @@ void TreeWriter::Start(DOM_Tree::Node inNode) {
 
 void TreeWriter::StartElement(DOM_Tree::Node inNode) {
   const DOM_Tree::NodeRecord& record = tree_.At(inNode);
-  buffer_.Append(u"<");
+  text_.Append("<");
   WriteName(record.name);
   for (DOM_Tree::Attribute at = record.firstAttribute; at != 0; at = tree_.AttributeAt(at).next) {
-    buffer_.Append(u" ");
-    WriteAttribute(tree_.AttributeAt(at));
+    const DOM_Tree::AttributeRecord& attribute = tree_.AttributeAt(at);
+    const NameText& name = TextOf(attribute.name);
+    text_.Append(name.start, name.units + kAroundName);
+    text_.Append(tree_.Text(attribute.value)->View(), kInAttribute);
+    text_.Append("\"");
   }
-  buffer_.Append(tree_.FirstChild(inNode) == 0 ? u"/>" : u">");
+  text_.Append(tree_.FirstChild(inNode) == 0 ? "/>" : ">");
 }
 
 void TreeWriter::End(DOM_Tree::Node inNode) {
   if (tree_.At(inNode).kind != DOM_Node::ELEMENT_NODE) return;
-  buffer_.Append(u"</");
+  text_.Append("</");
   WriteName(tree_.At(inNode).name);
-  buffer_.Append(u">");
+  text_.Append(">");
 }
 
 void TreeWriter::WriteAttribute(const DOM_Tree::AttributeRecord& inAttribute) {
   WriteName(inAttribute.name);
-  buffer_.Append(u"=\"");
-  WriteEscaped(tree_.Text(inAttribute.value)->View(), kInAttribute);
-  buffer_.Append(u"\"");
+  text_.Append("=\"");
+  text_.Append(tree_.Text(inAttribute.value)->View(), kInAttribute);
+  text_.Append("\"");
 }
 
 // A document of XML 1.1 may have names that the text, which declares no version, cannot carry.
+const TreeWriter::NameText& TreeWriter::TextOf(DOM_Tree::Name inName) {
+  NameText& name = names_[inName];
+  if (!name.start.empty()) return name;
+  const std::u16string_view units = tree_.NameUnits(inName);
+  if (!IsXMLName(units)) throw NotSerialisable();
+  std::string utf8(ZORFoundation::Utf8Length(units), '\0');
+  ZORFoundation::EncodeUtf8(units, utf8.data());
+  name.units = units.size();
+  name.start.append(" ").append(utf8).append("=\"");
+  return name;
+}
+
 void TreeWriter::WriteName(DOM_Tree::Name inName) {
-  const std::u16string_view name = tree_.NameUnits(inName);
-  if (!isNameChecked_[inName]) {
-    if (!IsXMLName(name)) throw NotSerialisable();
-    isNameChecked_[inName] = true;
-  }
-  buffer_.Append(name);
-}
-
-constexpr std::size_t kBlock = 8;
-
-// Whether eight units are ASCII that needs no escape in any context. Free of branches, so that it
-// vectorises.
-template <class Unit>
-bool NeedsNoEscape(const Unit* inUnits) {
-  unsigned int hits = 0;
-  for (std::size_t i = 0; i < kBlock; ++i) {
-    const auto unit = static_cast<std::make_unsigned_t<Unit>>(inUnits[i]);
-    hits |= static_cast<unsigned int>(unit < 0x20) | static_cast<unsigned int>(unit >= 0x80) |
-            static_cast<unsigned int>(unit == u'&') | static_cast<unsigned int>(unit == u'<') |
-            static_cast<unsigned int>(unit == u'>') | static_cast<unsigned int>(unit == u'"');
-  }
-  return hits == 0;
-}
-
-void TreeWriter::WriteEscaped(TextView inText, const AsciiTreatments& inTreatments) {
-  if (inText.IsWide())
-    WriteUnits(inText.Units(), inTreatments);
-  else
-    WriteUnits(inText.Latin1(), inTreatments);
-}
-
-template <class Unit>
-void TreeWriter::WriteUnits(std::basic_string_view<Unit> inText,
-                            const AsciiTreatments& inTreatments) {
-  const Unit* from = inText.data();
-  const Unit* const end = from + inText.size();
-  char16_t* to = buffer_.Reserve(inText.size());
-  while (from != end) {
-    if (end - from >= static_cast<std::ptrdiff_t>(kBlock) && NeedsNoEscape(from)) {
-      for (std::size_t i = 0; i < kBlock; ++i)
-        to[i] = static_cast<std::make_unsigned_t<Unit>>(from[i]);
-      to += kBlock;
-      from += kBlock;
-      continue;
-    }
-    const Unit* const pause = from + std::min<std::ptrdiff_t>(kBlock, end - from);
-    while (from < pause) {
-      const char16_t unit = static_cast<std::make_unsigned_t<Unit>>(*from);
-      if (unit < 0x80 ? inTreatments[unit] == kCopy : unit < 0xD800) {
-        *to++ = unit;
-        ++from;
-      } else if (unit >= 0x80) {
-        const bool isPair = unit >= 0xD800 && unit < 0xDC00 && from + 1 != end &&
-                            from[1] >= 0xDC00 && from[1] < 0xE000;
-        if (unit >= 0xFFFE || (unit < 0xE000 && !isPair)) throw NotSerialisable();
-        *to++ = unit;
-        ++from;
-        if (isPair) *to++ = static_cast<char16_t>(*from++);
-      } else {
-        if (inTreatments[unit] == kRefuse) throw NotSerialisable();
-        buffer_.SetEnd(to);
-        buffer_.Append(EscapeOf(unit));
-        ++from;
-        to = buffer_.Reserve(static_cast<std::size_t>(end - from));
-      }
-    }
-  }
-  buffer_.SetEnd(to);
+  const NameText& name = TextOf(inName);
+  text_.Append(std::string_view(name.start).substr(1, name.start.size() - kAroundName), name.units);
 }
 
 // What a section cannot hold is written between two sections.
 void TreeWriter::WriteSection(std::u16string_view inText) {
-  constexpr std::u16string_view kStart = u"<![CDATA[";
-  constexpr std::u16string_view kEnd = u"]]>";
-  buffer_.Append(kStart);
+  constexpr std::string_view kStart = "<![CDATA[";
+  constexpr std::string_view kEnd = "]]>";
+  text_.Append(kStart);
   while (true) {
-    const std::size_t stop = std::min(inText.find(kEnd), inText.find(u'\r'));
+    const std::size_t stop = std::min(inText.find(u"]]>"), inText.find(u'\r'));
     if (stop == std::u16string_view::npos) break;
     const bool isEnd = inText[stop] == u']';
     const std::size_t count = stop + (isEnd ? 2 : 0);
-    WriteUnits(inText.substr(0, count), kInSection);
-    buffer_.Append(kEnd);
-    if (!isEnd) buffer_.Append(EscapeOf(u'\r'));
-    buffer_.Append(kStart);
+    text_.Append(inText.substr(0, count), kInSection);
+    text_.Append(kEnd);
+    if (!isEnd) text_.Append(EscapeOf(u'\r'));
+    text_.Append(kStart);
     inText.remove_prefix(isEnd ? count : count + 1);
   }
-  WriteUnits(inText, kInSection);
-  buffer_.Append(kEnd);
+  text_.Append(inText, kInSection);
+  text_.Append(kEnd);
 }
 
 void TreeWriter::WriteComment(std::u16string_view inText) {
   if (inText.find(u"--") != std::u16string_view::npos || inText.ends_with(u'-'))
     throw NotSerialisable();
-  buffer_.Append(u"<!--");
-  WriteUnits(inText, kVerbatim);
-  buffer_.Append(u"-->");
+  text_.Append("<!--");
+  text_.Append(inText, kVerbatim);
+  text_.Append("-->");
 }
 
 void TreeWriter::WriteInstruction(const DOM_Tree::NodeRecord& inRecord) {
@@ -296,39 +170,39 @@ void TreeWriter::WriteInstruction(const DOM_Tree::NodeRecord& inRecord) {
   // A parser would take leading white space for the separator.
   if (data.find(u"?>") != std::u16string::npos || data.find_first_of(u" \t\n") == 0)
     throw NotSerialisable();
-  buffer_.Append(u"<?");
+  text_.Append("<?");
   WriteName(inRecord.name);
-  if (!data.empty()) buffer_.Append(u" ");
-  WriteUnits(std::u16string_view(data), kVerbatim);
-  buffer_.Append(u"?>");
+  if (!data.empty()) text_.Append(" ");
+  text_.Append(std::u16string_view(data), kVerbatim);
+  text_.Append("?>");
 }
 
 void TreeWriter::WriteDoctype(const DOM_Tree::NodeRecord& inRecord) {
   const DocumentType& doctype = tree_.Doctype();
-  buffer_.Append(u"<!DOCTYPE ");
+  text_.Append("<!DOCTYPE ");
   WriteName(inRecord.name);
   if (doctype.publicId != 0) {
-    buffer_.Append(u" PUBLIC ");
+    text_.Append(" PUBLIC ");
     WriteIdLiteral(*tree_.Text(doctype.publicId));
-    buffer_.Append(u" ");
+    text_.Append(" ");
   } else if (doctype.systemId != 0) {
-    buffer_.Append(u" SYSTEM ");
+    text_.Append(" SYSTEM ");
   }
   if (doctype.systemId != 0) WriteIdLiteral(*tree_.Text(doctype.systemId));
   if (doctype.internalSubset != 0) {
-    buffer_.Append(u" [");
-    WriteEscaped(tree_.Text(doctype.internalSubset)->View(), kVerbatim);
-    buffer_.Append(u"]");
+    text_.Append(" [");
+    text_.Append(tree_.Text(doctype.internalSubset)->View(), kVerbatim);
+    text_.Append("]");
   }
-  buffer_.Append(u">");
+  text_.Append(">");
 }
 
 void TreeWriter::WriteIdLiteral(const DOM_Text& inText) {
   const std::u16string text = inText.View().ToUtf16();
-  const std::u16string_view quote = text.find(u'"') == std::u16string::npos ? u"\"" : u"'";
-  buffer_.Append(quote);
-  WriteUnits(std::u16string_view(text), kVerbatim);
-  buffer_.Append(quote);
+  const std::string_view quote = text.find(u'"') == std::u16string::npos ? "\"" : "'";
+  text_.Append(quote);
+  text_.Append(std::u16string_view(text), kVerbatim);
+  text_.Append(quote);
 }
 
 bool IsKnownEncoding(const ZORUnicodeString& inName) {

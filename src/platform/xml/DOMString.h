@@ -35,6 +35,9 @@ class ZOR_PLATFORM_EXPORT DOMString {
   /// Same text; a null string equals an empty one.
   bool equals(const DOMString& inOther) const;
   bool equals(const char* inAscii) const;
+  /// The same text as UTF-8, without terminating zero, if the string is kept so, as that of a
+  /// serialised node is; else null. Valid while this string or a copy lives.
+  const char* rawUTF8(std::size_t& outCount) const;
 #endif
 
  private:

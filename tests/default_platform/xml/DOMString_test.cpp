@@ -2,10 +2,12 @@
 
 #include <gtest/gtest.h>
 
+#include <string>
 #include <thread>
 #include <utility>
 #include <vector>
 
+#include "platform/xml/ZORXMLParser.h"
 #include "support/XMLText.h"
 
 TEST(DOMString, NullStringAnswersAll) {
@@ -75,12 +77,42 @@ TEST(DOMString, KeepsItsDocumentAlive) {
   EXPECT_TRUE(value.equals("some longer text of the document"));
 }
 
+TEST(DOMString, SerialisedTextIsUtf8AndWidenedOnceWhereThreadsAskForIt) {
+  DOMString text;
+  ASSERT_EQ(
+      ZORXMLParser::WriteXML(support::RootOf("<a b='\u00E9'>\u65E5\U0001F600</a>"), "UTF-8", text),
+      S_OK);
+  std::size_t count = 0;
+  const char* const bytes = text.rawUTF8(count);
+  ASSERT_NE(bytes, nullptr);
+  EXPECT_EQ(std::string(bytes, count), "<a b=\"\u00E9\">\u65E5\U0001F600</a>");
+  EXPECT_EQ(text.length(), count - 1 - 2 - 2);
+  std::vector<std::thread> threads;
+  for (int i = 0; i < 2; ++i)
+    threads.emplace_back([text] {
+      EXPECT_EQ(std::u16string(text.rawBuffer(), text.length()),
+                u"<a b=\"\u00E9\">\u65E5\U0001F600</a>");
+    });
+  for (std::thread& thread : threads) thread.join();
+  EXPECT_EQ(DOMString(text).rawBuffer(), text.rawBuffer());
+  EXPECT_TRUE(text.equals(DOMString("<a b=\"\u00E9\">\u65E5\U0001F600</a>")));
+}
+
+TEST(DOMString, OtherTextIsNotKeptAsUtf8) {
+  std::size_t count = 7;
+  EXPECT_EQ(DOMString().rawUTF8(count), nullptr);
+  EXPECT_EQ(DOMString("text").rawUTF8(count), nullptr);
+  EXPECT_EQ(support::RootOf("<a>text</a>").getFirstChild().getNodeValue().rawUTF8(count), nullptr);
+  EXPECT_EQ(count, 7u);
+}
+
 TEST(DOMString, ConstantsMayBeCopiedByThreads) {
   const DOMString constant("constant");
   std::vector<std::thread> threads;
   for (int i = 0; i < 4; ++i)
     threads.emplace_back([&constant] {
       for (int j = 0; j < 20000; ++j) {
+        // NOLINTNEXTLINE(performance-unnecessary-copy-initialization): what is tested
         const DOMString copy(constant);
         ASSERT_EQ(copy.length(), 8u);
       }
@@ -94,6 +126,7 @@ TEST(DOMString, UnitsOfADocumentsTextOutliveTheCopyThatWasAsked) {
   const DOMString value = document.getDocumentElement().getAttribute("k");
   const ZORUC2Bytes* units = nullptr;
   {
+    // NOLINTNEXTLINE(performance-unnecessary-copy-initialization): what is tested
     const DOMString copy = value;
     units = copy.rawBuffer();
   }

@@ -50,16 +50,39 @@ TEST(TextStore, WidenedTextsStayWhereTheyAre) {
   EXPECT_EQ(std::u16string_view(units, 4), u"caf\u00E9");
 }
 
+// The sizes at which blocks of eight end, and one character of them that differs.
+TEST(Latin1, IsWidenedAndComparedAtEverySize) {
+  for (std::size_t size = 0; size < 40; ++size) {
+    std::string narrow;
+    for (std::size_t i = 0; i < size; ++i) narrow += static_cast<char>(0xF0 + i);
+    std::u16string wide(size + 1, u'#');
+    WidenLatin1(narrow, wide.data());
+    EXPECT_EQ(wide.back(), u'#');
+    wide.pop_back();
+    for (std::size_t i = 0; i < size; ++i) EXPECT_EQ(wide[i], (0xF0 + i) & 0xFF) << size;
+    EXPECT_TRUE(IsSameText(wide, narrow)) << size;
+    EXPECT_FALSE(IsSameText(wide + u"x", narrow)) << size;
+    for (std::size_t i = 0; i < size; ++i) {
+      std::u16string other = wide;
+      other[i] = static_cast<char16_t>(other[i] + 0x100);
+      EXPECT_FALSE(IsSameText(other, narrow)) << size << ' ' << i;
+    }
+  }
+}
+
 TEST(NameTable, NamesAreFoundByTheirTextWhereverItLies) {
   TextStore texts;
   NameTable names(texts);
   const std::uint32_t alias = names.Intern(u"Alias");
   char asked[] = "Alias";
-  EXPECT_EQ(names.Find(asked), alias);
+  EXPECT_EQ(names.FindAscii(asked), alias);
   asked[0] = 'a';  // the same place holds another name now
-  EXPECT_EQ(names.Find(asked), 0u);
+  EXPECT_EQ(names.FindAscii(asked), 0u);
   const std::uint32_t other = names.Intern(u"alias");
-  EXPECT_EQ(names.Find(asked), other);
+  EXPECT_EQ(names.FindAscii(asked), other);
   asked[0] = 'A';
-  EXPECT_EQ(names.Find(asked), alias);
+  EXPECT_EQ(names.FindAscii(asked), alias);
+  names.Intern(u"\u00E9");
+  EXPECT_EQ(names.FindAscii("\xE9"), 0u);
+  EXPECT_EQ(names.FindAscii("\u00E9"), 0u);
 }
