@@ -137,10 +137,8 @@ std::string SnapshotMaker::ReadyPicture(const InterferenceRecord& inRecord, bool
   else if (!inHasModel && !inRecord.picture.empty())
     path = (resultFolder_ / inRecord.picture).string();
   if (path.empty()) return {};
-  const std::optional<PictureSize> size = SizeOfPng(path);
-  const bool isFit = size && size->width >= 1 && size->height >= 1 &&
-                     std::max(size->width, size->height) <= kMaxSnapshotSize;
-  return isFit ? path : "";
+  const std::optional<PictureSize> size = SizeOfPicture(path);
+  return size && size->width >= 1 && size->height >= 1 ? path : "";
 }
 
 std::vector<Snapshot> SnapshotMaker::Make(const std::vector<const InterferenceRecord*>& inRecords,
@@ -162,7 +160,7 @@ std::vector<Snapshot> SnapshotMaker::Make(const std::vector<const InterferenceRe
       wanted.push_back(i);
       resolved.push_back(std::move(shown));
     } else {
-      const PictureSize size = *SizeOfPng(snapshot.picture);
+      const PictureSize size = *SizeOfPicture(snapshot.picture);
       snapshot.aspectRatio = static_cast<double>(size.width) / size.height;
       snapshot.camera = CameraOf(MakeScene(shown), size);
     }

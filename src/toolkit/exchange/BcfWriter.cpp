@@ -71,10 +71,13 @@ class BcfFileWriter {
     std::vector<const InterferenceRecord*> shown;
     for (const PlannedTopic& topic : topics_) shown.push_back(&Record(topic.representative));
     snapshots_ = maker.Make(shown, inOpenModel);
-    const BcfWritten written = Report();
+    const std::vector<NewArchiveEntry> entries = Entries();
     std::string reason;
-    if (!FindExchangeFunction<WriteArchiveFunction>(kWriteArchiveName)(inPath, Entries(), reason))
+    if (!FindExchangeFunction<WriteArchiveFunction>(kWriteArchiveName)(inPath, entries, reason))
       throw Error(about_.file, std::string("the BCF file cannot be written: ") + reason);
+    BcfWritten written = Report();
+    if (entries.size() > kMaxPlainArchiveEntries)
+      written.warnings.emplace_back("tools that do not know zip64 cannot read so many topics");
     return written;
   }
 
@@ -119,7 +122,7 @@ class BcfFileWriter {
     return written;
   }
 
-  std::vector<NewArchiveEntry> Entries() const {
+  std::vector<NewArchiveEntry> Entries() {
     std::vector<NewArchiveEntry> entries;
     entries.reserve(3 * topics_.size() + 5);
     const auto add = [&](const std::string& inName, auto inMake, bool inIsCompressed = true) {
@@ -142,9 +145,16 @@ class BcfFileWriter {
     return entries;
   }
 
-  static std::string PictureFile(const Snapshot& inSnapshot) {
-    if (inSnapshot.picture.empty()) return WhitePng();
-    return ZORFoundation::ReadWholeFile(inSnapshot.picture).bytes;
+  /// A ready one as it is, if it is as BCF wants it.
+  static std::string PictureFile(Snapshot& ioSnapshot) {
+    if (ioSnapshot.picture.empty()) return WhitePng();
+    const std::string bytes = ZORFoundation::ReadWholeFile(ioSnapshot.picture).bytes;
+    const std::optional<PictureSize> size = SizeOfPng(ioSnapshot.picture);
+    if (size && std::max(size->width, size->height) <= kMaxSnapshotSize) return bytes;
+    std::string png;
+    ioSnapshot.showsProducts = FindExchangeFunction<PngFromPictureFunction>(kPngFromPictureName)(
+        bytes, kMaxSnapshotSize, png);
+    return ioSnapshot.showsProducts ? png : WhitePng();
   }
 
   // Files of the project

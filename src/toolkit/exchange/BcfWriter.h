@@ -26,7 +26,7 @@ struct BcfOptions {
   RecordFilter filter;                   ///< of a group those members that it accepts
   /// Of drawn pictures, each side at most kMaxSnapshotSize.
   PictureSize size;
-  /// A published page, whose PNG pictures are taken instead of drawing; empty: the pictures that the
+  /// A published page, whose pictures are taken instead of drawing; empty: the pictures that the
   /// result refers to are taken when there is no model.
   std::string page;
   int processes = 1;        ///< that draw; at least 1

@@ -1,5 +1,5 @@
 // What the toolkit and its library of foreign formats say to each other. That one stands on libzip,
-// libxlsxwriter and libuuid, and is loaded when the first foreign file is read or written.
+// libxlsxwriter, libuuid and readers of pictures, and is loaded when the first foreign file is read or written.
 #ifndef ZOR_TOOLKIT_EXCHANGE_EXCHANGE_LIBRARY_H
 #define ZOR_TOOLKIT_EXCHANGE_EXCHANGE_LIBRARY_H
 
@@ -16,8 +16,10 @@ namespace ZORToolkit {
 
 // Zip archives
 
-/// So many entries at most are read and written: as many as every reader of the format counts.
-inline constexpr std::size_t kMaxArchiveEntries = 65535;
+/// So many entries at most are read and written: more serve to keep a reader busy.
+inline constexpr std::size_t kMaxArchiveEntries = 99999;
+/// More than these are counted in an extension of the format, which old tools do not know (zip64).
+inline constexpr std::size_t kMaxPlainArchiveEntries = 65535;
 
 struct ArchiveEntry {
   std::string name;  ///< with slashes, whatever the archive has; no folder
@@ -54,6 +56,14 @@ typedef std::array<unsigned char, 16> Uuid;
 /// A name-based UUID (RFC 4122, version 5) of a text in a namespace.
 typedef void NameUuidFunction(const Uuid& inNamespace, const std::string& inName, Uuid& outUuid);
 inline constexpr char kNameUuidName[] = "ZORNameUuid";
+
+// Pictures
+
+/// The bytes of a PNG or JPEG picture as PNG, made smaller where a side is longer than inMaxSide.
+/// @return false for what is no such picture, or one of more than 16,384 pixels a side.
+typedef bool PngFromPictureFunction(const std::string& inPicture, std::size_t inMaxSide,
+                                    std::string& outPng);
+inline constexpr char kPngFromPictureName[] = "ZORPngFromPicture";
 
 // Spreadsheets
 

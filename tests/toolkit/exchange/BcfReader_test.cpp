@@ -6,6 +6,7 @@
 
 #include "toolkit/Error.h"
 #include "toolkit/exchange/BcfFile.h"
+#include "toolkit/exchange/ExchangeLibrary.h"
 #include "toolkit/exchange/WrittenArchive.h"
 
 using namespace ZORToolkit;
@@ -14,6 +15,8 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::Not;
 using testing::StartsWith;
+
+extern "C" WriteArchiveFunction ZORWriteArchive;
 
 namespace {
 
@@ -202,9 +205,23 @@ TEST(BcfReader, RefusesArchivesThatAreTooLarge) {
   const std::string zeros(std::size_t{24} << 20, '\0');
   EXPECT_THAT(Refusal(WriteArchive("bomb.bcf", {{"bcf.version", kVersion21}, {"a/s.png", zeros}})),
               HasSubstr("times its size"));
-  Entries many = {{"bcf.version", kVersion21}};
-  for (int i = 0; i < 66000; ++i) many.emplace_back(std::to_string(i), "");
-  EXPECT_THAT(Refusal(WriteArchive("many.bcf", many)), HasSubstr("has 66001 entries"));
+  EXPECT_THAT(Refusal(WriteEmptyEntries("many.bcf", 100000)), HasSubstr("has 100000 entries"));
+}
+
+TEST(BcfReader, ReadsWhatIsWrittenOfMoreEntriesThanThePlainFormatCounts) {
+  std::vector<NewArchiveEntry> entries = {{"bcf.version", [] { return kVersion21; }}};
+  for (std::size_t i = 0; i <= kMaxPlainArchiveEntries; ++i)
+    entries.push_back({std::to_string(i), [] { return std::string(); }, false});
+  entries.push_back({"a/markup.bcf", [] { return Markup("1", "the last"); }});
+  const std::string path = testing::TempDir() + "zip64.bcf";
+  std::string reason;
+  ASSERT_TRUE(ZORWriteArchive(path, entries, reason)) << reason;
+  const BcfProject project = ReadBcf(path);
+  ASSERT_EQ(project.topics.size(), 1u);
+  EXPECT_EQ(project.topics[0].title, "the last");
+  entries.resize(kMaxArchiveEntries + 1, entries[1]);
+  EXPECT_FALSE(ZORWriteArchive(path, entries, reason));
+  EXPECT_THAT(reason, HasSubstr("would have 100000 entries, more than 99999"));
 }
 
 TEST(BcfReader, LooksLikeBcfGoesByTheNameAndTheFirstBytes) {

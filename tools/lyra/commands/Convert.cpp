@@ -1,5 +1,6 @@
 // lyra convert FILE --to json|bcf|xlsx|csv
 #include <algorithm>
+#include <cerrno>
 #include <cstdio>
 #include <memory>
 #include <thread>
@@ -7,6 +8,7 @@
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/GroupOptions.h"
+#include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/Model.h"
 #include "lyra/commands/Picture.h"
 #include "lyra/commands/RecordsJson.h"
@@ -55,16 +57,34 @@ void WriteInterferences(ClashDocument& ioDocument, Output& ioOutput) {
   array.Finish();
 }
 
-int ConvertToJson(const ConvertOptions& inOptions, Output& ioOutput) {
-  if (!inOptions.output.empty()) throw UsageError("--output: JSON is written to standard output");
-  ClashDocument document(inOptions.file);
-  ioOutput.Write(JsonHeaderText("convert") + ",\n\"info\":" + JsonText(ReadDocument(document)));
-  WriteInterferences(document, ioOutput);
-  WriteArray("components", ReadComponents(document), ioOutput);
-  WriteArray("specifications", ReadSpecifications(document), ioOutput);
-  WriteArray("links", ReadLinks(document), ioOutput);
-  ioOutput.Write("}\n");
+/// Writes text to the file that was named, or to standard output.
+int WriteText(const ConvertOptions& inOptions, Output& ioOutput,
+              const std::function<void(Output& ioText)>& inWrite) {
+  if (inOptions.output.empty()) {
+    inWrite(ioOutput);
+    return 0;
+  }
+  OutputFile file(inOptions.output);
+  const std::unique_ptr<std::FILE, int (*)(std::FILE*)> stream(
+      std::fopen(file.Path().c_str(), "wb"), &std::fclose);
+  if (stream == nullptr) throw ZORFoundation::FileError(inOptions.output, errno);
+  Output text(stream.get());
+  inWrite(text);
+  text.Finish();
+  file.Finish(ioOutput);
   return 0;
+}
+
+int ConvertToJson(const ConvertOptions& inOptions, Output& ioOutput) {
+  ClashDocument document(inOptions.file);
+  return WriteText(inOptions, ioOutput, [&](Output& ioText) {
+    ioText.Write(JsonHeaderText("convert") + ",\n\"info\":" + JsonText(ReadDocument(document)));
+    WriteInterferences(document, ioText);
+    WriteArray("components", ReadComponents(document), ioText);
+    WriteArray("specifications", ReadSpecifications(document), ioText);
+    WriteArray("links", ReadLinks(document), ioText);
+    ioText.Write("}\n");
+  });
 }
 
 // BCF
@@ -101,11 +121,9 @@ std::string TextOf(const std::vector<NotCarried>& inNotCarried, const std::strin
   return text;
 }
 
-/// Finishes the file, and says what became of the result where the file does not go.
-void Finish(OutputFile& ioFile, const ConvertOptions& inOptions, const std::string& inReport,
-            Output& ioOutput) {
-  ioFile.Finish(ioOutput);
-  if (inOptions.output == "-")
+/// Says what became of the result where the file does not go.
+void Say(const ConvertOptions& inOptions, const std::string& inReport, Output& ioOutput) {
+  if (inOptions.output.empty() || inOptions.output == "-")
     std::fputs(inReport.c_str(), stderr);
   else
     ioOutput.Write(inReport);
@@ -118,6 +136,11 @@ std::string JsonReport(const ConvertOptions& inOptions, const OrderedJson& inOfF
                        const std::vector<std::string>& inWarnings) {
   OrderedJson filters = OrderedJson::object();
   if (!inOptions.only.empty()) filters["only"] = inOptions.only;
+  if (inOptions.isGrouped) {
+    const GroupOptions grouping = inOptions.grouping.Get();
+    filters["group"] = Name(grouping.by.front());
+    if (grouping.by.front() == GroupBy::kPlace) filters["distance"] = grouping.distance;
+  }
   OrderedJson json = JsonHeader("exchange", filters);
   json["format"] = inOptions.format;
   json.update(inOfFormat);
@@ -138,6 +161,18 @@ std::string ReportOf(const ConvertOptions& inOptions, const BcfWritten& inWritte
                    std::to_string(inWritten.interferences) + " interferences, " +
                    std::to_string(inWritten.pictures) + " with a picture of their products") +
          "\n" + TextOf(inWritten.notCarried, "BCF");
+}
+
+/// Of a sheet.
+std::string ReportOf(const ConvertOptions& inOptions, const SpreadsheetWritten& inWritten) {
+  if (inOptions.json)
+    return JsonReport(inOptions, OrderedJson::object(), inWritten.interferences, inWritten.pictures,
+                      inWritten.notCarried, {});
+  const std::string list = TextOf(inWritten.notCarried, "A sheet");
+  if (inOptions.output.empty()) return list;
+  return Printable(inOptions.output + ": " + std::to_string(inWritten.interferences) +
+                   " interferences, " + std::to_string(inWritten.pictures) + " with a picture") +
+         "\n" + list;
 }
 
 /// The document, and the model where pictures are to show one, with the progress of drawing.
@@ -183,7 +218,8 @@ int ConvertToBcf(const ConvertOptions& inOptions, Output& ioOutput) {
   conversion.EndProgress();
   for (const std::string& warning : written.warnings)
     std::fprintf(stderr, "lyra: warning: %s\n", Printable(warning).c_str());
-  Finish(conversion.File(), inOptions, ReportOf(inOptions, written), ioOutput);
+  conversion.File().Finish(ioOutput);
+  Say(inOptions, ReportOf(inOptions, written), ioOutput);
   return 0;
 }
 
@@ -200,32 +236,31 @@ int ConvertToXlsx(const ConvertOptions& inOptions, Output& ioOutput) {
   const SpreadsheetWritten written = WriteSpreadsheet(
       conversion.Document(), options, conversion.ModelOpener(), conversion.File().Path());
   conversion.EndProgress();
-  const std::string report =
-      inOptions.json
-          ? JsonReport(inOptions, OrderedJson::object(), written.interferences, written.pictures,
-                       written.notCarried, {})
-          : Printable(inOptions.output + ": " + std::to_string(written.interferences) +
-                      " interferences, " + std::to_string(written.pictures) + " with a picture") +
-                "\n" + TextOf(written.notCarried, "A sheet");
-  Finish(conversion.File(), inOptions, report, ioOutput);
+  conversion.File().Finish(ioOutput);
+  Say(inOptions, ReportOf(inOptions, written), ioOutput);
   return 0;
 }
 
 int ConvertToCsv(const ConvertOptions& inOptions, Output& ioOutput) {
-  if (!inOptions.output.empty()) throw UsageError("--output: CSV is written to standard output");
   const RecordFilter filter = FilterOfConditions(inOptions.only);
   ClashDocument document(inOptions.file);
   document.RequireInterferences();
-  ioOutput.Write(CsvRow(SheetHeaders()));
-  std::vector<std::string> cells;
-  ForEachSheetRow(document, filter, [&](const std::vector<SheetCell>& inCells) {
-    cells.clear();
-    for (const SheetCell& cell : inCells) {
-      const std::string text = cell.number ? Number(*cell.number).text : cell.text;
-      cells.push_back(ioOutput.IsTerminal() ? Printable(text) : text);
-    }
-    ioOutput.Write(CsvRow(cells));
+  SpreadsheetWritten written;
+  WriteText(inOptions, ioOutput, [&](Output& ioText) {
+    ioText.Write(CsvRow(SheetHeaders()));
+    std::vector<std::string> cells;
+    written.notCarried =
+        ForEachSheetRow(document, filter, [&](const std::vector<SheetCell>& inCells) {
+          cells.clear();
+          for (const SheetCell& cell : inCells) {
+            const std::string text = cell.number ? Number(*cell.number).text : cell.text;
+            cells.push_back(ioText.IsTerminal() ? Printable(text) : text);
+          }
+          ioText.Write(CsvRow(cells));
+          ++written.interferences;
+        });
   });
+  Say(inOptions, ReportOf(inOptions, written), ioOutput);
   return 0;
 }
 
@@ -251,7 +286,7 @@ VerbAction DeclareConvert(Arguments& ioArguments) {
                            "xlsx: a workbook; csv: its rows");
   ioArguments.Words("--to", kFormats);
   ioArguments.NonEmptyText("-o,--output", "OUT", options->output,
-                           "bcf, xlsx: the file to write, or - for standard output");
+                           "The file to write, or - for standard output; bcf and xlsx need it");
   ioArguments.Text("--bcf-version", "VERSION", options->bcfVersion, "bcf: 2.1 (default) or 3.0");
   ioArguments.Words("--bcf-version", kBcfVersions);
   ioArguments.Flag("--group", options->isGrouped,
@@ -266,7 +301,8 @@ VerbAction DeclareConvert(Arguments& ioArguments) {
   ioArguments.Texts(
       "--only", "CONDITIONS", options->only,
       "Not for json: only some, such as type=clash,status=relevant; also result= and product=");
-  ioArguments.Flag("--json", options->json, "bcf, xlsx: print what became of the result as JSON");
+  ioArguments.Flag("--json", options->json,
+                   "bcf, xlsx, csv: print what became of the result as JSON");
   options->reading.Declare(ioArguments);
   ioArguments.Language(options->language);
   return [options](Output& ioOutput) { return Convert(*options, ioOutput); };

@@ -4,6 +4,7 @@
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
+#include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/JsonFields.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Table.h"
@@ -33,9 +34,10 @@ std::string IndexText(int inPosition) {
   return inPosition < 0 ? "" : std::to_string(inPosition + 1);
 }
 
-void PrintJson(const Compared& inCompared, Output& ioOutput) {
+void PrintJson(const Compared& inCompared, const DiffOptions& inOptions, Output& ioOutput) {
   const std::vector<std::string> ids = inCompared.Ids();
-  std::string begin = JsonHeaderText("diff") + ",\n";
+  const OrderedJson filters = {{"tolerance", inOptions.tolerance}, {"place", inOptions.samePlace}};
+  std::string begin = JsonHeaderText("diff", filters) + ",\n";
   for (std::size_t i = 0; i < kDiffClassCount; ++i) {
     const auto itsClass = static_cast<DiffClass>(i);
     ioOutput.Write(begin.append("\"").append(Name(itsClass)).append("\":["));
@@ -128,7 +130,7 @@ int Diff(const DiffVerbOptions& inOptions, Output& ioOutput) {
   const ReviewedResult newResult = ReadForReview(newDocument);
   const Compared compared{oldResult, newResult, ZORToolkit::Diff(oldResult, newResult, options)};
   if (inOptions.json)
-    PrintJson(compared, ioOutput);
+    PrintJson(compared, options, ioOutput);
   else if (inOptions.csv)
     PrintCsv(compared, ioOutput);
   else

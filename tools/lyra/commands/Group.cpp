@@ -5,6 +5,7 @@
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/GroupOptions.h"
+#include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/JsonFields.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Table.h"

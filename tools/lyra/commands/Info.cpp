@@ -5,6 +5,7 @@
 
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
+#include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/RecordsJson.h"
 #include "lyra/terminal/SafeText.h"
 #include "lyra/terminal/Table.h"
@@ -131,7 +132,9 @@ class Printer {
     if (array_) {
       array_->Add(inRecord);
     } else if (options_.json) {
-      output_.Write(JsonText(inRecord) + "\n");
+      // "version" is that of the document.
+      const std::string header = JsonHeaderText("info", OrderedJson::object(), "schemaVersion");
+      output_.Write(Behind(header, JsonText(inRecord)) + "\n");
     } else {
       if (!isFirst_) output_.Write("\n");
       PrintText(inRecord, inFile, output_);

@@ -1,17 +1,19 @@
 #include "lyra/commands/RecordsJson.h"
 
+#include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/JsonFields.h"
-#include "lyra/terminal/SafeText.h"
 
 namespace lyra {
 using namespace ZORToolkit;
 namespace {
 
-using Json = nlohmann::ordered_json;
+using Json = OrderedJson;
 
 Json ToJson(const BcfTopic& inTopic) {
   return {{"guid", inTopic.guid},
           {"title", inTopic.title},
+          {"type", inTopic.type},
+          {"status", inTopic.status},
           {"comments", inTopic.comments.size()},
           {"viewpoints", inTopic.viewpoints.size()},
           {"snapshots", inTopic.Snapshots()}};
@@ -28,22 +30,20 @@ Json ToJson(const ModelProductRecord& inRecord) {
   return json;
 }
 
-std::string LineOf(const Json& inValue) {
-  return EscapedForJson(inValue.dump(-1, ' ', false, Json::error_handler_t::replace));
-}
-
 }  // namespace
 
-std::string JsonText(const IdentifiedRecord& inRecord) { return LineOf(JsonOf(inRecord)); }
-std::string JsonText(const DocumentRecord& inRecord) { return LineOf(JsonOf(inRecord)); }
-std::string JsonText(const ComponentRecord& inRecord) { return LineOf(JsonOf(inRecord)); }
-std::string JsonText(const SpecificationRecord& inRecord) { return LineOf(JsonOf(inRecord)); }
-std::string JsonText(const LinkRecord& inRecord) { return LineOf(JsonOf(inRecord)); }
-std::string JsonText(const ModelProductRecord& inRecord) { return LineOf(ToJson(inRecord)); }
+std::string JsonText(const IdentifiedRecord& inRecord) { return JsonLine(JsonOf(inRecord)); }
+std::string JsonText(const DocumentRecord& inRecord) { return JsonLine(JsonOf(inRecord)); }
+std::string JsonText(const ComponentRecord& inRecord) { return JsonLine(JsonOf(inRecord)); }
+std::string JsonText(const SpecificationRecord& inRecord) { return JsonLine(JsonOf(inRecord)); }
+std::string JsonText(const LinkRecord& inRecord) { return JsonLine(JsonOf(inRecord)); }
+std::string JsonText(const ModelProductRecord& inRecord) { return JsonLine(ToJson(inRecord)); }
 std::string JsonText(const BcfProject& inProject) {
   Json topics = Json::array();
   for (const BcfTopic& topic : inProject.topics) topics.push_back(ToJson(topic));
-  return LineOf({{"version", inProject.version}, {"topics", std::move(topics)}});
+  return JsonLine({{"version", inProject.version},
+                   {"project", {{"guid", inProject.guid}, {"name", inProject.name}}},
+                   {"topics", std::move(topics)}});
 }
 
 JsonArray::JsonArray(Output& ioOutput) : output_(ioOutput) { output_.Write("["); }

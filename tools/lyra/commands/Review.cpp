@@ -9,6 +9,7 @@
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/GroupOptions.h"
+#include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/ReviewImport.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Table.h"

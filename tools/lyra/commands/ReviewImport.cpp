@@ -4,6 +4,7 @@
 
 #include "foundation/ReadWholeFile.h"
 #include "lyra/CommandErrors.h"
+#include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/SafeText.h"
 #include "toolkit/exchange/ReviewImport.h"

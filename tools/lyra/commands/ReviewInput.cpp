@@ -1,7 +1,6 @@
 #include "lyra/commands/ReviewInput.h"
 
 #include "lyra/CommandErrors.h"
-#include "lyra/terminal/SafeText.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -33,24 +32,6 @@ DiffOptions CompareOptions::Get() const {
   options.tolerance = LengthOf("--tolerance", tolerance, options.tolerance);
   options.samePlace = LengthOf("--place", place, options.samePlace);
   return options;
-}
-
-OrderedJson JsonHeader(const char* inName, const OrderedJson& inFilters) {
-  return {{"$schema", std::string("urn:zorlyra:schema:").append(inName)},
-          {"version", 1},
-          {"units", {{"length", "mm"}}},
-          {"tool", {{"name", "lyra"}, {"version", LYRA_VERSION}}},
-          {"filters", inFilters}};
-}
-
-std::string JsonHeaderText(const char* inName) {
-  std::string text = JsonLine(JsonHeader(inName));
-  text.pop_back();
-  return text;
-}
-
-std::string JsonLine(const OrderedJson& inJson) {
-  return EscapedForJson(inJson.dump(-1, ' ', false, OrderedJson::error_handler_t::replace));
 }
 
 }  // namespace lyra

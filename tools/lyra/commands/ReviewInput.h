@@ -2,7 +2,6 @@
 #ifndef ZOR_TOOLS_LYRA_COMMANDS_REVIEW_INPUT_H
 #define ZOR_TOOLS_LYRA_COMMANDS_REVIEW_INPUT_H
 
-#include <nlohmann/json.hpp>
 #include <string>
 
 #include "lyra/Arguments.h"
@@ -10,8 +9,6 @@
 #include "toolkit/review/ReviewedFile.h"
 
 namespace lyra {
-
-using OrderedJson = nlohmann::ordered_json;
 
 using ZORToolkit::BytesOfInput;
 using ReviewInput = ZORToolkit::ReviewedFile;
@@ -31,22 +28,6 @@ struct CompareOptions {
   /// Raises UsageError.
   ZORToolkit::DiffOptions Get() const;
 };
-
-/// What every JSON document of the command that is an object begins with: which schema describes it
-/// (resources/NAME.schema.json), its version, the units, the tool, and the filters that were applied.
-OrderedJson JsonHeader(const char* inName, const OrderedJson& inFilters = OrderedJson::object());
-/// The same as text to write members behind: without the closing brace.
-std::string JsonHeaderText(const char* inName);
-
-/// One line of JSON text, safe to print on a terminal, without line feed.
-std::string JsonLine(const OrderedJson& inJson);
-/// An array of such lines.
-template <class Rows>
-std::string JsonRows(const Rows& inRows) {
-  std::string text = "[";
-  for (const OrderedJson& row : inRows) text += (text.size() > 1 ? ",\n" : "\n") + JsonLine(row);
-  return text + (text.size() > 1 ? "\n]" : "]");
-}
 
 }  // namespace lyra
 

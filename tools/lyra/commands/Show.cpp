@@ -3,6 +3,7 @@
 
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
+#include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/RecordsJson.h"
 #include "lyra/terminal/Table.h"
 #include "toolkit/review/Match.h"
@@ -105,8 +106,9 @@ int Show(const ShowOptions& inOptions, Output& ioOutput) {
   ClashDocument document(inOptions.file);
   const InterferenceRecord record = ReadInterference(document, inOptions.number);
   if (inOptions.json)
-    ioOutput.Write(JsonText({record, StableIds(ReadForReview(document))
-                                         .at(static_cast<std::size_t>(record.index - 1))}) +
+    ioOutput.Write(Behind(JsonHeaderText("show"),
+                          JsonText({record, StableIds(ReadForReview(document))
+                                                .at(static_cast<std::size_t>(record.index - 1))})) +
                    "\n");
   else
     PrintText(record, ioOutput);

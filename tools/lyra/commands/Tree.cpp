@@ -4,6 +4,7 @@
 #include "ZORLyraGeneralServices.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
+#include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/Model.h"
 #include "lyra/commands/RecordsJson.h"
 #include "lyra/terminal/Table.h"
@@ -59,13 +60,18 @@ void PrintTree(const ZORIProduct_var& inRoot, std::size_t inDepth, Output& ioOut
 // One product a line. A product whose children are not shown has no "children".
 void PrintTreeJson(const ZORIProduct_var& inRoot, std::size_t inDepth, Output& ioOutput) {
   bool isFirst = true;  // among its parent's children
+  OrderedJson filters = OrderedJson::object();
+  if (inDepth != kAllLevels) filters["depth"] = inDepth;
   const auto showsChildren = [&](const ProductLevels& inLevels) {
     return inLevels.size() <= inDepth || inLevels.back().ChildCount() == 0;
   };
   const auto enter = [&](const ProductLevels& inLevels) {
     std::string text = JsonText(ReadModelProduct(inLevels.back().product));
     text.pop_back();  // the object stays open
-    if (inLevels.size() > 1) ioOutput.Write(isFirst ? "\n" : ",\n");
+    if (inLevels.size() > 1)
+      ioOutput.Write(isFirst ? "\n" : ",\n");
+    else
+      text = Behind(JsonHeaderText("tree", filters), text);
     ioOutput.Write(showsChildren(inLevels) ? text + ",\"children\":[" : text);
     isFirst = true;
   };
