@@ -204,7 +204,10 @@ TEST_P(JsonOfSample, ShowOfFirstMiddleAndLastAgrees) {
   for (const std::size_t number : {std::size_t{1}, records.size() / 2, records.size()}) {
     const CommandResult result = RunCommand({"show", "--json", GetParam(), std::to_string(number)});
     ASSERT_EQ(result.code, 0) << result.error;
-    EXPECT_EQ(TextWithoutId(Json::parse(result.out)), records[number - 1].dump());
+    Json record = Json::parse(result.out);
+    for (const char* const key : {"$schema", "version", "units", "tool", "filters"})
+      EXPECT_EQ(record.erase(key), 1u) << key;
+    EXPECT_EQ(TextWithoutId(record), records[number - 1].dump());
   }
 }
 

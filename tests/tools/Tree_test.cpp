@@ -53,7 +53,8 @@ json LeavesOf(const json& inTree) {
         }
         if (!inProduct["children"].empty()) return;
         json leaf = inProduct;
-        leaf.erase("children");
+        for (const char* const key : {"children", "$schema", "version", "units", "tool", "filters"})
+          leaf.erase(key);
         leaf["path"] = inPath;
         leaves.push_back(leaf);
       };
@@ -85,10 +86,10 @@ TEST(Tree, RowsNameProductPartPlacementTrianglesAndColour) {
 
 TEST(Tree, JsonHasTheKeysOfEachProductInOrder) {
   const CommandResult result = RunWithCache({"tree", "--json", kModel});
-  EXPECT_THAT(
-      result.out,
-      StartsWith("{\"alias\":\"as1\",\"part\":\"as1\",\"placement\":[1.0,0.0,0.0,0.0,1.0,0.0,"
-                 "0.0,0.0,1.0,0.0,0.0,0.0],\"triangles\":0,\"colour\":null,\"children\":["));
+  EXPECT_THAT(result.out,
+              HasSubstr(",\"filters\":{},\"alias\":\"as1\",\"part\":\"as1\",\"placement\":[1.0,0.0,"
+                        "0.0,0.0,1.0,0.0,"
+                        "0.0,0.0,1.0,0.0,0.0,0.0],\"triangles\":0,\"colour\":null,\"children\":["));
   const json rod = json::parse(result.out)["children"][0]["children"][2];
   EXPECT_EQ(rod["alias"], "rod_1");
   EXPECT_EQ(rod["placement"], json({0, 0, -1, 0, 1, 0, 1, 0, 0, -10, 75, 60}));
