@@ -220,6 +220,7 @@ TEST(ReviewFile, WhatIsNoneIsRefusedWithItsPlace) {
   EXPECT_THAT(reasonFor(R"({"format":"zorlyra-review/1"})"), HasSubstr("entries"));
   EXPECT_THAT(reasonFor(ReviewOf("a", R"(,"status":"maybe")")), HasSubstr("unknown status"));
   EXPECT_THAT(reasonFor(ReviewOf("a", R"(,"index":"1")")), HasSubstr("\"index\" is no number"));
+  EXPECT_THAT(reasonFor(ReviewOf("a", R"(,"index":1e999)")), HasSubstr("too large"));
 }
 
 }  // namespace

@@ -66,12 +66,13 @@ DetectionOptions ToDetection(const DetectOptions& inOptions) {
 DetectionResult DetectWithProgress(const DetectOptions& inOptions, DetectionOptions inDetection) {
   const auto reading = std::make_unique<ProgressLine>("reading " + inOptions.file);
   ProgressLine checking("checking " + inOptions.file);
-  const auto start = std::chrono::steady_clock::now();
+  std::optional<std::chrono::steady_clock::time_point> start;  // of the first verdict
   inDetection.readingProgress = [&](double done) { reading->Show(done); };
   inDetection.warn = [&](const std::string& warning) { checking.Warn(warning); };
   inDetection.progress = [&](std::size_t done, std::size_t all) {
-    const double seconds =
-        std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+    const auto now = std::chrono::steady_clock::now();
+    const double seconds = std::chrono::duration<double>(now - start.value_or(now)).count();
+    if (!start) start = now;
     checking.Show(static_cast<double>(done) / static_cast<double>(all),
                   RateText(done, all, seconds));
     return true;

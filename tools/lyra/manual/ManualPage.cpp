@@ -57,7 +57,9 @@ std::string Description(const CommandTable& inTable) {
   return ".SH DESCRIPTION\n" + Roff(inTable.description) + "\n" +
          Roff("A file named \"-\" is standard input, or standard output where one is written.\n") +
          Roff("Results go to standard output, everything else to standard error.\n") +
-         Roff("An output takes the place of an older file once it is whole.\n");
+         Roff(
+             "An output takes the place of an older file once it is whole. Where standard output "
+             "fails after that, the exit status is 1 and the new file stays.\n");
 }
 
 std::string ExitStatus() {
