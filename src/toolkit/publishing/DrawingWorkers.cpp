@@ -130,7 +130,13 @@ int DrawOnce(int inProcesses, const DrawingWork& inWork, const ZORFoundation::St
   }
   if (processes.empty()) FailToStart();
   pipe.CloseWriter();
-  Follow(inWork, inStop, pipe, ioNext, ioDone);
+  try {
+    Follow(inWork, inStop, pipe, ioNext, ioDone);
+  } catch (...) {  // whoever is told how many are drawn has had enough
+    ioNext.Set(inWork.count);
+    for (const pid_t process : processes) EndedWell(process);
+    throw;
+  }
   int failures = 0;
   for (const pid_t process : processes) failures += EndedWell(process) ? 0 : 1;
   return failures;
