@@ -328,7 +328,7 @@ void DefineDocuments(py::module_& ioModule) {
           "numbers as float or None, or as they are written.")
       .def(
           "info", [](const PyDocument& inDocument) { return RecordFrom(About(inDocument)); },
-          "What `lyra info --json` prints.")
+          "What `lyra info --json` prints of a document.")
       .def(
           "components",
           [](const PyDocument& inDocument) {

@@ -22,6 +22,13 @@ class Lyra:
     def json(self, *arguments):
         return json.loads(self.run(*arguments))
 
+    def info(self, path):
+        """What `lyra info --json` says of a document, without what the JSON says of itself."""
+        printed = self.json("info", "--json", path)
+        for name in ("$schema", "schemaVersion", "units", "tool", "filters"):
+            del printed[name]
+        return printed
+
     def complaint(self, *arguments):
         """The one line by which the command refuses, or None."""
         done = subprocess.run([str(BUILD / "bin/lyra"), *map(str, arguments)], capture_output=True, text=True)

@@ -61,7 +61,7 @@ def test_records_are_those_of_the_command(lyra, path):
     records = document.to_records()
     assert list(map(list, records)) == list(map(list, printed))  # the order of keys too
     assert records == with_numbers(None, printed)
-    assert document.info() == lyra.json("info", "--json", path)
+    assert document.info() == lyra.info(path)
     assert document.specifications() == lyra.json("specs", "--json", path)
     assert [group.to_dict() for group in zorlyra.group(document)] == lyra.json("group", "--json", path)
 
@@ -70,7 +70,7 @@ def test_records_are_those_of_the_command(lyra, path):
 def test_other_documents_are_those_of_the_command(lyra, name):
     path = SOURCE / f"tests/golden/inputs/{name}.xml"
     document = zorlyra.read(str(path))
-    assert document.info() == lyra.json("info", "--json", path)
+    assert document.info() == lyra.info(path)
     if name == "components":
         assert document.components() == lyra.json("components", "--json", path) != []
     if name == "federator":
