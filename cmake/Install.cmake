@@ -29,7 +29,7 @@ install(FILES src/default_platform/InterferenceScene.h src/default_platform/Open
 install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit COMPONENT development FILES_MATCHING PATTERN "*.h"
   PATTERN "detection" EXCLUDE
   PATTERN "viewer" EXCLUDE
-  REGEX "/(Deviations|DrawingWorkers|ElementWalk|Manifest|PageData|PageLibrary|PageMaker|PictureDrawing|PictureSettings|PictureStore|PublishedFiles|ReferredPictures|ShippedTexts)[.]h$" EXCLUDE
+  REGEX "/(Deviations|DrawingWorkers|ElementWalk|Manifest|PageData|PageLibrary|PageMaker|PictureDrawing|PictureSettings|PictureStore|PublishedFiles|ReferredPictures|SharedDrawing|ShippedTexts)[.]h$" EXCLUDE
   REGEX "/exchange/(BcfNames|BcfPictures|BcfTopics|BcfWords|DocumentTimes|ExchangeLibrary|ExchangeXml|SheetBase|XmlText)[.]h$" EXCLUDE
   REGEX "/review/(Assignment|Frames|HashInput|LanguageWords|PlaceClusters|ProductMatch|ReviewSource|TomlFile)[.]h$" EXCLUDE)
 install(FILES src/toolkit/detection/Detect.h DESTINATION ${headerDir}/toolkit/detection COMPONENT development)
@@ -51,3 +51,7 @@ file(RELATIVE_PATH pcToPrefix /prefix/${CMAKE_INSTALL_LIBDIR}/pkgconfig /prefix)
 string(REGEX REPLACE "/$" "" pcToPrefix "${pcToPrefix}")
 configure_file(cmake/zorlyra.pc.in ${PROJECT_BINARY_DIR}/generated/zorlyra.pc @ONLY)
 install(FILES ${PROJECT_BINARY_DIR}/generated/zorlyra.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig COMPONENT development)
+
+# Scripts for schedulers.
+install(PROGRAMS tools/cluster/lyra-cluster DESTINATION ${resourceDir}/cluster)
+install(FILES tools/cluster/lyra.condor DESTINATION ${resourceDir}/cluster)

@@ -36,6 +36,7 @@ std::vector<GoldenCase> Cases() {
       {"help_report", {"report", "--help"}},
       {"help_publish", {"publish", "--help"}},
       {"help_extract", {"extract", "--help"}},
+      {"help_gather", {"gather", "--help"}},
       {"help_tree", {"tree", "--help"}},
       {"help_render", {"render", "--help"}},
       {"help_detect", {"detect", "--help"}},

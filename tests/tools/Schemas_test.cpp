@@ -139,6 +139,7 @@ TEST(JsonSchemas, AcceptWhatIsPrinted) {
   addOf("tree", "samples/as1-oc-214.stp");
   addOf("tree", "--leaves samples/as1-oc-214.stp");
   addOf("tree", "--depth 1 samples/as1-oc-214.stp");
+  add("plan", Printed("detect --plan --shares 3 --json --only 'rod*' samples/as1-oc-214.stp"));
   const std::string mine = folder.Path("mine.xml"), theirs = folder.Path("theirs.xml");
   const std::string set = "review set " + kSample + " --only type=contact --comment ";
   Printed(set + "mine -o " + mine);

@@ -44,6 +44,7 @@ std::span<const Verb> Verbs() {
       {"publish", "Write a page of a result, with pictures of a CAD model", DeclarePublish},
       {"extract", "Give back the result from which a page was made", DeclareExtract},
       {"detect", "Find the interferences of a CAD model", DeclareDetect},
+      {"gather", "Put the shares of publish or detect together", DeclareGather},
       {"tree", "List the products of a CAD model", DeclareTree},
       {"render", "Draw a picture of a CAD model", DeclareRender},
       {"path", "Say which path a logical name stands for", DeclarePath},

@@ -40,6 +40,7 @@ VerbAction DeclareFederate(Arguments& ioArguments);
 VerbAction DeclareReport(Arguments& ioArguments);
 VerbAction DeclarePublish(Arguments& ioArguments);
 VerbAction DeclareExtract(Arguments& ioArguments);
+VerbAction DeclareGather(Arguments& ioArguments);
 VerbAction DeclareTree(Arguments& ioArguments);
 VerbAction DeclareRender(Arguments& ioArguments);
 VerbAction DeclareDetect(Arguments& ioArguments);

@@ -6,6 +6,7 @@
 #include <filesystem>
 #include <map>
 #include <memory>
+#include <stdexcept>
 #include <thread>
 
 #include "default_platform/ModelProgram.h"
@@ -200,8 +201,9 @@ class Detection {
     result_.computationCase =
         options_.between ? "Between two selections" : "Between all components";
     for (const Unit& unit : tree_.Units()) result_.products.push_back(unit.product);
-    const ZORDetection::Findings findings = Find();
+    const ZORDetection::Findings findings = FindUnknown();
     AddFindings(findings);
+    AddWork(findings);
     AddUnjudged(findings);
     return std::move(result_);
   }
@@ -227,8 +229,57 @@ class Detection {
     if (result_.productsChecked < 2) throw Error(model_, "there are not two products to check");
   }
 
+  /// What is known, and what is not known of the share.
+  ZORDetection::Findings FindUnknown() {
+    if (options_.known.empty()) return Find();
+    ZORDetection::Findings known = Known();
+    task_.options.known = known.judged;
+    if (known.judged.size() == known.verdicts) return known;
+    ZORDetection::Findings found = Find();
+    const bool isStopped = found.isStopped;
+    TakeInto(known, std::move(found));
+    known.isStopped = isStopped;
+    return known;
+  }
+
+  ZORDetection::Findings Known() const {
+    try {
+      ZORDetection::Findings known = ZORDetection::DecodeFindings(options_.known.front());
+      for (std::size_t i = 1; i < options_.known.size(); ++i)
+        TakeInto(known, ZORDetection::DecodeFindings(options_.known[i]));
+      const auto isProduct = [&](std::uint32_t inNumber) { return inNumber < chosen_.size(); };
+      for (const ZORDetection::Interference& found : known.interferences)
+        if (!isProduct(found.first) || !isProduct(found.second) || !isProduct(found.curveProduct) ||
+            found.curve >= known.curves.size())
+          RefuseKnown();
+      return known;
+    } catch (const std::runtime_error&) {
+      RefuseKnown();
+    }
+  }
+
+  void TakeInto(ZORDetection::Findings& ioKnown, ZORDetection::Findings&& inFound) const {
+    if (!ZORDetection::TakeIn(std::move(inFound), ioKnown)) RefuseKnown();
+  }
+
+  [[noreturn]] void RefuseKnown() const {
+    throw Error(model_ + ": the findings that are known are not of this model");
+  }
+
+  void AddWork(const ZORDetection::Findings& inFindings) {
+    result_.findings = ZORDetection::Encode(inFindings);
+    result_.judged.assign(inFindings.judged.begin(), inFindings.judged.end());
+    result_.work.costs = inFindings.costs;
+    result_.work.openSeconds = inFindings.openSeconds;
+    for (std::size_t i = 0; i < inFindings.seconds.size(); ++i)
+      result_.work.timed.push_back({inFindings.judged[i], inFindings.seconds[i]});
+  }
+
   ZORDetection::Findings Find() {
     ZORDetection::Options& options = task_.options;
+    options.shard = options_.shard.number;
+    options.shards = options_.shard.count;
+    options.tried = options_.tried;
     options.tolerance = options_.tolerance;
     options.contactGap = options_.contactGap;
     options.clearance = options_.clearance;

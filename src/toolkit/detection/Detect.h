@@ -12,6 +12,8 @@
 #include <vector>
 
 #include "ZORToolkitExport.h"
+#include "toolkit/sharding/Plan.h"
+#include "toolkit/sharding/Shard.h"
 
 namespace ZORToolkit {
 
@@ -36,6 +38,10 @@ struct DetectionOptions {
   double maxSeconds = 0;
   std::uint64_t maxMemory = 0;
   bool isStrict = false;  ///< a model of which something cannot be read is an error, not a warning
+
+  Shard shard;                     ///< of the verdicts only those of this share are found
+  std::vector<std::string> known;  ///< findings of other runs, which are not looked for again
+  std::size_t tried = 0;           ///< more than 0: only so many verdicts, timed one after another
 
   std::function<void(double)> readingProgress;             ///< told the share, 0 to 1; may be empty
   std::function<bool(std::size_t, std::size_t)> progress;  ///< told pairs done of all; false: stop
@@ -71,6 +77,9 @@ struct DetectionResult {
   std::vector<std::string> unjudged;
   std::size_t productsChecked = 0, pairsNear = 0;
   bool isStopped = false;
+  std::string findings;  ///< for `known`, on a machine of the same kind; with those that were known
+  std::vector<int> judged;  ///< the verdicts in them, by number
+  WorkSample work;          ///< all verdicts; timed, those that were tried
   double tolerance = 0, contactGap = 0, clearance = 0;
   std::string computationCase;
 };

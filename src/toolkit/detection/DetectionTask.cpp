@@ -1,8 +1,11 @@
 #include "toolkit/detection/DetectionTask.h"
 
+#include <algorithm>
 #include <cstring>
+#include <iterator>
 #include <stdexcept>
 #include <type_traits>
+#include <utility>
 
 namespace ZORDetection {
 namespace {
@@ -97,6 +100,7 @@ void Fields(Packing& ioPacking, Item& ioItem) {
   ioPacking(ioItem.part);
   ioPacking(ioItem.other);
   ioPacking(ioItem.isWholePart);
+  ioPacking(ioItem.verdict);
   ioPacking(ioItem.reason);
 }
 
@@ -108,6 +112,10 @@ void Fields(Packing& ioPacking, Item& ioItem) {
   ioPacking(ioItem.unjudged);
   ioPacking(ioItem.pairsChecked);
   ioPacking(ioItem.verdicts);
+  ioPacking(ioItem.costs);
+  ioPacking(ioItem.judged);
+  ioPacking(ioItem.seconds);
+  ioPacking(ioItem.openSeconds);
   ioPacking(ioItem.isStopped);
 }
 
@@ -121,6 +129,10 @@ void Fields(Packing& ioPacking, Item& ioItem) {
   ioPacking(ioItem.options.threads);
   ioPacking(ioItem.options.meshSize);
   ioPacking(ioItem.options.withCurves);
+  ioPacking(ioItem.options.shard);
+  ioPacking(ioItem.options.shards);
+  ioPacking(ioItem.options.known);
+  ioPacking(ioItem.options.tried);
   ioPacking(ioItem.products);
 }
 
@@ -145,5 +157,32 @@ std::string Encode(const DetectionTask& inTask) { return Packed(inTask); }
 DetectionTask DecodeTask(std::string_view inBytes) { return Unpacked<DetectionTask>(inBytes); }
 std::string Encode(const Findings& inFindings) { return Packed(inFindings); }
 Findings DecodeFindings(std::string_view inBytes) { return Unpacked<Findings>(inBytes); }
+
+bool TakeIn(Findings inOther, Findings& ioFindings) {
+  const auto isOfPart = [](const Unjudged& inUnjudged) { return !inUnjudged.other; };
+  if (inOther.costs != ioFindings.costs || inOther.pairsChecked != ioFindings.pairsChecked)
+    return false;
+  const auto append = [](auto& ioTo, auto& ioFrom) {
+    ioTo.insert(ioTo.end(), std::make_move_iterator(ioFrom.begin()),
+                std::make_move_iterator(ioFrom.end()));
+  };
+  std::erase_if(inOther.unjudged, isOfPart);  // of whole parts, which each run finds
+  const auto curves = static_cast<std::uint32_t>(ioFindings.curves.size());
+  for (Interference& found : inOther.interferences)
+    if (found.curve > 0) found.curve += curves - 1;  // the first is empty in both
+  if (!inOther.curves.empty()) inOther.curves.erase(inOther.curves.begin());
+  append(ioFindings.curves, inOther.curves);
+  append(ioFindings.unjudged, inOther.unjudged);
+  append(ioFindings.interferences, inOther.interferences);
+  append(ioFindings.judged, inOther.judged);
+  std::ranges::sort(ioFindings.judged);
+  std::ranges::sort(ioFindings.interferences, {}, [](const Interference& inFound) {
+    return std::pair(inFound.first, inFound.second);
+  });
+  std::ranges::stable_sort(ioFindings.unjudged, {}, [](const Unjudged& inUnjudged) {
+    return std::pair(inUnjudged.other.has_value(), inUnjudged.verdict);
+  });
+  return std::ranges::adjacent_find(ioFindings.judged) == ioFindings.judged.end();
+}
 
 }  // namespace ZORDetection

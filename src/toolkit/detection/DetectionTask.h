@@ -33,6 +33,10 @@ DetectionTask DecodeTask(std::string_view inBytes);
 std::string Encode(const Findings& inFindings);
 Findings DecodeFindings(std::string_view inBytes);
 
+/// Adds the findings of another share of the same work, in the order of one run.
+/// @return false when they are of other work, or a verdict is in both.
+bool TakeIn(Findings inOther, Findings& ioFindings);
+
 }  // namespace ZORDetection
 
 #endif

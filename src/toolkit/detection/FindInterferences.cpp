@@ -4,13 +4,16 @@
 #include <TopExp_Explorer.hxx>
 #include <TopoDS_Shape.hxx>
 #include <atomic>
+#include <chrono>
 #include <map>
 #include <memory>
 #include <mutex>
+#include <set>
 #include <thread>
 #include <unordered_map>
 
 #include "toolkit/detection/BodyPair.h"
+#include "toolkit/sharding/Shard.h"
 
 namespace ZORDetection {
 namespace {
@@ -157,6 +160,20 @@ bool SharesTopology(const std::vector<Part>& inParts) {
   return false;
 }
 
+constexpr double kCostOfVerdict = 64;  // triangles
+
+/// The share of a box that another takes, by its longest sides: a flat box has no volume.
+double CommonShare(const Box& inBox, const Box& inOther) {
+  double share = 1;
+  for (int i = 1; i <= 3; ++i) {
+    const double length = inBox.high.Coord(i) - inBox.low.Coord(i);
+    const double common = std::min(inBox.high.Coord(i), inOther.high.Coord(i)) -
+                          std::max(inBox.low.Coord(i), inOther.low.Coord(i));
+    if (length > 0) share *= std::clamp(common / length, 0.0, 1.0);
+  }
+  return std::sqrt(share);
+}
+
 class Search {
  public:
   Search(const std::vector<Part>& inParts, const std::vector<Product>& inProducts,
@@ -187,6 +204,10 @@ class Search {
   }
 
  private:
+  double Seconds() const {
+    return std::chrono::duration<double>(std::chrono::steady_clock::now() - start_).count();
+  }
+
   /// Farther apart than this nothing is looked for.
   double Reach() const { return std::max(options_.contactGap, options_.clearance) + 2 * kRounding; }
 
@@ -240,27 +261,64 @@ class Search {
     pairs_.push_back(pair);
   }
 
+  /// The verdicts that are found here, in their order.
+  std::vector<std::size_t> ChooseTasks() {
+    for (const Task& task : tasks_.Tasks()) findings_.costs.push_back(CostOf(task));
+    const std::vector<std::uint32_t> shares =
+        ZORToolkit::SharesOf(findings_.costs, options_.shards);
+    const std::set<std::uint32_t> known(options_.known.begin(), options_.known.end());
+    std::vector<std::size_t> chosen;
+    for (std::size_t i = 0; i < shares.size(); ++i)
+      if (shares[i] + 1 == options_.shard && !known.contains(static_cast<std::uint32_t>(i)))
+        chosen.push_back(i);
+    if (options_.tried == 0) return chosen;
+    return ZORToolkit::ItemsToTry(findings_.costs, options_.tried);
+  }
+
+  /// What a verdict is expected to cost, in triangles: of the bodies that come near each other those
+  /// in the part of their boxes that they have in common, and a constant.
+  std::uint64_t CostOf(const Task& inTask) const {
+    const PartGeometry &first = geometries_[inTask.firstPart],
+                       &second = geometries_[inTask.secondPart];
+    const double reach = Reach() + first.pointPrecision + second.pointPrecision;
+    double cost = kCostOfVerdict;
+    for (const Body& b : second.bodies) {
+      const Box box = b.box.Moved(inTask.firstFromSecond).Grown(reach);
+      for (const Body& a : first.bodies)
+        if (a.box.SquareDistance(box) <= 0)
+          cost += static_cast<double>(a.triangles.size()) * CommonShare(a.box, box) +
+                  static_cast<double>(b.triangles.size()) * CommonShare(box, a.box);
+    }
+    return static_cast<std::uint64_t>(std::llround(cost));
+  }
+
   void JudgeTasks() {
+    const std::vector<std::size_t> chosen = ChooseTasks();
     verdicts_.resize(tasks_.Tasks().size());
     std::atomic<bool> isStopped{false};
     std::mutex progressMutex;
-    std::size_t done = 0;
-    InThreads(options_.threads, [&](std::atomic<std::size_t>& next) {
+    findings_.openSeconds = Seconds();
+    const unsigned threads = options_.tried > 0 ? 1 : options_.threads;
+    InThreads(threads, [&](std::atomic<std::size_t>& next) {
       ProbeCache probes;
       while (!isStopped) {
-        const std::size_t task = next++;
-        if (task >= verdicts_.size()) return;
-        JudgeTask(task, probes, progressMutex);
-        if (!options_.progress) continue;
+        const std::size_t place = next++;
+        if (place >= chosen.size()) return;
+        const double start = Seconds();
+        JudgeTask(chosen[place], probes, progressMutex);
         const std::lock_guard lock(progressMutex);
-        if (!options_.progress(++done, verdicts_.size())) isStopped = true;
+        findings_.judged.push_back(static_cast<std::uint32_t>(chosen[place]));
+        if (options_.tried > 0) findings_.seconds.push_back(Seconds() - start);
+        if (options_.progress && !options_.progress(findings_.judged.size(), chosen.size()))
+          isStopped = true;
       }
     });
     findings_.isStopped = isStopped;
     std::ranges::sort(failures_, {}, &std::pair<std::size_t, std::string>::first);
     for (const auto& [task, reason] : failures_) {
       const Task& of = tasks_.Tasks()[task];
-      findings_.unjudged.push_back({of.firstPart, of.secondPart, false, reason});
+      findings_.unjudged.push_back(
+          {of.firstPart, of.secondPart, false, reason, static_cast<std::uint32_t>(task)});
     }
   }
 
@@ -347,6 +405,7 @@ class Search {
   std::vector<std::uint32_t> curves_;  ///< of the verdicts, in the findings; 0: none yet
   std::vector<std::pair<std::size_t, std::string>> failures_;
   Findings findings_;
+  std::chrono::steady_clock::time_point start_ = std::chrono::steady_clock::now();
 };
 
 }  // namespace

@@ -45,6 +45,10 @@ struct Options {
   unsigned threads = 1;
   double meshSize = 1;  ///< scales the triangles that the search starts from, not the result
   bool withCurves = true;
+  // Of the verdicts only those in one share of several, less those that are known, are found.
+  std::uint32_t shard = 1, shards = 1;
+  std::vector<std::uint32_t> known;
+  std::size_t tried = 0;  ///< more than 0: only so many of the share, timed one after another
   /// Says which pairs are looked at; all when empty. Called from the calling thread only.
   std::function<bool(std::uint32_t, std::uint32_t)> isWanted;
   /// Told how many verdicts are done of how many; returns false to stop. From any thread, never twice
@@ -76,6 +80,7 @@ struct Unjudged {
   std::optional<std::uint32_t> other;  ///< the part against which it could not be judged
   bool isWholePart = true;             ///< nothing of the part was checked
   std::string reason;
+  std::uint32_t verdict = 0;  ///< with another part: the number of the verdict
 };
 
 struct Findings {
@@ -83,8 +88,12 @@ struct Findings {
   /// Shared by all interferences of the same parts in the same placement to each other; the first is empty.
   std::vector<std::vector<Point>> curves{{}};
   std::vector<Unjudged> unjudged;
-  std::size_t pairsChecked = 0;  ///< of products whose boxes come near
-  std::size_t verdicts = 0;      ///< pairs of parts in different placements to each other
+  std::size_t pairsChecked = 0;       ///< of products whose boxes come near
+  std::size_t verdicts = 0;           ///< pairs of parts in different placements to each other
+  std::vector<std::uint64_t> costs;   ///< that each verdict is expected to have
+  std::vector<std::uint32_t> judged;  ///< the verdicts that were found
+  std::vector<double> seconds;        ///< that they took, where they were timed
+  double openSeconds = 0;             ///< until the first
   bool isStopped = false;
 };
 

@@ -43,6 +43,9 @@ class PictureStore {
   void Finish(int inNumber) const;
   void FinishPreview(int inNumber, std::size_t inProduct) const;
 
+  /// Puts what lies in the drawing folder under these names in its place.
+  void TakeOver(const std::vector<std::string>& inNames) const;
+
   bool Has(const std::string& inName) const;
   /// The name if there is such a picture, as the page refers to it; else empty.
   std::string Reference(const std::string& inName) const;
@@ -51,7 +54,6 @@ class PictureStore {
   std::vector<std::string> ThumbnailsIn(const std::filesystem::path& inFolder, int inNumber) const;
   std::set<std::string> PicturesOf(const std::set<std::string>& inNumbers) const;
   void WriteStamp(const std::string& inStamp, const std::set<std::string>& inNames) const;
-  void TakeOver(const std::vector<std::string>& inNames) const;
 
   std::filesystem::path shownFolder_, folder_;  // as given, absolute
   std::string ending_;

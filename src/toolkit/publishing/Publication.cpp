@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <numeric>
 #include <set>
 #include <unordered_map>
 #include <utility>
@@ -25,6 +26,7 @@
 #include "toolkit/publishing/PictureStore.h"
 #include "toolkit/publishing/PublishedFiles.h"
 #include "toolkit/publishing/ReferredPictures.h"
+#include "toolkit/publishing/SharedDrawing.h"
 #include "toolkit/publishing/WorkFolder.h"
 #include "toolkit/publishing/viewer/GeometryFiles.h"
 #include "toolkit/publishing/viewer/PictureCamera.h"
@@ -100,6 +102,7 @@ class Publication {
     const WorkFolder work(folder_);
     Published made;
     if (!options_.model.empty()) made.failures = Draw(inOpenModel());
+    if (!MakesPage()) return {folder_, published_.interferences.size(), 0, 0};
     published_.data = JsonOf(Data(), review_, ids_, isShown_);
     EditResult();
     const std::string manifest = ManifestText();
@@ -121,6 +124,8 @@ class Publication {
   }
 
  private:
+  bool MakesPage() const { return options_.sharing == nullptr || options_.sharing->MakesPage(); }
+
   /// What became of each interference, and those that the result has no more.
   void Compare(ClashDocument& ioBaseline) {
     published_.baseline = options_.baselineName;
@@ -245,12 +250,16 @@ class Publication {
     if (!wanted.empty()) numbers.insert("0");
     ResolveBaseline(inRoot);
     for (const Before& before : before_) numbers.insert(std::to_string(-before.record.index));
+    overview_ = ShownRep(inRoot);
+    const std::vector<std::size_t> chosen = ChooseItems(wanted, inRoot);
     const std::string stamp = Stamp();
     if (!store.Prepare(stamp, options_.resume, numbers) && options_.warn)
       options_.warn("the pictures that are there show something else: all are drawn");
-    overview_ = ShownRep(inRoot);
-    if (!wanted.empty()) DrawInProcesses(options_.processes, WorkOn(wanted, store));
+    if (options_.sharing != nullptr) options_.sharing->Begin(store);
+    if (!chosen.empty()) DrawInProcesses(options_.processes, WorkOn(wanted, chosen, store));
     store.Settle(stamp);
+    if (options_.sharing != nullptr) options_.sharing->Finish(store);
+    if (!MakesPage()) return 0;
     if (!wanted.empty()) MakeMap(store);
     for (const Before& before : before_)
       (before.isGone ? published_.gone : published_.interferences)[before.position].before =
@@ -265,6 +274,29 @@ class Publication {
     }
     TakeGeometry(scene);
     return failures;
+  }
+
+  /// What there is to draw: the interferences that are wanted, those before them, the overview.
+  std::vector<DrawingItem> Items(const std::vector<std::size_t>& inWanted,
+                                 const ZORIProduct_var& inRoot) const {
+    DrawingCosts costs;
+    std::vector<DrawingItem> items;
+    for (const std::size_t n : inWanted)
+      items.push_back({published_.interferences[n].number, costs.Of(resolved_[n])});
+    for (const Before& before : before_)
+      items.push_back({-before.record.index, costs.Of(before.resolved)});
+    items.push_back({kOverview, costs.OfAll(inRoot)});
+    return items;
+  }
+
+  /// @return the positions among the items of those that are drawn here.
+  std::vector<std::size_t> ChooseItems(const std::vector<std::size_t>& inWanted,
+                                       const ZORIProduct_var& inRoot) const {
+    if (inWanted.empty()) return {};
+    if (options_.sharing != nullptr) return options_.sharing->Choose(Items(inWanted, inRoot));
+    std::vector<std::size_t> all(inWanted.size() + before_.size() + 1);
+    std::iota(all.begin(), all.end(), std::size_t{0});
+    return all;
   }
 
   static ZOR3DRep* ShownRep(const ZORIProduct_var& inProduct) {
@@ -337,23 +369,29 @@ class Publication {
     geometry_ = inScene.Blocks(taken + kLeast < kMaxPage ? kMaxPage - taken : kLeast);
   }
 
-  DrawingWork WorkOn(const std::vector<std::size_t>& inWanted, const PictureStore& inStore) const {
+  void DrawItem(std::size_t inItem, const std::vector<std::size_t>& inWanted,
+                const PictureStore& inStore) const {
+    if (inItem == inWanted.size() + before_.size()) return DrawOverview(inStore);
+    if (inItem >= inWanted.size()) return DrawBefore(before_[inItem - inWanted.size()], inStore);
+    const std::size_t n = inWanted[inItem];
+    try {
+      fs::current_path(inStore.DrawingFolder());
+      PictureDrawing(published_.interferences[n].number, resolved_[n], inStore, options_).Draw();
+    } catch (const std::exception&) {
+      // Its picture is not there, which is what is looked for at the end.
+    }
+  }
+
+  DrawingWork WorkOn(const std::vector<std::size_t>& inWanted,
+                     const std::vector<std::size_t>& inChosen, const PictureStore& inStore) const {
+    const auto all = static_cast<std::size_t>(std::ranges::count_if(
+        inChosen, [&](std::size_t inItem) { return inItem < inWanted.size(); }));
     DrawingWork work;
-    work.count = inWanted.size() + before_.size() + 1;  // the last one is the overview
-    work.draw = [&](std::size_t inWantedIndex) {
-      if (inWantedIndex == inWanted.size() + before_.size()) return DrawOverview(inStore);
-      if (inWantedIndex >= inWanted.size())
-        return DrawBefore(before_[inWantedIndex - inWanted.size()], inStore);
-      const std::size_t n = inWanted[inWantedIndex];
-      try {
-        fs::current_path(inStore.DrawingFolder());
-        PictureDrawing(published_.interferences[n].number, resolved_[n], inStore, options_).Draw();
-      } catch (const std::exception&) {
-        // Its picture is not there, which is what is looked for at the end.
-      }
-    };
-    work.isDone = [&](std::size_t inDone) {
-      if (options_.drawn) options_.drawn(std::min(inDone, inWanted.size()), inWanted.size());
+    work.count = inChosen.size();
+    work.draw = [&](std::size_t inPlace) { DrawItem(inChosen[inPlace], inWanted, inStore); };
+    work.isDone = [this, all](std::size_t inDone) {
+      if (options_.sharing != nullptr) options_.sharing->Drawn(inDone);
+      if (options_.drawn) options_.drawn(std::min(inDone, all), all);
     };
     return work;
   }
@@ -415,7 +453,7 @@ Published Publish(ClashDocument& ioResult, const PublicationOptions& inOptions,
   ioResult.RequireInterferences();
   try {
     std::optional<ZORFoundation::ScratchFolder> scratch;
-    if (inOptions.isOneFile) scratch.emplace();
+    if (inOptions.isOneFile || inOptions.folder.empty()) scratch.emplace();
     return Publication(ioResult, inOptions, scratch ? scratch->Path() : inOptions.folder)
         .Make(inOpenModel);
   } catch (const fs::filesystem_error& error) {

@@ -15,6 +15,8 @@
 
 namespace ZORToolkit {
 
+class SharedDrawing;
+
 /// What is framed where an interference has no viewpoint; values of the setting "PictureZoom".
 enum class PictureZoom { kInterference = 0, kProducts = 1 };
 
@@ -43,6 +45,8 @@ struct PublicationOptions {
   ProductPlaces places = ProductPlaces::kResult;
   int processes = 1;    ///< that draw; at least 1
   bool resume = false;  ///< keep the pictures of a run that was ended early
+  /// Who draws which pictures, where others take part; lives as long as the call. May be null.
+  SharedDrawing* sharing = nullptr;
   /// Told in one line of what is shown otherwise than expected. May be empty.
   std::function<void(const std::string& inWarning)> warn;
   /// Told how many interferences are drawn. May be empty.
@@ -55,7 +59,7 @@ ZOR_TOOLKIT_EXPORT void SetTarget(PublicationOptions& ioOptions, const std::stri
 ZOR_TOOLKIT_EXPORT std::string FileNameOf(const std::string& inPath);
 
 struct Published {
-  std::string page;  ///< path of the page
+  std::string page;  ///< path of the page; of the folder where none was to be made
   std::size_t interferences = 0;
   std::size_t pictures = 0;  ///< interferences with one
   std::size_t failures = 0;  ///< without one although the model has one of their products

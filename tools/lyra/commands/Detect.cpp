@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <charconv>
 #include <chrono>
+#include <cstdlib>
 #include <memory>
 
 #include "lyra/CommandErrors.h"
@@ -11,7 +12,9 @@
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/Model.h"
 #include "lyra/commands/ReviewInput.h"
+#include "lyra/commands/Shares.h"
 #include "lyra/terminal/Progress.h"
+#include "toolkit/sharding/DetectionShare.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -25,7 +28,9 @@ struct DetectOptions {
                                       sheets = "clash";
   std::optional<long long> level, jobs;
   std::vector<std::string> only, ignore, between;
+  bool resume = false;
   ModelReading reading;
+  ShareOptions sharing;
 };
 
 double LengthOf(const char* inOption, const std::string& inText) {
@@ -63,7 +68,10 @@ DetectionOptions ToDetection(const DetectOptions& inOptions) {
   return options;
 }
 
-DetectionResult DetectWithProgress(const DetectOptions& inOptions, DetectionOptions inDetection) {
+/// @param inDetect what is found.
+template <class Finding>
+auto WithProgress(const DetectOptions& inOptions, DetectionOptions inDetection,
+                  const Finding& inDetect) {
   const auto reading = std::make_unique<ProgressLine>("reading " + inOptions.file);
   ProgressLine checking("checking " + inOptions.file);
   std::optional<std::chrono::steady_clock::time_point> start;  // of the first verdict
@@ -77,7 +85,7 @@ DetectionResult DetectWithProgress(const DetectOptions& inOptions, DetectionOpti
                   RateText(done, all, seconds));
     return true;
   };
-  return Detect(inOptions.file, inDetection);
+  return inDetect(inOptions.file, inDetection);
 }
 
 std::string Counted(std::size_t inCount, const char* inOne, const char* inMany) {
@@ -93,13 +101,14 @@ std::string Summary(const DetectionResult& inResult) {
          Counted(inResult.productsChecked, "product", "products") + "\n";
 }
 
-int Run(const DetectOptions& inOptions, Output& ioOutput) {
-  if (inOptions.file == "-") throw InputError("-: a model cannot be read from standard input");
+/// @param inDetect what is found.
+template <class Finding>
+int FindAndWrite(const DetectOptions& inOptions, Output& ioOutput, const Finding& inDetect) {
   const DetectionOptions detection = ToDetection(inOptions);
   std::optional<ReviewInput> previous;
   if (!inOptions.previous.empty()) previous.emplace(inOptions.previous);
   { const OutputFile probe(inOptions.result); }  // fails at once where nothing can be written
-  const DetectionResult result = DetectWithProgress(inOptions, detection);
+  const DetectionResult result = WithProgress(inOptions, detection, inDetect);
   OutputFile file(inOptions.result);
   WriteClashResult(result, DateOfWriting(), file.Path());
   if (previous) file.Check(SettleAsBefore(*previous, file.Path()));
@@ -108,12 +117,74 @@ int Run(const DetectOptions& inOptions, Output& ioOutput) {
   return 0;
 }
 
+/// The share that the options describe, with the files that it is made of.
+ShareManifest ShareOf(const DetectOptions& inOptions, const Shard& inShard) {
+  ShareManifest share = NewShare("detect", inOptions.result, inShard);
+  share.inputs = {ShareInputOf("model", inOptions.file)};
+  if (!inOptions.previous.empty())
+    share.inputs.push_back(ShareInputOf("previous", inOptions.previous));
+  share.options = {{"tolerance", inOptions.tolerance},
+                   {"contact-gap", inOptions.contactGap},
+                   {"clearance", inOptions.clearance},
+                   {"sheets", inOptions.sheets},
+                   {"level", inOptions.level ? std::to_string(*inOptions.level) : ""},
+                   {"only", ListText(inOptions.only)},
+                   {"ignore", ListText(inOptions.ignore)},
+                   {"between", ListText(inOptions.between)},
+                   {"strict", inOptions.reading.isStrict ? "yes" : ""}};
+  return share;
+}
+
+int Run(const DetectOptions& inOptions, Output& ioOutput) {
+  const std::optional<Shard> shard = inOptions.sharing.Get();
+  if (inOptions.resume && !shard) throw UsageError("--resume: only with --shard");
+  if (inOptions.result.empty() && !inOptions.sharing.plan)
+    throw UsageError("detect: -o is required");
+  if (inOptions.file == "-") throw InputError("-: a model cannot be read from standard input");
+  const DetectionOptions detection = ToDetection(inOptions);
+  if (inOptions.sharing.plan)
+    return PrintPlan("detect", WithProgress(inOptions, detection, SampleDetection),
+                     inOptions.sharing, ioOutput);
+  if (!shard) return FindAndWrite(inOptions, ioOutput, Detect);
+  const ShareManifest share = ShareOf(inOptions, *shard);
+  const auto find = [&](const std::string& inModel, const DetectionOptions& inDetection) {
+    return DetectShare(inModel, inDetection, share, inOptions.resume);
+  };
+  ioOutput.Write(ShareLine(share, WithProgress(inOptions, detection, find)));
+  return 0;
+}
+
 }  // namespace
+
+int GatherDetect(const std::vector<ShareManifest>& inShares, const GatherOptions& inOptions,
+                 Output& ioOutput) {
+  const ShareManifest& share = inShares.front();
+  DetectOptions options;
+  options.file = InputOfShares(share, "model", inOptions.model);
+  options.previous = InputOfShares(share, "previous");
+  options.result = inOptions.output;
+  options.tolerance = share.Option("tolerance");
+  options.contactGap = share.Option("contact-gap");
+  options.clearance = share.Option("clearance");
+  options.sheets = share.Option("sheets");
+  if (const std::string level = share.Option("level"); !level.empty())
+    options.level = std::atoll(level.c_str());
+  options.only = ListFrom(share.Option("only"));
+  options.ignore = ListFrom(share.Option("ignore"));
+  options.between = ListFrom(share.Option("between"));
+  options.jobs = inOptions.jobs;
+  options.reading = inOptions.reading;
+  options.reading.isStrict = !share.Option("strict").empty();
+  return FindAndWrite(options, ioOutput,
+                      [&](const std::string& inModel, const DetectionOptions& inDetection) {
+                        return GatherDetection(inModel, inDetection, inShares);
+                      });
+}
 
 VerbAction DeclareDetect(Arguments& ioArguments) {
   const auto options = std::make_shared<DetectOptions>();
   ioArguments.Positional("MODEL", options->file, "A STEP, IGES, glTF, OBJ or STL file");
-  ioArguments.RequiredText("-o,--output", "RESULT", options->result, "The clash result to write");
+  ioArguments.NonEmptyText("-o,--output", "RESULT", options->result, "The clash result to write");
   ioArguments.Text("--tolerance", "MM", options->tolerance,
                    "Products that enter each other deeper than this clash (default: 0.01)");
   ioArguments.Text("--contact-gap", "MM", options->contactGap,
@@ -137,6 +208,9 @@ VerbAction DeclareDetect(Arguments& ioArguments) {
                    "An older result: what was decided there holds here too, as lyra carry does");
   ioArguments.Number("--jobs", "N", options->jobs,
                      "Threads to work with (default: one for each processor)");
+  options->sharing.Declare(ioArguments);
+  ioArguments.Flag("--resume", options->resume,
+                   "Go on with a share that was ended early, or do nothing where it is whole");
   options->reading.Declare(ioArguments);
   return [options](Output& ioOutput) { return Run(*options, ioOutput); };
 }

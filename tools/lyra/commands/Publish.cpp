@@ -1,7 +1,9 @@
 // lyra publish RESULT --model MODEL -o DIR|PAGE.html, lyra extract PAGE.html -o RESULT
 #include <algorithm>
+#include <filesystem>
 #include <fstream>
 #include <memory>
+#include <optional>
 #include <thread>
 
 #include "lyra/CommandErrors.h"
@@ -10,10 +12,12 @@
 #include "lyra/commands/Model.h"
 #include "lyra/commands/Picture.h"
 #include "lyra/commands/ReviewInput.h"
+#include "lyra/commands/Shares.h"
 #include "lyra/terminal/Progress.h"
 #include "lyra/terminal/SafeText.h"
 #include "toolkit/publishing/OneFile.h"
 #include "toolkit/publishing/Publication.h"
+#include "toolkit/sharding/PublicationShare.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -31,7 +35,12 @@ struct PublishOptions {
   std::optional<long long> jobs;
   bool resume = false, verify = false, flat = false;
   ModelReading reading;
+  ShareOptions sharing;
 };
+
+using Opening = std::function<ZORIProduct_var()>;
+/// What is made of a result once everything is read: a page, a share of one, or a plan.
+using Making = std::function<int(ClashDocument&, const PublicationOptions&, const Opening&)>;
 
 int ProcessCount(const PublishOptions& inOptions) {
   if (!inOptions.jobs) return static_cast<int>(std::max(1U, std::thread::hardware_concurrency()));
@@ -44,6 +53,10 @@ PublicationOptions ToolkitOptions(const PublishOptions& inOptions) {
   PublicationOptions options;
   options.filter = FilterOfConditions(inOptions.only);
   SetTarget(options, inOptions.directory);
+  // A share is a folder whatever its name, which says what it is a share of.
+  if (!inOptions.sharing.shard.empty() &&
+      std::filesystem::path(inOptions.directory).extension() == ".html")
+    options.isOneFile = true;
   options.isCompact = inOptions.format.empty() && options.isOneFile;
   const bool isPng = options.isCompact || (!inOptions.format.empty() &&
                                            ChosenWord("--format", inOptions.format, kFormats) == 1);
@@ -73,49 +86,94 @@ int Verify(const PublicationOptions& inOptions, Output& ioOutput) {
   return lines.empty() ? 0 : kChanged;
 }
 
+/// Reads what the options name, and lets it be made.
+int ReadAndMake(const PublishOptions& inOptions, PublicationOptions inPublication,
+                const Making& inMake) {
+  if (!inOptions.baseline.empty()) {
+    inPublication.baselineSource = BytesOfInput(inOptions.baseline);
+    inPublication.baselineName = FileNameOf(inOptions.baseline);
+  }
+  std::optional<ClashDocument> baseline;
+  if (!inOptions.baseline.empty())
+    inPublication.baseline = &baseline.emplace(inOptions.baseline, inPublication.baselineSource);
+  if (!inOptions.baselineModel.empty())
+    inPublication.openBaselineModel = [&] {
+      return OpenModelFile(inOptions.baselineModel, inOptions.reading).root;
+    };
+  ClashDocument document(inOptions.file, inPublication.source);
+  inPublication.warn = [](const std::string& inWarning) {
+    std::fprintf(stderr, "lyra: warning: %s\n", Printable(inWarning).c_str());
+  };
+  std::optional<DrawingProgress> progress;
+  inPublication.drawn = [&](std::size_t inDone, std::size_t inAll) {
+    progress->Show(inDone, inAll);
+  };
+  return inMake(document, inPublication, [&] {
+    const ZORIProduct_var root = OpenModelFile(inOptions.model, inOptions.reading).root;
+    progress.emplace();
+    return root;
+  });
+}
+
+int Report(const Published& inMade, Output& ioOutput) {
+  ioOutput.Write(inMade.page + ": " + std::to_string(inMade.interferences) + " interferences, " +
+                 std::to_string(inMade.pictures) + " with a picture\n");
+  if (inMade.failures > 0)
+    throw InputError(std::to_string(inMade.failures) +
+                     " interferences have no picture: it cannot be drawn or written");
+  return 0;
+}
+
+/// The share that the options describe, with the files that it is made of.
+ShareManifest ShareOf(const PublishOptions& inOptions, const Shard& inShard) {
+  ShareManifest share = NewShare("publish", inOptions.directory, inShard);
+  for (const auto& [role, path] : {std::pair{"result", &inOptions.file},
+                                   {"model", &inOptions.model},
+                                   {"baseline", &inOptions.baseline},
+                                   {"baseline model", &inOptions.baselineModel},
+                                   {"style sheet", &inOptions.styleSheet}}) {
+    if (*path == "-") throw InputError("-: what is shared must be a file");
+    if (!path->empty()) share.inputs.push_back(ShareInputOf(role, *path));
+  }
+  share.options = {{"size", inOptions.size},
+                   {"format", inOptions.format},
+                   {"zoom", inOptions.zoom},
+                   {"positions", inOptions.positions},
+                   {"language", inOptions.language},
+                   {"only", ListText(inOptions.only)},
+                   {"flat", inOptions.flat ? "yes" : ""}};
+  return share;
+}
+
 int Publish(const PublishOptions& inOptions, Output& ioOutput) {
-  if (inOptions.directory.empty() && !inOptions.verify) throw UsageError("publish: -o is required");
+  const std::optional<Shard> shard = inOptions.sharing.Get();
+  if (inOptions.directory.empty() && !inOptions.verify && !inOptions.sharing.plan)
+    throw UsageError("publish: -o is required");
   PublicationOptions options = ToolkitOptions(inOptions);
   inOptions.reading.Check();
   ChooseLanguage(inOptions.language);
-  if (inOptions.directory.empty()) {  // what is there, by itself
+  if (inOptions.verify && inOptions.directory.empty()) {  // what is there, by itself
     options.folder = inOptions.file;
     return Verify(options, ioOutput);
   }
   options.source = BytesOfInput(inOptions.file);
   options.sourceName = FileNameOf(inOptions.file);
-  if (!inOptions.baseline.empty()) {
-    options.baselineSource = BytesOfInput(inOptions.baseline);
-    options.baselineName = FileNameOf(inOptions.baseline);
+  if (inOptions.verify) {
+    if (!inOptions.baseline.empty()) options.baselineSource = BytesOfInput(inOptions.baseline);
+    return Verify(options, ioOutput);
   }
-  if (inOptions.verify) return Verify(options, ioOutput);
-  std::optional<ClashDocument> baseline;
-  if (!inOptions.baseline.empty())
-    options.baseline = &baseline.emplace(inOptions.baseline, options.baselineSource);
-  if (!inOptions.baselineModel.empty())
-    options.openBaselineModel = [&] {
-      return OpenModelFile(inOptions.baselineModel, inOptions.reading).root;
-    };
-  ClashDocument document(inOptions.file, options.source);
-  options.warn = [](const std::string& inWarning) {
-    std::fprintf(stderr, "lyra: warning: %s\n", Printable(inWarning).c_str());
-  };
-  Published made;
-  {
-    std::optional<DrawingProgress> progress;
-    options.drawn = [&](std::size_t inDone, std::size_t inAll) { progress->Show(inDone, inAll); };
-    made = ZORToolkit::Publish(document, options, [&] {
-      const ZORIProduct_var root = OpenModelFile(inOptions.model, inOptions.reading).root;
-      progress.emplace();
-      return root;
-    });
-  }
-  ioOutput.Write(made.page + ": " + std::to_string(made.interferences) + " interferences, " +
-                 std::to_string(made.pictures) + " with a picture\n");
-  if (made.failures > 0)
-    throw InputError(std::to_string(made.failures) +
-                     " interferences have no picture: it cannot be drawn or written");
-  return 0;
+  return ReadAndMake(
+      inOptions, options,
+      [&](ClashDocument& ioDocument, const PublicationOptions& inPublication,
+          const Opening& inOpen) {
+        if (inOptions.sharing.plan)
+          return PrintPlan("publish", SamplePublication(ioDocument, inPublication, inOpen),
+                           inOptions.sharing, ioOutput);
+        if (!shard) return Report(ZORToolkit::Publish(ioDocument, inPublication, inOpen), ioOutput);
+        const ShareManifest share = ShareOf(inOptions, *shard);
+        ioOutput.Write(ShareLine(share, PublishShare(ioDocument, inPublication, share, inOpen)));
+        return 0;
+      });
 }
 
 struct ExtractOptions {
@@ -135,6 +193,38 @@ int Extract(const ExtractOptions& inOptions, Output& ioOutput) {
 }
 
 }  // namespace
+
+int GatherPublish(const std::vector<ShareManifest>& inShares, const GatherOptions& inOptions,
+                  Output& ioOutput) {
+  const ShareManifest& share = inShares.front();
+  PublishOptions options;
+  options.file = InputOfShares(share, "result", inOptions.result);
+  options.model = InputOfShares(share, "model", inOptions.model);
+  options.baseline = InputOfShares(share, "baseline");
+  options.baselineModel = InputOfShares(share, "baseline model");
+  options.styleSheet = InputOfShares(share, "style sheet");
+  options.directory = inOptions.output;
+  options.size = share.Option("size");
+  options.format = share.Option("format");
+  options.zoom = share.Option("zoom");
+  options.positions = share.Option("positions");
+  options.language = share.Option("language");
+  options.only = ListFrom(share.Option("only"));
+  options.flat = !share.Option("flat").empty();
+  options.jobs = inOptions.jobs;
+  options.resume = inOptions.resume;
+  options.reading = inOptions.reading;
+  PublicationOptions publication = ToolkitOptions(options);
+  ChooseLanguage(options.language);
+  publication.source = BytesOfInput(options.file);
+  publication.sourceName = FileNameOf(options.file);
+  return ReadAndMake(options, publication,
+                     [&](ClashDocument& ioDocument, const PublicationOptions& inPublication,
+                         const Opening& inOpen) {
+                       return Report(GatherPublication(ioDocument, inPublication, inShares, inOpen),
+                                     ioOutput);
+                     });
+}
 
 VerbAction DeclareExtract(Arguments& ioArguments) {
   const auto options = std::make_shared<ExtractOptions>();
@@ -181,6 +271,7 @@ VerbAction DeclarePublish(Arguments& ioArguments) {
                    "Leave the geometry of the model out: pictures cannot be turned");
   ioArguments.Flag("--verify", options->verify,
                    "Make nothing; say what has changed since DIR was made (exit code 3)");
+  options->sharing.Declare(ioArguments);
   options->reading.Declare(ioArguments);
   ioArguments.Language(options->language);
   return [options](Output& ioOutput) { return Publish(*options, ioOutput); };
