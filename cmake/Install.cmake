@@ -53,5 +53,5 @@ configure_file(cmake/zorlyra.pc.in ${PROJECT_BINARY_DIR}/generated/zorlyra.pc @O
 install(FILES ${PROJECT_BINARY_DIR}/generated/zorlyra.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig COMPONENT development)
 
 # Scripts for schedulers.
-install(PROGRAMS tools/cluster/lyra-cluster DESTINATION ${resourceDir}/cluster)
-install(FILES tools/cluster/lyra.condor DESTINATION ${resourceDir}/cluster)
+install(PROGRAMS tools/cluster/lyra-cluster DESTINATION ${resourceDir}/cluster COMPONENT command)
+install(FILES tools/cluster/lyra.condor DESTINATION ${resourceDir}/cluster COMPONENT command)

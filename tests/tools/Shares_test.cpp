@@ -91,9 +91,9 @@ class Shares : public testing::Test {
     }
     return folders;
   }
-  CommandResult Gather(Words inFolders, const std::string& inOut) const {
+  CommandResult Gather(Words inFolders, const std::string& inTarget) const {
     std::ranges::reverse(inFolders);
-    return Run({"gather", "-o", inOut}, inFolders);
+    return Run({"gather", "-o", inTarget}, inFolders);
   }
   std::string WhyRefused(const Words& inFolders) const {
     const std::string out = folder_.Path("refused");

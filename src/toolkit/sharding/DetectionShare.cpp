@@ -17,7 +17,7 @@ namespace {
 constexpr char kFindings[] = "findings.bin";
 constexpr std::size_t kTried = 24;
 
-std::string PlanText(const DetectionResult& inResult) {
+std::string HashOfPlan(const DetectionResult& inResult) {
   ZORFoundation::Hash64 hash;
   hash.Add(std::uint64_t{inResult.pairsNear});
   for (const std::uint64_t cost : inResult.work.costs) hash.Add(cost);
@@ -57,7 +57,7 @@ ShareSize DetectShare(const std::string& inModel, DetectionOptions inOptions,
     return (!progress || progress(inDone, inAll)) && !stop.IsMade();
   };
   const DetectionResult result = DetectUntilStopped(inModel, inOptions, stop);
-  inManifest.plan = PlanText(result);
+  inManifest.plan = HashOfPlan(result);
   inManifest.isComplete = !result.isStopped;
   inManifest.held = result.judged;
   ZORFoundation::WriteWholeFile(inManifest.folder + "/" + kFindings, result.findings);

@@ -23,7 +23,7 @@ constexpr char kCameras[] = "cameras.txt", kPictures[] = "pictures/";
 constexpr char kNothing[] = "nothing to draw";
 constexpr std::size_t kTried = 24, kNamesAtOnce = 1000;
 
-std::string PlanText(const std::vector<DrawingItem>& inItems) {
+std::string HashOfPlan(const std::vector<DrawingItem>& inItems) {
   ZORFoundation::Hash64 hash;
   for (const DrawingItem& item : inItems) {
     hash.Add(static_cast<std::uint64_t>(static_cast<std::int64_t>(item.number)));
@@ -57,7 +57,7 @@ class DrawingOfShare : public SharedDrawing {
   explicit DrawingOfShare(ShareManifest& ioManifest) : manifest_(ioManifest) {}
 
   std::vector<std::size_t> Choose(const std::vector<DrawingItem>& inItems) override {
-    manifest_.plan = PlanText(inItems);
+    manifest_.plan = HashOfPlan(inItems);
     const std::vector<std::uint32_t> shares = SharesOf(CostsOf(inItems), manifest_.shard.count);
     std::vector<std::size_t> chosen;
     for (std::size_t i = 0; i < inItems.size(); ++i)
@@ -98,7 +98,7 @@ class DrawingFromShares : public SharedDrawing {
       : shares_(inShares), options_(inOptions) {}
 
   std::vector<std::size_t> Choose(const std::vector<DrawingItem>& inItems) override {
-    if (PlanText(inItems) != shares_.front().plan)
+    if (HashOfPlan(inItems) != shares_.front().plan)
       throw Error(shares_.front().folder + ": the shares were cut otherwise than here");
     hasPictures_ = shares_.front().Option("pictures") == EndingOf(options_);
     if (hasPictures_) return {};
