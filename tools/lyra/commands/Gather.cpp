@@ -9,7 +9,7 @@
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
-#include "lyra/commands/ReviewInput.h"
+#include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/Shares.h"
 #include "lyra/terminal/Table.h"
 
