@@ -9,7 +9,7 @@ using namespace ZORToolkit;
 
 void HashGroups(const std::vector<InterferenceGroup>& inGroups, ResultHash& ioHash) {
   for (const InterferenceGroup& group : inGroups) {
-    ioHash.Add(group.id);
+    ioHash.Add(group.Id());
     ioHash.Add(group.label);
     ioHash.Add(std::uint64_t{group.members.size()});
     HashGroups(group.groups, ioHash);
@@ -91,7 +91,7 @@ Steps GroupWithZORLyra(const Arguments& inArguments) {
   std::vector<InterferenceGroup> groups;
   TimeStep("group", steps, [&] {
     const ReviewedResult result = ReadForReview(*document);
-    groups = GroupInterferences(result, StableIds(result));
+    groups = GroupInterferences(result);
   });
   ResultHash hash;
   HashGroups(groups, hash);

@@ -178,7 +178,7 @@ std::vector<PyGroup> Group(const py::object& inResult,
   {
     const LibraryScope library;
     all = std::make_shared<const std::vector<InterferenceGroup>>(
-        GroupInterferences(loaded->Review(), loaded->Ids(), options));
+        GroupInterferences(loaded->Review(), options));
   }
   return GroupsOf(all, *all);
 }

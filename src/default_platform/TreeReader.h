@@ -37,6 +37,19 @@ class TreeReader {
     }
   }
 
+  // The same step by step, for whoever walks two trees side by side
+  Element FirstElement(Element inParent) const { return ElementFrom(tree_->FirstChild(inParent)); }
+  Element NextElement(Element inElement) const { return ElementFrom(tree_->At(inElement).next); }
+  const DOM_Tree::AttributeRecord* FirstAttribute(Element inElement) const {
+    return AttributeAt(tree_->At(inElement).firstAttribute);
+  }
+  const DOM_Tree::AttributeRecord* Next(const DOM_Tree::AttributeRecord& inAttribute) const {
+    return AttributeAt(inAttribute.next);
+  }
+  const DOM_Text& TextOf(const DOM_Tree::AttributeRecord& inAttribute) const {
+    return *tree_->Text(inAttribute.value);
+  }
+
   /// Calls inVisit(Name, const DOM_Text&) for each attribute in document order. Texts of one
   /// document are Latin-1 where every character fits, so equal ones are equal bytes.
   template <class Visit>
@@ -49,6 +62,15 @@ class TreeReader {
   }
 
  private:
+  Element ElementFrom(DOM_Tree::Node inNode) const {
+    while (inNode != 0 && tree_->At(inNode).kind != DOM_Node::ELEMENT_NODE)
+      inNode = tree_->At(inNode).next;
+    return inNode;
+  }
+  const DOM_Tree::AttributeRecord* AttributeAt(DOM_Tree::Attribute inAttribute) const {
+    return inAttribute == 0 ? nullptr : &tree_->AttributeAt(inAttribute);
+  }
+
   DOM_Node handle_;
   DOM_Tree* tree_;
 };

@@ -50,7 +50,7 @@ class TopicPlanner {
 
   PlannedTopic OfGroup(const InterferenceGroup& inGroup) const {
     PlannedTopic topic;
-    topic.id = inGroup.id;
+    topic.id = inGroup.Id();
     topic.guid = GuidNamed("group " + topic.id);
     topic.groupLabel = inGroup.label;
     topic.members = inGroup.members;
@@ -123,7 +123,7 @@ std::vector<PlannedTopic> PlanTopics(const ReviewedResult& inResult,
   const TopicPlanner planner(inResult, inIds);
   std::vector<PlannedTopic> topics;
   if (inGrouping != nullptr) {
-    for (const InterferenceGroup& group : GroupInterferences(inResult, inIds, *inGrouping))
+    for (const InterferenceGroup& group : GroupInterferences(inResult, *inGrouping))
       topics.push_back(planner.OfGroup(group));
     return topics;
   }

@@ -190,8 +190,7 @@ class WorkbookMaker {
   void WriteGroups() {
     GroupOptions grouping = options_.grouping;
     while (grouping.by.size() > 1) grouping.by.pop_back();
-    std::vector<InterferenceGroup> groups =
-        GroupInterferences(rows_.Result(), rows_.Ids(), grouping);
+    std::vector<InterferenceGroup> groups = GroupInterferences(rows_.Result(), grouping);
     for (InterferenceGroup& group : groups)
       std::erase_if(group.members, [&](int inMember) {
         return !std::binary_search(accepted_.begin(), accepted_.end(), inMember);
@@ -211,7 +210,7 @@ class WorkbookMaker {
       book_->Number(i, 1, static_cast<double>(groups[i].members.size()));
       if (groups[i].worst) book_->Number(i, 2, *groups[i].worst);
       book_->Number(i, 3, groups[i].representative + 1);
-      book_->Text(i, 4, groups[i].id);
+      book_->Text(i, 4, groups[i].Id());
     }
   }
 

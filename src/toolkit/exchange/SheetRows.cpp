@@ -121,7 +121,8 @@ void SheetRows::CountNotCarried(const InterferenceRecord& inRecord) {
   std::size_t what = 0;
   const auto count = [&](bool inIsThere) { notCarried_[what++] += inIsThere ? 1 : 0; };
   count(HasHiddenId(first) || HasHiddenId(second));
-  count(result_.PlacementHash(review, 0) != 0 || result_.PlacementHash(review, 1) != 0);
+  count(result_.HasPlacement(review.productElements[0]) ||
+        result_.HasPlacement(review.productElements[1]));
   count(review.geometry != 0);
   count(HasViewpoint(review));
   count(!review.retrieve.empty());

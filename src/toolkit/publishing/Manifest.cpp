@@ -7,6 +7,7 @@
 
 #include "foundation/ReadWholeFile.h"
 #include "toolkit/publishing/PageLibrary.h"
+#include "toolkit/publishing/PublishedFiles.h"
 #include "toolkit/records/DocumentText.h"
 
 namespace ZORToolkit {
@@ -62,11 +63,11 @@ Manifest ManifestOf(const PublicationOptions& inOptions, const std::string& inPi
   if (!inOptions.model.empty()) manifest.model = HashedFileAt(inOptions.model);
   if (!inOptions.baselineSource.empty())
     manifest.baseline = HashedBytes(inOptions.baselineName, inOptions.baselineSource);
+  const std::string styleSheet = StyleSheetPath(inOptions);
   manifest.settings = {
       {"form", inOptions.isOneFile ? "one file" : "folder"},
       {"only", inOptions.filterText},
-      {"styleSheet",
-       inOptions.styleSheet.empty() ? std::string() : HashedFileAt(inOptions.styleSheet).sha256},
+      {"styleSheet", styleSheet.empty() ? std::string() : HashedFileAt(styleSheet).sha256},
       {"geometry", inOptions.hasGeometry ? "yes" : "no"},
       {"format", inOptions.isCompact ? "WEBP" : FormatName(inOptions.format)},
       {"size", std::to_string(inOptions.size.width) + "x" + std::to_string(inOptions.size.height)},

@@ -18,7 +18,7 @@ Json JsonOf(const std::vector<InterferenceGroup>& inGroups, const ReviewedResult
       if (inIsShown[position]) members.push_back(inResult.interferences[position].index);
     }
     if (members.empty()) continue;
-    Json json = {{"id", group.id},
+    Json json = {{"id", group.Id()},
                  {"by", Name(group.by)},
                  {"label", group.label},
                  {"members", members},
@@ -37,7 +37,7 @@ bool IsKnown(std::string_view inStatus) {
 }  // namespace
 
 std::string JsonOf(const PageData& inData, const ReviewedResult& inResult,
-                   const std::vector<std::string>& inIds, const std::vector<bool>& inIsShown) {
+                   const std::vector<bool>& inIsShown) {
   Json statuses = Json::object();
   for (std::size_t i = 0; i < inResult.interferences.size(); ++i) {
     const ReviewRecord& record = inResult.interferences[i];
@@ -50,7 +50,7 @@ std::string JsonOf(const PageData& inData, const ReviewedResult& inResult,
                      {"oneFile", inData.isOneFile},
                      {"geometry", inData.hasGeometry},
                      {"statuses", statuses},
-                     {"groups", JsonOf(GroupInterferences(inResult, inIds), inResult, inIsShown)}};
+                     {"groups", JsonOf(GroupInterferences(inResult), inResult, inIsShown)}};
   std::string text = json.dump(-1, ' ', true, Json::error_handler_t::replace);
   for (std::size_t at = text.find('<'); at != std::string::npos; at = text.find('<', at))
     text.replace(at, 1, "\\u003c");

@@ -21,7 +21,7 @@ struct PageData {
 /// JSON in ASCII that can stand in a script element.
 /// @param inIsShown of each interference, whether the page has it.
 std::string JsonOf(const PageData& inData, const ReviewedResult& inResult,
-                   const std::vector<std::string>& inIds, const std::vector<bool>& inIsShown);
+                   const std::vector<bool>& inIsShown);
 
 }  // namespace ZORToolkit
 

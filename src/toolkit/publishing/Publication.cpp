@@ -4,7 +4,6 @@
 #include <filesystem>
 #include <numeric>
 #include <set>
-#include <unordered_map>
 #include <utility>
 
 #include "PrintPictures.h"
@@ -19,11 +18,13 @@
 #include "toolkit/publishing/DrawingWorkers.h"
 #include "toolkit/publishing/Manifest.h"
 #include "toolkit/publishing/OneFile.h"
+#include "toolkit/publishing/OwnFiles.h"
 #include "toolkit/publishing/PageData.h"
 #include "toolkit/publishing/PageLibrary.h"
 #include "toolkit/publishing/PictureDrawing.h"
 #include "toolkit/publishing/PictureSettings.h"
 #include "toolkit/publishing/PictureStore.h"
+#include "toolkit/publishing/PublishedComparison.h"
 #include "toolkit/publishing/PublishedFiles.h"
 #include "toolkit/publishing/ReferredPictures.h"
 #include "toolkit/publishing/SharedDrawing.h"
@@ -42,30 +43,6 @@ namespace {
 
 constexpr int kOverview = 0;  // its number among the pictures
 
-/// A word that the reader could not understand is shown as the document has it.
-std::string ShownWord(const std::string& inWord, const std::string& inAsWritten) {
-  if (!inWord.empty() && CaseFolded(inWord) != "error") return inWord;
-  return inAsWritten.empty() ? "Not stated" : inAsWritten;
-}
-
-PublishedInterference PublishedOf(const InterferenceRecord& inRecord) {
-  PublishedInterference published;
-  published.element = inRecord.element;
-  published.number = inRecord.index;
-  published.type = ShownWord(inRecord.type, inRecord.typeAsWritten);
-  published.status = ShownWord(inRecord.status, inRecord.statusAsWritten);
-  for (std::size_t i = 0; i < 2; ++i) published.products[i].element = inRecord.products[i].element;
-  return published;
-}
-
-/// An interference of the baseline that has a picture of its own.
-struct Before {
-  InterferenceRecord record;
-  bool isGone = false;       // the result has it no more
-  std::size_t position = 0;  // among the published ones, or those that are gone
-  ResolvedInterference resolved;
-};
-
 class Publication {
  public:
   /// @param inFolder where the files are made.
@@ -74,7 +51,7 @@ class Publication {
       : result_(ioResult),
         options_(inOptions),
         folder_(inFolder),
-        styleSheet_(inOptions.styleSheet),
+        styleSheet_(inOptions),
         zoom_(inOptions),
         review_(ReadForReview(ioResult)),
         ids_(StableIds(review_)),
@@ -95,15 +72,17 @@ class Publication {
       published_.interferences.push_back(PublishedOf(record));
       published_.interferences.back().id = ids_[static_cast<std::size_t>(record.index - 1)];
     }
-    if (inOptions.baseline != nullptr) Compare(*inOptions.baseline);
+    if (inOptions.baseline != nullptr)
+      before_ = CompareWithBaseline(inOptions, review_, published_);
   }
 
   Published Make(const std::function<ZORIProduct_var()>& inOpenModel) {
     const WorkFolder work(folder_);
+    if (!options_.isOneFile && MakesPage()) RequireOwnFiles(options_, styleSheet_);
     Published made;
     if (!options_.model.empty()) made.failures = Draw(inOpenModel());
     if (!MakesPage()) return {folder_, published_.interferences.size(), 0, 0};
-    published_.data = JsonOf(Data(), review_, ids_, isShown_);
+    published_.data = JsonOf(Data(), review_, isShown_);
     EditResult();
     const std::string manifest = ManifestText();
     const std::string page = MakePageOf(options_, styleSheet_, result_, published_);
@@ -125,46 +104,6 @@ class Publication {
 
  private:
   bool MakesPage() const { return options_.sharing == nullptr || options_.sharing->MakesPage(); }
-
-  /// What became of each interference, and those that the result has no more.
-  void Compare(ClashDocument& ioBaseline) {
-    published_.baseline = options_.baselineName;
-    published_.baselineDocument = &ioBaseline;
-    const ReviewedResult old = ReadForReview(ioBaseline);
-    const ResultDiff diff = Diff(old, review_, options_.comparison);
-    std::unordered_map<int, const DiffEntry*> entryOfNew, entryOfOld;
-    for (const DiffEntry& entry : diff.entries)
-      (entry.newPosition < 0 ? entryOfOld[entry.oldPosition] : entryOfNew[entry.newPosition]) =
-          &entry;
-    std::unordered_map<int, std::size_t> shownOfOld;
-    for (std::size_t n = 0; n < published_.interferences.size(); ++n) {
-      PublishedInterference& published = published_.interferences[n];
-      const auto found = entryOfNew.find(published.number - 1);
-      if (found == entryOfNew.end()) continue;
-      TakeChange(*found->second, published);
-      if (found->second->itsClass == DiffClass::kChanged)
-        shownOfOld.emplace(found->second->oldPosition, n);
-    }
-    ForEachInterference(ioBaseline, RecordPart::kAll, [&](const InterferenceRecord& inRecord) {
-      const auto gone = entryOfOld.find(inRecord.index - 1);
-      const auto shown = shownOfOld.find(inRecord.index - 1);
-      if (gone != entryOfOld.end() && options_.filter.Accepts(inRecord)) {
-        published_.gone.push_back(PublishedOf(inRecord));
-        TakeChange(*gone->second, published_.gone.back());
-        before_.push_back({inRecord, true, published_.gone.size() - 1, {}});
-      } else if (shown != shownOfOld.end()) {
-        before_.push_back({inRecord, false, shown->second, {}});
-      }
-    });
-  }
-
-  static void TakeChange(const DiffEntry& inEntry, PublishedInterference& outPublished) {
-    const bool isComparable = inEntry.itsClass != DiffClass::kNotComparable;
-    outPublished.change = isComparable ? Name(inEntry.itsClass) : "not comparable";
-    outPublished.reason = inEntry.reason;
-    for (const Change& change : inEntry.changes)
-      outPublished.changes.push_back({std::string(change.what), change.from, change.to});
-  }
 
   PageData Data() const {
     PageData data;
@@ -248,7 +187,7 @@ class Publication {
       numbers.insert(std::to_string(published_.interferences[n].number));
     }
     if (!wanted.empty()) numbers.insert("0");
-    ResolveBaseline(inRoot);
+    ResolveBefore(options_, inRoot, before_);
     for (const Before& before : before_) numbers.insert(std::to_string(-before.record.index));
     overview_ = ShownRep(inRoot);
     const std::vector<std::size_t> chosen = ChooseItems(wanted, inRoot);
@@ -302,13 +241,6 @@ class Publication {
   static ZOR3DRep* ShownRep(const ZORIProduct_var& inProduct) {
     const ZORI3DGeoVisu_var visible = inProduct;
     return visible.IsNull() ? nullptr : static_cast<ZOR3DRep*>(visible->GetRep());
-  }
-
-  void ResolveBaseline(const ZORIProduct_var& inRoot) {
-    if (before_.empty()) return;
-    InterferenceScenes scenes(options_.openBaselineModel ? options_.openBaselineModel() : inRoot);
-    for (Before& before : before_) before.resolved = scenes.Resolve(before.record, options_.places);
-    std::erase_if(before_, [](const Before& inBefore) { return !inBefore.resolved.HasProduct(); });
   }
 
   void DrawBefore(const Before& inBefore, const PictureStore& inStore) const {

@@ -17,9 +17,7 @@ namespace fs = std::filesystem;
 namespace ZORToolkit {
 namespace {
 
-constexpr char kReportFile[] = "report.xml";
 constexpr char kReportStyleSheet[] = "clash-report.xsl";
-constexpr char kReportType[] = "clash-report.dtd";
 constexpr std::uint64_t kMaxStyleSheetSize = std::uint64_t{64} << 20;
 
 Page MakePage(const PageRequest& inRequest) {
@@ -53,10 +51,6 @@ std::string StyleSheetOfSetting() {
   return path;
 }
 
-std::string FileNameOf(const PageStyleSheet& inSheet) {
-  return inSheet.path.empty() ? kReportStyleSheet : fs::path(inSheet.path).filename().string();
-}
-
 void WriteReportFile(const ClashDocument& inDocument, const std::string& inStyleSheet,
                      const std::string& inPath, const ZORFoundation::AtomicFileOptions& inOptions) {
   Prologue prologue;
@@ -69,8 +63,16 @@ void WriteReportFile(const ClashDocument& inDocument, const std::string& inStyle
 
 }  // namespace
 
-PageStyleSheet::PageStyleSheet(const std::string& inPath)
-    : path(inPath.empty() ? StyleSheetOfSetting() : inPath) {
+std::string StyleSheetPath(const PublicationOptions& inOptions) {
+  return inOptions.styleSheet.empty() ? StyleSheetOfSetting() : inOptions.styleSheet;
+}
+
+std::string FileNameOf(const PageStyleSheet& inSheet) {
+  return inSheet.path.empty() ? kReportStyleSheet : fs::path(inSheet.path).filename().string();
+}
+
+PageStyleSheet::PageStyleSheet(const PublicationOptions& inOptions)
+    : path(StyleSheetPath(inOptions)) {
   if (path.empty()) return;
   ZORFoundation::ReadOptions limit;
   limit.maxSize = kMaxStyleSheetSize;

@@ -10,16 +10,23 @@
 namespace ZORToolkit {
 
 inline constexpr char kPageFile[] = "index.html";
+inline constexpr char kReportFile[] = "report.xml";
+inline constexpr char kReportType[] = "clash-report.dtd";
+
+/// The style sheet that was asked for, or that of the setting "XslTemplate"; empty: the page's own.
+std::string StyleSheetPath(const PublicationOptions& inOptions);
 
 /// The style sheet that makes the page.
 struct PageStyleSheet {
   /// Raises Error for one that cannot be read or is no style sheet, before anything is drawn.
-  /// @param inPath as PublicationOptions has it.
-  explicit PageStyleSheet(const std::string& inPath);
+  explicit PageStyleSheet(const PublicationOptions& inOptions);
 
   std::string path;  // empty: the page's own
   std::string text;
 };
+
+/// Under which name it lies beside the report.
+std::string FileNameOf(const PageStyleSheet& inSheet);
 
 /// The page of a result. Raises Error.
 std::string MakePageOf(const PublicationOptions& inOptions, const PageStyleSheet& inSheet,

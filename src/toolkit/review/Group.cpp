@@ -8,6 +8,7 @@
 
 #include "toolkit/review/HashInput.h"
 #include "toolkit/review/PlaceClusters.h"
+#include "toolkit/review/StableIds.h"
 
 namespace ZORToolkit {
 namespace {
@@ -72,9 +73,8 @@ class ProductLabels {
 
 class Grouper {
  public:
-  Grouper(const ReviewedResult& inResult, const std::vector<std::string>& inIds,
-          const GroupOptions& inOptions)
-      : result_(inResult), ids_(inIds), options_(inOptions) {
+  Grouper(const ReviewedResult& inResult, const GroupOptions& inOptions)
+      : result_(inResult), options_(inOptions) {
     values_.reserve(result_.interferences.size());
     for (const ReviewRecord& record : result_.interferences)
       values_.push_back(record.value.Value());
@@ -86,7 +86,7 @@ class Grouper {
     }
   }
 
-  std::vector<InterferenceGroup> Run() const {
+  std::vector<InterferenceGroup> Run() {
     std::vector<int> all(result_.interferences.size());
     std::iota(all.begin(), all.end(), 0);
     return Split(all, 0, "");
@@ -110,9 +110,8 @@ class Grouper {
 
   void ReadPlaces() {
     if (!places_.empty()) return;
-    places_.reserve(result_.interferences.size());
-    for (const ReviewRecord& record : result_.interferences)
-      places_.push_back(result_.PlaceOf(record));
+    places_ = PlacesOf(result_);
+    ids_ = StableIdNumbers(result_, places_);
   }
 
   void CountProducts() {
@@ -123,9 +122,14 @@ class Grouper {
   }
 
   std::vector<InterferenceGroup> Split(const std::vector<int>& inMembers, std::size_t inLevel,
-                                       const std::string& inParentId) const {
+                                       std::string_view inParentId) {
     std::vector<InterferenceGroup> groups;
     if (inLevel == options_.by.size()) return groups;
+    if (inMembers.size() == 1) {  // most groups of most results
+      Make({KeyOf(inMembers.front(), inLevel), inMembers.front()}, inMembers, inLevel, inParentId,
+           groups.emplace_back());
+      return groups;
+    }
     std::vector<Keyed> keyed = options_.by[inLevel] == GroupBy::kPlace
                                    ? KeyedByPlace(inMembers)
                                    : KeyedByLabel(inMembers, inLevel);
@@ -133,16 +137,23 @@ class Grouper {
     const std::vector<Bucket> buckets = BucketsOf(keyed);
     groups.reserve(buckets.size());
     for (const Bucket& bucket : buckets) {
-      InterferenceGroup& group = groups.emplace_back();
-      group.by = options_.by[inLevel];
-      group.members.reserve(bucket.end - bucket.begin);
-      for (std::size_t i = bucket.begin; i < bucket.end; ++i)
-        group.members.push_back(keyed[i].member);
-      group.label = LabelOf(keyed[bucket.begin], inLevel);
-      Describe(group, inParentId);
-      group.groups = Split(group.members, inLevel + 1, group.id);
+      std::vector<int> members;
+      members.reserve(bucket.end - bucket.begin);
+      for (std::size_t i = bucket.begin; i < bucket.end; ++i) members.push_back(keyed[i].member);
+      Make(keyed[bucket.begin], std::move(members), inLevel, inParentId, groups.emplace_back());
     }
     return groups;
+  }
+
+  /// @param inFirst the first of its members.
+  void Make(const Keyed& inFirst, std::vector<int> inMembers, std::size_t inLevel,
+            std::string_view inParentId, InterferenceGroup& outGroup) {
+    outGroup.by = options_.by[inLevel];
+    outGroup.members = std::move(inMembers);
+    outGroup.label = LabelOf(inFirst, inLevel);
+    Describe(outGroup, inParentId);
+    if (inLevel + 1 < options_.by.size())
+      outGroup.groups = Split(outGroup.members, inLevel + 1, outGroup.Id());
   }
 
   /// The largest first; of equal size the worst, then that whose first member comes first.
@@ -173,30 +184,35 @@ class Grouper {
     return places_[static_cast<std::size_t>(inPosition)];
   }
 
-  /// By the numbers of both labels, the lesser first; by the product that has more interferences by
-  /// that alone.
   std::vector<Keyed> KeyedByLabel(const std::vector<int>& inMembers, std::size_t inLevel) const {
-    const ProductLabels& labels = labels_[inLevel];
     std::vector<Keyed> keyed;
     keyed.reserve(inMembers.size());
-    for (const int member : inMembers) {
-      const std::array<int, 2>& products = Record(member).products;
-      std::uint64_t numbers[2] = {0, 0};
-      for (std::size_t i = 0; i < 2; ++i)
-        numbers[i] = static_cast<std::uint64_t>(labels.NumberOf(products[i]));
-      if (options_.by[inLevel] == GroupBy::kProduct) {
-        const auto order = [&](std::size_t inProduct) {
-          const int product = products[inProduct];
-          const int count = product < 0 ? -1 : counts_[static_cast<std::size_t>(product)];
-          return std::pair(-count, numbers[inProduct]);
-        };
-        keyed.push_back({order(0) < order(1) ? numbers[0] : numbers[1], member});
-      } else {
-        keyed.push_back(
-            {std::min(numbers[0], numbers[1]) << 32 | std::max(numbers[0], numbers[1]), member});
-      }
-    }
+    for (const int member : inMembers) keyed.push_back({LabelKeyOf(member, inLevel), member});
     return keyed;
+  }
+
+  /// The numbers of both labels, the lesser first; by product that of the one that has more
+  /// interferences alone.
+  std::uint64_t LabelKeyOf(int inMember, std::size_t inLevel) const {
+    const ProductLabels& labels = labels_[inLevel];
+    const std::array<int, 2>& products = Record(inMember).products;
+    std::uint64_t numbers[2] = {0, 0};
+    for (std::size_t i = 0; i < 2; ++i)
+      numbers[i] = static_cast<std::uint64_t>(labels.NumberOf(products[i]));
+    if (options_.by[inLevel] != GroupBy::kProduct)
+      return std::min(numbers[0], numbers[1]) << 32 | std::max(numbers[0], numbers[1]);
+    const auto order = [&](std::size_t inProduct) {
+      const int product = products[inProduct];
+      const int count = product < 0 ? -1 : counts_[static_cast<std::size_t>(product)];
+      return std::pair(-count, numbers[inProduct]);
+    };
+    return order(0) < order(1) ? numbers[0] : numbers[1];
+  }
+
+  /// Of a member that is alone.
+  std::uint64_t KeyOf(int inMember, std::size_t inLevel) const {
+    if (options_.by[inLevel] != GroupBy::kPlace) return LabelKeyOf(inMember, inLevel);
+    return PlaceOf(inMember) ? 0 : kNoPlace;
   }
 
   std::vector<Keyed> KeyedByPlace(const std::vector<int>& inMembers) const {
@@ -220,16 +236,29 @@ class Grouper {
       return labels_[inLevel].Text(static_cast<std::uint32_t>(inNumber));
     };
     if (by == GroupBy::kProduct) return std::string(text(inFirst.key));
-    if (by != GroupBy::kPlace)
-      return std::string(text(inFirst.key >> 32)).append(" x ").append(text(inFirst.key));
+    if (by != GroupBy::kPlace) {
+      const std::string_view low = text(inFirst.key >> 32), high = text(inFirst.key);
+      std::string label;
+      label.reserve(low.size() + high.size() + 3);
+      return label.append(low).append(" x ").append(high);
+    }
     if (inFirst.key == kNoPlace) return "no place";
-    std::string label = "place " + std::to_string(inFirst.key + 1) + ", near";
+    std::string label;
+    label.reserve(48);
+    label.append("place ").append(std::to_string(inFirst.key + 1)).append(", near");
     for (const double coordinate : *PlaceOf(inFirst.member))
-      label.append(1, ' ').append(Number(std::round(coordinate) + 0.0).text);
+      label.append(1, ' ').append(RoundedText(coordinate));
     return label;
   }
 
-  void Describe(InterferenceGroup& ioGroup, const std::string& inParentId) const {
+  static std::string RoundedText(double inNumber) {
+    constexpr double kPlain = 100'000;  // below it a number needs no exponent
+    const double rounded = std::round(inNumber) + 0.0;
+    return std::abs(rounded) < kPlain ? std::to_string(static_cast<int>(rounded))
+                                      : Number(rounded).text;
+  }
+
+  void Describe(InterferenceGroup& ioGroup, std::string_view inParentId) {
     for (const int member : ioGroup.members) {
       const std::optional<double>& value = ValueOf(member);
       if (ioGroup.representative < 0 || (value && (!ioGroup.worst || *value < *ioGroup.worst)))
@@ -237,25 +266,22 @@ class Grouper {
       if (value) ioGroup.worst = std::min(*value, ioGroup.worst.value_or(*value));
     }
     // What is grouped by place has no other name than its interferences.
-    std::string_view identity = ioGroup.label;
-    if (ioGroup.by == GroupBy::kPlace) identity = LeastId(ioGroup.members);
-    HashInput input;
-    for (const std::string_view text :
-         {std::string_view(inParentId), std::string_view(Name(ioGroup.by)), identity})
-      input.AddText(text);
-    ioGroup.id = ZORFoundation::HexText(input.Hash());
+    input_.Clear();
+    input_.AddText(inParentId);
+    input_.AddText(Name(ioGroup.by));
+    input_.AddText(ioGroup.by == GroupBy::kPlace ? LeastId(ioGroup.members) : ioGroup.label);
+    ioGroup.number = input_.Hash();
   }
 
-  std::string_view LeastId(const std::vector<int>& inMembers) const {
-    const auto id = [&](int inMember) -> std::string_view {
-      return ids_[static_cast<std::size_t>(inMember)];
-    };
-    return id(*std::ranges::min_element(inMembers, {}, id));
+  std::string LeastId(const std::vector<int>& inMembers) const {
+    const auto id = [&](int inMember) { return ids_[static_cast<std::size_t>(inMember)]; };
+    return ZORFoundation::HexText(id(*std::ranges::min_element(inMembers, {}, id)));
   }
 
   const ReviewedResult& result_;
-  const std::vector<std::string>& ids_;
   const GroupOptions& options_;
+  std::vector<std::uint64_t> ids_;  // of the interferences, where they are grouped by place
+  HashInput input_;
   std::vector<ProductLabels> labels_;  // of each level; none of places
   std::vector<std::optional<double>> values_;
   std::vector<std::optional<Position>> places_;
@@ -269,16 +295,17 @@ const char* Name(GroupBy inBy) {
   return kNames[static_cast<std::size_t>(inBy)];
 }
 
+std::string InterferenceGroup::Id() const { return ZORFoundation::HexText(number); }
+
 std::vector<InterferenceGroup> GroupInterferences(const ReviewedResult& inResult,
-                                                  const std::vector<std::string>& inIds,
                                                   const GroupOptions& inOptions) {
-  return Grouper(inResult, inIds, inOptions).Run();
+  return Grouper(inResult, inOptions).Run();
 }
 
 const InterferenceGroup* FindGroup(const std::vector<InterferenceGroup>& inGroups,
                                    const std::string& inId) {
   for (const InterferenceGroup& group : inGroups) {
-    if (group.id == inId) return &group;
+    if (group.Id() == inId) return &group;
     if (const InterferenceGroup* const inner = FindGroup(group.groups, inId)) return inner;
   }
   return nullptr;

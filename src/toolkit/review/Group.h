@@ -23,22 +23,23 @@ struct GroupOptions {
   double distance = 50;  ///< of kPlace; millimetres
 };
 
-struct InterferenceGroup {
-  std::string id;  ///< 16 hexadecimal digits; the same as long as what it is grouped by is
+struct ZOR_TOOLKIT_EXPORT InterferenceGroup {
+  std::uint64_t number = 0;  ///< the identifier
   GroupBy by = GroupBy::kParts;
   std::string label;            ///< for a person
   std::vector<int> members;     ///< positions in ReviewedResult::interferences, ascending
   int representative = -1;      ///< the member of the worst value; of several the first
   std::optional<double> worst;  ///< the least value of its members: the deepest penetration
   std::vector<InterferenceGroup> groups;
+
+  /// 16 hexadecimal digits; the same as long as what it is grouped by is.
+  std::string Id() const;
 };
 
 /// Every interference is in exactly one group of each level. The largest group comes first; of equal
 /// size the worst, then the one whose first member comes first. Deterministic, n log n.
-/// @param inIds those of StableIds.
 ZOR_TOOLKIT_EXPORT std::vector<InterferenceGroup> GroupInterferences(
-    const ReviewedResult& inResult, const std::vector<std::string>& inIds,
-    const GroupOptions& inOptions = {});
+    const ReviewedResult& inResult, const GroupOptions& inOptions = {});
 
 /// The group of an identifier among these and those inside them; null when there is none.
 ZOR_TOOLKIT_EXPORT const InterferenceGroup* FindGroup(

@@ -65,12 +65,24 @@ class PairMatcher {
   }
 
   /// By the texts of placements and points, without understanding them.
-  bool IsAtSamePlace(const Item& inOld, const Item& inNew) {
+  bool IsAtSamePlace(const Item& inOld, const Item& inNew) const {
     const ReviewRecord &was = Old(inOld), &is = New(inNew);
     const std::size_t swap = inOld.first == inNew.first ? 0 : 1;
-    return old_.PlacementHash(was, 0) == new_.PlacementHash(is, swap) &&
-           old_.PlacementHash(was, 1) == new_.PlacementHash(is, 1 - swap) &&
-           (geometry_ = old_.GeometryHash(was)) == new_.GeometryHash(is);
+    return StandsAlike(was, 0, is, swap) && StandsAlike(was, 1, is, 1 - swap) &&
+           old_.HasPointsOf(was, new_, is);
+  }
+
+  /// The first placement of a product has been compared already.
+  bool StandsAlike(const ReviewRecord& inOld, std::size_t inOldProduct, const ReviewRecord& inNew,
+                   std::size_t inNewProduct) const {
+    const int was = inOld.products[inOldProduct], is = inNew.products[inNewProduct];
+    if (was < 0 || is < 0) return was == is;
+    const ElementNumber from = inOld.productElements[inOldProduct];
+    const ElementNumber to = inNew.productElements[inNewProduct];
+    if (old_.products[static_cast<std::size_t>(was)].element == from &&
+        new_.products[static_cast<std::size_t>(is)].element == to)
+      return match_.productsOfOld[static_cast<std::size_t>(was)].isUnmoved;
+    return old_.HasPlacementOf(from, new_, to);
   }
 
   static Places PlacesOf(const ReviewedResult& inResult, const Item& inItem) {
@@ -175,7 +187,7 @@ class PairMatcher {
 
   /// The only ones of their pair, where all is where it was.
   void SetUnmoved(const Item& inOld, const Item& inNew) {
-    const bool hasPlace = geometry_ != 0;
+    const bool hasPlace = old_.HasPoints(Old(inOld));
     std::string_view reason =
         hasPlace ? "same products, same place" : "same products, the only one of the pair";
     const std::string products = ReasonOfProducts(Old(inOld));
@@ -231,7 +243,6 @@ class PairMatcher {
   std::map<std::string_view, int> types_;
   Items olds_, news_;
   std::vector<Places> oldPlaces_, newPlaces_;  // of these
-  std::uint64_t geometry_ = 0;                 // a hash of that of the old one
   double motion_ = 0;                          // of the second product against the first
   bool stands_ = false;                        // neither product moved
 };

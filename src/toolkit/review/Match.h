@@ -21,7 +21,8 @@ struct ResultMatch {
   struct Partner {
     int position = -1;        ///< in the other result, -1 for none
     std::string_view reason;  ///< why this one, or why none; lives as long as the match
-    bool isUnmoved = false;   ///< placements and points of an interference are written alike
+    /// Its placement, or the placements and points of an interference, are written alike.
+    bool isUnmoved = false;
   };
   std::vector<Partner> productsOfOld, productsOfNew;
   std::vector<Partner> interferencesOfOld, interferencesOfNew;

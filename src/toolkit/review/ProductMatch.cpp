@@ -51,8 +51,9 @@ class ProductMatcher {
   }
 
   void Set(int inOld, int inNew, std::string_view inReason) {
-    match_.productsOfOld[static_cast<std::size_t>(inOld)] = {inNew, inReason};
-    match_.productsOfNew[static_cast<std::size_t>(inNew)] = {inOld, inReason};
+    const bool isUnmoved = old_.HasPlacementOf(Old(inOld).element, new_, New(inNew).element);
+    match_.productsOfOld[static_cast<std::size_t>(inOld)] = {inNew, inReason, isUnmoved};
+    match_.productsOfNew[static_cast<std::size_t>(inNew)] = {inOld, inReason, isUnmoved};
   }
 
   void ByKey() {
@@ -138,7 +139,7 @@ class ProductMatcher {
     for (std::size_t i = 0; i < match_.productsOfOld.size(); ++i) {
       const int partner = match_.productsOfOld[i].position;
       const ReviewProduct& product = old_.products[i];
-      if (partner < 0 || product.part.empty()) continue;
+      if (partner < 0 || match_.productsOfOld[i].isUnmoved || product.part.empty()) continue;
       if (motions_.OfProduct(static_cast<int>(i), partner) <= inTolerance) continue;
       oldAt.emplace(spotOf(product, *old_.PlacementOf(product.element)), static_cast<int>(i));
     }
@@ -194,28 +195,27 @@ std::string Millimetres(double inLength) {
 }
 
 double Motions::Of(ElementNumber inOld, ElementNumber inNew) const {
+  if (old_.HasPlacementOf(inOld, new_, inNew)) return 0;
   const std::optional<Placement> was = old_.PlacementOf(inOld), is = new_.PlacementOf(inNew);
   if (!was || !is || *was == *is) return 0;
   return FrameDistance(FrameOf(*was), FrameOf(*is));
 }
 
 double Motions::OfProduct(int inOld, int inNew) const {
-  if (old_.PlacementHash(inOld) == new_.PlacementHash(inNew)) return 0;
   return Of(old_.products[static_cast<std::size_t>(inOld)].element,
             new_.products[static_cast<std::size_t>(inNew)].element);
 }
 
 double Motions::Of(const ReviewRecord& inOld, std::size_t inOldProduct, const ReviewRecord& inNew,
                    std::size_t inNewProduct) const {
-  if (old_.PlacementHash(inOld, inOldProduct) == new_.PlacementHash(inNew, inNewProduct)) return 0;
   return Of(inOld.productElements[inOldProduct], inNew.productElements[inNewProduct]);
 }
 
 double Motions::Relative(const ReviewRecord& inOld, const ReviewRecord& inNew,
                          bool inIsSwapped) const {
   const std::size_t first = inIsSwapped ? 1 : 0;
-  if (old_.PlacementHash(inOld, 0) == new_.PlacementHash(inNew, first) &&
-      old_.PlacementHash(inOld, 1) == new_.PlacementHash(inNew, 1 - first))
+  if (old_.HasPlacementOf(inOld.productElements[0], new_, inNew.productElements[first]) &&
+      old_.HasPlacementOf(inOld.productElements[1], new_, inNew.productElements[1 - first]))
     return 0;
   const auto oldFirst = old_.PlacementOf(inOld.productElements[0]);
   const auto oldSecond = old_.PlacementOf(inOld.productElements[1]);

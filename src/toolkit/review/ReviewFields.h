@@ -36,7 +36,7 @@ auto ValueOf(Maker& m, const IdentifiedEntry& inIdentified) {
 template <class Maker>
 typename Maker::Value ValueOf(Maker& m, const InterferenceGroup& inGroup) {
   return m.Object(
-      "id", m.Text(inGroup.id), "by", m.Text(Name(inGroup.by)), "label", m.Text(inGroup.label),
+      "id", m.Text(inGroup.Id()), "by", m.Text(Name(inGroup.by)), "label", m.Text(inGroup.label),
       "size", m.Integer(static_cast<long long>(inGroup.members.size())), "members",
       m.Array(inGroup.members, [&](int inPosition) { return m.Integer(inPosition + 1); }),
       "representative", m.Integer(inGroup.representative + 1), "worst",

@@ -90,11 +90,14 @@ struct ZOR_TOOLKIT_EXPORT ReviewedResult {
   std::optional<Placement> PlacementOf(ElementNumber inProduct) const;
   /// The mean of its points.
   std::optional<Position> PlaceOf(const ReviewRecord& inRecord) const;
-  /// Hashes of the texts of a product's placement and of an interference's points: equal ones are
-  /// equal, different ones may still be the same numbers. 0 where there are none.
-  std::uint64_t PlacementHash(const ReviewRecord& inRecord, std::size_t inProduct) const;
-  std::uint64_t PlacementHash(int inProduct) const;  ///< of the first placement of a product
-  std::uint64_t GeometryHash(const ReviewRecord& inRecord) const;
+  bool HasPoints(const ReviewRecord& inRecord) const;
+  bool HasPlacement(ElementNumber inProduct) const;  ///< whole or not
+  /// Whether the placements of two products, or the points of two interferences, are written alike:
+  /// then they are the same; others may still be the same numbers.
+  bool HasPlacementOf(ElementNumber inProduct, const ReviewedResult& inOther,
+                      ElementNumber inOtherProduct) const;
+  bool HasPointsOf(const ReviewRecord& inRecord, const ReviewedResult& inOther,
+                   const ReviewRecord& inOtherRecord) const;
   /// The position of a product of another result that is the same by identifier, -1 for none.
   /// @param inProduct a position in that result.
   /// @param inGuess a position in this one that is likely.

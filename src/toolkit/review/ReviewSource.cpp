@@ -116,6 +116,10 @@ std::optional<double> PlainNumber(std::string_view inText) {
 
 std::optional<double> NumberIn(StoredText inText) {
   if (inText == nullptr) return std::nullopt;
+  if (inText->head == 1) {  // one narrow character: most numbers of a rotation
+    const int digit = *inText->Latin1() - '0';
+    if (digit >= 0 && digit <= 9) return digit;
+  }
   const TextView view = inText->View();
   if (view.IsWide()) return Number(EncodedUnits(view.Units())).value;
   const std::optional<double> plain = PlainNumber(view.Latin1());
@@ -209,38 +213,67 @@ void ReviewSource::Add(const ProductKey& inKey) {
 
 // ---- geometry
 
-std::uint64_t ReviewSource::PlacementHash(Element inProduct) const {
-  std::uint64_t hash = 0;
-  ForEachChild(inProduct, [&](Element inMatrix, Named inNamed) {
-    if (inNamed != Named::kMatrix) return;
-    hash = Mix(hash, 1);
-    ForEachChild(inMatrix, [&](Element inPart, Named inPartNamed) {
-      hash = Mix(hash, static_cast<std::uint64_t>(inPartNamed));
-      ForEachAttribute(inPart, [&](Named inAttribute, StoredText inText) {
-        hash = Mix(hash, HashOf(inText) + static_cast<std::uint64_t>(inAttribute));
-      });
-    });
-  });
-  return hash;
+ReviewSource::Element ReviewSource::NextNamed(Element inElement, Named inName) const {
+  while (inElement != 0 && Meaning(tree_.NameOf(inElement)) != inName)
+    inElement = tree_.NextElement(inElement);
+  return inElement;
 }
 
-std::uint64_t ReviewSource::FirstPlacementHash(int inProduct, Element inElement) const {
-  placementHashes_.resize(products_.size());
-  std::uint64_t& hash = placementHashes_[static_cast<std::size_t>(inProduct)];
-  if (hash == 0) hash = PlacementHash(inElement);
-  return hash;
+bool ReviewSource::HasAttributesOf(Element inElement, const ReviewSource& inOther,
+                                   Element inOtherElement) const {
+  const auto* at = tree_.FirstAttribute(inElement);
+  const auto* other = inOther.tree_.FirstAttribute(inOtherElement);
+  for (; at != nullptr && other != nullptr;
+       at = tree_.Next(*at), other = inOther.tree_.Next(*other))
+    if (Meaning(at->name) != inOther.Meaning(other->name) ||
+        !ZORToolkit::IsSame(&tree_.TextOf(*at), &inOther.tree_.TextOf(*other)))
+      return false;
+  return at == other;
 }
 
-std::uint64_t ReviewSource::PointsHash(Element inGeometry) const {
-  std::uint64_t hash = 0;
-  ForEachChild(inGeometry, [&](Element inPoint, Named inNamed) {
-    if (inNamed != Named::kPoint) return;
-    hash = Mix(hash, 1);
-    ForEachAttribute(inPoint, [&](Named inAttribute, StoredText inText) {
-      hash = Mix(hash, HashOf(inText) + static_cast<std::uint64_t>(inAttribute));
-    });
+/// By the child elements, what they are and their attributes.
+bool ReviewSource::HasPartsOf(Element inElement, const ReviewSource& inOther,
+                              Element inOtherElement) const {
+  Element part = tree_.FirstElement(inElement);
+  Element other = inOther.tree_.FirstElement(inOtherElement);
+  for (; part != 0 && other != 0;
+       part = tree_.NextElement(part), other = inOther.tree_.NextElement(other))
+    if (Meaning(tree_.NameOf(part)) != inOther.Meaning(inOther.tree_.NameOf(other)) ||
+        !HasAttributesOf(part, inOther, other))
+      return false;
+  return part == other;
+}
+
+bool ReviewSource::HasPlacementOf(Element inProduct, const ReviewSource& inOther,
+                                  Element inOtherProduct) const {
+  Element matrix = FirstNamed(inProduct, Named::kMatrix);
+  Element other = inOther.FirstNamed(inOtherProduct, Named::kMatrix);
+  for (; matrix != 0 && other != 0;
+       matrix = Following(matrix, Named::kMatrix), other = inOther.Following(other, Named::kMatrix))
+    if (!HasPartsOf(matrix, inOther, other)) return false;
+  return matrix == other;
+}
+
+bool ReviewSource::HasPoints(const ReviewRecord& inRecord) const {
+  bool hasPoints = false;
+  ForEachGeometry(inRecord, [&](Element inGeometry) {
+    hasPoints = hasPoints || FirstNamed(inGeometry, Named::kPoint) != 0;
   });
-  return hash;
+  return hasPoints;
+}
+
+bool ReviewSource::HasPointsOf(const ReviewRecord& inRecord, const ReviewSource& inOther,
+                               const ReviewRecord& inOtherRecord) const {
+  if (inRecord.hasMoreGeometry || inOtherRecord.hasMoreGeometry)
+    return false;  // compared by numbers
+  if (inRecord.geometry == 0 || inOtherRecord.geometry == 0)
+    return inRecord.geometry == inOtherRecord.geometry;
+  Element point = FirstNamed(inRecord.geometry, Named::kPoint);
+  Element other = inOther.FirstNamed(inOtherRecord.geometry, Named::kPoint);
+  for (; point != 0 && other != 0;
+       point = Following(point, Named::kPoint), other = inOther.Following(other, Named::kPoint))
+    if (!HasAttributesOf(point, inOther, other)) return false;
+  return point == other;
 }
 
 /// The three attributes from inFirst on.
@@ -330,26 +363,23 @@ std::optional<Position> ReviewedResult::PlaceOf(const ReviewRecord& inRecord) co
   return source->PlaceOf(inRecord);
 }
 
-std::uint64_t ReviewedResult::PlacementHash(int inProduct) const {
-  return source->FirstPlacementHash(inProduct,
-                                    products[static_cast<std::size_t>(inProduct)].element);
+bool ReviewedResult::HasPlacementOf(ElementNumber inProduct, const ReviewedResult& inOther,
+                                    ElementNumber inOtherProduct) const {
+  if (inProduct == 0 || inOtherProduct == 0) return inProduct == inOtherProduct;
+  return source->HasPlacementOf(inProduct, *inOther.source, inOtherProduct);
 }
 
-std::uint64_t ReviewedResult::PlacementHash(const ReviewRecord& inRecord,
-                                            std::size_t inProduct) const {
-  const int product = inRecord.products[inProduct];
-  if (product < 0) return 0;
-  const ElementNumber element = inRecord.productElements[inProduct];
-  if (products[static_cast<std::size_t>(product)].element == element) return PlacementHash(product);
-  return source->PlacementHash(element);
+bool ReviewedResult::HasPlacement(ElementNumber inProduct) const {
+  return inProduct != 0 && source->HasPlacement(inProduct);
 }
 
-std::uint64_t ReviewedResult::GeometryHash(const ReviewRecord& inRecord) const {
-  std::uint64_t hash = 0;
-  source->ForEachGeometry(inRecord, [&](ElementNumber inGeometry) {
-    hash = Mix(hash, source->PointsHash(inGeometry));
-  });
-  return hash;
+bool ReviewedResult::HasPoints(const ReviewRecord& inRecord) const {
+  return source->HasPoints(inRecord);
+}
+
+bool ReviewedResult::HasPointsOf(const ReviewRecord& inRecord, const ReviewedResult& inOther,
+                                 const ReviewRecord& inOtherRecord) const {
+  return source->HasPointsOf(inRecord, *inOther.source, inOtherRecord);
 }
 
 int ReviewedResult::FindProduct(const ReviewedResult& inOther, int inProduct, int inGuess) const {

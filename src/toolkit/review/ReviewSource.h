@@ -109,10 +109,14 @@ class ReviewSource {
   int ProductCount() const { return static_cast<int>(products_.size()); }
 
   // Geometry
-  std::uint64_t PlacementHash(Element inProduct) const;
+  /// Whether the placements of two products, or the points of two interferences, are written alike:
+  /// then they are the same; others may still be the same numbers.
+  bool HasPlacementOf(Element inProduct, const ReviewSource& inOther, Element inOtherProduct) const;
+  bool HasPoints(const ReviewRecord& inRecord) const;
+  bool HasPlacement(Element inProduct) const { return FirstNamed(inProduct, Named::kMatrix) != 0; }
+  bool HasPointsOf(const ReviewRecord& inRecord, const ReviewSource& inOther,
+                   const ReviewRecord& inOtherRecord) const;
   std::optional<Placement> PlacementOf(Element inProduct) const;
-  /// Of one "GeometricAspect".
-  std::uint64_t PointsHash(Element inGeometry) const;
   /// Calls inVisit(Element) for each "GeometricAspect" of an interference.
   template <class Visit>
   void ForEachGeometry(const ReviewRecord& inRecord, const Visit& inVisit) const {
@@ -125,13 +129,21 @@ class ReviewSource {
     });
   }
   std::optional<Position> PlaceOf(const ReviewRecord& inRecord) const;
-  /// That of the first placement of a product, worked out once.
-  std::uint64_t FirstPlacementHash(int inProduct, Element inElement) const;
 
  private:
   Named Meaning(ZORDefault::TreeReader::Name inName) const {
     return inName < meanings_.size() ? meanings_[inName] : Named::kOther;
   }
+  Element NextNamed(Element inElement, Named inName) const;
+  Element FirstNamed(Element inParent, Named inName) const {
+    return NextNamed(tree_.FirstElement(inParent), inName);
+  }
+  Element Following(Element inElement, Named inName) const {
+    return NextNamed(tree_.NextElement(inElement), inName);
+  }
+  bool HasAttributesOf(Element inElement, const ReviewSource& inOther,
+                       Element inOtherElement) const;
+  bool HasPartsOf(Element inElement, const ReviewSource& inOther, Element inOtherElement) const;
   bool ReadTriple(Element inElement, Named inFirst, double* outTriple) const;
   std::optional<Placement> PlacementIn(Element inMatrix) const;
   static bool IsSame(const ProductKey& inA, const ProductKey& inB);
@@ -143,7 +155,6 @@ class ReviewSource {
   char* free_ = nullptr;
   std::size_t room_ = 0;
   std::vector<ProductKey> products_;
-  mutable std::vector<std::uint64_t> placementHashes_;  // of products; 0 where not worked out yet
   // Open addressing, a power of two; a position and one, and the upper half of the hash.
   struct Slot {
     std::uint32_t tag = 0, product = 0;

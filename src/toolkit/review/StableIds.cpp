@@ -19,13 +19,14 @@ class Identifier {
     return input_.Hash();
   }
 
-  std::uint64_t OfInterference(const ReviewRecord& inRecord) {
+  /// @param inWorld its place.
+  std::uint64_t OfInterference(const ReviewRecord& inRecord,
+                               const std::optional<Position>& inWorld) {
     const std::size_t frame = AddPair(inRecord);
-    const std::optional<Position> world = result_.PlaceOf(inRecord);
-    if (!world) return input_.Hash();
-    std::optional<Point3> place = PlaceInFrame(result_, inRecord.productElements[frame], *world);
-    if (!place) place = PlaceInFrame(result_, inRecord.productElements[1 - frame], *world);
-    if (!place) place = ToPoint(*world);
+    if (!inWorld) return input_.Hash();
+    std::optional<Point3> place = PlaceInFrame(result_, inRecord.productElements[frame], *inWorld);
+    if (!place) place = PlaceInFrame(result_, inRecord.productElements[1 - frame], *inWorld);
+    if (!place) place = ToPoint(*inWorld);
     if (ZORFoundation::IsFinite(*place))
       for (const double coordinate : {place->x, place->y, place->z})
         input_.Add(static_cast<std::uint64_t>(Cell(coordinate)));
@@ -58,32 +59,55 @@ class Identifier {
 
 }  // namespace
 
-std::vector<std::string> StableIds(const ReviewedResult& inResult) {
+std::vector<std::optional<Position>> PlacesOf(const ReviewedResult& inResult) {
+  std::vector<std::optional<Position>> places;
+  places.reserve(inResult.interferences.size());
+  for (const ReviewRecord& record : inResult.interferences)
+    places.push_back(inResult.PlaceOf(record));
+  return places;
+}
+
+std::vector<std::uint64_t> StableIdNumbers(const ReviewedResult& inResult,
+                                           const std::vector<std::optional<Position>>& inPlaces) {
   const std::vector<ReviewRecord>& records = inResult.interferences;
-  std::vector<std::pair<std::uint64_t, std::size_t>> hashes;
+  struct Hashed {
+    std::uint64_t hash;
+    std::size_t position;
+  };
+  std::vector<Hashed> hashes;
   hashes.reserve(records.size());
+  std::vector<std::uint64_t> ids;
+  ids.reserve(records.size());
   Identifier identifier(inResult);
-  for (std::size_t i = 0; i < records.size(); ++i)
-    hashes.emplace_back(identifier.OfInterference(records[i]), i);
-  std::ranges::sort(hashes, [&](const auto& inA, const auto& inB) {
-    if (inA.first != inB.first) return inA.first < inB.first;
-    const auto order = [&](const auto& inHash) {
-      const ReviewRecord& record = records[inHash.second];
-      return std::tie(record.type, record.value.text, inHash.second);
+  for (std::size_t i = 0; i < records.size(); ++i) {
+    ids.push_back(identifier.OfInterference(records[i], inPlaces[i]));
+    hashes.push_back({ids.back(), i});
+  }
+  std::ranges::sort(hashes, [&](const Hashed& inA, const Hashed& inB) {
+    if (inA.hash != inB.hash) return inA.hash < inB.hash;
+    const auto order = [&](const Hashed& inHashed) {
+      const ReviewRecord& record = records[inHashed.position];
+      return std::tie(record.type, record.value.text, inHashed.position);
     };
     return order(inA) < order(inB);
   });
-  std::vector<std::string> ids(records.size());
   std::uint64_t number = 0;
-  for (std::size_t i = 0; i < hashes.size(); ++i) {
-    number = i > 0 && hashes[i - 1].first == hashes[i].first ? number + 1 : 0;
+  for (std::size_t i = 1; i < hashes.size(); ++i) {
+    number = hashes[i - 1].hash == hashes[i].hash ? number + 1 : 0;
+    if (number == 0) continue;
     HashInput numbered;
-    if (number != 0) {
-      numbered.Add(hashes[i].first);
-      numbered.Add(number);
-    }
-    ids[hashes[i].second] = ZORFoundation::HexText(number == 0 ? hashes[i].first : numbered.Hash());
+    numbered.Add(hashes[i].hash);
+    numbered.Add(number);
+    ids[hashes[i].position] = numbered.Hash();
   }
+  return ids;
+}
+
+std::vector<std::string> StableIds(const ReviewedResult& inResult) {
+  std::vector<std::string> ids;
+  ids.reserve(inResult.interferences.size());
+  for (const std::uint64_t number : StableIdNumbers(inResult, PlacesOf(inResult)))
+    ids.push_back(ZORFoundation::HexText(number));
   return ids;
 }
 

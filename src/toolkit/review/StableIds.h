@@ -15,6 +15,14 @@ namespace ZORToolkit {
 /// the result has, on languages, or on where an assembly stands. No two of a result are equal.
 ZOR_TOOLKIT_EXPORT std::vector<std::string> StableIds(const ReviewedResult& inResult);
 
+/// The place of each interference.
+std::vector<std::optional<Position>> PlacesOf(const ReviewedResult& inResult);
+
+/// The identifiers as numbers, which are in the order of their digits.
+/// @param inPlaces those of PlacesOf.
+std::vector<std::uint64_t> StableIdNumbers(const ReviewedResult& inResult,
+                                           const std::vector<std::optional<Position>>& inPlaces);
+
 /// A stable identifier of the two products alone, likewise.
 ZOR_TOOLKIT_EXPORT std::string PairId(const ReviewedResult& inResult, const ReviewRecord& inRecord);
 

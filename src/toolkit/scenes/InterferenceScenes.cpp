@@ -1,5 +1,6 @@
 #include "toolkit/scenes/InterferenceScenes.h"
 
+#include <algorithm>
 #include <cmath>
 #include <cstdio>
 #include <unordered_map>
@@ -170,6 +171,7 @@ ResolvedInterference InterferenceScenes::Resolve(const InterferenceRecord& inRec
   ResolvedInterference resolved;
   auto& [first, second] = resolved.products;
   resolved.geometry = GeometryOf(inRecord);
+  resolved.curveLength = std::max(0.0, inRecord.curveLength.value.value_or(0));
   Resolve(inRecord.products[0], first);
   Resolve(inRecord.products[1], second);
   resolved.colours = ZORDefault::ChooseColours({first.shown.product, second.shown.product});

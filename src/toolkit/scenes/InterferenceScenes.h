@@ -30,6 +30,7 @@ struct ResolvedProduct {
 struct ResolvedInterference {
   std::array<ResolvedProduct, 2> products;
   ZORDefault::InterferenceGeometry geometry;
+  double curveLength = 0;  ///< of the curve on which some of its points are, millimetres; 0: none
   ZORDefault::SceneColours colours;
   /// Why the products are placed as in the model although the result has placements: one line of
   /// UTF-8, empty when they are placed where these say.

@@ -17,7 +17,7 @@ std::vector<InterferenceGroup> GroupsOf(const TestResult& inResult, std::vector<
   GroupOptions options;
   options.by = inBy;
   options.distance = inDistance;
-  return GroupInterferences(loaded.result, StableIds(loaded.result), options);
+  return GroupInterferences(loaded.result, options);
 }
 
 std::vector<std::string> Labels(const std::vector<InterferenceGroup>& inGroups) {
@@ -112,9 +112,9 @@ TEST(Group, ClustersAreThoseOfEveryPair) {
 TEST(Group, IsFoundByItsIdentifierAlsoInside) {
   const auto groups = GroupsOf(Bolts(), {GroupBy::kParts, GroupBy::kAssemblies});
   const InterferenceGroup& inner = groups[0].groups[1];
-  EXPECT_EQ(&inner, FindGroup(groups, inner.id));
+  EXPECT_EQ(&inner, FindGroup(groups, inner.Id()));
   EXPECT_EQ(nullptr, FindGroup(groups, "none"));
-  EXPECT_NE(groups[0].groups[0].id, groups[0].groups[1].id);
+  EXPECT_NE(groups[0].groups[0].number, groups[0].groups[1].number);
 }
 
 TEST(Group, EmptyResultHasNoGroups) {

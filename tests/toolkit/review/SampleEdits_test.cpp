@@ -1,6 +1,7 @@
 // Real results, edited by a seeded program that knows what it did.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <map>
 #include <random>
 #include <set>
@@ -14,8 +15,9 @@ namespace {
 using namespace ZORToolkit;
 using review_tests::Loaded;
 
-constexpr const char* kSamples[] = {"as1",        "dissonance",     "low_cost_robot_arm",
-                                    "pushdevice", "printable_case", "stamp_c6lora"};
+constexpr const char* kSamples[] = {"as1",         "dissonance",     "low_cost_robot_arm",
+                                    "pushdevice",  "printable_case", "stamp_c6lora",
+                                    "detected/as1"};
 
 /// What an interference of the edited result is.
 struct Truth {
@@ -230,6 +232,10 @@ TEST_P(EditedSamples, ClassesAreRightAndDecisionsArrive) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Samples, EditedSamples, testing::ValuesIn(kSamples),
-                         [](const auto& inInfo) { return std::string(inInfo.param); });
+                         [](const auto& inInfo) {
+                           std::string name = inInfo.param;
+                           std::ranges::replace(name, '/', '_');
+                           return name;
+                         });
 
 }  // namespace

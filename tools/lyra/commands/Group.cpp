@@ -28,7 +28,8 @@ void AddRows(const std::vector<InterferenceGroup>& inGroups, int inDepth, Table&
   for (const InterferenceGroup& group : inGroups) {
     ioTable.Add({std::to_string(group.members.size()), group.worst ? Number(*group.worst).text : "",
                  std::to_string(group.representative + 1), Name(group.by),
-                 std::string(2 * static_cast<std::size_t>(inDepth), ' ') + group.label, group.id});
+                 std::string(2 * static_cast<std::size_t>(inDepth), ' ') + group.label,
+                 group.Id()});
     const std::vector<InterferenceGroup>* inner = &group.groups;
     while (inner->size() == 1) inner = &inner->front().groups;
     AddRows(*inner, inDepth + 1, ioTable);
@@ -40,7 +41,7 @@ int Group(const GroupOptionsOfVerb& inOptions, Output& ioOutput) {
   ChooseLanguage(inOptions.language);
   ClashDocument document(inOptions.file);
   const ReviewedResult result = ReadForReview(document);
-  const auto groups = GroupInterferences(result, StableIds(result), options);
+  const auto groups = GroupInterferences(result, options);
   if (inOptions.json) {
     std::vector<OrderedJson> rows;
     for (const InterferenceGroup& group : groups) rows.push_back(JsonOf(group));

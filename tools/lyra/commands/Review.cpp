@@ -97,8 +97,7 @@ void PrintConflicts(const std::vector<ReviewConflict>& inConflicts, const Review
 std::vector<int> ChosenPositions(const ReviewOptions& inOptions, ReviewInput& ioInput) {
   std::unordered_set<int> ofGroup;
   if (!inOptions.group.empty()) {
-    const auto groups =
-        GroupInterferences(ioInput.result, StableIds(ioInput.result), inOptions.grouping.Get());
+    const auto groups = GroupInterferences(ioInput.result, inOptions.grouping.Get());
     const InterferenceGroup* const group = FindGroup(groups, inOptions.group);
     if (group == nullptr)
       throw InputError(ioInput.document.Name() + ": there is no group " + inOptions.group);

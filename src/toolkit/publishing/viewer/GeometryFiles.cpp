@@ -11,7 +11,8 @@ namespace fs = std::filesystem;
 namespace ZORToolkit {
 namespace {
 constexpr char kFolder[] = "viewer";
-}
+constexpr char kScriptStart[] = "zorBlock(\"";
+}  // namespace
 
 std::string GeometryPath(const PageBlock& inBlock) {
   return std::string(kFolder) + "/" + inBlock.name + ".js";
@@ -19,18 +20,26 @@ std::string GeometryPath(const PageBlock& inBlock) {
 
 std::string GeometryScript(const PageBlock& inBlock) {
   const std::string bytes = LoadPageLibrary().base64(inBlock.bytes);
-  return std::string("zorBlock(\"").append(inBlock.name).append("\",\"").append(bytes) + "\");\n";
+  return std::string(kScriptStart).append(inBlock.name).append("\",\"").append(bytes) + "\");\n";
+}
+
+bool IsGeometryScript(std::string_view inText) { return inText.starts_with(kScriptStart); }
+
+std::vector<fs::path> GeometryFilesIn(const std::string& inFolder) {
+  static const std::regex names(R"((scene|part-\d+)\.js)");
+  std::vector<fs::path> files;
+  const fs::path folder = fs::path(inFolder) / kFolder;
+  if (fs::is_directory(folder))
+    for (const fs::directory_entry& entry : fs::directory_iterator(folder))
+      if (std::regex_match(entry.path().filename().string(), names)) files.push_back(entry.path());
+  return files;
 }
 
 void WriteGeometry(const std::vector<PageBlock>& inBlocks, const std::string& inFolder,
                    const std::string& inWorkFolder) {
-  static const std::regex names(R"((scene|part-\d+)\.js)");
-  const fs::path folder = fs::path(inFolder) / kFolder;
-  if (fs::exists(folder))
-    for (const fs::directory_entry& entry : fs::directory_iterator(folder))
-      if (std::regex_match(entry.path().filename().string(), names)) fs::remove(entry.path());
+  for (const fs::path& file : GeometryFilesIn(inFolder)) fs::remove(file);
   if (inBlocks.empty()) return;
-  fs::create_directories(folder);
+  fs::create_directories(fs::path(inFolder) / kFolder);
   ZORFoundation::AtomicFileOptions written;
   written.temporaryFolder = inWorkFolder;
   for (const PageBlock& block : inBlocks)

@@ -3,7 +3,9 @@
 #ifndef ZOR_TOOLKIT_PUBLISHING_VIEWER_GEOMETRY_FILES_H
 #define ZOR_TOOLKIT_PUBLISHING_VIEWER_GEOMETRY_FILES_H
 
+#include <filesystem>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "toolkit/publishing/OneFile.h"
@@ -15,6 +17,12 @@ std::string GeometryPath(const PageBlock& inBlock);
 
 /// The script with this block.
 std::string GeometryScript(const PageBlock& inBlock);
+
+/// Whether a script begins as one of ours.
+bool IsGeometryScript(std::string_view inText);
+
+/// What has the name of such a script in a publication's folder.
+std::vector<std::filesystem::path> GeometryFilesIn(const std::string& inFolder);
 
 /// Writes a script for each block, and removes those of a former publication. Raises FileError.
 /// @param inWorkFolder where the files are made.

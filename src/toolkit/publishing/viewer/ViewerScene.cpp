@@ -1,8 +1,11 @@
 #include "toolkit/publishing/viewer/ViewerScene.h"
 
+#include <algorithm>
+#include <array>
 #include <cmath>
 #include <cstdio>
 #include <nlohmann/json.hpp>
+#include <tuple>
 #include <unordered_map>
 #include <utility>
 
@@ -174,6 +177,42 @@ ViewerScene::~ViewerScene() = default;
 
 bool ViewerScene::IsEmpty() const { return content_->pairs.empty(); }
 
+namespace {
+
+/// The curve of an interference, of which a result has but points in no order: near ones are joined,
+/// the nearest first, each with at most two (the greedy tour of J. L. Bentley, "Fast algorithms for
+/// geometric traveling salesman problems", 1992), until the curve is as long as the result says.
+/// @return pairs of places in inPoints.
+std::vector<std::array<std::size_t, 2>> CurveThrough(const std::vector<ZORMathVector>& inPoints,
+                                                     double inLength) {
+  using ZORFoundation::operator-;
+  constexpr double kMaxStep = 2;  // of the points' mean distance
+  constexpr double kMaxLength = 1.05;
+  std::vector<std::array<std::size_t, 2>> curve;
+  const std::size_t count = std::min<std::size_t>(inPoints.size(), kMaxPoints);
+  const double maxStep = kMaxStep * inLength / static_cast<double>(std::max<std::size_t>(count, 1));
+  typedef std::tuple<double, std::size_t, std::size_t> Step;
+  std::vector<Step> steps;
+  for (std::size_t i = 0; i < count; ++i)
+    for (std::size_t k = i + 1; k < count; ++k) {
+      const double length = ZORFoundation::Length(inPoints[k] - inPoints[i]);
+      if (length > 0 && length <= maxStep) steps.emplace_back(length, i, k);
+    }
+  std::ranges::sort(steps);
+  std::vector<int> ends(count, 0);
+  double sum = 0;
+  for (const auto& [length, from, to] : steps) {
+    if (ends[from] == 2 || ends[to] == 2 || sum + length > kMaxLength * inLength) continue;
+    sum += length;
+    ++ends[from];
+    ++ends[to];
+    curve.push_back({from, to});
+  }
+  return curve;
+}
+
+}  // namespace
+
 void ViewerScene::Add(const std::string& inKey, const ResolvedInterference& inResolved,
                       const PictureCamera& inCamera) {
   Json points = Json::array();
@@ -188,6 +227,7 @@ void ViewerScene::Add(const std::string& inKey, const ResolvedInterference& inRe
         content_->ProductOf(inResolved.products[1], inResolved.colours.imposedOnSecond)}},
       {"points", points},
       {"isDimension", isDimension},
+      {"curve", CurveThrough(inResolved.geometry.points, inResolved.curveLength)},
       {"markers", ColourText(inResolved.colours.markers)}};
 }
 
