@@ -148,7 +148,7 @@ class Drawing {
     }
   }
 
-  /** @param view {camera, sphere, section, solids, ghosts, points, pairs, marker}; solids and ghosts are [{part, matrix, colour}]. */
+  /** @param view {camera, sphere, section, solids, ghosts, points, curve, marker}; solids and ghosts are [{part, matrix, colour}]. */
   draw(view) {
     const { gl, canvas } = this, { camera, section } = view;
     gl.viewport(0, 0, canvas.width, canvas.height);
@@ -213,6 +213,7 @@ class Drawing {
     };
     const ball = Math.max(6, Math.round(this.canvas.height / (view.points.length > 60 ? 60 : 32)));
     if (view.isDimension) some(gl.LINES, view.points, view.marker, 1);
+    some(gl.LINES, view.curve, view.marker, 1);
     some(gl.POINTS, view.points, view.marker, ball);
     some(gl.LINES, view.measured.length === 2 ? view.measured : [], '#1f5fa8', 1);
     some(gl.POINTS, view.measured, '#1f5fa8', Math.round(this.canvas.height / 40));

@@ -79,7 +79,7 @@ const drawNow = scale => {
   const ghosts = view.hasGhosts ? view.ghosts : [];
   drawing.draw({
     camera: view.camera, sphere: ghosts.length ? view.wholeSphere : view.sphere, section: view.section && sectionPlane(), solids, ghosts,
-    points: view.pair.points, isDimension: view.pair.isDimension, marker: view.pair.markers, measured: view.measured,
+    points: view.pair.points, curve: view.pair.curve.flat().map(i => view.pair.points[i]), isDimension: view.pair.isDimension, marker: view.pair.markers, measured: view.measured,
   });
   if (scale === 2 && !isAsked) canvas.dataset.still = '1';
 };

@@ -365,6 +365,31 @@ TEST_F(Page, TurnsThePairWhereItsPictureStood) {
   const int x = box[0].get<int>(), y = box[1].get<int>();
   browser_.Drag(x, y, x + 90, y + 40);
   EXPECT_LT(shown()[0][0], 0.9);
+  const auto goBack = [&] {
+    Value("document.querySelector('canvas').focus({preventScroll: true})");
+    browser_.Key("0");
+  };
+  goBack();
+  EXPECT_EQ(shown(), first);
+  // By one finger too, and by two nearer
+  const auto touch = [&](const char* inType, const std::vector<std::pair<int, int>>& inFingers) {
+    nlohmann::json points = nlohmann::json::array();
+    for (const auto& [across, down] : inFingers)
+      points.push_back({{"x", x + across}, {"y", y + down}, {"id", points.size()}});
+    browser_.Send("Input.dispatchTouchEvent", {{"type", inType}, {"touchPoints", points}});
+  };
+  touch("touchStart", {{0, 0}});
+  touch("touchMove", {{45, 20}});
+  touch("touchMove", {{90, 40}});
+  touch("touchEnd", {});
+  EXPECT_LT(shown()[0][0], 0.9);
+  goBack();
+  touch("touchStart", {{-30, 0}, {30, 0}});
+  touch("touchMove", {{-40, 0}, {40, 0}});
+  touch("touchMove", {{-50, 0}, {50, 0}});
+  touch("touchEnd", {});
+  EXPECT_GT(shown()[0][1], first[0][1]);
+  EXPECT_GT(shown()[1][1], first[1][1]);
   Value("document.querySelector('canvas').focus()");
   for (const char* key : {"+", "+", "-"}) browser_.Key(key);
   browser_.Click("#i20 .tools button:first-child");

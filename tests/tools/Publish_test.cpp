@@ -147,6 +147,45 @@ TEST_F(Publish, ReportLiesWithItsStyleSheetAndType) {
             ReadFile(ZOR_SOURCE_DIR "/resources/clash-report.xsl"));
 }
 
+TEST_F(Publish, FilesOfSomebodyElseAreNeverReplaced) {
+  const std::vector<std::string> names = {"index.html", "report.xml", "clash-report.xsl",
+                                          "clash-report.dtd", "manifest.json"};
+  for (const std::string& name : names) {
+    SCOPED_TRACE(name);
+    fs::remove_all(folder_);
+    fs::create_directory(folder_);
+    const std::string path = directory_.Write("out/" + name, "<p>mine</p>");
+    const CommandResult result = Run({kResult});
+    EXPECT_EQ(result.code, 1);
+    EXPECT_EQ(result.error,
+              "lyra: " + path + ": is in the way of the page and was not made by lyra publish\n");
+    EXPECT_EQ(ReadFile(path), "<p>mine</p>");
+    EXPECT_EQ(std::distance(fs::directory_iterator(folder_), fs::directory_iterator()), 1);
+  }
+  fs::remove_all(folder_);
+  ASSERT_EQ(Run({kResult}).code, 0);
+  // Geometry too
+  fs::create_directory(folder_ + "/viewer");
+  const std::string script = directory_.Write("out/viewer/scene.js", "mine()");
+  EXPECT_EQ(Run({kResult}).code, 1);
+  EXPECT_EQ(ReadFile(script), "mine()");
+  fs::remove_all(folder_ + "/viewer");
+  // A style sheet of the user's own beside it, and that of a former publication
+  directory_.Write("out/own.xsl", "<mine/>");
+  const std::string templates = "<xsl:template match='/'><p/></xsl:template>";
+  EXPECT_EQ(RunWithStyleSheet(templates).code, 1);
+  fs::remove(folder_ + "/own.xsl");
+  EXPECT_EQ(RunWithStyleSheet(templates).code, 0);
+  EXPECT_EQ(RunWithStyleSheet("<xsl:template match='/'><hr/></xsl:template>").code, 0);
+  EXPECT_EQ(Run({kResult}).code, 0);
+  // Former versions wrote no manifest, and a simpler page
+  fs::remove(folder_ + "/manifest.json");
+  directory_.Write("out/index.html",
+                   "<html><body><p class=\"kind\">Clash report</p></body></html>");
+  EXPECT_EQ(Run({kResult}).code, 0);
+  EXPECT_THAT(Page(), HasSubstr("zor-manifest"));
+}
+
 TEST_F(Publish, ComponentListIsRefused) {
   EXPECT_EQ(Run({"tests/golden/inputs/components.xml"}).code, 1);
   EXPECT_FALSE(fs::exists(folder_));

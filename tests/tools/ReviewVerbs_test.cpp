@@ -62,6 +62,43 @@ TEST(DiffVerb, ExitCodeSaysWhetherThereAreDifferences) {
   EXPECT_EQ(RunCommand({"diff", kAs1, kAs1, "--tolerance", "wide"}).code, 2);
 }
 
+TEST(DiffVerb, PageShowsWhatBecameOfEach) {
+  const TemporaryDirectory directory;
+  std::string two = Text(kAs1);
+  for (int i = 3; i <= 32; ++i) two = Without(two, "Interference." + std::to_string(i));
+  const std::string older = directory.Write("old.xml", two);
+  const std::string newer = directory.Path("new.xml"), page = directory.Path("page.html");
+  ASSERT_EQ(RunCommand({"review", "set", older, "--only", "type=contact", "--status", "irrelevant",
+                        "--comment", "seen", "-o", newer})
+                .code,
+            0);
+  const CommandResult made =
+      RunCommand({"diff", older, newer, "--page", page, "--model", "samples/as1-oc-214.stp"});
+  EXPECT_EQ(made.code, 0) << made.error;
+  EXPECT_THAT(made.out, HasSubstr("page.html: 2 interferences, 2 with a picture\n"));
+  const std::string text = ReadFile(page);
+  EXPECT_THAT(text, HasSubstr("data-change=\"changed\""));
+  EXPECT_THAT(text, HasSubstr("class=\"before\""));
+  // The page gives the new result back, and a second one of the same is the same
+  const std::string back = directory.Path("back.xml");
+  EXPECT_EQ(RunCommand({"extract", page, "-o", back}).code, 0);
+  EXPECT_EQ(ReadFile(back), ReadFile(newer));
+  // JSON stays JSON beside a page, which may have no pictures
+  const auto entries = Json({"diff", older, newer, "--json", "--page", directory.Path("folder")});
+  EXPECT_EQ(entries["changed"].size() + entries["persisting"].size(), 2);
+  EXPECT_THAT(ReadFile(directory.Path("folder/index.html")), HasSubstr("data-change="));
+  // What the new model lacks was not looked for
+  const std::string fewer = directory.Write(
+      "fewer.xml", "<ClashElement Version='1.2'><ClashResult Name='r'/></ClashElement>");
+  const std::string other =
+      directory.Write("other.stl",
+                      "solid a\nfacet normal 0 0 1\nouter loop\nvertex 0 0 0\nvertex 1 0 0\n"
+                      "vertex 0 1 0\nendloop\nendfacet\nendsolid a\n");
+  EXPECT_EQ(Json({"diff", older, fewer, "--json"})["resolved"].size(), 2);
+  EXPECT_EQ(Json({"diff", older, fewer, "--json", "--model", other})["notComparable"].size(), 2);
+  EXPECT_EQ(RunCommand({"diff", older, newer, "--old-model", other}).code, 2);
+}
+
 TEST(DiffVerb, TableShowsWhatChangedAndCsvAll) {
   const TemporaryDirectory directory;
   const std::string newer =

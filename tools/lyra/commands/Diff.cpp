@@ -1,11 +1,15 @@
 // lyra diff OLD NEW
+#include <algorithm>
 #include <memory>
+#include <thread>
 
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/JsonFields.h"
+#include "lyra/commands/Model.h"
+#include "lyra/commands/PublishRun.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Table.h"
 #include "toolkit/review/ReviewFields.h"
@@ -17,8 +21,9 @@ namespace {
 constexpr int kDiffer = 3;
 
 struct DiffVerbOptions {
-  std::string oldFile, newFile;
+  std::string oldFile, newFile, model, oldModel, page;
   CompareOptions compare;
+  ModelReading reading;
   bool json = false, csv = false, all = false, exitCode = false;
 };
 
@@ -119,15 +124,83 @@ void PrintTable(const Compared& inCompared, bool inIsAll, Output& ioOutput) {
                  " not comparable\n");
 }
 
+/// @param inKeepsBytes for a page that gives its result back; a large result is read without them.
+struct DiffInput {
+  DiffInput(const std::string& inPath, bool inKeepsBytes)
+      : bytes(inKeepsBytes ? BytesOfInput(inPath) : std::string()),
+        document(inKeepsBytes ? ClashDocument(inPath, bytes) : ClashDocument(inPath)),
+        result(ReadForReview(document)) {}
+
+  std::string bytes;
+  ClashDocument document;
+  ReviewedResult result;
+};
+
+/// The products of two results that a model has, by their names there.
+std::unordered_set<std::string> ProductsInModel(const ZORIProduct_var& inRoot,
+                                                std::initializer_list<ClashDocument*> inResults) {
+  InterferenceScenes scenes(inRoot);
+  std::unordered_set<std::string> names;
+  for (ClashDocument* const document : inResults)
+    ForEachInterference(*document, RecordPart::kAll, [&](const InterferenceRecord& inRecord) {
+      const ResolvedInterference resolved = scenes.Resolve(inRecord, ProductPlaces::kModel);
+      for (std::size_t i = 0; i < 2; ++i) {
+        if (resolved.products[i].shown.product.IsNull()) continue;
+        for (const std::string& name : {inRecord.products[i].id, inRecord.products[i].alias})
+          if (!name.empty()) names.insert(name);
+      }
+    });
+  return names;
+}
+
+/// The new result with what became of each interference, and pictures before and after.
+void MakePage(const DiffVerbOptions& inOptions, const DiffOptions& inComparison,
+              const ZORIProduct_var& inRoot, DiffInput& ioOld, DiffInput& ioNew, Output& ioOutput) {
+  PublicationOptions options;
+  SetTarget(options, inOptions.page);
+  options.isCompact = options.isOneFile;
+  if (options.isCompact) options.format = PictureFormat::kPng;
+  options.source = ioNew.bytes;
+  options.sourceName = FileNameOf(inOptions.newFile);
+  options.baseline = &ioOld.document;
+  options.baselineSource = ioOld.bytes;
+  options.baselineName = FileNameOf(inOptions.oldFile);
+  options.comparison = inComparison;
+  options.model = inOptions.model;
+  options.language = inOptions.compare.language;
+  options.processes = static_cast<int>(std::max(1U, std::thread::hardware_concurrency()));
+  if (!inOptions.oldModel.empty())
+    options.openBaselineModel = [&] {
+      return OpenModelFile(inOptions.oldModel, inOptions.reading).root;
+    };
+  std::optional<DrawingProgress> progress;
+  SayOnStandardError(progress, options);
+  const Published made = Publish(ioNew.document, options, [&] {
+    progress.emplace();
+    return inRoot;
+  });
+  if (inOptions.json || inOptions.csv)
+    RequireAllPictures(made);
+  else
+    ReportPage(made, ioOutput);
+}
+
 int Diff(const DiffVerbOptions& inOptions, Output& ioOutput) {
   if (inOptions.json && inOptions.csv)
     throw UsageError("diff: --json and --csv exclude each other");
-  const DiffOptions options = inOptions.compare.Get();
+  if (!inOptions.oldModel.empty() && (inOptions.page.empty() || inOptions.model.empty()))
+    throw UsageError("diff: --old-model needs --page and --model");
+  DiffOptions options = inOptions.compare.Get();
+  inOptions.reading.Check();
   ChooseLanguage(inOptions.compare.language);
-  ClashDocument oldDocument(inOptions.oldFile);
-  const ReviewedResult oldResult = ReadForReview(oldDocument);
-  ClashDocument newDocument(inOptions.newFile);
-  const ReviewedResult newResult = ReadForReview(newDocument);
+  const bool hasPage = !inOptions.page.empty();
+  DiffInput oldInput(inOptions.oldFile, hasPage), newInput(inOptions.newFile, hasPage);
+  const ReviewedResult &oldResult = oldInput.result, &newResult = newInput.result;
+  ZORIProduct_var root;
+  if (!inOptions.model.empty()) {
+    root = OpenModelFile(inOptions.model, inOptions.reading).root;
+    options.productsOfNewModel = ProductsInModel(root, {&oldInput.document, &newInput.document});
+  }
   const Compared compared{oldResult, newResult, ZORToolkit::Diff(oldResult, newResult, options)};
   if (inOptions.json)
     PrintJson(compared, options, ioOutput);
@@ -135,6 +208,7 @@ int Diff(const DiffVerbOptions& inOptions, Output& ioOutput) {
     PrintCsv(compared, ioOutput);
   else
     PrintTable(compared, inOptions.all, ioOutput);
+  if (hasPage) MakePage(inOptions, options, root, oldInput, newInput, ioOutput);
   return inOptions.exitCode && compared.diff.HasDifferences() ? kDiffer : 0;
 }
 
@@ -148,7 +222,15 @@ VerbAction DeclareDiff(Arguments& ioArguments) {
   ioArguments.Flag("--csv", options->csv, "Print comma-separated values");
   ioArguments.Flag("--all", options->all, "Show persisting interferences in the table too");
   ioArguments.Flag("--exit-code", options->exitCode, "Exit with 3 when there are differences");
+  ioArguments.NonEmptyText("--page", "DIR", options->page,
+                           "Make a page of the new result too, as lyra publish --baseline does");
+  ioArguments.NonEmptyText("--model", "MODEL", options->model,
+                           "The new model: what it lacks is not comparable, and the page has "
+                           "pictures before and after");
+  ioArguments.NonEmptyText("--old-model", "MODEL", options->oldModel,
+                           "The model of the pictures before (default: that of --model)");
   options->compare.Declare(ioArguments);
+  options->reading.Declare(ioArguments);
   return [options](Output& ioOutput) { return Diff(*options, ioOutput); };
 }
 

@@ -11,6 +11,7 @@
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/Model.h"
 #include "lyra/commands/Picture.h"
+#include "lyra/commands/PublishRun.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/commands/Shares.h"
 #include "lyra/terminal/Progress.h"
@@ -101,27 +102,13 @@ int ReadAndMake(const PublishOptions& inOptions, PublicationOptions inPublicatio
       return OpenModelFile(inOptions.baselineModel, inOptions.reading).root;
     };
   ClashDocument document(inOptions.file, inPublication.source);
-  inPublication.warn = [](const std::string& inWarning) {
-    std::fprintf(stderr, "lyra: warning: %s\n", Printable(inWarning).c_str());
-  };
   std::optional<DrawingProgress> progress;
-  inPublication.drawn = [&](std::size_t inDone, std::size_t inAll) {
-    progress->Show(inDone, inAll);
-  };
+  SayOnStandardError(progress, inPublication);
   return inMake(document, inPublication, [&] {
     const ZORIProduct_var root = OpenModelFile(inOptions.model, inOptions.reading).root;
     progress.emplace();
     return root;
   });
-}
-
-int Report(const Published& inMade, Output& ioOutput) {
-  ioOutput.Write(inMade.page + ": " + std::to_string(inMade.interferences) + " interferences, " +
-                 std::to_string(inMade.pictures) + " with a picture\n");
-  if (inMade.failures > 0)
-    throw InputError(std::to_string(inMade.failures) +
-                     " interferences have no picture: it cannot be drawn or written");
-  return 0;
 }
 
 /// The share that the options describe, with the files that it is made of.
@@ -169,7 +156,8 @@ int Publish(const PublishOptions& inOptions, Output& ioOutput) {
         if (inOptions.sharing.plan)
           return PrintPlan("publish", SamplePublication(ioDocument, inPublication, inOpen),
                            inOptions.sharing, ioOutput);
-        if (!shard) return Report(ZORToolkit::Publish(ioDocument, inPublication, inOpen), ioOutput);
+        if (!shard)
+          return ReportPage(ZORToolkit::Publish(ioDocument, inPublication, inOpen), ioOutput);
         const ShareManifest share = ShareOf(inOptions, *shard);
         ioOutput.Write(ShareLine(share, PublishShare(ioDocument, inPublication, share, inOpen)));
         return 0;
@@ -193,6 +181,26 @@ int Extract(const ExtractOptions& inOptions, Output& ioOutput) {
 }
 
 }  // namespace
+
+void SayOnStandardError(std::optional<DrawingProgress>& ioProgress, PublicationOptions& ioOptions) {
+  ioOptions.warn = [](const std::string& inWarning) {
+    std::fprintf(stderr, "lyra: warning: %s\n", Printable(inWarning).c_str());
+  };
+  ioOptions.drawn = [&](std::size_t inDone, std::size_t inAll) { ioProgress->Show(inDone, inAll); };
+}
+
+void RequireAllPictures(const Published& inMade) {
+  if (inMade.failures > 0)
+    throw InputError(std::to_string(inMade.failures) +
+                     " interferences have no picture: it cannot be drawn or written");
+}
+
+int ReportPage(const Published& inMade, Output& ioOutput) {
+  ioOutput.Write(inMade.page + ": " + std::to_string(inMade.interferences) + " interferences, " +
+                 std::to_string(inMade.pictures) + " with a picture\n");
+  RequireAllPictures(inMade);
+  return 0;
+}
 
 int GatherPublish(const std::vector<ShareManifest>& inShares, const GatherOptions& inOptions,
                   Output& ioOutput) {
@@ -218,12 +226,12 @@ int GatherPublish(const std::vector<ShareManifest>& inShares, const GatherOption
   ChooseLanguage(options.language);
   publication.source = BytesOfInput(options.file);
   publication.sourceName = FileNameOf(options.file);
-  return ReadAndMake(options, publication,
-                     [&](ClashDocument& ioDocument, const PublicationOptions& inPublication,
-                         const Opening& inOpen) {
-                       return Report(GatherPublication(ioDocument, inPublication, inShares, inOpen),
-                                     ioOutput);
-                     });
+  return ReadAndMake(
+      options, publication,
+      [&](ClashDocument& ioDocument, const PublicationOptions& inPublication,
+          const Opening& inOpen) {
+        return ReportPage(GatherPublication(ioDocument, inPublication, inShares, inOpen), ioOutput);
+      });
 }
 
 VerbAction DeclareExtract(Arguments& ioArguments) {
