@@ -36,7 +36,7 @@ DOM_Element CoordinatesElement(const ZORUnicodeString& inName, DOM_Document inDo
 
 constexpr char kVersionSeparator[] = "<uuiddv>";
 constexpr int kVersionSeparatorLength = 8;
-constexpr char kPathSeparator[] = " --++-- ";
+constexpr char kAliasSeparator[] = " --++-- ";
 constexpr int kShownRepresentation = 1;
 
 /// Queries a component (a pointer or a handle) for an interface. Empty if the query fails or yields
@@ -223,7 +223,7 @@ ZORUnicodeString ZORLyraGeneralServices::GetPathRoot(ZORIProduct_var inProduct) 
   const int last = aliases.Size() - 1;  // below the root
   if (last < 1) return "";
   ZORUnicodeString path = aliases[last];
-  for (int i = last - 1; i >= 1; --i) path.Append(kPathSeparator).Append(aliases[i]);
+  for (int i = last - 1; i >= 1; --i) path.Append(kAliasSeparator).Append(aliases[i]);
   return path;
 }
 

@@ -8,13 +8,14 @@
 #include "platform/system/ZORUnicodeChar.h"
 
 namespace ZORDefault {
-namespace {
 
-ZORUnicodeString ToUnicode(const std::u16string& inText) {
+ZORUnicodeString UnicodeFromUtf16(const std::u16string& inText) {
   ZORUnicodeString text;
   text.BuildFromUTF16(inText.data(), inText.size());
   return text;
 }
+
+namespace {
 
 bool IsXmlUnit(char16_t inUnit) {
   if (inUnit < 0x20) return inUnit == u'\t' || inUnit == u'\n' || inUnit == u'\r';
@@ -62,7 +63,7 @@ void NumberDuplicates(const std::vector<std::size_t>& inSiblings,
 ModelDocument::ModelDocument(ModelData inModel, const std::u16string& inFileName)
     : model_(std::move(inModel)), document_(*this), providersFacet_(*this) {
   for (const std::u16string& alias : AliasesOf(model_, inFileName))
-    aliases_.push_back(ToUnicode(alias));
+    aliases_.push_back(UnicodeFromUtf16(alias));
   products_.reserve(model_.products.size());
   for (const ModelProduct& product : model_.products) {
     const bool isRoot = product.parent == ModelProduct::kNoParent;

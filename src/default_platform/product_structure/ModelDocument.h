@@ -16,6 +16,8 @@
 
 namespace ZORDefault {
 
+ZORUnicodeString UnicodeFromUtf16(const std::u16string& inText);
+
 /// Owns a model and its products. Deleted with the last reference to itself or to any of them.
 class ModelDocument final : public CountedComponent, private CountedObject<ModelDocument> {
  public:

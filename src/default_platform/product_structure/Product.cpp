@@ -14,12 +14,6 @@ constexpr int kShownRepresentation = 1;
 constexpr int kAllProperties = 11;
 constexpr int kWholeGeometry = 5;
 
-ZORUnicodeString ToUnicode(const std::u16string& inText) {
-  ZORUnicodeString text;
-  text.BuildFromUTF16(inText.data(), inText.size());
-  return text;
-}
-
 /// The colour that a product has itself: as an instance, else from its part.
 const std::optional<PartColour>& OwnColourOf(const Product& inProduct) {
   const auto& colour = inProduct.GetModelProduct().colour;
@@ -113,8 +107,8 @@ ProductInfo Product::GetInfo() const {
   const ModelPart& part = GetPart();
   ProductInfo info;
   info.alias = GetAlias();
-  info.instanceName = ToUnicode(GetModelProduct().name);
-  info.partName = ToUnicode(part.name);
+  info.instanceName = UnicodeFromUtf16(GetModelProduct().name);
+  info.partName = UnicodeFromUtf16(part.name);
   info.part = GetModelProduct().part;
   info.isAssembly = part.isAssembly;
   info.parentFromProduct = GetModelProduct().parentFromProduct;
@@ -190,7 +184,7 @@ HRESULT Product::InSessionFacet::GetRepresentationName(int& outState, int inShow
   outState = self_.HasGeometry() ? 1 : 0;
   outName = ZORUnicodeString();
   if (!self_.HasGeometry()) return S_OK;
-  outName = ToUnicode(self_.GetPart().name);
+  outName = UnicodeFromUtf16(self_.GetPart().name);
   if (outName.GetLengthInChar() == 0) outName = self_.GetAlias();
   return S_OK;
 }

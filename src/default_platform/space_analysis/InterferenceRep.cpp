@@ -4,6 +4,7 @@
 #include <array>
 #include <cmath>
 #include <cstdint>
+#include <numbers>
 #include <set>
 
 #include "default_platform/visualisation/Rendering.h"
@@ -14,7 +15,6 @@ namespace {
 
 using namespace ZORFoundation;
 
-constexpr double kPi = 3.14159265358979323846;
 
 std::array<float, 3> Rounded(const ZORMathVector& inVector) {
   return {static_cast<float>(inVector.x), static_cast<float>(inVector.y),
@@ -63,7 +63,7 @@ void MarkerMesh::AddSphere(const ZORMathVector& inCentre, double inRadius, std::
   const ZORMathVector axis(0, 0, 1);
   std::vector<Ring> rings;
   for (std::uint32_t i = 0; i <= inSlices; ++i) {
-    const double angle = kPi * i / inSlices;
+    const double angle = std::numbers::pi * i / inSlices;
     const double along = -std::cos(angle);
     rings.push_back({inCentre + (along * inRadius) * axis, inRadius * std::sin(angle), along});
   }
@@ -90,7 +90,7 @@ void MarkerMesh::AddRings(const ZORMathVector& inAxis, const std::vector<Ring>& 
   for (const Ring& ring : inRings) {
     const double outwards = std::sqrt(std::max(0.0, 1 - ring.normalAlong * ring.normalAlong));
     for (std::uint32_t side = 0; side < inSides; ++side) {
-      const double angle = 2 * kPi * side / inSides;
+      const double angle = 2 * std::numbers::pi * side / inSides;
       const ZORMathVector out = std::cos(angle) * u + std::sin(angle) * v;
       mesh_->points.push_back(Rounded(ring.centre + ring.radius * out - mesh_->origin));
       mesh_->normals.push_back(Rounded(outwards * out + ring.normalAlong * inAxis));

@@ -6,6 +6,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <mutex>
+#include <numbers>
 #include <utility>
 
 #include "foundation/PluginLoader.h"
@@ -14,8 +15,7 @@
 namespace ZORDefault {
 namespace {
 
-constexpr double kPi = 3.14159265358979323846;
-constexpr double kMaxViewAngle = 170 * kPi / 180;
+constexpr double kMaxViewAngle = 170 * std::numbers::pi / 180;
 
 using ZORFoundation::Cross;
 using ZORFoundation::IsFinite;
@@ -33,7 +33,7 @@ ZORMathVector RightOf(const ZORMathVector& inForward, const ZORMathVector& inUp)
 double PixelSize(const ZOR3DViewpoint& inViewpoint, int inHeight) {
   if (inViewpoint.projection == ZOR3DViewpoint::kCylindric)
     return PositiveOr(inViewpoint.viewHeight, 1) / inHeight;
-  const double angle = std::min(PositiveOr(inViewpoint.viewAngle, kPi / 6), kMaxViewAngle);
+  const double angle = std::min(PositiveOr(inViewpoint.viewAngle, std::numbers::pi / 6), kMaxViewAngle);
   return 2 * std::tan(angle / 2) / inHeight;
 }
 

@@ -14,10 +14,10 @@ constexpr std::size_t kMaxWindow = std::size_t{64} * 1024 * 1024;
 constexpr std::size_t kMaxDepth = 1'000'000;
 // What is wrong so near the end of the window may only be cut off; longest is "<![CDATA[".
 constexpr std::ptrdiff_t kMaxLookahead = 16;
-constexpr std::size_t kFirstSlots = 256;
+constexpr std::size_t kFirstTexts = 256;
 constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
 
-bool StartsWith(const char* inPlace, std::string_view inText) {
+bool IsTextAt(const char* inPlace, std::string_view inText) {
   return std::memcmp(inPlace, inText.data(), inText.size()) == 0;
 }
 
@@ -28,14 +28,14 @@ Utf8FastPath::Utf8FastPath(ByteReader& ioReader, DOM_Tree& ioTree)
       tree_(ioTree),
       window_(new char[kFirstWindow + ByteSearch::kPadding]),
       windowBytes_(kFirstWindow),
-      slots_(kFirstSlots) {
+      slots_(kFirstTexts) {
   at_ = end_ = window_.get();
   open_.push_back({DOM_Tree::kDocument, 0, nullptr});
 }
 
 void Utf8FastPath::Read() {
   ReadMore();
-  if (end_ - at_ >= 3 && StartsWith(at_, kByteOrderMark)) at_ += kByteOrderMark.size();
+  if (end_ - at_ >= 3 && IsTextAt(at_, kByteOrderMark)) at_ += kByteOrderMark.size();
   ReadDeclaration();
   ReadContent();
   if (!hasRoot_ || open_.size() != 1) throw NeedsFullScanner();
@@ -218,7 +218,7 @@ void Utf8FastPath::ReadEndTag() {
 
 bool Utf8FastPath::IsNext(const char* inPlace, const Name& inName) const {
   return end_ - inPlace > static_cast<std::ptrdiff_t>(inName.utf8.size()) &&
-         StartsWith(inPlace, inName.utf8);
+         IsTextAt(inPlace, inName.utf8);
 }
 
 const char* Utf8FastPath::NameEnd(const char* inPlace) const {
@@ -325,7 +325,7 @@ const char* Utf8FastPath::AppendReference(const char* inPlace) {
   constexpr Predefined kPredefined[] = {
       {"&lt;", u'<'}, {"&gt;", u'>'}, {"&amp;", u'&'}, {"&quot;", u'"'}, {"&apos;", u'\''}};
   for (const Predefined& one : kPredefined) {
-    if (!StartsWith(inPlace, one.text)) continue;
+    if (!IsTextAt(inPlace, one.text)) continue;
     text_ += one.unit;
     return inPlace + one.text.size();
   }
@@ -358,7 +358,7 @@ void Utf8FastPath::ReadComment() {
 
 void Utf8FastPath::ReadSection() {
   constexpr std::string_view kStart = "<![CDATA[";
-  if (open_.size() == 1 || !StartsWith(at_, kStart)) Stop(at_);
+  if (open_.size() == 1 || !IsTextAt(at_, kStart)) Stop(at_);
   const char* at = at_ + kStart.size();
   text_.clear();
   while (at[0] != ']' || at[1] != ']' || at[2] != '>') at = AppendCharacter(at);

@@ -41,7 +41,7 @@ namespace fs = std::filesystem;
 namespace ZORToolkit {
 namespace {
 
-constexpr int kOverview = 0;  // its number among the pictures
+constexpr int kOverviewNumber = 0;  // its number among the pictures
 
 class Publication {
  public:
@@ -253,13 +253,13 @@ class Publication {
   }
 
   void DrawOverview(const PictureStore& inStore) const {
-    const std::string name = inStore.PictureName(kOverview);
+    const std::string name = inStore.PictureName(kOverviewNumber);
     if (overview_ == nullptr || inStore.Has(name)) return;
     try {
       fs::current_path(inStore.DrawingFolder());
       PrintPictures::TakeRepImage(overview_, FromUtf8(name), FormatName(options_.format),
                                   options_.size.width, options_.size.height, 1, 0);
-      inStore.Finish(kOverview);
+      inStore.Finish(kOverviewNumber);
     } catch (const std::exception&) {
       // The page has no map then.
     }
@@ -268,7 +268,7 @@ class Publication {
   /// Where the interferences are in the overview: the middle of their points.
   void MakeMap(const PictureStore& inStore) {
     published_.map =
-        pictures_.Refer(folder_, inStore.Reference(inStore.PictureName(kOverview)), options_.size);
+        pictures_.Refer(folder_, inStore.Reference(inStore.PictureName(kOverviewNumber)), options_.size);
     if (published_.map.empty()) return;
     published_.mapRatio = static_cast<double>(options_.size.height) / options_.size.width;
     const PictureCamera camera = OverviewCamera(*overview_, options_.size);

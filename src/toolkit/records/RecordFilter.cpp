@@ -11,7 +11,7 @@
 namespace ZORToolkit {
 namespace {
 
-std::vector<std::string> Keys(const std::vector<std::string>& inWords) {
+std::vector<std::string> WordKeys(const std::vector<std::string>& inWords) {
   std::vector<std::string> keys;
   keys.reserve(inWords.size());
   for (const std::string& word : inWords) keys.push_back(WordKey(word));
@@ -60,10 +60,10 @@ std::string WordKey(std::string_view inWord) {
   return key;
 }
 
-void RecordFilter::SetTypes(const std::vector<std::string>& inWords) { types_ = Keys(inWords); }
+void RecordFilter::SetTypes(const std::vector<std::string>& inWords) { types_ = WordKeys(inWords); }
 
 void RecordFilter::SetStatuses(const std::vector<std::string>& inWords) {
-  statuses_ = Keys(inWords);
+  statuses_ = WordKeys(inWords);
 }
 
 bool RecordFilter::Accepts(const InterferenceRecord& inRecord) const {

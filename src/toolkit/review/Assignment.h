@@ -3,12 +3,17 @@
 #define ZOR_TOOLKIT_REVIEW_ASSIGNMENT_H
 
 #include <array>
+#include <limits>
 #include <span>
 #include <vector>
 
 #include "ZORToolkitExport.h"
 
 namespace ZORToolkit {
+
+inline constexpr double kUnlimited = std::numeric_limits<double>::infinity();
+inline constexpr double kExact = 0.01;  ///< what is nearer is called the same place; millimetres
+inline constexpr double kAlone = 1e12;  ///< costs more than any assignment
 
 /// What is assigned: three coordinates, a fourth that only adds to the cost, and a kind.
 struct AssignmentPoint {

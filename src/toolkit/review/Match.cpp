@@ -12,11 +12,8 @@
 namespace ZORToolkit {
 namespace {
 
-constexpr double kUnlimited = std::numeric_limits<double>::infinity();
-constexpr double kExact = 0.01;       // below it a place is called the same; millimetres
 constexpr double kOtherType = 1;      // what another type costs, in millimetres of distance
 constexpr double kValueWeight = 0.1;  // what a small difference of values costs, likewise
-constexpr double kAlone = 1e12;       // costs more than any assignment
 
 /// An interference of the pair in hand.
 struct Item {

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <charconv>
-#include <limits>
 #include <map>
 #include <tuple>
 
@@ -11,10 +10,6 @@
 
 namespace ZORToolkit {
 namespace {
-
-constexpr double kUnlimited = std::numeric_limits<double>::infinity();
-constexpr double kExact = 0.01;  // below it a placement is called the same; millimetres
-constexpr double kAlone = 1e12;  // costs more than any assignment
 
 std::string Quoted(const ReviewProduct& inProduct) {
   return std::string(1, '"').append(inProduct.Name()).append(1, '"');

@@ -10,16 +10,17 @@
 #include "toolkit/publishing/PageLibrary.h"
 
 namespace ZORToolkit {
-namespace {
 
-typedef std::array<float, 3> Float3;
-constexpr double kSteps = 65535;
-
-std::string ColourText(const PartColour& inColour) {
+std::string ColourText(const std::array<std::uint8_t, 4>& inColour) {
   char text[8];
   std::snprintf(text, sizeof text, "#%02x%02x%02x", inColour[0], inColour[1], inColour[2]);
   return text;
 }
+
+namespace {
+
+typedef std::array<float, 3> Float3;
+constexpr double kSteps = 65535;
 
 /// The corners of all triangles by colour, in the order of the colours.
 std::map<std::string, std::vector<std::uint32_t>> CornersByColour(const PartMesh& inMesh) {

@@ -11,6 +11,9 @@
 
 namespace ZORToolkit {
 
+/// "#rrggbb"; how opaque it is is left out.
+std::string ColourText(const std::array<std::uint8_t, 4>& inColour);
+
 /// Triangles of one colour, one after the other.
 struct ColourRange {
   std::string colour;  ///< "#rrggbb"; empty: that of the product

@@ -42,12 +42,6 @@ Coefficients CoefficientsOf(const ZORMathTransformation& inTransformation) {
   return numbers;
 }
 
-std::string ColourText(const std::array<std::uint8_t, 4>& inColour) {
-  char text[8];
-  std::snprintf(text, sizeof text, "#%02x%02x%02x", inColour[0], inColour[1], inColour[2]);
-  return text;
-}
-
 /// Seven digits are finer than what positions are rounded to.
 double Rounded(double inNumber) {
   if (inNumber == 0 || !std::isfinite(inNumber)) return 0;
