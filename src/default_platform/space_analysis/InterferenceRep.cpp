@@ -15,7 +15,6 @@ namespace {
 
 using namespace ZORFoundation;
 
-
 std::array<float, 3> Rounded(const ZORMathVector& inVector) {
   return {static_cast<float>(inVector.x), static_cast<float>(inVector.y),
           static_cast<float>(inVector.z)};

@@ -33,7 +33,8 @@ ZORMathVector RightOf(const ZORMathVector& inForward, const ZORMathVector& inUp)
 double PixelSize(const ZOR3DViewpoint& inViewpoint, int inHeight) {
   if (inViewpoint.projection == ZOR3DViewpoint::kCylindric)
     return PositiveOr(inViewpoint.viewHeight, 1) / inHeight;
-  const double angle = std::min(PositiveOr(inViewpoint.viewAngle, std::numbers::pi / 6), kMaxViewAngle);
+  const double angle =
+      std::min(PositiveOr(inViewpoint.viewAngle, std::numbers::pi / 6), kMaxViewAngle);
   return 2 * std::tan(angle / 2) / inHeight;
 }
 

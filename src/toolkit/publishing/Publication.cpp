@@ -267,8 +267,8 @@ class Publication {
 
   /// Where the interferences are in the overview: the middle of their points.
   void MakeMap(const PictureStore& inStore) {
-    published_.map =
-        pictures_.Refer(folder_, inStore.Reference(inStore.PictureName(kOverviewNumber)), options_.size);
+    published_.map = pictures_.Refer(
+        folder_, inStore.Reference(inStore.PictureName(kOverviewNumber)), options_.size);
     if (published_.map.empty()) return;
     published_.mapRatio = static_cast<double>(options_.size.height) / options_.size.width;
     const PictureCamera camera = OverviewCamera(*overview_, options_.size);

@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstdlib>
 #include <map>
 #include <ostream>
 #include <set>
@@ -160,7 +161,10 @@ TEST_P(RealModels, OpenWithAllThatTheyHoldAndAreSeen) {
   ExpectEachProductToBeSeenAlone(model);
 }
 
+// Guards the numbers above, not our reading; of the largest model it takes as long as of all others together.
 TEST_P(RealModels, NumbersAreThoseOfAnIndependentCount) {
+  if (path_.ends_with("opendog_v2_20.stp") && std::getenv("ZOR_COUNT_ALL") == nullptr)
+    GTEST_SKIP() << "set ZOR_COUNT_ALL to count the largest model too";
   ExpectCount(products::CountIndependently(path_), GetParam(), 0.001);
 }
 
