@@ -224,7 +224,7 @@ class Publication {
       items.push_back({published_.interferences[n].number, costs.Of(resolved_[n])});
     for (const Before& before : before_)
       items.push_back({-before.record.index, costs.Of(before.resolved)});
-    items.push_back({kOverview, costs.OfAll(inRoot)});
+    items.push_back({kOverviewNumber, costs.OfAll(inRoot)});
     return items;
   }
 
