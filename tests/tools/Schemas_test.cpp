@@ -140,6 +140,8 @@ TEST(JsonSchemas, AcceptWhatIsPrinted) {
   addOf("tree", "--leaves samples/as1-oc-214.stp");
   addOf("tree", "--depth 1 samples/as1-oc-214.stp");
   add("plan", Printed("detect --plan --shares 3 --json --only 'rod*' samples/as1-oc-214.stp"));
+  add("plan",
+      Printed("publish --plan --shares 2 --json --model samples/as1-oc-214.stp " + kSample));
   const std::string mine = folder.Path("mine.xml"), theirs = folder.Path("theirs.xml");
   const std::string set = "review set " + kSample + " --only type=contact --comment ";
   Printed(set + "mine -o " + mine);
@@ -148,8 +150,8 @@ TEST(JsonSchemas, AcceptWhatIsPrinted) {
                             folder.Path("m.xml") + " --json")
                        .out);
   EXPECT_EQ(JsonComplaints(documents), "");
-  // Those of convert and review have other names: see the next test.
-  std::vector<std::string> printing = {"convert", "review"};
+  // Those of convert and review have other names: see the next test. What detect and publish print is their plan.
+  std::vector<std::string> printing = {"convert", "review", "detect", "publish"};
   for (const auto& [verb, count] : verbs) printing.push_back(verb);
   for (const std::string& help : FilesIn("tests/golden", "help_", ".txt")) {
     const std::string verb = help.substr(help.find('_') + 1, help.find('.') - help.find('_') - 1);
