@@ -185,7 +185,7 @@ std::vector<PyGroup> Group(const py::object& inResult,
 
 void DefineGroup(py::module_& ioModule) {
   py::class_<PyGroup>(ioModule, "Group", "Interferences that belong together; see group().")
-      .def_property_readonly("id", [](const PyGroup& inGroup) { return inGroup.group->id; })
+      .def_property_readonly("id", [](const PyGroup& inGroup) { return inGroup.group->Id(); })
       .def_property_readonly("by", [](const PyGroup& inGroup) { return Name(inGroup.group->by); })
       .def_property_readonly("label",
                              [](const PyGroup& inGroup) { return TextFrom(inGroup.group->label); })

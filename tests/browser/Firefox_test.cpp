@@ -137,10 +137,10 @@ TEST(Firefox, ShowsSettlesAndTurnsAPage) {
   ASSERT_EQ(made.code, 0) << made.error;
   Firefox browser;
   browser.Open(page);
-  EXPECT_EQ(
-      browser.Value("const p = document.images; await Promise.all([...p].filter(i => i.getAttribute('src')).map(i => i.decode()));"
-                    "return document.querySelectorAll('tr[data-n]').length"),
-      32);
+  EXPECT_EQ(browser.Value("const p = document.images; await Promise.all([...p].filter(i => "
+                          "i.getAttribute('src')).map(i => i.decode()));"
+                          "return document.querySelectorAll('tr[data-n]').length"),
+            32);
   EXPECT_EQ(browser.Value("for (const key of ['j', 'r']) document.body.dispatchEvent("
                           "new KeyboardEvent('keydown', {key, bubbles: true}));"
                           "return document.querySelector('tr[data-n=\"1\"]').dataset.status"),

@@ -108,7 +108,11 @@ void RequireAll(const std::vector<ShareManifest>& inSorted) {
   std::uint32_t next = 1, count = 0;
   const auto miss = [&](std::uint32_t inEnd) {
     for (; next < inEnd; ++next)
-      if (++count <= 10) missing += " " + std::to_string(next) + "/" + std::to_string(first.count);
+      if (++count <= 10)
+        missing.append(" ")
+            .append(std::to_string(next))
+            .append("/")
+            .append(std::to_string(first.count));
   };
   for (const ShareManifest& share : inSorted) {
     miss(share.shard.number);
