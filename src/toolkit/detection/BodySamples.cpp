@@ -142,7 +142,7 @@ Sample BodyPair::SampleAt(std::size_t inSide, const gp_XYZ& inCommonPoint) {
 
 /// Compass search over the boundary. The compass turns, so that it also finds its way along ridges.
 Sample BodyPair::Climb(Sample inStart, double inStep, int inMaxTries) {
-  constexpr int kDirections = 8;
+  constexpr int kTurns = 8;
   constexpr double kTurn = 0.35, kStretch = 1.6;
   Sample best = inStart;
   double step = inStep, offset = 0;
@@ -150,8 +150,8 @@ Sample BodyPair::Climb(Sample inStart, double inStep, int inMaxTries) {
     const gp_XYZ normal = best.normal.Modulus() > 0 ? best.normal : gp_XYZ(0, 0, 1);
     const auto [x, y] = Across(normal);
     bool isBetter = false;
-    for (int k = 0; k < kDirections && !isBetter; ++k, --inMaxTries) {
-      const double angle = offset + k * 2 * M_PI / kDirections;
+    for (int k = 0; k < kTurns && !isBetter; ++k, --inMaxTries) {
+      const double angle = offset + k * 2 * M_PI / kTurns;
       const Sample next =
           SampleAt(best.side, best.point + (x * std::cos(angle) + y * std::sin(angle)) * step);
       if (!next.depth.foot.IsFound() || next.depth.value <= best.depth.value + 1e-9) continue;

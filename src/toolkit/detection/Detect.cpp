@@ -23,7 +23,7 @@ namespace {
 
 constexpr const char* kSeparator = " --++-- ";
 constexpr double kRigid = 1e-6;
-constexpr std::size_t kMaxCurvePoints = 32;  // of one pair of parts
+constexpr std::size_t kMaxPairPoints = 32;  // of one pair of parts
 
 /// A leaf of the tree, and what it counts as.
 struct Leaf {
@@ -62,8 +62,11 @@ class TreeReading {
              std::vector<std::string> inNames, int inLevel, std::optional<std::size_t> inUnit) {
     ZORDefault::ProductInfo info;
     if (!ZORDefault::GetProductInfo(inProduct.GetInterface(), info)) return;
-    const std::string path =
-        inLevel == 0 ? "" : (inPath.empty() ? "" : inPath + kSeparator) + Utf8(info.alias);
+    std::string path;
+    if (inLevel > 0) {
+      if (!inPath.empty()) path.append(inPath).append(kSeparator);
+      path += Utf8(info.alias);
+    }
     const std::string partName = Utf8(info.partName);
     partNames_.emplace(static_cast<std::uint32_t>(info.part), partName);
     if (inLevel > 0) inNames.push_back(path);
@@ -75,7 +78,11 @@ class TreeReading {
     if (!inUnit && (options_.level ? inLevel == *options_.level || isLeaf : isLeaf) &&
         inLevel > 0) {
       inUnit = units_.size();
-      Unit unit{{path, partName, {}}, inNames};
+      // Filled one by one: GCC 12 frees the parts of such a value twice when one of them has no memory.
+      Unit unit;
+      unit.product.path = path;
+      unit.product.partName = partName;
+      unit.names = inNames;
       info.rootFromProduct.GetCoefficients(unit.product.rootFromProduct.data());
       units_.push_back(std::move(unit));
     }
@@ -312,7 +319,7 @@ class Detection {
     std::map<std::pair<std::size_t, std::size_t>, DetectedInterference> byUnits;
     for (const ZORDetection::Interference& found : inFindings.interferences) {
       DetectedInterference interference = ToInterference(found);
-      interference.curve = PointsAlong(inFindings, found, products, kMaxCurvePoints);
+      interference.curve = PointsAlong(inFindings, found, products, kMaxPairPoints);
       interference.first = chosen_[found.first].unit;
       interference.second = chosen_[found.second].unit;
       const auto [place, isNew] =

@@ -11,7 +11,7 @@
 namespace ZORToolkit {
 namespace {
 
-constexpr std::size_t kMaxCurvePoints = 32;
+constexpr std::size_t kMaxWrittenPoints = 32;
 
 std::string Escaped(const std::string& inText) { return Utf8(AttributeValue(FromUtf8(inText))); }
 
@@ -98,7 +98,7 @@ class ResultWriter {
     out_ << "      <GeometricAspect IntersectCurveLength=\"" << NumberText(inFound.curveLength)
          << "\" ExtractOrDistValue=\"" << NumberText(inFound.value) << "\">\n";
     for (const auto& point : inFound.points) WritePoint(point, "        ");
-    const std::size_t count = std::min(inFound.curve.size(), kMaxCurvePoints);
+    const std::size_t count = std::min(inFound.curve.size(), kMaxWrittenPoints);
     for (std::size_t i = 0; i < count; ++i)
       WritePoint(inFound.curve[i * inFound.curve.size() / count], "        ");
     out_ << "      </GeometricAspect>\n";

@@ -22,8 +22,8 @@ constexpr char kSystem[] = "ZORLyra";
 constexpr double kMetresOfMillimetres = 0.001;
 constexpr double kPi = 3.14159265358979323846;
 constexpr std::size_t kManyComponents = 1000;
-constexpr const char* kStatuses[] = {"Not inspected", "Relevant", "Irrelevant"};
-constexpr const char* kTypes[] = {"Clash", "Contact", "Clearance", "Interference"};
+constexpr const char* kTopicStatuses[] = {"Not inspected", "Relevant", "Irrelevant"};
+constexpr const char* kTopicTypes[] = {"Clash", "Contact", "Clearance", "Interference"};
 
 std::string Quoted(const std::string& inText) { return "\"" + inText + "\""; }
 
@@ -193,16 +193,16 @@ class BcfFileWriter {
     XmlText xml;
     if (is30_) {
       xml.Open("Extensions");
-      WriteWords("TopicTypes", "TopicType", kTypes, xml);
-      WriteWords("TopicStatuses", "TopicStatus", kStatuses, xml);
+      WriteWords("TopicTypes", "TopicType", kTopicTypes, xml);
+      WriteWords("TopicStatuses", "TopicStatus", kTopicStatuses, xml);
       WriteWords("TopicLabels", "TopicLabel", labels, xml);
       WriteWords("Users", "User", users, xml);
       return xml.Close().Take();
     }
     xml.Open("xs:schema", {{"xmlns:xs", "http://www.w3.org/2001/XMLSchema"}});
     xml.Open("xs:redefine", {{"schemaLocation", "markup.xsd"}});
-    WriteEnumeration("TopicType", kTypes, xml);
-    WriteEnumeration("TopicStatus", kStatuses, xml);
+    WriteEnumeration("TopicType", kTopicTypes, xml);
+    WriteEnumeration("TopicStatus", kTopicStatuses, xml);
     if (!labels.empty()) WriteEnumeration("TopicLabel", labels, xml);
     WriteEnumeration("UserIdType", users, xml);
     return xml.Close().Close().Take();

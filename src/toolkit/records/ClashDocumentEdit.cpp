@@ -13,15 +13,15 @@
 namespace ZORToolkit {
 namespace {
 
-struct WordKey {
+struct ValueWord {
   const char* word;
   const char* key;  // in the message catalogue
 };
-constexpr WordKey kWords[] = {{"Relevant", "Relevant"},
-                              {"Irrelevant", "Irrelevant"},
-                              {"Not inspected", "NotInspected"},
-                              {"Old", "Old"},
-                              {"New", "New"}};
+constexpr ValueWord kWords[] = {{"Relevant", "Relevant"},
+                                {"Irrelevant", "Irrelevant"},
+                                {"Not inspected", "NotInspected"},
+                                {"Old", "Old"},
+                                {"New", "New"}};
 
 /// The reference is written as an attribute's value.
 ZORUnicodeString StyleSheetOf(const Prologue& inPrologue) {
@@ -43,7 +43,7 @@ bool IsXmlName(const std::string& inText) {
 
 void ClashDocumentEdit::SetWord(const ElementHandle& inInterference, const char* inAttribute,
                                 const std::string& inWord) {
-  const auto known = std::ranges::find(kWords, inWord, &WordKey::word);
+  const auto known = std::ranges::find(kWords, inWord, &ValueWord::word);
   const std::string word =
       known == std::end(kWords)
           ? inWord

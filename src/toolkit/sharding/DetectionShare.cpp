@@ -15,7 +15,7 @@ namespace ZORToolkit {
 namespace {
 
 constexpr char kFindings[] = "findings.bin";
-constexpr std::size_t kTried = 24;
+constexpr std::size_t kTriedPairs = 24;
 
 std::string HashOfPlan(const DetectionResult& inResult) {
   ZORFoundation::Hash64 hash;
@@ -74,7 +74,7 @@ DetectionResult GatherDetection(const std::string& inModel, DetectionOptions inO
 }
 
 WorkSample SampleDetection(const std::string& inModel, DetectionOptions inOptions) {
-  inOptions.tried = kTried;
+  inOptions.tried = kTriedPairs;
   return Detect(inModel, inOptions).work;
 }
 

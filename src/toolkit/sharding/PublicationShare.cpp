@@ -21,7 +21,7 @@ namespace {
 
 constexpr char kCameras[] = "cameras.txt", kPictures[] = "pictures/";
 constexpr char kNothing[] = "nothing to draw";
-constexpr std::size_t kTried = 24, kNamesAtOnce = 1000;
+constexpr std::size_t kTriedPictures = 24, kNamesAtOnce = 1000;
 
 std::string HashOfPlan(const std::vector<DrawingItem>& inItems) {
   ZORFoundation::Hash64 hash;
@@ -158,7 +158,7 @@ class DrawingOfSample : public SharedDrawing {
  public:
   std::vector<std::size_t> Choose(const std::vector<DrawingItem>& inItems) override {
     sample.costs = CostsOf(inItems);
-    tried_ = ItemsToTry(sample.costs, kTried);
+    tried_ = ItemsToTry(sample.costs, kTriedPictures);
     return tried_;
   }
   void Begin(const PictureStore&) override { sample.openSeconds = Lap(); }
