@@ -9,7 +9,7 @@
 
 #include "default_platform/ReaderProgram.h"
 #include "default_platform/product_structure/model_reader/DocumentReading.h"
-#include "default_platform/product_structure/model_reader/FileDoor.h"
+#include "default_platform/product_structure/model_reader/FileSandbox.h"
 #include "default_platform/product_structure/model_reader/MeshBuilder.h"
 #include "default_platform/product_structure/model_reader/ModelChecks.h"
 #include "default_platform/product_structure/model_reader/TreeWalk.h"

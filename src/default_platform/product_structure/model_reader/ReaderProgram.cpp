@@ -17,7 +17,7 @@
 #include <optional>
 #include <utility>
 
-#include "default_platform/product_structure/model_reader/FileDoor.h"
+#include "default_platform/product_structure/model_reader/FileSandbox.h"
 #include "default_platform/product_structure/model_reader/ObjFaces.h"
 #include "foundation/Descriptor.h"
 #include "foundation/ReadWholeFile.h"
@@ -83,7 +83,7 @@ int Run(char** inArguments) try {
   if (request.format == ModelFormat::kObj)
     if (std::optional<std::string> other = ObjWithoutLargeFaces(bytes))
       Replace(bytes, *std::move(other));
-  CloseDoorBehind(request.path, ModelReaderProtocol::kModel);
+  EnterFileSandbox(request.path, ModelReaderProtocol::kModel);
   return Answer(ModelReaderProtocol::kExitRead, AnswerTo(request, bytes));
 } catch (const Refusal& refusal) {
   return Refuse(refusal.reason);

@@ -1,6 +1,6 @@
-// The one way by which this program opens files.
-#ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_FILEDOOR_H
-#define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_FILEDOOR_H
+// What this program may open: the model, and regular files in its folder.
+#ifndef ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_FILESANDBOX_H
+#define ZOR_DEFAULT_PLATFORM_PRODUCT_STRUCTURE_MODEL_READER_FILESANDBOX_H
 
 #include <string>
 #include <vector>
@@ -14,7 +14,7 @@ namespace ZORDefault {
 /// folder or below it gives its bytes as they were when it was opened first; all else is refused. The
 /// CAD kernel opens what a model names, which may be a pipe or a device, under names that only it
 /// decodes.
-void CloseDoorBehind(const std::string& inModelPath, int inModelBytes);
+void EnterFileSandbox(const std::string& inModelPath, int inModelBytes);
 
 /// What became of a file that the model names, whether it was opened or not.
 ReferencedFile ReferencedFileAt(const std::string& inName);

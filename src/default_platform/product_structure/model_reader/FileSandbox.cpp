@@ -1,4 +1,4 @@
-#include "default_platform/product_structure/model_reader/FileDoor.h"
+#include "default_platform/product_structure/model_reader/FileSandbox.h"
 
 #include <fcntl.h>
 #include <sys/mman.h>
@@ -34,9 +34,9 @@ int Reopen(int inDescriptor) {
   return OpenDirectly(path, O_RDONLY);
 }
 
-class FileDoor {
+class FileSandbox {
  public:
-  FileDoor(const std::string& inModelPath, int inModelBytes)
+  FileSandbox(const std::string& inModelPath, int inModelBytes)
       : modelPath_(fs::path(inModelPath).lexically_normal()),
         folder_(fs::canonical(modelPath_.parent_path())),
         modelBytes_(inModelBytes) {}
@@ -143,38 +143,38 @@ class FileDoor {
   bool isReading_ = false;  // this opens a file itself
 };
 
-std::optional<FileDoor>& Door() {
-  static std::optional<FileDoor> door;
-  return door;
+std::optional<FileSandbox>& Sandbox() {
+  static std::optional<FileSandbox> sandbox;
+  return sandbox;
 }
 
-int OpenThroughDoor(const char* inPath, bool inWrites, int inFlags) {
-  if (!Door() || Door()->IsReading()) return OpenDirectly(inPath, inFlags);
-  if (!inWrites && inPath != nullptr) return Door()->Open(inPath);
+int OpenInSandbox(const char* inPath, bool inWrites, int inFlags) {
+  if (!Sandbox() || Sandbox()->IsReading()) return OpenDirectly(inPath, inFlags);
+  if (!inWrites && inPath != nullptr) return Sandbox()->Open(inPath);
   errno = EACCES;
   return -1;
 }
 
 std::FILE* OpenStream(const char* inPath, const char* inMode) {
   const bool writes = std::strpbrk(inMode, "wa+") != nullptr;
-  const int descriptor = OpenThroughDoor(inPath, writes, O_RDONLY);
+  const int descriptor = OpenInSandbox(inPath, writes, O_RDONLY);
   return descriptor < 0 ? nullptr : fdopen(descriptor, "r");
 }
 
 int OpenDescriptor(const char* inPath, int inFlags) {
-  return OpenThroughDoor(inPath, (inFlags & O_ACCMODE) != O_RDONLY, inFlags);
+  return OpenInSandbox(inPath, (inFlags & O_ACCMODE) != O_RDONLY, inFlags);
 }
 
 }  // namespace
 
-void CloseDoorBehind(const std::string& inModelPath, int inModelBytes) {
-  Door().emplace(inModelPath, inModelBytes);
+void EnterFileSandbox(const std::string& inModelPath, int inModelBytes) {
+  Sandbox().emplace(inModelPath, inModelBytes);
 }
 
-ReferencedFile ReferencedFileAt(const std::string& inName) { return Door()->At(inName); }
-std::string FirstNonRegularFile() { return Door()->FirstNonRegular(); }
-std::vector<std::string> RefusedFiles() { return Door()->Refused(); }
-bool HasChangedFile() { return Door()->HasChanged(); }
+ReferencedFile ReferencedFileAt(const std::string& inName) { return Sandbox()->At(inName); }
+std::string FirstNonRegularFile() { return Sandbox()->FirstNonRegular(); }
+std::vector<std::string> RefusedFiles() { return Sandbox()->Refused(); }
+bool HasChangedFile() { return Sandbox()->HasChanged(); }
 
 }  // namespace ZORDefault
 
