@@ -18,6 +18,7 @@ struct ModelProgram {
   std::uint64_t memory = 0;  ///< bytes that this takes besides reading, which has limits
   /// Told each line that it has for its caller; false: it is asked to end soon with what it has.
   std::function<bool(std::string_view)> tell;
+  int kept = -1;  ///< an open file to which it appends what it has so far; -1: none
 };
 
 /// Runs a program on a model file. Reading has the limits of the options; the rest as much time as it

@@ -191,6 +191,69 @@ TEST_F(Shares, AreMendedByWhatIsMissing) {
   EXPECT_THAT(WhyRefused(shares), HasSubstr("is missing or damaged"));
 }
 
+TEST_F(Shares, OfAPageInOneFileGoOn) {
+  MakeResult();
+  const std::string page = folder_.Path("page.html"), one = folder_.Path("one.html");
+  ASSERT_EQ(Run(PublishWords(), {"-o", one}).code, 0);
+  const std::string share = folder_.Path("share.html"), other = folder_.Path("other.html");
+  const Words first = {"--shard", "1/2", "--resume", "-o", share};
+  EXPECT_THAT(Run(PublishWords(), first).out, testing::EndsWith(" items\n"));
+  EXPECT_THAT(Run(PublishWords(), first).out, HasSubstr("was there already"));
+  const auto whole = Content(share);
+  EXPECT_EQ(whole.count("pictures/interference_1.png"), 1u);
+  // As a run leaves it that was killed between two pictures.
+  std::string manifest = ReadFile(share + "/share.json");
+  manifest.replace(manifest.find("\"complete\": true"), 16, "\"complete\": false");
+  std::ofstream(share + "/share.json") << manifest;
+  fs::remove(share + "/pictures/interference_2.png");
+  EXPECT_THAT(Run({"gather", share, share, "-o", page}, {}).error, HasSubstr("is there twice"));
+  EXPECT_EQ(Run(PublishWords(), first).code, 0);
+  EXPECT_THAT(Differences(share, whole), IsEmpty());
+  EXPECT_EQ(Run(PublishWords(), {"--shard", "2/2", "--resume", "-o", other}).code, 0);
+  const CommandResult gathered = Gather({share, other}, page);
+  EXPECT_EQ(gathered.error, "");
+  EXPECT_THAT(Differences(page, Content(one)), IsEmpty());
+  // What is asked for is another share now: nothing of this one stays.
+  const CommandResult anew = Run({"publish", result_, "--model", model_, "--size", "20x20"}, first);
+  EXPECT_EQ(anew.error, "lyra: warning: " + share +
+                            ": held a foreign share: its option size is \"30x20\", another than is "
+                            "asked for; it is made anew\n");
+  EXPECT_NE(ReadFile(share + "/pictures/interference_1.png"),
+            whole.at("pictures/interference_1.png"));
+}
+
+TEST_F(Shares, OfADetectionGoOnWhereTheyWereKilled) {
+  ASSERT_EQ(Run(DetectWords(), {"-o", result_}).code, 0);
+  const std::string share = folder_.Path("share"), checkpoint = share + "/findings.part";
+  const Words whole = {"--shard", "1/1", "--resume", "--jobs", "1", "-o", share};
+  // The end of a run that cannot write its findings leaves what a killed one does.
+  const auto leftBy = [&](const Words& inWords) {
+    fs::remove(share + "/findings.bin");
+    fs::create_directories(share + "/findings.bin");
+    EXPECT_EQ(Run(inWords, whole).code, 1);
+    return ReadFile(checkpoint);
+  };
+  const std::string all = leftBy(DetectWords());
+  std::ofstream(checkpoint) << all.substr(0, all.size() / 2);
+  const std::string more = leftBy(DetectWords());
+  EXPECT_EQ(more.substr(0, all.size() / 3), all.substr(0, all.size() / 3));
+  EXPECT_GT(more.size(), all.size());                   // a second start, and nothing is lost
+  EXPECT_LT(more.size(), all.size() + all.size() / 4);  // but nothing is found again
+  const Words otherWords = {"detect", model_, "--clearance", "2"};
+  const std::string others = leftBy(otherWords);  // does not go on with that of another work
+  EXPECT_EQ(others.size(), all.size());
+  leftBy(DetectWords());
+  std::ofstream(checkpoint) << others;
+  EXPECT_EQ(leftBy(DetectWords()).size(), all.size());
+  std::ofstream(checkpoint, std::ios::app) << "cut off";
+  fs::remove(share + "/findings.bin");
+  EXPECT_EQ(Run(DetectWords(), whole).out, share + ": share 1/1, 28 items\n");
+  EXPECT_FALSE(fs::exists(checkpoint));
+  const std::string out = folder_.Path("gathered.xml");
+  EXPECT_EQ(Gather({share}, out).error, "");
+  EXPECT_EQ(ReadFile(out), ReadFile(result_));
+}
+
 TEST_F(Shares, ThatAreNoneAreWrongUsage) {
   for (const char* const shard : {"0/3", "4/3", "x/y", "1/0", "1", "1/3/5", "-1/3", "1/9999999"}) {
     const CommandResult refused = Run(DetectWords(), {"--shard", shard, "-o", folder_.Path("x")});

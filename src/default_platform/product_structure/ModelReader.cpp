@@ -38,12 +38,16 @@ typedef std::chrono::steady_clock Clock;
 
 /// Above the descriptors that the reader is given, so that none is overwritten while they are put
 /// in their places.
-Descriptor Raised(int inDescriptor) {
+Descriptor RaisedCopy(int inDescriptor) {
   constexpr int kMinDescriptor = 16;
-  const Descriptor original(inDescriptor);
   Descriptor raised(fcntl(inDescriptor, F_DUPFD_CLOEXEC, kMinDescriptor));
   if (!raised.IsOpen()) RaiseSystemError("no file can be opened", errno);
   return raised;
+}
+
+Descriptor Raised(int inDescriptor) {
+  const Descriptor original(inDescriptor);
+  return RaisedCopy(inDescriptor);
 }
 
 Descriptor MemoryFile(std::string_view inBytes) {
@@ -83,6 +87,7 @@ class SpawnRequest {
 
   void Give(const Descriptor& inDescriptor, int inNumber) {
     posix_spawn_file_actions_adddup2(&actions_, inDescriptor.Get(), inNumber);
+    next_ = std::max(next_, inNumber + 1);
   }
 
   /// Signals as they are by default; all other descriptors closed; its standard ones on the null
@@ -90,7 +95,7 @@ class SpawnRequest {
   pid_t Spawn(const std::vector<std::string>& inArguments) {
     for (const int standard : {0, 1, 2})
       posix_spawn_file_actions_addopen(&actions_, standard, "/dev/null", O_RDWR, 0);
-    posix_spawn_file_actions_addclosefrom_np(&actions_, ModelReaderProtocol::kTask + 1);
+    posix_spawn_file_actions_addclosefrom_np(&actions_, next_);
     sigset_t signals;
     sigfillset(&signals);
     posix_spawnattr_setsigdefault(&attributes_, &signals);
@@ -111,6 +116,7 @@ class SpawnRequest {
  private:
   posix_spawn_file_actions_t actions_;
   posix_spawnattr_t attributes_;
+  int next_ = 3;  // the first descriptor that is not given
 };
 
 /// A process that never outlives this object.
@@ -268,6 +274,8 @@ std::string ReadModelInChild(const ModelRequest& inRequest, std::string_view inB
   request.Give(result, ModelReaderProtocol::kResult);
   request.Give(status.write, ModelReaderProtocol::kStatus);
   request.Give(task, ModelReaderProtocol::kTask);
+  const Descriptor kept = inProgram.kept < 0 ? Descriptor() : RaisedCopy(inProgram.kept);
+  if (kept.IsOpen()) request.Give(kept, ModelReaderProtocol::kKept);
   const pid_t process = request.Spawn({reader, std::to_string(static_cast<int>(inRequest.format)),
                                        deflection, std::to_string(inLimits.memory),
                                        std::to_string(inLimits.seconds), inRequest.path});

@@ -42,6 +42,7 @@ struct ModelReaderProtocol {
   /// one of these the model is read and time has no limit.
   static constexpr int kStatus = 5;
   static constexpr int kTask = 6;  ///< what is to be done with the model, if anything
+  static constexpr int kKept = 7;  ///< where the task says so: takes what is done so far
   static constexpr int kExitRead = 0;
   static constexpr int kExitRefused = 2;
   static constexpr int kExitOutOfMemory = 3;

@@ -295,7 +295,9 @@ class Detection {
                                                                : ZORDetection::SheetPolicy::kIgnore;
     options.threads = options_.threads != 0 ? options_.threads
                                             : std::max(1U, std::thread::hardware_concurrency());
+    task_.isKept = options_.kept >= 0;
     ZORDefault::ModelProgram program;
+    program.kept = options_.kept;
     program.path = ZORDetection::kInterferenceFinderPath;
     program.task = Encode(task_);
     program.memory =

@@ -41,7 +41,8 @@ struct DetectionOptions {
 
   Shard shard;                     ///< of the verdicts only those of this share are found
   std::vector<std::string> known;  ///< findings of other runs, which are not looked for again
-  std::size_t tried = 0;           ///< more than 0: only so many verdicts, timed one after another
+  int kept = -1;          ///< an open file to which records of what is found are appended; -1: none
+  std::size_t tried = 0;  ///< more than 0: only so many verdicts, timed one after another
 
   std::function<void(double)> readingProgress;             ///< told the share, 0 to 1; may be empty
   std::function<bool(std::size_t, std::size_t)> progress;  ///< told pairs done of all; false: stop

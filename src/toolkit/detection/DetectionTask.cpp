@@ -3,9 +3,12 @@
 #include <algorithm>
 #include <cstring>
 #include <iterator>
+#include <optional>
 #include <stdexcept>
 #include <type_traits>
 #include <utility>
+
+#include "foundation/Hash.h"
 
 namespace ZORDetection {
 namespace {
@@ -134,6 +137,7 @@ void Fields(Packing& ioPacking, Item& ioItem) {
   ioPacking(ioItem.options.known);
   ioPacking(ioItem.options.tried);
   ioPacking(ioItem.products);
+  ioPacking(ioItem.isKept);
 }
 
 template <typename Item>
@@ -151,17 +155,12 @@ Item Unpacked(std::string_view inBytes) {
   return item;
 }
 
-}  // namespace
+bool IsSameWork(const Findings& inOne, const Findings& inOther) {
+  return inOne.costs == inOther.costs && inOne.pairsChecked == inOther.pairsChecked;
+}
 
-std::string Encode(const DetectionTask& inTask) { return Packed(inTask); }
-DetectionTask DecodeTask(std::string_view inBytes) { return Unpacked<DetectionTask>(inBytes); }
-std::string Encode(const Findings& inFindings) { return Packed(inFindings); }
-Findings DecodeFindings(std::string_view inBytes) { return Unpacked<Findings>(inBytes); }
-
-bool TakeIn(Findings inOther, Findings& ioFindings) {
+void Append(Findings inOther, Findings& ioFindings) {
   const auto isOfPart = [](const Unjudged& inUnjudged) { return !inUnjudged.other; };
-  if (inOther.costs != ioFindings.costs || inOther.pairsChecked != ioFindings.pairsChecked)
-    return false;
   const auto append = [](auto& ioTo, auto& ioFrom) {
     ioTo.insert(ioTo.end(), std::make_move_iterator(ioFrom.begin()),
                 std::make_move_iterator(ioFrom.end()));
@@ -175,6 +174,10 @@ bool TakeIn(Findings inOther, Findings& ioFindings) {
   append(ioFindings.unjudged, inOther.unjudged);
   append(ioFindings.interferences, inOther.interferences);
   append(ioFindings.judged, inOther.judged);
+}
+
+/// Brings findings into the order of one run. @return false when a verdict is there twice.
+bool Sort(Findings& ioFindings) {
   std::ranges::sort(ioFindings.judged);
   std::ranges::sort(ioFindings.interferences, {}, [](const Interference& inFound) {
     return std::pair(inFound.first, inFound.second);
@@ -183,6 +186,53 @@ bool TakeIn(Findings inOther, Findings& ioFindings) {
     return std::pair(inUnjudged.other.has_value(), inUnjudged.verdict);
   });
   return std::ranges::adjacent_find(ioFindings.judged) == ioFindings.judged.end();
+}
+
+/// Takes the next record off the bytes. @return nothing where none is whole.
+std::optional<Findings> NextRecord(std::string_view& ioBytes) {
+  std::uint64_t head[2];  // its length and its hash
+  if (ioBytes.size() < sizeof head) return std::nullopt;
+  std::memcpy(head, ioBytes.data(), sizeof head);
+  const std::string_view rest = ioBytes.substr(sizeof head);
+  if (head[0] > rest.size()) return std::nullopt;
+  const std::string_view record = rest.substr(0, head[0]);
+  if (ZORFoundation::Hash64Of(record) != head[1]) return std::nullopt;
+  ioBytes = rest.substr(head[0]);
+  return DecodeFindings(record);
+}
+
+}  // namespace
+
+std::string Encode(const DetectionTask& inTask) { return Packed(inTask); }
+DetectionTask DecodeTask(std::string_view inBytes) { return Unpacked<DetectionTask>(inBytes); }
+std::string Encode(const Findings& inFindings) { return Packed(inFindings); }
+Findings DecodeFindings(std::string_view inBytes) { return Unpacked<Findings>(inBytes); }
+
+bool TakeIn(Findings inOther, Findings& ioFindings) {
+  if (!IsSameWork(inOther, ioFindings)) return false;
+  Append(std::move(inOther), ioFindings);
+  return Sort(ioFindings);
+}
+
+std::string EncodeRecord(const Findings& inFindings) {
+  const std::string bytes = Encode(inFindings);
+  const std::uint64_t head[2] = {bytes.size(), ZORFoundation::Hash64Of(bytes)};
+  return std::string(reinterpret_cast<const char*>(head), sizeof head) + bytes;
+}
+
+KeptFindings DecodeRecords(std::string_view inBytes) {
+  KeptFindings kept;
+  std::string_view left = inBytes;
+  while (std::optional<Findings> record = NextRecord(left)) {
+    const bool isStart = record->judged.empty();
+    if (kept.size == 0 ? !isStart : isStart && !IsSameWork(*record, kept.findings)) break;
+    if (kept.size == 0)
+      kept.findings = *std::move(record);
+    else if (!isStart)
+      Append(*std::move(record), kept.findings);
+    kept.size = inBytes.size() - left.size();
+  }
+  return Sort(kept.findings) ? kept : KeptFindings();
 }
 
 }  // namespace ZORDetection

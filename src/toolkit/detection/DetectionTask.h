@@ -23,6 +23,7 @@ struct TaskProduct {
 struct DetectionTask {
   Options options;  ///< without its functions
   std::vector<TaskProduct> products;
+  bool isKept = false;  ///< records of what is found so far go to ModelReaderProtocol::kKept
 };
 
 // Both run on one machine from one build, so numbers keep the bytes that they have in memory. Decoding
@@ -36,6 +37,18 @@ Findings DecodeFindings(std::string_view inBytes);
 /// Adds the findings of another share of the same work, in the order of one run.
 /// @return false when they are of other work, or a verdict is in both.
 bool TakeIn(Findings inOther, Findings& ioFindings);
+
+/// What a run appends to a file while it finds, so that this outlives it: first a record without
+/// verdicts, then one for each.
+std::string EncodeRecord(const Findings& inFindings);
+
+struct KeptFindings {
+  Findings findings;
+  std::size_t size = 0;  ///< in bytes, of the records that are whole; 0: nothing is known
+};
+/// @param inBytes of one run or of several, each of which went on with what the ones before had found.
+/// Whatever follows a record that is cut off or damaged is left out.
+KeptFindings DecodeRecords(std::string_view inBytes);
 
 }  // namespace ZORDetection
 

@@ -9,6 +9,7 @@
 
 #include "default_platform/ModelShapes.h"
 #include "default_platform/ReaderProgram.h"
+#include "foundation/Descriptor.h"
 #include "foundation/ReadWholeFile.h"
 #include "toolkit/detection/DetectionTask.h"
 
@@ -39,6 +40,13 @@ class Progress {
 DetectionTask TakeTask() {
   lseek(ZORDefault::ModelReaderProtocol::kTask, 0, SEEK_SET);
   return DecodeTask(ZORFoundation::ReadToEnd(ZORDefault::ModelReaderProtocol::kTask, "task"));
+}
+
+/// What cannot be written is found again by who goes on.
+void Keep(const Findings& inFindings) {
+  std::size_t written = 0;
+  ZORFoundation::WriteAll(ZORDefault::ModelReaderProtocol::kKept, EncodeRecord(inFindings),
+                          written);
 }
 
 /// Parts that products show, which alone are measured.
@@ -89,6 +97,11 @@ Findings Find(const ZORDefault::ModelRequest& inRequest) {
   };
   Progress progress;
   task.options.progress = std::ref(progress);
+  if (task.isKept)
+    task.options.keep = [&](Findings inFindings) {
+      shown.Restore(inFindings);
+      Keep(inFindings);
+    };
   ZORDefault::LiftTimeLimit();
   ZORDefault::ReportStatus("finding interferences");
   ZORDefault::ReportStatus("=0 0");

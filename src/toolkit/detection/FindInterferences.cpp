@@ -8,7 +8,9 @@
 #include <map>
 #include <memory>
 #include <mutex>
+#include <numeric>
 #include <set>
+#include <system_error>
 #include <thread>
 #include <unordered_map>
 
@@ -26,6 +28,13 @@ gp_Trsf ToMotion(const Placement& inPlacement) {
 }
 
 Point ToPoint(const gp_XYZ& inPoint) { return {inPoint.X(), inPoint.Y(), inPoint.Z()}; }
+
+std::vector<Point> ToPoints(const std::vector<gp_XYZ>& inPoints) {
+  std::vector<Point> points;
+  points.reserve(inPoints.size());
+  for (const gp_XYZ& point : inPoints) points.push_back(ToPoint(point));
+  return points;
+}
 
 /// Two parts in one placement to each other, judged once for all pairs of products that stand so.
 struct Task {
@@ -138,11 +147,16 @@ void Merge(Verdict&& inVerdict, std::optional<Verdict>& ioBest) {
 }
 
 /// Runs some work in so many threads, the calling one among them, each of which takes the next item.
+/// Threads that there is no memory for are done without.
 template <typename Work>
 void InThreads(unsigned inCount, const Work& inWork) {
   std::atomic<std::size_t> next{0};
   std::vector<std::thread> threads;
-  for (unsigned i = 1; i < inCount; ++i) threads.emplace_back([&] { inWork(next); });
+  threads.reserve(inCount);
+  try {
+    for (unsigned i = 1; i < inCount; ++i) threads.emplace_back([&] { inWork(next); });
+  } catch (const std::system_error&) {
+  }
   inWork(next);
   for (std::thread& thread : threads) thread.join();
 }
@@ -298,6 +312,10 @@ class Search {
     std::atomic<bool> isStopped{false};
     std::mutex progressMutex;
     findings_.openSeconds = Seconds();
+    if (options_.keep) {
+      GroupPairs();
+      options_.keep(findings_);
+    }
     const unsigned threads = options_.tried > 0 ? 1 : options_.threads;
     InThreads(threads, [&](std::atomic<std::size_t>& next) {
       ProbeCache probes;
@@ -309,17 +327,47 @@ class Search {
         const std::lock_guard lock(progressMutex);
         findings_.judged.push_back(static_cast<std::uint32_t>(chosen[place]));
         if (options_.tried > 0) findings_.seconds.push_back(Seconds() - start);
+        if (options_.keep) options_.keep(FindingsOf(chosen[place]));
         if (options_.progress && !options_.progress(findings_.judged.size(), chosen.size()))
           isStopped = true;
       }
     });
     findings_.isStopped = isStopped;
     std::ranges::sort(failures_, {}, &std::pair<std::size_t, std::string>::first);
-    for (const auto& [task, reason] : failures_) {
-      const Task& of = tasks_.Tasks()[task];
-      findings_.unjudged.push_back(
-          {of.firstPart, of.secondPart, false, reason, static_cast<std::uint32_t>(task)});
-    }
+    for (const auto& [task, reason] : failures_)
+      findings_.unjudged.push_back(UnjudgedOf(task, reason));
+  }
+
+  Unjudged UnjudgedOf(std::size_t inTask, const std::string& inReason) const {
+    const Task& task = tasks_.Tasks()[inTask];
+    return {task.firstPart, task.secondPart, false, inReason, static_cast<std::uint32_t>(inTask)};
+  }
+
+  /// Sorts the numbers of the pairs by their verdicts.
+  void GroupPairs() {
+    pairsByTask_.resize(pairs_.size());
+    std::iota(pairsByTask_.begin(), pairsByTask_.end(), 0U);
+    std::ranges::stable_sort(pairsByTask_, {},
+                             [this](std::uint32_t inPair) { return pairs_[inPair].task; });
+  }
+
+  /// What one verdict says of all pairs that stand so.
+  Findings FindingsOf(std::size_t inTask) const {
+    Findings findings;
+    findings.pairsChecked = findings_.pairsChecked;
+    findings.verdicts = findings_.verdicts;
+    findings.judged = {static_cast<std::uint32_t>(inTask)};
+    for (const auto& [task, reason] : failures_)
+      if (task == inTask) findings.unjudged.push_back(UnjudgedOf(task, reason));
+    if (!verdicts_[inTask]) return findings;
+    const Verdict& verdict = *verdicts_[inTask];
+    if (!verdict.curve.empty()) findings.curves.push_back(ToPoints(verdict.curve));
+    const auto curve = static_cast<std::uint32_t>(findings.curves.size() - 1);
+    const auto taskOf = [this](std::uint32_t inPair) { return pairs_[inPair].task; };
+    for (auto pair = std::ranges::lower_bound(pairsByTask_, inTask, {}, taskOf);
+         pair != pairsByTask_.end() && taskOf(*pair) == inTask; ++pair)
+      findings.interferences.push_back(InterferenceOf(pairs_[*pair], verdict, curve));
+    return findings;
   }
 
   void JudgeTask(std::size_t inTask, ProbeCache& ioProbes, std::mutex& ioMutex) {
@@ -363,6 +411,13 @@ class Search {
   }
 
   void AddInterference(const PairOfProducts& inPair, const Verdict& inVerdict) {
+    findings_.interferences.push_back(
+        InterferenceOf(inPair, inVerdict, CurveOf(inPair.task, inVerdict)));
+  }
+
+  /// @param inCurve the place of its curve.
+  Interference InterferenceOf(const PairOfProducts& inPair, const Verdict& inVerdict,
+                              std::uint32_t inCurve) const {
     const gp_Trsf& rootFromCommon = motions_[inPair.isSwapped ? inPair.second : inPair.first];
     Interference found;
     found.first = inPair.first;
@@ -374,13 +429,13 @@ class Search {
     if (inPair.isSwapped && found.kind == Kind::kClearance) std::swap(points[0], points[1]);
     for (std::size_t i = 0; i < 2; ++i) found.points[i] = ToPoint(Moved(rootFromCommon, points[i]));
     found.curveLength = inVerdict.curveLength;
-    found.curve = CurveOf(inPair.task, inVerdict);
+    found.curve = inCurve;
     found.curveProduct = inPair.isSwapped ? inPair.second : inPair.first;
     found.isDuplicate = inVerdict.isDuplicate;
     found.isSheetInSolid = inVerdict.isSheetInSolid;
     found.hasMeshPrecision = inVerdict.hasMeshPrecision;
     found.precision = inVerdict.precision;
-    findings_.interferences.push_back(found);
+    return found;
   }
 
   /// @return its place in the findings, where each verdict's curve is once.
@@ -389,8 +444,7 @@ class Search {
     curves_.resize(verdicts_.size());
     if (curves_[inTask] == 0) {
       curves_[inTask] = static_cast<std::uint32_t>(findings_.curves.size());
-      std::vector<Point>& points = findings_.curves.emplace_back();
-      for (const gp_XYZ& point : inVerdict.curve) points.push_back(ToPoint(point));
+      findings_.curves.push_back(ToPoints(inVerdict.curve));
     }
     return curves_[inTask];
   }
@@ -401,6 +455,7 @@ class Search {
   std::vector<gp_Trsf> motions_;
   TaskTable tasks_;
   std::vector<PairOfProducts> pairs_;
+  std::vector<std::uint32_t> pairsByTask_;  ///< only where verdicts are kept
   std::vector<std::optional<Verdict>> verdicts_;
   std::vector<std::uint32_t> curves_;  ///< of the verdicts, in the findings; 0: none yet
   std::vector<std::pair<std::size_t, std::string>> failures_;

@@ -54,6 +54,9 @@ struct Options {
   /// Told how many verdicts are done of how many; returns false to stop. From any thread, never twice
   /// at a time.
   std::function<bool(std::size_t, std::size_t)> progress;
+  /// Handed what is known before the first verdict, then each verdict's findings alone, in any order
+  /// and without costs. From any thread, never twice at a time.
+  std::function<void(const struct Findings&)> keep;
 };
 
 enum class Kind { kClash, kContact, kClearance };

@@ -205,9 +205,11 @@ ShareSize PublishShare(ClashDocument& ioResult, PublicationOptions inOptions,
                        const std::function<ZORIProduct_var()>& inOpenModel) {
   inManifest.options["pictures"] = EndingOf(inOptions);
   inManifest.options["settings"] = SettingsText(inOptions);
-  if (inOptions.resume)
-    if (const auto found = FindShare(inManifest); found && IsWhole(*found))
-      return {found->held.size(), true};
+  if (inOptions.resume) {
+    const auto found = FindShare(inManifest, inOptions.warn);
+    if (found && IsWhole(*found)) return {found->held.size(), true};
+    inOptions.resume = found.has_value();
+  }
   fs::create_directories(inManifest.folder);
   inManifest.plan = kNothing;
   WriteShare(inManifest);

@@ -145,15 +145,20 @@ ShareManifest ReadShare(const std::string& inFolder) {
   throw Error(path + ": is damaged: it is no manifest of a share");
 }
 
-std::optional<ShareManifest> FindShare(const ShareManifest& inManifest) {
+std::optional<ShareManifest> FindShare(const ShareManifest& inManifest,
+                                       const std::function<void(const std::string&)>& inWarn) {
   if (!fs::exists(PathOf(inManifest.folder, kShareFile))) return std::nullopt;
+  std::string why;
   try {
     ShareManifest found = ReadShare(inManifest.folder);
-    const bool isSame = found.shard.number == inManifest.shard.number;
-    if (isSame && WhyForeign(inManifest, found).empty()) return found;
-  } catch (const Error&) {
-    // It is made anew.
+    why = WhyForeign(inManifest, found);
+    if (why.empty() && found.shard.number == inManifest.shard.number) return found;
+    if (why.empty()) why = "it is " + Called(found.shard) + ", another";
+    why = inManifest.folder + ": held a foreign share: " + why + " than is asked for";
+  } catch (const Error& error) {
+    why = error.what();
   }
+  if (inWarn) inWarn(why + "; it is made anew");
   return std::nullopt;
 }
 

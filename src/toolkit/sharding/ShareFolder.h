@@ -3,6 +3,7 @@
 #define ZOR_TOOLKIT_SHARDING_SHARE_FOLDER_H
 
 #include <cstddef>
+#include <functional>
 #include <map>
 #include <optional>
 #include <string>
@@ -60,7 +61,9 @@ ZOR_TOOLKIT_EXPORT ShareInput ShareInputOf(const std::string& inRole, const std:
 /// Raises Error for a folder that holds no share.
 ZOR_TOOLKIT_EXPORT ShareManifest ReadShare(const std::string& inFolder);
 /// What the folder of a manifest has of the same share of the same work; nothing where it has none.
-ZOR_TOOLKIT_EXPORT std::optional<ShareManifest> FindShare(const ShareManifest& inManifest);
+/// @param inWarn told in one line that it has another, which is to be made anew; may be empty.
+ZOR_TOOLKIT_EXPORT std::optional<ShareManifest> FindShare(
+    const ShareManifest& inManifest, const std::function<void(const std::string&)>& inWarn);
 /// Replaces the manifest in its folder. Raises ZORFoundation::FileError.
 ZOR_TOOLKIT_EXPORT void WriteShare(const ShareManifest& inManifest);
 
