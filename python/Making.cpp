@@ -11,7 +11,9 @@
 #include "toolkit/publishing/Publication.h"
 #include "toolkit/records/RecordFilter.h"
 #include "toolkit/records/WrittenFile.h"
+#include "toolkit/review/LanguageWords.h"
 #include "toolkit/review/ReviewedFile.h"
+#include "toolkit/scenes/ModelLimits.h"
 
 namespace ZORPython {
 using namespace ZORToolkit;
@@ -111,13 +113,25 @@ PyDetection SummaryOf(const DetectionResult& inResult, std::string inOutput) {
 }
 
 using Patterns = std::vector<std::string>;
+using Limit = std::optional<long long>;
+
+/// How a model is read, from the arguments that several functions have.
+ZORDefault::ModelOptions ReadingFrom(const Limit& inTime, const Limit& inMemory, bool inStrict) {
+  ZORDefault::ModelOptions reading;
+  reading.maxSeconds = static_cast<double>(ModelLimit("limit_time", inTime, "LimitTime"));
+  reading.maxMemory =
+      static_cast<std::uint64_t>(ModelLimit("limit_memory", inMemory, "LimitMemory")) << 20;
+  reading.isStrict = inStrict;
+  return reading;
+}
 
 DetectionOptions DetectionOptionsFrom(
     double inTolerance, double inContactGap, double inClearance, std::optional<int> inLevel,
     const Patterns& inOnly, const Patterns& inIgnore,
     const std::optional<std::pair<std::string, std::string>>& inBetween,
-    const std::string& inSheets, unsigned inJobs, bool inStrict) {
+    const std::string& inSheets, unsigned inJobs, const ZORDefault::ModelOptions& inReading) {
   constexpr const char* kSheets[] = {"clash", "contact", "ignore"};
+  constexpr unsigned kMaxThreads = 1024;
   DetectionOptions options;
   options.tolerance = inTolerance;
   options.contactGap = inContactGap;
@@ -129,8 +143,11 @@ DetectionOptions DetectionOptionsFrom(
   const auto word = std::find(std::begin(kSheets), std::end(kSheets), inSheets);
   if (word == std::end(kSheets)) throw UnknownWord("sheets", inSheets, kSheets);
   options.sheets = static_cast<SheetsMean>(word - std::begin(kSheets));
+  if (inJobs > kMaxThreads) throw UsageError("jobs: at most " + std::to_string(kMaxThreads));
   options.threads = inJobs;
-  options.isStrict = inStrict;
+  options.maxSeconds = inReading.maxSeconds;
+  options.maxMemory = inReading.maxMemory;
+  options.isStrict = inReading.isStrict;
   if (const std::string fault = FindFault(options); !fault.empty()) throw UsageError(fault);
   return options;
 }
@@ -140,11 +157,11 @@ PyDetection DetectToFile(const py::object& inModel, const py::object& inOutput, 
                          const Patterns& inOnly, const Patterns& inIgnore,
                          const std::optional<std::pair<std::string, std::string>>& inBetween,
                          const std::string& inSheets, const std::optional<py::object>& inPrevious,
-                         unsigned inJobs, bool inStrict, const py::object& inProgress,
-                         const py::object& inWarn) {
+                         unsigned inJobs, const Limit& inTime, const Limit& inMemory, bool inStrict,
+                         const py::object& inProgress, const py::object& inWarn) {
   DetectionOptions options =
       DetectionOptionsFrom(inTolerance, inContactGap, inClearance, inLevel, inOnly, inIgnore,
-                           inBetween, inSheets, inJobs, inStrict);
+                           inBetween, inSheets, inJobs, ReadingFrom(inTime, inMemory, inStrict));
   const std::string model = PathFrom(inModel), output = PathFrom(inOutput);
   const std::string previousPath = inPrevious ? PathFrom(*inPrevious) : std::string();
   Listener listener(inProgress, inWarn);
@@ -187,9 +204,13 @@ void DefineDetect(py::module_& ioModule) {
       py::arg("clearance") = options.clearance, py::arg("level") = py::none(),
       py::arg("only") = Patterns(), py::arg("ignore") = Patterns(), py::arg("between") = py::none(),
       py::arg("sheets") = "clash", py::arg("previous") = py::none(), py::arg("jobs") = 0,
+      py::arg("limit_time") = py::none(), py::arg("limit_memory") = py::none(),
       py::arg("strict") = false, py::arg("progress") = py::none(), py::arg("warn") = py::none(),
       "Compute a clash result from a CAD model and write it.\n\nThe options are those of `lyra "
-      "detect`; jobs: threads, 0 for one for each processor. progress(work, done, all) is called "
+      "detect`; jobs: threads, 0 for one for each processor; limit_time, limit_memory: seconds "
+      "of processor time and megabytes that reading the model may take, by default those of the "
+      "settings, else by its size; strict refuses a model of which something cannot be read. "
+      "progress(work, done, all) is called "
       "with work 'reading' or 'checking'; warn(text) for each warning, by default "
       "warnings.warn. What one of them raises stops the work; no file is written then.");
 }
@@ -208,8 +229,11 @@ Published PublishToFolder(const py::object& inResult, const py::object& inOutput
                           const std::optional<py::object>& inBaseline, const Patterns& inOnly,
                           const std::optional<std::string>& inFormat, std::pair<int, int> inSize,
                           const std::optional<std::string>& inZoom, const std::string& inPositions,
-                          unsigned inJobs, bool inResume, bool inFlat, bool inStrict,
-                          const py::object& inProgress, const py::object& inWarn) {
+                          const std::optional<py::object>& inBaselineModel,
+                          const std::optional<py::object>& inStyleSheet,
+                          const std::optional<std::string>& inLanguage, unsigned inJobs,
+                          bool inResume, bool inFlat, const Limit& inTime, const Limit& inMemory,
+                          bool inStrict, const py::object& inProgress, const py::object& inWarn) {
   constexpr const char* kFormats[] = {"jpeg", "png"};
   constexpr const char* kZooms[] = {"interference", "products"};
   constexpr const char* kPositions[] = {"result", "model"};
@@ -236,17 +260,26 @@ Published PublishToFolder(const py::object& inResult, const py::object& inOutput
   options.resume = inResume;
   options.hasGeometry = !inFlat;
   if (inModel) options.model = PathFrom(*inModel);
+  if (inStyleSheet) options.styleSheet = PathFrom(*inStyleSheet);
+  const char* const language =
+      inLanguage ? kLanguages[WordPlace("lang", *inLanguage, kLanguages)] : nullptr;
+  if (language != nullptr) options.language = language;
   Listener listener(inProgress, inWarn);
   options.warn = [&](const std::string& warning) { listener.WarnOrStop(warning); };
   options.drawn = [&](std::size_t done, std::size_t all) {
     listener.ProgressOrStop("drawing", static_cast<double>(done), static_cast<double>(all));
   };
-  ZORDefault::ModelOptions reading;
-  reading.isStrict = inStrict;
+  ZORDefault::ModelOptions reading = ReadingFrom(inTime, inMemory, inStrict);
   reading.progress = [&](double done) { listener.ProgressOrStop("reading", done, 1); };
   reading.warn = options.warn;
+  if (inBaselineModel)
+    options.openBaselineModel = [&, path = PathFrom(*inBaselineModel)] {
+      return ZORDefault::OpenModel(path, reading).root;
+    };
   Published made;
   Attended(listener, [&] {
+    std::optional<OtherLanguage> spoken;
+    if (language != nullptr) spoken.emplace(language);
     options.source = BytesOfInput(result);
     options.sourceName = FileNameOf(result);
     std::optional<ClashDocument> baseline;
@@ -275,12 +308,17 @@ void DefinePublish(py::module_& ioModule) {
       py::arg("model") = py::none(), py::arg("baseline") = py::none(), py::arg("only") = Patterns(),
       py::arg("format") = py::none(),
       py::arg("size") = std::pair(options.size.width, options.size.height),
-      py::arg("zoom") = py::none(), py::arg("positions") = "result", py::arg("jobs") = 0,
-      py::arg("resume") = false, py::arg("flat") = false, py::arg("strict") = false,
+      py::arg("zoom") = py::none(), py::arg("positions") = "result",
+      py::arg("baseline_model") = py::none(), py::arg("xsl") = py::none(),
+      py::arg("lang") = py::none(), py::arg("jobs") = 0, py::arg("resume") = false,
+      py::arg("flat") = false, py::arg("limit_time") = py::none(),
+      py::arg("limit_memory") = py::none(), py::arg("strict") = false,
       py::arg("progress") = py::none(), py::arg("warn") = py::none(),
       "Publish a result as a page: a folder, or one file when output ends in '.html'.\n\nresult, "
-      "output, model, baseline: paths; without a model there are no pictures. only: conditions "
-      "such as 'type=clash,status=relevant'. The other options are those of `lyra publish`; "
+      "output, model, baseline, baseline_model, xsl: paths; without a model there are no "
+      "pictures. only: conditions such as 'type=clash,status=relevant'. lang: the language of the "
+      "words, such as 'de'. limit_time, limit_memory, strict: as for detect(). The other options "
+      "are those of `lyra publish`; "
       "pictures are drawn in jobs processes that start as copies of this one, 0 for one for each "
       "processor. progress(work, done, all) is called with work 'reading' or 'drawing'; "
       "warn(text) for each warning, by default warnings.warn. What one of them raises stops the "

@@ -110,8 +110,20 @@ def test_detect_and_publish(lyra, samples, tmp_path, monkeypatch):
     with pytest.raises(InterruptedError, match="enough"):
         zorlyra.detect(model, tmp_path / "stopped.xml", progress=stop)
     assert not (tmp_path / "stopped.xml").exists()
-    with pytest.raises(ValueError):
-        zorlyra.detect(model, tmp_path / "stopped.xml", sheets="paper")
+    for wrong in [{"sheets": "paper"}, {"limit_time": 0}, {"limit_memory": 10**7}, {"jobs": 2000}]:
+        with pytest.raises(ValueError, match=next(iter(wrong))):
+            zorlyra.detect(model, tmp_path / "stopped.xml", **wrong)
+    with pytest.raises(zorlyra.Error, match="takes more than 4 MB"):
+        zorlyra.detect(model, tmp_path / "stopped.xml", limit_memory=4)
+    settings = tmp_path / "settings"
+    settings.mkdir()
+    (settings / "ModelReading.toml").write_text("LimitMemory = 4\n")
+    with monkeypatch.context() as other:
+        other.setenv("ZOR_SETTINGS_PATH", str(settings))
+        with pytest.raises(zorlyra.Error, match="takes more than 4 MB"):
+            zorlyra.detect(model, tmp_path / "stopped.xml")
+        zorlyra.detect(model, tmp_path / "limited.xml", limit_memory=2000, limit_time=100)
+    assert (tmp_path / "limited.xml").read_bytes() == (tmp_path / "command.xml").read_bytes()
 
     seen.clear()
     only, size = ["type=contact"], (80, 60)
@@ -125,7 +137,24 @@ def test_detect_and_publish(lyra, samples, tmp_path, monkeypatch):
     for file in files:
         assert (tmp_path / "module" / file).read_bytes() == (tmp_path / "command" / file).read_bytes(), file
     assert seen[-1][0] == "drawing"
+    sheet = tmp_path / "own.xsl"
+    sheet.write_text('<xsl:stylesheet version="1.0" xmlns:xsl="http://www.w3.org/1999/XSL/Transform">'
+                     '<xsl:template match="/"><html><body>own</body></html></xsl:template></xsl:stylesheet>')
+    zorlyra.publish(tmp_path / "module.xml", tmp_path / "own", xsl=sheet, lang="fr")
+    lyra.run("publish", tmp_path / "module.xml", "-o", tmp_path / "own-command", "--xsl", sheet, "--lang", "fr")
+    assert (tmp_path / "own/index.html").read_bytes() == (tmp_path / "own-command/index.html").read_bytes()
+    zorlyra.publish(tmp_path / "module.xml", tmp_path / "french", lang="fr", baseline=samples / "as1.clash.xml")
+    lyra.run("publish", tmp_path / "module.xml", "-o", tmp_path / "french-command", "--lang", "fr",
+             "--baseline", samples / "as1.clash.xml")
+    french = (tmp_path / "french/index.html").read_bytes()
+    assert french == (tmp_path / "french-command/index.html").read_bytes()
+    with pytest.raises(ValueError, match="lang"):
+        zorlyra.publish(tmp_path / "module.xml", tmp_path / "french", lang="latin")
+    with pytest.raises(zorlyra.Error, match="no-model.stp"):
+        zorlyra.publish(tmp_path / "module.xml", tmp_path / "twice", model=model, baseline=samples / "as1.clash.xml",
+                        baseline_model=tmp_path / "no-model.stp", size=size)
     page = zorlyra.publish(tmp_path / "module.xml", tmp_path / "page.html").page
+    assert pathlib.Path(page).read_bytes() != french
     assert pathlib.Path(page).read_bytes().startswith(b"<!DOCTYPE html>")
     with pytest.raises(InterruptedError):
         zorlyra.publish(tmp_path / "module.xml", tmp_path / "again", model=model, size=size, progress=stop)

@@ -8,6 +8,8 @@
 #include <string>
 #include <vector>
 
+#include "toolkit/review/LanguageWords.h"
+
 namespace CLI {
 class App;
 class Option;
@@ -18,8 +20,7 @@ namespace lyra {
 /// The words that are worth offering for an option's value; what is read does not depend on them.
 using OptionWords = std::map<const CLI::Option*, std::vector<std::string>>;
 
-/// The languages that there are message catalogues of.
-inline constexpr const char* kLanguages[] = {"de", "en", "es", "fr", "it", "ja"};
+using ZORToolkit::kLanguages;
 
 /// Declares the arguments of one verb. The variables are filled when the command line is read and
 /// must live until then; what is not given leaves its variable as it is.

@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <array>
 #include <cstdlib>
-#include <optional>
 
 #include "platform/system/ZORMsgCatalog.h"
 #include "toolkit/records/DocumentText.h"
@@ -11,7 +10,6 @@
 namespace ZORToolkit {
 namespace {
 
-constexpr const char* kLanguages[] = {"en", "de", "es", "fr", "it", "ja"};
 constexpr const char* kKeys[] = {"Relevant", "Irrelevant", "NotInspected", "Old", "New"};
 constexpr std::size_t kWordCount = std::size(kKeys);
 constexpr const char* kEnglish[] = {"Relevant", "Irrelevant", "Not inspected", "Old", "New"};
@@ -25,33 +23,15 @@ Words CurrentWords() {
   return words;
 }
 
-/// Catalogues are chosen by this variable alone, so it is another one for as long as this lives.
-class OtherLanguage {
- public:
-  explicit OtherLanguage(const char* inLanguage) {
-    if (const char* const former = std::getenv("ZOR_LANG")) former_ = former;
-    setenv("ZOR_LANG", inLanguage, 1);
-  }
-  ~OtherLanguage() {
-    if (former_)
-      setenv("ZOR_LANG", former_->c_str(), 1);
-    else
-      unsetenv("ZOR_LANG");
-  }
-  OtherLanguage(const OtherLanguage&) = delete;
-  OtherLanguage& operator=(const OtherLanguage&) = delete;
+Words WordsOf(const char* inLanguage) {
+  const OtherLanguage other(inLanguage);
+  return CurrentWords();
+}
 
- private:
-  std::optional<std::string> former_;
-};
-
-/// The current language first, so that its meaning of a word counts.
+/// The current language first, so that its meaning of a word counts, and then English.
 std::vector<Words> ReadTable() {
-  std::vector<Words> table{CurrentWords()};
-  for (const char* const language : kLanguages) {
-    const OtherLanguage other(language);
-    table.push_back(CurrentWords());
-  }
+  std::vector<Words> table{CurrentWords(), WordsOf("en")};
+  for (const char* const language : kLanguages) table.push_back(WordsOf(language));
   return table;
 }
 
@@ -67,6 +47,18 @@ std::string Trimmed(const std::string& inText) {
 }
 
 }  // namespace
+
+OtherLanguage::OtherLanguage(const char* inLanguage) {
+  if (const char* const former = std::getenv("ZOR_LANG")) former_ = former;
+  setenv("ZOR_LANG", inLanguage, 1);
+}
+
+OtherLanguage::~OtherLanguage() {
+  if (former_)
+    setenv("ZOR_LANG", former_->c_str(), 1);
+  else
+    unsetenv("ZOR_LANG");
+}
 
 std::string EnglishWord(const std::string& inText) {
   const std::string text = Trimmed(inText);

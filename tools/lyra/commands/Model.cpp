@@ -10,8 +10,8 @@
 #include "lyra/Arguments.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/terminal/Progress.h"
-#include "platform/system/ZORSettingRepository.h"
 #include "toolkit/records/DocumentText.h"
+#include "toolkit/scenes/ModelLimits.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -81,15 +81,6 @@ Quaternion QuaternionOf(const double* inColumns) {
   return turn;
 }
 
-/// A limit that is not given is the setting's, if that is one. @return 0 without either.
-long long LimitOf(const std::optional<long long>& inGiven, const char* inSetting) {
-  if (inGiven) return *inGiven;
-  int limit = 0;
-  ZORSettingRepository* const settings = ZORSettingRepository::GetRepository("ModelReading");
-  if (settings == nullptr || FAILED(settings->ReadSetting(inSetting, &limit, 1))) return 0;
-  return std::max(0, limit);
-}
-
 }  // namespace
 
 void ModelReading::Declare(Arguments& ioArguments) {
@@ -101,21 +92,22 @@ void ModelReading::Declare(Arguments& ioArguments) {
                    "Refuse a model of which something cannot be read, instead of a warning");
 }
 
+long long ModelReading::Seconds() const { return ModelLimit("--limit-time", seconds, "LimitTime"); }
+
+long long ModelReading::Megabytes() const {
+  return ModelLimit("--limit-memory", megabytes, "LimitMemory");
+}
+
 void ModelReading::Check() const {
-  constexpr long long kMaxLimit = 1'000'000;
-  const auto check = [](const char* inOption, const std::optional<long long>& inLimit) {
-    if (inLimit && (*inLimit < 1 || *inLimit > kMaxLimit))
-      throw UsageError(std::string(inOption) + ": 1 to " + std::to_string(kMaxLimit));
-  };
-  check("--limit-time", seconds);
-  check("--limit-memory", megabytes);
+  Seconds();
+  Megabytes();
 }
 
 ZORDefault::ModelOptions ModelReading::Options() const {
   ZORDefault::ModelOptions options;
   options.isStrict = isStrict;
-  options.maxSeconds = static_cast<double>(LimitOf(seconds, "LimitTime"));
-  options.maxMemory = static_cast<std::uint64_t>(LimitOf(megabytes, "LimitMemory")) << 20;
+  options.maxSeconds = static_cast<double>(Seconds());
+  options.maxMemory = static_cast<std::uint64_t>(Megabytes()) << 20;
   return options;
 }
 

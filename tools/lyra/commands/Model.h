@@ -28,6 +28,10 @@ struct ModelReading {
   void Check() const;
   /// With the limits of the settings where none is given.
   ZORDefault::ModelOptions Options() const;
+
+ private:
+  long long Seconds() const;
+  long long Megabytes() const;
 };
 
 /// Opens a model. What was repaired or left out is reported on standard error, progress too when that is
