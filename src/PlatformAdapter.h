@@ -7,6 +7,7 @@
 #include <cstdint>
 #include <optional>
 #include <string_view>
+#include <utility>
 
 #include "platform/system/ZORUnicodeString.h"
 #include "platform/xml/DOM_Node.h"
@@ -68,6 +69,69 @@ bool IsText(const Text& inText, const char* inAscii) {
 inline bool IsText(const DOMString& inText, const ZORUnicodeString& inOther) {
   return UnitsOf(inText) == UnitsOf(inOther);
 }
+
+template <class Node>
+bool HasName(const Node& inNode, const char* inAscii) {
+  if constexpr (requires { inNode.hasName(inAscii); })
+    return inNode.hasName(inAscii);
+  else
+    return IsText(inNode.getNodeName(), inAscii);
+}
+template <class Node>
+bool HasName(const Node& inNode, const ZORUnicodeString& inName) {
+  return IsText(inNode.getNodeName(), inName);
+}
+
+/// The node itself or else the first element after it among its siblings.
+template <class Node>
+Node ElementFrom(Node inNode) {
+  while (!inNode.isNull() && inNode.getNodeType() != Node::ELEMENT_NODE)
+    inNode = inNode.getNextSibling();
+  return inNode;
+}
+template <class Node>
+Node FirstElementChild(const Node& inParent) {
+  if constexpr (requires { inParent.getFirstElementChild(); })
+    return inParent.getFirstElementChild();
+  else
+    return ElementFrom(inParent.getFirstChild());
+}
+template <class Node>
+Node NextElementSibling(const Node& inNode) {
+  if constexpr (requires { inNode.getNextElementSibling(); })
+    return inNode.getNextElementSibling();
+  else
+    return ElementFrom(inNode.getNextSibling());
+}
+
+/// The attributes of an element that outlives this: looked up once for all that are read, or the
+/// element itself where the platform reads them from there.
+template <class Node>
+class AttributeSource {
+ public:
+  explicit AttributeSource(const Node& inElement) : source_(From(inElement)) {}
+  /// Empties the text where there is no such attribute.
+  void Read(const char* inName, ZORUnicodeString& outText) const {
+    if constexpr (kIsElement)
+      source_.getAttributeText(inName, outText);
+    else
+      outText = source_.getNamedItem(inName).getNodeValue().DOMStringToZORUnicodeString();
+  }
+
+ private:
+  static constexpr bool kIsElement = requires(const Node& inElement, ZORUnicodeString& outText) {
+    inElement.getAttributeText("", outText);
+  };
+  static decltype(auto) From(const Node& inElement) {
+    if constexpr (kIsElement)
+      return (inElement);
+    else
+      return inElement.getAttributes();
+  }
+  using Source = decltype(From(std::declval<const Node&>()));
+
+  Source source_;
+};
 
 /// A number that changes with the node's document. None if the platform does not count changes, so
 /// that nothing may be cached from one call to the next.

@@ -14,30 +14,31 @@
 /// Whether a node is an element of a name; the name is a ZORUnicodeString or ASCII text.
 template <class NameText>
 bool IsElementNamed(const DOM_Node& inNode, const NameText& inName) {
-  return inNode.getNodeType() == DOM_Node::ELEMENT_NODE &&
-         adapter::IsText(inNode.getNodeName(), inName);
+  return inNode.getNodeType() == DOM_Node::ELEMENT_NODE && adapter::HasName(inNode, inName);
 }
 
-/// Calls inVisit for each child node of a parent in document order.
+/// Calls inVisit for each child element of a parent in document order.
 template <class Visit>
-void ForEachChild(const DOM_Node& inParent, const Visit& inVisit) {
-  for (DOM_Node child = inParent.getFirstChild(); !child.isNull(); child = child.getNextSibling())
+void ForEachElement(const DOM_Node& inParent, const Visit& inVisit) {
+  for (DOM_Node child = adapter::FirstElementChild(inParent); !child.isNull();
+       child = adapter::NextElementSibling(child))
     inVisit(child);
 }
 
 /// Calls inVisit for each child element of a name in document order.
 template <class NameText, class Visit>
 void ForEachElement(const DOM_Node& inParent, const NameText& inName, const Visit& inVisit) {
-  ForEachChild(inParent, [&](const DOM_Node& inChild) {
-    if (IsElementNamed(inChild, inName)) inVisit(inChild);
+  ForEachElement(inParent, [&](const DOM_Node& inChild) {
+    if (adapter::HasName(inChild, inName)) inVisit(inChild);
   });
 }
 
 /// The first child element of a name, or a null node.
 template <class NameText>
 DOM_Node FirstElement(const DOM_Node& inParent, const NameText& inName) {
-  DOM_Node child = inParent.getFirstChild();
-  while (!child.isNull() && !IsElementNamed(child, inName)) child = child.getNextSibling();
+  DOM_Node child = adapter::FirstElementChild(inParent);
+  while (!child.isNull() && !adapter::HasName(child, inName))
+    child = adapter::NextElementSibling(child);
   return child;
 }
 
@@ -46,28 +47,36 @@ inline DOM_Node ChildAt(const DOM_Node& inParent, int inPosition) {
   return inParent.getChildNodes().item(static_cast<unsigned int>(inPosition));
 }
 
-/// The attributes of an element, looked up once for all that are read of it.
+/// What is read of the attributes of an element, which must outlive this.
 class ElementAttributes {
  public:
-  explicit ElementAttributes(const DOM_Node& inElement) : attributes_(inElement.getAttributes()) {}
+  explicit ElementAttributes(const DOM_Node& inElement) : attributes_(inElement) {}
 
   /// Empty where the attribute is missing.
-  ZORUnicodeString Text(const char* inName) const {
-    return ZORLyraGeneralServices::GetDOMName(attributes_.getNamedItem(inName).getNodeValue());
+  void ReadText(const char* inName, ZORUnicodeString& outText) const {
+    attributes_.Read(inName, outText);
   }
-  ZORUnicodeString Text(const ZORUnicodeString& inName) const {
-    return Text(inName.ConvertToChar());
+  void ReadText(const ZORUnicodeString& inName, ZORUnicodeString& outText) const {
+    attributes_.Read(inName.ConvertToChar(), outText);
   }
   /// An attribute that holds a number, its first comma replaced by a point.
-  ZORUnicodeString Number(const char* inName) const {
-    ZORUnicodeString text = Text(inName);
-    if (adapter::UnitsOf(text).find(u',') != std::u16string_view::npos)
-      text.ReplaceSubString(",", ".");
+  void ReadNumber(const char* inName, ZORUnicodeString& outText) const {
+    attributes_.Read(inName, outText);
+    if (adapter::UnitsOf(outText).find(u',') == std::u16string_view::npos) return;
+    // Never deleted: a host's own static objects may read while the process ends.
+    static const auto* const comma = new ZORUnicodeString(",");
+    static const auto* const point = new ZORUnicodeString(".");
+    outText.ReplaceSubString(*comma, *point);
+  }
+  template <class NameText>
+  ZORUnicodeString Text(const NameText& inName) const {
+    ZORUnicodeString text;
+    ReadText(inName, text);
     return text;
   }
 
  private:
-  DOM_NamedNodeMap attributes_;
+  adapter::AttributeSource<DOM_Node> attributes_;
 };
 
 /// The "NbInterf" of a result set read as a floating number and truncated toward zero; 0 when it is

@@ -28,8 +28,7 @@ void ZORClashParsing::GetClashGeneralInfos(ZORUnicodeString& outVersion,
   outVersion = GetAttrOnNode(root_, "Version");
   outReference = GetAttrOnNode(root_, names::ZORDocument.ConvertToChar());
   outResponsible = GetAttrOnNode(root_, "Responsible");
-  ForEachChild(root_, [&](const DOM_Node& inChild) {
-    if (inChild.getNodeType() != DOM_Node::ELEMENT_NODE) return;
+  ForEachElement(root_, [&](const DOM_Node& inChild) {
     const ZORUnicodeString name = ZORLyraGeneralServices::GetDOMName(inChild);
     if (name == "Date")
       outDate = inChild;
@@ -150,8 +149,9 @@ void ZORClashParsing::GetClashInfos(
 
   ZORClashDocumentIndex& index = ZORClashDocumentIndex::Of(*this, root_);
   const auto nameResultSet = [&](const DOM_Node& inResultSet) {
-    outResultName = GetAttrOnNode(inResultSet, names::Name.ConvertToChar());
-    outComputationType = GetAttrOnNode(inResultSet, "ComputationCase");
+    const ElementAttributes resultSet(inResultSet);
+    resultSet.ReadText(names::Name, outResultName);
+    resultSet.ReadText("ComputationCase", outComputationType);
   };
   const auto& resultSets = index.ResultSets();
   const auto& interferences = index.Interferences();

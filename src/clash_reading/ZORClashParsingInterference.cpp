@@ -68,23 +68,31 @@ class InterferenceWords {
 
 void AppendPoint(const DOM_Node& inPoint, ZORUnicodeString& ioPoints) {
   const ElementAttributes attributes(inPoint);
-  if (ioPoints.GetLengthInChar() != 0) adapter::AppendUnits(ioPoints, u"/");
-  ioPoints += attributes.Number("Ux");
-  adapter::AppendUnits(ioPoints, u"/");
-  ioPoints += attributes.Number("Uy");
-  adapter::AppendUnits(ioPoints, u"/");
-  ioPoints += attributes.Number("Uz");
+  ZORUnicodeString coordinate;
+  bool isFirst = ioPoints.GetLengthInChar() == 0;
+  for (const char* const name : {"Ux", "Uy", "Uz"}) {
+    if (!std::exchange(isFirst, false)) adapter::AppendUnits(ioPoints, u"/");
+    attributes.ReadNumber(name, coordinate);
+    ioPoints += coordinate;
+  }
 }
 
 // The last segment of a path; empty if a segment is empty or holds a line feed, where the result
 // depends on the platform's tokenizer.
 std::u16string_view LastPlainSegment(std::u16string_view inPath) {
-  if (inPath.find(u'\n') != std::u16string_view::npos) return {};
-  for (std::size_t end = 0; (end = inPath.find(kPathSeparator)) != std::u16string_view::npos;) {
-    if (end == 0) return {};
-    inPath.remove_prefix(end + kPathSeparator.size());
+  std::size_t begin = 0;
+  for (std::size_t at = 0; at < inPath.size();) {
+    if (inPath[at] == u'\n') return {};
+    if (inPath[at] != kPathSeparator[0] ||
+        inPath.substr(at, kPathSeparator.size()) != kPathSeparator) {
+      ++at;
+      continue;
+    }
+    if (at == begin) return {};
+    at += kPathSeparator.size();
+    begin = at;
   }
-  return inPath;
+  return inPath.substr(begin);
 }
 
 // Every separator replaced by a line feed, in one pass: a text may hold many.
@@ -97,6 +105,20 @@ ZORUnicodeString SegmentsAsLines(std::u16string_view inPath) {
   }
   adapter::AppendUnits(lines, inPath);
   return lines;
+}
+
+ZORUnicodeString InstanceName(const ZORUnicodeString& inDescriptionId) {
+  ZORUnicodeString last;
+  const std::u16string_view path = adapter::UnitsOf(inDescriptionId);
+  if (const std::u16string_view plain = LastPlainSegment(path); !plain.empty()) {
+    last.BuildFromUTF16(plain.data(), plain.size());
+    return last;
+  }
+  ZORToken segments(SegmentsAsLines(path));
+  for (ZORUnicodeString segment = segments.GetNextToken("\n"); segment.GetLengthInChar() != 0;
+       segment = segments.GetNextToken("\n"))
+    last = segment;
+  return last;
 }
 
 }  // namespace
@@ -123,7 +145,7 @@ void ZORClashParsing::GetInterferenceDataV12(
   const InterferenceWords words;
   const ElementAttributes interference(inInterference);
   outResultType = words.ResultType(inInterference);
-  outClearance = interference.Number("DistanceClearance");
+  interference.ReadNumber("DistanceClearance", outClearance);
   outStatus = words.Status(interference.Text("Status"));
   outRetrieve = words.Retrieve(interference.Text("RetrieveInf"));
   outPoints = ZORUnicodeString();
@@ -131,11 +153,11 @@ void ZORClashParsing::GetInterferenceDataV12(
 
   const auto readRule = [&](const DOM_Node& inRule) {
     const ElementAttributes rule(inRule);
-    outRuleName = rule.Text(names::Name);
-    outRuleClearance = rule.Number("Clearance");
-    outComputationType = rule.Text("TypeCalc");
-    outSeverity = rule.Text("Severity");
-    outPenetrationCandidate = rule.Text("PenetrationCandidate");
+    rule.ReadText(names::Name, outRuleName);
+    rule.ReadNumber("Clearance", outRuleClearance);
+    rule.ReadText("TypeCalc", outComputationType);
+    rule.ReadText("Severity", outSeverity);
+    rule.ReadText("PenetrationCandidate", outPenetrationCandidate);
   };
   // A filled Alien flag means that the first product has been read. Hosts may pass one string for
   // two outputs, so everything is read before the outputs are filled, in this order.
@@ -148,8 +170,8 @@ void ZORClashParsing::GetInterferenceDataV12(
     ZORUnicodeString processMode = product.Text("ProcessMode");
     ZORUnicodeString shapeName = product.Text(names::ShapeName);
     ZORUnicodeString shapeSource = product.Text("ShapeSource");
-    ZORUnicodeString instance = processMode == kManagedByPdm ? product.Text(names::Alias)
-                                                             : GetInstanceNameFromDID(identifier);
+    ZORUnicodeString instance =
+        processMode == kManagedByPdm ? product.Text(names::Alias) : InstanceName(identifier);
     (first ? outFirstDescriptionId : outSecondDescriptionId) = identifier;
     (first ? ioFirstAlien : outSecondAlien) = std::move(alien);
     (first ? outFirstShapeSource : outSecondShapeSource) = std::move(shapeSource);
@@ -160,49 +182,47 @@ void ZORClashParsing::GetInterferenceDataV12(
   };
   const auto readViewpoint = [&](const DOM_Node& inViewpoint) {
     const ElementAttributes viewpoint(inViewpoint);
-    outFocusDistance = viewpoint.Text("FocusDistance");  // its comma stays
-    outNearPlane = viewpoint.Number("NearPlane");
-    outFarPlane = viewpoint.Number("FarPlane");
-    outProjection = viewpoint.Number("ProjectionType");
+    viewpoint.ReadText("FocusDistance", outFocusDistance);  // its comma stays
+    viewpoint.ReadNumber("NearPlane", outNearPlane);
+    viewpoint.ReadNumber("FarPlane", outFarPlane);
+    viewpoint.ReadNumber("ProjectionType", outProjection);
     ForEachElement(inViewpoint, "Point", [&](const DOM_Node& inPoint) {
       const ElementAttributes point(inPoint);
-      outViewpointX = point.Number("Ux");
-      outViewpointY = point.Number("Uy");
-      outViewpointZ = point.Number("Uz");
+      point.ReadNumber("Ux", outViewpointX);
+      point.ReadNumber("Uy", outViewpointY);
+      point.ReadNumber("Uz", outViewpointZ);
     });
     // There is no second vector: the last three outputs keep the caller's texts.
     ForEachElement(inViewpoint, "Vector", [&](const DOM_Node& inVector) {
       const ElementAttributes vector(inVector);
       if (vector.Text("CorrespondingData") != "Sight") return;
-      outSightX = vector.Number("Vx");
-      outSightY = vector.Number("Vy");
-      outSightZ = vector.Number("Vz");
+      vector.ReadNumber("Vx", outSightX);
+      vector.ReadNumber("Vy", outSightY);
+      vector.ReadNumber("Vz", outSightZ);
     });
   };
   const auto readGeometry = [&](const DOM_Node& inGeometry) {
     const ElementAttributes geometry(inGeometry);
-    outCurveLength = geometry.Number("IntersectCurveLength");
-    outDistance = geometry.Number("ExtractOrDistValue");
+    geometry.ReadNumber("IntersectCurveLength", outCurveLength);
+    geometry.ReadNumber("ExtractOrDistValue", outDistance);
     outReserved = ZORUnicodeString();
-    ForEachChild(inGeometry, [&](const DOM_Node& inChild) {
-      if (IsElementNamed(inChild, "Point"))
+    ForEachElement(inGeometry, [&](const DOM_Node& inChild) {
+      if (adapter::HasName(inChild, "Point"))
         AppendPoint(inChild, outPoints);
-      else if (IsElementNamed(inChild, "Viewpoint"))
+      else if (adapter::HasName(inChild, "Viewpoint"))
         readViewpoint(inChild);
     });
   };
 
-  ForEachChild(inInterference, [&](const DOM_Node& inChild) {
-    if (inChild.getNodeType() != DOM_Node::ELEMENT_NODE) return;
-    const DOMString name = inChild.getNodeName();
-    if (adapter::IsText(name, "ViolatedRule"))
+  ForEachElement(inInterference, [&](const DOM_Node& inChild) {
+    if (adapter::HasName(inChild, "ViolatedRule"))
       readRule(inChild);
-    else if (adapter::IsText(name, "Product"))
+    else if (adapter::HasName(inChild, "Product"))
       readProduct(inChild);
-    else if (adapter::IsText(name, "GeometricAspect"))
+    else if (adapter::HasName(inChild, "GeometricAspect"))
       readGeometry(inChild);
-    else if (adapter::IsText(name, "Comment"))
-      outComment = GetAttrOnNode(inChild, "Value");
+    else if (adapter::HasName(inChild, "Comment"))
+      ElementAttributes(inChild).ReadText("Value", outComment);
   });
 }
 
@@ -212,14 +232,14 @@ void ZORClashParsing::GetInterferenceData(DOM_Node inInterference, ZORUnicodeStr
                                           ZORUnicodeString& ioFirstAlias,
                                           ZORUnicodeString& outSecondAlias) {
   const ElementAttributes interference(inInterference);
-  outValue = interference.Text("Value");
-  outResultType = interference.Text("ResultType");
-  ForEachChild(inInterference, [&](const DOM_Node& inChild) {
-    if (IsElementNamed(inChild, "ViolatedRule"))
-      outRuleName = GetAttrOnNode(inChild, names::Name.ConvertToChar());
-    else if (IsElementNamed(inChild, "Product"))
-      (ioFirstAlias.GetLengthInChar() == 0 ? ioFirstAlias : outSecondAlias) =
-          GetAttrOnNode(inChild, names::Alias.ConvertToChar());
+  interference.ReadText("Value", outValue);
+  interference.ReadText("ResultType", outResultType);
+  ForEachElement(inInterference, [&](const DOM_Node& inChild) {
+    if (adapter::HasName(inChild, "ViolatedRule"))
+      ElementAttributes(inChild).ReadText(names::Name, outRuleName);
+    else if (adapter::HasName(inChild, "Product"))
+      ElementAttributes(inChild).ReadText(
+          names::Alias, ioFirstAlias.GetLengthInChar() == 0 ? ioFirstAlias : outSecondAlias);
   });
 }
 
@@ -230,7 +250,7 @@ void ZORClashParsing::GetInterferenceData(DOM_Node inInterference, ZORUnicodeStr
   ForEachElement(inInterference, "Product", [&](const DOM_Node& inProduct) {
     const ElementAttributes product(inProduct);
     const bool first = ioFirstLabel.GetLengthInChar() == 0;
-    ZORUnicodeString label = GetInstanceNameFromDID(product.Text(names::Alias));
+    ZORUnicodeString label = InstanceName(product.Text(names::Alias));
     adapter::AppendUnits(label, u" -- ");
     label += product.Text(names::ShapeName);
     (first ? ioFirstLabel : outSecondLabel) = label;
@@ -287,15 +307,5 @@ void ZORClashParsing::GetInterferenceData(DOM_Node inInterference, ZORUnicodeStr
 }
 
 ZORUnicodeString ZORClashParsing::GetInstanceNameFromDID(ZORUnicodeString inDescriptionId) {
-  ZORUnicodeString last;
-  const std::u16string_view path = adapter::UnitsOf(inDescriptionId);
-  if (const std::u16string_view plain = LastPlainSegment(path); !plain.empty()) {
-    last.BuildFromUTF16(plain.data(), plain.size());
-    return last;
-  }
-  ZORToken segments(SegmentsAsLines(path));
-  for (ZORUnicodeString segment = segments.GetNextToken("\n"); segment.GetLengthInChar() != 0;
-       segment = segments.GetNextToken("\n"))
-    last = segment;
-  return last;
+  return InstanceName(inDescriptionId);
 }

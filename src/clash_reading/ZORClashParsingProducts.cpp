@@ -49,9 +49,10 @@ void ZORClashParsing::GetSetOfRealAttr(int inPosition, int inNumber, ZORUnicodeS
   const auto& attributes = ZORClashDocumentIndex::Of(*this, root_).RealAttributes(component);
   if (inNumber < 1 || static_cast<std::size_t>(inNumber) > attributes.size()) return;
   const DOM_Node& attribute = attributes[static_cast<std::size_t>(inNumber) - 1];
-  outName = GetAttrOnNode(attribute, names::Name.ConvertToChar());
-  outType = GetAttrOnNode(attribute, names::AttrType.ConvertToChar());
-  outValue = GetAttrOnNode(attribute, names::AttrValue.ConvertToChar());
+  const ElementAttributes read(attribute);
+  read.ReadText(names::Name, outName);
+  read.ReadText(names::AttrType, outType);
+  read.ReadText(names::AttrValue, outValue);
 }
 
 int ZORClashParsing::GetNbShapes(int inPosition) {
@@ -73,9 +74,9 @@ void ZORClashParsing::GetPosition(int inPosition, double*& outPosition) {
   char ux[] = "Ux", uy[] = "Uy", uz[] = "Uz";
   const ZORUnicodeString* triples[] = {&names::Rx, &names::Ry, &names::Rz, &names::T};
   ForEachElement(component, names::ShapePosition, [&](const DOM_Node& inPlacement) {
-    ForEachChild(inPlacement, [&](const DOM_Node& inTriple) {
+    ForEachElement(inPlacement, [&](const DOM_Node& inTriple) {
       for (int i = 0; i < 4; ++i) {
-        if (!IsElementNamed(inTriple, *triples[i])) continue;
+        if (!adapter::HasName(inTriple, *triples[i])) continue;
         const DOM_NamedNodeMap attributes = inTriple.getAttributes();
         outPosition[3 * i] = TransDouble(attributes, ux);
         outPosition[3 * i + 1] = TransDouble(attributes, uy);
@@ -105,11 +106,12 @@ void ZORClashParsing::GetProductsInSpec(
                            ZORUnicodeString& outId, ZORUnicodeString& outVersion,
                            ZORUnicodeString& outAlien, ZORUnicodeString& outShapeName) {
     ForEachElement(specification, inSetName, [&](const DOM_Node& inSet) {
-      outAlias = GetAttrOnNode(inSet, names::Alias.ConvertToChar());
-      outId = GetAttrOnNode(inSet, "DisplayableID");
-      outVersion = GetAttrOnNode(inSet, "DocumentVersion");
-      outAlien = GetAttrOnNode(inSet, names::Alien.ConvertToChar());
-      outShapeName = GetAttrOnNode(inSet, names::ShapeName.ConvertToChar());
+      const ElementAttributes set(inSet);
+      set.ReadText(names::Alias, outAlias);
+      set.ReadText("DisplayableID", outId);
+      set.ReadText("DocumentVersion", outVersion);
+      set.ReadText(names::Alien, outAlien);
+      set.ReadText(names::ShapeName, outShapeName);
     });
   };
   readSet("ProdListe1", outFirstAlias, outFirstId, outFirstVersion, outFirstAlien,

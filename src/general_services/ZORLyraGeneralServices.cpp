@@ -115,7 +115,9 @@ ZORListValZORUnicodeString AliasesToRoot(ZORIProduct_var inProduct) {
 }  // namespace
 
 ZORUnicodeString ZORLyraGeneralServices::GetAttrOnNode(DOM_Node inNode, const char* inName) {
-  return GetDOMName(inNode.getAttributes().getNamedItem(inName).getNodeValue());
+  ZORUnicodeString text;
+  adapter::AttributeSource(inNode).Read(inName, text);
+  return text;
 }
 
 ZORUnicodeString ZORLyraGeneralServices::GetDOMName(DOMString inText) {

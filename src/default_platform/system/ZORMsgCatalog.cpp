@@ -1,5 +1,11 @@
 #include "platform/system/ZORMsgCatalog.h"
 
+#ifdef __unix__
+#include <unistd.h>
+#endif
+
+#include <array>
+#include <cstring>
 #include <map>
 #include <memory>
 #include <mutex>
@@ -53,13 +59,51 @@ std::string LanguageOf(std::string_view inLocale) {
   return language.size() < 2 || language == "posix" || !isWord ? "en" : language;
 }
 
-std::string UserLanguage() {
-  for (const char* const variable : {"ZOR_LANG", "LC_ALL", "LC_MESSAGES", "LANG"}) {
-    const char* const value = ZORGetEnv(variable);
-    if (value && *value) return LanguageOf(value);
+// What the environment says now about where a catalogue is: null for a variable that is not set.
+struct SearchVariables {
+  std::array<const char*, 4> languages{};  // the first that is not empty counts
+  const char* path = nullptr;
+
+  std::string Language() const {
+    for (const char* const value : languages)
+      if (value && *value) return LanguageOf(value);
+    return "en";
   }
-  return "en";
+};
+constexpr std::array<std::string_view, 4> kLanguageVariables = {"ZOR_LANG", "LC_ALL", "LC_MESSAGES",
+                                                                "LANG"};
+constexpr std::string_view kPathVariable = "ZOR_CATALOGUE_PATH";
+
+#ifdef __unix__
+
+// One pass over the environment in place of one for each variable: each call of a host asks.
+SearchVariables ReadSearchVariables() {
+  SearchVariables found;
+  const auto keep = [](const char* inEntry, std::string_view inName, const char*& ioValue) {
+    if (ioValue == nullptr && std::strncmp(inEntry, inName.data(), inName.size()) == 0 &&
+        inEntry[inName.size()] == '=')
+      ioValue = inEntry + inName.size() + 1;
+  };
+  for (char** entry = environ; entry != nullptr && *entry != nullptr; ++entry) {
+    if (**entry != 'Z' && **entry != 'L') continue;
+    for (std::size_t i = 0; i < found.languages.size(); ++i)
+      keep(*entry, kLanguageVariables[i], found.languages[i]);
+    keep(*entry, kPathVariable, found.path);
+  }
+  return found;
 }
+
+#else
+
+SearchVariables ReadSearchVariables() {
+  SearchVariables found;
+  for (std::size_t i = 0; i < found.languages.size(); ++i)
+    found.languages[i] = ZORGetEnv(kLanguageVariables[i].data());
+  found.path = ZORGetEnv(kPathVariable.data());
+  return found;
+}
+
+#endif
 
 // The files that a catalogue may be, the first to be looked for first. Hosts ask for the same one a
 // hundred thousand times: the last answer holds as long as the environment does.
@@ -72,9 +116,9 @@ std::shared_ptr<const std::vector<std::string>> CandidatesOf(const char* inName)
   static auto* const lastOfAll = new Search;
   const std::lock_guard lock(mutex);
   Search& last = *lastOfAll;
-  const std::string language = UserLanguage();
-  const char* const path = ZORGetEnv("ZOR_CATALOGUE_PATH");
-  const std::string_view pathNow = path == nullptr ? "" : path;
+  const SearchVariables variables = ReadSearchVariables();
+  const std::string language = variables.Language();
+  const std::string_view pathNow = variables.path == nullptr ? "" : variables.path;
   if (last.name == inName && last.language == language && last.path == pathNow) return last.files;
   const std::vector<std::string> directories = ZORDefault::CatalogueDirectories();
   auto files = std::make_shared<std::vector<std::string>>(

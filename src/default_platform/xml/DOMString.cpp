@@ -167,18 +167,21 @@ bool DOMString::equals(const char* inAscii) const {
                     TextView(inAscii == nullptr ? std::string_view() : inAscii));
 }
 
-ZORUnicodeString DOMString::DOMStringToZORUnicodeString() const {
+void DOM_HandleAccess::CopyTo(ZORUnicodeString& outText, TextView inView) {
   constexpr std::size_t kShort = 256;
-  ZORUnicodeString text;
-  const TextView view = DOM_HandleAccess::View(*this);
-  if (view.IsWide()) {
-    text.BuildFromUTF16(view.Units().data(), view.Length());
-  } else if (view.Length() <= kShort) {
+  if (inView.IsWide()) {
+    outText.BuildFromUTF16(inView.Units().data(), inView.Length());
+  } else if (inView.Length() <= kShort) {
     char16_t units[kShort];
-    view.CopyTo(units);
-    text.BuildFromUTF16(units, view.Length());
+    WidenLatin1(inView.Latin1(), units);
+    outText.BuildFromUTF16(units, inView.Length());
   } else {
-    text.BuildFromUTF16(view.ToUtf16().data(), view.Length());
+    outText.BuildFromUTF16(inView.ToUtf16().data(), inView.Length());
   }
+}
+
+ZORUnicodeString DOMString::DOMStringToZORUnicodeString() const {
+  ZORUnicodeString text;
+  DOM_HandleAccess::CopyTo(text, DOM_HandleAccess::View(*this));
   return text;
 }

@@ -48,6 +48,7 @@ class DOM_HandleAccess {
   static TextRef TextFor(DOM_Tree& ioTree, const DOMString& inText) {
     return ioTree.AddText(View(inText));
   }
+  static void CopyTo(ZORUnicodeString& outText, TextView inView);
   /// Makes a string of well-formed UTF-8, which is widened when its code units are asked for.
   /// @param inUnits the number of its code units.
   static DOMString StringOfUtf8(MallocedBytes inBytes, std::size_t inCount, std::uint32_t inUnits);

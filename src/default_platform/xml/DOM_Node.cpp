@@ -32,6 +32,14 @@ const DOMString& KindName(int inKind) {
   }
 }
 
+DOM_Tree::Attribute FindNarrow(const DOM_Tree& inTree, DOM_Tree::Node inElement,
+                               const char* inName) {
+  if (inName == nullptr) return 0;
+  const DOM_Tree::Attribute attribute = inTree.FindAttribute(inElement, inName);
+  if (attribute != 0 || ZORFoundation::IsAscii(inName)) return attribute;
+  return inTree.FindAttribute(inElement, DOM_HandleAccess::View(DOMString(inName)));
+}
+
 [[noreturn]] void RefuseNull() {
   throw DOM_DOMException(DOM_DOMException::NULL_HANDLE_ERR, "a change through a null handle");
 }
@@ -221,6 +229,30 @@ DOM_Document DOM_Node::getOwnerDocument() const {
   return DOM_HandleAccess::DocumentOf(tree_);
 }
 
+DOM_Node DOM_Node::getFirstElementChild() const {
+  if (tree_ == nullptr || attribute_ != 0) return DOM_Node();
+  return DOM_HandleAccess::Handle(tree_, tree_->ElementFrom(tree_->FirstChild(node_)));
+}
+
+DOM_Node DOM_Node::getNextElementSibling() const {
+  if (tree_ == nullptr || attribute_ != 0) return DOM_Node();
+  return DOM_HandleAccess::Handle(tree_, tree_->ElementFrom(tree_->At(node_).next));
+}
+
+bool DOM_Node::hasName(const char* inAscii) const {
+  if (inAscii == nullptr || getNodeType() != ELEMENT_NODE) return getNodeName().equals(inAscii);
+  return IsSameText(tree_->NameUnits(tree_->At(node_).name), inAscii);
+}
+
+void DOM_Node::getAttributeText(const char* inName, ZORUnicodeString& outText) const {
+  const DOM_Tree::Attribute attribute =
+      getNodeType() == ELEMENT_NODE ? FindNarrow(*tree_, node_, inName) : 0;
+  if (attribute == 0)
+    outText.BuildFromUTF16(nullptr, 0);
+  else
+    DOM_HandleAccess::CopyTo(outText, tree_->Text(tree_->AttributeAt(attribute).value)->View());
+}
+
 std::uint64_t DOM_Node::getChangeCount() const {
   return tree_ == nullptr ? 0 : tree_->ChangeCount();
 }
@@ -338,12 +370,9 @@ DOM_Node DOM_NamedNodeMap::getNamedItem(const DOMString& inName) const {
 
 DOM_Node DOM_NamedNodeMap::getNamedItem(const char* inName) const {
   if (isNull()) return DOM_Node();
-  const std::string_view name = inName == nullptr ? std::string_view() : inName;
   DOM_Tree* const tree = DOM_HandleAccess::TreeOf(element_);
   const DOM_Tree::Node element = DOM_HandleAccess::NodeOf(element_);
-  const DOM_Tree::Attribute attribute = tree->FindAttribute(element, name);
-  if (attribute == 0 && !ZORFoundation::IsAscii(name)) return getNamedItem(DOMString(inName));
-  return DOM_HandleAccess::Handle(tree, element, attribute);
+  return DOM_HandleAccess::Handle(tree, element, FindNarrow(*tree, element, inName));
 }
 
 // ---- refusals

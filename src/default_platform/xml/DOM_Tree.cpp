@@ -96,16 +96,6 @@ DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, TextView inName) con
   return attribute;
 }
 
-DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, std::string_view inAscii) const {
-  Attribute attribute = At(inElement).firstAttribute;
-  if (attribute == 0) return 0;
-  const Name name = names_.FindAscii(inAscii);
-  if (name == 0) return 0;
-  while (attribute != 0 && attributes_[attribute].name != name)
-    attribute = attributes_[attribute].next;
-  return attribute;
-}
-
 // ---- making
 
 DOM_Tree::Node DOM_Tree::TakeNode() {
@@ -210,19 +200,26 @@ DOM_Tree::Node DOM_Tree::Copy(const DOM_Tree& inSource, Node inNode, bool inDeep
   const Node root = CopyOne(inSource, inNode, group);
   ListRoot(root, group);
   Node parent = root;  // the copy of the parent of what is copied next
+  Node last = 0;       // the last child of that copy so far
   Node from = inDeep ? inSource.FirstChild(inNode) : 0;
   while (from != 0) {
     const Node copy = CopyOne(inSource, from, group);
-    LinkLast(parent, copy);
-    const Node child = inSource.FirstChild(from);
-    if (child != 0) {
+    NodeRecord& record = nodes_[copy];
+    record.parent = parent;
+    record.previous = last == 0 ? copy : last;
+    (last == 0 ? nodes_[parent].firstChild : nodes_[last].next) = copy;
+    last = copy;
+    if (const Node child = inSource.FirstChild(from); child != 0) {
       parent = copy;
+      last = 0;
       from = child;
       continue;
     }
     while (from != inNode && inSource.At(from).next == 0) {
+      EndChildren(parent, last);
+      last = parent;
+      parent = nodes_[parent].parent;
       from = inSource.At(from).parent;
-      if (from != inNode) parent = nodes_[parent].parent;
     }
     from = from == inNode ? 0 : inSource.At(from).next;
   }

@@ -142,7 +142,21 @@ class DOM_Tree {
   Attribute AttributeAtPosition(Node inElement, std::uint32_t inPosition);
   Attribute FindAttribute(Node inElement, TextView inName) const;
   /// Finds nothing by a name that is not ASCII.
-  Attribute FindAttribute(Node inElement, std::string_view inAscii) const;
+  /// @param inAscii zero-terminated.
+  Attribute FindAttribute(Node inElement, const char* inAscii) const {
+    Attribute attribute = At(inElement).firstAttribute;
+    if (attribute == 0) return 0;
+    const Name name = names_.FindAscii(inAscii);
+    if (name == 0) return 0;
+    while (attribute != 0 && attributes_[attribute].name != name)
+      attribute = attributes_[attribute].next;
+    return attribute;
+  }
+  /// A node itself or else the first element after it among its siblings; 0 when there is none.
+  Node ElementFrom(Node inNode) const {
+    while (inNode != 0 && At(inNode).kind != DOM_Node::ELEMENT_NODE) inNode = At(inNode).next;
+    return inNode;
+  }
   Node FirstChildOfKind(Node inParent, int inKind) const;
   const DOM_Text* NameText(Name inName) const { return names_.TextOf(inName); }
   std::u16string_view NameUnits(Name inName) const { return names_.UnitsOf(inName); }

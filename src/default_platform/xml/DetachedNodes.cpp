@@ -24,20 +24,6 @@ void DetachedNodes::FreeGroup(Group inGroup) noexcept {
   freeGroups_.push_back(inGroup);
 }
 
-void DetachedNodes::AddNode(Node inNode, Group inGroup) {
-  Chunk& chunk = ChunkFor(inNode);
-  ++chunk.used;
-  chunk.entries[inNode & (kChunkSize - 1)] = Entry{inGroup, 0};
-  ++groups_[inGroup].nodes;
-}
-
-void DetachedNodes::RemoveNode(Node inNode) {
-  const Entry entry = EntryOf(inNode);
-  groups_[entry.group].handles -= entry.handles;
-  --groups_[entry.group].nodes;
-  LeaveChunk(inNode);
-}
-
 void DetachedNodes::MoveNode(Node inNode, Group inGroup) {
   Entry& entry = EntryOf(inNode);
   groups_[entry.group].handles -= entry.handles;
@@ -47,16 +33,10 @@ void DetachedNodes::MoveNode(Node inNode, Group inGroup) {
   ++groups_[inGroup].nodes;
 }
 
-DetachedNodes::Chunk& DetachedNodes::ChunkFor(Node inNode) {
-  const std::uint32_t number = inNode >> kChunkBits;
-  if (number >= chunks_.size()) chunks_.resize(number + 1);
-  if (!chunks_[number]) chunks_[number] = spare_ ? std::move(spare_) : std::make_unique<Chunk>();
-  return *chunks_[number];
-}
-
-void DetachedNodes::LeaveChunk(Node inNode) {
-  std::unique_ptr<Chunk>& chunk = chunks_[inNode >> kChunkBits];
-  if (--chunk->used == 0) spare_ = std::move(chunk);
+DetachedNodes::Chunk& DetachedNodes::NewChunk(std::uint32_t inNumber) {
+  if (inNumber >= chunks_.size()) chunks_.resize(inNumber + 1);
+  chunks_[inNumber] = spare_ ? std::move(spare_) : std::make_unique<Chunk>();
+  return *chunks_[inNumber];
 }
 
 // ---- what the tree does with them
@@ -134,20 +114,20 @@ void DOM_Tree::Reclaim(DetachedNodes::Group inGroup) noexcept {
   detached_.FreeGroup(inGroup);
 }
 
+// Children first, so that a node's links are still there when they are followed.
 void DOM_Tree::FreeSubtree(Node inRoot) {
-  Node at = inRoot;
-  while (at != 0) {
-    // Children first: a node goes when it has none left.
-    const Node child = FirstChild(at);
-    if (child != 0) {
-      nodes_[at].firstChild = nodes_[child].next;
-      at = child;
-      continue;
-    }
-    const Node parent = at == inRoot ? 0 : nodes_[at].parent;
+  const auto firstLeaf = [this](Node inNode) {
+    for (Node child = FirstChild(inNode); child != 0; child = FirstChild(inNode)) inNode = child;
+    return inNode;
+  };
+  Node at = firstLeaf(inRoot);
+  while (at != inRoot) {
+    const NodeRecord& record = At(at);
+    const Node next = record.next == 0 ? record.parent : firstLeaf(record.next);
     FreeOne(at);
-    at = parent;
+    at = next;
   }
+  FreeOne(inRoot);
 }
 
 void DOM_Tree::FreeOne(Node inNode) {

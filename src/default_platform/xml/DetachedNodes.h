@@ -62,8 +62,11 @@ class DetachedNodes {
   Entry& EntryOf(Node inNode) const {
     return chunks_[inNode >> kChunkBits]->entries[inNode & (kChunkSize - 1)];
   }
-  Chunk& ChunkFor(Node inNode);
-  void LeaveChunk(Node inNode);
+  Chunk& ChunkFor(Node inNode) {
+    const std::uint32_t number = inNode >> kChunkBits;
+    return number < chunks_.size() && chunks_[number] ? *chunks_[number] : NewChunk(number);
+  }
+  Chunk& NewChunk(std::uint32_t inNumber);
 
   // Only the chunks that hold detached nodes exist; most documents have none.
   std::vector<std::unique_ptr<Chunk>> chunks_;
@@ -71,5 +74,21 @@ class DetachedNodes {
   std::vector<GroupRecord> groups_;
   std::vector<Group> freeGroups_;
 };
+
+inline void DetachedNodes::AddNode(Node inNode, Group inGroup) {
+  Chunk& chunk = ChunkFor(inNode);
+  ++chunk.used;
+  chunk.entries[inNode & (kChunkSize - 1)] = Entry{inGroup, 0};
+  ++groups_[inGroup].nodes;
+}
+
+inline void DetachedNodes::RemoveNode(Node inNode) {
+  std::unique_ptr<Chunk>& chunk = chunks_[inNode >> kChunkBits];
+  const Entry entry = chunk->entries[inNode & (kChunkSize - 1)];
+  GroupRecord& group = groups_[entry.group];
+  group.handles -= entry.handles;
+  --group.nodes;
+  if (--chunk->used == 0) spare_ = std::move(chunk);
+}
 
 #endif

@@ -18,6 +18,12 @@ bool IsLatin1(std::u16string_view inUnits) {
   return all < 0x100;
 }
 
+// Stored texts are as narrow as they can be, so equal ones have units of one size.
+bool AreSameAsStored(TextView inA, TextView inB) {
+  return inA.IsWide() == inB.IsWide() && inA.Length() == inB.Length() &&
+         (inA.Length() == 0 || std::memcmp(inA.Data(), inB.Data(), inA.Bytes()) == 0);
+}
+
 }  // namespace
 
 void TextView::CopyTo(char16_t* outUnits) const {
@@ -62,7 +68,7 @@ TextRef TextStore::AddStored(TextView inText) {
 TextRef TextStore::AddShared(TextView inText) {
   const std::uint64_t hash = HashOfBytes(inText.Data(), inText.Bytes());
   Shared& slot = shared_[hash % kSharedSlots];
-  if (slot.text == 0 || slot.hash != hash || !IsSameText((*this)[slot.text].View(), inText))
+  if (slot.text == 0 || slot.hash != hash || !AreSameAsStored((*this)[slot.text].View(), inText))
     slot = {hash, AddUnshared(inText)};
   return slot.text;
 }
@@ -146,13 +152,14 @@ std::size_t NameTable::SlotOf(std::u16string_view inName) const {
   return slot;
 }
 
-std::uint32_t NameTable::FindAscii(std::string_view inName) const {
-  const auto address = reinterpret_cast<std::uintptr_t>(inName.data());
-  std::uint32_t& found = found_[(address ^ (address >> 8)) % found_.size()];
-  if (found != 0 && IsSameText(UnitsOf(found), inName)) return found;
+std::uint32_t NameTable::FindNewAscii(std::string_view inName) const {
   if (!ZORFoundation::IsAscii(inName)) return 0;
   const std::uint32_t name = slots_[SlotOf(TextView(inName).ToUtf16())];
-  if (name != 0) found = name;
+  Found& found = found_[PlaceOf(inName.data())];
+  if (name != 0 && inName.size() < sizeof(found.text)) {
+    found.name = name;
+    *std::copy(inName.begin(), inName.end(), found.text) = '\0';
+  }
   return name;
 }
 

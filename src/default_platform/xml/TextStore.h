@@ -130,8 +130,13 @@ class NameTable {
 
   explicit NameTable(TextStore& ioTexts);
   std::uint32_t Intern(std::u16string_view inName);
+  /// @param inName zero-terminated.
   /// @return 0 for a name that the document does not have, and for all that is not ASCII.
-  std::uint32_t FindAscii(std::string_view inName) const;
+  std::uint32_t FindAscii(const char* inName) const {
+    const Found& found = found_[PlaceOf(inName)];
+    return found.name != 0 && std::strcmp(found.text, inName) == 0 ? found.name
+                                                                   : FindNewAscii(inName);
+  }
   const DOM_Text* TextOf(std::uint32_t inName) const { return names_[inName]; }
   std::u16string_view UnitsOf(std::uint32_t inName) const {
     return {names_[inName]->Units(), names_[inName]->Length()};
@@ -140,15 +145,25 @@ class NameTable {
   std::uint32_t End() const { return static_cast<std::uint32_t>(names_.size()); }
 
  private:
+  static constexpr std::size_t kFound = 256;
+  struct Found {
+    std::uint32_t name = 0;
+    char text[28] = {};
+  };
+  static std::size_t PlaceOf(const char* inName) {
+    const auto address = reinterpret_cast<std::uintptr_t>(inName);
+    return (address ^ (address >> 8)) % kFound;
+  }
+  std::uint32_t FindNewAscii(std::string_view inName) const;
   std::size_t SlotOf(std::u16string_view inName) const;
   void Grow();
 
   TextStore& texts_;
   std::vector<const DOM_Text*> names_;
   std::vector<std::uint32_t> slots_;  // open addressing; a power of two
-  // Readers ask for the same few names by the same literals: the last one found by each address,
-  // all ASCII.
-  mutable std::array<std::uint32_t, 256> found_{};
+  // Readers ask for the same few names by the same literals: the last short one found by each
+  // address, all ASCII.
+  mutable std::array<Found, kFound> found_{};
 };
 
 /// Up to seven bytes as a number, different for different bytes of one count; free of calls.

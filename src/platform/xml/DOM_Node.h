@@ -85,6 +85,14 @@ class ZOR_PLATFORM_EXPORT DOM_Node {
   /// Same node of the same document; two null handles are equal.
   bool operator==(const DOM_Node& inOther) const;
   bool operator!=(const DOM_Node& inOther) const;
+  /// As getFirstChild and getNextSibling, passing over all that is no element.
+  DOM_Node getFirstElementChild() const;
+  DOM_Node getNextElementSibling() const;
+  /// Whether the node's name is this text, without making a string of it.
+  bool hasName(const char* inAscii) const;
+  /// Puts the value of an attribute into a text, without making a handle or a string of it; empties
+  /// it when the node has no such attribute.
+  void getAttributeText(const char* inName, ZORUnicodeString& outText) const;
   /// How many changes have been made to the node's document so far. The same number twice means
   /// that no node in it has come, gone, moved or changed its value in between. Making a node or a
   /// copy that stays outside the tree, and changing such nodes, does not count.

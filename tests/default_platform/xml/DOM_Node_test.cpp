@@ -119,6 +119,42 @@ TEST(DOM_Node, NeighboursOfANode) {
   EXPECT_TRUE(root.getOwnerDocument().getOwnerDocument().isNull());
 }
 
+TEST(DOM_Node, ElementsAmongOtherNodes) {
+  const DOM_Node root = RootOf("<r> <!--c--><a/>text<?p i?><b/> </r>");
+  const DOM_Node a = root.getFirstElementChild();
+  EXPECT_TRUE(a.hasName("a"));
+  EXPECT_FALSE(a.hasName("ab"));
+  EXPECT_FALSE(a.hasName(""));
+  EXPECT_TRUE(root.getFirstChild().hasName("#text"));
+  EXPECT_FALSE(root.getFirstChild().hasName("a"));
+  EXPECT_TRUE(root.getFirstChild().getNextElementSibling() == a);
+  const DOM_Node b = a.getNextElementSibling();
+  EXPECT_TRUE(b.hasName("b"));
+  EXPECT_TRUE(b.getNextElementSibling().isNull());
+  EXPECT_TRUE(b.getFirstElementChild().isNull());
+  const DOM_Node none;
+  EXPECT_TRUE(none.getFirstElementChild().isNull());
+  EXPECT_TRUE(none.getNextElementSibling().isNull());
+  EXPECT_FALSE(none.hasName("a"));
+}
+
+TEST(DOM_Node, AttributeTextOfPresentAndMissingAttributes) {
+  const DOM_Node root = RootOf("<r Name='v\u00E9' Empty='' \u00E9t\u00E9='wide \u30B1'>t</r>");
+  const auto read = [](const DOM_Node& inNode, const char* inName) {
+    ZORUnicodeString text("before");
+    inNode.getAttributeText(inName, text);
+    return text;
+  };
+  EXPECT_EQ(read(root, "Name"), ZORUnicodeString("v\u00E9"));
+  EXPECT_EQ(read(root, "\u00E9t\u00E9"), ZORUnicodeString("wide \u30B1"));
+  EXPECT_EQ(read(root, "Empty"), ZORUnicodeString());
+  EXPECT_EQ(read(root, "name"), ZORUnicodeString());
+  EXPECT_EQ(read(root, nullptr), ZORUnicodeString());
+  EXPECT_EQ(read(root.getFirstChild(), "Name"), ZORUnicodeString());
+  EXPECT_EQ(read(root.getAttributes().item(0), "Name"), ZORUnicodeString());
+  EXPECT_EQ(read(DOM_Node(), "Name"), ZORUnicodeString());
+}
+
 TEST(DOM_Node, AttributeHasNeitherParentNorChildren) {
   const DOM_Node attribute = RootOf("<a x='1' y='2'><b/></a>").getAttributes().item(0);
   EXPECT_TRUE(attribute.getParentNode().isNull());
