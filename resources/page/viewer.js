@@ -49,11 +49,28 @@ const ghostsOf = async (scene, pair) => {
   return ghosts;
 };
 
-// A frame that turns has a pixel for each of the screen's, or fewer where that is too slow; one that stands has four, which
-// smooths its edges.
+// A frame that turns has a pixel for each of the screen's and all triangles, or fewer where that is too slow; one that stands
+// has four pixels for each, which smooths its edges. What was too slow twice is not tried again while it turns, since each
+// other size has to be made room for.
 
-const slow = 1000 / 28, stillAfter = 150;
-let isAsked = false, lastFrame = 0, coarseness = 1, stillTimer = 0;
+const details = [{ scale: 1, cells: 0 }, { scale: 0.7, cells: 0 }, { scale: 0.7, cells: 64 }, { scale: 0.5, cells: 64 }, { scale: 0.35, cells: 32 }, { scale: 0.35, cells: 16 }];
+const still = { scale: 2, cells: 0 }, tooSlow = 1000 / 33, quick = 1000 / 50, stillAfter = 150;
+const pace = { coarseness: 0, frames: 0, meanTime: 0, failures: [] };
+const keepPace = took => {
+  const { coarseness } = pace, change = step => Object.assign(pace, { coarseness: coarseness + step, frames: 0, meanTime: 0 });
+  if (isStill) {  // it begins to turn
+    isStill = false;
+    pace.failures = details.map(() => 0);
+    return void change(coarseness ? -1 : 0);
+  }
+  if (++pace.frames < 4) return;  // until there is room
+  pace.meanTime = pace.meanTime ? 0.8 * pace.meanTime + 0.2 * took : took;
+  if (pace.meanTime > tooSlow && coarseness < details.length - 1) {
+    ++pace.failures[coarseness];
+    change(1);
+  } else if (pace.frames > 30 && pace.meanTime < quick && coarseness && pace.failures[coarseness - 1] < 2) change(-1);
+};
+let isAsked = false, isStill = true, lastFrame = 0, stillTimer = 0;
 const redraw = () => {
   if (isAsked) return;
   isAsked = true;
@@ -61,27 +78,27 @@ const redraw = () => {
   clearTimeout(stillTimer);
   requestAnimationFrame(time => {
     isAsked = false;
-    const took = time - lastFrame;
+    keepPace(time - lastFrame);
     lastFrame = time;
-    if (took < stillAfter) coarseness = Math.min(3, Math.max(1, coarseness * (took > slow ? 1.15 : 0.97)));
-    drawNow(1 / coarseness);
-    stillTimer = setTimeout(() => drawNow(2), stillAfter);
+    drawNow(details[pace.coarseness]);
+    stillTimer = setTimeout(() => { isStill = true; drawNow(still); }, stillAfter);
   });
 };
 
-const drawNow = scale => {
+const drawNow = ({ scale, cells }) => {
   if (!view?.camera) return;
-  const { canvas } = drawing, ratio = scale * Math.min(devicePixelRatio || 1, 2);
-  const width = Math.round(canvas.clientWidth * ratio), height = Math.round(canvas.clientHeight * ratio);
+  const { canvas } = drawing, { camera } = view, ratio = scale * Math.min(devicePixelRatio || 1, 2);
+  const width = Math.round(drawing.width * ratio), height = Math.round(drawing.height * ratio);
   if (!width || !height) return;
   if (canvas.width !== width || canvas.height !== height) Object.assign(canvas, { width, height });
-  const solids = view.solids.filter(solid => !view.hidden[solid.product]);
-  const ghosts = view.hasGhosts ? view.ghosts : [];
+  const viewFromRoot = camera.matrix(width / height, view.hasGhosts ? view.wholeSphere : view.sphere);
   drawing.draw({
-    camera: view.camera, sphere: ghosts.length ? view.wholeSphere : view.sphere, section: view.section && sectionPlane(), solids, ghosts,
-    points: view.pair.points, curve: view.pair.curve.flat().map(i => view.pair.points[i]), isDimension: view.pair.isDimension, marker: view.pair.markers, measured: view.measured,
+    camera, viewFromRoot, section: view.section && sectionPlane(),
+    solids: view.batches.filter((_, product) => !view.hidden[product]).flat().map(batch => coarseBatch(batch, cells)),
+    ghosts: view.hasGhosts && view.ghosts ? view.ghosts.seen(viewFromRoot, camera, cells / 2, cells ? 0.5 / cells : 0) : [],
+    points: view.pair.points, curve: view.curve, isDimension: view.pair.isDimension, marker: view.pair.markers, measured: view.measured,
   });
-  if (scale === 2 && !isAsked) canvas.dataset.still = '1';
+  if (scale === still.scale && !isAsked) canvas.dataset.still = '1';
 };
 
 // The section: a plane through the interference, which moves along its direction.
@@ -147,9 +164,10 @@ const showViewer = () => {
 const toggleGhosts = async () => {
   const mine = view;
   mine.hasGhosts = !mine.hasGhosts;
-  if (mine.hasGhosts && !mine.ghosts.length) {
-    mine.ghosts = await ghostsOf(await readScene(), mine.pair);
-    mine.wholeSphere = sphereOf([...mine.ghosts, ...mine.solids]);
+  if (mine.hasGhosts && !mine.ghosts) {
+    const ghosts = await ghostsOf(await readScene(), mine.pair);
+    mine.wholeSphere = sphereOf([...ghosts, ...mine.solids]);
+    mine.ghosts = new Ghosts(ghosts);
   }
   if (view === mine) showViewer();
 };
@@ -202,12 +220,14 @@ const listenToPointers = canvas => {
   }, { passive: false });
   canvas.addEventListener('keydown', event => {
     if (event.ctrlKey || event.metaKey || event.altKey || !view?.camera) return;
-    const action = viewerKeys[(event.shiftKey && event.key.startsWith('Arrow') ? 'Shift ' : '') + event.key];
+    const key = (event.shiftKey && event.key.startsWith('Arrow') ? 'Shift ' : '') + event.key;
+    const action = viewerKeys[key];
     if (!action) return;
     event.preventDefault();
     event.stopPropagation();
     action(view.camera);
-    if (view) showViewer();
+    if (view && !/^(Shift )?Arrow|[-+0]/.test(key)) showViewer();  // for what only turns no layout is made anew
+    else if (view) redraw();
   });
 };
 
@@ -216,8 +236,9 @@ const makeDrawing = () => {
   drawing = new Drawing(canvas);
   listenToPointers(canvas);
   canvas.addEventListener('webglcontextlost', () => { whyNotTurned = 'the graphics were lost'; closeViewer(); say('The 3D view ended: the graphics were lost.'); });
-  let width = 0;
-  new ResizeObserver(() => { if (canvas.clientWidth !== width) { width = canvas.clientWidth; redraw(); } }).observe(canvas);
+  // Asked for here alone, since each answer may need a layout.
+  drawing.fit = () => Object.assign(drawing, { width: canvas.clientWidth, height: canvas.clientHeight });
+  new ResizeObserver(() => { const { width } = drawing; if (drawing.fit().width !== width) redraw(); }).observe(canvas);
 };
 
 const toolsOf = item => {
@@ -274,8 +295,10 @@ const openViewer = async item => {
       ...(fields ? [make('div', { className: 'settle decide' }, fields.status, fields.comment)] : []),
       ...(scene.simplified ? [make('p', { className: 'note' }, `Simplified for size: about ${Math.round(100 * scene.simplified)} % of the triangles, up to ${(100 * scene.error).toPrecision(2)} % of a part’s size off.`)] : []));
     const sphere = sphereOf(solids);
-    view = { item, figure, place, pair, solids, tools, fields, sphere, wholeSphere: sphere, camera: new Camera(pair.camera),
-      hidden: [false, false], ghosts: [], hasGhosts: false, section: null, measured: [], isMeasuring: false };
+    const batches = [0, 1].map(which => batchesOf(solids.filter(solid => solid.product === which)));
+    const curve = pair.curve.flat().map(i => pair.points[i]);
+    view = { item, figure, place, pair, solids, batches, curve, tools, fields, sphere, wholeSphere: sphere, camera: new Camera(pair.camera),
+      hidden: [false, false], ghosts: null, hasGhosts: false, section: null, measured: [], isMeasuring: false };
     drawing.canvas.style.aspectRatio = scene.size.join(' / ');
     figure.classList.add('turned');
     figure.prepend(place);
@@ -283,8 +306,9 @@ const openViewer = async item => {
     item.section.scrollIntoView({ block: 'nearest' });
     drawing.canvas.focus({ preventScroll: true });
     if (fields) tell('decided', [item]);
+    drawing.fit();
     showViewer();
-    drawNow(2);
+    drawNow(still);
   } catch (error) {
     whyNotTurned = error.message;
     view = null;

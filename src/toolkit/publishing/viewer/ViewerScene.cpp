@@ -5,7 +5,6 @@
 #include <cmath>
 #include <cstdio>
 #include <nlohmann/json.hpp>
-#include <tuple>
 #include <unordered_map>
 #include <utility>
 
@@ -173,29 +172,36 @@ bool ViewerScene::IsEmpty() const { return content_->pairs.empty(); }
 
 namespace {
 
-/// The curve of an interference, of which a result has but points in no order: near ones are joined,
-/// the nearest first, each with at most two (the greedy tour of J. L. Bentley, "Fast algorithms for
-/// geometric traveling salesman problems", 1992), until the curve is as long as the result says.
+/// The curve of an interference, of which a result has but points. It promises no order, though those
+/// that follow one another mostly are neighbours: near ones are joined, the nearest first, each with
+/// at most two (the greedy tour of J. L. Bentley, "Fast algorithms for geometric traveling salesman
+/// problems", 1992), until the curve is as long as the result says.
 /// @return pairs of places in inPoints.
 std::vector<std::array<std::size_t, 2>> CurveThrough(const std::vector<ZORMathVector>& inPoints,
                                                      double inLength) {
   using ZORFoundation::operator-;
-  constexpr double kMaxStep = 2;  // of the points' mean distance
+  constexpr double kMaxStep = 2.5;  // of the points' mean distance
   constexpr double kMaxLength = 1.05;
   std::vector<std::array<std::size_t, 2>> curve;
   const std::size_t count = std::min<std::size_t>(inPoints.size(), kMaxPoints);
   const double maxStep = kMaxStep * inLength / static_cast<double>(std::max<std::size_t>(count, 1));
-  typedef std::tuple<double, std::size_t, std::size_t> Step;
+  constexpr double kNext = 0.5;  // what following one another counts
+  struct Step {
+    double cost = 0, length = 0;
+    std::size_t from = 0, to = 0;
+    auto operator<=>(const Step&) const = default;
+  };
   std::vector<Step> steps;
   for (std::size_t i = 0; i < count; ++i)
     for (std::size_t k = i + 1; k < count; ++k) {
       const double length = ZORFoundation::Length(inPoints[k] - inPoints[i]);
-      if (length > 0 && length <= maxStep) steps.emplace_back(length, i, k);
+      if (length > 0 && length <= maxStep)
+        steps.push_back({k == i + 1 ? kNext * length : length, length, i, k});
     }
   std::ranges::sort(steps);
   std::vector<int> ends(count, 0);
   double sum = 0;
-  for (const auto& [length, from, to] : steps) {
+  for (const auto& [cost, length, from, to] : steps) {
     if (ends[from] == 2 || ends[to] == 2 || sum + length > kMaxLength * inLength) continue;
     sum += length;
     ++ends[from];
