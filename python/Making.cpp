@@ -129,7 +129,8 @@ DetectionOptions DetectionOptionsFrom(
     double inTolerance, double inContactGap, double inClearance, std::optional<int> inLevel,
     const Patterns& inOnly, const Patterns& inIgnore,
     const std::optional<std::pair<std::string, std::string>>& inBetween,
-    const std::string& inSheets, unsigned inJobs, const ZORDefault::ModelOptions& inReading) {
+    const std::string& inSheets, bool inViewpoints, unsigned inJobs,
+    const ZORDefault::ModelOptions& inReading) {
   constexpr const char* kSheets[] = {"clash", "contact", "ignore"};
   constexpr unsigned kMaxThreads = 1024;
   DetectionOptions options;
@@ -144,6 +145,7 @@ DetectionOptions DetectionOptionsFrom(
   if (word == std::end(kSheets)) throw UnknownWord("sheets", inSheets, kSheets);
   options.sheets = static_cast<SheetsMean>(word - std::begin(kSheets));
   if (inJobs > kMaxThreads) throw UsageError("jobs: at most " + std::to_string(kMaxThreads));
+  options.hasViewpoints = inViewpoints;
   options.threads = inJobs;
   options.maxSeconds = inReading.maxSeconds;
   options.maxMemory = inReading.maxMemory;
@@ -156,12 +158,13 @@ PyDetection DetectToFile(const py::object& inModel, const py::object& inOutput, 
                          double inContactGap, double inClearance, std::optional<int> inLevel,
                          const Patterns& inOnly, const Patterns& inIgnore,
                          const std::optional<std::pair<std::string, std::string>>& inBetween,
-                         const std::string& inSheets, const std::optional<py::object>& inPrevious,
-                         unsigned inJobs, const Limit& inTime, const Limit& inMemory, bool inStrict,
+                         const std::string& inSheets, bool inViewpoints,
+                         const std::optional<py::object>& inPrevious, unsigned inJobs,
+                         const Limit& inTime, const Limit& inMemory, bool inStrict,
                          const py::object& inProgress, const py::object& inWarn) {
-  DetectionOptions options =
-      DetectionOptionsFrom(inTolerance, inContactGap, inClearance, inLevel, inOnly, inIgnore,
-                           inBetween, inSheets, inJobs, ReadingFrom(inTime, inMemory, inStrict));
+  DetectionOptions options = DetectionOptionsFrom(
+      inTolerance, inContactGap, inClearance, inLevel, inOnly, inIgnore, inBetween, inSheets,
+      inViewpoints, inJobs, ReadingFrom(inTime, inMemory, inStrict));
   const std::string model = PathFrom(inModel), output = PathFrom(inOutput);
   const std::string previousPath = inPrevious ? PathFrom(*inPrevious) : std::string();
   Listener listener(inProgress, inWarn);
@@ -203,8 +206,8 @@ void DefineDetect(py::module_& ioModule) {
       py::arg("tolerance") = options.tolerance, py::arg("contact_gap") = options.contactGap,
       py::arg("clearance") = options.clearance, py::arg("level") = py::none(),
       py::arg("only") = Patterns(), py::arg("ignore") = Patterns(), py::arg("between") = py::none(),
-      py::arg("sheets") = "clash", py::arg("previous") = py::none(), py::arg("jobs") = 0,
-      py::arg("limit_time") = py::none(), py::arg("limit_memory") = py::none(),
+      py::arg("sheets") = "clash", py::arg("viewpoints") = false, py::arg("previous") = py::none(),
+      py::arg("jobs") = 0, py::arg("limit_time") = py::none(), py::arg("limit_memory") = py::none(),
       py::arg("strict") = false, py::arg("progress") = py::none(), py::arg("warn") = py::none(),
       "Compute a clash result from a CAD model and write it.\n\nThe options are those of `lyra "
       "detect`; jobs: threads, 0 for one for each processor; limit_time, limit_memory: seconds "

@@ -97,8 +97,8 @@ def test_detect_and_publish(lyra, samples, tmp_path, monkeypatch):
     monkeypatch.setenv("XDG_CACHE_HOME", str(tmp_path / "cache"))
     model = samples / "as1-oc-214.stp"
     seen = []
-    found = zorlyra.detect(model, tmp_path / "module.xml", progress=lambda *step: seen.append(step))
-    printed = lyra.run("detect", model, "-o", tmp_path / "command.xml")
+    found = zorlyra.detect(model, tmp_path / "module.xml", viewpoints=True, progress=lambda *step: seen.append(step))
+    printed = lyra.run("detect", model, "--viewpoints", "-o", tmp_path / "command.xml")
     assert (tmp_path / "module.xml").read_bytes() == (tmp_path / "command.xml").read_bytes()
     assert printed.startswith(f"{found.clashes} clash")
     assert {work for work, _, _ in seen} == {"reading", "checking"}

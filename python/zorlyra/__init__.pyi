@@ -305,6 +305,7 @@ def detect(
     ignore: Sequence[str] = ...,
     between: Optional[tuple[str, str]] = ...,
     sheets: str = ...,
+    viewpoints: bool = ...,
     previous: Optional[Path] = ...,
     jobs: int = ...,
     limit_time: Optional[int] = ...,

@@ -2,8 +2,10 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <fstream>
 #include <iterator>
+#include <nlohmann/json.hpp>
 
 #include "tools/Command.h"
 
@@ -40,6 +42,45 @@ TEST(Detect, AnyNumberOfJobsGivesTheSameBytes) {
   ASSERT_EQ(RunCommand({"detect", kModel, "-o", three, "--jobs", "3", "--clearance", "5"}).code, 0);
   EXPECT_EQ(BytesOf(one), BytesOf(three));
   EXPECT_FALSE(BytesOf(one).empty());
+}
+
+TEST(Detect, ViewpointsLookAtTheMiddleOfEachInterference) {
+  TemporaryDirectory directory;
+  const std::string one = directory.Path("one.xml"), three = directory.Path("three.xml");
+  const auto detect = [](const std::string& inResult, const char* inJobs) {
+    return RunCommand({"detect", kModel, "-o", inResult, "--jobs", inJobs, "--clearance", "5",
+                       "--only", "*bracket*", "--viewpoints"})
+        .code;
+  };
+  ASSERT_EQ(detect(one, "1"), 0);
+  ASSERT_EQ(detect(three, "3"), 0);
+  EXPECT_EQ(BytesOf(one), BytesOf(three));
+  const CommandResult converted = RunCommand({"convert", one, "--to", "json"});
+  const nlohmann::json document = nlohmann::json::parse(converted.out);
+  const nlohmann::json& all = document["interferences"];
+  EXPECT_GT(all.size(), 10u);
+  const auto number = [](const nlohmann::json& inText) {
+    return std::stod(inText.get<std::string>());
+  };
+  for (const nlohmann::json& interference : all) {
+    const nlohmann::json &seen = interference["viewpoint"],
+                         &points = interference["geometry"]["points"];
+    EXPECT_EQ(seen["projection"], "Conic");
+    const double focus = number(seen["focusDistance"]), near = number(seen["near"]);
+    EXPECT_GT(near, 0);
+    EXPECT_GT(focus, near);
+    EXPECT_GT(number(seen["far"]), focus);
+    double length = 0;
+    for (std::size_t axis = 0; axis < 3; ++axis) {
+      const double sight = number(seen["sight"][axis]);
+      std::vector<double> along;
+      for (const nlohmann::json& point : points) along.push_back(number(point[axis]));
+      const auto [low, high] = std::ranges::minmax(along);
+      EXPECT_NEAR(number(seen["point"][axis]) + focus * sight, (low + high) / 2, 1e-6);
+      length += sight * sight;
+    }
+    EXPECT_NEAR(length, 1, 1e-12);
+  }
 }
 
 TEST(Detect, WhatWasDecidedBeforeHolds) {

@@ -15,6 +15,7 @@
 #include "platform/product_structure/ZORIAlias.h"
 #include "toolkit/Error.h"
 #include "toolkit/detection/DetectionTask.h"
+#include "toolkit/detection/Viewpoints.h"
 #include "toolkit/records/DocumentText.h"
 #include "toolkit/records/Glob.h"
 
@@ -394,7 +395,9 @@ DetectionResult Detect(const std::string& inModel, const DetectionOptions& inOpt
   try {
     const ZORDefault::OpenedModel opened = ZORDefault::OpenModel(inModel, modelOptions);
     const TreeReading tree(opened.root, inOptions);
-    return Detection(inModel, inOptions, tree).Run();
+    DetectionResult result = Detection(inModel, inOptions, tree).Run();
+    if (inOptions.hasViewpoints) AddViewpoints(opened.root, result);
+    return result;
   } catch (const ZORDefault::ModelError& error) {
     throw Error(error.GetPath(), error.GetReason());
   }

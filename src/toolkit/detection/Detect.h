@@ -38,6 +38,7 @@ struct DetectionOptions {
   double maxSeconds = 0;
   std::uint64_t maxMemory = 0;
   bool isStrict = false;  ///< a model of which something cannot be read is an error, not a warning
+  bool hasViewpoints = false;  ///< each interference gets the viewpoint of its picture
 
   Shard shard;                     ///< of the verdicts only those of this share are found
   std::vector<std::string> known;  ///< findings of other runs, which are not looked for again
@@ -56,6 +57,12 @@ struct DetectedProduct {
   std::array<double, 12> rootFromProduct{};
 };
 
+/// In perspective, in millimetres.
+struct DetectedViewpoint {
+  std::array<double, 3> eye{}, sight{};  ///< the sight is a unit vector
+  double focusDistance = 0, nearPlane = 0, farPlane = 0;
+};
+
 struct DetectedInterference {
   enum class Kind { kClash, kContact, kClearance };
   std::size_t first = 0, second = 0;  ///< of the products of the result
@@ -66,6 +73,7 @@ struct DetectedInterference {
   std::vector<std::array<double, 3>> curve;  ///< some points along it
   bool isDuplicate = false;                  ///< the same geometry at the same place
   bool isSheetInSolid = false;
+  std::optional<DetectedViewpoint> viewpoint;
   std::optional<double> meshPrecision;  ///< by how much triangles that had to do may be off
 };
 

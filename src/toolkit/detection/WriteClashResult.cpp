@@ -5,13 +5,12 @@
 
 #include "toolkit/Error.h"
 #include "toolkit/detection/Detect.h"
+#include "toolkit/detection/Viewpoints.h"
 #include "toolkit/publishing/ReportWriter.h"
 #include "toolkit/records/DocumentText.h"
 
 namespace ZORToolkit {
 namespace {
-
-constexpr std::size_t kMaxWrittenPoints = 32;
 
 std::string Escaped(const std::string& inText) { return Utf8(AttributeValue(FromUtf8(inText))); }
 
@@ -97,13 +96,20 @@ class ResultWriter {
     WriteProduct(result_.products[inFound.second]);
     out_ << "      <GeometricAspect IntersectCurveLength=\"" << NumberText(inFound.curveLength)
          << "\" ExtractOrDistValue=\"" << NumberText(inFound.value) << "\">\n";
-    for (const auto& point : inFound.points) WritePoint(point, "        ");
-    const std::size_t count = std::min(inFound.curve.size(), kMaxWrittenPoints);
-    for (std::size_t i = 0; i < count; ++i)
-      WritePoint(inFound.curve[i * inFound.curve.size() / count], "        ");
+    for (const auto& point : WrittenPoints(inFound)) WritePoint(point, "        ");
+    if (inFound.viewpoint) WriteViewpoint(*inFound.viewpoint);
     out_ << "      </GeometricAspect>\n";
     WriteComment(inFound);
     out_ << "    </Interference>\n";
+  }
+
+  void WriteViewpoint(const DetectedViewpoint& inViewpoint) {
+    out_ << "        <Viewpoint FocusDistance=\"" << NumberText(inViewpoint.focusDistance)
+         << "\" NearPlane=\"" << NumberText(inViewpoint.nearPlane) << "\" FarPlane=\""
+         << NumberText(inViewpoint.farPlane) << "\" ProjectionType=\"Conic\">\n";
+    WritePoint(inViewpoint.eye, "          ");
+    WriteVector("Sight", inViewpoint.sight, "          ");
+    out_ << "        </Viewpoint>\n";
   }
 
   void WriteComment(const DetectedInterference& inFound) {
@@ -123,17 +129,23 @@ class ResultWriter {
          << "\" Alien=\"NO\" ProcessMode=\"\" ShapeName=\"" << Escaped(inProduct.partName)
          << "\" ShapeSource=\"" << Escaped(result_.model) << "\" Preview=\"\">\n        <Matrix>\n";
     const auto& m = inProduct.rootFromProduct;
+    constexpr const char* kAxes[] = {"Rx", "Ry", "Rz"};
     WritePoint({m[9], m[10], m[11]}, "          ");
     for (std::size_t i = 0; i < 3; ++i)
-      out_ << "          <Vector CorrespondingData=\"R"
-           << "xyz"[i] << "\" Vx=\"" << NumberText(m[3 * i]) << "\" Vy=\""
-           << NumberText(m[3 * i + 1]) << "\" Vz=\"" << NumberText(m[3 * i + 2]) << "\"/>\n";
+      WriteVector(kAxes[i], {m[3 * i], m[3 * i + 1], m[3 * i + 2]}, "          ");
     out_ << "        </Matrix>\n      </Product>\n";
   }
 
   void WritePoint(const std::array<double, 3>& inPoint, const char* inIndent) {
     out_ << inIndent << "<Point Ux=\"" << NumberText(inPoint[0]) << "\" Uy=\""
          << NumberText(inPoint[1]) << "\" Uz=\"" << NumberText(inPoint[2]) << "\"/>\n";
+  }
+
+  void WriteVector(const char* inName, const std::array<double, 3>& inVector,
+                   const char* inIndent) {
+    out_ << inIndent << "<Vector CorrespondingData=\"" << inName << "\" Vx=\""
+         << NumberText(inVector[0]) << "\" Vy=\"" << NumberText(inVector[1]) << "\" Vz=\""
+         << NumberText(inVector[2]) << "\"/>\n";
   }
 
   const DetectionResult& result_;

@@ -28,7 +28,7 @@ struct DetectOptions {
                                       sheets = "clash";
   std::optional<long long> level, jobs;
   std::vector<std::string> only, ignore, between;
-  bool resume = false;
+  bool resume = false, viewpoints = false;
   ModelReading reading;
   ShareOptions sharing;
 };
@@ -65,6 +65,7 @@ DetectionOptions ToDetection(const DetectOptions& inOptions) {
   options.maxSeconds = reading.maxSeconds;
   options.maxMemory = reading.maxMemory;
   options.isStrict = reading.isStrict;
+  options.hasViewpoints = inOptions.viewpoints;
   return options;
 }
 
@@ -131,6 +132,7 @@ ShareManifest ShareOf(const DetectOptions& inOptions, const Shard& inShard) {
                    {"only", ListText(inOptions.only)},
                    {"ignore", ListText(inOptions.ignore)},
                    {"between", ListText(inOptions.between)},
+                   {"viewpoints", inOptions.viewpoints ? "yes" : ""},
                    {"strict", inOptions.reading.isStrict ? "yes" : ""}};
   return share;
 }
@@ -141,7 +143,8 @@ int Run(const DetectOptions& inOptions, Output& ioOutput) {
   if (inOptions.result.empty() && !inOptions.sharing.plan)
     throw UsageError("detect: -o is required");
   if (inOptions.file == "-") throw InputError("-: a model cannot be read from standard input");
-  const DetectionOptions detection = ToDetection(inOptions);
+  DetectionOptions detection = ToDetection(inOptions);
+  if (inOptions.sharing.plan || shard) detection.hasViewpoints = false;  // who gathers adds them
   if (inOptions.sharing.plan)
     return PrintPlan("detect", WithProgress(inOptions, detection, SampleDetection),
                      inOptions.sharing, ioOutput);
@@ -172,6 +175,7 @@ int GatherDetect(const std::vector<ShareManifest>& inShares, const GatherOptions
   options.only = ListFrom(share.Option("only"));
   options.ignore = ListFrom(share.Option("ignore"));
   options.between = ListFrom(share.Option("between"));
+  options.viewpoints = !share.Option("viewpoints").empty();
   options.jobs = inOptions.jobs;
   options.reading = inOptions.reading;
   options.reading.isStrict = !share.Option("strict").empty();
@@ -204,6 +208,9 @@ VerbAction DeclareDetect(Arguments& ioArguments) {
                    "What a surface without an inside means that enters a solid: clash (default), "
                    "contact or ignore");
   ioArguments.Words("--sheets", kSheetWords);
+  ioArguments.Flag(
+      "--viewpoints", options->viewpoints,
+      "Give each interference a viewpoint that shows both products, as its picture has it");
   ioArguments.Text("--previous", "RESULT", options->previous,
                    "An older result: what was decided there holds here too, as lyra carry does");
   ioArguments.Number("--jobs", "N", options->jobs,

@@ -1,5 +1,6 @@
 #include "toolkit/publishing/viewer/PictureCamera.h"
 
+#include <algorithm>
 #include <array>
 #include <cmath>
 #include <cstdio>
@@ -64,6 +65,13 @@ PictureCamera CameraOf(const ZORDefault::InterferenceScene& inScene, PictureSize
   if (inScene.interference->FillViewpoint(&viewpoint) != 1)
     Reframe(viewpoint, inSize, FramedSphere(inScene, inFramesInterference));
   return CameraFrom(viewpoint);
+}
+
+double DepthOf(const ZORDefault::InterferenceScene& inScene, const PictureCamera& inCamera) {
+  using namespace ZORFoundation;
+  const ZOR3DBoundingSphere all = FramedSphere(inScene, false);
+  return std::max(inCamera.focusDistance, Dot(all.centre - inCamera.eye, inCamera.sight)) +
+         all.radius;
 }
 
 PictureCamera OverviewCamera(const ZOR3DRep& inRep, PictureSize inSize) {

@@ -26,6 +26,9 @@ struct PictureCamera {
 PictureCamera CameraOf(const ZORDefault::InterferenceScene& inScene, PictureSize inSize,
                        bool inFramesInterference);
 
+/// How deep a camera sees until both products of the scene lie before that.
+double DepthOf(const ZORDefault::InterferenceScene& inScene, const PictureCamera& inCamera);
+
 /// The camera with which all of a representation is shown from a corner.
 PictureCamera OverviewCamera(const ZOR3DRep& inRep, PictureSize inSize);
 
