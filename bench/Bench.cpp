@@ -238,7 +238,7 @@ class Bench {
     print("report, write", results_.Milliseconds("report", "ZORLyra", most, "write"),
           results_.Milliseconds("report", "ZORLyra", least, "write"));
     print("load, read, merge and dump", results_.AllMilliseconds("whole", "ZORLyra", most),
-          results_.AllMilliseconds("whole", "ZORLyra", least), 1.3);
+          results_.AllMilliseconds("whole", "ZORLyra", least), 1.2);
   }
 
   void PrintLoadRatios() const {

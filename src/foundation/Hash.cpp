@@ -4,7 +4,6 @@
 #include <xxhash.h>
 
 #include <bit>
-#include <charconv>
 #include <new>
 
 namespace ZORFoundation {
@@ -31,10 +30,10 @@ Hash128Value Hash128Of(std::string_view inBytes, std::uint64_t inSeed) {
 }
 
 std::string HexText(std::uint64_t inHash) {
-  char digits[16];
-  const char* const end = std::to_chars(digits, digits + sizeof digits, inHash, 16).ptr;
-  const std::size_t count = static_cast<std::size_t>(end - digits);
-  return std::string(sizeof digits - count, '0').append(digits, count);
+  std::string digits(16, '0');
+  for (auto digit = digits.rbegin(); inHash != 0; ++digit, inHash >>= 4)
+    *digit = "0123456789abcdef"[inHash & 0xF];
+  return digits;
 }
 
 std::string HexText(const Hash128Value& inHash) {

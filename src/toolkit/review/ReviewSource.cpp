@@ -126,6 +126,16 @@ std::optional<double> NumberIn(StoredText inText) {
   return plain ? plain : Number(EncodedLatin1(view.Latin1())).value;
 }
 
+constexpr std::size_t kNoColumn = 3;
+
+/// Which column of a rotation "Rx", "Ry" or "Rz" is; kNoColumn for any other text.
+std::size_t ColumnNamed(StoredText inText) {
+  const TextView text = inText->View();
+  if (text.IsWide() || text.Length() != 2 || text.Latin1()[0] != 'R') return kNoColumn;
+  const std::size_t column = std::string_view("xyz").find(text.Latin1()[1]);
+  return column == std::string_view::npos ? kNoColumn : column;
+}
+
 }  // namespace
 
 ReviewSource::ReviewSource(const DOM_Node& inRoot)
@@ -276,18 +286,23 @@ bool ReviewSource::HasPointsOf(const ReviewRecord& inRecord, const ReviewSource&
   return point == other;
 }
 
-/// The three attributes from inFirst on.
-bool ReviewSource::ReadTriple(Element inElement, Named inFirst, double* outTriple) const {
+template <class Other>
+bool ReviewSource::ReadTriple(Element inElement, Named inFirst, double* outTriple,
+                              const Other& inOther) const {
   int count = 0;
   ForEachAttribute(inElement, [&](Named inNamed, StoredText inText) {
     const int place = static_cast<int>(inNamed) - static_cast<int>(inFirst);
-    if (place < 0 || place > 2) return;
+    if (place < 0 || place > 2) return inOther(inNamed, inText);
     const std::optional<double> number = NumberIn(inText);
     if (!number) return;
     outTriple[place] = *number;
     ++count;
   });
   return count == 3;
+}
+
+bool ReviewSource::ReadTriple(Element inElement, Named inFirst, double* outTriple) const {
+  return ReadTriple(inElement, inFirst, outTriple, [](Named, StoredText) {});
 }
 
 std::optional<Placement> ReviewSource::PlacementIn(Element inMatrix) const {
@@ -299,14 +314,16 @@ std::optional<Placement> ReviewSource::PlacementIn(Element inMatrix) const {
       isWhole = ReadTriple(inChild, Named::kUx, &placement[9]) && isWhole;
       found |= 8;
     } else if (inNamed == Named::kVector) {
-      const StoredText column = Attribute(inChild, Named::kCorrespondingData);
-      for (unsigned int i = 0; i < 3; ++i) {
-        constexpr std::string_view kColumns[] = {"Rx", "Ry", "Rz"};
-        if (column == nullptr || column->IsWide() || column->View().Latin1() != kColumns[i])
-          continue;
-        isWhole = ReadTriple(inChild, Named::kVx, &placement[std::size_t{3} * i]) && isWhole;
-        found |= 1u << i;
-      }
+      std::size_t column = kNoColumn;
+      double triple[3];
+      const bool hasAll =
+          ReadTriple(inChild, Named::kVx, triple, [&](Named inName, StoredText inText) {
+            if (inName == Named::kCorrespondingData) column = ColumnNamed(inText);
+          });
+      if (column == kNoColumn) return;
+      isWhole = hasAll && isWhole;
+      if (hasAll) std::copy_n(triple, 3, &placement[3 * column]);
+      found |= 1u << column;
     }
   });
   if (!isWhole || found != 15) return std::nullopt;

@@ -144,6 +144,10 @@ class ReviewSource {
   bool HasAttributesOf(Element inElement, const ReviewSource& inOther,
                        Element inOtherElement) const;
   bool HasPartsOf(Element inElement, const ReviewSource& inOther, Element inOtherElement) const;
+  /// Reads the three attributes from inFirst on and calls inOther(Named, StoredText) for the rest.
+  /// @return whether all three are numbers.
+  template <class Other>
+  bool ReadTriple(Element inElement, Named inFirst, double* outTriple, const Other& inOther) const;
   bool ReadTriple(Element inElement, Named inFirst, double* outTriple) const;
   std::optional<Placement> PlacementIn(Element inMatrix) const;
   static bool IsSame(const ProductKey& inA, const ProductKey& inB);
