@@ -59,10 +59,16 @@ struct ReaderTexts {
   }
 };
 
+bool HasComma(const ZORUnicodeString& inText) {
+  const std::u16string_view units(inText.ConvertToUCChar(),
+                                  static_cast<std::size_t>(inText.GetLengthInChar()));
+  return units.find(u',') != std::u16string_view::npos;
+}
+
 /// An attribute that holds a number: its first comma, which is a decimal one, becomes a point.
 Number NumberIn(const DOM_Node& inNode, const char* inName) {
   ZORUnicodeString text = ZORLyraGeneralServices::GetAttrOnNode(inNode, inName);
-  text.ReplaceSubString(",", ".");
+  if (HasComma(text)) text.ReplaceSubString(",", ".");
   return Number(text);
 }
 
@@ -93,7 +99,7 @@ void ReadTriple(const DOM_Node& inNode, const std::array<const char*, 3>& inName
     const ZORUnicodeString text = ZORLyraGeneralServices::GetAttrOnNode(inNode, inNames[i]);
     double number = -1;
     if (text.ConvertToNum(&number, "%le") != 1) ioWhyMisread = "a number of its matrix is missing";
-    if (text.SearchSubString(",") >= 0) ioWhyMisread = "its numbers are cut at a decimal comma";
+    if (HasComma(text)) ioWhyMisread = "its numbers are cut at a decimal comma";
     if (outTriple) outTriple[i] = number;
   }
 }

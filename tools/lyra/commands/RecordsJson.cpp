@@ -1,5 +1,9 @@
 #include "lyra/commands/RecordsJson.h"
 
+#include <algorithm>
+#include <cmath>
+#include <utility>
+
 #include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/JsonFields.h"
 
@@ -30,13 +34,65 @@ Json ToJson(const ModelProductRecord& inRecord) {
   return json;
 }
 
+/// The text of JsonLine(JsonOf(record)), written at once: a document has too many records to make
+/// and take apart a tree of values for each.
+class JsonTextFields : public FieldMaker<JsonTextFields> {
+ public:
+  struct Value {
+    std::string text;
+  };
+
+  Value Text(std::string_view inText) {
+    const bool isPlain = std::ranges::all_of(inText, [](char inByte) {
+      return inByte >= ' ' && inByte < 0x7F && inByte != '"' && inByte != '\\';
+    });
+    if (!isPlain) return {JsonLine(inText)};
+    std::string quoted;
+    quoted.reserve(inText.size() + 2);
+    return {std::move(quoted.append(1, '"').append(inText).append(1, '"'))};
+  }
+  Value Integer(long long inNumber) { return {std::to_string(inNumber)}; }
+  Value Real(double inNumber) {
+    constexpr double kMaxPlain = 1e15;  // from there on with an exponent
+    if (!(std::abs(inNumber) < kMaxPlain) || inNumber != std::trunc(inNumber))
+      return {JsonLine(inNumber)};
+    std::string text(std::signbit(inNumber) ? "-" : "");
+    text.append(std::to_string(static_cast<long long>(std::abs(inNumber)))).append(".0");
+    return {std::move(text)};
+  }
+  Value Written(const Number& inNumber) { return Text(inNumber.text); }
+  Value Null() { return {"null"}; }
+  Value NewObject() { return {"{}"}; }
+  Value NewArray() { return {"[]"}; }
+  void Set(Value& ioObject, const char* inName, const Value& inValue) {
+    Reopen(ioObject.text);
+    ioObject.text.append(1, '"').append(inName).append("\":").append(inValue.text).append(1, '}');
+  }
+  void Append(Value& ioArray, const Value& inValue) {
+    Reopen(ioArray.text);
+    ioArray.text.append(inValue.text).append(1, ']');
+  }
+
+ private:
+  static void Reopen(std::string& ioText) {
+    ioText.pop_back();
+    if (ioText.size() > 1) ioText += ',';
+  }
+};
+
+template <class Record>
+std::string TextOf(const Record& inRecord) {
+  JsonTextFields fields;
+  return ValueOf(fields, inRecord).text;
+}
+
 }  // namespace
 
-std::string JsonText(const IdentifiedRecord& inRecord) { return JsonLine(JsonOf(inRecord)); }
-std::string JsonText(const DocumentRecord& inRecord) { return JsonLine(JsonOf(inRecord)); }
-std::string JsonText(const ComponentRecord& inRecord) { return JsonLine(JsonOf(inRecord)); }
-std::string JsonText(const SpecificationRecord& inRecord) { return JsonLine(JsonOf(inRecord)); }
-std::string JsonText(const LinkRecord& inRecord) { return JsonLine(JsonOf(inRecord)); }
+std::string JsonText(const IdentifiedRecord& inRecord) { return TextOf(inRecord); }
+std::string JsonText(const DocumentRecord& inRecord) { return TextOf(inRecord); }
+std::string JsonText(const ComponentRecord& inRecord) { return TextOf(inRecord); }
+std::string JsonText(const SpecificationRecord& inRecord) { return TextOf(inRecord); }
+std::string JsonText(const LinkRecord& inRecord) { return TextOf(inRecord); }
 std::string JsonText(const ModelProductRecord& inRecord) { return JsonLine(ToJson(inRecord)); }
 std::string JsonText(const BcfProject& inProject) {
   Json topics = Json::array();

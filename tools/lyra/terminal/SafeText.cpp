@@ -13,10 +13,13 @@ namespace {
 
 using ZORFoundation::IsAscii;
 
-bool IsPlain(std::string_view inText) {
-  return std::all_of(inText.begin(), inText.end(),
-                     [](char inByte) { return inByte >= ' ' && inByte < 0x7F; });
+/// Where the printable ASCII that begins somewhere ends.
+std::size_t PlainEnd(std::string_view inText, std::size_t inBegin) {
+  while (inBegin < inText.size() && inText[inBegin] >= ' ' && inText[inBegin] < 0x7F) ++inBegin;
+  return inBegin;
 }
+
+bool IsPlain(std::string_view inText) { return PlainEnd(inText, 0) == inText.size(); }
 
 std::vector<char32_t> CodePoints(std::string_view inText) {
   std::vector<char32_t> points;
@@ -95,7 +98,13 @@ std::string Printable(std::string_view inText) {
 std::string EscapedForJson(std::string inJson) {
   if (IsAscii(inJson) && inJson.find('\x7F') == std::string::npos) return inJson;
   std::string escaped;
-  for (char32_t point : CodePoints(inJson)) {
+  escaped.reserve(inJson.size() + inJson.size() / 8);
+  for (std::size_t at = 0; at < inJson.size();) {
+    // What most of a line is goes over as a whole.
+    const std::size_t end = PlainEnd(inJson, at);
+    escaped.append(inJson, at, end - at);
+    if ((at = end) == inJson.size()) break;
+    const char32_t point = ZORFoundation::NextCharacter(inJson, at);
     if (!IsControl(point) && !IsDeceptive(point))
       AppendCodePoint(point, escaped);
     else if (point < 0x10000)
