@@ -4,8 +4,10 @@
 #include <cmath>
 #include <utility>
 
+#include "foundation/Utf8.h"
 #include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/JsonFields.h"
+#include "lyra/terminal/SafeText.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -43,13 +45,17 @@ class JsonTextFields : public FieldMaker<JsonTextFields> {
   };
 
   Value Text(std::string_view inText) {
-    const bool isPlain = std::ranges::all_of(inText, [](char inByte) {
-      return inByte >= ' ' && inByte < 0x7F && inByte != '"' && inByte != '\\';
-    });
-    if (!isPlain) return {JsonLine(inText)};
+    bool isAscii = true, hasEscape = false;
+    for (const char byte : inText) {
+      isAscii = isAscii && static_cast<unsigned char>(byte) < 0x7F;
+      hasEscape =
+          hasEscape || static_cast<unsigned char>(byte) < ' ' || byte == '"' || byte == '\\';
+    }
+    if (hasEscape || !(isAscii || ZORFoundation::IsUtf8(inText))) return {JsonLine(inText)};
     std::string quoted;
     quoted.reserve(inText.size() + 2);
-    return {std::move(quoted.append(1, '"').append(inText).append(1, '"'))};
+    quoted.append(1, '"').append(inText).append(1, '"');
+    return {isAscii ? std::move(quoted) : EscapedForJson(std::move(quoted))};
   }
   Value Integer(long long inNumber) { return {std::to_string(inNumber)}; }
   Value Real(double inNumber) {
