@@ -4,7 +4,6 @@
 #include <TopExp_Explorer.hxx>
 #include <TopoDS_Shape.hxx>
 #include <atomic>
-#include <chrono>
 #include <map>
 #include <memory>
 #include <mutex>
@@ -15,6 +14,7 @@
 #include <unordered_map>
 
 #include "toolkit/detection/BodyPair.h"
+#include "toolkit/sharding/ProcessorTime.h"
 #include "toolkit/sharding/Shard.h"
 
 namespace ZORDetection {
@@ -218,10 +218,6 @@ class Search {
   }
 
  private:
-  double Seconds() const {
-    return std::chrono::duration<double>(std::chrono::steady_clock::now() - start_).count();
-  }
-
   /// Farther apart than this nothing is looked for.
   double Reach() const { return std::max(options_.contactGap, options_.clearance) + 2 * kRounding; }
 
@@ -311,7 +307,7 @@ class Search {
     verdicts_.resize(tasks_.Tasks().size());
     std::atomic<bool> isStopped{false};
     std::mutex progressMutex;
-    findings_.openSeconds = Seconds();
+    findings_.openSeconds = ZORToolkit::ProcessorSeconds();
     if (options_.keep) {
       GroupPairs();
       options_.keep(findings_);
@@ -322,11 +318,11 @@ class Search {
       while (!isStopped) {
         const std::size_t place = next++;
         if (place >= chosen.size()) return;
-        const double start = Seconds();
+        const double start = ZORToolkit::ProcessorSeconds();
         JudgeTask(chosen[place], probes, progressMutex);
         const std::lock_guard lock(progressMutex);
         findings_.judged.push_back(static_cast<std::uint32_t>(chosen[place]));
-        if (options_.tried > 0) findings_.seconds.push_back(Seconds() - start);
+        if (options_.tried > 0) findings_.seconds.push_back(ZORToolkit::ProcessorSeconds() - start);
         if (options_.keep) options_.keep(FindingsOf(chosen[place]));
         if (options_.progress && !options_.progress(findings_.judged.size(), chosen.size()))
           isStopped = true;
@@ -460,7 +456,6 @@ class Search {
   std::vector<std::uint32_t> curves_;  ///< of the verdicts, in the findings; 0: none yet
   std::vector<std::pair<std::size_t, std::string>> failures_;
   Findings findings_;
-  std::chrono::steady_clock::time_point start_ = std::chrono::steady_clock::now();
 };
 
 }  // namespace

@@ -192,7 +192,7 @@ void SnapshotMaker::Draw(const std::vector<std::size_t>& inWanted,
                                        scene.interference, FromUtf8(pathOf(i, ".png")), "PNG",
                                        options_.size.width, options_.size.height, 1, 0);
   };
-  work.isDone = [&](std::size_t inDone) {
+  work.isDone = [&](std::size_t inDone, double) {
     if (options_.drawn) options_.drawn(inDone, inWanted.size());
   };
   DrawInProcesses(options_.processes, work);

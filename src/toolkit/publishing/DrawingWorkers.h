@@ -9,8 +9,9 @@ namespace ZORToolkit {
 
 struct DrawingWork {
   std::size_t count = 0;
-  std::function<void(std::size_t)> draw;    ///< in one of the processes, for each of the count
-  std::function<void(std::size_t)> isDone;  ///< here, with how many are drawn
+  std::function<void(std::size_t)> draw;  ///< in one of the processes, for each of the count
+  /// Here, with how many are drawn and the seconds of processor time that all these took.
+  std::function<void(std::size_t, double)> isDone;
 };
 
 /// Shares the work among processes that start as copies of this one, which should have drawn nothing

@@ -321,8 +321,8 @@ class Publication {
     DrawingWork work;
     work.count = inChosen.size();
     work.draw = [&](std::size_t inPlace) { DrawItem(inChosen[inPlace], inWanted, inStore); };
-    work.isDone = [this, all](std::size_t inDone) {
-      if (options_.sharing != nullptr) options_.sharing->Drawn(inDone);
+    work.isDone = [this, all](std::size_t inDone, double inSeconds) {
+      if (options_.sharing != nullptr) options_.sharing->Drawn(inDone, inSeconds);
       if (options_.drawn) options_.drawn(std::min(inDone, all), all);
     };
     return work;

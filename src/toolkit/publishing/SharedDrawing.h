@@ -31,8 +31,8 @@ class SharedDrawing {
   virtual std::vector<std::size_t> Choose(const std::vector<DrawingItem>& inItems) = 0;
   /// Called once the store is ready, before anything is drawn.
   virtual void Begin(const PictureStore&) {}
-  /// Told that so many of the chosen items are drawn.
-  virtual void Drawn(std::size_t) {}
+  /// Told that so many of the chosen items are drawn, and the processor time of all these in seconds.
+  virtual void Drawn(std::size_t, double) {}
   /// Called once all that was chosen is drawn.
   virtual void Finish(const PictureStore&) {}
   /// Whether the page is to be made then.

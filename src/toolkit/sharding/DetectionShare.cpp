@@ -15,6 +15,7 @@
 #include "foundation/TerminationSignals.h"
 #include "toolkit/Error.h"
 #include "toolkit/detection/DetectionTask.h"
+#include "toolkit/sharding/ProcessorTime.h"
 
 namespace fs = std::filesystem;
 
@@ -148,7 +149,9 @@ DetectionResult GatherDetection(const std::string& inModel, DetectionOptions inO
 
 WorkSample SampleDetection(const std::string& inModel, DetectionOptions inOptions) {
   inOptions.tried = kTriedPairs;
-  return Detect(inModel, inOptions).work;
+  WorkSample sample = Detect(inModel, inOptions).work;
+  sample.openSeconds += ProcessorSeconds();
+  return sample;
 }
 
 }  // namespace ZORToolkit

@@ -1,4 +1,5 @@
-// How long shares of a work are expected to take, from a sample of the work itself.
+// How long shares of a work are expected to take, from a sample of the work itself. All times are processor
+// time.
 #ifndef ZOR_TOOLKIT_SHARDING_PLAN_H
 #define ZOR_TOOLKIT_SHARDING_PLAN_H
 
@@ -18,7 +19,7 @@ struct WorkSample {
   };
   std::vector<std::uint64_t> costs;  ///< expected, of all items
   std::vector<Timed> timed;
-  double openSeconds = 0;  ///< until the first item could be done
+  double openSeconds = 0;  ///< until the first item can be done, the model in the cache
 };
 
 struct PlannedShare {

@@ -1,7 +1,6 @@
 #include "toolkit/sharding/PublicationShare.h"
 
 #include <algorithm>
-#include <chrono>
 #include <filesystem>
 #include <set>
 #include <sstream>
@@ -13,6 +12,7 @@
 #include "toolkit/publishing/PictureDrawing.h"
 #include "toolkit/publishing/PictureSettings.h"
 #include "toolkit/publishing/SharedDrawing.h"
+#include "toolkit/sharding/ProcessorTime.h"
 
 namespace fs = std::filesystem;
 
@@ -161,9 +161,10 @@ class DrawingOfSample : public SharedDrawing {
     tried_ = ItemsToTry(sample.costs, kTriedPictures);
     return tried_;
   }
-  void Begin(const PictureStore&) override { sample.openSeconds = Lap(); }
-  void Drawn(std::size_t inDone) override {
-    const double each = Lap() / static_cast<double>(std::max<std::size_t>(1, inDone - done_));
+  void Begin(const PictureStore&) override { sample.openSeconds = ProcessorSeconds(); }
+  void Drawn(std::size_t inDone, double inSeconds) override {
+    const double each = (inSeconds - std::exchange(seconds_, inSeconds)) /
+                        static_cast<double>(std::max<std::size_t>(1, inDone - done_));
     for (; done_ < std::min(inDone, tried_.size()); ++done_)
       sample.timed.push_back({tried_[done_], each});
   }
@@ -171,16 +172,9 @@ class DrawingOfSample : public SharedDrawing {
   WorkSample sample;
 
  private:
-  using Clock = std::chrono::steady_clock;
-
-  double Lap() {
-    const Clock::time_point now = Clock::now();
-    return std::chrono::duration<double>(now - std::exchange(last_, now)).count();
-  }
-
   std::vector<std::size_t> tried_;
   std::size_t done_ = 0;
-  Clock::time_point last_ = Clock::now();
+  double seconds_ = 0;
 };
 
 std::string SettingsText(const PublicationOptions& inOptions) {
