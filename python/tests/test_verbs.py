@@ -122,7 +122,7 @@ def test_detect_and_publish(lyra, samples, tmp_path, monkeypatch):
         other.setenv("ZOR_SETTINGS_PATH", str(settings))
         with pytest.raises(zorlyra.Error, match="takes more than 4 MB"):
             zorlyra.detect(model, tmp_path / "stopped.xml")
-        zorlyra.detect(model, tmp_path / "limited.xml", limit_memory=2000, limit_time=100)
+        zorlyra.detect(model, tmp_path / "limited.xml", viewpoints=True, limit_memory=2000, limit_time=100)
     assert (tmp_path / "limited.xml").read_bytes() == (tmp_path / "command.xml").read_bytes()
 
     seen.clear()
