@@ -5,6 +5,7 @@
 #include <cmath>
 #include <cstdio>
 #include <nlohmann/json.hpp>
+#include <tuple>
 #include <unordered_map>
 #include <utility>
 
@@ -186,17 +187,13 @@ std::vector<std::array<std::size_t, 2>> CurveThrough(const std::vector<ZORMathVe
   const std::size_t count = std::min<std::size_t>(inPoints.size(), kMaxPoints);
   const double maxStep = kMaxStep * inLength / static_cast<double>(std::max<std::size_t>(count, 1));
   constexpr double kNext = 0.5;  // what following one another counts
-  struct Step {
-    double cost = 0, length = 0;
-    std::size_t from = 0, to = 0;
-    auto operator<=>(const Step&) const = default;
-  };
+  typedef std::tuple<double, double, std::size_t, std::size_t> Step;  // cost, length, from, to
   std::vector<Step> steps;
   for (std::size_t i = 0; i < count; ++i)
     for (std::size_t k = i + 1; k < count; ++k) {
       const double length = ZORFoundation::Length(inPoints[k] - inPoints[i]);
       if (length > 0 && length <= maxStep)
-        steps.push_back({k == i + 1 ? kNext * length : length, length, i, k});
+        steps.emplace_back(k == i + 1 ? kNext * length : length, length, i, k);
     }
   std::ranges::sort(steps);
   std::vector<int> ends(count, 0);
