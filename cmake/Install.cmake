@@ -10,9 +10,13 @@ set(packageDir ${CMAKE_INSTALL_LIBDIR}/cmake/ZORLyra)
 set(resourceDir share/ZORLyra)
 
 file(RELATIVE_PATH binToLib /prefix/${CMAKE_INSTALL_BINDIR} /prefix/${CMAKE_INSTALL_LIBDIR})
-set_target_properties(ZORLyra ZORDefaultPlatform ZORFoundation ZORClashToolkit PROPERTIES INSTALL_RPATH "$ORIGIN")
+set(libraries ZORFoundation ZORDefaultPlatform ZORLyra)
+if(ZOR_WITH_TOOLKIT)
+  list(APPEND libraries ZORClashToolkit)
+endif()
+set_target_properties(${libraries} PROPERTIES INSTALL_RPATH "$ORIGIN")
 
-install(TARGETS ZORPlatformDeclarations ZORFoundation ZORDefaultPlatform ZORLyra ZORClashToolkit EXPORT ZORLyraTargets
+install(TARGETS ZORPlatformDeclarations ${libraries} EXPORT ZORLyraTargets
   RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT libraries
   LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT libraries NAMELINK_COMPONENT development
   ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT development)
@@ -21,20 +25,26 @@ if(TARGET lyra)
   install(TARGETS lyra RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT command)
 endif()
 
+if(WIN32)
+  install(FILES ${ZOR_COMPILER_LIBRARIES} DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT libraries)
+endif()
+
 install(DIRECTORY include/ DESTINATION ${headerDir} COMPONENT development FILES_MATCHING PATTERN "*.h")
 install(DIRECTORY src/platform/ DESTINATION ${headerDir}/platform COMPONENT development FILES_MATCHING PATTERN "*.h")
 install(FILES src/default_platform/InterferenceScene.h src/default_platform/OpenModel.h
   src/default_platform/SettingOverride.h DESTINATION ${headerDir}/default_platform COMPONENT development)
-# Not those of the CAD kernel's part, which is loaded by name, and of the toolkit's own sources.
-install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit COMPONENT development FILES_MATCHING PATTERN "*.h"
-  PATTERN "detection" EXCLUDE
-  PATTERN "viewer" EXCLUDE
-  REGEX "/(Deviations|DrawingWorkers|ElementWalk|Manifest|PageData|PageLibrary|PageMaker|PictureDrawing|PictureSettings|PictureStore|PublishedFiles|ReferredPictures|SharedDrawing|ShippedTexts)[.]h$" EXCLUDE
-  REGEX "/exchange/(BcfNames|BcfPictures|BcfTopics|BcfWords|DocumentTimes|ExchangeLibrary|ExchangeXml|SheetBase|XmlText)[.]h$" EXCLUDE
-  REGEX "/review/(Assignment|Frames|HashInput|LanguageWords|PlaceClusters|ProductMatch|ReviewSource|TomlFile)[.]h$" EXCLUDE)
-install(FILES src/toolkit/detection/Detect.h DESTINATION ${headerDir}/toolkit/detection COMPONENT development)
+if(ZOR_WITH_TOOLKIT)
+  # Not those of the CAD kernel's part, which is loaded by name, and of the toolkit's own sources.
+  install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit COMPONENT development FILES_MATCHING PATTERN "*.h"
+    PATTERN "detection" EXCLUDE
+    PATTERN "viewer" EXCLUDE
+    REGEX "/(Deviations|DrawingWorkers|ElementWalk|Manifest|PageData|PageLibrary|PageMaker|PictureDrawing|PictureSettings|PictureStore|PublishedFiles|ReferredPictures|SharedDrawing|ShippedTexts)[.]h$" EXCLUDE
+    REGEX "/exchange/(BcfNames|BcfPictures|BcfTopics|BcfWords|DocumentTimes|ExchangeLibrary|ExchangeXml|SheetBase|XmlText)[.]h$" EXCLUDE
+    REGEX "/review/(Assignment|Frames|HashInput|LanguageWords|PlaceClusters|ProductMatch|ReviewSource|TomlFile)[.]h$" EXCLUDE)
+  install(FILES src/toolkit/detection/Detect.h DESTINATION ${headerDir}/toolkit/detection COMPONENT development)
+  install(FILES ${PROJECT_BINARY_DIR}/generated/ZORToolkitExport.h DESTINATION ${headerDir} COMPONENT development)
+endif()
 install(FILES ${PROJECT_BINARY_DIR}/generated/ZORLyraExport.h ${PROJECT_BINARY_DIR}/generated/ZORPlatformExport.h
-  ${PROJECT_BINARY_DIR}/generated/ZORToolkitExport.h
   DESTINATION ${headerDir} COMPONENT development)
 install(DIRECTORY resources/ DESTINATION ${resourceDir} COMPONENT libraries OPTIONAL)
 

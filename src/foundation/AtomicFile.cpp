@@ -113,7 +113,7 @@ TemporaryFile::TemporaryFile(const std::string& inFolder, unsigned int inMode,
 }
 
 TemporaryFile::~TemporaryFile() {
-  close(descriptor_);
+  Close();
   if (!path_.empty()) unlink(path_.c_str());
 }
 
@@ -137,6 +137,10 @@ int TemporaryFile::Reopen() {
   if (reopened < 0) throw FileError(reportedPath_, errno);
   close(descriptor_);
   return descriptor_ = reopened;
+}
+
+void TemporaryFile::Close() {
+  if (descriptor_ >= 0) CloseDescriptor(std::exchange(descriptor_, -1));
 }
 
 bool TemporaryFile::IsTemporaryName(std::string_view inName) {

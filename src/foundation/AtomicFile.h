@@ -35,6 +35,8 @@ class ZOR_FOUNDATION_EXPORT TemporaryFile {
   /// Switches to whatever file now has this path, in case a writer replaced it.
   /// @return the descriptor.
   int Reopen();
+  /// Nothing more is written; the file stays.
+  void Close();
   /// The file has been renamed and is no longer this object's to remove.
   void Release() { path_.clear(); }
 

@@ -2,14 +2,17 @@
 
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 
 namespace ZORFoundation {
 
 int WriteAll(int inDescriptor, std::string_view inBytes, std::size_t& outWritten) {
   for (outWritten = 0; outWritten < inBytes.size();) {
-    const ssize_t count =
-        write(inDescriptor, inBytes.data() + outWritten, inBytes.size() - outWritten);
+    constexpr std::size_t kMost = 1 << 30;  // what every system's call takes at a time
+    const auto count =
+        write(inDescriptor, inBytes.data() + outWritten,
+              static_cast<unsigned int>(std::min(kMost, inBytes.size() - outWritten)));
     if (count >= 0)
       outWritten += static_cast<std::size_t>(count);
     else if (errno != EINTR)
@@ -26,7 +29,7 @@ int CloseDescriptor(int inDescriptor) {
 int CopyBytes(int inSource, int inTarget) {
   char block[1 << 16];
   for (;;) {
-    const ssize_t count = read(inSource, block, sizeof block);
+    const auto count = read(inSource, block, sizeof block);
     if (count == 0) return 0;
     if (count < 0 && errno == EINTR) continue;
     if (count < 0) return errno;

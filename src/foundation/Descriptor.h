@@ -3,6 +3,7 @@
 #define ZOR_FOUNDATION_DESCRIPTOR_H
 
 #include <cstddef>
+#include <cstdio>
 #include <stdexcept>
 #include <string>
 #include <string_view>
@@ -40,6 +41,10 @@ class Descriptor {
  private:
   int descriptor_;
 };
+
+/// Opens a file as a stream of the C library, which makes or empties it.
+/// @return null when that failed; errno says why.
+ZOR_FOUNDATION_EXPORT std::FILE* OpenStream(const std::string& inPath);
 
 /// Copies the rest of one open file into another.
 ZOR_FOUNDATION_EXPORT int CopyBytes(int inSource, int inTarget);

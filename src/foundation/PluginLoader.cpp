@@ -13,9 +13,11 @@ std::string LibraryDirectory() {
   return slash == std::string::npos ? std::string(".") : file.substr(0, slash);
 }
 
+std::string PluginPath(const char* inName) { return LibraryDirectory() + "/lib" + inName + ".so"; }
+
 // By its path, since not every loader looks where the library that asks was found.
-void* FindPluginFunction(const char* inFile, const char* inFunction, std::string& outReason) {
-  const std::string path = LibraryDirectory() + '/' + inFile;
+void* FindPluginFunction(const char* inName, const char* inFunction, std::string& outReason) {
+  const std::string path = PluginPath(inName);
   void* const library = dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
   void* const function = library == nullptr ? nullptr : dlsym(library, inFunction);
   if (function == nullptr) {

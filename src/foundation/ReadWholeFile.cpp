@@ -60,6 +60,23 @@ Descriptor OpenForReading(const std::string& inPath, bool inMayBeStream) {
   return file;
 }
 
+Descriptor OpenForAppending(const std::string& inPath) {
+  Descriptor file(open(inPath.c_str(), O_WRONLY | O_APPEND | O_CLOEXEC));
+  if (!file.IsOpen()) throw FileError(inPath, errno);
+  return file;
+}
+
+Descriptor OpenCut(const std::string& inPath, std::uint64_t inSize) {
+  constexpr int kMode = 0666;
+  Descriptor file(
+      open(inPath.c_str(), O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC | O_NOFOLLOW, kMode));
+  if (!file.IsOpen() || ftruncate(file.Get(), static_cast<off_t>(inSize)) != 0)
+    throw FileError(inPath, errno);
+  return file;
+}
+
+std::FILE* OpenStream(const std::string& inPath) { return std::fopen(inPath.c_str(), "wb"); }
+
 std::size_t ReadSome(int inDescriptor, void* outBytes, std::size_t inMax,
                      const std::string& inName) {
   for (;;) {

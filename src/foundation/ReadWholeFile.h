@@ -52,6 +52,13 @@ ZOR_FOUNDATION_EXPORT std::optional<WholeFile> TryReadWholeFile(const std::strin
 ZOR_FOUNDATION_EXPORT Descriptor OpenForReading(const std::string& inPath,
                                                 bool inMayBeStream = false);
 
+/// Opens a file that is there, for writing at its end. Raises FileError.
+ZOR_FOUNDATION_EXPORT Descriptor OpenForAppending(const std::string& inPath);
+
+/// Opens a file of its own for writing behind its first bytes; what follows them is cut off, and a
+/// missing one is made. Raises FileError, also where its name is a link.
+ZOR_FOUNDATION_EXPORT Descriptor OpenCut(const std::string& inPath, std::uint64_t inSize);
+
 /// Reads up to so many bytes, fewer at the end and from streams. @return 0 at the end only.
 /// @param inName what a FileError names.
 ZOR_FOUNDATION_EXPORT std::size_t ReadSome(int inDescriptor, void* outBytes, std::size_t inMax,

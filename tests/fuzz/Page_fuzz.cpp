@@ -7,7 +7,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* inBytes, std::size_t i
   using ZORToolkit::PageLibraryFunction;
   std::string reason;
   static auto* const library = reinterpret_cast<PageLibraryFunction*>(
-      ZORFoundation::FindPluginFunction("libZORPage.so", ZORToolkit::kPageLibraryName, reason));
+      ZORFoundation::FindPluginFunction("ZORPage", ZORToolkit::kPageLibraryName, reason));
   fuzz::Require(library != nullptr, reason);
   ZORToolkit::Page page;
   const bool isMade = library()->makePage({"<ClashElement><ClashResult Name=\"r\"/></ClashElement>",

@@ -21,6 +21,7 @@ const Part* PartOf(const std::string& inPath) {
       Part{Pattern("include/.*"), Pattern("src/platform/.*|ZORLyraExport")},
       // Types that Windows has itself must be Windows' own there.
       Part{Pattern("src/platform/.*"), Pattern("ZORPlatformExport|windows-types")},
+      Part{Pattern("src/foundation/WindowsCalls\\.h"), Pattern("ZORFoundationExport|windows")},
       Part{Pattern("src/foundation/.*\\.h"), Pattern("ZORFoundationExport")},
       Part{Pattern("src/foundation/.*"), Pattern("ZORFoundationExport|third-party")},
       Part{Pattern("src/default_platform/[^/]*\\.h"),

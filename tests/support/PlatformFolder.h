@@ -8,7 +8,7 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
-#include <stdexcept>
+#include <random>
 #include <string>
 
 #include "support/ScopedVariable.h"
@@ -25,9 +25,8 @@ inline std::string ReadFile(const std::filesystem::path& inPath) {
 class TemporaryFolder {
  public:
   TemporaryFolder() {
-    std::string pattern = testing::TempDir() + "zor_XXXXXX";
-    if (mkdtemp(pattern.data()) == nullptr) throw std::runtime_error("no folder for a test");
-    path = pattern;
+    do path = testing::TempDir() + "zor_" + std::to_string(std::random_device()());
+    while (!std::filesystem::create_directory(path));
   }
   ~TemporaryFolder() { std::filesystem::remove_all(path); }
   TemporaryFolder(const TemporaryFolder&) = delete;

@@ -13,18 +13,24 @@ class ScopedVariable {
  public:
   ScopedVariable(const char* inName, const std::string& inValue) : name_(inName) {
     if (const char* const former = std::getenv(inName)) former_ = former;
-    setenv(inName, inValue.c_str(), 1);
+    Set(inValue.c_str());
   }
-  ~ScopedVariable() {
-    if (former_)
-      setenv(name_, former_->c_str(), 1);
-    else
-      unsetenv(name_);
-  }
+  ~ScopedVariable() { Set(former_ ? former_->c_str() : nullptr); }
   ScopedVariable(const ScopedVariable&) = delete;
   ScopedVariable& operator=(const ScopedVariable&) = delete;
 
  private:
+#ifdef _WIN32
+  void Set(const char* inValue) { _putenv_s(name_, inValue == nullptr ? "" : inValue); }
+#else
+  void Set(const char* inValue) {
+    if (inValue == nullptr)
+      unsetenv(name_);
+    else
+      setenv(name_, inValue, 1);
+  }
+#endif
+
   const char* name_;
   std::optional<std::string> former_;
 };

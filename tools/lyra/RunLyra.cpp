@@ -1,6 +1,5 @@
 #include "lyra/RunLyra.h"
 
-#include <csignal>
 #include <cstdio>
 #include <cstdlib>
 #include <exception>
@@ -13,6 +12,7 @@
 #include "lyra/CommandLine.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/terminal/SafeText.h"
+#include "lyra/terminal/Terminal.h"
 
 namespace lyra {
 namespace {
@@ -96,9 +96,7 @@ volatile bool hasLackedMemory = false;
 }
 
 int RunAndReport(int inCount, char** inArguments) {
-  // A reader that goes away shows as a failed write, so that work can stop in good order.
-  std::signal(SIGPIPE, SIG_IGN);
-  std::signal(SIGXFSZ, SIG_IGN);  // likewise a file that may not grow any further
+  PrepareStreams();
   ZORFoundation::HandleTerminationSignals();
   try {
     Output output(stdout);

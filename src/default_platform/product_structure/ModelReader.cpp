@@ -252,14 +252,6 @@ std::string TakeResult(const Descriptor& inResult) {
 
 }  // namespace
 
-ModelLimits LimitsFor(const ModelOptions& inOptions, std::size_t inFileSize) {
-  constexpr double kSeconds = 6, kSecondsPerByte = 10e-6;
-  constexpr std::uint64_t kMemory = std::uint64_t{512} << 20, kMemoryPerByte = 256;
-  const auto size = static_cast<double>(inFileSize);
-  return {inOptions.maxSeconds > 0 ? inOptions.maxSeconds : kSeconds + kSecondsPerByte * size,
-          inOptions.maxMemory > 0 ? inOptions.maxMemory : kMemory + kMemoryPerByte * inFileSize};
-}
-
 std::string ReadModelInChild(const ModelRequest& inRequest, std::string_view inBytes,
                              const ModelLimits& inLimits, const ModelProgram& inProgram) {
   const std::string reader = ZORFoundation::LibraryDirectory() + inProgram.path;

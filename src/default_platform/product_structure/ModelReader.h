@@ -26,9 +26,6 @@ struct ModelLimits {
   std::uint64_t memory = 0;  ///< in bytes
 };
 
-/// The limits of the options; where they have none, those for a file of this size.
-ModelLimits LimitsFor(const ModelOptions& inOptions, std::size_t inFileSize);
-
 /// The reader, a program that lies in this folder beside our libraries. Its arguments, and those of
 /// others that read a model, are the format's number, the deflection, the memory in bytes, the
 /// seconds and the model's path. What it opens by itself it may read from the model's folder alone.

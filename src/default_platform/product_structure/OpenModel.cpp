@@ -16,6 +16,15 @@
 namespace ZORDefault {
 namespace {
 
+/// The limits of the options; where they have none, those for a file of this size.
+ModelLimits LimitsFor(const ModelOptions& inOptions, std::size_t inFileSize) {
+  constexpr double kSeconds = 6, kSecondsPerByte = 10e-6;
+  constexpr std::uint64_t kMemory = std::uint64_t{512} << 20, kMemoryPerByte = 256;
+  const auto size = static_cast<double>(inFileSize);
+  return {inOptions.maxSeconds > 0 ? inOptions.maxSeconds : kSeconds + kSecondsPerByte * size,
+          inOptions.maxMemory > 0 ? inOptions.maxMemory : kMemory + kMemoryPerByte * inFileSize};
+}
+
 constexpr double kMaxDeflection = 0.1;
 
 std::string ReasonOf(const ZORFoundation::FileError& inError) {

@@ -2,25 +2,19 @@
 #ifndef ZOR_DEFAULT_PLATFORM_SYSTEM_CLOCALE_H
 #define ZOR_DEFAULT_PLATFORM_SYSTEM_CLOCALE_H
 
-#include <locale.h>
-
 namespace ZORDefault {
 
 /// While one of these lives, the C library's functions called by this thread use the C locale: a
 /// decimal separator is the point, whatever the application chose. Other threads are not touched.
 class CLocaleScope {
  public:
-  CLocaleScope() : previous_(uselocale(CLocale())) {}
-  ~CLocaleScope() { uselocale(previous_); }
+  CLocaleScope();
+  ~CLocaleScope();
   CLocaleScope(const CLocaleScope&) = delete;
   CLocaleScope& operator=(const CLocaleScope&) = delete;
 
  private:
-  static locale_t CLocale() {
-    static const locale_t locale = newlocale(LC_ALL_MASK, "C", nullptr);
-    return locale;
-  }
-  locale_t previous_;
+  void* previous_;
 };
 
 }  // namespace ZORDefault

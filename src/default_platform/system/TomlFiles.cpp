@@ -6,6 +6,7 @@
 #include <cerrno>
 #include <optional>
 
+#include "default_platform/system/SettingPlaces.h"
 #include "foundation/PluginLoader.h"
 #include "foundation/TomlNesting.h"
 #include "platform/system/ZORGetEnv.h"
@@ -37,23 +38,13 @@ std::string_view Variable(const char* inName) {
   return value ? value : "";
 }
 
-// Empty parts are no directories: "a::b" is a and b.
+// Empty parts are no directories: "a::b" is a and b where the colon separates.
 void AppendList(std::string_view inList, std::vector<std::string>& ioDirectories) {
   while (!inList.empty()) {
-    const std::size_t colon = std::min(inList.find(':'), inList.size());
+    const std::size_t colon = std::min(inList.find(kListSeparator), inList.size());
     if (colon > 0) ioDirectories.emplace_back(inList.substr(0, colon));
     inList.remove_prefix(std::min(colon + 1, inList.size()));
   }
-}
-
-void AppendUserDirectory(std::vector<std::string>& ioDirectories) {
-  const std::string_view configuration = Variable("XDG_CONFIG_HOME");
-  const std::string_view home = Variable("HOME");
-  // The rules of XDG base directories: a relative path here is ignored.
-  if (!configuration.empty() && configuration.front() == '/')
-    ioDirectories.push_back(std::string(configuration) + "/zorlyra");
-  else if (!home.empty())
-    ioDirectories.push_back(std::string(home) + "/.config/zorlyra");
 }
 
 // The library lies in lib or, on some systems, in a folder of lib for the processor's kind.
@@ -73,7 +64,7 @@ const std::string& InstalledResources() {
 std::vector<std::string> SettingDirectories() {
   std::vector<std::string> directories;
   AppendList(Variable("ZOR_SETTINGS_PATH"), directories);
-  AppendUserDirectory(directories);
+  if (std::string own = UserSettingDirectory(); !own.empty()) directories.push_back(std::move(own));
   directories.push_back(InstalledResources() + "/settings");
   return directories;
 }

@@ -1,10 +1,10 @@
 #include "platform/system/ZORDocumentLocation.h"
 
-#include <cstdlib>
 #include <string>
 #include <string_view>
 
 #include "default_platform/system/TomlFiles.h"
+#include "foundation/Environment.h"
 #include "platform/system/ZORGetEnv.h"
 
 namespace {
@@ -27,7 +27,9 @@ bool Expand(std::string_view inText, std::string& outText) {
 
 }  // namespace
 
-const char* ZORGetEnv(const char* inName) { return inName ? std::getenv(inName) : nullptr; }
+const char* ZORGetEnv(const char* inName) {
+  return inName ? ZORFoundation::ReadEnvironment(inName) : nullptr;
+}
 
 HRESULT ZORGetDLName(const ZORUnicodeString& inName, ZORUnicodeString** outDirectory) {
   if (!outDirectory) return E_INVALIDARG;

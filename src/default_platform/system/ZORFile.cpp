@@ -1,4 +1,4 @@
-// The file operations over POSIX.
+// Opening and copying files, over POSIX; ZORFileWindows.cpp takes this file's place on Windows.
 #include "platform/system/ZORFile.h"
 
 #include <fcntl.h>
@@ -6,7 +6,6 @@
 #include <unistd.h>
 
 #include <cerrno>
-#include <cstring>
 #include <string>
 #include <string_view>
 
@@ -18,8 +17,6 @@
 namespace {
 
 using ZORFoundation::Descriptor;
-
-constexpr std::size_t kPathRoom = 260;
 
 // The file system's bytes of a wide path; empty when it is no text.
 std::string NarrowPath(const wchar_t* inPath) {
@@ -48,31 +45,6 @@ int OpenFlags(std::string_view inMode) {
 
 }  // namespace
 
-HRESULT ZORDefault::FileResultOf(int inError) {
-  switch (inError) {
-    case ENOENT:
-      return kZORFileNotFound;
-    case EACCES:
-    case EPERM:
-    case EROFS:
-      return kZORFileAccessDenied;
-    case EEXIST:
-      return kZORFileExists;
-    case ENOSPC:
-    case EDQUOT:
-    case EFBIG:  // the process may write no larger file: no room, for its purposes
-      return kZORFileDiskFull;
-    case ENOTDIR:
-    case ENAMETOOLONG:
-    case ELOOP:
-      return kZORFileBadPath;
-    case EISDIR:
-      return kZORFileIsDirectory;
-    default:
-      return E_FAIL;
-  }
-}
-
 int ZORFileAccess(const char* inPath, int inMode) {
   if (!inPath || (inMode & ~6) != 0) return -1;
   const int read = inMode & 4 ? R_OK : 0;
@@ -94,22 +66,6 @@ HRESULT ZORFOpen(const wchar_t* inPath, const char* inMode, int* outDescriptor) 
   return S_OK;
 }
 
-HRESULT ZORFWrite(int inDescriptor, const void* inBytes, std::size_t inCount,
-                  std::size_t* outWritten) {
-  std::size_t unused = 0;
-  std::size_t& written = outWritten ? *outWritten : unused;
-  written = 0;
-  if (!inBytes && inCount > 0) return E_INVALIDARG;
-  const int error =
-      ZORFoundation::WriteAll(inDescriptor, {static_cast<const char*>(inBytes), inCount}, written);
-  return error == 0 ? S_OK : ZORDefault::FileResultOf(error);
-}
-
-HRESULT ZORFClose(int inDescriptor) {
-  const int error = ZORFoundation::CloseDescriptor(inDescriptor);
-  return error == 0 ? S_OK : ZORDefault::FileResultOf(error);
-}
-
 HRESULT ZORFCopy(const wchar_t* inSource, const wchar_t* inTarget, int inFlags) try {
   if (!inSource || !inTarget || (inFlags != 0 && inFlags != 1)) return E_INVALIDARG;
   const std::string sourcePath = NarrowPath(inSource);
@@ -128,17 +84,4 @@ HRESULT ZORFCopy(const wchar_t* inSource, const wchar_t* inTarget, int inFlags) 
   return S_OK;
 } catch (const ZORFoundation::FileError& error) {
   return ZORDefault::FileResultOf(error.Code());
-}
-
-HRESULT ZORMakePath(const char* inDirectory, const char* inFileName, char* outPath) {
-  if (!outPath) return E_INVALIDARG;
-  *outPath = '\0';
-  if (!inDirectory || !inFileName) return E_INVALIDARG;
-  std::string path = inDirectory;
-  // No directory is the current one: a separator would make it the root.
-  if (!path.empty() && path.back() != '/') path += '/';
-  path += inFileName;
-  if (path.size() >= kPathRoom) return E_INVALIDARG;
-  std::memcpy(outPath, path.c_str(), path.size() + 1);
-  return S_OK;
 }

@@ -41,7 +41,7 @@ double PixelSize(const ZOR3DViewpoint& inViewpoint, int inHeight) {
 const RayCaster* FindRayCaster() {
   std::string reason;
   void* const function =
-      ZORFoundation::FindPluginFunction("libZORRayCaster.so", kGetRayCasterName, reason);
+      ZORFoundation::FindPluginFunction("ZORRayCaster", kGetRayCasterName, reason);
   return function ? reinterpret_cast<GetRayCasterFunction*>(function)() : nullptr;
 }
 

@@ -46,7 +46,7 @@ struct ScanFailure {
 /// sink raise.
 using ScanAnyDocument = bool(ByteReader& ioReader, const char* inName, ScanSink& ioSink,
                              ScanFailure& outFailure);
-inline constexpr const char* kFullScannerFile = "libZORXmlScanner.so";
+inline constexpr const char* kFullScannerFile = "ZORXmlScanner";
 inline constexpr const char* kFullScannerName = "ZORScanAnyDocument";
 
 #endif

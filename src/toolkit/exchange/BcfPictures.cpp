@@ -71,7 +71,7 @@ constexpr double kDefaultAspect = 756.0 / 506.0;
 
 std::optional<PictureSize> SizeOfPng(const std::string& inPath) {
   char begin[24] = {};
-  std::ifstream file(inPath, std::ios::binary);
+  std::ifstream file(std::filesystem::path(inPath), std::ios::binary);
   if (!file.read(begin, sizeof begin) || std::string_view(begin, 8) != "\x89PNG\r\n\x1a\n")
     return std::nullopt;
   const auto number = [&](std::size_t inFirst) {
@@ -86,7 +86,7 @@ std::optional<PictureSize> SizeOfPng(const std::string& inPath) {
 /// Looks for the frame's header among the segments (ITU T.81, annex B).
 std::optional<PictureSize> SizeOfPicture(const std::string& inPath) {
   if (const std::optional<PictureSize> size = SizeOfPng(inPath)) return size;
-  std::ifstream file(inPath, std::ios::binary);
+  std::ifstream file(std::filesystem::path(inPath), std::ios::binary);
   const auto byte = [&] { return static_cast<int>(static_cast<unsigned char>(file.get())); };
   const auto number = [&] {
     const int high = byte();

@@ -14,7 +14,7 @@ namespace ZORToolkit {
 
 void* ExchangeFunction(const char* inName) {
   std::string reason;
-  void* const function = ZORFoundation::FindPluginFunction("libZORExchange.so", inName, reason);
+  void* const function = ZORFoundation::FindPluginFunction("ZORExchange", inName, reason);
   if (function == nullptr)
     throw Error("the library of foreign formats cannot be loaded: " + reason);
   return function;

@@ -7,8 +7,7 @@ namespace ZORToolkit {
 
 const PageLibrary& LoadPageLibrary() {
   std::string reason;
-  void* const function =
-      ZORFoundation::FindPluginFunction("libZORPage.so", kPageLibraryName, reason);
+  void* const function = ZORFoundation::FindPluginFunction("ZORPage", kPageLibraryName, reason);
   if (function == nullptr) throw Error("the library that makes pages cannot be loaded: " + reason);
   return *reinterpret_cast<PageLibraryFunction*>(function)();
 }

@@ -1,8 +1,5 @@
 #include "toolkit/publishing/PictureStore.h"
 
-#include <fcntl.h>
-
-#include <cerrno>
 #include <cstdlib>
 #include <optional>
 #include <regex>
@@ -181,8 +178,7 @@ void PictureStore::TakeOver(const std::vector<std::string>& inNames) const {
   for (const std::string& name : inNames)
     if (HasBytes(work / name)) drawn.push_back(name);
   const std::string stamp = (folder_ / kStampFile).string();
-  const ZORFoundation::Descriptor file(open(stamp.c_str(), O_WRONLY | O_APPEND | O_CLOEXEC));
-  if (!file.IsOpen()) throw ZORFoundation::FileError(stamp, errno);
+  const ZORFoundation::Descriptor file = ZORFoundation::OpenForAppending(stamp);
   std::size_t written = 0;
   if (const int error = ZORFoundation::WriteAll(file.Get(), ListText(drawn), written); error != 0)
     throw ZORFoundation::FileError(stamp, error);

@@ -29,7 +29,7 @@ class WorkFolder {
  private:
   void Lock(const std::filesystem::path& inFolder);
   void RemoveFiles() const;
-  void RemoveFolder() const;
+  void RemoveFolder();
 
   std::string path_, lockPath_;
   ZORFoundation::Descriptor lock_;  // released by the system when the last process that has it ends

@@ -227,7 +227,9 @@ std::string WhatIsWrongWith(const std::string& inPath) {
 
 std::string LinkTo(const std::string& inFile, const std::string& inFederator) {
   if (fs::path(inFile).is_absolute()) return inFile;
-  return Canonical(fs::absolute(inFile)).lexically_relative(Canonical(DirectoryOf(inFederator)));
+  return Canonical(fs::absolute(inFile))
+      .lexically_relative(Canonical(DirectoryOf(inFederator)))
+      .string();
 }
 
 std::string LinkedPath(const std::string& inLink, const std::string& inFederator) {
@@ -240,8 +242,8 @@ std::string LinkedPath(const std::string& inLink, const std::string& inFederator
   std::error_code ignored;
   // Documents from the library's home system separate folders by backslashes.
   if (!fs::exists(path, ignored) && link.find('\\') != std::string::npos)
-    return DirectoryOf(inFederator) / WithSlashes(link);
-  return path;
+    return (DirectoryOf(inFederator) / WithSlashes(link)).string();
+  return path.string();
 }
 
 std::vector<std::string> CheckLinks(const std::vector<LinkRecord>& inLinks,

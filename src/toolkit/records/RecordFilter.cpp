@@ -1,11 +1,9 @@
 #include "toolkit/records/RecordFilter.h"
 
-#include <wctype.h>
-
 #include <algorithm>
-#include <clocale>
 #include <sstream>
 
+#include "foundation/CharacterTables.h"
 #include "foundation/Utf8.h"
 
 namespace ZORToolkit {
@@ -29,15 +27,6 @@ bool Holds(const ProductRecord& inProduct, const std::string& inFolded) {
   return false;
 }
 
-/// By way of the capital, so that both forms of a letter such as the Greek sigma meet.
-char32_t Folded(char32_t inCharacter) {
-  // Loaded when the first text comes, whatever the process's locale, and kept.
-  static const locale_t tables = newlocale(LC_CTYPE_MASK, "C.UTF-8", nullptr);
-  if (tables == nullptr) return inCharacter;
-  return static_cast<char32_t>(
-      towlower_l(towupper_l(static_cast<wint_t>(inCharacter), tables), tables));
-}
-
 }  // namespace
 
 std::string CaseFolded(std::string_view inText) {
@@ -47,7 +36,8 @@ std::string CaseFolded(std::string_view inText) {
   folded.reserve(inText.size());
   for (std::size_t position = 0; position < units.size();) {
     char bytes[4];
-    const char32_t character = Folded(ZORFoundation::NextCharacter(units, position));
+    const char32_t character =
+        ZORFoundation::CaseFoldedCharacter(ZORFoundation::NextCharacter(units, position));
     folded.append(bytes, ZORFoundation::EncodeCharacter(character, bytes));
   }
   return folded;

@@ -2,8 +2,8 @@
 
 #include <algorithm>
 #include <array>
-#include <cstdlib>
 
+#include "foundation/Environment.h"
 #include "platform/system/ZORMsgCatalog.h"
 #include "toolkit/records/DocumentText.h"
 
@@ -49,15 +49,12 @@ std::string Trimmed(const std::string& inText) {
 }  // namespace
 
 OtherLanguage::OtherLanguage(const char* inLanguage) {
-  if (const char* const former = std::getenv("ZOR_LANG")) former_ = former;
-  setenv("ZOR_LANG", inLanguage, 1);
+  if (const char* const former = ZORFoundation::ReadEnvironment("ZOR_LANG")) former_ = former;
+  ZORFoundation::WriteEnvironment("ZOR_LANG", inLanguage);
 }
 
 OtherLanguage::~OtherLanguage() {
-  if (former_)
-    setenv("ZOR_LANG", former_->c_str(), 1);
-  else
-    unsetenv("ZOR_LANG");
+  ZORFoundation::WriteEnvironment("ZOR_LANG", former_ ? former_->c_str() : nullptr);
 }
 
 std::string EnglishWord(const std::string& inText) {

@@ -1,5 +1,6 @@
 #include "toolkit/review/ReviewedFile.h"
 
+#include <filesystem>
 #include <fstream>
 #include <utility>
 
@@ -12,7 +13,7 @@ namespace {
 constexpr std::uint64_t kMaxSize = 0x7fffffff;  // what the library reads from memory
 
 HRESULT WriteBytes(const std::string& inBytes, const std::string& inPath) {
-  std::ofstream file(inPath, std::ios::binary);
+  std::ofstream file(std::filesystem::path(inPath), std::ios::binary);
   file.write(inBytes.data(), static_cast<std::streamsize>(inBytes.size()));
   return file.flush() ? S_OK : E_FAIL;
 }

@@ -1,10 +1,6 @@
 #include "toolkit/sharding/DetectionShare.h"
 
-#include <fcntl.h>
-#include <unistd.h>
-
 #include <algorithm>
-#include <cerrno>
 #include <filesystem>
 #include <utility>
 
@@ -60,11 +56,7 @@ class Checkpoint {
 
   /// Goes on behind what was read; without any, from the start.
   int Open() {
-    constexpr int kMode = 0666;
-    file_ = ZORFoundation::Descriptor(
-        open(path_.c_str(), O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC | O_NOFOLLOW, kMode));
-    if (!file_.IsOpen() || ftruncate(file_.Get(), static_cast<off_t>(size_)) != 0)
-      throw ZORFoundation::FileError(path_, errno);
+    file_ = ZORFoundation::OpenCut(path_, size_);
     std::size_t written = 0;
     const int error = size_ > 0 ? 0 : ZORFoundation::WriteAll(file_.Get(), title_, written);
     if (error != 0) throw ZORFoundation::FileError(path_, error);

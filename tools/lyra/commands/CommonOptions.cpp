@@ -1,9 +1,9 @@
 #include "lyra/commands/CommonOptions.h"
 
 #include <algorithm>
-#include <cstdlib>
 #include <span>
 
+#include "foundation/Environment.h"
 #include "lyra/Arguments.h"
 #include "lyra/CommandErrors.h"
 
@@ -34,7 +34,7 @@ void ChooseLanguage(const std::string& inLanguage) {
   const std::string language =
       ZORToolkit::CaseFolded(inLanguage.substr(0, inLanguage.find_first_of("_-.@")));
   ChosenWord("--lang", language, kLanguages);
-  setenv("ZOR_LANG", language.c_str(), 1);
+  ZORFoundation::WriteEnvironment("ZOR_LANG", language.c_str());
 }
 
 void PrologueOptions::Declare(Arguments& ioArguments) {

@@ -66,7 +66,7 @@ int WriteText(const ConvertOptions& inOptions, Output& ioOutput,
   }
   OutputFile file(inOptions.output);
   const std::unique_ptr<std::FILE, int (*)(std::FILE*)> stream(
-      std::fopen(file.Path().c_str(), "wb"), &std::fclose);
+      ZORFoundation::OpenStream(file.Path()), &std::fclose);
   if (stream == nullptr) throw ZORFoundation::FileError(inOptions.output, errno);
   Output text(stream.get());
   inWrite(text);

@@ -1,11 +1,10 @@
 // lyra gather DIR… -o OUT, and what the verbs have in common whose work can be shared.
-#include <sys/resource.h>
-
 #include <algorithm>
 #include <cmath>
 #include <filesystem>
 #include <memory>
 
+#include "foundation/MemoryUsed.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
@@ -16,15 +15,6 @@
 namespace lyra {
 using namespace ZORToolkit;
 namespace {
-
-/// Of this process and the largest one that it started and that has ended, in megabytes. Twice what a
-/// share shows of it is asked for: its pictures are not those that were tried.
-double MegabytesUsed() {
-  rusage own{}, started{};
-  getrusage(RUSAGE_SELF, &own);
-  getrusage(RUSAGE_CHILDREN, &started);
-  return static_cast<double>(own.ru_maxrss + started.ru_maxrss) / 1024;
-}
 
 double Rounded(double inNumber, double inStep) { return std::ceil(inNumber / inStep) * inStep; }
 
@@ -99,7 +89,8 @@ int PrintPlan(const char* inVerb, const WorkSample& inSample, const ShareOptions
                      : shard          ? shard->count
                                       : 0;
   const Plan plan = PlanOf(inSample, count);
-  const double megabytes = Rounded(2 * MegabytesUsed(), 64);
+  // Twice what a share shows of it: its pictures are not those that were tried.
+  const double megabytes = Rounded(2 * ZORFoundation::MegabytesUsed(), 64);
   if (inOptions.json) {
     ioOutput.Write(PlanJson(inVerb, plan, megabytes));
     return 0;

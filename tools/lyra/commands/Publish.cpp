@@ -173,7 +173,7 @@ int Extract(const ExtractOptions& inOptions, Output& ioOutput) {
   const PublishedPage page(inOptions.file, BytesOfInput(inOptions.file));
   const std::string bytes = inOptions.manifest ? page.ManifestText() : page.Result();
   OutputFile output(inOptions.output);
-  std::ofstream file(output.Path(), std::ios::binary);
+  std::ofstream file(std::filesystem::path(output.Path()), std::ios::binary);
   file.write(bytes.data(), static_cast<std::streamsize>(bytes.size()));
   output.Check(file.flush() ? S_OK : E_FAIL);
   output.Finish(ioOutput);

@@ -1,6 +1,4 @@
 // lyra path NAME, lyra escape TEXT, lyra filename TEXT
-#include <unistd.h>
-
 #include <memory>
 
 #include "BuildPath.h"
@@ -23,8 +21,9 @@ using Converter = void (*)(ZORUnicodeString& inText, ZORUnicodeString& ioOutput)
 
 /// Converts a text of the command line as a line, standard input as it stands.
 int Convert(const TextOptions& inOptions, Converter inFirst, Converter inOther, Output& ioOutput) {
+  constexpr int kStandardInput = 0;
   const bool isStream = inOptions.text == "-";
-  ZORUnicodeString text = FromUtf8(isStream ? ZORFoundation::ReadToEnd(STDIN_FILENO, "-")
+  ZORUnicodeString text = FromUtf8(isStream ? ZORFoundation::ReadToEnd(kStandardInput, "-")
                                             : inOptions.text),
                    converted;
   (inOptions.other ? inOther : inFirst)(text, converted);

@@ -1,8 +1,5 @@
 #include "lyra/terminal/Output.h"
 
-#include <sys/ioctl.h>
-#include <unistd.h>
-
 #include <cerrno>
 #include <cstdlib>
 #include <cstring>
@@ -11,6 +8,7 @@
 
 #include "foundation/ReadWholeFile.h"
 #include "lyra/CommandErrors.h"
+#include "lyra/terminal/Terminal.h"
 #include "platform/system/ZORGetEnv.h"
 #include "toolkit/records/WrittenFile.h"
 
@@ -23,13 +21,11 @@ bool IsSet(const char* inName) {
   return value != nullptr && *value != '\0';
 }
 
-bool IsTerminalStream(std::FILE* inStream) { return isatty(fileno(inStream)) == 1; }
-
 }  // namespace
 
 Output::Output(std::FILE* inStream)
     : stream_(inStream),
-      isTerminal_(IsTerminalStream(inStream)),
+      isTerminal_(lyra::IsTerminal(inStream)),
       isStyled_(isTerminal_ && !IsSet("NO_COLOR")) {}
 
 void Output::Write(std::string_view inBytes) {
@@ -51,8 +47,7 @@ int Output::Width() const {
     const int width = std::atoi(columns);
     if (width > 0) return width;
   }
-  winsize size{};
-  return ioctl(fileno(stream_), TIOCGWINSZ, &size) == 0 ? size.ws_col : 0;
+  return TerminalWidth(stream_);
 }
 
 OutputFile::OutputFile(const std::string& inPath) : path_(inPath) {

@@ -1,11 +1,10 @@
 #include "lyra/terminal/Progress.h"
 
-#include <unistd.h>
-
 #include <algorithm>
 #include <cstdio>
 
 #include "lyra/terminal/SafeText.h"
+#include "lyra/terminal/Terminal.h"
 
 namespace lyra {
 namespace {
@@ -22,8 +21,7 @@ std::string Duration(double inSeconds) {
 }  // namespace
 
 ProgressLine::ProgressLine(const std::string& inWork)
-    : work_(Fitted(Printable(inWork), kWidest, Cut::kStart)),
-      isTerminal_(isatty(STDERR_FILENO) == 1) {}
+    : work_(Fitted(Printable(inWork), kWidest, Cut::kStart)), isTerminal_(IsTerminal(stderr)) {}
 
 ProgressLine::~ProgressLine() { Clear(); }
 
@@ -63,7 +61,7 @@ std::string DrawingText(std::size_t inDone, std::size_t inAll, double inSeconds)
          RateText(inDone, inAll, inSeconds);
 }
 
-DrawingProgress::DrawingProgress() : isTerminal_(isatty(STDERR_FILENO) == 1) {}
+DrawingProgress::DrawingProgress() : isTerminal_(IsTerminal(stderr)) {}
 
 DrawingProgress::~DrawingProgress() { Clear(); }
 

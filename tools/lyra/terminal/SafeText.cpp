@@ -1,11 +1,10 @@
 #include "lyra/terminal/SafeText.h"
 
 #include <algorithm>
-#include <clocale>
 #include <cstdio>
-#include <cwchar>
 #include <vector>
 
+#include "foundation/CharacterTables.h"
 #include "foundation/Utf8.h"
 
 namespace lyra {
@@ -50,32 +49,12 @@ std::string Hex(const char* inFormat, char32_t inPoint) {
   return digits;
 }
 
-/// Makes the character tables of Unicode current while it lives, whatever the process's locale.
-class UnicodeTables {
- public:
-  UnicodeTables() : previous_(Tables() != nullptr ? uselocale(Tables()) : nullptr) {}
-  ~UnicodeTables() {
-    if (previous_ != nullptr) uselocale(previous_);
-  }
-  UnicodeTables(const UnicodeTables&) = delete;
-  UnicodeTables& operator=(const UnicodeTables&) = delete;
-
- private:
-  // Loaded when the first text beyond ASCII comes, and kept for the process's lifetime.
-  static locale_t Tables() {
-    static const locale_t tables = newlocale(LC_CTYPE_MASK, "C.UTF-8", nullptr);
-    return tables;
-  }
-  locale_t previous_;
-};
-
 int ColumnsOf(char32_t inPoint) {
-  const int columns = wcwidth(static_cast<wchar_t>(inPoint));
+  const int columns = ZORFoundation::ColumnsOfCharacter(inPoint);
   return columns < 0 ? 1 : columns;  // not in the tables: most characters take one column
 }
 
 int ColumnsOf(const std::vector<char32_t>& inPoints) {
-  const UnicodeTables tables;
   int width = 0;
   for (char32_t point : inPoints) width += ColumnsOf(point);
   return width;
@@ -123,7 +102,6 @@ std::string Fitted(std::string_view inText, int inWidth, Cut inCut) {
   if (DisplayWidth(inText) <= inWidth) return std::string(inText);
   std::vector<char32_t> points = CodePoints(inText);
   if (inCut == Cut::kStart) std::reverse(points.begin(), points.end());
-  const UnicodeTables tables;
   int width = 1;  // of the sign that something is missing
   std::size_t kept = 0;
   while (kept < points.size() && width + ColumnsOf(points[kept]) <= inWidth)

@@ -1,0 +1,39 @@
+#include <cstdlib>
+#include <mutex>
+#include <set>
+#include <string>
+
+#include "foundation/Environment.h"
+#include "foundation/WindowsCalls.h"
+
+namespace ZORFoundation {
+
+// Of the process, since a host may change it by other ways than the C library's. Values are kept, as
+// elsewhere a caller's pointer is good until the variable changes.
+const char* ReadEnvironment(const char* inName) {
+  static std::mutex mutex;
+  static auto* const values = new std::set<std::string>();
+  const std::wstring name = WideText(inName);
+  std::wstring value(256, L'\0');
+  for (;;) {
+    SetLastError(ERROR_SUCCESS);
+    const DWORD length =
+        GetEnvironmentVariableW(name.c_str(), value.data(), static_cast<DWORD>(value.size()));
+    if (length == 0 && GetLastError() != ERROR_SUCCESS) return nullptr;
+    const bool isWhole = length < value.size();
+    value.resize(length);
+    if (isWhole) break;
+  }
+  const std::lock_guard lock(mutex);
+  return values->insert(Utf8Text(value)).first->c_str();
+}
+
+// The C library keeps a copy, which its own functions read; an empty value it would take away.
+void WriteEnvironment(const char* inName, const char* inValue) {
+  const std::wstring name = WideText(inName);
+  const std::wstring value = inValue == nullptr ? L"" : WideText(inValue);
+  _wputenv((name + L"=" + value).c_str());
+  SetEnvironmentVariableW(name.c_str(), inValue == nullptr ? nullptr : value.c_str());
+}
+
+}  // namespace ZORFoundation

@@ -1,0 +1,42 @@
+// What the files for Windows have in common: paths in wide characters, errors as errno values. Paths
+// and texts are UTF-8 everywhere else, whatever the ANSI code page.
+#ifndef ZOR_FOUNDATION_WINDOWSCALLS_H
+#define ZOR_FOUNDATION_WINDOWSCALLS_H
+
+#include <windows.h>
+
+#include <string>
+#include <string_view>
+
+#include "foundation/Descriptor.h"
+
+namespace ZORFoundation {
+
+/// What is no UTF-8, or no UTF-16, becomes U+FFFD.
+ZOR_FOUNDATION_EXPORT std::wstring WideText(std::string_view inText);
+ZOR_FOUNDATION_EXPORT std::string Utf8Text(std::wstring_view inText);
+
+/// A path as the calls of Windows take it: with backslashes, and where it is too long for MAX_PATH
+/// absolute and marked so that this limit does not hold.
+ZOR_FOUNDATION_EXPORT std::wstring WidePath(const std::string& inPath);
+
+/// The errno value for an error of Windows.
+ZOR_FOUNDATION_EXPORT int ErrorNumberOf(unsigned long inError);
+
+struct OpenRequest {
+  unsigned long access = GENERIC_READ;
+  unsigned long disposition = OPEN_EXISTING;
+  bool isAppending = false;
+};
+
+/// Opens a file in binary mode; others may read, write, rename and remove it meanwhile, and processes
+/// that are started do not inherit it.
+/// @return -1 when that failed; errno says why.
+ZOR_FOUNDATION_EXPORT int OpenShared(const std::string& inPath, const OpenRequest& inRequest);
+
+/// @return that of an open file.
+ZOR_FOUNDATION_EXPORT HANDLE HandleOf(int inDescriptor);
+
+}  // namespace ZORFoundation
+
+#endif

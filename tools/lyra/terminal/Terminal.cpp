@@ -1,0 +1,25 @@
+#include "lyra/terminal/Terminal.h"
+
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include <csignal>
+
+namespace lyra {
+
+bool IsTerminal(std::FILE* inStream) { return isatty(fileno(inStream)) == 1; }
+
+int TerminalWidth(std::FILE* inStream) {
+  winsize size{};
+  return ioctl(fileno(inStream), TIOCGWINSZ, &size) == 0 ? size.ws_col : 0;
+}
+
+void PrepareStreams() {
+  for (const int signal : {SIGPIPE, SIGXFSZ}) std::signal(signal, SIG_IGN);
+}
+
+std::vector<std::string> WordsOfCommandLine(int inCount, char** inArguments) {
+  return {inArguments, inArguments + inCount};
+}
+
+}  // namespace lyra
