@@ -134,7 +134,8 @@ void BodyPair::FindDeepest(std::size_t inSide) {
   for (const Sample& start : starts) {
     if (!start.depth.foot.IsFound()) continue;
     const double scale = std::max(start.depth.value, options_.tolerance);
-    const Sample top = Climb(start, 0.5 * scale, 150);
+    Sample top = Climb(start, 0.5 * scale, 150);
+    DeepenAlongEdge(top);
     if (top.depth.value > best_.depth.value) best_ = top;
   }
 }

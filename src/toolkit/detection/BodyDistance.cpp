@@ -7,6 +7,7 @@ namespace ZORDetection {
 namespace {
 
 constexpr int kMaxAlternations = 12;
+constexpr int kPlainAlternations = 4;
 constexpr int kMaxNewtonSteps = 25;
 constexpr std::size_t kMaxStarts = 40, kMaxStartsOfFaces = 3;
 constexpr double kStartsApart = 20;  // in errors of the triangles
@@ -220,12 +221,14 @@ bool BodyPair::StepToTangency(const Sample& inStart, Sample& outSample) {
          outSample.depth.value >= inStart.depth.value;
 }
 
-/// Feet on one body and the other in turn come closer with each step.
+/// Feet on one body and the other in turn come closer with each step: slowly where the bodies are nearly
+/// parallel, so that several steps at once are tried then.
 void BodyPair::Alternate(gp_XYZ inFirst) {
   Side &a = sides_[0], &b = sides_[1];
-  double last = std::numeric_limits<double>::infinity();
+  double last = kInfinity;
   const auto go = [&](int steps) {
     for (int step = 0; step < steps; ++step) {
+      const gp_XYZ before = inFirst;
       const BodyFoot onB = b.probe.Nearest(Moved(b.thisFromCommon, inFirst));
       if (!onB.IsFound()) return true;
       const gp_XYZ second = Moved(b.commonFromThis, onB.foot.point);
@@ -236,6 +239,7 @@ void BodyPair::Alternate(gp_XYZ inFirst) {
       if (onA.distance >= last - 1e-12 * (1 + onA.distance)) return true;
       last = onA.distance;
       if (distance_ < 1e-12) return true;
+      if (step % kPlainAlternations == kPlainAlternations - 1) Leap(inFirst, inFirst - before);
     }
     return false;
   };
@@ -245,6 +249,22 @@ void BodyPair::Alternate(gp_XYZ inFirst) {
     if (go(3)) break;
   }
   go(200);
+}
+
+/// Goes on along a step, twice as far each time, as long as that comes closer.
+void BodyPair::Leap(gp_XYZ& ioFirst, const gp_XYZ& inStep) {
+  Side &a = sides_[0], &b = sides_[1];
+  const gp_XYZ start = ioFirst;
+  double nearest = b.probe.Nearest(Moved(b.thisFromCommon, start)).distance;
+  for (double times = 2; times < 1e6; times *= 2) {
+    const BodyFoot onA = a.probe.Nearest(start + inStep * times);
+    if (!onA.IsFound()) return;
+    const BodyFoot onB = b.probe.Nearest(Moved(b.thisFromCommon, onA.foot.point));
+    if (!(onB.distance < nearest)) return;
+    nearest = onB.distance;
+    ioFirst = onA.foot.point;
+    KeepDistance(ioFirst, Moved(b.commonFromThis, onB.foot.point));
+  }
 }
 
 void BodyPair::FindDistance() {
@@ -270,6 +290,7 @@ void BodyPair::FindDistance() {
     const BodyFoot start = a.probe.Nearest(near.closest[0]);
     if (start.IsFound()) Alternate(start.foot.point);
   }
+  if (std::isfinite(distance_) && distance_ > gap_) ApproachAlongEdges();
 }
 
 std::optional<Verdict> BodyPair::DistanceVerdict() {

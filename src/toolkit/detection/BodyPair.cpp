@@ -118,6 +118,10 @@ std::optional<Verdict> BodyPair::JudgeTouching() {
     ClimbFromBestOfFaces();
     isClash = hasClash();
   }
+  if (!isClash) {
+    ClimbAlongEdges();
+    isClash = hasClash();
+  }
   if (isClash) {
     best_ = *std::ranges::max_element(samples_, deeper);
     FindDeepest(0);

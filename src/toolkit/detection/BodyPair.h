@@ -71,6 +71,18 @@ class BodyPair {
     const Body& body() const { return probe.Of(); }
   };
 
+  /// A place on the border of a face.
+  struct BorderPlace {
+    std::size_t side = 0;
+    std::uint32_t face = 0;
+    int edge = 0;
+    double parameter = 0;
+  };
+  struct DeepPlace {
+    gp_XYZ point;  ///< in the common frame
+    double depth = 0;
+  };
+
   // Search for near triangles.
   void CollectNear();
   void MeetLeaves(const TriangleTree::Node& inFirst, const TriangleTree::Node& inSecond);
@@ -103,9 +115,18 @@ class BodyPair {
   bool IsContained(std::size_t inSide) const;
   void FindDistance();
   void Alternate(gp_XYZ inFirst);
+  void Leap(gp_XYZ& ioFirst, const gp_XYZ& inStep);
   bool Polish(gp_XYZ& ioFirst);
   void KeepDistance(const gp_XYZ& inFirst, const gp_XYZ& inSecond);
   std::optional<Verdict> DistanceVerdict();
+
+  // Along borders, in BodyEdges.cpp.
+  DeepPlace DeepestAlong(const BorderPlace& inPlace, double inStep, double inWanted);
+  std::optional<BorderPlace> BorderAt(std::size_t inSide, std::uint32_t inTriangle,
+                                      const gp_XYZ& inCommonPoint) const;
+  void ClimbAlongEdges();
+  void DeepenAlongEdge(Sample& ioSample);
+  void ApproachAlongEdges();
 
   // Curves, in InterferenceCurve.cpp.
   void AddCrossingCurve(Verdict& ioVerdict);

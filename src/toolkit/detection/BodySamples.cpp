@@ -140,11 +140,14 @@ Sample BodyPair::SampleAt(std::size_t inSide, const gp_XYZ& inCommonPoint) {
   return sample;
 }
 
-/// Compass search over the boundary. The compass turns, so that it also finds its way along ridges.
+/// Compass search over the boundary. The compass turns, so that it also finds its way along ridges; where
+/// it stops at a finer step it has come along one, and goes on in that direction (Hooke, Jeeves: Direct
+/// search, 1961).
 Sample BodyPair::Climb(Sample inStart, double inStep, int inMaxTries) {
   constexpr int kTurns = 8;
   constexpr double kTurn = 0.35, kStretch = 1.6;
   Sample best = inStart;
+  gp_XYZ lastStop = best.point;
   double step = inStep, offset = 0;
   while (step > kFinestStep && inMaxTries > 0) {
     const gp_XYZ normal = best.normal.Modulus() > 0 ? best.normal : gp_XYZ(0, 0, 1);
@@ -162,6 +165,13 @@ Sample BodyPair::Climb(Sample inStart, double inStep, int inMaxTries) {
     if (isBetter) {
       step *= kStretch;
       continue;
+    }
+    const gp_XYZ start = best.point, way = start - lastStop;
+    lastStop = start;
+    for (double times = 1; way.Modulus() > 0 && inMaxTries > 0; times *= 2, --inMaxTries) {
+      const Sample next = SampleAt(best.side, start + way * times);
+      if (!next.depth.foot.IsFound() || next.depth.value <= best.depth.value + 1e-9) break;
+      best = next;
     }
     step *= 0.5;
     offset += kTurn;

@@ -33,11 +33,11 @@ class FaceTool {
   /// @param inGuess where on the surface to begin.
   FaceFoot Foot(const gp_XYZ& inPoint, const gp_XY& inGuess);
 
-  /// From a point to the nearest of the face's edges but its seams; infinite without any.
-  double BorderDistance(const gp_XYZ& inPoint) {
+  /// The foot on the nearest of the face's edges but its seams; infinitely far away without any.
+  FaceFoot BorderFoot(const gp_XYZ& inPoint) {
     FaceFoot foot;
     TryEdges(inPoint, false, foot);
-    return foot.distance;
+    return foot;
   }
 
   /// The foot on the surface, wherever the trims are.

@@ -122,7 +122,7 @@ bool BodyPair::IsBorderOnOther(std::size_t inSide, const gp_XYZ& inLocal) {
   const BodyFoot foot = other.probe.Nearest(there, 2 * gap);
   if (foot.distance > gap) return false;
   // A border on a border is counted with the first body's.
-  return inSide == 0 || other.probe.Tool(foot.face).BorderDistance(there) > gap;
+  return inSide == 0 || other.probe.Tool(foot.face).BorderFoot(there).distance > gap;
 }
 
 void BodyPair::AddChordOnOther(std::size_t inSide, const BRepAdaptor_Curve& inCurve,
