@@ -18,8 +18,4 @@ void PrepareStreams() {
   for (const int signal : {SIGPIPE, SIGXFSZ}) std::signal(signal, SIG_IGN);
 }
 
-std::vector<std::string> WordsOfCommandLine(int inCount, char** inArguments) {
-  return {inArguments, inArguments + inCount};
-}
-
 }  // namespace lyra

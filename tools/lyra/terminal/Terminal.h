@@ -3,8 +3,6 @@
 #define ZOR_TOOLS_LYRA_TERMINAL_TERMINAL_H
 
 #include <cstdio>
-#include <string>
-#include <vector>
 
 namespace lyra {
 
@@ -16,9 +14,6 @@ int TerminalWidth(std::FILE* inStream);
 /// Bytes pass through the standard streams as they are, a console takes them for UTF-8, and a reader
 /// that goes away, or a file that may not grow any further, shows as a failed write.
 void PrepareStreams();
-
-/// The words of the command line in UTF-8.
-std::vector<std::string> WordsOfCommandLine(int inCount, char** inArguments);
 
 }  // namespace lyra
 

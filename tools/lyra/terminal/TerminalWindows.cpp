@@ -3,8 +3,6 @@
 
 #include "foundation/WindowsCalls.h"
 #include "lyra/terminal/Terminal.h"
-// After the types that it needs.
-#include <shellapi.h>
 
 namespace lyra {
 namespace {
@@ -33,17 +31,6 @@ void PrepareStreams() {
   const HANDLE console = HandleOf(stdout);
   if (GetConsoleMode(console, &mode) != FALSE)
     SetConsoleMode(console, mode | ENABLE_VIRTUAL_TERMINAL_PROCESSING);
-}
-
-// The narrow words have lost what the ANSI code page lacks.
-std::vector<std::string> WordsOfCommandLine(int inCount, char** inArguments) {
-  int count = 0;
-  LPWSTR* const words = CommandLineToArgvW(GetCommandLineW(), &count);
-  if (words == nullptr) return {inArguments, inArguments + inCount};
-  std::vector<std::string> texts;
-  for (int i = 0; i < count; ++i) texts.push_back(ZORFoundation::Utf8Text(words[i]));
-  LocalFree(words);
-  return texts;
 }
 
 }  // namespace lyra
