@@ -176,13 +176,27 @@ void Browser::Key(const std::string& inKey) {
 
 void Browser::Type(const std::string& inText) { Send("Input.insertText", {{"text", inText}}); }
 
+/// The middle of an element that was brought into view. Pictures that come into view load only then, and
+/// move what stands below them.
+constexpr const char* kPlaceOf = R"(async selector => {
+    const element = document.querySelector(selector);
+    element.scrollIntoView({block: 'center', behavior: 'instant'});
+    const isLoading = image => !image.complete &&
+        image.getBoundingClientRect().bottom > 0 && image.getBoundingClientRect().top < innerHeight;
+    let last = '';
+    for (let frame = 0, still = 0; frame < 600 && still < 3; ++frame) {
+      await new Promise(requestAnimationFrame);
+      const box = element.getBoundingClientRect();
+      const now = [box.x, box.y, box.width, box.height].join();
+      still = now === last && ![...document.images].some(isLoading) ? still + 1 : 0;
+      last = now;
+    }
+    const box = element.getBoundingClientRect();
+    return [box.x + box.width / 2, box.y + box.height / 2];
+  })";
+
 void Browser::Click(const std::string& inSelector) {
-  const json place = Value(
-      "(() => { const e = document.querySelector(" + json(inSelector).dump() +
-      "); e.scrollIntoView({block: 'center', behavior: 'instant'});"
-      "return new Promise(done => requestAnimationFrame(() => requestAnimationFrame(() => {"
-      "const b = e.getBoundingClientRect(); done([b.x + b.width / 2, b.y + b.height / 2]); })));"
-      "})()");
+  const json place = Value(std::string("(") + kPlaceOf + ")(" + json(inSelector).dump() + ")");
   Send("Input.dispatchMouseEvent", MouseAt("mousePressed", place[0], place[1], 1));
   Send("Input.dispatchMouseEvent", MouseAt("mouseReleased", place[0], place[1], 0));
 }

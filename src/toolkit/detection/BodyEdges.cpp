@@ -9,8 +9,8 @@ namespace {
 constexpr double kGolden = 0.381966011250105;
 constexpr double kFinest = 1e-7;  // millimetres along a border; the depth changes by no more
 constexpr int kMaxDoublings = 24;
-constexpr int kMaxSteps = 60;
-constexpr std::size_t kMaxClimbs = 24, kMaxClimbsOfEdge = 3;
+constexpr int kMaxBrentSteps = 60;
+constexpr std::size_t kMaxEdgeClimbs = 24, kMaxClimbsOfEdge = 3;
 constexpr double kNearBorder = 0.5;  // in depths
 
 struct Maximum {
@@ -46,7 +46,7 @@ Maximum MaximumAround(double inAt, double inStep, double inTolerance, const Func
   if (!inIsWorth(value, high - low)) return {middle, value};
   double second = middle, third = middle, secondValue = value, thirdValue = value;
   double step = 0, stepBefore = 0;
-  for (int i = 0; i < kMaxSteps && high - low > 2 * inTolerance; ++i) {
+  for (int i = 0; i < kMaxBrentSteps && high - low > 2 * inTolerance; ++i) {
     double offset = 0;
     bool isParabolic = false;
     if (std::abs(stepBefore) > inTolerance) {
@@ -152,7 +152,7 @@ void BodyPair::ClimbAlongEdges() {
   std::map<std::array<std::size_t, 3>, std::size_t> climbsOf;
   std::size_t climbs = 0;
   for (const NearTriangles& near : near_) {
-    if (near.lower > gap_ || climbs >= kMaxClimbs) break;
+    if (near.lower > gap_ || climbs >= kMaxEdgeClimbs) break;
     std::array<gp_XYZ, 2> ends = near.closest;
     if (near.distance == 0) {
       const auto crossing =
