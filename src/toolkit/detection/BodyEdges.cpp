@@ -205,11 +205,11 @@ void BodyPair::ApproachAlongEdges() {
             .point;
     const BodyFoot there = other.probe.Nearest(Moved(other.thisFromCommon, point));
     if (!there.IsFound()) continue;
-    const gp_XYZ onOther = Moved(other.commonFromThis, there.foot.point);
+    const gp_XYZ opposite = Moved(other.commonFromThis, there.foot.point);
     if (side == 0)
-      KeepDistance(point, onOther);
+      KeepDistance(point, opposite);
     else
-      KeepDistance(onOther, point);
+      KeepDistance(opposite, point);
   }
 }
 

@@ -7,9 +7,7 @@
 namespace ZORToolkit {
 
 /// Of this process with all its threads, since it was started, in seconds.
-inline double ProcessorSeconds() {
-  return static_cast<double>(std::clock()) / CLOCKS_PER_SEC;
-}
+inline double ProcessorSeconds() { return static_cast<double>(std::clock()) / CLOCKS_PER_SEC; }
 
 }  // namespace ZORToolkit
 
