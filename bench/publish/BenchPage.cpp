@@ -80,9 +80,9 @@ double ProcessorTimeOfDescendants() {
 }
 
 Turning Turn(Browser& ioBrowser, double inSeconds) {
-  const auto frames = [&](double inFor) {
+  const auto frames = [&](double inDuration) {
     std::string text = kTurn;
-    return ioBrowser.Value(text.replace(text.find("SECONDS"), 7, std::to_string(inFor)));
+    return ioBrowser.Value(text.replace(text.find("SECONDS"), 7, std::to_string(inDuration)));
   };
   frames(1.5);  // by which it is found out how coarse they must be
   const double before = ProcessorTimeOfDescendants();
