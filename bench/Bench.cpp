@@ -14,7 +14,7 @@
 #include "Measurement.h"
 #include "Results.h"
 #include "StartTimes.h"
-#include "foundation/ScratchFolder.h"
+#include "foundation/TemporaryFile.h"
 
 namespace {
 namespace fs = std::filesystem;

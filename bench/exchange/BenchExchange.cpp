@@ -18,7 +18,7 @@
 
 #include "ChildProcess.h"
 #include "ClashDocumentGenerator.h"
-#include "foundation/ScratchFolder.h"
+#include "foundation/TemporaryFile.h"
 
 namespace fs = std::filesystem;
 

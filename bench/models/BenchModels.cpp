@@ -13,7 +13,7 @@
 #include "ResultHash.h"
 #include "default_platform/OpenModel.h"
 #include "default_platform/PartMesh.h"
-#include "foundation/ScratchFolder.h"
+#include "foundation/TemporaryFile.h"
 
 namespace {
 namespace fs = std::filesystem;

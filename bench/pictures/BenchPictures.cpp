@@ -19,7 +19,7 @@
 
 #include "ChildProcess.h"
 #include "PictureScenes.h"
-#include "foundation/ScratchFolder.h"
+#include "foundation/TemporaryFile.h"
 #include "platform/visualisation/ZORPrint3DRepImage.h"
 
 namespace fs = std::filesystem;

@@ -20,7 +20,7 @@
 
 #include "ChildProcess.h"
 #include "ResultHash.h"
-#include "foundation/ScratchFolder.h"
+#include "foundation/TemporaryFile.h"
 #include "publish/PhaseTimes.h"
 #include "publish/RepeatedResult.h"
 #include "support/ResultOnModel.h"

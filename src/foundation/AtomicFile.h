@@ -2,57 +2,18 @@
 #ifndef ZOR_FOUNDATION_ATOMICFILE_H
 #define ZOR_FOUNDATION_ATOMICFILE_H
 
-#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
 
 #include "foundation/Descriptor.h"
-#include "foundation/TerminationSignals.h"
+#include "foundation/TemporaryFile.h"
 
 namespace ZORFoundation {
 
-/// A new file under a unique name, removed by the destructor or when a termination signal ends the
-/// process. Raises FileError.
-class ZOR_FOUNDATION_EXPORT TemporaryFile {
- public:
-  /// @param inMode permissions, subject to the umask.
-  /// @param inReportedPath the path that a FileError names in place of the temporary one.
-  TemporaryFile(const std::string& inFolder, unsigned int inMode,
-                const std::string& inReportedPath);
-  ~TemporaryFile();
-  TemporaryFile(const TemporaryFile&) = delete;
-  TemporaryFile& operator=(const TemporaryFile&) = delete;
-
-  const std::string& Path() const { return path_; }
-  /// A path to the same file that is valid UTF-8 whatever the folder's name, for as long as this
-  /// lives.
-  std::string Utf8Path() const;
-  /// Open for reading and writing.
-  int Descriptor() const { return descriptor_; }
-
-  void Write(std::string_view inBytes);
-  /// Switches to whatever file now has this path, in case a writer replaced it.
-  /// @return the descriptor.
-  int Reopen();
-  /// Nothing more is written; the file stays.
-  void Close();
-  /// The file has been renamed and is no longer this object's to remove.
-  void Release() { path_.clear(); }
-
-  /// Whether a file name, without its folder, is of the form that this class generates.
-  static bool IsTemporaryName(std::string_view inName);
-
- private:
-  std::string reportedPath_;
-  std::string path_;  // empty once released
-  std::optional<RemoveOnSignal> removeOnSignal_;
-  int descriptor_ = -1;
-};
-
 struct AtomicFileOptions {
-  unsigned int modeOfNew =
-      0666;                ///< permissions of a file that did not exist; subject to the umask
+  /// Permissions of a file that did not exist; subject to the umask.
+  unsigned int modeOfNew = 0666;
   bool mayReplace = true;  ///< otherwise an existing file is refused (EEXIST)
   /// Flush the bytes to disk before the rename. Not worth the wait for what can be made again.
   bool isSynchronised = true;
@@ -84,10 +45,13 @@ class ZOR_FOUNDATION_EXPORT AtomicFile {
   void Commit();
 
  private:
+  // Those of each system.
+  static std::string FollowLinks(const std::string& inPath);
   void CheckTarget();
   bool KeepAttributes(int inDescriptor) const;
-  void OverwriteTarget(int inDescriptor) const;
   void Rename();
+
+  void OverwriteTarget(int inDescriptor) const;
   void CopyIntoTarget() const;
 
   std::string path_;    // as given

@@ -21,6 +21,10 @@ struct FileStamp {
 /// @return nothing when there is no such file.
 ZOR_FOUNDATION_EXPORT std::optional<FileStamp> StampOfFile(const std::string& inPath);
 
+/// @param inName what a FileError names.
+/// @return that of an open file. On Windows, of what is no file, that of nothing.
+ZOR_FOUNDATION_EXPORT FileStamp StampOfOpen(int inDescriptor, const std::string& inName);
+
 /// @return nanoseconds since 1970, of the clock that file stamps are taken from.
 ZOR_FOUNDATION_EXPORT std::int64_t FileClockNow();
 

@@ -1,7 +1,3 @@
-// The files of Windows: what ReadWholeFile.cpp is elsewhere, for stamps and for opening.
-#include <io.h>
-
-#include <algorithm>
 #include <cerrno>
 
 #include "foundation/ReadWholeFile.h"
@@ -30,14 +26,6 @@ std::optional<FileStamp> StampOf(HANDLE inFile) {
                    Nanoseconds(basic.ChangeTime.QuadPart)};
 }
 
-FileStamp StampOfOpen(int inDescriptor) {
-  return StampOf(HandleOf(inDescriptor)).value_or(FileStamp());
-}
-
-void CheckSize(std::uint64_t inSize, std::uint64_t inMaxSize, const std::string& inPath) {
-  if (inSize > inMaxSize) throw FileError(inPath, EFBIG);
-}
-
 }  // namespace
 
 std::optional<FileStamp> StampOfFile(const std::string& inPath) {
@@ -49,6 +37,10 @@ std::optional<FileStamp> StampOfFile(const std::string& inPath) {
   const auto stamp = StampOf(file);
   CloseHandle(file);
   return stamp;
+}
+
+FileStamp StampOfOpen(int inDescriptor, const std::string& /*inName*/) {
+  return StampOf(HandleOf(inDescriptor)).value_or(FileStamp());
 }
 
 std::int64_t FileClockNow() {
@@ -88,50 +80,6 @@ Descriptor OpenCut(const std::string& inPath, std::uint64_t inSize) {
 
 std::FILE* OpenStream(const std::string& inPath) {
   return _wfopen(WidePath(inPath).c_str(), L"wb");
-}
-
-std::size_t ReadSome(int inDescriptor, void* outBytes, std::size_t inMax,
-                     const std::string& inName) {
-  constexpr std::size_t kMost = 1 << 30;
-  const int count = _read(inDescriptor, outBytes, static_cast<unsigned>(std::min(inMax, kMost)));
-  if (count < 0) throw FileError(inName, errno);
-  return static_cast<std::size_t>(count);
-}
-
-void Rewind(int inDescriptor, const std::string& inName) {
-  if (_lseeki64(inDescriptor, 0, SEEK_SET) != 0) throw FileError(inName, errno);
-}
-
-std::string ReadToEnd(int inDescriptor, const std::string& inName, std::uint64_t inMaxSize) {
-  std::string bytes;
-  // Growing step by step would copy large files several times.
-  if (const std::uint64_t size = StampOfOpen(inDescriptor).size; size > 0) {
-    CheckSize(size, inMaxSize, inName);
-    bytes.reserve(static_cast<std::size_t>(size));
-  }
-  char part[1 << 16];
-  while (const std::size_t count = ReadSome(inDescriptor, part, sizeof part, inName)) {
-    bytes.append(part, count);
-    CheckSize(bytes.size(), inMaxSize, inName);
-  }
-  return bytes;
-}
-
-WholeFile ReadWholeFile(const std::string& inPath, const ReadOptions& inOptions) {
-  const Descriptor file = OpenForReading(inPath, inOptions.mayBeStream);
-  WholeFile whole;
-  whole.before = StampOfOpen(file.Get());
-  whole.bytes = ReadToEnd(file.Get(), inPath, inOptions.maxSize);
-  whole.after = StampOfOpen(file.Get());
-  return whole;
-}
-
-std::optional<WholeFile> TryReadWholeFile(const std::string& inPath, const ReadOptions& inOptions) {
-  try {
-    return ReadWholeFile(inPath, inOptions);
-  } catch (const FileError&) {
-    return std::nullopt;
-  }
 }
 
 }  // namespace ZORFoundation

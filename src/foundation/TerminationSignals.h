@@ -41,7 +41,9 @@ class ZOR_FOUNDATION_EXPORT StopRequest {
   StopRequest(const StopRequest&) = delete;
   StopRequest& operator=(const StopRequest&) = delete;
 
-  bool IsMade() const;
+  /// @return the signal; 0 before one came.
+  int Recorded() const;
+  bool IsMade() const { return Recorded() != 0; }
   /// Raises Interrupted once a signal was recorded.
   void Check() const;
 };

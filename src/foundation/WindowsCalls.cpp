@@ -98,6 +98,11 @@ int ErrorNumberOf(unsigned long inError) {
   return found == kErrorNumbers.end() ? EIO : found->second;
 }
 
+bool IsInUse(unsigned long inError) {
+  return inError == ERROR_SHARING_VIOLATION || inError == ERROR_ACCESS_DENIED ||
+         inError == ERROR_UNABLE_TO_REMOVE_REPLACED || inError == ERROR_USER_MAPPED_FILE;
+}
+
 int OpenShared(const std::string& inPath, const OpenRequest& inRequest) {
   const HANDLE handle = CreateFileW(WidePath(inPath).c_str(), inRequest.access,
                                     FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,

@@ -23,6 +23,9 @@ ZOR_FOUNDATION_EXPORT std::wstring WidePath(const std::string& inPath);
 /// The errno value for an error of Windows.
 ZOR_FOUNDATION_EXPORT int ErrorNumberOf(unsigned long inError);
 
+/// Whether a call failed because another program has the file open.
+ZOR_FOUNDATION_EXPORT bool IsInUse(unsigned long inError);
+
 struct OpenRequest {
   unsigned long access = GENERIC_READ;
   unsigned long disposition = OPEN_EXISTING;

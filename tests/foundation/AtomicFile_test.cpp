@@ -15,9 +15,11 @@
 #include <optional>
 #include <thread>
 
+#include "support/FileErrors.h"
 #include "support/PlatformFolder.h"
 
 namespace fs = std::filesystem;
+using support::CodeOf;
 using support::ReadFile;
 using support::TemporaryFolder;
 using ZORFoundation::AtomicFile;
@@ -36,16 +38,6 @@ struct stat StatusOf(const std::string& inPath) {
 }
 
 unsigned int ModeOf(const std::string& inPath) { return StatusOf(inPath).st_mode & 07777U; }
-
-/// The errno value with which something fails; 0 when it does not.
-int CodeOf(const std::function<void()>& inAct) {
-  try {
-    inAct();
-    return 0;
-  } catch (const FileError& error) {
-    return error.Code();
-  }
-}
 
 rlimit FileSizeLimit(rlim_t inBytes) { return {inBytes, inBytes}; }
 

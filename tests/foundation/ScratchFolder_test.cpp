@@ -1,9 +1,9 @@
-#include "foundation/ScratchFolder.h"
-
 #include <gtest/gtest.h>
 
 #include <filesystem>
 #include <fstream>
+
+#include "foundation/TemporaryFile.h"
 
 namespace fs = std::filesystem;
 

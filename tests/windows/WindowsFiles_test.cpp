@@ -6,18 +6,20 @@
 #include <filesystem>
 
 #include "foundation/AtomicFile.h"
-#include "foundation/Environment.h"
 #include "foundation/PluginLoader.h"
+#include "foundation/Process.h"
 #include "foundation/ReadWholeFile.h"
 #include "foundation/WindowsCalls.h"
 #include "platform/system/ZORDocumentLocation.h"
 #include "platform/system/ZORFile.h"
 #include "platform/system/ZORGetEnv.h"
 #include "platform/system/ZORMsgCatalog.h"
+#include "support/FileErrors.h"
 #include "support/PlatformFolder.h"
 
 namespace fs = std::filesystem;
 using namespace ZORFoundation;
+using support::CodeOf;
 using support::TemporaryFolder;
 
 namespace {
@@ -25,15 +27,6 @@ namespace {
 const std::string kJapaneseAndEmoji = "\u5E72\u6E09\U0001F680";
 
 std::string Read(const std::string& inPath) { return ReadWholeFile(inPath).bytes; }
-
-int CodeOf(const std::function<void()>& inAct) {
-  try {
-    inAct();
-    return 0;
-  } catch (const FileError& error) {
-    return error.Code();
-  }
-}
 
 /// A file that is open as other programs open files.
 class OpenElsewhere {

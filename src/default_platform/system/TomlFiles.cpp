@@ -4,9 +4,9 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <filesystem>
 #include <optional>
 
-#include "default_platform/system/SettingPlaces.h"
 #include "foundation/PluginLoader.h"
 #include "foundation/TomlNesting.h"
 #include "platform/system/ZORGetEnv.h"
@@ -33,6 +33,11 @@ std::optional<TomlValue> ValueOf(const toml::node& inNode) {
   return std::nullopt;
 }
 
+constexpr bool kIsWindows = std::filesystem::path::preferred_separator == '\\';
+
+/// Between the directories of a list in the environment. On Windows a colon follows a drive's letter.
+constexpr char kListSeparator = kIsWindows ? ';' : ':';
+
 std::string_view Variable(const char* inName) {
   const char* const value = ZORGetEnv(inName);
   return value ? value : "";
@@ -41,9 +46,9 @@ std::string_view Variable(const char* inName) {
 // Empty parts are no directories: "a::b" is a and b where the colon separates.
 void AppendList(std::string_view inList, std::vector<std::string>& ioDirectories) {
   while (!inList.empty()) {
-    const std::size_t colon = std::min(inList.find(kListSeparator), inList.size());
-    if (colon > 0) ioDirectories.emplace_back(inList.substr(0, colon));
-    inList.remove_prefix(std::min(colon + 1, inList.size()));
+    const std::size_t end = std::min(inList.find(kListSeparator), inList.size());
+    if (end > 0) ioDirectories.emplace_back(inList.substr(0, end));
+    inList.remove_prefix(std::min(end + 1, inList.size()));
   }
 }
 
@@ -59,6 +64,16 @@ std::string FindInstalledResources() {
 const std::string& InstalledResources() {
   static const std::string directory = FindInstalledResources();
   return directory;
+}
+
+// The user's own settings; empty when there is no place for them. Elsewhere than on Windows by the
+// rules of XDG base directories: a relative path in XDG_CONFIG_HOME is ignored.
+std::string UserSettingDirectory() {
+  const std::string_view configuration = Variable(kIsWindows ? "APPDATA" : "XDG_CONFIG_HOME");
+  if (kIsWindows ? !configuration.empty() : configuration.starts_with('/'))
+    return std::string(configuration) + "/zorlyra";
+  const std::string_view home = kIsWindows ? "" : Variable("HOME");
+  return home.empty() ? std::string() : std::string(home) + "/.config/zorlyra";
 }
 
 std::vector<std::string> SettingDirectories() {

@@ -4,7 +4,7 @@
 #include <string_view>
 
 #include "default_platform/system/TomlFiles.h"
-#include "foundation/Environment.h"
+#include "foundation/Process.h"
 #include "platform/system/ZORGetEnv.h"
 
 namespace {

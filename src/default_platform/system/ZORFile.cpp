@@ -1,87 +1,126 @@
-// Opening and copying files, over POSIX; ZORFileWindows.cpp takes this file's place on Windows.
 #include "platform/system/ZORFile.h"
 
-#include <fcntl.h>
-#include <sys/stat.h>
-#include <unistd.h>
-
 #include <cerrno>
+#include <cstring>
+#include <optional>
 #include <string>
-#include <string_view>
 
-#include "default_platform/system/FileResult.h"
+#include "default_platform/system/FileOperations.h"
 #include "foundation/AtomicFile.h"
 #include "foundation/Descriptor.h"
-#include "foundation/Utf8.h"
+#include "foundation/ReadWholeFile.h"
 
 namespace {
 
+using ZORDefault::FileMode;
 using ZORFoundation::Descriptor;
+using ZORFoundation::FileStamp;
 
-// The file system's bytes of a wide path; empty when it is no text.
-std::string NarrowPath(const wchar_t* inPath) {
-  std::string narrow;
-  for (; inPath && *inPath; ++inPath) {
-    const char32_t character = static_cast<char32_t>(*inPath);
-    if (character > 0x10FFFF || (character >= 0xD800 && character <= 0xDFFF)) return std::string();
-    char bytes[4];
-    narrow.append(bytes, ZORFoundation::EncodeCharacter(character, bytes));
-  }
-  return narrow;
+constexpr std::size_t kPathRoom = 260;
+
+bool EndsInSeparator(const std::string& inDirectory) {
+  constexpr std::string_view kSeparators = ZORDefault::kPathSeparator == '/' ? "/" : "/\\";
+  return kSeparators.find(inDirectory.back()) != std::string_view::npos;
 }
 
-bool IsSameFile(const struct stat& inStatus, const std::string& inPath) {
-  struct stat other;
-  return stat(inPath.c_str(), &other) == 0 && other.st_dev == inStatus.st_dev &&
-         other.st_ino == inStatus.st_ino;
+std::optional<FileMode> ModeOf(std::string_view inMode) {
+  if (inMode == "rb") return FileMode::kRead;
+  if (inMode == "wb") return FileMode::kReplace;
+  if (inMode == "ab") return FileMode::kAppend;
+  return std::nullopt;
 }
 
-int OpenFlags(std::string_view inMode) {
-  if (inMode == "rb") return O_RDONLY;
-  if (inMode == "wb") return O_WRONLY | O_CREAT | O_TRUNC;
-  if (inMode == "ab") return O_WRONLY | O_CREAT | O_APPEND;
-  return -1;
+bool IsSameFile(const FileStamp& inStamp, const std::string& inPath) {
+  const auto other = ZORFoundation::StampOfFile(inPath);
+  return other && other->device == inStamp.device && other->inode == inStamp.inode;
 }
 
 }  // namespace
 
-int ZORFileAccess(const char* inPath, int inMode) {
-  if (!inPath || (inMode & ~6) != 0) return -1;
-  const int read = inMode & 4 ? R_OK : 0;
-  const int write = inMode & 2 ? W_OK : 0;
-  return access(inPath, F_OK | read | write);
+HRESULT ZORDefault::FileResultOf(int inError) {
+  switch (inError) {
+    case ENOENT:
+      return kZORFileNotFound;
+    case EACCES:
+    case EPERM:
+    case EROFS:
+      return kZORFileAccessDenied;
+    case EEXIST:
+      return kZORFileExists;
+    case ENOSPC:
+#ifdef EDQUOT
+    case EDQUOT:
+#endif
+    case EFBIG:  // the process may write no larger file: no room, for its purposes
+      return kZORFileDiskFull;
+    case ENOTDIR:
+    case ENAMETOOLONG:
+    case ELOOP:
+      return kZORFileBadPath;
+    case EISDIR:
+      return kZORFileIsDirectory;
+    default:
+      return E_FAIL;
+  }
 }
 
 HRESULT ZORFOpen(const wchar_t* inPath, const char* inMode, int* outDescriptor) {
   if (!inPath || !inMode || !outDescriptor) return E_INVALIDARG;
-  const int flags = OpenFlags(inMode);
-  if (flags < 0) return E_INVALIDARG;
-  const std::string path = NarrowPath(inPath);
+  const std::optional<FileMode> mode = ModeOf(inMode);
+  if (!mode) return E_INVALIDARG;
+  const std::string path = ZORDefault::NarrowPath(inPath);
   if (path.empty()) return kZORFileBadPath;
-  Descriptor file(open(path.c_str(), flags | O_CLOEXEC, 0666));
-  if (!file.IsOpen()) return ZORDefault::FileResultOf(errno);
-  struct stat status;
-  if (fstat(file.Get(), &status) == 0 && S_ISDIR(status.st_mode)) return kZORFileIsDirectory;
-  *outDescriptor = file.Release();
+  const int descriptor = ZORDefault::OpenFile(path, *mode);
+  if (descriptor < 0) return ZORDefault::FileResultOf(errno);
+  *outDescriptor = descriptor;
   return S_OK;
+}
+
+HRESULT ZORFWrite(int inDescriptor, const void* inBytes, std::size_t inCount,
+                  std::size_t* outWritten) {
+  std::size_t unused = 0;
+  std::size_t& written = outWritten ? *outWritten : unused;
+  written = 0;
+  if (!inBytes && inCount > 0) return E_INVALIDARG;
+  const int error =
+      ZORFoundation::WriteAll(inDescriptor, {static_cast<const char*>(inBytes), inCount}, written);
+  return error == 0 ? S_OK : ZORDefault::FileResultOf(error);
+}
+
+HRESULT ZORFClose(int inDescriptor) {
+  const int error = ZORFoundation::CloseDescriptor(inDescriptor);
+  return error == 0 ? S_OK : ZORDefault::FileResultOf(error);
 }
 
 HRESULT ZORFCopy(const wchar_t* inSource, const wchar_t* inTarget, int inFlags) try {
   if (!inSource || !inTarget || (inFlags != 0 && inFlags != 1)) return E_INVALIDARG;
-  const std::string sourcePath = NarrowPath(inSource);
-  const std::string targetPath = NarrowPath(inTarget);
+  const std::string sourcePath = ZORDefault::NarrowPath(inSource);
+  const std::string targetPath = ZORDefault::NarrowPath(inTarget);
   if (sourcePath.empty() || targetPath.empty()) return kZORFileBadPath;
-  const Descriptor source(open(sourcePath.c_str(), O_RDONLY | O_CLOEXEC));
-  struct stat status;
-  if (!source.IsOpen() || fstat(source.Get(), &status) != 0) return ZORDefault::FileResultOf(errno);
-  if (S_ISDIR(status.st_mode)) return kZORFileIsDirectory;
-  if (inFlags == 0 && IsSameFile(status, targetPath)) return S_OK;
+  const Descriptor source(ZORDefault::OpenFile(sourcePath, FileMode::kRead));
+  if (!source.IsOpen()) return ZORDefault::FileResultOf(errno);
+  const FileStamp stamp = ZORFoundation::StampOfOpen(source.Get(), sourcePath);
+  if (inFlags == 0 && IsSameFile(stamp, targetPath)) return S_OK;
   ZORFoundation::AtomicFile target(
-      targetPath, {.modeOfNew = status.st_mode & 0777, .mayReplace = inFlags == 0});
+      targetPath,
+      {.modeOfNew = ZORDefault::PermissionsOf(source.Get()), .mayReplace = inFlags == 0});
   const int error = ZORFoundation::CopyBytes(source.Get(), target.Temporary().Descriptor());
   if (error != 0) return ZORDefault::FileResultOf(error);
   target.Commit();
   return S_OK;
 } catch (const ZORFoundation::FileError& error) {
   return ZORDefault::FileResultOf(error.Code());
+}
+
+HRESULT ZORMakePath(const char* inDirectory, const char* inFileName, char* outPath) {
+  if (!outPath) return E_INVALIDARG;
+  *outPath = '\0';
+  if (!inDirectory || !inFileName) return E_INVALIDARG;
+  std::string path = inDirectory;
+  // No directory is the current one: a separator would make it the root.
+  if (!path.empty() && !EndsInSeparator(path)) path += ZORDefault::kPathSeparator;
+  path += inFileName;
+  if (path.size() >= kPathRoom) return E_INVALIDARG;
+  std::memcpy(outPath, path.c_str(), path.size() + 1);
+  return S_OK;
 }

@@ -1,20 +1,10 @@
-// Opening and copying files on Windows, by its wide calls.
-#include <cerrno>
-#include <string>
 #include <string_view>
 
-#include "default_platform/system/FileResult.h"
-#include "foundation/AtomicFile.h"
-#include "foundation/ReadWholeFile.h"
+#include "default_platform/system/FileOperations.h"
 #include "foundation/WindowsCalls.h"
-#include "platform/system/ZORFile.h"
 
-namespace {
+namespace ZORDefault {
 
-using ZORFoundation::Descriptor;
-using ZORFoundation::StampOfFile;
-
-/// Empty when it is no text.
 std::string NarrowPath(const wchar_t* inPath) {
   if (!inPath) return std::string();
   const std::wstring_view path = inPath;
@@ -26,17 +16,17 @@ std::string NarrowPath(const wchar_t* inPath) {
   return ZORFoundation::Utf8Text(path);
 }
 
-bool IsFolder(const std::string& inPath) {
-  const DWORD attributes = GetFileAttributesW(ZORFoundation::WidePath(inPath).c_str());
-  return attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DIRECTORY) != 0;
+int OpenFile(const std::string& inPath, FileMode inMode) {
+  if (inMode == FileMode::kRead) return ZORFoundation::OpenShared(inPath, {});
+  const bool isAppending = inMode == FileMode::kAppend;
+  const unsigned long disposition = isAppending ? OPEN_ALWAYS : CREATE_ALWAYS;
+  return ZORFoundation::OpenShared(inPath,
+                                   {GENERIC_READ | GENERIC_WRITE, disposition, isAppending});
 }
 
-bool IsSameFile(const std::string& inPath, const std::string& inOther) {
-  const auto stamp = StampOfFile(inPath), other = StampOfFile(inOther);
-  return stamp && other && stamp->device == other->device && stamp->inode == other->inode;
-}
+unsigned int PermissionsOf(int /*inDescriptor*/) { return 0; }  // a file has none here
 
-}  // namespace
+}  // namespace ZORDefault
 
 // What the access list of a file says is known for certain only once the file is opened.
 int ZORFileAccess(const char* inPath, int inMode) {
@@ -54,40 +44,4 @@ int ZORFileAccess(const char* inPath, int inMode) {
   if (file == INVALID_HANDLE_VALUE) return -1;
   CloseHandle(file);
   return 0;
-}
-
-HRESULT ZORFOpen(const wchar_t* inPath, const char* inMode, int* outDescriptor) {
-  if (!inPath || !inMode || !outDescriptor) return E_INVALIDARG;
-  const std::string_view mode = inMode;
-  ZORFoundation::OpenRequest request;
-  if (mode == "wb" || mode == "ab")
-    request = {GENERIC_READ | GENERIC_WRITE,
-               static_cast<unsigned long>(mode == "wb" ? CREATE_ALWAYS : OPEN_ALWAYS),
-               mode == "ab"};
-  else if (mode != "rb")
-    return E_INVALIDARG;
-  const std::string path = NarrowPath(inPath);
-  if (path.empty()) return kZORFileBadPath;
-  const int descriptor = ZORFoundation::OpenShared(path, request);
-  if (descriptor < 0) return ZORDefault::FileResultOf(errno);
-  *outDescriptor = descriptor;
-  return S_OK;
-}
-
-HRESULT ZORFCopy(const wchar_t* inSource, const wchar_t* inTarget, int inFlags) try {
-  if (!inSource || !inTarget || (inFlags != 0 && inFlags != 1)) return E_INVALIDARG;
-  const std::string sourcePath = NarrowPath(inSource);
-  const std::string targetPath = NarrowPath(inTarget);
-  if (sourcePath.empty() || targetPath.empty()) return kZORFileBadPath;
-  if (IsFolder(sourcePath)) return kZORFileIsDirectory;
-  const Descriptor source(ZORFoundation::OpenShared(sourcePath, {}));
-  if (!source.IsOpen()) return ZORDefault::FileResultOf(errno);
-  if (inFlags == 0 && IsSameFile(sourcePath, targetPath)) return S_OK;
-  ZORFoundation::AtomicFile target(targetPath, {.mayReplace = inFlags == 0});
-  const int error = ZORFoundation::CopyBytes(source.Get(), target.Temporary().Descriptor());
-  if (error != 0) return ZORDefault::FileResultOf(error);
-  target.Commit();
-  return S_OK;
-} catch (const ZORFoundation::FileError& error) {
-  return ZORDefault::FileResultOf(error.Code());
 }

@@ -7,7 +7,7 @@
 #include <string_view>
 #include <utility>
 
-#include "default_platform/system/FileResult.h"
+#include "default_platform/system/FileOperations.h"
 #include "default_platform/system/ObjectCounters.h"
 #include "default_platform/visualisation/Rendering.h"
 #include "foundation/AtomicFile.h"

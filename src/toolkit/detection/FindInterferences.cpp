@@ -13,8 +13,8 @@
 #include <thread>
 #include <unordered_map>
 
+#include "foundation/Process.h"
 #include "toolkit/detection/BodyPair.h"
-#include "toolkit/sharding/ProcessorTime.h"
 #include "toolkit/sharding/Shard.h"
 
 namespace ZORDetection {
@@ -307,7 +307,7 @@ class Search {
     verdicts_.resize(tasks_.Tasks().size());
     std::atomic<bool> isStopped{false};
     std::mutex progressMutex;
-    findings_.openSeconds = ZORToolkit::ProcessorSeconds();
+    findings_.openSeconds = ZORFoundation::ProcessorSeconds();
     if (options_.keep) {
       GroupPairs();
       options_.keep(findings_);
@@ -318,11 +318,12 @@ class Search {
       while (!isStopped) {
         const std::size_t place = next++;
         if (place >= chosen.size()) return;
-        const double start = ZORToolkit::ProcessorSeconds();
+        const double start = ZORFoundation::ProcessorSeconds();
         JudgeTask(chosen[place], probes, progressMutex);
         const std::lock_guard lock(progressMutex);
         findings_.judged.push_back(static_cast<std::uint32_t>(chosen[place]));
-        if (options_.tried > 0) findings_.seconds.push_back(ZORToolkit::ProcessorSeconds() - start);
+        if (options_.tried > 0)
+          findings_.seconds.push_back(ZORFoundation::ProcessorSeconds() - start);
         if (options_.keep) options_.keep(FindingsOf(chosen[place]));
         if (options_.progress && !options_.progress(findings_.judged.size(), chosen.size()))
           isStopped = true;

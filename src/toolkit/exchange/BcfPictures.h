@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-#include "foundation/ScratchFolder.h"
+#include "foundation/TemporaryFile.h"
 #include "foundation/Vector3.h"
 #include "toolkit/exchange/BcfWriter.h"
 #include "toolkit/scenes/InterferenceScenes.h"

@@ -17,9 +17,9 @@
 #include <utility>
 #include <vector>
 
+#include "foundation/Process.h"
 #include "foundation/TerminationSignals.h"
 #include "toolkit/Error.h"
-#include "toolkit/sharding/ProcessorTime.h"
 
 namespace ZORToolkit {
 namespace {
@@ -88,10 +88,10 @@ void EndWith(pid_t inParent) {
   int code = 0;
   try {
     close(inPipe.reader);
-    double last = ProcessorSeconds();
+    double last = ZORFoundation::ProcessorSeconds();
     for (std::size_t i = ioNext.Next(); i < inWork.count; i = ioNext.Next()) {
       inWork.draw(i);
-      const double now = ProcessorSeconds();
+      const double now = ZORFoundation::ProcessorSeconds();
       const double seconds = now - std::exchange(last, now);
       if (write(inPipe.writer, &seconds, sizeof seconds) != sizeof seconds || inStop.IsMade())
         break;

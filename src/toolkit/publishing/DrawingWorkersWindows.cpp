@@ -1,4 +1,5 @@
 // Windows starts no process as a copy of another: everything is drawn in this one.
+#include "foundation/Process.h"
 #include "foundation/TerminationSignals.h"
 #include "toolkit/publishing/DrawingWorkers.h"
 
@@ -6,9 +7,10 @@ namespace ZORToolkit {
 
 void DrawInProcesses(int /*inProcesses*/, const DrawingWork& inWork) {
   const ZORFoundation::StopRequest stop;
+  const double start = ZORFoundation::ProcessorSeconds();
   for (std::size_t i = 0; i < inWork.count; ++i) {
     inWork.draw(i);
-    inWork.isDone(i + 1);
+    inWork.isDone(i + 1, ZORFoundation::ProcessorSeconds() - start);
     stop.Check();
   }
 }

@@ -10,7 +10,7 @@
 #include "foundation/AtomicFile.h"
 #include "foundation/Hash.h"
 #include "foundation/ReadWholeFile.h"
-#include "foundation/ScratchFolder.h"
+#include "foundation/TemporaryFile.h"
 #include "foundation/Vector3.h"
 #include "platform/visualisation/ZOR3DRep.h"
 #include "platform/visualisation/ZORI3DGeoVisu.h"

@@ -1,6 +1,10 @@
 #include "toolkit/publishing/WorkFolder.h"
 
+#include <chrono>
+#include <thread>
 #include <vector>
+
+#include "toolkit/Error.h"
 
 namespace fs = std::filesystem;
 
@@ -33,6 +37,18 @@ WorkFolder::~WorkFolder() {
     // The next run tries again.
   }
   RemoveFolder();
+}
+
+// Waits a moment, since the processes of a publication that was killed end a little after it.
+void WorkFolder::Lock(const fs::path& inFolder) {
+  using Clock = std::chrono::steady_clock;
+  const auto end = Clock::now() + std::chrono::milliseconds(500);
+  for (;; std::this_thread::sleep_for(std::chrono::milliseconds(10))) {
+    fs::create_directory(path_);
+    if (TryLock()) return;
+    if (Clock::now() > end)
+      throw Error(inFolder.string(), "another lyra publishes into this folder");
+  }
 }
 
 void WorkFolder::RemoveFiles() const {

@@ -29,6 +29,8 @@ class WorkFolder {
  private:
   void Lock(const std::filesystem::path& inFolder);
   void RemoveFiles() const;
+  // Those of each system.
+  bool TryLock();
   void RemoveFolder();
 
   std::string path_, lockPath_;

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <array>
 
-#include "foundation/Environment.h"
+#include "foundation/Process.h"
 #include "platform/system/ZORMsgCatalog.h"
 #include "toolkit/records/DocumentText.h"
 

@@ -7,11 +7,11 @@
 #include "foundation/AtomicFile.h"
 #include "foundation/Descriptor.h"
 #include "foundation/Hash.h"
+#include "foundation/Process.h"
 #include "foundation/ReadWholeFile.h"
 #include "foundation/TerminationSignals.h"
 #include "toolkit/Error.h"
 #include "toolkit/detection/DetectionTask.h"
-#include "toolkit/sharding/ProcessorTime.h"
 
 namespace fs = std::filesystem;
 
@@ -142,7 +142,7 @@ DetectionResult GatherDetection(const std::string& inModel, DetectionOptions inO
 WorkSample SampleDetection(const std::string& inModel, DetectionOptions inOptions) {
   inOptions.tried = kTriedPairs;
   WorkSample sample = Detect(inModel, inOptions).work;
-  sample.openSeconds += ProcessorSeconds();
+  sample.openSeconds += ZORFoundation::ProcessorSeconds();
   return sample;
 }
 

@@ -8,11 +8,11 @@
 
 #include "foundation/AtomicFile.h"
 #include "foundation/Hash.h"
+#include "foundation/Process.h"
 #include "foundation/ReadWholeFile.h"
 #include "toolkit/publishing/PictureDrawing.h"
 #include "toolkit/publishing/PictureSettings.h"
 #include "toolkit/publishing/SharedDrawing.h"
-#include "toolkit/sharding/ProcessorTime.h"
 
 namespace fs = std::filesystem;
 
@@ -161,7 +161,9 @@ class DrawingOfSample : public SharedDrawing {
     tried_ = ItemsToTry(sample.costs, kTriedPictures);
     return tried_;
   }
-  void Begin(const PictureStore&) override { sample.openSeconds = ProcessorSeconds(); }
+  void Begin(const PictureStore&) override {
+    sample.openSeconds = ZORFoundation::ProcessorSeconds();
+  }
   void Drawn(std::size_t inDone, double inSeconds) override {
     const double each = (inSeconds - std::exchange(seconds_, inSeconds)) /
                         static_cast<double>(std::max<std::size_t>(1, inDone - done_));

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <span>
 
-#include "foundation/Environment.h"
+#include "foundation/Process.h"
 #include "lyra/Arguments.h"
 #include "lyra/CommandErrors.h"
 

@@ -4,7 +4,7 @@
 #include <filesystem>
 #include <memory>
 
-#include "foundation/MemoryUsed.h"
+#include "foundation/Process.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"

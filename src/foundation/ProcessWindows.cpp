@@ -3,8 +3,10 @@
 #include <set>
 #include <string>
 
-#include "foundation/Environment.h"
+#include "foundation/Process.h"
 #include "foundation/WindowsCalls.h"
+// After the types that it needs.
+#include <psapi.h>
 
 namespace ZORFoundation {
 
@@ -34,6 +36,22 @@ void WriteEnvironment(const char* inName, const char* inValue) {
   const std::wstring value = inValue == nullptr ? L"" : WideText(inValue);
   _wputenv((name + L"=" + value).c_str());
   SetEnvironmentVariableW(name.c_str(), inValue == nullptr ? nullptr : value.c_str());
+}
+
+double MegabytesUsed() {
+  PROCESS_MEMORY_COUNTERS counters{};
+  if (GetProcessMemoryInfo(GetCurrentProcess(), &counters, sizeof counters) == FALSE) return 0;
+  return static_cast<double>(counters.PeakWorkingSetSize) / (1 << 20);
+}
+
+// Not clock(), which counts the time of day here.
+double ProcessorSeconds() {
+  FILETIME started{}, ended{}, kernel{}, user{};
+  if (GetProcessTimes(GetCurrentProcess(), &started, &ended, &kernel, &user) == FALSE) return 0;
+  double seconds = 0;
+  for (const FILETIME& part : {kernel, user})
+    seconds += 429.4967296 * part.dwHighDateTime + 1e-7 * part.dwLowDateTime;  // of 100 ns
+  return seconds;
 }
 
 }  // namespace ZORFoundation

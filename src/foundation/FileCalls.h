@@ -1,0 +1,56 @@
+// What atomic and temporary files ask of the system; for the foundation's own sources. A descriptor
+// is -1, and another answer an errno value, when the call failed; errno says why in both cases.
+#ifndef ZOR_FOUNDATION_FILECALLS_H
+#define ZOR_FOUNDATION_FILECALLS_H
+
+#include <cstdint>
+#include <filesystem>
+#include <functional>
+#include <string>
+#include <string_view>
+
+#include "foundation/Descriptor.h"
+
+namespace ZORFoundation {
+
+/// Where a file's name may begin in its path: behind one of these. "C:name" is relative to the drive.
+inline constexpr std::string_view kPathSeparators =
+    std::filesystem::path::preferred_separator == '/' ? "/" : "/\\:";
+
+/// Another number at each call, in all processes; not for secrets.
+std::uint64_t UniqueNumber();
+
+/// Makes a file for reading and writing; one that exists is refused (EEXIST).
+/// @param inMode permissions, subject to the umask. Windows has none.
+int OpenNew(const std::string& inPath, unsigned int inMode);
+/// Opens a file for reading and writing, not through a link, without waiting for anybody.
+int OpenExisting(const std::string& inPath);
+/// Opens a file, device or pipe, for reading or for writing alone.
+int OpenToRead(const std::string& inPath);
+int OpenToWrite(const std::string& inPath);
+/// Opens the file that has this path now; the same descriptor when that is the open one.
+int ReopenIfReplaced(int inDescriptor, const std::string& inPath);
+/// What is raised when a file could not be opened by one of these.
+FileError WhyNotOpened(const std::string& inPath);
+
+/// A path to an open file that is valid UTF-8 for as long as it is open.
+std::string Utf8PathOf(int inDescriptor, const std::string& inPath);
+
+/// Ends an open file where it was last written.
+int CutHere(int inDescriptor);
+int FlushToDisk(int inDescriptor);
+
+/// Makes a folder that nobody else may enter.
+int MakeOwnFolder(const std::string& inPath);
+
+/// Remove a file, or an empty folder, if there is one. Async-signal-safe where there are signals.
+void RemoveFile(const char* inPath) noexcept;
+void RemoveFolder(const char* inPath) noexcept;
+
+/// Runs a function while the termination signals of this thread are kept waiting. On Windows they
+/// come on a thread of their own and are not held up.
+void WithSignalsHeld(const std::function<void()>& inFunction);
+
+}  // namespace ZORFoundation
+
+#endif

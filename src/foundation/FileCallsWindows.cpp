@@ -1,0 +1,66 @@
+#include <atomic>
+#include <cerrno>
+
+#include "foundation/FileCalls.h"
+#include "foundation/Hash.h"
+#include "foundation/WindowsCalls.h"
+
+namespace ZORFoundation {
+
+std::uint64_t UniqueNumber() {
+  static std::atomic<std::uint64_t> count = 0;
+  LARGE_INTEGER ticks{};
+  QueryPerformanceCounter(&ticks);
+  Hash64 hash(++count);
+  hash.Add(std::uint64_t{GetCurrentProcessId()});
+  hash.Add(static_cast<std::uint64_t>(ticks.QuadPart));
+  return hash.Get();
+}
+
+int OpenNew(const std::string& inPath, unsigned int /*inMode*/) {
+  return OpenShared(inPath, {GENERIC_READ | GENERIC_WRITE, CREATE_NEW, false});
+}
+
+int OpenExisting(const std::string& inPath) {
+  return OpenShared(inPath, {GENERIC_READ | GENERIC_WRITE, OPEN_EXISTING, false});
+}
+
+int OpenToRead(const std::string& inPath) { return OpenShared(inPath, {}); }
+
+int OpenToWrite(const std::string& inPath) {
+  return OpenShared(inPath, {GENERIC_WRITE, OPEN_EXISTING, false});
+}
+
+// Always anew: what is to be renamed was closed.
+int ReopenIfReplaced(int /*inDescriptor*/, const std::string& inPath) {
+  return OpenExisting(inPath);
+}
+
+FileError WhyNotOpened(const std::string& inPath) {
+  const int number = errno;
+  if (!IsInUse(GetLastError())) return FileError(inPath, number);
+  return FileError(inPath, EACCES, "is open in another program, which does not let it be written");
+}
+
+std::string Utf8PathOf(int /*inDescriptor*/, const std::string& inPath) { return inPath; }
+
+int CutHere(int inDescriptor) {
+  return SetEndOfFile(HandleOf(inDescriptor)) != FALSE ? 0 : ErrorNumberOf(GetLastError());
+}
+
+int FlushToDisk(int inDescriptor) {
+  return FlushFileBuffers(HandleOf(inDescriptor)) != FALSE ? 0 : ErrorNumberOf(GetLastError());
+}
+
+int MakeOwnFolder(const std::string& inPath) {
+  return CreateDirectoryW(WidePath(inPath).c_str(), nullptr) != FALSE
+             ? 0
+             : ErrorNumberOf(GetLastError());
+}
+
+void RemoveFile(const char* inPath) noexcept { DeleteFileW(WidePath(inPath).c_str()); }
+void RemoveFolder(const char* inPath) noexcept { RemoveDirectoryW(WidePath(inPath).c_str()); }
+
+void WithSignalsHeld(const std::function<void()>& inFunction) { inFunction(); }
+
+}  // namespace ZORFoundation
