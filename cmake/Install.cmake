@@ -36,12 +36,11 @@ install(FILES src/default_platform/InterferenceScene.h src/default_platform/Open
 if(ZOR_WITH_TOOLKIT)
   # Not those of the CAD kernel's part, which is loaded by name, and of the toolkit's own sources.
   install(DIRECTORY src/toolkit/ DESTINATION ${headerDir}/toolkit COMPONENT development FILES_MATCHING PATTERN "*.h"
-    PATTERN "detection" EXCLUDE
-    PATTERN "viewer" EXCLUDE
-    REGEX "/(Deviations|DrawingWorkers|ElementWalk|Manifest|PageData|PageLibrary|PageMaker|PictureDrawing|PictureSettings|PictureStore|PublishedFiles|ReferredPictures|SharedDrawing|ShippedTexts)[.]h$" EXCLUDE
-    REGEX "/exchange/(BcfNames|BcfPictures|BcfTopics|BcfWords|DocumentTimes|ExchangeLibrary|ExchangeXml|SheetBase|XmlText)[.]h$" EXCLUDE
+    REGEX "/detection/(kernel|DetectionTask|ProductTree|Viewpoints)" EXCLUDE
+    REGEX "/exchange/(bcf/(BcfNames|BcfPictures|BcfTopics|BcfWords)|sheets/(SheetBase|SheetRows)|DocumentTimes|ExchangeLibrary|ExchangeXml|XmlText)[.]h$" EXCLUDE
+    REGEX "/publishing/(folder|page|pictures|viewer)$" EXCLUDE
+    REGEX "/records/ElementWalk[.]h$" EXCLUDE
     REGEX "/review/(Assignment|Frames|HashInput|LanguageWords|PlaceClusters|ProductMatch|ReviewSource|TomlFile)[.]h$" EXCLUDE)
-  install(FILES src/toolkit/detection/Detect.h DESTINATION ${headerDir}/toolkit/detection COMPONENT development)
   install(FILES ${PROJECT_BINARY_DIR}/generated/ZORToolkitExport.h DESTINATION ${headerDir} COMPONENT development)
 endif()
 install(FILES ${PROJECT_BINARY_DIR}/generated/ZORLyraExport.h ${PROJECT_BINARY_DIR}/generated/ZORPlatformExport.h

@@ -6,7 +6,7 @@
 #include <ctime>
 #include <memory>
 
-#include "toolkit/detection/Body.h"
+#include "toolkit/detection/kernel/Body.h"
 #endif
 
 namespace ZORDetection {

@@ -1,7 +1,7 @@
 // A style sheet, applied to a small report.
 #include "foundation/PluginLoader.h"
 #include "fuzz/Fuzz.h"
-#include "toolkit/publishing/PageLibrary.h"
+#include "toolkit/publishing/page/PageLibrary.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* inBytes, std::size_t inSize) {
   using ZORToolkit::PageLibraryFunction;

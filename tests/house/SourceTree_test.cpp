@@ -139,7 +139,7 @@ TEST(IncludeArrows, ToolkitSeesLibraryPlatformFrontHeadersAndFoundation) {
     EXPECT_FALSE(MayInclude("src/toolkit/scenes/A.cpp", include)) << include;
   }
   EXPECT_FALSE(MayInclude("src/toolkit/scenes/A.h", kThirdParty));
-  EXPECT_TRUE(MayInclude("src/toolkit/detection/A.h", kThirdParty));  // not installed
+  EXPECT_TRUE(MayInclude("src/toolkit/detection/kernel/A.h", kThirdParty));  // not installed
 }
 
 TEST(IncludeArrows, CommandSeesTheToolkitAndWhatItStandsOn) {

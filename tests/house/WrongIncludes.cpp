@@ -28,7 +28,7 @@ const Part* PartOf(const std::string& inPath) {
            Pattern("src/(platform|foundation)/.*|ZORPlatformExport")},
       Part{Pattern("src/default_platform/.*"),
            Pattern("src/(platform|foundation)/.*|ZORPlatformExport|third-party")},
-      Part{Pattern("src/toolkit/(?!detection/).*\\.h"),
+      Part{Pattern("src/toolkit/(?!detection/kernel/).*\\.h"),
            Pattern("include/.*|src/(platform|foundation)/.*|src/default_platform/[^/]*|"
                    "ZORToolkitExport")},
       Part{Pattern("src/toolkit/.*"),

@@ -12,98 +12,16 @@
 #include "default_platform/ModelProgram.h"
 #include "default_platform/OpenModel.h"
 #include "foundation/Vector3.h"
-#include "platform/product_structure/ZORIAlias.h"
 #include "toolkit/Error.h"
 #include "toolkit/detection/DetectionTask.h"
+#include "toolkit/detection/ProductTree.h"
 #include "toolkit/detection/Viewpoints.h"
-#include "toolkit/records/DocumentText.h"
-#include "toolkit/records/Glob.h"
 
 namespace ZORToolkit {
 namespace {
 
-constexpr const char* kSeparator = " --++-- ";
 constexpr double kRigid = 1e-6;
 constexpr std::size_t kMaxPairPoints = 32;  // of one pair of parts
-
-/// A leaf of the tree, and what it counts as.
-struct Leaf {
-  std::size_t unit = 0;  ///< of the units
-  std::uint32_t part = 0;
-  ZORMathTransformation rootFromProduct;
-};
-
-struct Unit {
-  DetectedProduct product;
-  std::vector<std::string> names;  ///< paths and part names that patterns are held against
-};
-
-bool MatchesAny(const std::vector<std::string>& inPatterns, const Unit& inUnit) {
-  return std::ranges::any_of(
-      inUnit.names, [&](const std::string& name) { return MatchesAnyGlob(inPatterns, name); });
-}
-
-/// Collects leaves and units of an opened model.
-class TreeReading {
- public:
-  TreeReading(const ZORIProduct_var& inRoot, const DetectionOptions& inOptions)
-      : options_(inOptions) {
-    const ZORIAlias_var alias = inRoot;
-    if (!alias.IsNull()) rootAlias_ = Utf8(alias->GetAlias());
-    Visit(inRoot, {}, {}, 0, std::nullopt);
-  }
-
-  const std::string& RootAlias() const { return rootAlias_; }
-  const std::vector<Leaf>& Leaves() const { return leaves_; }
-  const std::vector<Unit>& Units() const { return units_; }
-  const std::map<std::uint32_t, std::string>& PartNames() const { return partNames_; }
-
- private:
-  void Visit(const ZORIProduct_var& inProduct, const std::string& inPath,
-             std::vector<std::string> inNames, int inLevel, std::optional<std::size_t> inUnit) {
-    ZORDefault::ProductInfo info;
-    if (!ZORDefault::GetProductInfo(inProduct.GetInterface(), info)) return;
-    std::string path;
-    if (inLevel > 0) {
-      if (!inPath.empty()) path.append(inPath).append(kSeparator);
-      path += Utf8(info.alias);
-    }
-    const std::string partName = Utf8(info.partName);
-    partNames_.emplace(static_cast<std::uint32_t>(info.part), partName);
-    if (inLevel > 0) inNames.push_back(path);
-    if (inLevel > 0 && !partName.empty()) inNames.push_back(partName);
-    const std::unique_ptr<ZORListValZORBaseUnknown_var> children(
-        inProduct->GetChildren("ZORIProduct"));
-    const int count = children ? children->Size() : 0;
-    const bool isLeaf = count == 0;
-    if (!inUnit && (options_.level ? inLevel == *options_.level || isLeaf : isLeaf) &&
-        inLevel > 0) {
-      inUnit = units_.size();
-      // Filled one by one: GCC 12 frees the parts of such a value twice when one of them has no memory.
-      Unit unit;
-      unit.product.path = path;
-      unit.product.partName = partName;
-      unit.names = inNames;
-      info.rootFromProduct.GetCoefficients(unit.product.rootFromProduct.data());
-      units_.push_back(std::move(unit));
-    }
-    if (isLeaf) {
-      if (inUnit && !info.isAssembly)
-        leaves_.push_back({*inUnit, static_cast<std::uint32_t>(info.part), info.rootFromProduct});
-      return;
-    }
-    for (int i = 1; i <= count; ++i) {
-      const ZORIProduct_var child = (*children)[i];
-      Visit(child, path, inNames, inLevel + 1, inUnit);
-    }
-  }
-
-  const DetectionOptions& options_;
-  std::string rootAlias_;
-  std::vector<Leaf> leaves_;
-  std::vector<Unit> units_;
-  std::map<std::uint32_t, std::string> partNames_;
-};
 
 bool IsRigid(const ZORMathTransformation& inPlacement) {
   std::array<double, 12> m{};
@@ -121,33 +39,6 @@ ZORDetection::Placement ToPlacement(const ZORMathTransformation& inPlacement) {
     for (std::size_t column = 0; column < 4; ++column) placement[row][column] = m[3 * column + row];
   return placement;
 }
-
-/// Which units are looked at, and which of them against which.
-class Selection {
- public:
-  Selection(const std::string& inModel, const DetectionOptions& inOptions,
-            const std::vector<Unit>& inUnits) {
-    if (inUnits.size() < 2) throw Error(inModel, "there are not two products to check");
-    for (const Unit& unit : inUnits) {
-      const bool isIn = (inOptions.only.empty() || MatchesAny(inOptions.only, unit)) &&
-                        !MatchesAny(inOptions.ignore, unit);
-      const bool isFirst = !inOptions.between || MatchesAny({inOptions.between->first}, unit);
-      const bool isSecond = !inOptions.between || MatchesAny({inOptions.between->second}, unit);
-      isFirst_.push_back(isIn && isFirst);
-      isSecond_.push_back(isIn && isSecond);
-    }
-    for (const auto* side : {&isFirst_, &isSecond_})
-      if (std::ranges::find(*side, true) == side->end())
-        throw Error(inModel, "no product is selected");
-  }
-
-  bool IsSelected(std::size_t inUnit) const { return isFirst_[inUnit] || isSecond_[inUnit]; }
-  bool IsFirst(std::size_t inUnit) const { return isFirst_[inUnit]; }
-  bool IsSecond(std::size_t inUnit) const { return isSecond_[inUnit]; }
-
- private:
-  std::vector<bool> isFirst_, isSecond_;
-};
 
 DetectedInterference ToInterference(const ZORDetection::Interference& inFound) {
   DetectedInterference found;
@@ -193,7 +84,7 @@ ZORDefault::ModelOptions ModelOptionsOf(const DetectionOptions& inOptions) {
 class Detection {
  public:
   Detection(const std::string& inModel, const DetectionOptions& inOptions,
-            const TreeReading& inTree)
+            const ProductTree& inTree)
       : model_(inModel),
         options_(inOptions),
         tree_(inTree),
@@ -367,7 +258,7 @@ class Detection {
 
   const std::string& model_;
   const DetectionOptions& options_;
-  const TreeReading& tree_;
+  const ProductTree& tree_;
   const Selection selection_;
   std::vector<Leaf> chosen_;
   ZORDetection::DetectionTask task_;
@@ -394,7 +285,7 @@ DetectionResult Detect(const std::string& inModel, const DetectionOptions& inOpt
   modelOptions.warn = inOptions.warn;
   try {
     const ZORDefault::OpenedModel opened = ZORDefault::OpenModel(inModel, modelOptions);
-    const TreeReading tree(opened.root, inOptions);
+    const ProductTree tree(opened.root, inOptions);
     DetectionResult result = Detection(inModel, inOptions, tree).Run();
     if (inOptions.hasViewpoints) AddViewpoints(opened.root, result);
     return result;

@@ -6,7 +6,7 @@
 #include <string_view>
 #include <vector>
 
-#include "toolkit/detection/FindInterferences.h"
+#include "toolkit/detection/kernel/FindInterferences.h"
 
 namespace ZORDetection {
 

@@ -5,7 +5,7 @@
 
 #include "default_platform/InterferenceScene.h"
 #include "default_platform/OpenModel.h"
-#include "toolkit/publishing/viewer/PictureCamera.h"
+#include "toolkit/publishing/pictures/PictureCamera.h"
 #include "toolkit/records/DocumentText.h"
 
 namespace ZORToolkit {

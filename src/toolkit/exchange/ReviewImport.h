@@ -8,7 +8,7 @@
 #include <string_view>
 #include <vector>
 
-#include "toolkit/exchange/BcfFile.h"
+#include "toolkit/exchange/bcf/BcfFile.h"
 #include "toolkit/review/Carry.h"
 #include "toolkit/review/Group.h"
 

@@ -4,8 +4,8 @@
 #include <utility>
 
 #include "toolkit/Error.h"
-#include "toolkit/publishing/Manifest.h"
-#include "toolkit/publishing/PageLibrary.h"
+#include "toolkit/publishing/folder/Manifest.h"
+#include "toolkit/publishing/page/PageLibrary.h"
 
 namespace ZORToolkit {
 namespace {

@@ -14,23 +14,21 @@
 #include "foundation/Vector3.h"
 #include "platform/visualisation/ZOR3DRep.h"
 #include "platform/visualisation/ZORI3DGeoVisu.h"
-#include "toolkit/publishing/Deviations.h"
-#include "toolkit/publishing/DrawingWorkers.h"
-#include "toolkit/publishing/Manifest.h"
 #include "toolkit/publishing/OneFile.h"
-#include "toolkit/publishing/OwnFiles.h"
-#include "toolkit/publishing/PageData.h"
-#include "toolkit/publishing/PageLibrary.h"
-#include "toolkit/publishing/PictureDrawing.h"
-#include "toolkit/publishing/PictureSettings.h"
-#include "toolkit/publishing/PictureStore.h"
-#include "toolkit/publishing/PublishedComparison.h"
-#include "toolkit/publishing/PublishedFiles.h"
-#include "toolkit/publishing/ReferredPictures.h"
-#include "toolkit/publishing/SharedDrawing.h"
-#include "toolkit/publishing/WorkFolder.h"
+#include "toolkit/publishing/folder/Manifest.h"
+#include "toolkit/publishing/folder/PublishedFiles.h"
+#include "toolkit/publishing/folder/WorkFolder.h"
+#include "toolkit/publishing/page/PageData.h"
+#include "toolkit/publishing/page/PageLibrary.h"
+#include "toolkit/publishing/page/PublishedComparison.h"
+#include "toolkit/publishing/page/ReferredPictures.h"
+#include "toolkit/publishing/pictures/Deviations.h"
+#include "toolkit/publishing/pictures/DrawingWorkers.h"
+#include "toolkit/publishing/pictures/PictureCamera.h"
+#include "toolkit/publishing/pictures/PictureDrawing.h"
+#include "toolkit/publishing/pictures/PictureStore.h"
+#include "toolkit/publishing/pictures/SharedDrawing.h"
 #include "toolkit/publishing/viewer/GeometryFiles.h"
-#include "toolkit/publishing/viewer/PictureCamera.h"
 #include "toolkit/publishing/viewer/ViewerScene.h"
 #include "toolkit/records/DocumentText.h"
 #include "toolkit/review/Carry.h"
@@ -248,7 +246,7 @@ class Publication {
       fs::current_path(inStore.DrawingFolder());
       PictureDrawing(-inBefore.record.index, inBefore.resolved, inStore, options_).DrawAlone();
     } catch (const std::exception&) {
-      // As above.
+      // The page shows no picture of it then.
     }
   }
 

@@ -6,9 +6,9 @@
 #include <utility>
 
 #include "foundation/ReadWholeFile.h"
-#include "toolkit/publishing/Manifest.h"
 #include "toolkit/publishing/OneFile.h"
-#include "toolkit/publishing/PictureSettings.h"
+#include "toolkit/publishing/folder/Manifest.h"
+#include "toolkit/publishing/pictures/PictureDrawing.h"
 #include "toolkit/records/DocumentText.h"
 
 namespace fs = std::filesystem;

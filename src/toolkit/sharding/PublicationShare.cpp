@@ -10,9 +10,8 @@
 #include "foundation/Hash.h"
 #include "foundation/Process.h"
 #include "foundation/ReadWholeFile.h"
-#include "toolkit/publishing/PictureDrawing.h"
-#include "toolkit/publishing/PictureSettings.h"
-#include "toolkit/publishing/SharedDrawing.h"
+#include "toolkit/publishing/pictures/PictureDrawing.h"
+#include "toolkit/publishing/pictures/SharedDrawing.h"
 
 namespace fs = std::filesystem;
 

@@ -16,7 +16,7 @@
 #include <string>
 #include <vector>
 
-#include "toolkit/detection/FindInterferences.h"
+#include "toolkit/detection/kernel/FindInterferences.h"
 
 namespace ZORDetection {
 

@@ -1,4 +1,4 @@
-#include "toolkit/detection/FindInterferences.h"
+#include "toolkit/detection/kernel/FindInterferences.h"
 
 #include <gtest/gtest.h>
 

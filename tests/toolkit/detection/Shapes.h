@@ -21,7 +21,7 @@
 #include <optional>
 #include <vector>
 
-#include "toolkit/detection/FindInterferences.h"
+#include "toolkit/detection/kernel/FindInterferences.h"
 
 namespace ZORDetection::Shapes {
 

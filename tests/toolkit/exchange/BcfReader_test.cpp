@@ -5,9 +5,9 @@
 #include <pugixml.hpp>
 
 #include "toolkit/Error.h"
-#include "toolkit/exchange/BcfFile.h"
 #include "toolkit/exchange/ExchangeLibrary.h"
 #include "toolkit/exchange/WrittenArchive.h"
+#include "toolkit/exchange/bcf/BcfFile.h"
 
 using namespace ZORToolkit;
 using testing::AllOf;

@@ -16,8 +16,8 @@
 #include "lyra/terminal/Progress.h"
 #include "lyra/terminal/SafeText.h"
 #include "lyra/terminal/Table.h"
-#include "toolkit/exchange/BcfWriter.h"
-#include "toolkit/exchange/ResultSheet.h"
+#include "toolkit/exchange/bcf/BcfWriter.h"
+#include "toolkit/exchange/sheets/ResultSheet.h"
 #include "toolkit/review/Match.h"
 
 namespace lyra {

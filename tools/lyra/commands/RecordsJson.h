@@ -6,7 +6,7 @@
 
 #include "lyra/commands/Model.h"
 #include "lyra/terminal/Output.h"
-#include "toolkit/exchange/BcfFile.h"
+#include "toolkit/exchange/bcf/BcfFile.h"
 #include "toolkit/records/RecordFields.h"
 
 namespace lyra {

@@ -4,7 +4,7 @@
 #include <regex>
 
 #include "foundation/AtomicFile.h"
-#include "toolkit/publishing/PageLibrary.h"
+#include "toolkit/publishing/page/PageLibrary.h"
 
 namespace fs = std::filesystem;
 

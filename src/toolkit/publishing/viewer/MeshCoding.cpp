@@ -7,7 +7,7 @@
 #include <map>
 #include <span>
 
-#include "toolkit/publishing/PageLibrary.h"
+#include "toolkit/publishing/page/PageLibrary.h"
 
 namespace ZORToolkit {
 

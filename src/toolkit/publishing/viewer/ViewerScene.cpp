@@ -11,7 +11,7 @@
 
 #include "default_platform/OpenModel.h"
 #include "foundation/Vector3.h"
-#include "toolkit/publishing/PageLibrary.h"
+#include "toolkit/publishing/page/PageLibrary.h"
 #include "toolkit/publishing/viewer/MeshCoding.h"
 
 namespace ZORToolkit {

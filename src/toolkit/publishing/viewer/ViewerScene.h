@@ -8,7 +8,7 @@
 #include <vector>
 
 #include "toolkit/publishing/OneFile.h"
-#include "toolkit/publishing/viewer/PictureCamera.h"
+#include "toolkit/publishing/pictures/PictureCamera.h"
 #include "toolkit/scenes/InterferenceScenes.h"
 
 namespace ZORToolkit {
