@@ -4,7 +4,7 @@
 #include <cmath>
 #include <cstddef>
 
-#include "default_platform/visualisation/ray_caster/ParallelFor.h"
+#include "foundation/ParallelFor.h"
 
 namespace ZORRayCaster {
 namespace {
@@ -252,7 +252,7 @@ LineCoverage DrawEdgeLines(const RenderScene& inScene, const Sample* inPixels, b
   const std::size_t size =
       static_cast<std::size_t>(view.width) * static_cast<std::size_t>(view.height);
   std::vector<LineCoverage> shares(static_cast<std::size_t>(inThreadCount));
-  ParallelFor(inThreadCount, inThreadCount, [&](int inShare) {
+  ZORFoundation::ParallelFor(inThreadCount, inThreadCount, [&](int inShare) {
     LineCoverage& coverage = shares[static_cast<std::size_t>(inShare)];
     coverage.visible.assign(size, 0);
     if (inDrawHidden) coverage.hidden.assign(size, 0);

@@ -6,10 +6,10 @@
 #include <memory>
 
 #include "default_platform/visualisation/ray_caster/EdgeLines.h"
-#include "default_platform/visualisation/ray_caster/ParallelFor.h"
 #include "default_platform/visualisation/ray_caster/PictureEncoding.h"
 #include "default_platform/visualisation/ray_caster/RenderScene.h"
 #include "default_platform/visualisation/ray_caster/Sampling.h"
+#include "foundation/ParallelFor.h"
 
 namespace ZORRayCaster {
 namespace {
@@ -129,7 +129,7 @@ std::vector<std::uint8_t> RenderPicture(const PictureRequest& inRequest) {
   const std::size_t rowSize = 3 * static_cast<std::size_t>(inRequest.width);
   std::vector<std::uint8_t> bytes(rowSize * static_cast<std::size_t>(inRequest.height));
   const Compositor compositor(inRequest, samples, lines);
-  ParallelFor(threadCount, inRequest.height, [&](int inY) {
+  ZORFoundation::ParallelFor(threadCount, inRequest.height, [&](int inY) {
     compositor.ComposeRow(inY, background.rows[static_cast<std::size_t>(inY)],
                           bytes.data() + rowSize * static_cast<std::size_t>(inY));
   });

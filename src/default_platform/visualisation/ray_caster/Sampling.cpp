@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <cmath>
 
-#include "default_platform/visualisation/ray_caster/ParallelFor.h"
+#include "foundation/ParallelFor.h"
 
 namespace ZORRayCaster {
 namespace {
@@ -38,7 +38,8 @@ std::unique_ptr<Sample[]> SurfacePass::CastPixels(int inThreadCount) const {
   auto pixels = std::make_unique_for_overwrite<Sample[]>(static_cast<std::size_t>(view.width) *
                                                          static_cast<std::size_t>(view.height));
   const int tileCount = TilesAcross(view.width) * TilesAcross(view.height);
-  ParallelFor(inThreadCount, tileCount, [&](int inTile) { CastTile(inTile, pixels.get()); });
+  ZORFoundation::ParallelFor(inThreadCount, tileCount,
+                             [&](int inTile) { CastTile(inTile, pixels.get()); });
   return pixels;
 }
 
@@ -168,12 +169,14 @@ AdaptiveSampling::AdaptiveSampling(const SurfacePass& inPass, const View& inView
                        static_cast<std::size_t>(inView.height)),
       firstSamples_(static_cast<std::size_t>(inView.width) *
                     static_cast<std::size_t>(inView.height)) {
-  ParallelFor(inThreadCount, view_.height, [&](int inY) { FindDiscontinuities(inY); });
+  ZORFoundation::ParallelFor(inThreadCount, view_.height,
+                             [&](int inY) { FindDiscontinuities(inY); });
   std::vector<std::int32_t> rowStarts(static_cast<std::size_t>(view_.height) + 1, 0);
-  ParallelFor(inThreadCount, view_.height, [&](int inY) { MarkRefinedPixels(inY, rowStarts); });
+  ZORFoundation::ParallelFor(inThreadCount, view_.height,
+                             [&](int inY) { MarkRefinedPixels(inY, rowStarts); });
   for (std::size_t i = 1; i < rowStarts.size(); ++i) rowStarts[i] += rowStarts[i - 1];
   samples_ = std::make_unique_for_overwrite<Sample[]>(static_cast<std::size_t>(rowStarts.back()));
-  ParallelFor(inThreadCount, view_.height, [&](int inY) {
+  ZORFoundation::ParallelFor(inThreadCount, view_.height, [&](int inY) {
     for (int x = 0; x < view_.width; ++x) {
       std::int32_t& first = firstSamples_[Place(x, inY)];
       if (first != kNotRefined) first += rowStarts[static_cast<std::size_t>(inY)];

@@ -9,10 +9,9 @@
 #include <mutex>
 #include <numeric>
 #include <set>
-#include <system_error>
-#include <thread>
 #include <unordered_map>
 
+#include "foundation/ParallelFor.h"
 #include "foundation/Process.h"
 #include "toolkit/detection/kernel/BodyPair.h"
 #include "toolkit/detection/kernel/TaskTable.h"
@@ -75,21 +74,6 @@ void Merge(Verdict&& inVerdict, std::optional<Verdict>& ioBest) {
   ioBest->precision = precision;
 }
 
-/// Runs some work in so many threads, the calling one among them, each of which takes the next item.
-/// Threads that there is no memory for are done without.
-template <typename Work>
-void InThreads(unsigned inCount, const Work& inWork) {
-  std::atomic<std::size_t> next{0};
-  std::vector<std::thread> threads;
-  threads.reserve(inCount);
-  try {
-    for (unsigned i = 1; i < inCount; ++i) threads.emplace_back([&] { inWork(next); });
-  } catch (const std::system_error&) {
-  }
-  inWork(next);
-  for (std::thread& thread : threads) thread.join();
-}
-
 /// Whether two parts have a face or an edge in common, which keep their triangles.
 bool SharesTopology(const std::vector<Part>& inParts) {
   std::unordered_map<const Standard_Transient*, const Part*> owners;
@@ -123,9 +107,10 @@ class Search {
          const Options& inOptions)
       : products_(inProducts), options_(inOptions) {
     geometries_.resize(inParts.size());
-    InThreads(SharesTopology(inParts) ? 1 : inOptions.threads, [&](std::atomic<std::size_t>& next) {
-      for (std::size_t i = next++; i < inParts.size(); i = next++)
-        geometries_[i] = GeometryOf(inParts[i], inOptions.meshSize);
+    const int threads = SharesTopology(inParts) ? 1 : ThreadCount();
+    ZORFoundation::ParallelFor(threads, static_cast<int>(inParts.size()), [&](int inPart) {
+      const auto i = static_cast<std::size_t>(inPart);
+      geometries_[i] = GeometryOf(inParts[i], inOptions.meshSize);
     });
     for (std::size_t i = 0; i < geometries_.size(); ++i)
       for (Unjudged& problem : geometries_[i].problems) {
@@ -147,6 +132,8 @@ class Search {
   }
 
  private:
+  int ThreadCount() const { return static_cast<int>(std::max(1U, options_.threads)); }
+
   /// Farther apart than this nothing is looked for.
   double Reach() const { return std::max(options_.contactGap, options_.clearance) + 2 * kRounding; }
 
@@ -241,8 +228,9 @@ class Search {
       GroupPairs();
       options_.keep(findings_);
     }
-    const unsigned threads = options_.tried > 0 ? 1 : options_.threads;
-    InThreads(threads, [&](std::atomic<std::size_t>& next) {
+    const int threads = options_.tried > 0 ? 1 : ThreadCount();
+    std::atomic<std::size_t> next{0};
+    ZORFoundation::ParallelFor(threads, threads, [&](int /*inThread*/) {
       ProbeCache probes;
       while (!isStopped) {
         const std::size_t place = next++;

@@ -1,6 +1,6 @@
 // A loop shared among threads.
-#ifndef ZOR_DEFAULT_PLATFORM_VISUALISATION_RAY_CASTER_PARALLELFOR_H
-#define ZOR_DEFAULT_PLATFORM_VISUALISATION_RAY_CASTER_PARALLELFOR_H
+#ifndef ZOR_FOUNDATION_PARALLELFOR_H
+#define ZOR_FOUNDATION_PARALLELFOR_H
 
 #include <algorithm>
 #include <atomic>
@@ -10,7 +10,7 @@
 #include <thread>
 #include <vector>
 
-namespace ZORRayCaster {
+namespace ZORFoundation {
 
 /// Calls inBody for 0 to inCount - 1, each once, in no particular order. The calling thread takes
 /// part; with one thread no other is started. The first exception is rethrown here.
@@ -39,6 +39,6 @@ void ParallelFor(int inThreadCount, int inCount, const Body& inBody) {
   if (failure) std::rethrow_exception(failure);
 }
 
-}  // namespace ZORRayCaster
+}  // namespace ZORFoundation
 
 #endif
