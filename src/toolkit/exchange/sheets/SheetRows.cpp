@@ -3,6 +3,7 @@
 #include <cmath>
 
 #include "toolkit/exchange/ExchangeLibrary.h"
+#include "toolkit/exchange/bcf/BcfWords.h"
 #include "toolkit/exchange/sheets/SheetBase.h"
 #include "toolkit/review/Match.h"
 #include "toolkit/review/ReviewSource.h"
@@ -37,10 +38,6 @@ double Rounded(double inCoordinate) {
 }
 
 SheetCell CellOf(const Number& inNumber) { return {inNumber.text, inNumber.value}; }
-
-std::string_view NameOf(const ProductRecord& inProduct) {
-  return inProduct.alias.empty() ? inProduct.id : inProduct.alias;
-}
 
 bool HasHiddenId(const ProductRecord& inProduct) {
   return !inProduct.id.empty() && inProduct.id != NameOf(inProduct);

@@ -14,7 +14,7 @@ namespace fs = std::filesystem;
 namespace ZORToolkit {
 namespace {
 
-constexpr char kFolder[] = "pictures";
+constexpr char kPictureFolder[] = "pictures";
 constexpr char kStampFile[] = ".lyra-publish";
 constexpr std::string_view kListStart = "drawn";
 
@@ -76,7 +76,7 @@ bool HasBytes(const fs::path& inPath) {
 }  // namespace
 
 PictureStore::PictureStore(const fs::path& inPublication, const std::string& inEnding)
-    : shownFolder_(inPublication / kFolder),
+    : shownFolder_(inPublication / kPictureFolder),
       folder_(fs::absolute(shownFolder_)),
       ending_(inEnding),
       work_(shownFolder_) {}
@@ -188,7 +188,7 @@ void PictureStore::TakeOver(const std::vector<std::string>& inNames) const {
 bool PictureStore::Has(const std::string& inName) const { return HasBytes(folder_ / inName); }
 
 std::string PictureStore::Reference(const std::string& inName) const {
-  return Has(inName) ? std::string(kFolder) + "/" + inName : "";
+  return Has(inName) ? std::string(kPictureFolder) + "/" + inName : "";
 }
 
 }  // namespace ZORToolkit

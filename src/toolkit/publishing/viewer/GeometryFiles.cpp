@@ -10,12 +10,12 @@ namespace fs = std::filesystem;
 
 namespace ZORToolkit {
 namespace {
-constexpr char kFolder[] = "viewer";
+constexpr char kViewerFolder[] = "viewer";
 constexpr char kScriptStart[] = "zorBlock(\"";
 }  // namespace
 
 std::string GeometryPath(const PageBlock& inBlock) {
-  return std::string(kFolder) + "/" + inBlock.name + ".js";
+  return std::string(kViewerFolder) + "/" + inBlock.name + ".js";
 }
 
 std::string GeometryScript(const PageBlock& inBlock) {
@@ -28,7 +28,7 @@ bool IsGeometryScript(std::string_view inText) { return inText.starts_with(kScri
 std::vector<fs::path> GeometryFilesIn(const std::string& inFolder) {
   static const std::regex names(R"((scene|part-\d+)\.js)");
   std::vector<fs::path> files;
-  const fs::path folder = fs::path(inFolder) / kFolder;
+  const fs::path folder = fs::path(inFolder) / kViewerFolder;
   if (fs::is_directory(folder))
     for (const fs::directory_entry& entry : fs::directory_iterator(folder))
       if (std::regex_match(entry.path().filename().string(), names)) files.push_back(entry.path());
@@ -39,7 +39,7 @@ void WriteGeometry(const std::vector<PageBlock>& inBlocks, const std::string& in
                    const std::string& inWorkFolder) {
   for (const fs::path& file : GeometryFilesIn(inFolder)) fs::remove(file);
   if (inBlocks.empty()) return;
-  fs::create_directories(fs::path(inFolder) / kFolder);
+  fs::create_directories(fs::path(inFolder) / kViewerFolder);
   ZORFoundation::AtomicFileOptions written;
   written.temporaryFolder = inWorkFolder;
   for (const PageBlock& block : inBlocks)
