@@ -2,6 +2,7 @@
 
 #include <fcntl.h>
 #include <signal.h>
+#include <sys/mman.h>
 #include <sys/random.h>
 #include <sys/stat.h>
 #include <time.h>
@@ -24,6 +25,8 @@ std::uint64_t UniqueNumber() {
 int OpenNew(const std::string& inPath, unsigned int inMode) {
   return open(inPath.c_str(), O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, inMode);
 }
+
+int OpenInMemory() { return memfd_create("memory", MFD_CLOEXEC); }
 
 int OpenExisting(const std::string& inPath) {
   return open(inPath.c_str(), O_RDWR | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK);

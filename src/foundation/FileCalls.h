@@ -23,6 +23,8 @@ std::uint64_t UniqueNumber();
 /// Makes a file for reading and writing; one that exists is refused (EEXIST).
 /// @param inMode permissions, subject to the umask. Windows has none.
 int OpenNew(const std::string& inPath, unsigned int inMode);
+/// Makes a file that has no name, or none for others, and goes with its last descriptor.
+int OpenInMemory();
 /// Opens a file for reading and writing, not through a link, without waiting for anybody.
 int OpenExisting(const std::string& inPath);
 /// Opens a file, device or pipe, for reading or for writing alone.

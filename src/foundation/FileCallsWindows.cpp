@@ -21,6 +21,16 @@ int OpenNew(const std::string& inPath, unsigned int /*inMode*/) {
   return OpenShared(inPath, {GENERIC_READ | GENERIC_WRITE, CREATE_NEW, false});
 }
 
+int OpenInMemory() {
+  const std::string folder = std::filesystem::temp_directory_path().string();
+  for (;;) {
+    const int descriptor = OpenShared(folder + "/lyra-" + HexText(UniqueNumber()),
+                                      {GENERIC_READ | GENERIC_WRITE, CREATE_NEW, false,
+                                       FILE_ATTRIBUTE_TEMPORARY | FILE_FLAG_DELETE_ON_CLOSE});
+    if (descriptor >= 0 || errno != EEXIST) return descriptor;
+  }
+}
+
 int OpenExisting(const std::string& inPath) {
   return OpenShared(inPath, {GENERIC_READ | GENERIC_WRITE, OPEN_EXISTING, false});
 }

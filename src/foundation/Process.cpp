@@ -16,6 +16,10 @@ void WriteEnvironment(const char* inName, const char* inValue) {
     setenv(inName, inValue, 1);
 }
 
+std::vector<std::string> WordsOfCommandLine(int inCount, char** inArguments) {
+  return {inArguments, inArguments + inCount};
+}
+
 double MegabytesUsed() {
   rusage own{}, started{};
   getrusage(RUSAGE_SELF, &own);

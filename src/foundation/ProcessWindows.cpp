@@ -7,6 +7,7 @@
 #include "foundation/WindowsCalls.h"
 // After the types that it needs.
 #include <psapi.h>
+#include <shellapi.h>
 
 namespace ZORFoundation {
 
@@ -36,6 +37,16 @@ void WriteEnvironment(const char* inName, const char* inValue) {
   const std::wstring value = inValue == nullptr ? L"" : WideText(inValue);
   _wputenv((name + L"=" + value).c_str());
   SetEnvironmentVariableW(name.c_str(), inValue == nullptr ? nullptr : value.c_str());
+}
+
+std::vector<std::string> WordsOfCommandLine(int inCount, char** inArguments) {
+  int count = 0;
+  LPWSTR* const words = CommandLineToArgvW(GetCommandLineW(), &count);
+  if (words == nullptr) return {inArguments, inArguments + inCount};
+  std::vector<std::string> texts;
+  for (int i = 0; i < count; ++i) texts.push_back(Utf8Text(words[i]));
+  LocalFree(words);
+  return texts;
 }
 
 double MegabytesUsed() {

@@ -63,6 +63,14 @@ bool TemporaryFile::IsTemporaryName(std::string_view inName) {
          inName.find_first_not_of("0123456789abcdef", kTemporaryPrefix.size()) == inName.npos;
 }
 
+Descriptor NewMemoryFile(std::string_view inBytes) {
+  Descriptor file(OpenInMemory());
+  std::size_t written = 0;
+  const int error = file.IsOpen() ? WriteAll(file.Get(), inBytes, written) : errno;
+  if (error != 0) throw FileError("a file in memory", error);
+  return file;
+}
+
 ScratchFolder::ScratchFolder() {
   const std::string folder = fs::temp_directory_path().string();
   int error = 0;

@@ -6,6 +6,7 @@
 #include <string>
 #include <string_view>
 
+#include "foundation/Descriptor.h"
 #include "foundation/TerminationSignals.h"
 
 namespace ZORFoundation {
@@ -47,6 +48,12 @@ class ZOR_FOUNDATION_EXPORT TemporaryFile {
   std::optional<RemoveOnSignal> removeOnSignal_;
   int descriptor_ = -1;
 };
+
+/// A file without a name, for bytes that another process is given or gives back; it goes with its
+/// last descriptor. On Windows it is in memory as far as the system's cache has room. Raises
+/// FileError.
+/// @return it, with the bytes written and its position behind them.
+ZOR_FOUNDATION_EXPORT Descriptor NewMemoryFile(std::string_view inBytes);
 
 /// A new folder of this process's own among the temporary files, removed with all that it holds.
 class ZOR_FOUNDATION_EXPORT ScratchFolder {

@@ -106,7 +106,7 @@ bool IsInUse(unsigned long inError) {
 int OpenShared(const std::string& inPath, const OpenRequest& inRequest) {
   const HANDLE handle = CreateFileW(WidePath(inPath).c_str(), inRequest.access,
                                     FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,
-                                    inRequest.disposition, FILE_ATTRIBUTE_NORMAL, nullptr);
+                                    inRequest.disposition, inRequest.attributes, nullptr);
   if (handle == INVALID_HANDLE_VALUE) {
     const DWORD error = GetLastError();
     const DWORD attributes = GetFileAttributesW(WidePath(inPath).c_str());

@@ -30,6 +30,7 @@ struct OpenRequest {
   unsigned long access = GENERIC_READ;
   unsigned long disposition = OPEN_EXISTING;
   bool isAppending = false;
+  unsigned long attributes = FILE_ATTRIBUTE_NORMAL;
 };
 
 /// Opens a file in binary mode; others may read, write, rename and remove it meanwhile, and processes

@@ -43,6 +43,8 @@ struct ModelReaderProtocol {
   static constexpr int kExitRead = 0;
   static constexpr int kExitRefused = 2;
   static constexpr int kExitOutOfMemory = 3;
+  static constexpr int kExitOverTime = 4;  ///< on Windows, where no signal says so
+  static constexpr int kExitAborted = 5;   ///< on Windows
 };
 
 /// Why the reader has no model.

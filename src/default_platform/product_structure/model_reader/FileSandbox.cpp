@@ -1,38 +1,21 @@
 #include "default_platform/product_structure/model_reader/FileSandbox.h"
 
-#include <fcntl.h>
-#include <sys/mman.h>
-#include <sys/syscall.h>
-#include <unistd.h>
-
 #include <cerrno>
-#include <cstdio>
-#include <cstring>
 #include <filesystem>
 #include <map>
 #include <optional>
 #include <vector>
 
-#include "foundation/Descriptor.h"
+#include "default_platform/product_structure/model_reader/SandboxedCalls.h"
 #include "foundation/Hash.h"
 #include "foundation/ReadWholeFile.h"
+#include "foundation/TemporaryFile.h"
 
 namespace ZORDefault {
 namespace {
 
 namespace fs = std::filesystem;
 using ZORFoundation::Descriptor;
-
-int OpenDirectly(const char* inPath, int inFlags) {
-  return static_cast<int>(syscall(SYS_openat, AT_FDCWD, inPath, inFlags | O_CLOEXEC, 0666));
-}
-
-/// Opens what a descriptor refers to once more, with a position of its own.
-int Reopen(int inDescriptor) {
-  char path[32];
-  std::snprintf(path, sizeof path, "/proc/self/fd/%d", inDescriptor);
-  return OpenDirectly(path, O_RDONLY);
-}
 
 class FileSandbox {
  public:
@@ -125,10 +108,8 @@ class FileSandbox {
       File file;
       file.state = ReferencedFile::State::kRead;
       file.hash = ZORFoundation::Hash64Of(whole.bytes);
-      file.bytes = Descriptor(memfd_create("referenced", MFD_CLOEXEC));
-      std::size_t written = 0;
-      const int failure = ZORFoundation::WriteAll(file.bytes.Get(), whole.bytes, written);
-      return failure == 0 ? std::move(file) : Refusal(failure, false);
+      file.bytes = ZORFoundation::NewMemoryFile(whole.bytes);
+      return file;
     } catch (const ZORFoundation::FileError& failure) {
       isReading_ = false;
       return Refusal(failure.Code(), failure.Code() == ESPIPE);
@@ -148,23 +129,6 @@ std::optional<FileSandbox>& Sandbox() {
   return sandbox;
 }
 
-int OpenInSandbox(const char* inPath, bool inWrites, int inFlags) {
-  if (!Sandbox() || Sandbox()->IsReading()) return OpenDirectly(inPath, inFlags);
-  if (!inWrites && inPath != nullptr) return Sandbox()->Open(inPath);
-  errno = EACCES;
-  return -1;
-}
-
-std::FILE* OpenStream(const char* inPath, const char* inMode) {
-  const bool writes = std::strpbrk(inMode, "wa+") != nullptr;
-  const int descriptor = OpenInSandbox(inPath, writes, O_RDONLY);
-  return descriptor < 0 ? nullptr : fdopen(descriptor, "r");
-}
-
-int OpenDescriptor(const char* inPath, int inFlags) {
-  return OpenInSandbox(inPath, (inFlags & O_ACCMODE) != O_RDONLY, inFlags);
-}
-
 }  // namespace
 
 void EnterFileSandbox(const std::string& inModelPath, int inModelBytes) {
@@ -176,20 +140,11 @@ std::string FirstNonRegularFile() { return Sandbox()->FirstNonRegular(); }
 std::vector<std::string> RefusedFiles() { return Sandbox()->Refused(); }
 bool HasChangedFile() { return Sandbox()->HasChanged(); }
 
-}  // namespace ZORDefault
+std::optional<int> OpenInSandbox(const char* inPath, bool inWrites) {
+  if (!Sandbox() || Sandbox()->IsReading()) return std::nullopt;
+  if (!inWrites && inPath != nullptr) return Sandbox()->Open(inPath);
+  errno = EACCES;
+  return -1;
+}
 
-// A program's own functions come before those of the C library, for all libraries that it loads.
-extern "C" {
-__attribute__((visibility("default"))) std::FILE* fopen(const char* inPath, const char* inMode) {
-  return ZORDefault::OpenStream(inPath, inMode);
-}
-__attribute__((visibility("default"))) std::FILE* fopen64(const char* inPath, const char* inMode) {
-  return ZORDefault::OpenStream(inPath, inMode);
-}
-__attribute__((visibility("default"))) int open(const char* inPath, int inFlags, ...) {
-  return ZORDefault::OpenDescriptor(inPath, inFlags);
-}
-__attribute__((visibility("default"))) int open64(const char* inPath, int inFlags, ...) {
-  return ZORDefault::OpenDescriptor(inPath, inFlags);
-}
-}
+}  // namespace ZORDefault
