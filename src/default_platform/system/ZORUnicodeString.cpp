@@ -5,6 +5,7 @@
 #include <string_view>
 #include <utility>
 
+#include "default_platform/xml/Latin1.h"
 #include "foundation/Utf8.h"
 #include "platform/system/ZORString.h"
 #include "platform/system/ZORToken.h"
@@ -42,7 +43,121 @@ std::size_t FindText(std::u16string_view inText, std::u16string_view inSought, s
 
 int Position(std::size_t inFound) { return inFound == kNotFound ? -1 : static_cast<int>(inFound); }
 
+void CopyUnits(std::u16string_view inFrom, char16_t* outTo) {
+  if (!inFrom.empty()) std::memmove(outTo, inFrom.data(), inFrom.size() * sizeof(char16_t));
+}
+
 }  // namespace
+
+// ---- code units
+
+// All of a short text's room is copied: a count that the compiler knows takes no call.
+inline void ZORUnicodeString::Units::TakeFrom(Units& ioOther) noexcept {
+  size_ = ioOther.size_;
+  if (ioOther.data_ == ioOther.inline_) {
+    std::memcpy(inline_, ioOther.inline_, sizeof(inline_));
+  } else {
+    data_ = ioOther.data_;
+    capacity_ = ioOther.capacity_;
+    ioOther.data_ = ioOther.inline_;
+    ioOther.capacity_ = kInline;
+  }
+  ioOther.Cut(0);
+}
+
+inline void ZORUnicodeString::Units::Release() noexcept {
+  if (data_ == inline_) return;
+  delete[] data_;
+  data_ = inline_;
+  capacity_ = kInline;
+}
+
+inline ZORUnicodeString::Units::Units(const Units& inOther) {
+  if (inOther.data_ == inOther.inline_) {
+    std::memcpy(inline_, inOther.inline_, sizeof(inline_));
+    size_ = inOther.size_;
+  } else {
+    Assign(inOther);
+  }
+}
+
+inline ZORUnicodeString::Units::Units(Units&& ioOther) noexcept { TakeFrom(ioOther); }
+
+inline ZORUnicodeString::Units& ZORUnicodeString::Units::operator=(const Units& inOther) {
+  Assign(inOther);
+  return *this;
+}
+
+inline ZORUnicodeString::Units& ZORUnicodeString::Units::operator=(Units&& ioOther) noexcept {
+  if (this == &ioOther) return *this;
+  Release();
+  TakeFrom(ioOther);
+  return *this;
+}
+
+inline ZORUnicodeString::Units::~Units() { Release(); }
+
+inline void ZORUnicodeString::Units::Cut(std::size_t inCount) {
+  size_ = inCount;
+  data_[inCount] = u'\0';
+}
+
+inline char16_t* ZORUnicodeString::Units::Renew(std::size_t inCount) {
+  if (inCount > capacity_) {
+    char16_t* const larger = new char16_t[inCount + 1];
+    Release();
+    data_ = larger;
+    capacity_ = inCount;
+  }
+  Cut(inCount);
+  return data_;
+}
+
+void ZORUnicodeString::Units::Grow(std::size_t inCapacity) {
+  char16_t* const larger = new char16_t[inCapacity + 1];
+  std::memcpy(larger, data_, (size_ + 1) * sizeof(char16_t));
+  Release();
+  data_ = larger;
+  capacity_ = inCapacity;
+}
+
+inline void ZORUnicodeString::Units::Assign(std::u16string_view inText) {
+  if (inText.size() > capacity_) Renew(inText.size());  // no part of this text: it is longer
+  CopyUnits(inText, data_);
+  Cut(inText.size());
+}
+
+inline void ZORUnicodeString::Units::Append(std::u16string_view inTail) {
+  const std::size_t size = size_ + inTail.size();
+  if (size > capacity_) {
+    Units sum;
+    sum.Renew(std::max(size, 2 * capacity_));
+    CopyUnits(*this, sum.data_);
+    CopyUnits(inTail, sum.data_ + size_);
+    *this = std::move(sum);
+  } else {
+    CopyUnits(inTail, data_ + size_);
+  }
+  Cut(size);
+}
+
+void ZORUnicodeString::Units::Replace(std::size_t inPosition, std::size_t inCount,
+                                      std::u16string_view inText) {
+  if (inCount == inText.size()) return CopyUnits(inText, data_ + inPosition);
+  const std::u16string_view all = *this;
+  Units replaced;
+  replaced.Reserve(size_ - inCount + inText.size());
+  replaced.Append(all.substr(0, inPosition));
+  replaced.Append(inText);
+  replaced.Append(all.substr(inPosition + inCount));
+  *this = std::move(replaced);
+}
+
+void ZORUnicodeString::Units::Reserve(std::size_t inCount) {
+  if (inCount > capacity_) Grow(inCount);
+}
+
+// ---- building
 
 ZORUnicodeString::ZORUnicodeString() = default;
 
@@ -58,9 +173,7 @@ ZORUnicodeString::ZORUnicodeString(const ZORString& inNarrow) {
 ZORUnicodeString::ZORUnicodeString(const ZORUnicodeString& inOther) : units_(inOther.units_) {}
 
 ZORUnicodeString::ZORUnicodeString(ZORUnicodeString&& ioOther) noexcept
-    : units_(std::move(ioOther.units_)), narrow_(std::move(ioOther.narrow_)) {
-  ioOther.units_.clear();
-}
+    : units_(std::move(ioOther.units_)), narrow_(std::move(ioOther.narrow_)) {}
 
 ZORUnicodeString& ZORUnicodeString::operator=(const ZORUnicodeString& inOther) {
   if (this == &inOther) return *this;
@@ -73,30 +186,31 @@ ZORUnicodeString& ZORUnicodeString::operator=(ZORUnicodeString&& ioOther) noexce
   if (this == &ioOther) return *this;
   units_ = std::move(ioOther.units_);
   narrow_ = std::move(ioOther.narrow_);
-  ioOther.units_.clear();
   return *this;
 }
 
 ZORUnicodeString::~ZORUnicodeString() = default;
 
 void ZORUnicodeString::BuildFromUTF16(const ZORUC2Bytes* inUnits, std::size_t inCount) {
-  if (inUnits)
-    units_.assign(inUnits, inCount);
-  else
-    units_.clear();
+  units_.Assign(inUnits ? std::u16string_view(inUnits, inCount) : std::u16string_view());
   narrow_.reset();
 }
 
 void ZORUnicodeString::BuildFromUTF8(const char* inBytes, std::size_t inCount) {
   // The bytes may be this string's own narrow form, so that is let go last.
-  units_.resize(inBytes ? inCount : 0);
+  char16_t* const units = units_.Renew(inBytes ? inCount : 0);
   if (!units_.empty())
-    units_.resize(ZORFoundation::DecodeUtf8(std::string_view(inBytes, inCount), units_.data()));
+    units_.Cut(ZORFoundation::DecodeUtf8(std::string_view(inBytes, inCount), units));
+  narrow_.reset();
+}
+
+void ZORUnicodeString::BuildFromLatin1(const char* inBytes, std::size_t inCount) {
+  WidenLatin1(std::string_view(inBytes, inCount), units_.Renew(inCount));
   narrow_.reset();
 }
 
 ZORUnicodeString& ZORUnicodeString::Append(const ZORUnicodeString& inTail) {
-  units_ += inTail.units_;
+  units_.Append(inTail.units_);
   narrow_.reset();
   return *this;
 }
@@ -106,24 +220,23 @@ ZORUnicodeString& ZORUnicodeString::operator+=(const ZORUnicodeString& inTail) {
 }
 
 ZORUnicodeString& ZORUnicodeString::operator+=(ZORUnicodeChar inTail) {
-  units_ += inTail.ConvertToUC2Bytes();
+  const char16_t unit = inTail.ConvertToUC2Bytes();
+  units_.Append(std::u16string_view(&unit, 1));
   narrow_.reset();
   return *this;
 }
 
 ZORUnicodeString& ZORUnicodeString::AppendUTF16(const ZORUC2Bytes* inUnits, std::size_t inCount) {
-  if (inUnits) units_.append(inUnits, inCount);
+  if (inUnits) units_.Append(std::u16string_view(inUnits, inCount));
   narrow_.reset();
   return *this;
 }
 
-void ZORUnicodeString::Reserve(std::size_t inCount) {
-  if (inCount > units_.capacity()) units_.reserve(inCount);
-}
+void ZORUnicodeString::Reserve(std::size_t inCount) { units_.Reserve(inCount); }
 
 ZORUnicodeString& ZORUnicodeString::Insert(int inPosition, const ZORUnicodeString& inText) {
-  units_.insert(static_cast<std::size_t>(std::clamp(inPosition, 0, GetLengthInChar())),
-                inText.units_);
+  units_.Replace(static_cast<std::size_t>(std::clamp(inPosition, 0, GetLengthInChar())), 0,
+                 inText.units_);
   narrow_.reset();
   return *this;
 }
@@ -137,7 +250,7 @@ ZORUnicodeString ZORUnicodeString::Strip(int inMode, ZORUnicodeChar inCharacter)
   while (leading && begin < end && units_[begin] == unit) ++begin;
   while (trailing && end > begin && units_[end - 1] == unit) --end;
   ZORUnicodeString stripped;
-  stripped.units_.assign(units_, begin, end - begin);
+  stripped.units_.Assign(std::u16string_view(units_).substr(begin, end - begin));
   return stripped;
 }
 
@@ -145,7 +258,7 @@ int ZORUnicodeString::ReplaceSubString(const ZORUnicodeString& inOld,
                                        const ZORUnicodeString& inNew) {
   const std::size_t found = FindText(units_, inOld.units_, 0);
   if (found == kNotFound) return -1;
-  units_.replace(found, inOld.units_.size(), inNew.units_);
+  units_.Replace(found, inOld.units_.size(), inNew.units_);
   narrow_.reset();
   return Position(found);
 }
@@ -157,7 +270,8 @@ int ZORUnicodeString::SearchSubString(const ZORUnicodeString& inText, int inStar
   if (inStart < 0 || inStart >= GetLengthInChar() || inText.units_.empty()) return -1;
   const std::size_t start = static_cast<std::size_t>(inStart);
   if (inMode == kSearchForward) return Position(FindText(units_, inText.units_, start));
-  if (inMode == kSearchBackward) return Position(units_.rfind(inText.units_, start));
+  if (inMode == kSearchBackward)
+    return Position(std::u16string_view(units_).rfind(inText.units_, start));
   return -1;
 }
 
@@ -165,7 +279,7 @@ ZORUnicodeString ZORUnicodeString::SubString(int inStart, int inLength) const {
   ZORUnicodeString part;
   if (inStart < 0 || inStart >= GetLengthInChar()) return part;
   const std::size_t length = inLength < 0 ? kNotFound : static_cast<std::size_t>(inLength);
-  part.units_.assign(units_, static_cast<std::size_t>(inStart), length);
+  part.units_.Assign(std::u16string_view(units_).substr(static_cast<std::size_t>(inStart), length));
   return part;
 }
 
@@ -197,7 +311,7 @@ HRESULT ZORUnicodeString::ConvertToUTF8(char* outBytes, std::size_t* outCount) c
 HRESULT ZORUnicodeString::ConvertToWChar(wchar_t* outWide) const {
   if (!outWide) return E_INVALIDARG;
   if constexpr (sizeof(wchar_t) == sizeof(char16_t)) {
-    for (const char16_t unit : units_) *outWide++ = static_cast<wchar_t>(unit);
+    for (const char16_t unit : std::u16string_view(units_)) *outWide++ = static_cast<wchar_t>(unit);
   } else {
     for (std::size_t position = 0; position < units_.size();)
       *outWide++ = static_cast<wchar_t>(ZORFoundation::NextCharacter(units_, position));
@@ -207,7 +321,8 @@ HRESULT ZORUnicodeString::ConvertToWChar(wchar_t* outWide) const {
 }
 
 bool operator==(const ZORUnicodeString& inA, const ZORUnicodeString& inB) {
-  return inA.units_ == inB.units_;
+  const std::u16string_view a = inA.units_, b = inB.units_;
+  return a.size() == b.size() && std::memcmp(a.data(), b.data(), a.size() * sizeof(char16_t)) == 0;
 }
 
 bool operator!=(const ZORUnicodeString& inA, const ZORUnicodeString& inB) { return !(inA == inB); }
@@ -226,8 +341,9 @@ bool operator!=(const ZORUnicodeString& inA, const char* inB) { return !(inA == 
 
 ZORUnicodeString operator+(const ZORUnicodeString& inA, const ZORUnicodeString& inB) {
   ZORUnicodeString sum;
-  sum.units_.reserve(inA.units_.size() + inB.units_.size());
-  sum.units_.append(inA.units_).append(inB.units_);
+  sum.units_.Reserve(inA.units_.size() + inB.units_.size());
+  sum.units_.Append(inA.units_);
+  sum.units_.Append(inB.units_);
   return sum;
 }
 

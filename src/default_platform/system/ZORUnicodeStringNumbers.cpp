@@ -163,8 +163,7 @@ HRESULT ZORUnicodeString::BuildFromNum(int inNumber, const char* inFormat) {
   if (IsFormat(inFormat, "%d") || IsFormat(inFormat, "%i")) {
     char digits[std::numeric_limits<int>::digits10 + 3];
     char* const end = std::to_chars(digits, digits + sizeof(digits), inNumber).ptr;
-    units_.assign(digits, end);
-    narrow_.reset();
+    BuildFromLatin1(digits, static_cast<std::size_t>(end - digits));
     return S_OK;
   }
   if (!FindConversion(inFormat, NumberKind::kInt, FormatUse::kPrint)) return E_INVALIDARG;
@@ -178,8 +177,7 @@ HRESULT ZORUnicodeString::BuildFromNum(double inNumber, const char* inFormat) {
     char digits[330];  // the longest double has 309 digits before the point
     char* const end =
         std::to_chars(digits, digits + sizeof(digits), inNumber, std::chars_format::fixed, 6).ptr;
-    units_.assign(digits, end);
-    narrow_.reset();
+    BuildFromLatin1(digits, static_cast<std::size_t>(end - digits));
     return S_OK;
   }
   if (!FindConversion(inFormat, NumberKind::kDouble, FormatUse::kPrint)) return E_INVALIDARG;

@@ -168,16 +168,10 @@ bool DOMString::equals(const char* inAscii) const {
 }
 
 void DOM_HandleAccess::CopyTo(ZORUnicodeString& outText, TextView inView) {
-  constexpr std::size_t kShort = 256;
-  if (inView.IsWide()) {
+  if (inView.IsWide())
     outText.BuildFromUTF16(inView.Units().data(), inView.Length());
-  } else if (inView.Length() <= kShort) {
-    char16_t units[kShort];
-    WidenLatin1(inView.Latin1(), units);
-    outText.BuildFromUTF16(units, inView.Length());
-  } else {
-    outText.BuildFromUTF16(inView.ToUtf16().data(), inView.Length());
-  }
+  else
+    outText.BuildFromLatin1(inView.Latin1().data(), inView.Length());
 }
 
 ZORUnicodeString DOMString::DOMStringToZORUnicodeString() const {

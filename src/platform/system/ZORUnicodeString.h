@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <memory>
 #include <string>
+#include <string_view>
 
 #include "ZORPlatformExport.h"
 #include "platform/ZORPlatformAdditions.h"
@@ -99,6 +100,8 @@ class ZOR_PLATFORM_EXPORT ZORUnicodeString {
   ZORUnicodeString(const ZORString& inNarrow);
   /// Replaces the text by the bytes of a UTF-8 text; invalid sequences become U+FFFD.
   void BuildFromUTF8(const char* inBytes, std::size_t inCount);
+  /// Replaces the text by that of Latin-1 bytes, not of this string.
+  void BuildFromLatin1(const char* inBytes, std::size_t inCount);
   /// Appends inCount code units as they are; amortised constant for each unit.
   ZORUnicodeString& AppendUTF16(const ZORUC2Bytes* inUnits, std::size_t inCount);
   /// Makes room for inCount code units in all, so that appending up to there does not move the
@@ -109,7 +112,47 @@ class ZOR_PLATFORM_EXPORT ZORUnicodeString {
 #endif
 
  private:
-  std::u16string units_;
+  // Code units, followed by a zero. Names, numbers and words fit into the string itself, so that a
+  // host that asks for forty texts at once does not pay for forty allocations. Texts that are given
+  // may be parts of this one.
+  class Units {
+   public:
+    Units() = default;
+    inline Units(const Units& inOther);
+    inline Units(Units&& ioOther) noexcept;
+    inline Units& operator=(const Units& inOther);
+    inline Units& operator=(Units&& ioOther) noexcept;
+    inline ~Units();
+
+    operator std::u16string_view() const { return {data_, size_}; }
+    const char16_t* data() const { return data_; }
+    std::size_t size() const { return size_; }
+    bool empty() const { return size_ == 0; }
+    char16_t operator[](std::size_t inPosition) const { return data_[inPosition]; }
+
+    inline void Assign(std::u16string_view inText);
+    inline void Append(std::u16string_view inTail);
+    void Replace(std::size_t inPosition, std::size_t inCount, std::u16string_view inText);
+    void Reserve(std::size_t inCount);
+    // Makes room for a text of so many units, to be written there; the former one is lost.
+    inline char16_t* Renew(std::size_t inCount);
+    // Leaves the first units only.
+    inline void Cut(std::size_t inCount);
+
+   private:
+    static constexpr std::size_t kInline = 23;
+
+    void Grow(std::size_t inCapacity);
+    inline void Release() noexcept;
+    inline void TakeFrom(Units& ioOther) noexcept;
+
+    char16_t* data_ = inline_;
+    std::size_t size_ = 0;
+    std::size_t capacity_ = kInline;
+    char16_t inline_[kInline + 1] = {};
+  };
+
+  Units units_;
   mutable std::unique_ptr<std::string> narrow_;  // made when the narrow form is first asked for
 };
 

@@ -163,7 +163,7 @@ TEST(ZORUnicodeString, MoveLeavesTheSourceEmpty) {
   ZORUnicodeString first("a text that is too long to lie inside the string");
   first.ConvertToChar();
   const ZORUnicodeString second(std::move(first));
-  EXPECT_EQ(first.GetLengthInChar(), 0);
+  EXPECT_EQ(first.GetLengthInChar(), 0);  // NOLINT(bugprone-use-after-move): empty then
   EXPECT_STREQ(first.ConvertToChar(), "");
   EXPECT_TRUE(second == "a text that is too long to lie inside the string");
 }
@@ -172,7 +172,7 @@ TEST(ZORUnicodeString, MoveAssignmentLeavesTheSourceEmpty) {
   ZORUnicodeString source("ab"), target("xyz");
   target.ConvertToChar();
   target = std::move(source);
-  EXPECT_EQ(source.GetLengthInChar(), 0);
+  EXPECT_EQ(source.GetLengthInChar(), 0);  // NOLINT(bugprone-use-after-move): empty then
   EXPECT_STREQ(target.ConvertToChar(), "ab");
 }
 
@@ -357,6 +357,52 @@ TEST(ZORUnicodeString, ReserveKeepsTheTextInPlaceWhileAppending) {
   EXPECT_EQ(text.ConvertToUCChar(), before);
   text.Reserve(0);
   EXPECT_EQ(text.GetLengthInChar(), 1000);
+}
+
+// Short texts lie in the string itself, longer ones on the heap; what is given may be part of the
+// text that changes.
+TEST(ZORUnicodeString, TextsOfAllLengthsChangeAndMoveAlike) {
+  for (std::size_t length = 0; length <= 60; ++length) {
+    std::u16string expected;
+    for (std::size_t i = 0; i < length; ++i) expected += static_cast<char16_t>(u'a' + i);
+    const ZORUnicodeString text = FromUnits(expected);
+    const std::size_t half = length / 2;
+    const std::u16string tail = expected.substr(half);
+
+    ZORUnicodeString copy(text);
+    EXPECT_EQ(UnitsOf(copy.Append(copy)), expected + expected);
+    EXPECT_EQ(UnitsOf(copy = text), expected);
+    EXPECT_EQ(UnitsOf(copy.AppendUTF16(copy.ConvertToUCChar(), half)),
+              expected + expected.substr(0, half));
+    copy = text;
+    EXPECT_EQ(UnitsOf(copy.Insert(static_cast<int>(half), copy)),
+              expected.substr(0, half) + expected + tail);
+    copy = text;
+    if (length > 0) copy.BuildFromUTF16(copy.ConvertToUCChar() + half, length - half);
+    EXPECT_EQ(UnitsOf(copy), tail);
+
+    ZORUnicodeString moved(std::move(copy));
+    EXPECT_EQ(UnitsOf(moved), tail);
+    EXPECT_EQ(UnitsOf(copy), u"");  // NOLINT(bugprone-use-after-move): empty then
+    copy = text;
+    moved = std::move(copy);
+    EXPECT_EQ(UnitsOf(moved), expected);
+    EXPECT_EQ(UnitsOf(copy += ZORUnicodeChar('z')), u"z");  // NOLINT(bugprone-use-after-move)
+    copy = moved;
+    moved += "!";
+    EXPECT_EQ(UnitsOf(copy), expected);
+    EXPECT_EQ(UnitsOf(moved), expected + u"!");
+  }
+}
+
+TEST(ZORUnicodeString, BuildFromLatin1TakesEveryByteAsACharacter) {
+  std::string bytes;
+  for (int length = 0; length <= 40; ++length) {
+    ZORUnicodeString text("before");
+    text.BuildFromLatin1(bytes.data(), bytes.size());
+    ASSERT_EQ(UnitsOf(text), std::u16string(bytes.size(), u'\u00E9'));
+    bytes += '\xE9';
+  }
 }
 
 TEST(ZORUnicodeChar, KeepsAnyUnit) {
