@@ -144,15 +144,9 @@ std::vector<std::string> TomlCandidates(const std::vector<std::string>& inDirect
   return paths;
 }
 
-std::optional<FoundFile> FindFirst(const std::vector<std::string>& inPaths) {
-  for (const std::string& path : inPaths)
-    if (const auto stamp = ZORFoundation::StampOfFile(path)) return FoundFile{path, *stamp};
-  return std::nullopt;
-}
-
 std::shared_ptr<const TomlTable> ReadSettingFile(std::string_view inFolder,
                                                  std::string_view inName) {
-  return SettingFiles().Get(FindFirst(TomlCandidates(SettingDirectories(), inFolder, inName)));
+  return SettingFiles().GetFirst(TomlCandidates(SettingDirectories(), inFolder, inName));
 }
 
 }  // namespace ZORDefault

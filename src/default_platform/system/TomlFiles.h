@@ -10,6 +10,7 @@
 #include <string>
 #include <string_view>
 #include <unordered_map>
+#include <utility>
 #include <variant>
 #include <vector>
 
@@ -27,12 +28,6 @@ using TomlTable = std::map<std::string, TomlValue, std::less<>>;
 /// @return the entries, or null when the text is not TOML.
 std::shared_ptr<const TomlTable> ParseToml(std::string_view inText);
 
-/// A file that was found, and the stamp that it had then.
-struct FoundFile {
-  std::string path;
-  ZORFoundation::FileStamp stamp;
-};
-
 /// Directories of message catalogues, the first to be looked into first, from the environment as it
 /// is now; below each there is a folder for each language.
 std::vector<std::string> CatalogueDirectories();
@@ -41,9 +36,6 @@ std::vector<std::string> CatalogueDirectories();
 /// that of one file in a directory.
 std::vector<std::string> TomlCandidates(const std::vector<std::string>& inDirectories,
                                         std::string_view inFolder, std::string_view inName);
-/// The first of these files that exists now.
-std::optional<FoundFile> FindFirst(const std::vector<std::string>& inPaths);
-
 /// The entries of the first NAME.toml among the setting directories; null when there is none or it
 /// is damaged.
 std::shared_ptr<const TomlTable> ReadSettingFile(std::string_view inFolder,
@@ -64,14 +56,13 @@ class FileCache {
 
   explicit FileCache(Reader inReader) : reader_(inReader) {}
 
-  /// @return null when there is no file, or it cannot be read or parsed. Raises FileError when the
+  /// The content of the first of these files that exists now.
+  /// @return null when there is none, or it cannot be read or parsed. Raises FileError when the
   /// system is short of what reading takes: what the file says is not known then.
-  Pointer Get(const std::optional<FoundFile>& inFile) {
-    if (!inFile) return nullptr;
-    const std::lock_guard lock(mutex_);
-    Entry& entry = entries_[inFile->path];
-    if (!entry.isSettled || entry.stamp != inFile->stamp) Read(inFile->path, entry);
-    return entry.content;
+  Pointer GetFirst(const std::vector<std::string>& inPaths) {
+    for (const std::string& path : inPaths)
+      if (const auto stamp = ZORFoundation::StampOfFile(path)) return Get(path, *stamp);
+    return nullptr;
   }
 
  private:
@@ -80,6 +71,14 @@ class FileCache {
     bool isSettled = false;
     Pointer content;
   };
+
+  Pointer Get(const std::string& inPath, const ZORFoundation::FileStamp& inStamp) {
+    const std::lock_guard lock(mutex_);
+    if (last_ == nullptr || last_->first != inPath) last_ = &*entries_.try_emplace(inPath).first;
+    Entry& entry = last_->second;
+    if (!entry.isSettled || entry.stamp != inStamp) Read(inPath, entry);
+    return entry.content;
+  }
 
   void Read(const std::string& inPath, Entry& outEntry) {
     constexpr std::int64_t kSettlingTime = 50'000'000;  // some ticks of a file system's clock
@@ -95,6 +94,7 @@ class FileCache {
   Reader reader_;
   std::mutex mutex_;
   std::unordered_map<std::string, Entry> entries_;
+  std::pair<const std::string, Entry>* last_ = nullptr;  // mostly asked for again
 };
 
 }  // namespace ZORDefault

@@ -6,11 +6,12 @@
 
 #include <array>
 #include <cstring>
-#include <map>
+#include <functional>
 #include <memory>
 #include <mutex>
 #include <string>
 #include <string_view>
+#include <unordered_map>
 #include <utility>
 #include <vector>
 
@@ -19,7 +20,14 @@
 #include "platform/system/ZORMsg.h"
 
 struct ZORMsgCatalog::Messages {
-  std::map<std::string, ZORMsg, std::less<>> byKey;
+  // Looked up by views.
+  struct Hash {
+    using is_transparent = void;
+    std::size_t operator()(std::string_view inKey) const {
+      return std::hash<std::string_view>()(inKey);
+    }
+  };
+  std::unordered_map<std::string, ZORMsg, Hash, std::equal_to<>> byKey;
 };
 
 namespace {
@@ -61,12 +69,13 @@ std::string LanguageOf(std::string_view inLocale) {
 
 // What the environment says now about where a catalogue is: null for a variable that is not set.
 struct SearchVariables {
-  std::array<const char*, 4> languages{};  // the first that is not empty counts
+  std::array<const char*, 4> languages{};
   const char* path = nullptr;
 
-  std::string Language() const {
+  // The first language that is not empty counts.
+  std::string_view Locale() const {
     for (const char* const value : languages)
-      if (value && *value) return LanguageOf(value);
+      if (value && *value) return value;
     return "en";
   }
 };
@@ -75,6 +84,12 @@ constexpr std::array<std::string_view, 4> kLanguageVariables = {"ZOR_LANG", "LC_
 constexpr std::string_view kPathVariable = "ZOR_CATALOGUE_PATH";
 
 #ifdef __unix__
+
+// Whether an entry begins as one of the variables does, which few others do.
+bool MayBeVariable(const char* inEntry) {
+  return (inEntry[0] == 'Z' && inEntry[1] == 'O') ||
+         (inEntry[0] == 'L' && (inEntry[1] == 'A' || inEntry[1] == 'C'));
+}
 
 // One pass over the environment in place of one for each variable: each call of a host asks.
 SearchVariables ReadSearchVariables() {
@@ -85,7 +100,7 @@ SearchVariables ReadSearchVariables() {
       ioValue = inEntry + inName.size() + 1;
   };
   for (char** entry = environ; entry != nullptr && *entry != nullptr; ++entry) {
-    if (**entry != 'Z' && **entry != 'L') continue;
+    if (!MayBeVariable(*entry)) continue;
     for (std::size_t i = 0; i < found.languages.size(); ++i)
       keep(*entry, kLanguageVariables[i], found.languages[i]);
     keep(*entry, kPathVariable, found.path);
@@ -109,7 +124,7 @@ SearchVariables ReadSearchVariables() {
 // hundred thousand times: the last answer holds as long as the environment does.
 std::shared_ptr<const std::vector<std::string>> CandidatesOf(const char* inName) {
   struct Search {
-    std::string name, language, path;
+    std::string name, locale, path;
     std::shared_ptr<const std::vector<std::string>> files;
   };
   static std::mutex mutex;
@@ -117,21 +132,23 @@ std::shared_ptr<const std::vector<std::string>> CandidatesOf(const char* inName)
   const std::lock_guard lock(mutex);
   Search& last = *lastOfAll;
   const SearchVariables variables = ReadSearchVariables();
-  const std::string language = variables.Language();
+  const std::string_view locale = variables.Locale();
   const std::string_view pathNow = variables.path == nullptr ? "" : variables.path;
-  if (last.name == inName && last.language == language && last.path == pathNow) return last.files;
+  if (last.files != nullptr && last.name == inName && last.locale == locale && last.path == pathNow)
+    return last.files;
+  const std::string language = LanguageOf(locale);
   const std::vector<std::string> directories = ZORDefault::CatalogueDirectories();
   auto files = std::make_shared<std::vector<std::string>>(
       ZORDefault::TomlCandidates(directories, language + "/", inName));
   for (std::string& file : ZORDefault::TomlCandidates(directories, "en/", inName))
     files->push_back(std::move(file));
-  last = Search{inName, language, std::string(pathNow), std::move(files)};
+  last = Search{inName, std::string(locale), std::string(pathNow), std::move(files)};
   return last.files;
 }
 
 MessagesPointer FindMessages(const char* inName) {
   if (!inName) return nullptr;
-  return CatalogueFiles().Get(ZORDefault::FindFirst(*CandidatesOf(inName)));
+  return CatalogueFiles().GetFirst(*CandidatesOf(inName));
 }
 
 }  // namespace
