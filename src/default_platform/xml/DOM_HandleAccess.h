@@ -21,6 +21,10 @@ class DOM_HandleAccess {
   static DOM_Tree* TreeOf(const DOM_Node& inHandle) { return inHandle.tree_; }
   static DOM_Tree::Node NodeOf(const DOM_Node& inHandle) { return inHandle.node_; }
   static DOM_Tree::Attribute AttributeOf(const DOM_Node& inHandle) { return inHandle.attribute_; }
+  static bool IsElement(const DOM_Node& inHandle) {
+    return inHandle.tree_ != nullptr && inHandle.attribute_ == 0 &&
+           inHandle.tree_->At(inHandle.node_).kind == DOM_Node::ELEMENT_NODE;
+  }
 
   /// @return a null handle for the node 0.
   static DOM_Node Handle(DOM_Tree* inTree, DOM_Tree::Node inNode) {

@@ -32,12 +32,24 @@ const DOMString& KindName(int inKind) {
   }
 }
 
-DOM_Tree::Attribute FindNarrow(const DOM_Tree& inTree, DOM_Tree::Node inElement,
-                               const char* inName) {
+DOM_Tree::Attribute FindBeyondAscii(const DOM_Tree& inTree, DOM_Tree::Node inElement,
+                                    const char* inName) {
+  if (ZORFoundation::IsAscii(inName)) return 0;
+  return inTree.FindAttribute(inElement, DOM_HandleAccess::View(DOMString(inName)));
+}
+
+inline DOM_Tree::Attribute FindNarrow(const DOM_Tree& inTree, DOM_Tree::Node inElement,
+                                      const char* inName) {
   if (inName == nullptr) return 0;
   const DOM_Tree::Attribute attribute = inTree.FindAttribute(inElement, inName);
-  if (attribute != 0 || ZORFoundation::IsAscii(inName)) return attribute;
-  return inTree.FindAttribute(inElement, DOM_HandleAccess::View(DOMString(inName)));
+  return attribute != 0 ? attribute : FindBeyondAscii(inTree, inElement, inName);
+}
+
+// Most comparisons end at the first character, which no call is worth.
+bool IsSameName(std::u16string_view inName, const char* inAscii) {
+  for (const char16_t unit : inName)
+    if (unit != static_cast<unsigned char>(*inAscii++)) return false;
+  return *inAscii == '\0';
 }
 
 [[noreturn]] void RefuseNull() {
@@ -240,13 +252,14 @@ DOM_Node DOM_Node::getNextElementSibling() const {
 }
 
 bool DOM_Node::hasName(const char* inAscii) const {
-  if (inAscii == nullptr || getNodeType() != ELEMENT_NODE) return getNodeName().equals(inAscii);
-  return IsSameText(tree_->NameUnits(tree_->At(node_).name), inAscii);
+  if (inAscii == nullptr || !DOM_HandleAccess::IsElement(*this))
+    return getNodeName().equals(inAscii);
+  return IsSameName(tree_->NameUnits(tree_->At(node_).name), inAscii);
 }
 
 void DOM_Node::getAttributeText(const char* inName, ZORUnicodeString& outText) const {
   const DOM_Tree::Attribute attribute =
-      getNodeType() == ELEMENT_NODE ? FindNarrow(*tree_, node_, inName) : 0;
+      DOM_HandleAccess::IsElement(*this) ? FindNarrow(*tree_, node_, inName) : 0;
   if (attribute == 0)
     outText.BuildFromUTF16(nullptr, 0);
   else

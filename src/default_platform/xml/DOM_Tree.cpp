@@ -19,13 +19,6 @@ DOM_Tree::DOM_Tree() : serial_(NextSerial()), names_(texts_) {
   NewNode(DOM_Node::DOCUMENT_NODE, 0, 0);
 }
 
-DOM_Tree::Node DOM_Tree::NextWithin(Node inNode, Node inRoot) const {
-  const Node child = FirstChild(inNode);
-  if (child != 0) return child;
-  while (inNode != inRoot && At(inNode).next == 0) inNode = At(inNode).parent;
-  return inNode == inRoot ? 0 : At(inNode).next;
-}
-
 DOM_Tree::Node DOM_Tree::FirstChildOfKind(Node inParent, int inKind) const {
   Node child = FirstChild(inParent);
   while (child != 0 && At(child).kind != inKind) child = At(child).next;
@@ -98,28 +91,11 @@ DOM_Tree::Attribute DOM_Tree::FindAttribute(Node inElement, TextView inName) con
 
 // ---- making
 
-DOM_Tree::Node DOM_Tree::TakeNode() {
-  if (freeNode_ == 0) return nodes_.Add();
-  const Node node = freeNode_;
-  freeNode_ = nodes_[node].next;
-  return node;
-}
-
-DOM_Tree::Attribute DOM_Tree::TakeAttribute() {
+inline DOM_Tree::Attribute DOM_Tree::TakeAttribute() {
   if (freeAttribute_ == 0) return attributes_.Add();
   const Attribute attribute = freeAttribute_;
   freeAttribute_ = attributes_[attribute].next;
   return attribute;
-}
-
-DOM_Tree::Node DOM_Tree::NewNode(int inKind, Name inName, TextRef inText) {
-  const Node node = TakeNode();
-  NodeRecord& record = nodes_[node];
-  record = NodeRecord();
-  record.kind = static_cast<std::uint32_t>(inKind) & 0xF;
-  record.name = inName & (NameTable::kMaxNames - 1);
-  if (HasText(inKind)) record.text = inText;
-  return node;
 }
 
 DOM_Tree::Node DOM_Tree::NewDetached(int inKind, Name inName, TextRef inText) {
@@ -128,16 +104,6 @@ DOM_Tree::Node DOM_Tree::NewDetached(int inKind, Name inName, TextRef inText) {
   nodes_[node].flags = kDetached;
   detached_.AddNode(node, group);
   ListRoot(node, group);
-  return node;
-}
-
-DOM_Tree::Node DOM_Tree::AppendNew(Node inParent, Node inLast, int inKind, Name inName,
-                                   TextRef inText) {
-  const Node node = NewNode(inKind, inName, inText);
-  NodeRecord& record = nodes_[node];
-  record.parent = inParent;
-  record.previous = inLast == 0 ? node : inLast;
-  (inLast == 0 ? nodes_[inParent].firstChild : nodes_[inLast].next) = node;
   return node;
 }
 
@@ -158,7 +124,7 @@ void DOM_Tree::ImportFrom(const DOM_Tree& inSource) {
   importedTexts_.assign(kImportedTexts, {});
 }
 
-DOM_Tree::Name DOM_Tree::NameFrom(const DOM_Tree& inSource, Name inName) {
+inline DOM_Tree::Name DOM_Tree::NameFrom(const DOM_Tree& inSource, Name inName) {
   if (&inSource == this || inName == 0) return inName;
   if (inName >= importedNames_.size()) importedNames_.resize(inSource.NameEnd());
   Name& name = importedNames_[inName];
@@ -166,22 +132,17 @@ DOM_Tree::Name DOM_Tree::NameFrom(const DOM_Tree& inSource, Name inName) {
   return name;
 }
 
-TextRef DOM_Tree::TextFrom(const DOM_Tree& inSource, TextRef inText) {
+inline TextRef DOM_Tree::TextFrom(const DOM_Tree& inSource, TextRef inText) {
   if (&inSource == this) return inText;
   ImportedText& known = importedTexts_[inText % kImportedTexts];
   if (known.from != inText) known = {inText, texts_.AddStored(inSource.texts_[inText].View())};
   return known.here;
 }
 
-DOM_Tree::Node DOM_Tree::CopyOne(const DOM_Tree& inSource, Node inNode,
-                                 DetachedNodes::Group inGroup) {
-  const NodeRecord& from = inSource.At(inNode);
-  const TextRef text = HasText(from.kind) ? TextFrom(inSource, from.text) : 0;
-  const Node copy = NewNode(from.kind, NameFrom(inSource, from.name), text);
-  nodes_[copy].flags = kDetached;
-  detached_.AddNode(copy, inGroup);
-  Attribute* link = &nodes_[copy].firstAttribute;
-  for (Attribute at = from.firstAttribute; at != 0;) {
+void DOM_Tree::ImportAttributes(const DOM_Tree& inSource, const NodeRecord& inFrom,
+                                NodeRecord& outTo) {
+  Attribute* link = &outTo.firstAttribute;
+  for (Attribute at = inFrom.firstAttribute; at != 0;) {
     const AttributeRecord attribute = inSource.attributes_[at];
     const TextRef value = TextFrom(inSource, attribute.value);
     const Name name = NameFrom(inSource, attribute.name);
@@ -191,37 +152,71 @@ DOM_Tree::Node DOM_Tree::CopyOne(const DOM_Tree& inSource, Node inNode,
     link = &record.next;
     at = attribute.next;
   }
+}
+
+inline void DOM_Tree::CopyAttributes(const NodeRecord& inFrom, NodeRecord& outTo) {
+  Attribute* link = &outTo.firstAttribute;
+  for (Attribute at = inFrom.firstAttribute; at != 0;) {
+    const AttributeRecord& attribute = attributes_[at];
+    const Attribute copy = TakeAttribute();
+    AttributeRecord& record = attributes_[copy];
+    record = {attribute.value, attribute.name, 0};
+    *link = copy;
+    link = &record.next;
+    at = attribute.next;
+  }
+}
+
+inline DOM_Tree::NodeRecord& DOM_Tree::CopyOne(const DOM_Tree& inSource, const NodeRecord& inFrom,
+                                               DetachedNodes::Group inGroup, Node& outCopy) {
+  const TextRef text = HasText(inFrom.kind) ? TextFrom(inSource, inFrom.text) : 0;
+  outCopy = NewNode(inFrom.kind, NameFrom(inSource, inFrom.name), text);
+  NodeRecord& copy = nodes_[outCopy];
+  copy.flags = kDetached;
+  detached_.AddNode(outCopy, inGroup);
+  if (&inSource == this)
+    CopyAttributes(inFrom, copy);
+  else
+    ImportAttributes(inSource, inFrom, copy);
   return copy;
 }
 
 DOM_Tree::Node DOM_Tree::Copy(const DOM_Tree& inSource, Node inNode, bool inDeep) {
   ImportFrom(inSource);
   const DetachedNodes::Group group = detached_.NewGroup();
-  const Node root = CopyOne(inSource, inNode, group);
+  Node root = 0;
+  NodeRecord& rootRecord = CopyOne(inSource, inSource.At(inNode), group, root);
   ListRoot(root, group);
-  Node parent = root;  // the copy of the parent of what is copied next
-  Node last = 0;       // the last child of that copy so far
+  Node parent = root;                   // the copy of the parent of what is copied next
+  Node last = 0;                        // the last child of that copy so far
+  Node* link = &rootRecord.firstChild;  // where the next copy is put
   Node from = inDeep ? inSource.FirstChild(inNode) : 0;
   while (from != 0) {
-    const Node copy = CopyOne(inSource, from, group);
-    NodeRecord& record = nodes_[copy];
+    const NodeRecord& source = inSource.At(from);
+    NodeRecord& record = CopyOne(inSource, source, group, *link);
+    const Node copy = *link;
     record.parent = parent;
     record.previous = last == 0 ? copy : last;
-    (last == 0 ? nodes_[parent].firstChild : nodes_[last].next) = copy;
-    last = copy;
-    if (const Node child = inSource.FirstChild(from); child != 0) {
+    if (MayHaveChildren(source.kind) && source.firstChild != 0) {
       parent = copy;
       last = 0;
-      from = child;
+      link = &record.firstChild;
+      from = source.firstChild;
       continue;
     }
-    while (from != inNode && inSource.At(from).next == 0) {
+    last = copy;
+    link = &record.next;
+    from = source.next;
+    for (const NodeRecord* up = &source; from == 0;) {
       EndChildren(parent, last);
+      if (up->parent == inNode) break;
       last = parent;
-      parent = nodes_[parent].parent;
-      from = inSource.At(from).parent;
+      NodeRecord& lastRecord = nodes_[last];
+      parent = lastRecord.parent;
+      link = &lastRecord.next;
+      up = &inSource.At(up->parent);
+      from = up->next;
     }
-    from = from == inNode ? 0 : inSource.At(from).next;
   }
   return root;
 }

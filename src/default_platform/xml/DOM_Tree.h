@@ -27,7 +27,7 @@ class ChunkedRecords {
   const Record& operator[](std::uint32_t inNumber) const {
     return chunks_[inNumber >> kChunkBits][inNumber & (kChunkSize - 1)];
   }
-  /// The number of a new record; its content is undefined.
+  /// The number of a new record, one more than that of the last; its content is undefined.
   std::uint32_t Add() {
     if ((end_ >> kChunkBits) >= chunks_.size()) {
       if (end_ > std::numeric_limits<std::uint32_t>::max() - kChunkSize)
@@ -186,6 +186,8 @@ class DOM_Tree {
   }
   /// @param inLast the element's last attribute so far, 0 for none.
   Attribute AppendNewAttribute(Node inElement, Attribute inLast, Name inName, TextRef inValue);
+  /// The attributes of an element that has none yet; what they say of a next one does not count.
+  void SetNewAttributes(Node inElement, const std::vector<AttributeRecord>& inAttributes);
   void SetDoctype(const DocumentType& inDoctype) { doctype_ = inDoctype; }
 
   // Changing
@@ -205,7 +207,10 @@ class DOM_Tree {
   Node TakeNode();
   Attribute TakeAttribute();
   Node NewNode(int inKind, Name inName, TextRef inText);
-  Node CopyOne(const DOM_Tree& inSource, Node inNode, DetachedNodes::Group inGroup);
+  NodeRecord& CopyOne(const DOM_Tree& inSource, const NodeRecord& inFrom,
+                      DetachedNodes::Group inGroup, Node& outCopy);
+  void CopyAttributes(const NodeRecord& inFrom, NodeRecord& outTo);
+  void ImportAttributes(const DOM_Tree& inSource, const NodeRecord& inFrom, NodeRecord& outTo);
   Name NameFrom(const DOM_Tree& inSource, Name inName);
   TextRef TextFrom(const DOM_Tree& inSource, TextRef inText);
   void ImportFrom(const DOM_Tree& inSource);
@@ -247,7 +252,7 @@ class DOM_Tree {
   NameTable names_;
   ChunkedRecords<NodeRecord> nodes_;
   ChunkedRecords<AttributeRecord> attributes_;
-  Node freeNode_ = 0;            // chained by next
+  Node freeNode_ = 0;            // chained by previous
   Attribute freeAttribute_ = 0;  // chained by next
   DocumentType doctype_;
   DetachedNodes detached_;
@@ -263,6 +268,51 @@ class DOM_Tree {
   };
   std::vector<ImportedText> importedTexts_;  // by the last bits of their number there
 };
+
+inline DOM_Tree::Node DOM_Tree::NextWithin(Node inNode, Node inRoot) const {
+  const Node child = FirstChild(inNode);
+  if (child != 0) return child;
+  while (inNode != inRoot && At(inNode).next == 0) inNode = At(inNode).parent;
+  return inNode == inRoot ? 0 : At(inNode).next;
+}
+
+inline DOM_Tree::Node DOM_Tree::TakeNode() {
+  if (freeNode_ == 0) return nodes_.Add();
+  const Node node = freeNode_;
+  freeNode_ = nodes_[node].previous;
+  return node;
+}
+
+inline DOM_Tree::Node DOM_Tree::NewNode(int inKind, Name inName, TextRef inText) {
+  const Node node = TakeNode();
+  NodeRecord& record = nodes_[node];
+  record = NodeRecord();
+  record.kind = static_cast<std::uint32_t>(inKind) & 0xF;
+  record.name = inName & (NameTable::kMaxNames - 1);
+  if (HasText(inKind)) record.text = inText;
+  return node;
+}
+
+inline DOM_Tree::Node DOM_Tree::AppendNew(Node inParent, Node inLast, int inKind, Name inName,
+                                          TextRef inText) {
+  const Node node = NewNode(inKind, inName, inText);
+  NodeRecord& record = nodes_[node];
+  record.parent = inParent;
+  record.previous = inLast == 0 ? node : inLast;
+  (inLast == 0 ? nodes_[inParent].firstChild : nodes_[inLast].next) = node;
+  return node;
+}
+
+inline void DOM_Tree::SetNewAttributes(Node inElement,
+                                       const std::vector<AttributeRecord>& inAttributes) {
+  Attribute* link = &nodes_[inElement].firstAttribute;
+  for (const AttributeRecord& attribute : inAttributes) {
+    *link = attributes_.Add();
+    AttributeRecord& record = attributes_[*link];
+    record = {attribute.value, attribute.name, 0};
+    link = &record.next;
+  }
+}
 
 inline bool DOM_Tree::HasText(int inKind) {
   return inKind == DOM_Node::TEXT_NODE || inKind == DOM_Node::CDATA_SECTION_NODE ||

@@ -114,23 +114,12 @@ void DOM_Tree::Reclaim(DetachedNodes::Group inGroup) noexcept {
   detached_.FreeGroup(inGroup);
 }
 
-// Children first, so that a node's links are still there when they are followed.
+// A node that was freed keeps the links by which the next one is found.
 void DOM_Tree::FreeSubtree(Node inRoot) {
-  const auto firstLeaf = [this](Node inNode) {
-    for (Node child = FirstChild(inNode); child != 0; child = FirstChild(inNode)) inNode = child;
-    return inNode;
-  };
-  Node at = firstLeaf(inRoot);
-  while (at != inRoot) {
-    const NodeRecord& record = At(at);
-    const Node next = record.next == 0 ? record.parent : firstLeaf(record.next);
-    FreeOne(at);
-    at = next;
-  }
-  FreeOne(inRoot);
+  for (Node at = inRoot; at != 0; at = NextWithin(at, inRoot)) FreeOne(at);
 }
 
-void DOM_Tree::FreeOne(Node inNode) {
+inline void DOM_Tree::FreeOne(Node inNode) {
   NodeRecord& record = nodes_[inNode];
   if (Attribute last = record.firstAttribute; last != 0) {
     while (attributes_[last].next != 0) last = attributes_[last].next;
@@ -140,8 +129,7 @@ void DOM_Tree::FreeOne(Node inNode) {
   if (cursor_.element == inNode) cursor_ = AttributeCursor();
   if (record.flags & kIndexed) indexes_.Drop(inNode);
   detached_.RemoveNode(inNode);
-  record = NodeRecord();
   record.flags = kFree;
-  record.next = freeNode_;
+  record.previous = freeNode_;
   freeNode_ = inNode;
 }

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <limits>
 #include <stdexcept>
+#include <utility>
 
 #include "foundation/Utf8.h"
 
@@ -21,7 +22,8 @@ bool IsLatin1(std::u16string_view inUnits) {
 // Stored texts are as narrow as they can be, so equal ones have units of one size.
 bool AreSameAsStored(TextView inA, TextView inB) {
   return inA.IsWide() == inB.IsWide() && inA.Length() == inB.Length() &&
-         (inA.Length() == 0 || std::memcmp(inA.Data(), inB.Data(), inA.Bytes()) == 0);
+         AreSameBytes(static_cast<const char*>(inA.Data()), static_cast<const char*>(inB.Data()),
+                      inA.Bytes());
 }
 
 }  // namespace
@@ -75,7 +77,7 @@ TextRef TextStore::AddShared(TextView inText) {
 
 TextRef TextStore::Add(std::string_view inLatin1, TextSeries& ioSeries) {
   if (ioSeries.last != nullptr && ioSeries.last->head == inLatin1.size() &&
-      std::memcmp(ioSeries.last->Latin1(), inLatin1.data(), inLatin1.size()) == 0) {
+      AreSameBytes(ioSeries.last->Latin1(), inLatin1.data(), inLatin1.size())) {
     ioSeries.newInARow = 0;
     return ioSeries.lastRef;
   }
@@ -94,9 +96,9 @@ TextRef TextStore::AddUnshared(TextView inText) {
   if (inText.Length() > DOM_Text::kMaxLength)
     throw std::length_error("a text is longer than 2,147,483,647 characters");
   const TextRef ref = Allocate(sizeof(DOM_Text) + inText.Bytes());
-  char* const place = pages_[ref >> kPageBits] + (ref & (kPageSteps - 1)) * kStep;
   const auto length = static_cast<std::uint32_t>(inText.Length());
-  DOM_Text* const text = new (place) DOM_Text{inText.IsWide() ? length | DOM_Text::kWide : length};
+  DOM_Text* const text =
+      new (PlaceOf(ref)) DOM_Text{inText.IsWide() ? length | DOM_Text::kWide : length};
   if (length != 0) std::memcpy(text + 1, inText.Data(), inText.Bytes());
   return ref;
 }
@@ -107,12 +109,32 @@ const DOM_Text* TextStore::AddWide(std::u16string_view inUnits) {
 
 const char16_t* TextStore::Widen(const DOM_Text& inText) {
   if (inText.IsWide()) return inText.Units();
-  std::unique_ptr<char16_t[]>& units = widened_[&inText];
-  if (!units) {
-    units.reset(new char16_t[inText.Length()]);
-    inText.View().CopyTo(units.get());
+  if (widenedCount_ * 2 >= widened_.size()) GrowWidened();
+  Widened& known = SlotOf(&inText);
+  if (known.narrow == nullptr) {
+    const TextRef ref = Allocate(sizeof(DOM_Text) + inText.Length() * sizeof(char16_t));
+    DOM_Text* const wide = new (PlaceOf(ref)) DOM_Text{inText.Length() | DOM_Text::kWide};
+    inText.View().CopyTo(wide->Units());
+    known = {&inText, wide};
+    ++widenedCount_;
   }
-  return units.get();
+  return known.wide->Units();
+}
+
+TextStore::Widened& TextStore::SlotOf(const DOM_Text* inNarrow) {
+  const std::size_t mask = widened_.size() - 1;
+  const auto address = reinterpret_cast<std::uintptr_t>(inNarrow);
+  std::size_t slot = HashOfBytes(&address, sizeof address) & mask;
+  while (widened_[slot].narrow != nullptr && widened_[slot].narrow != inNarrow)
+    slot = (slot + 1) & mask;
+  return widened_[slot];
+}
+
+void TextStore::GrowWidened() {
+  const std::vector<Widened> before =
+      std::exchange(widened_, std::vector<Widened>(std::max(widened_.size() * 2, kFirstSlots)));
+  for (const Widened& known : before)
+    if (known.narrow != nullptr) SlotOf(known.narrow) = known;
 }
 
 TextRef TextStore::Allocate(std::size_t inBytes) {

@@ -9,10 +9,39 @@
 #include <memory>
 #include <string>
 #include <string_view>
-#include <unordered_map>
 #include <vector>
 
 #include "default_platform/xml/Latin1.h"
+
+/// Up to seven bytes as a number, different for different bytes of one count; free of calls.
+inline std::uint64_t ShortBytes(const char* inBytes, std::size_t inCount) {
+  if (inCount >= 4) {
+    std::uint32_t first = 0, last = 0;
+    std::memcpy(&first, inBytes, 4);
+    std::memcpy(&last, inBytes + inCount - 4, 4);
+    return first | std::uint64_t{last} << 32;
+  }
+  if (inCount == 0) return 0;
+  const auto byte = [&](std::size_t inAt) {
+    return std::uint64_t{static_cast<unsigned char>(inBytes[inAt])};
+  };
+  return byte(0) | byte(inCount / 2) << 8 | byte(inCount - 1) << 16;
+}
+
+/// As memcmp, without a call: most texts and names are short.
+inline bool AreSameBytes(const char* inA, const char* inB, std::size_t inCount) {
+  constexpr std::size_t kLong = 64;
+  if (inCount < 8) return ShortBytes(inA, inCount) == ShortBytes(inB, inCount);
+  if (inCount > kLong) return std::memcmp(inA, inB, inCount) == 0;
+  const auto eight = [](const char* inBytes) {
+    std::uint64_t bytes = 0;
+    std::memcpy(&bytes, inBytes, 8);
+    return bytes;
+  };
+  for (std::size_t i = 0; i + 8 < inCount; i += 8)
+    if (eight(inA + i) != eight(inB + i)) return false;
+  return eight(inA + inCount - 8) == eight(inB + inCount - 8);
+}
 
 /// As ==, which the standard library does unit by unit.
 inline bool IsSameText(std::u16string_view inA, std::u16string_view inB) {
@@ -102,9 +131,18 @@ class TextStore {
     std::uint64_t hash;
     TextRef text;
   };
+  struct Widened {
+    const DOM_Text* narrow = nullptr;
+    const DOM_Text* wide = nullptr;
+  };
+  Widened& SlotOf(const DOM_Text* inNarrow);
+  void GrowWidened();
   TextRef AddShared(TextView inText);
   TextRef AddUnshared(TextView inText);
   TextRef Allocate(std::size_t inBytes);
+  char* PlaceOf(TextRef inText) {
+    return pages_[inText >> kPageBits] + (inText & (kPageSteps - 1)) * kStep;
+  }
   void AddPages(std::size_t inBytes);
 
   static constexpr std::size_t kStep = 4;
@@ -120,7 +158,8 @@ class TextStore {
   TextRef end_ = 0;
   std::unique_ptr<Shared[]> shared_;
   std::string narrowed_;
-  std::unordered_map<const DOM_Text*, std::unique_ptr<char16_t[]>> widened_;
+  std::vector<Widened> widened_;  // open addressing; a power of two
+  std::size_t widenedCount_ = 0;
 };
 
 /// Numbers the names of a document: equal names have equal numbers, from 1.
@@ -165,21 +204,6 @@ class NameTable {
   // address, all ASCII.
   mutable std::array<Found, kFound> found_{};
 };
-
-/// Up to seven bytes as a number, different for different bytes of one count; free of calls.
-inline std::uint64_t ShortBytes(const char* inBytes, std::size_t inCount) {
-  if (inCount >= 4) {
-    std::uint32_t first = 0, last = 0;
-    std::memcpy(&first, inBytes, 4);
-    std::memcpy(&last, inBytes + inCount - 4, 4);
-    return first | std::uint64_t{last} << 32;
-  }
-  if (inCount == 0) return 0;
-  const auto byte = [&](std::size_t inAt) {
-    return std::uint64_t{static_cast<unsigned char>(inBytes[inAt])};
-  };
-  return byte(0) | byte(inCount / 2) << 8 | byte(inCount - 1) << 16;
-}
 
 /// A fast hash of bytes, eight at a time.
 inline std::uint64_t HashOfBytes(const void* inBytes, std::size_t inCount) {

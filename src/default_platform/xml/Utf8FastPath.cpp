@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <utility>
 
 #include "default_platform/xml/XMLChars.h"
 
@@ -30,7 +31,7 @@ Utf8FastPath::Utf8FastPath(ByteReader& ioReader, DOM_Tree& ioTree)
       windowBytes_(kFirstWindow),
       slots_(kFirstTexts) {
   at_ = end_ = window_.get();
-  open_.push_back({DOM_Tree::kDocument, 0, nullptr});
+  open_.push_back({DOM_Tree::kDocument, 0, nullptr, nullptr});
 }
 
 void Utf8FastPath::Read() {
@@ -126,10 +127,9 @@ void Utf8FastPath::SkipBlanks() {
 
 void Utf8FastPath::ReadStartTag() {
   const char* at = at_ + 1;
-  const char* const nameEnd = NameEnd(at);
   if (open_.size() == 1 && hasRoot_) throw NeedsFullScanner();
-  Name& name = FindName(at, nameEnd);
-  at = ReadAttributes(nameEnd, name);
+  Name& name = ReadElementName(at);
+  at = ReadAttributes(at, name);
   const bool isEmpty = *at == '/';
   if (at[isEmpty ? 1 : 0] != '>') Stop(at);
   if (open_.size() > kMaxDepth) throw NeedsFullScanner();
@@ -139,11 +139,29 @@ void Utf8FastPath::ReadStartTag() {
   const DOM_Tree::Node element =
       tree_.AppendNew(parent.node, parent.lastChild, DOM_Node::ELEMENT_NODE, name.number, 0);
   parent.lastChild = element;
-  DOM_Tree::Attribute last = 0;
-  for (const ReadAttribute& attribute : attributes_)
-    last = tree_.AppendNewAttribute(element, last, attribute.name, attribute.value);
+  parent.lastElement = &name;
+  tree_.SetNewAttributes(element, attributes_);
   at_ = at + (isEmpty ? 2 : 1);
-  if (!isEmpty) open_.push_back({element, 0, &name});
+  if (!isEmpty) open_.push_back({element, 0, &name, nullptr});
+}
+
+Utf8FastPath::Name& Utf8FastPath::ReadElementName(const char*& ioPlace) {
+  const auto find = [&]() -> Name& {
+    const char* const begin = std::exchange(ioPlace, NameEnd(ioPlace));
+    return FindName(begin, ioPlace);
+  };
+  if (open_.size() == 1) return find();
+  Name*& expected = open_.back().NextElement();
+  if (expected != nullptr && IsNext(ioPlace, *expected)) {
+    const char* const end = ioPlace + expected->utf8.size();
+    if (*end == '>' || *end == '/' || IsBlank(*end)) {
+      ioPlace = end;
+      return *expected;
+    }
+  }
+  Name& name = find();
+  expected = &name;
+  return name;
 }
 
 // Reads up to the end of the tag; what ends it is left to the caller.
@@ -170,7 +188,8 @@ const char* Utf8FastPath::ReadAttributes(const char* inPlace, Name& ioElement) {
     shape.name->element = element;
     if (*at != '=') Stop(at);
     at = AfterBlanks(at + 1);
-    attributes_.push_back({shape.name->number, ReadValue(at, shape.values)});
+    const TextRef value = ReadValue(at, shape.values);
+    attributes_.push_back({value, shape.name->number, 0});
   }
 }
 
@@ -183,7 +202,8 @@ TextRef Utf8FastPath::ReadValue(const char*& ioPlace, TextSeries& ioSeries) {
     ioPlace = at + 1;
     return tree_.AddText({value, static_cast<std::size_t>(at - value)}, ioSeries);
   }
-  text_.assign(value, at);
+  text_.clear();
+  AppendAscii(value, at);
   while (*at != quote) {
     if (*at == '<') Stop(at);
     if (*at == '&') {
@@ -194,6 +214,9 @@ TextRef Utf8FastPath::ReadValue(const char*& ioPlace, TextSeries& ioSeries) {
     } else {
       at = AppendCharacter(at);
     }
+    const char* const plain = search_.EndOfValue(at, quote);
+    AppendAscii(at, plain);
+    at = plain;
   }
   ioPlace = at + 1;
   return tree_.AddText(std::u16string_view(text_));
@@ -218,7 +241,7 @@ void Utf8FastPath::ReadEndTag() {
 
 bool Utf8FastPath::IsNext(const char* inPlace, const Name& inName) const {
   return end_ - inPlace > static_cast<std::ptrdiff_t>(inName.utf8.size()) &&
-         IsTextAt(inPlace, inName.utf8);
+         AreSameBytes(inPlace, inName.utf8.data(), inName.utf8.size());
 }
 
 const char* Utf8FastPath::NameEnd(const char* inPlace) const {
@@ -243,7 +266,9 @@ Utf8FastPath::Name& Utf8FastPath::FindName(const char* inPlace, const char* inEn
   std::size_t slot = hash & mask;
   for (; slots_[slot] != nullptr; slot = (slot + 1) & mask) {
     Name& known = *slots_[slot];
-    if (known.hash == hash && std::string_view(inPlace, length) == known.utf8) return known;
+    if (known.hash == hash && known.utf8.size() == length &&
+        AreSameBytes(inPlace, known.utf8.data(), length))
+      return known;
   }
   text_.clear();
   for (const char* at = inPlace; at != inEnd;) at = AppendCharacter(at);
@@ -277,12 +302,13 @@ void Utf8FastPath::AppendNode(int inKind, DOM_Tree::Name inName, TextRef inText)
 void Utf8FastPath::ReadText() {
   const char* at = search_.EndOfText(at_);
   if (*at == '<') {
-    AppendNode(DOM_Node::TEXT_NODE, 0,
-               tree_.AddText(std::string_view(at_, static_cast<std::size_t>(at - at_))));
+    const std::string_view text(at_, static_cast<std::size_t>(at - at_));
+    AppendNode(DOM_Node::TEXT_NODE, 0, tree_.AddText(text, open_.back().NextTexts()));
     at_ = at;
     return;
   }
-  text_.assign(at_, at);
+  text_.clear();
+  AppendAscii(at_, at);
   while (*at != '<') {
     if (*at == '&') {
       at = AppendReference(at);
@@ -291,11 +317,18 @@ void Utf8FastPath::ReadText() {
     if (*at == ']' && at[1] == ']' && at[2] == '>') throw NeedsFullScanner();
     at = AppendCharacter(at);
     const char* const plain = search_.EndOfText(at);
-    text_.append(at, plain);
+    AppendAscii(at, plain);
     at = plain;
   }
   AppendNode(DOM_Node::TEXT_NODE, 0, tree_.AddText(std::u16string_view(text_)));
   at_ = at;
+}
+
+void Utf8FastPath::AppendAscii(const char* inPlace, const char* inEnd) {
+  const std::size_t before = text_.size();
+  const auto count = static_cast<std::size_t>(inEnd - inPlace);
+  text_.resize(before + count);
+  WidenLatin1({inPlace, count}, text_.data() + before);
 }
 
 // Line ends become line feeds.

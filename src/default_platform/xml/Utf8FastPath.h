@@ -37,15 +37,19 @@ class Utf8FastPath {
     std::uint64_t hash;
     std::uint64_t element = 0;  // the last one that had an attribute of this name
     std::vector<AttributeShape> attributes;
+    // What followed the last time: the next time it very likely does again.
+    Name* firstChild = nullptr;   // the first element in an element of this name
+    Name* nextSibling = nullptr;  // the next element after one of this name
+    TextSeries firstTexts, nextTexts;
   };
   struct OpenElement {
     DOM_Tree::Node node;
     DOM_Tree::Node lastChild;
-    const Name* name;
-  };
-  struct ReadAttribute {
-    DOM_Tree::Name name;
-    TextRef value;
+    Name* name;
+    Name* lastElement;  // among the children
+
+    Name*& NextElement() { return lastElement ? lastElement->nextSibling : name->firstChild; }
+    TextSeries& NextTexts() { return lastElement ? lastElement->nextTexts : name->firstTexts; }
   };
   /// Raised where the bytes read so far end.
   struct EndOfWindow {};
@@ -71,11 +75,13 @@ class Utf8FastPath {
   // Parts of these; each returns where it ends
   const char* NameEnd(const char* inPlace) const;
   bool IsNext(const char* inPlace, const Name& inName) const;
+  Name& ReadElementName(const char*& ioPlace);
   Name& FindName(const char* inPlace, const char* inEnd);
   void GrowNames();
   TextRef ReadValue(const char*& ioPlace, TextSeries& ioSeries);
   const char* AppendCharacter(const char* inPlace);
   const char* AppendReference(const char* inPlace);
+  void AppendAscii(const char* inPlace, const char* inEnd);
   void AppendNode(int inKind, DOM_Tree::Name inName, TextRef inText);
 
   ByteReader& reader_;
@@ -91,7 +97,7 @@ class Utf8FastPath {
   std::vector<std::unique_ptr<Name>> names_;
   std::vector<Name*> slots_;  // open addressing; a power of two
   std::vector<OpenElement> open_;
-  std::vector<ReadAttribute> attributes_;
+  std::vector<DOM_Tree::AttributeRecord> attributes_;
   std::uint64_t elements_ = 0;
   bool hasRoot_ = false;
   std::u16string text_;  // what is not plain ASCII
