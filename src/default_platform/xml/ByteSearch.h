@@ -3,6 +3,7 @@
 #define ZOR_DEFAULT_PLATFORM_XML_BYTESEARCH_H
 
 #include <cstddef>
+#include <string_view>
 #ifdef __SSE2__
 #include <emmintrin.h>
 #endif
@@ -73,6 +74,35 @@ inline unsigned int StopsOfName(const char* inText) {
 }  // namespace sse2
 
 #endif
+
+/// Compares a name with what is at a place, of which sixteen bytes must be readable: names are short.
+class NameStart {
+ public:
+  NameStart() = default;
+  explicit NameStart(std::string_view inName) : isWhole_(inName.size() <= sizeof(bytes_)) {
+    const std::size_t count = inName.copy(bytes_, sizeof(bytes_));
+    bits_ = (1u << count) - 1;
+  }
+  /// Whether these bytes are all of the name, so that no others need to be compared.
+  bool IsWhole() const { return isWhole_; }
+#ifdef __SSE2__
+  bool IsAt(const char* inPlace) const {
+    const __m128i equal = _mm_cmpeq_epi8(sse2::Load(inPlace), sse2::Load(bytes_));
+    return (sse2::Bits(equal) & bits_) == bits_;
+  }
+#else
+  bool IsAt(const char* inPlace) const {
+    for (std::size_t i = 0; (bits_ >> i) != 0; ++i)
+      if (inPlace[i] != bytes_[i]) return false;
+    return true;
+  }
+#endif
+
+ private:
+  char bytes_[16] = {};
+  unsigned int bits_ = 0;  // one for each byte that is of the name
+  bool isWhole_ = true;
+};
 
 /// The same as the best search; most values and texts end within sixteen bytes, which are looked at
 /// without a call.

@@ -57,6 +57,23 @@ TextStore::TextStore() : shared_(new Shared[kSharedSlots]()) {
   end_ = kFirstBlock / kStep;
 }
 
+inline TextRef TextStore::Allocate(std::size_t inBytes) {
+  const std::size_t steps = (inBytes + kStep - 1) / kStep;
+  if (end_ - free_ < steps) {
+    if (steps > kPageSteps / 4) {  // pages of its own; the current one stays in use
+      const auto ref = static_cast<TextRef>(pages_.size() << kPageBits);
+      AddPages(inBytes);
+      return ref;
+    }
+    free_ = static_cast<TextRef>(pages_.size() << kPageBits);
+    AddPages(kPageBytes);
+    end_ = free_ + kPageSteps;
+  }
+  const TextRef ref = free_;
+  free_ += static_cast<TextRef>(steps);
+  return ref;
+}
+
 TextRef TextStore::Add(TextView inText) {
   if (!inText.IsWide() || !IsLatin1(inText.Units())) return AddStored(inText);
   narrowed_.assign(inText.Units().begin(), inText.Units().end());
@@ -67,7 +84,7 @@ TextRef TextStore::AddStored(TextView inText) {
   return inText.Length() > kMaxShared ? AddUnshared(inText) : AddShared(inText);
 }
 
-TextRef TextStore::AddShared(TextView inText) {
+inline TextRef TextStore::AddShared(TextView inText) {
   const std::uint64_t hash = HashOfBytes(inText.Data(), inText.Bytes());
   Shared& slot = shared_[hash % kSharedSlots];
   if (slot.text == 0 || slot.hash != hash || !AreSameAsStored((*this)[slot.text].View(), inText))
@@ -75,12 +92,7 @@ TextRef TextStore::AddShared(TextView inText) {
   return slot.text;
 }
 
-TextRef TextStore::Add(std::string_view inLatin1, TextSeries& ioSeries) {
-  if (ioSeries.last != nullptr && ioSeries.last->head == inLatin1.size() &&
-      AreSameBytes(ioSeries.last->Latin1(), inLatin1.data(), inLatin1.size())) {
-    ioSeries.newInARow = 0;
-    return ioSeries.lastRef;
-  }
+TextRef TextStore::AddOther(std::string_view inLatin1, TextSeries& ioSeries) {
   if (ioSeries.newInARow == kMaxNewInARow) {
     ioSeries.lastRef = AddUnshared(inLatin1);
   } else {
@@ -135,23 +147,6 @@ void TextStore::GrowWidened() {
       std::exchange(widened_, std::vector<Widened>(std::max(widened_.size() * 2, kFirstSlots)));
   for (const Widened& known : before)
     if (known.narrow != nullptr) SlotOf(known.narrow) = known;
-}
-
-TextRef TextStore::Allocate(std::size_t inBytes) {
-  const std::size_t steps = (inBytes + kStep - 1) / kStep;
-  if (end_ - free_ < steps) {
-    if (steps > kPageSteps / 4) {  // pages of its own; the current one stays in use
-      const auto ref = static_cast<TextRef>(pages_.size() << kPageBits);
-      AddPages(inBytes);
-      return ref;
-    }
-    free_ = static_cast<TextRef>(pages_.size() << kPageBits);
-    AddPages(kPageBytes);
-    end_ = free_ + kPageSteps;
-  }
-  const TextRef ref = free_;
-  free_ += static_cast<TextRef>(steps);
-  return ref;
 }
 
 void TextStore::AddPages(std::size_t inBytes) {

@@ -119,7 +119,13 @@ class TextStore {
   /// As Add, of a text that a store keeps already.
   TextRef AddStored(TextView inText);
   /// As Add. After a long run of different texts, as of numbers, only the last one is compared.
-  TextRef Add(std::string_view inLatin1, TextSeries& ioSeries);
+  TextRef Add(std::string_view inLatin1, TextSeries& ioSeries) {
+    if (ioSeries.last == nullptr || ioSeries.last->head != inLatin1.size() ||
+        !AreSameBytes(ioSeries.last->Latin1(), inLatin1.data(), inLatin1.size()))
+      return AddOther(inLatin1, ioSeries);
+    ioSeries.newInARow = 0;
+    return ioSeries.lastRef;
+  }
   /// As Add, as UTF-16 and without looking for an equal text.
   const DOM_Text* AddWide(std::u16string_view inUnits);
   /// The units of a text as UTF-16, kept as long as the store.
@@ -137,6 +143,7 @@ class TextStore {
   };
   Widened& SlotOf(const DOM_Text* inNarrow);
   void GrowWidened();
+  TextRef AddOther(std::string_view inLatin1, TextSeries& ioSeries);
   TextRef AddShared(TextView inText);
   TextRef AddUnshared(TextView inText);
   TextRef Allocate(std::size_t inBytes);

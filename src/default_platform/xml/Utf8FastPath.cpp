@@ -125,6 +125,12 @@ void Utf8FastPath::SkipBlanks() {
 
 // ---- elements
 
+inline bool Utf8FastPath::IsNext(const char* inPlace, const Name& inName) const {
+  const std::string& name = inName.utf8;
+  if (end_ - inPlace <= static_cast<std::ptrdiff_t>(name.size())) return false;
+  return inName.start.IsAt(inPlace) && (inName.start.IsWhole() || IsTextAt(inPlace, name));
+}
+
 void Utf8FastPath::ReadStartTag() {
   const char* at = at_ + 1;
   if (open_.size() == 1 && hasRoot_) throw NeedsFullScanner();
@@ -164,6 +170,16 @@ Utf8FastPath::Name& Utf8FastPath::ReadElementName(const char*& ioPlace) {
   return name;
 }
 
+inline TextRef Utf8FastPath::ReadValue(const char*& ioPlace, TextSeries& ioSeries) {
+  const char quote = *ioPlace;
+  if (quote != '"' && quote != '\'') Stop(ioPlace);
+  const char* const value = ioPlace + 1;
+  const char* const end = search_.EndOfValue(value, quote);
+  if (*end != quote) return ReadSpecialValue(ioPlace, end);
+  ioPlace = end + 1;
+  return tree_.AddText({value, static_cast<std::size_t>(end - value)}, ioSeries);
+}
+
 // Reads up to the end of the tag; what ends it is left to the caller.
 const char* Utf8FastPath::ReadAttributes(const char* inPlace, Name& ioElement) {
   attributes_.clear();
@@ -193,15 +209,11 @@ const char* Utf8FastPath::ReadAttributes(const char* inPlace, Name& ioElement) {
   }
 }
 
-TextRef Utf8FastPath::ReadValue(const char*& ioPlace, TextSeries& ioSeries) {
+// A value that is not as it is written: with references, other white space or beyond ASCII.
+TextRef Utf8FastPath::ReadSpecialValue(const char*& ioPlace, const char* inSpecial) {
   const char quote = *ioPlace;
-  if (quote != '"' && quote != '\'') Stop(ioPlace);
   const char* const value = ioPlace + 1;
-  const char* at = search_.EndOfValue(value, quote);
-  if (*at == quote) {
-    ioPlace = at + 1;
-    return tree_.AddText({value, static_cast<std::size_t>(at - value)}, ioSeries);
-  }
+  const char* at = inSpecial;
   text_.clear();
   AppendAscii(value, at);
   while (*at != quote) {
@@ -239,11 +251,6 @@ void Utf8FastPath::ReadEndTag() {
 
 // ---- names
 
-bool Utf8FastPath::IsNext(const char* inPlace, const Name& inName) const {
-  return end_ - inPlace > static_cast<std::ptrdiff_t>(inName.utf8.size()) &&
-         AreSameBytes(inPlace, inName.utf8.data(), inName.utf8.size());
-}
-
 const char* Utf8FastPath::NameEnd(const char* inPlace) const {
   const char first = *inPlace;
   if (first == '-' || first == '.' || (first >= '0' && first <= '9')) Stop(inPlace);
@@ -276,6 +283,7 @@ Utf8FastPath::Name& Utf8FastPath::FindName(const char* inPlace, const char* inEn
   Name& name = *names_.back();
   name.number = tree_.InternName(text_);
   name.utf8.assign(inPlace, inEnd);
+  name.start = NameStart(name.utf8);
   name.hash = hash;
   slots_[slot] = &name;
   if (names_.size() * 2 > slots_.size()) GrowNames();

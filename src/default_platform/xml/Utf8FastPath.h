@@ -34,6 +34,7 @@ class Utf8FastPath {
   struct Name {
     DOM_Tree::Name number;
     std::string utf8;
+    NameStart start;  // of utf8
     std::uint64_t hash;
     std::uint64_t element = 0;  // the last one that had an attribute of this name
     std::vector<AttributeShape> attributes;
@@ -74,11 +75,12 @@ class Utf8FastPath {
 
   // Parts of these; each returns where it ends
   const char* NameEnd(const char* inPlace) const;
-  bool IsNext(const char* inPlace, const Name& inName) const;
+  inline bool IsNext(const char* inPlace, const Name& inName) const;
   Name& ReadElementName(const char*& ioPlace);
   Name& FindName(const char* inPlace, const char* inEnd);
   void GrowNames();
-  TextRef ReadValue(const char*& ioPlace, TextSeries& ioSeries);
+  inline TextRef ReadValue(const char*& ioPlace, TextSeries& ioSeries);
+  TextRef ReadSpecialValue(const char*& ioPlace, const char* inSpecial);
   const char* AppendCharacter(const char* inPlace);
   const char* AppendReference(const char* inPlace);
   void AppendAscii(const char* inPlace, const char* inEnd);
