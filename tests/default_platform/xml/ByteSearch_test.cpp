@@ -3,6 +3,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <random>
 #include <string>
 #include <vector>
@@ -68,6 +69,21 @@ TEST(ByteSearch, PlainStopsWhereItShould) {
   for (const char* const one :
        {"ab=", "ab/", "ab>", "ab@", "ab[", "ab`", "ab{", "ab;", "ab,", "ab\xC3", "ab"})
     EXPECT_EQ(name(one), 2) << one;
+}
+
+TEST(ByteSearch, ANameIsFoundWhereItIs) {
+  const std::string all = "abcdefghijklmnopqrstu";
+  for (std::size_t length = 0; length <= all.size(); ++length) {
+    const NameStart name(all.substr(0, length));
+    EXPECT_EQ(name.IsWhole(), length <= 16);
+    for (std::size_t place = 0; place < all.size(); ++place) {
+      std::string text = all;
+      text[place] = '!';
+      EXPECT_EQ(name.IsAt(PlacedText(text, place).Begin()),
+                place >= std::min<std::size_t>(length, 16))
+          << length << ' ' << place;
+    }
+  }
 }
 
 // Every byte at every place of three blocks of the widest search, at every alignment.

@@ -12,6 +12,13 @@ using namespace std::string_view_literals;
 // ---- what must be read
 
 inline constexpr string_view kElements[] = {
+    // names that begin alike, after which others are expected
+    "<r><abcdefghijklmnop/><abcdefghijklmnop/><abcdefghijklmnopq/><abcdefghijklmnopq/>"
+    "<abcdefghijklmnopr/><abcdefghijklmno/><abcdefghijklmno k=''/></r>",
+    "<r><a><b/><c/></a><a><b/><c/></a><a><bb/><c/></a><a>\n<b/> <c/>\n</a><a>\n<b/> "
+    "<cc/>\t</a></r>",
+    "<r><a abcdefghijklmnop='1' abcdefghijklmnopq='2'/>"
+    "<a abcdefghijklmnopq='1' abcdefghijklmnop='2'/></r>",
     "<a/>",
     "<a></a>",
     "<a />",
@@ -201,6 +208,10 @@ inline constexpr string_view kEntities[] = {
 // ---- what must be refused
 
 inline constexpr string_view kBrokenTags[] = {
+    "<abcdefghijklmnopq></abcdefghijklmnopr>",
+    "<abcdefghijklmnopq></abcdefghijklmnop>",
+    "<r><a/><a/><a</r>",
+    "<r><a/><a/><a&/></r>",
     "<a>",
     "<a",
     "<a k",
