@@ -21,8 +21,8 @@ struct ModelProgram {
   int kept = -1;  ///< an open file to which it appends what it has so far; -1: none
 };
 
-/// Runs a program on a model file. Reading has the limits of the options; the rest as much time as it
-/// takes.
+/// Runs a program on a model file. Reading has the limits of the options; the rest as much time as
+/// it takes.
 /// @param inPath in UTF-8 on Linux.
 /// @param inOptions their deflection and cache are not used.
 /// @return what the program answers. Raises as OpenModel does.

@@ -58,8 +58,8 @@ struct ModelOptions {
   bool useCache = true;
   /// A file of which the CAD kernel leaves out what it cannot read is an error, not a warning.
   bool isStrict = false;
-  /// Processor time in seconds and memory in bytes that reading may take; 0: 6 s and 10 s a megabyte,
-  /// 512 MB and 256 times the file's size. A model in the cache has no limits.
+  /// Processor time in seconds and memory in bytes that reading may take; 0: 6 s and 10 s a
+  /// megabyte, 512 MB and 256 times the file's size. A model in the cache has no limits.
   double maxSeconds = 0;
   std::uint64_t maxMemory = 0;
   /// Called with the share that is done, 0 to 1, never less than before. May be empty.
@@ -82,8 +82,8 @@ struct OpenedModel {
 /// @param inPath in UTF-8 on Linux.
 /// The file is read by a process of its own, so that a damaged one cannot crash the caller's. Other
 /// files that it names are read when they are regular files in its folder or below.
-/// Raises ModelError when nothing can be shown, std::bad_alloc, and what the functions in the options
-/// raise.
+/// Raises ModelError when nothing can be shown, std::bad_alloc, and what the functions in the
+/// options raise.
 ZOR_PLATFORM_EXPORT OpenedModel OpenModel(const std::string& inPath,
                                           const ModelOptions& inOptions = {});
 
@@ -96,8 +96,8 @@ struct ProductInfo {
   bool isAssembly = false;
   ZORMathTransformation parentFromProduct;
   ZORMathTransformation rootFromProduct;
-  std::optional<std::array<std::uint8_t, 4>>
-      colour;                 ///< its own, or its part's: red, green, blue, alpha
+  /// Its own, or its part's: red, green, blue, alpha.
+  std::optional<std::array<std::uint8_t, 4>> colour;
   std::size_t triangles = 0;  ///< of this product alone
   double area = 0;            ///< of those triangles, square millimetres
   bool failedToTessellate = false;

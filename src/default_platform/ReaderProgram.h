@@ -1,4 +1,5 @@
-// What all programs that read models have in common: limits, the one way to files, and how they answer.
+// What all programs that read models have in common: limits, the one way to files, and how they
+// answer.
 #ifndef ZOR_DEFAULT_PLATFORM_READERPROGRAM_H
 #define ZOR_DEFAULT_PLATFORM_READERPROGRAM_H
 
@@ -14,8 +15,8 @@ struct Refusal {
   std::string reason;
 };
 
-/// The program's work, which each of them defines. It may open the model's path: the bytes come from
-/// memory.
+/// The program's work, which each of them defines. It may open the model's path: the bytes come
+/// from memory.
 /// @return its answer. Raises Refusal, what the kernel raises, and std::exception.
 std::string AnswerTo(const ModelRequest& inRequest, std::string_view inBytes);
 

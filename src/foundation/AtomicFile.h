@@ -26,9 +26,10 @@ struct AtomicFileOptions {
 /// untouched; if it never does, nothing is left of the new one unless the process is killed.
 ///
 /// The new file keeps the owner, group, permissions, extended attributes and access control list of
-/// the old one. Where the system does not let it, the old file itself is overwritten at Commit, with
-/// a copy beside it until that is done, and its old bytes put back when it fails. Symbolic links are
-/// followed, dangling ones included. A device or a pipe is never replaced: it receives the bytes at Commit.
+/// the old one. Where the system does not let it, the old file itself is overwritten at Commit,
+/// with a copy beside it until that is done, and its old bytes put back when it fails. Symbolic
+/// links are followed, dangling ones included. A device or a pipe is never replaced: it receives
+/// the bytes at Commit.
 ///
 /// The constructor already raises FileError where nothing could be written; every operation may
 /// raise std::bad_alloc.
@@ -45,7 +46,7 @@ class ZOR_FOUNDATION_EXPORT AtomicFile {
   void Commit();
 
  private:
-  // Those of each system.
+  // Implemented for each system.
   static std::string FollowLinks(const std::string& inPath);
   void CheckTarget();
   bool KeepAttributes(int inDescriptor) const;

@@ -1,4 +1,4 @@
-// What the tables of Unicode say of a character.
+// Properties of characters, from the tables of Unicode.
 #ifndef ZOR_FOUNDATION_CHARACTERTABLES_H
 #define ZOR_FOUNDATION_CHARACTERTABLES_H
 
@@ -6,10 +6,11 @@
 
 namespace ZORFoundation {
 
-/// The small letter of the capital, so that both forms of a letter such as the Greek sigma meet.
+/// Case folding by way of the capital letter, so that both small forms of the Greek sigma compare
+/// equal.
 ZOR_FOUNDATION_EXPORT char32_t CaseFoldedCharacter(char32_t inCharacter);
 
-/// How many columns of a terminal it takes: 0 to 2; negative when that is not known.
+/// The number of terminal columns that a character takes, 0 to 2; negative when unknown.
 ZOR_FOUNDATION_EXPORT int ColumnsOfCharacter(char32_t inCharacter);
 
 }  // namespace ZORFoundation

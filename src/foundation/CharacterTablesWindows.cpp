@@ -1,4 +1,4 @@
-// The C library of Windows has no such tables: ICU's.
+// ICU's tables, since the C library of Windows has none.
 #include <unicode/uchar.h>
 
 #include "foundation/CharacterTables.h"

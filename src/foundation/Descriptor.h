@@ -1,4 +1,5 @@
-// Open files. The functions return 0, or the errno value of what failed; others raise it as FileError.
+// Open files. The functions return 0, or the errno value of what failed; others raise it as
+// FileError.
 #ifndef ZOR_FOUNDATION_DESCRIPTOR_H
 #define ZOR_FOUNDATION_DESCRIPTOR_H
 

@@ -1,5 +1,6 @@
-// What atomic and temporary files ask of the system; for the foundation's own sources. A descriptor
-// is -1, and another answer an errno value, when the call failed; errno says why in both cases.
+// The system calls under atomic and temporary files; for the foundation's own sources. Where a call
+// fails, a descriptor is -1, with the reason in errno; other calls return an errno value, 0 for
+// success.
 #ifndef ZOR_FOUNDATION_FILECALLS_H
 #define ZOR_FOUNDATION_FILECALLS_H
 
@@ -13,11 +14,11 @@
 
 namespace ZORFoundation {
 
-/// Where a file's name may begin in its path: behind one of these. "C:name" is relative to the drive.
+/// A file's name begins after the last of these in its path. "C:name" is relative to the drive.
 inline constexpr std::string_view kPathSeparators =
     std::filesystem::path::preferred_separator == '/' ? "/" : "/\\:";
 
-/// Another number at each call, in all processes; not for secrets.
+/// A number that no other call gets, in this process or another. Not for secrets.
 std::uint64_t UniqueNumber();
 
 /// Makes a file for reading and writing; one that exists is refused (EEXIST).

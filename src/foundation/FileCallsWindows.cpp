@@ -41,7 +41,7 @@ int OpenToWrite(const std::string& inPath) {
   return OpenShared(inPath, {GENERIC_WRITE, OPEN_EXISTING, false});
 }
 
-// Always anew: what is to be renamed was closed.
+// Always opened anew: a file is closed before it is renamed.
 int ReopenIfReplaced(int /*inDescriptor*/, const std::string& inPath) {
   return OpenExisting(inPath);
 }

@@ -45,7 +45,7 @@ HashState::HashState(std::uint64_t inSeed) {
   XXH3_64bits_reset_withSeed(new (state_) XXH3_state_t, inSeed);
 }
 
-// Both hashes are fed alike; they differ in how they end.
+// Both hashes share their state; only the digests differ.
 void HashState::AddBytes(const void* inBytes, std::size_t inCount) {
   if (inCount > 0) XXH3_64bits_update(StateIn(state_), inBytes, inCount);
 }

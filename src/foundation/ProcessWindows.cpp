@@ -11,8 +11,8 @@
 
 namespace ZORFoundation {
 
-// Of the process, since a host may change it by other ways than the C library's. Values are kept, as
-// elsewhere a caller's pointer is good until the variable changes.
+// The process's own environment, since a host may change it without the C library. Values are kept,
+// as elsewhere a caller's pointer is good until the variable changes.
 const char* ReadEnvironment(const char* inName) {
   static std::mutex mutex;
   static auto* const values = new std::set<std::string>();
@@ -31,7 +31,7 @@ const char* ReadEnvironment(const char* inName) {
   return values->insert(Utf8Text(value)).first->c_str();
 }
 
-// The C library keeps a copy, which its own functions read; an empty value it would take away.
+// The C library's copy is for its own functions; there an empty value removes the variable.
 void WriteEnvironment(const char* inName, const char* inValue) {
   const std::wstring name = WideText(inName);
   const std::wstring value = inValue == nullptr ? L"" : WideText(inValue);

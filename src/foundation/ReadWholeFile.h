@@ -22,7 +22,7 @@ struct FileStamp {
 ZOR_FOUNDATION_EXPORT std::optional<FileStamp> StampOfFile(const std::string& inPath);
 
 /// @param inName what a FileError names.
-/// @return that of an open file. On Windows, of what is no file, that of nothing.
+/// @return the stamp of an open file; on Windows an empty one for a device or a pipe.
 ZOR_FOUNDATION_EXPORT FileStamp StampOfOpen(int inDescriptor, const std::string& inName);
 
 /// @return nanoseconds since 1970, of the clock that file stamps are taken from.
@@ -56,11 +56,11 @@ ZOR_FOUNDATION_EXPORT std::optional<WholeFile> TryReadWholeFile(const std::strin
 ZOR_FOUNDATION_EXPORT Descriptor OpenForReading(const std::string& inPath,
                                                 bool inMayBeStream = false);
 
-/// Opens a file that is there, for writing at its end. Raises FileError.
+/// Opens an existing file for appending. Raises FileError.
 ZOR_FOUNDATION_EXPORT Descriptor OpenForAppending(const std::string& inPath);
 
-/// Opens a file of its own for writing behind its first bytes; what follows them is cut off, and a
-/// missing one is made. Raises FileError, also where its name is a link.
+/// Opens a file for appending after its first inSize bytes; what follows them is cut off, and a
+/// missing file is made. Raises FileError, also for a symbolic link.
 ZOR_FOUNDATION_EXPORT Descriptor OpenCut(const std::string& inPath, std::uint64_t inSize);
 
 /// Reads up to so many bytes, fewer at the end and from streams. @return 0 at the end only.

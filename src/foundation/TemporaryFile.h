@@ -1,4 +1,4 @@
-// Files and folders for a while.
+// Temporary files and folders.
 #ifndef ZOR_FOUNDATION_TEMPORARYFILE_H
 #define ZOR_FOUNDATION_TEMPORARYFILE_H
 

@@ -1,5 +1,5 @@
-// What a termination signal removes; TerminationSignalsUnix.cpp and TerminationSignalsWindows.cpp say how
-// it comes.
+// What a termination signal removes; TerminationSignalsUnix.cpp and TerminationSignalsWindows.cpp
+// say how it comes.
 #include "foundation/TerminationSignals.h"
 
 #include <unistd.h>

@@ -1,5 +1,5 @@
-// Windows has no signals but the console's: Ctrl-C and Ctrl-Break count as SIGINT, a console that is
-// closed, and the end of a session, as SIGTERM. They come on a thread of their own.
+// Windows has no signals but the console's: Ctrl-C and Ctrl-Break count as SIGINT, a console that
+// is closed, and the end of a session, as SIGTERM. They come on a thread of their own.
 #include <atomic>
 #include <csignal>
 #include <cstdlib>
@@ -39,7 +39,7 @@ StopRequest::~StopRequest() { isRequested = false; }
 
 int StopRequest::Recorded() const { return stopSignal; }
 
-// As a shell of Unix reports it: Windows has no signal that a program could end by.
+// The exit code that a Unix shell reports: on Windows no program ends by a signal.
 void EndBySignal(int inSignal) { std::_Exit(128 + inSignal); }
 
 }  // namespace ZORFoundation

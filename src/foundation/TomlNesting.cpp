@@ -5,8 +5,8 @@
 namespace ZORFoundation {
 namespace {
 
-/// @return where the text goes on after the one that begins with a quotation mark; one on a single
-/// line that is not closed ends with its line.
+/// @return the end of the string that begins with a quotation mark; an unclosed one on a single
+/// line ends with the line.
 std::size_t EndOfQuoted(std::string_view inText, std::size_t inStart) {
   const char quote = inText[inStart];
   const std::string_view three = quote == '"' ? "\"\"\"" : "'''";

@@ -19,9 +19,9 @@ struct TextPlace {
   std::size_t line = 1, column = 1;
 };
 
-/// Where a key has more than kMaxTomlKeyParts parts, or more than kMaxTomlBrackets brackets are open.
-/// The TOML library takes apart what it read by recursion and would overflow the stack. @return
-/// nothing for a text that may be read.
+/// Where a key has more than kMaxTomlKeyParts parts, or more than kMaxTomlBrackets brackets are
+/// open. The TOML library takes apart what it read by recursion and would overflow the stack.
+/// @return nothing for a text that may be read.
 ZOR_FOUNDATION_EXPORT std::optional<TextPlace> FindTooDeepToml(std::string_view inText);
 
 }  // namespace ZORFoundation

@@ -15,8 +15,7 @@ bool HasPrefix(std::wstring_view inPath) {
   return inPath.starts_with(LR"(\\?\)") || inPath.starts_with(LR"(\\.\)");
 }
 
-/// Drive-relative paths and those from the current directory included; the path itself when that
-/// cannot be told.
+/// The absolute path, also of a drive-relative one; the path itself when that is unknown.
 std::wstring FullPath(const std::wstring& inPath) {
   const DWORD size = GetFullPathNameW(inPath.c_str(), 0, nullptr, nullptr);
   std::wstring full(size, L'\0');
@@ -83,7 +82,7 @@ std::string Utf8Text(std::wstring_view inText) {
 std::wstring WidePath(const std::string& inPath) {
   std::wstring path = WideText(inPath);
   std::ranges::replace(path, L'/', L'\\');
-  // A name of 8.3 is added to a folder's path, which may therefore be only so long.
+  // A folder's path must leave room for a name of 8.3.
   constexpr std::size_t kLongest = MAX_PATH - 12 - 1;
   if (path.size() < kLongest / 2 || HasPrefix(path)) return path;
   const std::wstring full = FullPath(path);

@@ -1,4 +1,4 @@
-// What the files for Windows have in common: paths in wide characters, errors as errno values. Paths
+// Helpers of the sources for Windows: paths in wide characters, errors as errno values. Paths
 // and texts are UTF-8 everywhere else, whatever the ANSI code page.
 #ifndef ZOR_FOUNDATION_WINDOWSCALLS_H
 #define ZOR_FOUNDATION_WINDOWSCALLS_H
@@ -12,7 +12,7 @@
 
 namespace ZORFoundation {
 
-/// What is no UTF-8, or no UTF-16, becomes U+FFFD.
+/// Ill-formed UTF-8 or UTF-16 becomes U+FFFD.
 ZOR_FOUNDATION_EXPORT std::wstring WideText(std::string_view inText);
 ZOR_FOUNDATION_EXPORT std::string Utf8Text(std::wstring_view inText);
 
@@ -33,12 +33,12 @@ struct OpenRequest {
   unsigned long attributes = FILE_ATTRIBUTE_NORMAL;
 };
 
-/// Opens a file in binary mode; others may read, write, rename and remove it meanwhile, and processes
-/// that are started do not inherit it.
+/// Opens a file in binary mode; others may read, write, rename and remove it meanwhile, and
+/// processes that are started do not inherit it.
 /// @return -1 when that failed; errno says why.
 ZOR_FOUNDATION_EXPORT int OpenShared(const std::string& inPath, const OpenRequest& inRequest);
 
-/// @return that of an open file.
+/// The handle of an open file.
 ZOR_FOUNDATION_EXPORT HANDLE HandleOf(int inDescriptor);
 
 }  // namespace ZORFoundation

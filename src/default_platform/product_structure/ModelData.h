@@ -63,8 +63,8 @@ struct ModelData {
 /// Incremented with every change of the encoding, or of what is read from the same file.
 inline constexpr std::uint32_t kModelCodecVersion = 4;
 
-/// The form in which models are kept in the cache and handed over by the process that reads them, in
-/// the machine's own byte order.
+/// The form in which models are kept in the cache and handed over by the process that reads them,
+/// in the machine's own byte order.
 std::string EncodeModel(const ModelData& inModel);
 
 /// @return false when the bytes are no model: too short, too long, or with indices out of range.

@@ -16,7 +16,7 @@ namespace {
 
 typedef std::chrono::steady_clock Clock;
 
-/// Follows the lines by which the reader reports how far it is.
+/// Parses the status lines of the reader.
 class StatusLines {
  public:
   StatusLines(const std::function<void(double)>& inProgress,

@@ -20,7 +20,7 @@ struct ModelRequest {
   std::function<void(double)> progress;  ///< may be empty
 };
 
-/// What a reading may use. See ModelOptions.
+/// The limits of a reading. See ModelOptions.
 struct ModelLimits {
   double seconds = 0;        ///< of processor time
   std::uint64_t memory = 0;  ///< in bytes
@@ -35,8 +35,8 @@ inline constexpr char kModelReaderPath[] = "/ZORLyra/zor-model-reader";
 struct ModelReaderProtocol {
   static constexpr int kModel = 3;   ///< the model's bytes
   static constexpr int kResult = 4;  ///< takes an encoded model, or why there is none
-  /// Takes lines: a percentage, what is done from then on, or "=" and what the caller is told. After
-  /// one of these the model is read and time has no limit.
+  /// Takes lines: a percentage, what is done from then on, or "=" and what the caller is told.
+  /// After one of these the model is read and time has no limit.
   static constexpr int kStatus = 5;
   static constexpr int kTask = 6;  ///< what is to be done with the model, if anything
   static constexpr int kKept = 7;  ///< where the task says so: takes what is done so far
@@ -55,7 +55,8 @@ struct ModelReaderError {
 
 /// Reads a model from its bytes. Several may be read at a time.
 /// @param inProgram of which only the path is used for the reader.
-/// @return the model, encoded, or what else the program answers. Raises ModelReaderError, and what the
+/// @return the model, encoded, or what else the program answers. Raises ModelReaderError, and what
+/// the
 ///         functions raise.
 std::string ReadModelInChild(const ModelRequest& inRequest, std::string_view inBytes,
                              const ModelLimits& inLimits,

@@ -41,7 +41,7 @@ std::string ReasonOf(const ZORFoundation::FileError& inError) {
   }
 }
 
-/// One state of the file, which may be saved at the same time.
+/// A consistent state of the file, which another program may be saving.
 std::string ReadBytes(const std::string& inPath) try {
   constexpr int kAttempts = 5;
   for (int attempt = 0; attempt < kAttempts; ++attempt) {

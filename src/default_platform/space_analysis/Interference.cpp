@@ -92,7 +92,7 @@ void Fill(const StoredViewpoint& inStored, ZOR3DViewpoint& outViewpoint) {
   outViewpoint.focusDistance = PositiveOr(inStored.focusDistance, usual.focusDistance);
   outViewpoint.viewAngle = usual.viewAngle;
   outViewpoint.viewHeight = 2 * outViewpoint.focusDistance * std::tan(usual.viewAngle / 2);
-  // Right before the eye a near plane cuts nothing that matters, but would keep markers from being
+  // A near plane close to the eye cuts nothing that matters, but would keep markers from being
   // an overlay.
   constexpr double kRightBefore = 0.02;
   const bool cutsNothing = inStored.projection == ZOR3DViewpoint::kConic &&
@@ -101,7 +101,7 @@ void Fill(const StoredViewpoint& inStored, ZOR3DViewpoint& outViewpoint) {
   outViewpoint.farPlane = inStored.farPlane > inStored.nearPlane ? inStored.farPlane : 0;
 }
 
-/// Two parts of nearly one colour could not be told apart.
+/// Whether two parts of these colours could not be told apart.
 bool AreAlike(const SceneColour& inA, const SceneColour& inB) {
   constexpr int kAlike = 90;
   return ColourDifference(inA, inB) < kAlike;

@@ -16,7 +16,8 @@
 
 namespace ZORDefault {
 
-/// Its elements and sub-interferences are the points that differ. Ends with its last reference, sub-interferences' included.
+/// Its elements and sub-interferences are the points that differ. Ends with its last reference,
+/// sub-interferences' included.
 class Interference final : public CountedComponent, private CountedObject<Interference> {
  public:
   static const char* CountedName() { return "Interference"; }

@@ -120,9 +120,9 @@ constexpr double kArrowLength = 0.06;
 constexpr double kPinHead = 0.04;
 /// With more points than this they show the place by themselves.
 constexpr std::size_t kMaxPins = 3;
-/// What a picture can show apart.
+/// A picture cannot resolve more balls than this.
 constexpr std::size_t kMaxBalls = 1000;
-/// With more balls than this nobody looks at one.
+/// With more balls than this none is seen by itself.
 constexpr std::size_t kMaxFineBalls = 100;
 
 /// A needle from the point upwards and towards the eye, whose head stands out of the surfaces that

@@ -20,8 +20,8 @@ struct MarkerStyle {
   double pinLength = 0;  ///< as a share of viewRadius; 0: without pins
 };
 
-/// Markers at some points, an overlay, and the sphere to frame when the interference is shown alone:
-/// it holds what is needed of the surroundings to recognise the place.
+/// Markers at some points, an overlay, and the sphere to frame when the interference is shown
+/// alone: it holds what is needed of the surroundings to recognise the place.
 class InterferenceRep final : public ZOR3DRep, private CountedObject<InterferenceRep> {
  public:
   static const char* CountedName() { return "InterferenceRep"; }

@@ -1,4 +1,4 @@
-// From where an interference is seen well.
+// Choosing a direction from which an interference is seen well.
 #ifndef ZOR_DEFAULT_PLATFORM_SPACE_ANALYSIS_VIEWCHOICE_H
 #define ZOR_DEFAULT_PLATFORM_SPACE_ANALYSIS_VIEWCHOICE_H
 

@@ -6,7 +6,7 @@
 
 namespace ZORDefault {
 
-// From here on this thread has a locale of its own, equal to that of the process at first.
+// From here on this thread has a locale of its own, at first a copy of the process's.
 CLocaleScope::CLocaleScope() : previous_(nullptr) {
   const std::string present = setlocale(LC_NUMERIC, nullptr);
   if (present == "C") return;

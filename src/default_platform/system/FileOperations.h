@@ -16,7 +16,7 @@ HRESULT FileResultOf(int inError);
 inline constexpr char kPathSeparator =
     static_cast<char>(std::filesystem::path::preferred_separator);
 
-// Those of each system.
+// Implemented for each system.
 
 /// A wide path in UTF-8; empty when it is no well-formed text.
 std::string NarrowPath(const wchar_t* inPath);

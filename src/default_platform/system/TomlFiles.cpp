@@ -35,7 +35,8 @@ std::optional<TomlValue> ValueOf(const toml::node& inNode) {
 
 constexpr bool kIsWindows = std::filesystem::path::preferred_separator == '\\';
 
-/// Between the directories of a list in the environment. On Windows a colon follows a drive's letter.
+/// Between the directories of a list in the environment. On Windows a colon follows a drive's
+/// letter.
 constexpr char kListSeparator = kIsWindows ? ';' : ':';
 
 std::string_view Variable(const char* inName) {

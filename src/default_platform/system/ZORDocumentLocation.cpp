@@ -46,7 +46,7 @@ HRESULT ZORGetDLName(const ZORUnicodeString& inName, ZORUnicodeString** outDirec
 
 HRESULT ZORExpandString(ZORUnicodeString* ioText) {
   if (!ioText) return E_INVALIDARG;
-  // A text without a place keeps even what the narrow form cannot carry.
+  // A text without a placeholder keeps even what the narrow form cannot hold.
   if (ioText->SearchSubString("${") < 0) return S_OK;
   std::string expanded;
   if (!Expand(ioText->ConvertToChar(), expanded)) return E_FAIL;

@@ -51,7 +51,7 @@ HRESULT ZORDefault::FileResultOf(int inError) {
 #ifdef EDQUOT
     case EDQUOT:
 #endif
-    case EFBIG:  // the process may write no larger file: no room, for its purposes
+    case EFBIG:  // beyond the process's limit for files: no room, for its purposes
       return kZORFileDiskFull;
     case ENOTDIR:
     case ENAMETOOLONG:

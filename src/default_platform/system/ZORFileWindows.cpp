@@ -28,7 +28,7 @@ unsigned int PermissionsOf(int /*inDescriptor*/) { return 0; }  // a file has no
 
 }  // namespace ZORDefault
 
-// What the access list of a file says is known for certain only once the file is opened.
+// Only opening a file tells for certain what its access list allows.
 int ZORFileAccess(const char* inPath, int inMode) {
   if (!inPath || (inMode & ~6) != 0) return -1;
   const std::wstring path = ZORFoundation::WidePath(inPath);

@@ -67,7 +67,7 @@ std::string LanguageOf(std::string_view inLocale) {
   return language.size() < 2 || language == "posix" || !isWord ? "en" : language;
 }
 
-// What the environment says now about where a catalogue is: null for a variable that is not set.
+// The variables that say where a catalogue is, as they are now; null for one that is not set.
 struct SearchVariables {
   std::array<const char*, 4> languages{};
   const char* path = nullptr;

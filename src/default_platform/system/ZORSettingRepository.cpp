@@ -47,7 +47,8 @@ struct ToNumber {
   double number = 0;
 };
 
-// How a value of a file converts to what is asked for; false when it does not, and nothing changes.
+// Converts a value of a file to the type that is asked for. Returns false, with nothing changed,
+// when it cannot.
 bool ConvertTomlValue(const TomlValue& inValue, ZORString& outValue) {
   ToText convert;
   if (!std::visit(convert, inValue)) return false;
@@ -78,7 +79,7 @@ bool ConvertTomlValue(const TomlValue& inValue, int& outValue) {
   return true;
 }
 
-/// A value that goes before those of the files.
+/// A value that overrides those of the files.
 struct OverriddenSetting {
   const SettingOverride* owner;
   std::string repository, setting;

@@ -43,8 +43,8 @@ ZORMathVector NormalizeOr(const ZORMathVector& inVector, const ZORMathVector& in
 /// @return inValue when it is finite and above zero, else inOtherwise.
 double PositiveOr(double inValue, double inOtherwise);
 
-/// Invalid values of the viewpoint are replaced: a missing sight by the isometric one, an `up` along
-/// the sight by z (or y), sizes by 1, a non-finite eye by the origin.
+/// Invalid values of the viewpoint are replaced: a missing sight by the isometric one, an `up`
+/// along the sight by z (or y), sizes by 1, a non-finite eye by the origin.
 /// @param inHeight in pixels.
 Camera MakeCamera(const ZOR3DViewpoint& inViewpoint, int inHeight);
 

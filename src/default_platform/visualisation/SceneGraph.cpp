@@ -92,7 +92,7 @@ void ZOR3DBagRep::Accept(ZOR3DSceneVisitor& ioVisitor) const {
 namespace ZORDefault {
 namespace {
 
-/// The colour that a node hands to what is below it.
+/// The colour that a node passes on to its descendants.
 struct InheritedColour {
   PartColour colour{210, 210, 210, 255};
   bool isImposed = false;

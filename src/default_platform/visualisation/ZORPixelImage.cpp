@@ -57,7 +57,7 @@ HRESULT ZORPixelImage::Write(const ZORString& inFormat, const ZORString& inPath)
   if (!rayCaster) return E_FAIL;
   const std::string bytes = (rayCaster->*encoder)(width_, height_, pixels_.data());
   if (bytes.empty()) return E_FAIL;
-  // A picture can be made again, so nobody waits for the disk.
+  // Not synchronised: a picture can be made again.
   ZORFoundation::WriteWholeFile(inPath.CastToCharPtr(), bytes, {.isSynchronised = false});
   return S_OK;
 } catch (const ZORFoundation::FileError& error) {

@@ -8,8 +8,8 @@
 #include <emmintrin.h>
 #endif
 
-/// Searches in UTF-8 that a byte 0 ends, which every search stops at. They read up to kPadding bytes
-/// past the one they find, so that many must be readable after the 0.
+/// Searches in UTF-8 that a byte 0 ends, which every search stops at. They read up to kPadding
+/// bytes past the one they find, so that many must be readable after the 0.
 struct ByteSearch {
   static constexpr std::size_t kPadding = 64;
 

@@ -55,8 +55,8 @@ struct DocumentType {
 /// plain numbers, since a document is used by one thread at a time.
 ///
 /// A node is attached when it is, or once was, part of the document's tree; such nodes live as long
-/// as the document. A node that was only made is detached: it goes with the last handle on the nodes
-/// that can be reached from it (see DetachedNodes).
+/// as the document. A node that was only made is detached: it goes with the last handle on the
+/// nodes that can be reached from it (see DetachedNodes).
 ///
 /// Operations trust their arguments; the handles check them. Nothing here recurses.
 class DOM_Tree {

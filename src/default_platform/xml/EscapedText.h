@@ -30,8 +30,8 @@ constexpr AsciiTreatments Treatments(std::u16string_view inEscaped, bool inRefus
 /// "&amp;" or the like.
 std::string_view EscapeOf(char16_t inUnit);
 
-/// UTF-8 that grows; becomes a string without being copied. Its code units are counted too: a string
-/// has at most 4,294,967,295, and NotSerialisable is raised for more.
+/// UTF-8 that grows; becomes a string without being copied. Its code units are counted too: a
+/// string has at most 4,294,967,295, and NotSerialisable is raised for more.
 class EscapedText {
  public:
   /// Appends ASCII as it is.

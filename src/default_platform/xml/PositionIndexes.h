@@ -9,10 +9,10 @@
 #include <vector>
 
 /// The children of a few parents as arrays. A host that walks by position asks for the length and
-/// one item in turn, at several levels at once, so several indexes are kept. Which one makes room is
-/// chosen by what it would cost to build again (GreedyDual of N. Young, "The k-server dual and loose
-/// competitiveness for paging", 1994): a long list in an outer loop outlives the many short ones of
-/// the inner loops.
+/// one item in turn, at several levels at once, so several indexes are kept. Which one makes room
+/// is chosen by what it would cost to build again (GreedyDual of N. Young, "The k-server dual and
+/// loose competitiveness for paging", 1994): a long list in an outer loop outlives the many short
+/// ones of the inner loops.
 class PositionIndexes {
  public:
   using Children = std::vector<std::uint32_t>;

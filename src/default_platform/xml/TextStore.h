@@ -77,8 +77,8 @@ class TextView {
 bool IsSameText(TextView inA, TextView inB);
 
 /// An immutable text: this head, then its characters. The texts of a tree are Latin-1 where every
-/// character fits a byte, else UTF-16; equal ones are therefore equal bytes. Of those that strings own
-/// (see DOMString.cpp) all 32 bits count the units.
+/// character fits a byte, else UTF-16; equal ones are therefore equal bytes. Of those that strings
+/// own (see DOMString.cpp) all 32 bits count the units.
 struct DOM_Text {
   static constexpr std::uint32_t kWide = std::uint32_t{1} << 31;
   static constexpr std::uint32_t kMaxLength = kWide - 1;  // of a tree's text

@@ -15,8 +15,8 @@
 /// document type, one past its limits, and any that is not well-formed.
 struct NeedsFullScanner {};
 
-/// Reads a document in one pass into a tree, checking all that XML 1.0 asks of well-formed ones. The
-/// tree is that of the full scanner. One object reads one document.
+/// Reads a document in one pass into a tree, checking all that XML 1.0 asks of well-formed ones.
+/// The tree is that of the full scanner. One object reads one document.
 class Utf8FastPath {
  public:
   /// @param ioTree a new one; of no use when NeedsFullScanner is raised.

@@ -55,7 +55,7 @@ DetectedInterference ToInterference(const ZORDetection::Interference& inFound) {
   return found;
 }
 
-/// What is worse counts for two products of several parts.
+/// Of the interferences between the parts of two products the worst one counts.
 void Merge(DetectedInterference inFound, DetectedInterference& ioBest) {
   const bool isSameKind = inFound.kind == ioBest.kind;
   const bool isWorse = isSameKind ? inFound.value < ioBest.value : inFound.kind < ioBest.kind;
@@ -69,7 +69,7 @@ void Merge(DetectedInterference inFound, DetectedInterference& ioBest) {
     ioBest.meshPrecision = std::max(ioBest.meshPrecision.value_or(0), *inFound.meshPrecision);
 }
 
-// What finding may take besides reading, in bytes, where there is no limit of the user's.
+// Memory for the search besides that for reading, in bytes, where the user sets no limit.
 constexpr std::uint64_t kMemory = std::uint64_t{1} << 30, kMemoryPerThread = 64 << 20,
                         kMemoryPerProduct = 16 << 10;
 
@@ -128,7 +128,7 @@ class Detection {
     if (result_.productsChecked < 2) throw Error(model_, "there are not two products to check");
   }
 
-  /// What is known, and what is not known of the share.
+  /// The known findings, and those of a run for what is missing of the share.
   ZORDetection::Findings FindUnknown() {
     if (options_.known.empty()) return Find();
     ZORDetection::Findings known = Known();
@@ -158,7 +158,7 @@ class Detection {
   }
 
   void TakeInto(ZORDetection::Findings& ioKnown, ZORDetection::Findings&& inFound) const {
-    if (!ZORDetection::TakeIn(std::move(inFound), ioKnown)) RefuseKnown();
+    if (!ZORDetection::MergeFindings(std::move(inFound), ioKnown)) RefuseKnown();
   }
 
   [[noreturn]] void RefuseKnown() const {
@@ -199,7 +199,7 @@ class Detection {
         ZORDefault::RunOnModel(model_, program, ModelOptionsOf(options_)));
   }
 
-  /// @param inLine the verdicts that are done, and all of them.
+  /// @param inLine the number of verdicts that are done, and of all.
   bool Tell(const std::string& inLine) const {
     std::size_t done = 0, all = 0;
     return !options_.progress || std::sscanf(inLine.c_str(), "%zu %zu", &done, &all) != 2 ||
@@ -226,7 +226,7 @@ class Detection {
     result_.isStopped = inFindings.isStopped;
   }
 
-  /// A part without a name is called by the first product that shows it.
+  /// A part without a name is called by its first instance.
   std::string NameOfPart(std::uint32_t inPart) const {
     const auto name = tree_.PartNames().find(inPart);
     if (name != tree_.PartNames().end() && !name->second.empty())

@@ -20,8 +20,9 @@ namespace ZORToolkit {
 /// What a surface that encloses nothing means when it enters a solid deeper than the tolerance.
 enum class SheetsMean { kClash, kContact, kNothing };
 
-/// Lengths in millimetres; texts in UTF-8. Patterns have "*" for any text and "?" for any character;
-/// they are held against the alias path and the part name of a product and of the assemblies above.
+/// Lengths in millimetres; texts in UTF-8. Patterns have "*" for any text and "?" for any
+/// character; they are matched against the alias path and the part name of a product and of the
+/// assemblies above it.
 struct DetectionOptions {
   double tolerance = 0.01;   ///< a clash is deeper; not negative
   double contactGap = 1e-5;  ///< products that are at most this far apart touch; not negative
@@ -40,14 +41,16 @@ struct DetectionOptions {
   bool isStrict = false;  ///< a model of which something cannot be read is an error, not a warning
   bool hasViewpoints = false;  ///< each interference gets the viewpoint of its picture
 
-  Shard shard;                     ///< of the verdicts only those of this share are found
+  Shard shard;                     ///< only the verdicts of this share are found
   std::vector<std::string> known;  ///< findings of other runs, which are not looked for again
   int kept = -1;          ///< an open file to which records of what is found are appended; -1: none
   std::size_t tried = 0;  ///< more than 0: only so many verdicts, timed one after another
 
-  std::function<void(double)> readingProgress;             ///< told the share, 0 to 1; may be empty
-  std::function<bool(std::size_t, std::size_t)> progress;  ///< told pairs done of all; false: stop
-  std::function<void(const std::string&)> warn;            ///< told in one line; may be empty
+  /// Called with the share that is read, 0 to 1; may be empty.
+  std::function<void(double)> readingProgress;
+  /// Called with the pairs done and all; false: stop.
+  std::function<bool(std::size_t, std::size_t)> progress;
+  std::function<void(const std::string&)> warn;  ///< called with one line; may be empty
 };
 
 struct DetectedProduct {
@@ -65,7 +68,7 @@ struct DetectedViewpoint {
 
 struct DetectedInterference {
   enum class Kind { kClash, kContact, kClearance };
-  std::size_t first = 0, second = 0;  ///< of the products of the result
+  std::size_t first = 0, second = 0;  ///< positions in DetectionResult::products
   Kind kind = Kind::kContact;
   double value = 0;  ///< minus the depth of a clash, 0, or the distance
   std::array<std::array<double, 3>, 2> points{};
@@ -74,7 +77,8 @@ struct DetectedInterference {
   bool isDuplicate = false;                  ///< the same geometry at the same place
   bool isSheetInSolid = false;
   std::optional<DetectedViewpoint> viewpoint;
-  std::optional<double> meshPrecision;  ///< by how much triangles that had to do may be off
+  /// How far the triangles may be off where there is no exact geometry.
+  std::optional<double> meshPrecision;
 };
 
 struct DetectionResult {
@@ -86,9 +90,11 @@ struct DetectionResult {
   std::vector<std::string> unjudged;
   std::size_t productsChecked = 0, pairsNear = 0;
   bool isStopped = false;
-  std::string findings;  ///< for `known`, on a machine of the same kind; with those that were known
+  /// Encoded, for `known` of a later run on a machine of the same kind; with those that were
+  /// known.
+  std::string findings;
   std::vector<int> judged;  ///< the verdicts in them, by number
-  WorkSample work;          ///< all verdicts; timed, those that were tried
+  WorkSample work;          ///< the costs of all verdicts, and the times of those that were tried
   double tolerance = 0, contactGap = 0, clearance = 0;
   std::string computationCase;
 };
@@ -97,14 +103,14 @@ struct CalendarDate {
   int day = 1, month = 1, year = 1970;
 };
 
-/// Today's, or that of SOURCE_DATE_EPOCH, which makes builds repeat.
+/// Today's date, or that of SOURCE_DATE_EPOCH, as reproducible builds want it.
 ZOR_TOOLKIT_EXPORT CalendarDate DateOfWriting();
 
-/// What is wrong with the lengths of the options, one line; empty when nothing is.
+/// Why options are refused, one line; empty when they are valid.
 ZOR_TOOLKIT_EXPORT std::string FindFault(const DetectionOptions& inOptions);
 
-/// Finds all interferences of a STEP, IGES, glTF, GLB, OBJ or STL file, in a process of its own, so that
-/// a damaged file cannot crash the caller's. The number of threads does not change the result.
+/// Finds all interferences of a STEP, IGES, glTF, GLB, OBJ or STL file, in a process of its own, so
+/// that a damaged file cannot crash the caller's. The number of threads does not change the result.
 /// Raises Error when the model cannot be read, when there are not two products to check, or when a
 /// selection is empty.
 ZOR_TOOLKIT_EXPORT DetectionResult Detect(const std::string& inModel,

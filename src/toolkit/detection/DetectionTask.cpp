@@ -13,7 +13,7 @@
 namespace ZORDetection {
 namespace {
 
-/// Turns values into bytes.
+/// Encodes values.
 class Packer {
  public:
   template <typename Value>
@@ -43,7 +43,7 @@ class Packer {
   std::string bytes_;
 };
 
-/// And back, in the same order.
+/// Decodes them, in the same order.
 class Unpacker {
  public:
   explicit Unpacker(std::string_view inBytes) : left_(inBytes) {}
@@ -176,7 +176,7 @@ void Append(Findings inOther, Findings& ioFindings) {
   append(ioFindings.judged, inOther.judged);
 }
 
-/// Brings findings into the order of one run. @return false when a verdict is there twice.
+/// Sorts findings as a single run gives them. @return false for a verdict that occurs twice.
 bool Sort(Findings& ioFindings) {
   std::ranges::sort(ioFindings.judged);
   std::ranges::sort(ioFindings.interferences, {}, [](const Interference& inFound) {
@@ -188,7 +188,7 @@ bool Sort(Findings& ioFindings) {
   return std::ranges::adjacent_find(ioFindings.judged) == ioFindings.judged.end();
 }
 
-/// Takes the next record off the bytes. @return nothing where none is whole.
+/// Removes the next record from the bytes. @return nothing when it is incomplete.
 std::optional<Findings> NextRecord(std::string_view& ioBytes) {
   std::uint64_t head[2];  // its length and its hash
   if (ioBytes.size() < sizeof head) return std::nullopt;
@@ -208,7 +208,7 @@ DetectionTask DecodeTask(std::string_view inBytes) { return Unpacked<DetectionTa
 std::string Encode(const Findings& inFindings) { return Packed(inFindings); }
 Findings DecodeFindings(std::string_view inBytes) { return Unpacked<Findings>(inBytes); }
 
-bool TakeIn(Findings inOther, Findings& ioFindings) {
+bool MergeFindings(Findings inOther, Findings& ioFindings) {
   if (!IsSameWork(inOther, ioFindings)) return false;
   Append(std::move(inOther), ioFindings);
   return Sort(ioFindings);

@@ -48,7 +48,8 @@ void ProductTree::Visit(const ZORIProduct_var& inProduct, const std::string& inP
   const bool isLeaf = count == 0;
   if (!inUnit && (options_.level ? inLevel == *options_.level || isLeaf : isLeaf) && inLevel > 0) {
     inUnit = units_.size();
-    // Filled one by one: GCC 12 frees the parts of such a value twice when one of them has no memory.
+    // Filled one by one: GCC 12 frees the parts of such a value twice when one of them has no
+    // memory.
     Unit unit;
     unit.product.path = path;
     unit.product.partName = partName;

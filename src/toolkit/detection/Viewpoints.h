@@ -1,4 +1,4 @@
-// From where interferences that were found are seen.
+// The viewpoints of detected interferences.
 #ifndef ZOR_TOOLKIT_DETECTION_VIEWPOINTS_H
 #define ZOR_TOOLKIT_DETECTION_VIEWPOINTS_H
 
@@ -10,7 +10,7 @@
 
 namespace ZORToolkit {
 
-/// The points of an interference that a result has: of a long curve some.
+/// The points of an interference that are written: of a long curve a sample.
 std::vector<std::array<double, 3>> WrittenPoints(const DetectedInterference& inFound);
 
 /// Gives each interference the viewpoint from which its picture would be taken: one that shows both

@@ -1,5 +1,6 @@
-// What the toolkit and its library of foreign formats say to each other. That one stands on libzip,
-// libxlsxwriter, libuuid and readers of pictures, and is loaded when the first foreign file is read or written.
+// The interface between the toolkit and its plugin for foreign formats, which stands on libzip,
+// libxlsxwriter, libuuid and readers of pictures. It is loaded when the first foreign file is read
+// or written.
 #ifndef ZOR_TOOLKIT_EXCHANGE_EXCHANGE_LIBRARY_H
 #define ZOR_TOOLKIT_EXCHANGE_EXCHANGE_LIBRARY_H
 

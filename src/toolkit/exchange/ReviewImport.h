@@ -14,10 +14,10 @@
 
 namespace ZORToolkit {
 
-/// What a status is called by us: "Relevant", "Irrelevant" or "Not inspected" for these words in any
-/// language, and for the words that other tools have. "Open", "New", "Reopened" and the like are not
-/// inspected, "Active", "In progress", "Assigned" and the like relevant, "Closed", "Resolved",
-/// "Accepted" and the like irrelevant.
+/// What a status is called by us: "Relevant", "Irrelevant" or "Not inspected" for these words in
+/// any language, and for the words that other tools have. "Open", "New", "Reopened" and the like
+/// are not inspected, "Active", "In progress", "Assigned" and the like relevant, "Closed",
+/// "Resolved", "Accepted" and the like irrelevant.
 /// @return nothing for another word.
 ZOR_TOOLKIT_EXPORT std::optional<std::string> StatusCalled(const std::string& inText);
 
@@ -43,9 +43,9 @@ ZOR_TOOLKIT_EXPORT ImportedReview ImportBcf(const ReviewedResult& inResult, cons
                                             const GroupOptions& inGrouping);
 
 /// What was done in a sheet: an Office Open XML workbook, or text with commas, semicolons or tabs.
-/// Rows are known by the column "Id" alone, wherever they and their columns are. A status or comment
-/// that is not what the column "Base" says, or the result where there is no such column, was changed;
-/// an empty cell of a comment takes it out, an empty status says nothing.
+/// Rows are known by the column "Id" alone, wherever they and their columns are. A status or
+/// comment that is not what the column "Base" says, or the result where there is no such column,
+/// was changed; an empty cell of a comment takes it out, an empty status says nothing.
 /// @param inPath what ends in .xlsx, else text. Raises Error for what is no such file or has no
 ///               columns "Id" and "Status" or "Comment".
 ZOR_TOOLKIT_EXPORT ImportedReview ImportSheet(const ReviewedResult& inResult,

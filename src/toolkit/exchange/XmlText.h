@@ -13,7 +13,8 @@
 
 namespace ZORToolkit {
 
-/// UTF-8 as the text of an element or the value of an attribute. What XML cannot carry becomes U+FFFD.
+/// UTF-8 as the text of an element or the value of an attribute. What XML cannot carry becomes
+/// U+FFFD.
 inline std::string XmlEscaped(std::string_view inText) {
   std::string text;
   text.reserve(inText.size());

@@ -40,7 +40,8 @@ std::string TextOf(int inCode) {
   return text;
 }
 
-/// @return the name with slashes. Refuses one that would lie outside of a folder it is unpacked in.
+/// @return the name with slashes. Refuses one that leads out of the folder that it is unpacked
+/// into.
 std::string CheckedName(const char* inName) {
   std::string name = inName == nullptr ? "" : inName;
   std::ranges::replace(name, '\\', '/');

@@ -11,11 +11,12 @@
 
 namespace ZORToolkit {
 
-/// Bytes in a page that its script, or ReadBlock, finds by name: letters, digits, "-" and "_".
+/// Bytes in a page that its script, or PublishedPage::Block, finds by name: letters, digits, "-"
+/// and "_".
 struct PageBlock {
   std::string name;
   std::string bytes;
-  bool isPacked = false;  ///< they are of gzip already
+  bool isPacked = false;  ///< they are compressed by gzip already
 };
 
 /// A picture that a page has once and shows wherever it refers to "#id".

@@ -344,7 +344,7 @@ class Publication {
     return !published.picture.empty();
   }
 
-  /// Makes the result what is published.
+  /// Edits the result to what is published.
   void EditResult() {
     ClashDocumentEdit edit(result_);
     for (const ElementHandle& other : others_) edit.Remove(other);

@@ -31,8 +31,8 @@ struct PublicationOptions {
   RecordFilter filter;
   /// An older result: each interference says what became of it since. Lives as long as the call.
   ClashDocument* baseline = nullptr;
-  std::string baselineSource,
-      baselineName;  ///< its bytes, for the manifest, and the name of its file
+  std::string baselineSource;  ///< its bytes, for the manifest
+  std::string baselineName;    ///< the name of its file
   DiffOptions comparison;
   /// The root of the model that the baseline's pictures show; empty: that of the result.
   std::function<ZORIProduct_var()> openBaselineModel;
@@ -47,9 +47,9 @@ struct PublicationOptions {
   bool resume = false;  ///< keep the pictures of a run that was ended early
   /// Who draws which pictures, where others take part; lives as long as the call. May be null.
   SharedDrawing* sharing = nullptr;
-  /// Told in one line of what is shown otherwise than expected. May be empty.
+  /// Called with one line for what is shown otherwise than expected. May be empty.
   std::function<void(const std::string& inWarning)> warn;
-  /// Told how many interferences are drawn. May be empty.
+  /// Called with the numbers of interferences that are drawn and of all. May be empty.
   std::function<void(std::size_t inDone, std::size_t inAll)> drawn;
 };
 
@@ -74,7 +74,8 @@ ZOR_TOOLKIT_EXPORT std::vector<std::string> VerifyPublication(const PublicationO
 /// Publishes the interferences of a result that a filter accepts. Pictures are drawn in processes
 /// that start as copies of this one, which runs no other thread; a termination signal is raised as
 /// ZORFoundation::Interrupted.
-/// @param ioResult    becomes the result that is published: the other interferences leave it, and it
+/// @param ioResult    becomes the result that is published: the other interferences leave it, and
+/// it
 ///                    refers to the pictures of the publication alone.
 /// @param inOpenModel answers the root of the model; called once, if there is one.
 /// Raises Error and what inOpenModel raises; pictures that are whole stay.

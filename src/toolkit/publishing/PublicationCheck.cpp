@@ -1,4 +1,4 @@
-// Whether a publication is what would be made now.
+// Verifying a publication: whether it is what would be made now.
 #include <algorithm>
 #include <cctype>
 #include <filesystem>
@@ -16,7 +16,7 @@ namespace fs = std::filesystem;
 namespace ZORToolkit {
 namespace {
 
-/// A publication as it lies there.
+/// An existing publication.
 class FoundPublication {
  public:
   explicit FoundPublication(const PublicationOptions& inOptions) : folder_(inOptions.folder) {

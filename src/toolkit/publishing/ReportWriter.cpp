@@ -23,7 +23,7 @@ constexpr char kDocumentType[] = "clash-report.dtd";
 
 using Names = std::span<const char* const>;
 
-/// What reports hold of an element.
+/// The attributes and children of an element that reports have.
 struct ElementRule {
   const char* name;
   Names attributes;

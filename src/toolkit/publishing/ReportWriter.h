@@ -11,8 +11,8 @@
 
 namespace ZORToolkit {
 
-/// Writes a result as a report: all elements and attributes that reports have (those of the document
-/// type clash-report.dtd), in document order. The report reads back as the same result.
+/// Writes a result as a report: all elements and attributes that reports have (those of the
+/// document type clash-report.dtd), in document order. The report reads back as the same result.
 /// @param inPrologue without a document type: clash-report.dtd; without a style sheet: that of the
 ///                   setting "XslTemplate".
 /// @param inPath     UTF-8.

@@ -9,7 +9,8 @@
 namespace ZORToolkit {
 
 /// A limit that is given, else that of the settings "ModelReading".
-/// @param inName    what the user calls it, for the UsageError that is raised for a limit below 1 or
+/// @param inName    what the user calls it, for the UsageError that is raised for a limit below 1
+/// or
 ///                  above a million.
 /// @param inSetting "LimitTime" in seconds or "LimitMemory" in megabytes.
 /// @return 0 without either: the limit follows from the size of the file.

@@ -10,9 +10,9 @@
 
 namespace ZORToolkit {
 
-/// Finds one share of the verdicts into a folder. A termination signal ends it with what is found so
-/// far, and is then raised as ZORFoundation::Interrupted. A run that resumes goes on from there, also
-/// where the process was killed.
+/// Finds one share of the verdicts into a folder. A termination signal ends it with what is found
+/// so far, and is then raised as ZORFoundation::Interrupted. A run that resumes goes on from there,
+/// also where the process was killed.
 /// @param inManifest says where and of what: all but its plan and its files.
 /// Raises what Detect does.
 ZOR_TOOLKIT_EXPORT ShareSize DetectShare(const std::string& inModel, DetectionOptions inOptions,

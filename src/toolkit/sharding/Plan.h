@@ -1,5 +1,5 @@
-// How long shares of a work are expected to take, from a sample of the work itself. All times are processor
-// time.
+// How long shares of a work are expected to take, from a sample of the work itself. All times are
+// processor time.
 #ifndef ZOR_TOOLKIT_SHARDING_PLAN_H
 #define ZOR_TOOLKIT_SHARDING_PLAN_H
 

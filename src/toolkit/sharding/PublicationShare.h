@@ -19,8 +19,8 @@ ZOR_TOOLKIT_EXPORT ShareSize PublishShare(ClashDocument& ioResult, PublicationOp
                                           ShareManifest inManifest,
                                           const std::function<ZORIProduct_var()>& inOpenModel);
 
-/// Publishes with the pictures of all shares: what one machine would make, byte for byte. Pictures of
-/// a format that the shares have not are drawn, with a warning.
+/// Publishes with the pictures of all shares: what one machine would make, byte for byte. Pictures
+/// of a format that the shares have not are drawn, with a warning.
 /// @param inShares as ReadAllShares gives them.
 /// Raises what Publish does, and Error, with nothing changed, when there is something else to draw
 /// here than the shares say.

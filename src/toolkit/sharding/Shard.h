@@ -33,10 +33,9 @@ inline std::optional<Shard> ShardFrom(std::string_view inText) {
   return shard;
 }
 
-/// The share, from 0, of each item: consecutive items belong together, since they often show the same
-/// parts, and an item is in the share in which the middle of its cost falls. No share is larger or
-/// smaller than the mean by more than the cost of one item. Every machine
-/// cuts alike.
+/// The share, from 0, of each item: consecutive items belong together, since they often show the
+/// same parts, and an item is in the share in which the middle of its cost falls. No share is
+/// larger or smaller than the mean by more than the cost of one item. Every machine cuts alike.
 /// @param inCosts expected, in any unit.
 /// @param inCount at least 1.
 inline std::vector<std::uint32_t> SharesOf(const std::vector<std::uint64_t>& inCosts,
@@ -54,7 +53,8 @@ inline std::vector<std::uint32_t> SharesOf(const std::vector<std::uint64_t>& inC
   return shares;
 }
 
-/// Items to try before all are done: the cheapest, the dearest, and some evenly between them by cost.
+/// Items to try before all are done: the cheapest, the dearest, and some evenly between them by
+/// cost.
 inline std::vector<std::size_t> ItemsToTry(const std::vector<std::uint64_t>& inCosts,
                                            std::size_t inCount) {
   std::vector<std::size_t> items(inCosts.size());

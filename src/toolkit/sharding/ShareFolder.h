@@ -67,8 +67,8 @@ ZOR_TOOLKIT_EXPORT std::optional<ShareManifest> FindShare(
 /// Replaces the manifest in its folder. Raises ZORFoundation::FileError.
 ZOR_TOOLKIT_EXPORT void WriteShare(const ShareManifest& inManifest);
 
-/// What another has that is not of the same work, in words: "the model is another"; empty where both
-/// are. Neither the share's number nor the plan is looked at.
+/// What another has that is not of the same work, in words: "the model is another"; empty where
+/// both are. Neither the share's number nor the plan is looked at.
 ZOR_TOOLKIT_EXPORT std::string WhyForeign(const ShareManifest& inManifest,
                                           const ShareManifest& inOther);
 

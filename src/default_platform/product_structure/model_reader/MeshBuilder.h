@@ -57,8 +57,8 @@ void AddSurfaceEdges(const TopoDS_Shape& inShape, const TopTools_IndexedMapOfSha
 
 inline constexpr std::uint32_t kNoPoints = 0xFFFFFFFF;
 
-/// Fills the part's mesh, its area, and its counts of what has no triangles. On failure the part has
-/// no mesh.
+/// Fills the part's mesh, its area, and its counts of what has no triangles. On failure the part
+/// has no mesh.
 /// @param inDeflection as a share of the diagonal of the part's box.
 /// @return false when the kernel raised an error. Raises std::bad_alloc.
 bool MeshPart(const TDF_Label& inPart, double inDeflection, ModelPart& ioPart);

@@ -77,7 +77,7 @@ class GltfCounts {
     if (inNeeded > inAvailable) throw Fault{inName + " claims more bytes than there are"};
   }
 
-  /// At most these bytes can stand behind a buffer.
+  /// An upper bound of the bytes behind a buffer.
   double Available(const json& inBuffer) const {
     const auto uri = inBuffer.is_object() ? inBuffer.find("uri") : inBuffer.end();
     if (!inBuffer.is_object() || uri == inBuffer.end() || !uri->is_string())

@@ -13,7 +13,8 @@ namespace ZORDefault {
 /// @return why the model cannot be read, one line; "" when nothing was found.
 std::string FindFault(const ModelRequest& inRequest, std::string_view inBytes);
 
-/// @return how many nodes of a glTF or GLB scene stretch, shrink or mirror what they show, which the
+/// @return how many nodes of a glTF or GLB scene stretch, shrink or mirror what they show, which
+/// the
 ///         kernel ignores.
 std::size_t CountScaledNodes(std::string_view inBytes);
 

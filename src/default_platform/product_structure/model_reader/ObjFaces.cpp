@@ -139,8 +139,8 @@ std::vector<Point2> Flattened(const std::vector<Point>& inPolygon) {
   return flat;
 }
 
-/// Ear clipping (Meisters, "Polygons have ears", 1975): only corners that turn inwards can lie in an
-/// ear.
+/// Ear clipping (Meisters, "Polygons have ears", 1975): only corners that turn inwards can lie in
+/// an ear.
 class EarClipping {
  public:
   explicit EarClipping(const std::vector<Point>& inPolygon)

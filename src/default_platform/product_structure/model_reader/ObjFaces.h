@@ -17,8 +17,8 @@ std::optional<std::string> ObjWithoutLargeFaces(std::string_view inText);
 
 using Point = std::array<double, 3>;
 
-/// Cuts a polygon that lies near a plane and does not cross itself into triangles, two fewer than it
-/// has corners. @return positions of corners.
+/// Cuts a polygon that lies near a plane and does not cross itself into triangles, two fewer than
+/// it has corners. @return positions of corners.
 std::vector<std::array<std::size_t, 3>> TrianglesOf(const std::vector<Point>& inPolygon);
 
 }  // namespace ZORDefault

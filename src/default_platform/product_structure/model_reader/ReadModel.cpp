@@ -1,5 +1,5 @@
-// The program that reads models: damaged ones may crash the CAD kernel, which must not be in a host's
-// process.
+// The program that reads models: damaged ones may crash the CAD kernel, which must not be in a
+// host's process.
 #include <Message_ProgressIndicator.hxx>
 #include <Message_ProgressScope.hxx>
 #include <algorithm>

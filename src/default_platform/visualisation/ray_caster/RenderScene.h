@@ -17,8 +17,8 @@ struct RasterPoint {
   float y;
 };
 
-/// The projection of camera space to raster space. An orthographic eye was moved back along the sight
-/// until nothing lies behind it; depths are relative to it.
+/// The projection of camera space to raster space. An orthographic eye was moved back along the
+/// sight until nothing lies behind it; depths are relative to it.
 struct View {
   bool isPerspective = true;
   int width = 0;
@@ -36,7 +36,8 @@ struct View {
   Vector3f RayDirection(RasterPoint inPoint) const {
     return isPerspective ? InPlane(inPoint, 1) : Vector3f{0, 0, 1};
   }
-  /// Perspective: 1 / depth; orthographic: -depth. Linear in raster space along lines and over planes.
+  /// Perspective: 1 / depth; orthographic: -depth. Linear in raster space along lines and over
+  /// planes.
   float InverseDepth(float inDepth) const { return isPerspective ? 1 / inDepth : -inDepth; }
   /// The change of inverse depth over a depth of one pixel's size.
   float InverseDepthPerPixel(float inInverseDepth) const {
@@ -103,7 +104,7 @@ class RenderScene {
 
   const View& GetView() const { return view_; }
   const std::vector<SceneInstance>& GetInstances() const { return instances_; }
-  /// The distance from the original eye that a depth of an instance stands for.
+  /// The distance from the original eye to a depth of an instance.
   double UnbiasedDepth(const SceneInstance& inInstance, float inDepth) const;
   /// Conservative raster bounds of an instance, including its lines; empty when it is not visible.
   PixelBounds BoundsOf(const SceneInstance& inInstance) const;

@@ -185,7 +185,8 @@ AdaptiveSampling::AdaptiveSampling(const SurfacePass& inPass, const View& inView
   });
 }
 
-/// Numbers the samples of the row's refined pixels from 0; their count goes to the next row's start.
+/// Numbers the samples of the row's refined pixels from 0; their count goes to the next row's
+/// start.
 void AdaptiveSampling::MarkRefinedPixels(int inY, std::vector<std::int32_t>& outRowCounts) {
   std::int32_t count = 0;
   for (int x = 0; x < view_.width; ++x) {

@@ -8,8 +8,8 @@
 #include "default_platform/xml/ByteSource.h"
 
 /// Gives a reader to the library as its one and only entity. The library reads damaged bytes as if
-/// nothing were wrong with them: it drops some sequences of UTF-8, and in encodings that it leaves to
-/// ICU each bad byte becomes U+FFFD. Here it gets what it refuses instead.
+/// nothing were wrong with them: it drops some sequences of UTF-8, and in encodings that it leaves
+/// to ICU each bad byte becomes U+FFFD. Here it gets what it refuses instead.
 class DocumentEntity : public xercesc::InputSource {
  public:
   /// Reads the beginning. Raises what the reader raises.

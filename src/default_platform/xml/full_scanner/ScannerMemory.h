@@ -18,8 +18,9 @@ struct ScannerMemoryExhausted {
   const char* reason;
 };
 
-/// Gives a scanner memory up to a limit. A scanner keeps little between two events: only a huge name,
-/// value or text, an entity that grows inside a value, or a million different names come near it.
+/// Gives a scanner memory up to a limit. A scanner keeps little between two events: only a huge
+/// name, value or text, an entity that grows inside a value, or a million different names come near
+/// it.
 class ScannerMemory : public xercesc::MemoryManager {
  public:
   ScannerMemory() = default;
@@ -35,7 +36,8 @@ class ScannerMemory : public xercesc::MemoryManager {
   /// own limit does not count.
   static constexpr std::size_t kMaxReaders = 60'000;
 
-  /// @param inPlace where the scanner is, for errors; null for nowhere. Lives as long as the scanner.
+  /// @param inPlace where the scanner is, for errors; null for nowhere. Lives as long as the
+  /// scanner.
   void SetPlace(const xercesc::Locator* inPlace) { place_ = inPlace; }
 
   void* allocate(XMLSize_t inBytes) override {

@@ -16,7 +16,7 @@ const std::array<gp_XYZ, 7> kDirections{
     gp_XYZ(0.1327, 0.2719, -0.9531), gp_XYZ(-0.8831, 0.4217, -0.2057),
     gp_XYZ(0.3391, -0.6173, -0.7099)};
 
-/// Whether each edge is run through as often one way as the other.
+/// Whether each edge is used as often in one direction as in the other.
 bool IsClosedMesh(const Body& inBody, double inWeldTolerance) {
   const std::vector<std::uint32_t> welded = WeldPoints(inBody.nodes, inWeldTolerance);
   std::unordered_map<std::uint64_t, int> balance;
@@ -58,7 +58,7 @@ Hit MeetRay(const gp_XYZ& inOrigin, const gp_XYZ& inDirection, const Corners& in
   const double sum = u + v + w;
   const double along = to[2] * (to[0] ^ to[1]) / (sum == 0 ? 1 : sum);
   if (u == 0 || v == 0 || w == 0) {
-    // Behind the origin it does not matter what exactly is met.
+    // Behind the origin it does not matter what is hit.
     return sum != 0 && along < 0 ? Hit::kNone : Hit::kUnclear;
   }
   return along > 0 ? Hit::kFront : Hit::kNone;
@@ -164,7 +164,7 @@ int Body::CrossingsAlong(const gp_XYZ& inPoint, const gp_XYZ& inDirection, bool&
 
 bool Body::Encloses(const gp_XYZ& inPoint) const {
   if (!isSolid || box.SquareDistance(inPoint) > 0) return false;
-  // Through a cracked mesh a ray may slip: several vote.
+  // A ray may slip through a cracked mesh: several vote.
   const int wanted = isWatertight ? 1 : 5;
   int votes = 0, inside = 0;
   for (const gp_XYZ& direction : kDirections) {

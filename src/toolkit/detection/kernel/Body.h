@@ -1,4 +1,4 @@
-// What is judged: solids and sheets with their triangles, and the exact faces behind these.
+// Bodies: solids and sheets with their triangles, and the exact faces that these approximate.
 #ifndef ZOR_TOOLKIT_DETECTION_KERNEL_BODY_H
 #define ZOR_TOOLKIT_DETECTION_KERNEL_BODY_H
 
@@ -77,11 +77,12 @@ class Body {
   /// The deviation at a point of a triangle.
   double DeviationAt(std::uint32_t inTriangle, const gp_XYZ& inPoint) const;
 
-  /// Turns normals outwards, measures and builds the tree. To be called once, when all is filled in.
+  /// Turns normals outwards, measures and builds the tree. To be called once, when all is filled
+  /// in.
   void Finish();
 
-  /// Whether a point that is farther from the surface than the triangles lies inside the solid. Turned
-  /// inside out or not, a finite solid's inside is the finite side.
+  /// Whether a point that is farther from the surface than the triangles lies inside the solid.
+  /// Turned inside out or not, a finite solid's inside is the finite side.
   bool Encloses(const gp_XYZ& inPoint) const;
 
  private:
@@ -95,11 +96,12 @@ struct PartGeometry {
   double pointPrecision = 0;
 };
 
-/// Makes triangles and measures them. Never throws for a bad shape: what fails is named in `problems`.
+/// Makes triangles and measures them. Never throws for a bad shape: what fails is named in
+/// `problems`.
 PartGeometry GeometryOf(const Part& inPart, double inMeshSize);
 
-/// Bodies of triangles alone: one for each connected closed surface with the cavities in it, and one
-/// for all that is open.
+/// Bodies of triangles alone: one for each connected closed surface with the cavities in it, and
+/// one for all that is open.
 std::vector<Body> BodiesOfTriangles(const std::vector<gp_XYZ>& inPoints,
                                     const std::vector<std::array<std::uint32_t, 3>>& inTriangles);
 

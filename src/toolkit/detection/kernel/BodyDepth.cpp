@@ -5,7 +5,7 @@
 
 namespace ZORDetection {
 
-/// A file that allows its edges an error does not mean what is within it.
+/// A depth within the tolerances that the file gives its faces and edges is none.
 double BodyPair::AllowedDepth(const Sample& inSample) const {
   double allowed = options_.tolerance;
   const Body &own = sides_[inSample.side].body(), &other = sides_[1 - inSample.side].body();
@@ -84,7 +84,7 @@ void BodyPair::CollectDeep(std::size_t inSide, std::vector<gp_XYZ>& outStarts) {
     regions.pop();
     if (region.bound <= limit()) break;
     if (region.node < 0) {
-      // Across the longest edge, so that thin triangles soon are none.
+      // Across the longest edge, so that slivers do not stay slivers.
       std::size_t longest = 0;
       double square = -1;
       for (std::size_t i = 0; i < 3; ++i) {

@@ -1,4 +1,4 @@
-// Least distance of two bodies that do not enter each other.
+// The distance of two bodies that do not penetrate each other.
 #include <map>
 
 #include "toolkit/detection/kernel/BodyPair.h"
@@ -12,8 +12,8 @@ constexpr int kMaxNewtonSteps = 25;
 constexpr std::size_t kMaxStarts = 40, kMaxStartsOfFaces = 3;
 constexpr double kStartsApart = 20;  // in errors of the triangles
 
-/// A surface, a curve or a point that moves with up to two parameters; the part of a boundary on which a
-/// foot lies.
+/// A surface, a curve or a point that moves with up to two parameters; the part of a boundary on
+/// which a foot lies.
 class Feature {
  public:
   Feature(FaceTool& ioTool, const FaceFoot& inFoot, const gp_Trsf& inCommonFromThis)
@@ -74,7 +74,8 @@ bool Solve(int inSize, std::array<std::array<double, 5>, 4>& ioRows, std::array<
   return true;
 }
 
-/// The shortest of the solutions that come nearest: between parallel lines and planes there are many.
+/// The least-squares solution of minimum norm: between parallel lines and planes there are many
+/// solutions.
 bool SolveLeastSquares(int inSize, const std::array<std::array<double, 5>, 4>& inRows,
                        std::array<double, 4>& outX) {
   constexpr double kDamping = 1e-12;
@@ -91,8 +92,9 @@ bool SolveLeastSquares(int inSize, const std::array<std::array<double, 5>, 4>& i
   return trace > 0 && Solve(inSize, normal, outX);
 }
 
-/// What vanishes where two features are nearest: the part of their distance along each of them. For two
-/// that touch it does not see the distance but the normal, so that Newton's steps stay quadratic.
+/// The residual that vanishes at the closest points of two features: the gap between them,
+/// projected onto the tangents of both. A surface's normal takes the place of the gap, which itself
+/// vanishes where they touch, so that Newton's method stays quadratic.
 class Tangency {
  public:
   Tangency(Feature& ioFirst, Feature& ioSecond) : features_{&ioFirst, &ioSecond} {}
@@ -191,7 +193,7 @@ bool BodyPair::Polish(gp_XYZ& ioFirst) {
     if (!tangency.Step()) return false;
     if (tangency.LastStep() < 1e-10) break;
   }
-  // Only what lies within the trims counts.
+  // Only points within the trims count.
   const gp_XYZ onFirst = a.probe.Nearest(first.Point()).foot.point;
   const BodyFoot foot = b.probe.Nearest(Moved(b.thisFromCommon, onFirst));
   if (!foot.IsFound() || !(foot.distance < onB.distance)) return false;
@@ -221,8 +223,8 @@ bool BodyPair::StepToTangency(const Sample& inStart, Sample& outSample) {
          outSample.depth.value >= inStart.depth.value;
 }
 
-/// Feet on one body and the other in turn come closer with each step: slowly where the bodies are nearly
-/// parallel, so that several steps at once are tried then.
+/// Alternating projection: feet on one body and the other in turn come closer with each step, but
+/// slowly where the bodies are nearly parallel, so that steps are extrapolated there.
 void BodyPair::Alternate(gp_XYZ inFirst) {
   Side &a = sides_[0], &b = sides_[1];
   double last = kInfinity;
@@ -251,7 +253,7 @@ void BodyPair::Alternate(gp_XYZ inFirst) {
   go(200);
 }
 
-/// Goes on along a step, twice as far each time, as long as that comes closer.
+/// Extrapolates a step, twice as far each time, as long as that comes closer.
 void BodyPair::Leap(gp_XYZ& ioFirst, const gp_XYZ& inStep) {
   Side &a = sides_[0], &b = sides_[1];
   const gp_XYZ start = ioFirst;

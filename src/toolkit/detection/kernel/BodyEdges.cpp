@@ -1,4 +1,5 @@
-// Searches along the borders of faces, where a boundary has ridges that no search across it follows.
+// Searches along the borders of faces, where a boundary has ridges that no search across it
+// follows.
 #include <map>
 
 #include "toolkit/detection/kernel/BodyPair.h"
@@ -17,9 +18,10 @@ struct Maximum {
   double at = 0, value = 0;
 };
 
-/// The largest value of a function around a place: brackets it by steps that double, then Brent's
+/// Maximises a function near a parameter: brackets the maximum by doubling steps, then Brent's
 /// method (Algorithms for Minimization without Derivatives, 1973).
-/// @param inIsWorth asked with the largest value so far and the size of the bracket, whether to go on.
+/// @param inIsWorth asked with the largest value so far and the size of the bracket, whether to go
+/// on.
 template <typename Function, typename IsWorth>
 Maximum MaximumAround(double inAt, double inStep, double inTolerance, const Function& inValueAt,
                       const IsWorth& inIsWorth) {
@@ -145,8 +147,8 @@ std::optional<BodyPair::BorderPlace> BodyPair::BorderAt(std::size_t inSide,
   return std::nullopt;
 }
 
-/// Where an edge passes through another the part of it that lies inside may be shorter than any step
-/// between samples. It begins where triangles cross or come nearest.
+/// Where an edge passes through another the part of it that lies inside may be shorter than any
+/// step between samples. It begins where triangles cross or come nearest.
 void BodyPair::ClimbAlongEdges() {
   if (!sides_[0].body().isExact || !sides_[1].body().isExact) return;
   std::map<std::array<std::size_t, 3>, std::size_t> climbsOf;

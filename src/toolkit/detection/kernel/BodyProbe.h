@@ -27,20 +27,20 @@ struct Depth {
   BodyFoot foot;
 };
 
-/// Asks one body about points. For one thread only.
+/// Distance queries to one body. For one thread only.
 class BodyProbe {
  public:
   explicit BodyProbe(const Body& inBody) : body_(inBody), tools_(inBody.faces.size()) {}
 
   const Body& Of() const { return body_; }
 
-  /// @param inBound nothing farther away is looked for.
+  /// @param inBound nothing beyond this distance is searched for.
   BodyFoot Nearest(const gp_XYZ& inPoint, double inBound = std::numeric_limits<double>::infinity());
 
   /// The depth of a point in a solid; for a sheet minus the distance from it.
   Depth DepthOf(const gp_XYZ& inPoint);
 
-  /// The same from the triangles alone, with their error.
+  /// The same, from the triangles alone and with their error.
   double MeshDepthOf(const gp_XYZ& inPoint, double inBound) const;
 
   FaceTool& Tool(std::uint32_t inFace);

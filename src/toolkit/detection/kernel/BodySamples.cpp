@@ -1,4 +1,4 @@
-// Points of one body's boundary, tried against the other body.
+// Samples of one body's boundary, and their depths in the other body.
 #include <map>
 #include <set>
 
@@ -140,9 +140,9 @@ Sample BodyPair::SampleAt(std::size_t inSide, const gp_XYZ& inCommonPoint) {
   return sample;
 }
 
-/// Compass search over the boundary. The compass turns, so that it also finds its way along ridges; where
-/// it stops at a finer step it has come along one, and goes on in that direction (Hooke, Jeeves: Direct
-/// search, 1961).
+/// Compass search over the boundary. The compass turns, so that it also finds its way along ridges;
+/// where it stops at a finer step it has come along one, and goes on in that direction (Hooke,
+/// Jeeves: Direct search, 1961).
 Sample BodyPair::Climb(Sample inStart, double inStep, int inMaxTries) {
   constexpr int kTurns = 8;
   constexpr double kTurn = 0.35, kStretch = 1.6;
@@ -208,8 +208,8 @@ void BodyPair::ClimbFromBestOfFaces() {
     const Body &own = sides_[sample.side].body(), &other = sides_[1 - sample.side].body();
     const bool isFlat = (!own.isExact || own.faces[sample.face].isPlane) &&
                         (!other.isExact || other.faces[sample.depth.foot.face].isPlane);
-    // Between planes the corners, which were sampled, are deepest; where faces lie upon each other all
-    // of them are level.
+    // Between planes the corners, which were sampled, are deepest; where faces lie upon each other
+    // all of them are level.
     if ((isFlat || levelCounts[start] >= kLevel) && !IsClash(sample)) continue;
     if (++climbs > kMaxClimbs) break;
     Sample top;

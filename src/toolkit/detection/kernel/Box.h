@@ -1,4 +1,4 @@
-// Axis-parallel boxes, and points in other frames.
+// Axis-aligned boxes, and points in other frames.
 #ifndef ZOR_TOOLKIT_DETECTION_KERNEL_BOX_H
 #define ZOR_TOOLKIT_DETECTION_KERNEL_BOX_H
 

@@ -29,7 +29,7 @@ const BRepAdaptor_Curve& FaceTool::Curve(int inEdge) {
   return *curve;
 }
 
-/// By the kernel, which is exact and slow near borders.
+/// The kernel's classifier, which is exact, and slow near borders.
 bool FaceTool::IsInByKernel(const gp_XY& inParameters) {
   if (!classifier_)
     classifier_ = std::make_unique<BRepTopAdaptor_FClass2d>(face_.face, kTrimTolerance);

@@ -23,8 +23,8 @@ struct FaceFoot {
   bool isVertex = false;  ///< at an end of that edge
 };
 
-/// Evaluates one face. Holds adaptors and classifiers, which keep caches inside const calls: each thread
-/// needs its own.
+/// Evaluates one face. Holds adaptors and classifiers, which keep caches inside const calls: each
+/// thread needs its own.
 class FaceTool {
  public:
   FaceTool(const Body& inBody, std::uint32_t inFace);

@@ -1,5 +1,5 @@
-// The program that finds the interferences in a model: the CAD kernel may crash on a damaged one, which
-// must not be in a host's process.
+// The program that finds the interferences in a model: the CAD kernel may crash on a damaged one,
+// which must not be in a host's process.
 #include <signal.h>
 #include <unistd.h>
 
@@ -20,7 +20,7 @@ volatile sig_atomic_t isToStop = 0;
 
 void RequestStop(int) { isToStop = 1; }
 
-/// Tells how many verdicts are done of how many, not too often.
+/// Reports how many verdicts are done, not too often.
 class Progress {
  public:
   bool operator()(std::size_t inDone, std::size_t inAll) {
@@ -42,14 +42,14 @@ DetectionTask TakeTask() {
   return DecodeTask(ZORFoundation::ReadToEnd(ZORDefault::ModelReaderProtocol::kTask, "task"));
 }
 
-/// What cannot be written is found again by who goes on.
+/// A record that cannot be written is found again by the run that resumes.
 void Keep(const Findings& inFindings) {
   std::size_t written = 0;
   ZORFoundation::WriteAll(ZORDefault::ModelReaderProtocol::kKept, EncodeRecord(inFindings),
                           written);
 }
 
-/// Parts that products show, which alone are measured.
+/// The parts that products are instances of: no others are measured.
 class ShownParts {
  public:
   ShownParts(const std::vector<TopoDS_Shape>& inShapes, std::vector<Product>& ioProducts) {

@@ -36,7 +36,7 @@ std::vector<Point> ToPoints(const std::vector<gp_XYZ>& inPoints) {
   return points;
 }
 
-/// Probes of one thread, made when first asked for.
+/// The probes of one thread, made on first use.
 class ProbeCache {
  public:
   BodyProbe& ProbeOf(const Body& inBody) {
@@ -74,7 +74,8 @@ void Merge(Verdict&& inVerdict, std::optional<Verdict>& ioBest) {
   ioBest->precision = precision;
 }
 
-/// Whether two parts have a face or an edge in common, which keep their triangles.
+/// Whether two parts share a face or an edge, and with it the triangulation that the kernel stores
+/// there.
 bool SharesTopology(const std::vector<Part>& inParts) {
   std::unordered_map<const Standard_Transient*, const Part*> owners;
   for (const Part& part : inParts) {
@@ -134,7 +135,7 @@ class Search {
  private:
   int ThreadCount() const { return static_cast<int>(std::max(1U, options_.threads)); }
 
-  /// Farther apart than this nothing is looked for.
+  /// Bodies farther apart than this have no interference.
   double Reach() const { return std::max(options_.contactGap, options_.clearance) + 2 * kRounding; }
 
   const PartGeometry& GeometryOfProduct(std::uint32_t inProduct) const {
@@ -187,7 +188,7 @@ class Search {
     pairs_.push_back(pair);
   }
 
-  /// The verdicts that are found here, in their order.
+  /// The verdicts that this run is to find, ascending.
   std::vector<std::size_t> ChooseTasks() {
     for (const Task& task : tasks_.Tasks()) findings_.costs.push_back(CostOf(task));
     const std::vector<std::uint32_t> shares =
@@ -201,8 +202,8 @@ class Search {
     return ZORToolkit::ItemsToTry(findings_.costs, options_.tried);
   }
 
-  /// What a verdict is expected to cost, in triangles: of the bodies that come near each other those
-  /// in the part of their boxes that they have in common, and a constant.
+  /// The expected cost of a verdict, in triangles: those of the bodies that come near each other,
+  /// by the share of their boxes that overlaps, and a constant.
   std::uint64_t CostOf(const Task& inTask) const {
     const PartGeometry &first = geometries_[inTask.firstPart],
                        &second = geometries_[inTask.secondPart];
@@ -265,7 +266,7 @@ class Search {
                              [this](std::uint32_t inPair) { return pairs_[inPair].task; });
   }
 
-  /// What one verdict says of all pairs that stand so.
+  /// The findings of one verdict, for all pairs in this relative placement.
   Findings FindingsOf(std::size_t inTask) const {
     Findings findings;
     findings.pairsChecked = findings_.pairsChecked;
@@ -329,7 +330,7 @@ class Search {
         InterferenceOf(inPair, inVerdict, CurveOf(inPair.task, inVerdict)));
   }
 
-  /// @param inCurve the place of its curve.
+  /// @param inCurve the position of its curve in the findings.
   Interference InterferenceOf(const PairOfProducts& inPair, const Verdict& inVerdict,
                               std::uint32_t inCurve) const {
     const gp_Trsf& rootFromCommon = motions_[inPair.isSwapped ? inPair.second : inPair.first];
@@ -352,7 +353,7 @@ class Search {
     return found;
   }
 
-  /// @return its place in the findings, where each verdict's curve is once.
+  /// @return its position in the findings, which have each verdict's curve once.
   std::uint32_t CurveOf(std::size_t inTask, const Verdict& inVerdict) {
     if (inVerdict.curve.empty()) return 0;
     curves_.resize(verdicts_.size());

@@ -49,13 +49,13 @@ struct Options {
   std::uint32_t shard = 1, shards = 1;
   std::vector<std::uint32_t> known;
   std::size_t tried = 0;  ///< more than 0: only so many of the share, timed one after another
-  /// Says which pairs are looked at; all when empty. Called from the calling thread only.
+  /// Whether a pair is checked; all are when it is empty. Called from the calling thread only.
   std::function<bool(std::uint32_t, std::uint32_t)> isWanted;
-  /// Told how many verdicts are done of how many; returns false to stop. From any thread, never twice
-  /// at a time.
+  /// Called with the numbers of verdicts that are done and of all; returns false to stop. From any
+  /// thread, never twice at a time.
   std::function<bool(std::size_t, std::size_t)> progress;
-  /// Handed what is known before the first verdict, then each verdict's findings alone, in any order
-  /// and without costs. From any thread, never twice at a time.
+  /// Handed what is known before the first verdict, then each verdict's findings alone, in any
+  /// order and without costs. From any thread, never twice at a time.
   std::function<void(const struct Findings&)> keep;
 };
 
@@ -88,7 +88,8 @@ struct Unjudged {
 
 struct Findings {
   std::vector<Interference> interferences;  ///< in the order of the products
-  /// Shared by all interferences of the same parts in the same placement to each other; the first is empty.
+  /// Shared by all interferences of the same parts in the same placement to each other; the first
+  /// is empty.
   std::vector<std::vector<Point>> curves{{}};
   std::vector<Unjudged> unjudged;
   std::size_t pairsChecked = 0;       ///< of products whose boxes come near
@@ -100,12 +101,12 @@ struct Findings {
   bool isStopped = false;
 };
 
-/// Looks at each pair of products once. The result does not depend on the number of threads.
+/// Checks each pair of products once. The result does not depend on the number of threads.
 /// @return what was found up to a stop that `progress` asked for.
 Findings FindInterferences(const std::vector<Part>& inParts, const std::vector<Product>& inProducts,
                            const Options& inOptions);
 
-/// @param inProducts those that were looked at.
+/// @param inProducts those that were checked.
 /// @return at most inMax points along the interference's curve, evenly spread.
 inline std::vector<Point> PointsAlong(const Findings& inFindings,
                                       const Interference& inInterference,

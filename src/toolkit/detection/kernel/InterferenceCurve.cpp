@@ -80,7 +80,8 @@ void BodyPair::AddCrossingCurve(Verdict& ioVerdict) {
   ioVerdict.curve = Thinned(ioVerdict.curve, kMaxCurvePoints);
 }
 
-/// The parts of one body's edges that lie on the other body. Only chords of triangles that come near it can.
+/// The parts of one body's edges that lie on the other body. Only chords of triangles that come
+/// near it can.
 void BodyPair::AddBorderOnOther(std::size_t inSide, Verdict& ioVerdict) {
   const Body& body = sides_[inSide].body();
   std::set<std::uint32_t> faces;

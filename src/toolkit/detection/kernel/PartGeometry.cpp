@@ -24,12 +24,12 @@
 namespace ZORDetection {
 namespace {
 
-// The triangles are only where the search begins: their size decides about time, not about the result.
+// The search starts from the triangles: their size affects its time, not the result.
 constexpr double kDeflectionShare = 0.003;  // of the part's size
 constexpr double kMaxDeflection = 0.5;      // millimetres
 constexpr double kAngle = 0.45;             // radians
 constexpr double kSinglePrecision = 6e-8;
-constexpr double kSafety = 1.5;  // a measured deflection is one at a few points
+constexpr double kSafety = 1.5;  // deflections are measured at a few points only
 
 bool HasSurface(const TopoDS_Face& inFace) {
   TopLoc_Location location;
@@ -265,7 +265,7 @@ class ShapeReading {
     }
   }
 
-  /// Faces of formats without solids enclose one all the same when they are sewn together.
+  /// In formats without solids, faces that enclose a volume once they are sewn together are one.
   void SewFreeFaces() {
     if (freeFaces_ == 0) return;
     BRepBuilderAPI_Sewing sewing(1e-4);

@@ -12,7 +12,7 @@
 
 namespace ZORDetection {
 
-/// Two parts in one placement to each other, judged once for all pairs of products that stand so.
+/// Two parts in a relative placement, judged once for all pairs of products that have it.
 struct Task {
   std::uint32_t firstPart = 0, secondPart = 0;
   gp_Trsf firstFromSecond;
@@ -24,8 +24,8 @@ struct PairOfProducts {
   bool isSwapped = false;  ///< the task's first part is the second product's
 };
 
-/// Finds the task of a relative placement. Placements that differ by rounding only have one task, also
-/// where they fall on two sides of a border between cells.
+/// Finds the task of a relative placement. Placements that differ by rounding alone have one task,
+/// also where the border between two cells of the hash lies between them.
 class TaskTable {
  public:
   std::size_t TaskFor(std::uint32_t inFirst, std::uint32_t inSecond, const gp_Trsf& inMotion,

@@ -1,4 +1,4 @@
-// Bodies of models that are triangles and nothing else.
+// Bodies of mesh formats, which have triangles alone.
 #include <map>
 #include <numeric>
 
@@ -136,8 +136,8 @@ class Soup {
     }
   }
 
-  /// A surface that is turned inwards bounds the smallest hull around it from within; without one it is
-  /// a body turned inside out.
+  /// A surface that is turned inwards bounds the smallest hull around it from within; without one
+  /// it is a body turned inside out.
   void PlaceCavity(const std::vector<std::uint32_t>& inCavity,
                    std::vector<std::vector<std::uint32_t>>& ioHulls, std::vector<Body>& ioBodies) {
     const gp_XYZ& point = points_[triangles_[inCavity.front()][0]];

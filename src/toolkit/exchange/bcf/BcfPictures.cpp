@@ -169,8 +169,8 @@ std::vector<Snapshot> SnapshotMaker::Make(const std::vector<const InterferenceRe
   return snapshots;
 }
 
-// Cameras are chosen where pictures are drawn, and come back beside them: choosing one takes as long
-// as drawing.
+// Cameras are chosen where pictures are drawn, and come back beside them: choosing one takes as
+// long as drawing.
 void SnapshotMaker::Draw(const std::vector<std::size_t>& inWanted,
                          const std::vector<ResolvedInterference>& inResolved,
                          std::vector<Snapshot>& ioSnapshots) {

@@ -24,8 +24,8 @@ struct SnapshotCamera {
 
 struct Snapshot {
   SnapshotCamera camera;
-  std::string
-      picture;  ///< path of a PNG or JPEG file; empty: there is none, and a white one stands in
+  /// Path of a PNG or JPEG file; empty: there is none, and a white one stands in.
+  std::string picture;
   double aspectRatio = 1;
   std::array<std::string, 2> colours;  ///< RRGGBB, upper case
   bool showsProducts = false;

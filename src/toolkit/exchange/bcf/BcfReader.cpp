@@ -31,7 +31,7 @@ std::string FolderOf(const std::string& inName) {
   return slash == std::string::npos ? "" : inName.substr(0, slash);
 }
 
-/// Without the white space around it, as names, words and numbers are meant.
+/// Trimmed: white space around names, words and numbers means nothing.
 std::string WordOf(const DOM_Node& inElement) {
   const std::string text = TextOf(inElement);
   const std::size_t begin = text.find_first_not_of(" \t\r\n");
@@ -259,7 +259,7 @@ class BcfCollector {
     project_.topics.push_back(TopicIn(inMarkup, inFolder));
   }
 
-  /// The first versions need not list what has the usual names.
+  /// The first versions need not list files that have the usual names.
   void FindFiles(BcfTopic& ioTopic) {
     const std::string folder = ioTopic.folder.empty() ? "" : LowerCase(ioTopic.folder) + "/";
     if (ioTopic.viewpoints.empty() && names_.contains(folder + kFirstViewpoint)) {

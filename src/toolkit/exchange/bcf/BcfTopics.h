@@ -1,5 +1,5 @@
-// Which topics a clash result becomes in BCF: the writer's plan, and what the way back compares with;
-// for the toolkit's own sources.
+// Which topics a clash result becomes in BCF: the writer's plan, and what the way back compares
+// with; for the toolkit's own sources.
 #ifndef ZOR_TOOLKIT_EXCHANGE_BCF_BCF_TOPICS_H
 #define ZOR_TOOLKIT_EXCHANGE_BCF_BCF_TOPICS_H
 
@@ -12,8 +12,8 @@ namespace ZORToolkit {
 
 /// Lower-case GUIDs that are always the same for the same name.
 std::string GuidNamed(const std::string& inName);
-/// The GUID of a component as IFC writes it, in 22 characters: that of the product's own identifier,
-/// if it is one, else one made of its identity.
+/// The GUID of a component as IFC writes it, in 22 characters: that of the product's own
+/// identifier, if it is one, else one made of its identity.
 std::string IfcGuidOf(const std::string& inProductId);
 
 struct PlannedComment {

@@ -145,7 +145,7 @@ class BcfFileWriter {
     return entries;
   }
 
-  /// A ready one as it is, if it is as BCF wants it.
+  /// An existing picture, unchanged where BCF allows it as it is.
   static std::string PictureFile(Snapshot& ioSnapshot) {
     if (ioSnapshot.picture.empty()) return WhitePng();
     const std::string bytes = ZORFoundation::ReadWholeFile(ioSnapshot.picture).bytes;
@@ -294,7 +294,8 @@ class BcfFileWriter {
     ioXml.Leaf("Description", kAttachedDescription).Close();
   }
 
-  /// The products of all members, each once: one that is somewhere the first has its colour.
+  /// The products of all members, each once: one that is the first of some member has the first's
+  /// colour.
   std::vector<ShownComponent> ComponentsOf(const PlannedTopic& inTopic) const {
     std::vector<ShownComponent> components;
     std::set<std::string> known;
@@ -350,7 +351,8 @@ class BcfFileWriter {
     ioXml.Close();
   }
 
-  /// Version 2.1 has angles of 45 to 60 degrees only: from nearer, as much is seen around the focus.
+  /// Version 2.1 has angles of 45 to 60 degrees only: from nearer, as much is seen around the
+  /// focus.
   void WriteCamera(const Snapshot& inSnapshot, XmlText& ioXml) const {
     SnapshotCamera camera = inSnapshot.camera;
     constexpr double kLeast = 45 * kPi / 180, kMost = 60 * kPi / 180;

@@ -31,7 +31,7 @@ struct BcfOptions {
   std::string page;
   int processes = 1;        ///< that draw; at least 1
   std::string resultBytes;  ///< of the result's file, which goes into the BCF file whole
-  /// Told how many pictures are drawn. May be empty.
+  /// Called with the numbers of pictures that are drawn and of all. May be empty.
   std::function<void(std::size_t inDone, std::size_t inAll)> drawn;
 };
 

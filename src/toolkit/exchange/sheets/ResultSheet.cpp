@@ -22,7 +22,7 @@ const std::vector<std::uint32_t> kTypeColours = {0xF8CBAD, 0xFFE699, 0xBDD7EE};
 const std::vector<std::string> kStatuses = {"Not inspected", "Relevant", "Irrelevant"};
 const std::vector<std::uint32_t> kStatusColours = {0xEDEDED, 0xF4B084, 0xC6E0B4};
 
-/// How often things of one kind are there.
+/// Counts for one kind of thing.
 struct Counts {
   int all = 0, byType[3] = {};
   double worst = HUGE_VAL;  // none: infinity

@@ -20,9 +20,9 @@ struct SheetCell {
 /// The headers of the rows below. Lengths are millimetres.
 ZOR_TOOLKIT_EXPORT std::vector<std::string> SheetHeaders();
 
-/// A row of cells for each interference that a filter accepts, in the order of SheetHeaders. "Id" is
-/// the stable identifier, by which a row comes back; "Status" and "Comment" are for editing; "Base"
-/// is what they were when the row was written.
+/// A row of cells for each interference that a filter accepts, in the order of SheetHeaders. "Id"
+/// is the stable identifier, by which a row comes back; "Status" and "Comment" are for editing;
+/// "Base" is what they were when the row was written.
 /// @return what the rows have no place for.
 ZOR_TOOLKIT_EXPORT std::vector<NotCarried> ForEachSheetRow(
     ClashDocument& ioResult, const RecordFilter& inFilter,

@@ -17,7 +17,7 @@ namespace ZORToolkit {
 namespace {
 
 typedef std::vector<std::string> Row;
-/// Told row after row, the header first. @return false to be told no more.
+/// Called with row after row, the header first. @return false to stop.
 typedef std::function<bool(Row& ioRow)> RowVisit;
 
 // Office Open XML
@@ -43,7 +43,7 @@ std::string Unescaped(const std::string& inText) {
   return text;
 }
 
-/// The text of a string, plain or in runs; not what says how it is pronounced.
+/// The text of a string, plain or in runs, without phonetic hints.
 std::string StringIn(const DOM_Node& inElement) {
   std::string text;
   ForEachLocal(inElement, "t", [&](const DOM_Node& inText) { text += TextOf(inText); });
@@ -132,7 +132,7 @@ class Workbook {
 
 // Text
 
-/// The sign between cells: that of which the first line has most.
+/// The delimiter: the candidate that the first line has most of.
 char SeparatorIn(std::string_view inText) {
   const std::string_view line = inText.substr(0, inText.find('\n'));
   char best = ',';
@@ -141,7 +141,8 @@ char SeparatorIn(std::string_view inText) {
   return best;
 }
 
-/// What our own writing put before a text that a spreadsheet would take for a formula.
+/// Removes the apostrophe that our CSV writer puts before a text that a spreadsheet would take for
+/// a formula.
 std::string WithoutGuard(std::string inCell) {
   constexpr std::string_view kGuarded = "=+-@\t\r";
   if (inCell.size() > 1 && inCell[0] == '\'' && kGuarded.find(inCell[1]) != kGuarded.npos)

@@ -1,4 +1,4 @@
-// What a publication was made from, so that one can say later what changed.
+// What a publication was made from, to tell later what has changed.
 #ifndef ZOR_TOOLKIT_PUBLISHING_FOLDER_MANIFEST_H
 #define ZOR_TOOLKIT_PUBLISHING_FOLDER_MANIFEST_H
 
@@ -32,7 +32,7 @@ struct Manifest {
   std::vector<HashedFile> files;  ///< pictures and geometry, by name
 };
 
-/// What the options say, without files.
+/// The manifest of the options, without files.
 /// @param inPictureSettings what else decides how pictures look.
 Manifest ManifestOf(const PublicationOptions& inOptions, const std::string& inPictureSettings);
 
@@ -40,7 +40,7 @@ std::string JsonOf(const Manifest& inManifest);
 /// @param inName what errors call it. Raises Error for what is no manifest.
 Manifest ManifestFrom(const std::string& inName, const std::string& inJson);
 
-/// What differs, a line each: "result: changed".
+/// The differences, a line each, such as "result: changed".
 std::vector<std::string> Differences(const Manifest& inOld, const Manifest& inNew);
 
 }  // namespace ZORToolkit

@@ -107,7 +107,8 @@ class OwnFiles {
     return true;
   }
 
-  /// The hash of the style sheet that the former publication was made with; empty for the page's own.
+  /// The hash of the style sheet that the former publication was made with; empty for the page's
+  /// own.
   std::string FormerStyleSheet() const {
     if (!manifest_) return {};
     for (const auto& [name, value] : manifest_->settings)

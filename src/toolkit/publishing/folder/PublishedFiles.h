@@ -1,4 +1,4 @@
-// The files of a publication but its pictures.
+// The files of a publication except its pictures.
 #ifndef ZOR_TOOLKIT_PUBLISHING_FOLDER_PUBLISHED_FILES_H
 #define ZOR_TOOLKIT_PUBLISHING_FOLDER_PUBLISHED_FILES_H
 
@@ -25,7 +25,7 @@ struct PageStyleSheet {
   std::string text;
 };
 
-/// Under which name it lies beside the report.
+/// The name of its file beside the report.
 std::string FileNameOf(const PageStyleSheet& inSheet);
 
 /// The page of a result. Raises Error.
@@ -33,12 +33,12 @@ std::string MakePageOf(const PublicationOptions& inOptions, const PageStyleSheet
                        const ClashDocument& inDocument, PublishedResult& ioPublished);
 
 /// Raises Error that names the file where one stands in the way of a publication's page, report,
-/// style sheet, document type, manifest or geometry that no lyra publish made. Those of former
-/// versions are known by what they say.
+/// style sheet, document type, manifest or geometry that no lyra publish made. Files of former
+/// versions are recognised by their content.
 void RequireOwnFiles(const PublicationOptions& inOptions, const PageStyleSheet& inSheet);
 
 /// Writes page, report and what they need. Raises Error and ZORFoundation::FileError.
-/// @param inWorkFolder where files are until they are whole.
+/// @param inWorkFolder where files are until they are complete.
 void WritePublishedFiles(const PublicationOptions& inOptions, const PageStyleSheet& inSheet,
                          const ClashDocument& inDocument, const std::string& inPage,
                          const std::string& inManifest, const std::string& inWorkFolder);

@@ -1,4 +1,4 @@
-// Where a publication's files are while they are written.
+// The folder in which the files of a publication are written before they are moved into place.
 #ifndef ZOR_TOOLKIT_PUBLISHING_FOLDER_WORKFOLDER_H
 #define ZOR_TOOLKIT_PUBLISHING_FOLDER_WORKFOLDER_H
 
@@ -12,13 +12,13 @@
 namespace ZORToolkit {
 
 /// A hidden folder in one that is published into, for this process and those that it forks alone.
-/// What a killed process left in it goes; nothing outside it is anybody's to clear away.
+/// What a killed process left in it is removed; nothing outside of it ever is.
 class WorkFolder {
  public:
   /// Makes both folders where they are missing. Raises Error when another process publishes into
   /// this one, ZORFoundation::FileError and std::filesystem::filesystem_error.
   explicit WorkFolder(const std::filesystem::path& inFolder);
-  /// Removes it with what is unfinished.
+  /// Removes it with the unfinished files.
   ~WorkFolder();
   WorkFolder(const WorkFolder&) = delete;
   WorkFolder& operator=(const WorkFolder&) = delete;
@@ -29,7 +29,7 @@ class WorkFolder {
  private:
   void Lock(const std::filesystem::path& inFolder);
   void RemoveFiles() const;
-  // Those of each system.
+  // Implemented for each system.
   bool TryLock();
   void RemoveFolder();
 

@@ -99,7 +99,7 @@ bool Gunzip(std::string_view inBytes, std::size_t inMaxSize, std::string& outByt
 }
 
 std::string WebpFromPng(std::string_view inPng) {
-  constexpr float kQuality = 82;  // edges of drawn surfaces stay clean
+  constexpr float kQuality = 82;  // edges of surfaces stay clean
   png_image image{};
   image.version = PNG_IMAGE_VERSION;
   if (png_image_begin_read_from_memory(&image, inPng.data(), inPng.size()) == 0) return {};

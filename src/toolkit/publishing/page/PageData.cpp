@@ -7,7 +7,7 @@ namespace {
 
 using Json = nlohmann::ordered_json;
 
-/// Groups without what the page does not show; those that would be empty are left out.
+/// The groups of what the page shows; empty ones are left out.
 Json JsonOf(const std::vector<InterferenceGroup>& inGroups, const ReviewedResult& inResult,
             const std::vector<bool>& inIsShown) {
   Json groups = Json::array();

@@ -1,4 +1,4 @@
-// What the script of a page knows besides what the page shows.
+// The data of a page's script, besides what the page shows.
 #ifndef ZOR_TOOLKIT_PUBLISHING_PAGE_PAGE_DATA_H
 #define ZOR_TOOLKIT_PUBLISHING_PAGE_PAGE_DATA_H
 
@@ -19,7 +19,7 @@ struct PageData {
 };
 
 /// JSON in ASCII that can stand in a script element.
-/// @param inIsShown of each interference, whether the page has it.
+/// @param inIsShown for each interference, whether the page has it.
 std::string JsonOf(const PageData& inData, const ReviewedResult& inResult,
                    const std::vector<bool>& inIsShown);
 

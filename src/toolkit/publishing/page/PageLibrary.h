@@ -1,5 +1,5 @@
-// What the toolkit and its page library say to each other. The library stands on libxslt, zlib,
-// Nettle, libwebp and meshoptimizer; it is loaded when the first page is made or read.
+// The interface between the toolkit and its page plugin, which stands on libxslt, zlib, Nettle,
+// libwebp and meshoptimizer. It is loaded when the first page is made or read.
 #ifndef ZOR_TOOLKIT_PUBLISHING_PAGE_PAGE_LIBRARY_H
 #define ZOR_TOOLKIT_PUBLISHING_PAGE_PAGE_LIBRARY_H
 
@@ -21,12 +21,12 @@ struct PageRequest {
 struct Page {
   std::string bytes;
   std::string reason;    // in one line, why there is no page
-  std::string messages;  // what the style sheet had to say
+  std::string messages;  // messages of the style sheet
 };
 
 struct PageLibrary {
   /// Applies a style sheet to a document. A style sheet reads and writes no file and reaches no
-  /// network; it is all in one text. Characters that turn the direction of writing reach it as
+  /// network; it is all in one text. Characters that change the direction of writing reach it as
   /// \u{HEX}. @return false, with a reason, when there is no page.
   bool (*makePage)(const PageRequest& inRequest, Page& outPage);
 

@@ -19,7 +19,7 @@
 namespace ZORToolkit {
 namespace {
 
-// Both libraries report in pieces of a line.
+// Both libraries report messages in pieces of a line.
 void Collect(void* ioText, const char* inFormat, ...) __attribute__((format(printf, 2, 3)));
 void Collect(void* ioText, const char* inFormat, ...) {
   constexpr std::size_t kMaxText = 1 << 16;
@@ -33,7 +33,7 @@ void Collect(void* ioText, const char* inFormat, ...) {
   try {
     text += piece;
   } catch (const std::bad_alloc&) {
-    // Nothing may be thrown through a library of C.
+    // No exception may pass through a C library.
   }
 }
 
@@ -109,7 +109,7 @@ using StyleSheet = std::unique_ptr<xsltStylesheet, Freer<xsltFreeStylesheet>>;
 using Security = std::unique_ptr<xsltSecurityPrefs, Freer<xsltFreeSecurityPrefs>>;
 using Context = std::unique_ptr<xsltTransformContext, Freer<xsltFreeTransformContext>>;
 
-/// Leads the libraries' messages to a text while this lives.
+/// Collects the libraries' messages while this lives.
 class MessagesTo {
  public:
   explicit MessagesTo(std::string& ioText) {

@@ -1,4 +1,4 @@
-// The parts of the page library.
+// The functions of the page plugin.
 #ifndef ZOR_TOOLKIT_PUBLISHING_PAGE_PAGE_MAKER_H
 #define ZOR_TOOLKIT_PUBLISHING_PAGE_PAGE_MAKER_H
 

@@ -1,4 +1,4 @@
-// An older result beside the one that is published.
+// The comparison of a published result with an older one, its baseline.
 #ifndef ZOR_TOOLKIT_PUBLISHING_PAGE_PUBLISHED_COMPARISON_H
 #define ZOR_TOOLKIT_PUBLISHING_PAGE_PUBLISHED_COMPARISON_H
 
@@ -9,8 +9,8 @@
 
 namespace ZORToolkit {
 
-/// What a page shows of an interference; a word that the reader could not understand is shown as the
-/// document has it.
+/// What a page shows of an interference; a word that the reader could not understand is shown as
+/// the document has it.
 PublishedInterference PublishedOf(const InterferenceRecord& inRecord);
 
 /// An interference of the older result that has a picture of its own.
@@ -21,14 +21,15 @@ struct Before {
   ResolvedInterference resolved;
 };
 
-/// Says of each published interference what became of it since, and adds those that are gone.
+/// Fills in for each published interference what became of it since, and adds those that are gone.
 /// @param inOptions with a baseline.
 /// @return those that have changed or are gone.
 std::vector<Before> CompareWithBaseline(const PublicationOptions& inOptions,
                                         const ReviewedResult& inReview,
                                         PublishedResult& ioPublished);
 
-/// Looks them up in the model that they were computed with; those that it has nothing of leave.
+/// Resolves them in the model that they were computed with; those of which it has no product are
+/// removed.
 void ResolveBefore(const PublicationOptions& inOptions, const ZORIProduct_var& inRoot,
                    std::vector<Before>& ioBefore);
 

@@ -1,4 +1,4 @@
-// What pictures show otherwise than the result has it.
+// Where pictures deviate from the result.
 #ifndef ZOR_TOOLKIT_PUBLISHING_PICTURES_DEVIATIONS_H
 #define ZOR_TOOLKIT_PUBLISHING_PICTURES_DEVIATIONS_H
 
@@ -11,6 +11,8 @@
 
 namespace ZORToolkit {
 
+/// Collects the products that the model lacks, and the interferences whose products are drawn as in
+/// the model since their placements in the result cannot be trusted.
 class Deviations {
  public:
   void Add(int inNumber, const InterferenceRecord& inRecord,

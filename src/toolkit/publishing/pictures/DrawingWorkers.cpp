@@ -77,7 +77,7 @@ struct Pipe {
   int reader, writer;
 };
 
-/// Lets this process end with its parent, however that ends: nothing is written for nobody.
+/// Lets this process end with its parent, however that ends.
 void EndWith(pid_t inParent) {
   prctl(PR_SET_PDEATHSIG, SIGKILL);
   if (getppid() != inParent) _exit(1);  // ended before that took effect
@@ -118,7 +118,7 @@ void Follow(const DrawingWork& inWork, const ZORFoundation::StopRequest& inStop,
     ioProgress.done += drawn;
     ioProgress.seconds = std::accumulate(seconds, seconds + drawn, ioProgress.seconds);
     inWork.isDone(ioProgress.done, ioProgress.seconds);
-    if (inStop.IsMade()) ioNext.Set(inWork.count);  // leaves nothing to begin
+    if (inStop.IsMade()) ioNext.Set(inWork.count);  // so that no worker begins another
   }
 }
 

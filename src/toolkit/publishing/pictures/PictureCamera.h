@@ -1,4 +1,4 @@
-// Where the picture of an interference is taken from.
+// The camera of the picture of an interference.
 #ifndef ZOR_TOOLKIT_PUBLISHING_PICTURES_PICTURE_CAMERA_H
 #define ZOR_TOOLKIT_PUBLISHING_PICTURES_PICTURE_CAMERA_H
 
@@ -12,9 +12,9 @@
 
 namespace ZORToolkit {
 
-/// A camera as numbers: "perspective" or "orthographic", then the eye, the direction of sight and up,
-/// then the distance of what is looked at, the full vertical angle in radians (perspective) or the
-/// height that is shown (orthographic), the near and the far plane (0: none).
+/// A camera as numbers: "perspective" or "orthographic", then the eye, the direction of sight and
+/// up, then the distance of what is looked at, the full vertical angle in radians (perspective) or
+/// the height that is shown (orthographic), the near and the far plane (0: none).
 struct PictureCamera {
   bool isPerspective = true;
   ZORMathVector eye, sight, up;
@@ -26,14 +26,14 @@ struct PictureCamera {
 PictureCamera CameraOf(const ZORDefault::InterferenceScene& inScene, PictureSize inSize,
                        bool inFramesInterference);
 
-/// How deep a camera sees until both products of the scene lie before that.
+/// The distance up to which a camera has to see to show both products of the scene whole.
 double DepthOf(const ZORDefault::InterferenceScene& inScene, const PictureCamera& inCamera);
 
-/// The camera with which all of a representation is shown from a corner.
+/// A camera that shows all of a representation from a corner.
 PictureCamera OverviewCamera(const ZOR3DRep& inRep, PictureSize inSize);
 
-/// Where a camera sees a point: shares of the picture's width and height, from its left and its top.
-/// Nothing for what is behind it or beside the picture.
+/// Projects a point to the picture: shares of its width and height, from the left and the top.
+/// Nothing for a point behind the camera or outside of the picture.
 std::optional<std::array<double, 2>> Seen(const PictureCamera& inCamera, PictureSize inSize,
                                           const ZORMathVector& inPoint);
 

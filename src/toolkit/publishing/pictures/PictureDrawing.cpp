@@ -14,7 +14,7 @@ namespace ZORToolkit {
 namespace {
 
 constexpr char kSettings[] = "ClashPublish", kZoomSetting[] = "PictureZoom";
-constexpr char kFound[] = "";  // no path: the products are found already
+constexpr char kFound[] = "";  // no path: the products are resolved already
 
 int ZoomNumber() {
   int zoom = 0;
@@ -23,7 +23,7 @@ int ZoomNumber() {
   return zoom;
 }
 
-// What is no known value frames all that is shown, as another than 0 does.
+// Any value but 0 frames all that is shown, unknown ones too.
 PictureZoom CurrentZoom() {
   return ZoomNumber() == 0 ? PictureZoom::kInterference : PictureZoom::kProducts;
 }

@@ -11,7 +11,7 @@
 
 namespace ZORToolkit {
 
-/// While this lives, the setting "PictureZoom" is what the options say, if they do.
+/// While this lives, the setting "PictureZoom" has the value of the options, if they have one.
 class ZoomOfOptions {
  public:
   explicit ZoomOfOptions(const PublicationOptions& inOptions);
@@ -26,7 +26,8 @@ std::string PictureSettings();
 /// The file of an interference's camera, in the folder of unfinished pictures.
 std::string CameraName(int inNumber);
 
-/// Draws in the folder of unfinished pictures, which is the current one: no text has to carry its path.
+/// Draws in the folder of unfinished pictures, which is the current directory, so that no text has
+/// to hold its path.
 class PictureDrawing {
  public:
   PictureDrawing(int inNumber, const ResolvedInterference& inResolved, const PictureStore& inStore,

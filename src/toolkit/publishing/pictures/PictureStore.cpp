@@ -20,8 +20,8 @@ constexpr std::string_view kListStart = "drawn";
 
 constexpr char kOverview[] = "overview";
 
-/// The parts of a picture's name: the number of its interference, negative in the baseline, 0 for the
-/// overview, and what kind of picture it is.
+/// The parts of a picture's name: the number of its interference, negative in the baseline, 0 for
+/// the overview, and what kind of picture it is.
 struct PictureNameParts {
   std::string number, kind;
 };
@@ -42,7 +42,7 @@ struct Stamp {
   std::optional<std::set<std::string>> names;
 };
 
-/// What does not look like a picture's name is none: a list can lead nowhere else.
+/// Anything but a picture's name is skipped: a list can lead nowhere else.
 std::optional<Stamp> ReadStamp(const fs::path& inPath) {
   const auto file = ZORFoundation::TryReadWholeFile(inPath.string());
   if (!file) return std::nullopt;
@@ -55,7 +55,7 @@ std::optional<Stamp> ReadStamp(const fs::path& inPath) {
   return stamp;
 }
 
-/// A line feed comes first, so that a line that was cut off spoils none but itself.
+/// A line feed comes first, so that a truncated line damages no other.
 std::string ListText(const std::vector<std::string>& inNames) {
   std::string text;
   for (const std::string& name : inNames) text.append(1, '\n').append(name);
@@ -108,7 +108,7 @@ void PictureStore::Settle(const std::string& inStamp) const {
   WriteStamp(inStamp, names);
 }
 
-/// The files that are there under names that pictures of these interferences may get.
+/// The existing files with names that pictures of these interferences may get.
 std::set<std::string> PictureStore::PicturesOf(const std::set<std::string>& inNumbers) const {
   std::set<std::string> names;
   for (const fs::directory_entry& entry : fs::directory_iterator(folder_)) {

@@ -11,9 +11,9 @@
 
 namespace ZORToolkit {
 
-/// Pictures appear whole or not at all, and a main one after its small ones, so one that is there is
-/// done. A stamp beside them says what they were drawn from and lists them: a picture that is not
-/// listed is somebody else's, and is neither replaced nor removed. Raises Error,
+/// Pictures appear whole or not at all, and a main one after its small ones, so one that is there
+/// is done. A stamp beside them says what they were drawn from and lists them: a picture that is
+/// not listed is somebody else's, and is neither replaced nor removed. Raises Error,
 /// ZORFoundation::FileError, and std::filesystem::filesystem_error for what cannot be read or made.
 class PictureStore {
  public:
@@ -23,27 +23,27 @@ class PictureStore {
 
   /// Where pictures are drawn, under the names that they will have.
   const std::string& DrawingFolder() const { return work_.Path(); }
-  /// Makes the folder ready. The pictures that are there stay only when they are to be gone on with
-  /// and were drawn from what the stamp says. Raises Error, with nothing changed, where somebody
-  /// else's picture stands in the place of one of these interferences.
-  /// @return false when they were to stay and could not.
+  /// Prepares the folder. Existing pictures are kept only where the run resumes and they were drawn
+  /// from what the stamp says. Raises Error, with nothing changed, where somebody else's picture
+  /// stands in the place of one of these interferences.
+  /// @return false when they were to be kept and could not.
   bool Prepare(const std::string& inStamp, bool inGoesOn, const std::set<std::string>& inNumbers);
-  /// Lists, in order, the pictures that are there in the end.
+  /// Writes the final list of pictures, in order.
   void Settle(const std::string& inStamp) const;
 
-  // Names within the folder; of interferences, the overview of all has number 0, those of the
-  // baseline have negative ones
+  // Names within the folder, by the number of the interference: 0 is the overview of all; those of
+  // the baseline are negative.
   std::string PictureName(int inNumber) const;
   /// @param inProduct 0 or 1.
   std::string PreviewName(int inNumber, std::size_t inProduct) const;
-  /// The small pictures that are there beside a main one, in their order.
+  /// The existing small pictures of a main one, in their order.
   std::vector<std::string> ThumbnailNames(int inNumber) const;
 
-  /// Puts what was drawn in its place: a main picture with its small ones, or a preview.
+  /// Moves what was drawn into place: a main picture with its small ones, or a preview.
   void Finish(int inNumber) const;
   void FinishPreview(int inNumber, std::size_t inProduct) const;
 
-  /// Puts what lies in the drawing folder under these names in its place.
+  /// Moves the pictures of these names from the drawing folder into place.
   void TakeOver(const std::vector<std::string>& inNames) const;
 
   bool Has(const std::string& inName) const;

@@ -19,7 +19,7 @@ struct DrawingItem {
   std::uint64_t cost = 0;  ///< expected; see DrawingCosts
 };
 
-/// Which pictures a run draws, where it is not all of them, and where it gets others from.
+/// For a run that draws a share of the pictures: which these are, and where others come from.
 class SharedDrawing {
  public:
   SharedDrawing() = default;
@@ -31,7 +31,8 @@ class SharedDrawing {
   virtual std::vector<std::size_t> Choose(const std::vector<DrawingItem>& inItems) = 0;
   /// Called once the store is ready, before anything is drawn.
   virtual void Begin(const PictureStore&) {}
-  /// Told that so many of the chosen items are drawn, and the processor time of all these in seconds.
+  /// Called with the number of chosen items that are drawn, and the processor time of all these in
+  /// seconds.
   virtual void Drawn(std::size_t, double) {}
   /// Called once all that was chosen is drawn.
   virtual void Finish(const PictureStore&) {}
@@ -39,8 +40,8 @@ class SharedDrawing {
   virtual bool MakesPage() const { return false; }
 };
 
-/// What drawing an interference is expected to cost, in triangles: those of its products, and a
-/// constant for what each picture costs whatever it shows.
+/// The expected cost of drawing an interference, in triangles: those of its products, and a
+/// constant for what any picture costs.
 class DrawingCosts {
  public:
   std::uint64_t Of(const ResolvedInterference& inResolved);

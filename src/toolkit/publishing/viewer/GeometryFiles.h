@@ -1,5 +1,5 @@
-// The geometry of a published folder's 3D views: scripts beside the page, since a page that was opened
-// from disk may load nothing else.
+// The geometry of a published folder's 3D views: scripts beside the page, since a page that was
+// opened from disk may load nothing else.
 #ifndef ZOR_TOOLKIT_PUBLISHING_VIEWER_GEOMETRY_FILES_H
 #define ZOR_TOOLKIT_PUBLISHING_VIEWER_GEOMETRY_FILES_H
 
@@ -12,16 +12,16 @@
 
 namespace ZORToolkit {
 
-/// Of the script with this block, as the page refers to it.
+/// The path of the script with this block, as the page refers to it.
 std::string GeometryPath(const PageBlock& inBlock);
 
 /// The script with this block.
 std::string GeometryScript(const PageBlock& inBlock);
 
-/// Whether a script begins as one of ours.
+/// Whether a text begins as such a script does.
 bool IsGeometryScript(std::string_view inText);
 
-/// What has the name of such a script in a publication's folder.
+/// The files in a publication's folder that have the name of such a script.
 std::vector<std::filesystem::path> GeometryFilesIn(const std::string& inFolder);
 
 /// Writes a script for each block, and removes those of a former publication. Raises FileError.

@@ -1,4 +1,4 @@
-// A part's mesh as few bytes, for a page.
+// Compact encoding of a part's mesh, for a page.
 #ifndef ZOR_TOOLKIT_PUBLISHING_VIEWER_MESH_CODING_H
 #define ZOR_TOOLKIT_PUBLISHING_VIEWER_MESH_CODING_H
 
@@ -11,7 +11,7 @@
 
 namespace ZORToolkit {
 
-/// "#rrggbb"; how opaque it is is left out.
+/// "#rrggbb", without the opacity.
 std::string ColourText(const std::array<std::uint8_t, 4>& inColour);
 
 /// Triangles of one colour, one after the other.
@@ -31,7 +31,8 @@ struct CodedMesh {
 
 /// Positions have 16 bits an axis, as differences from the point before, low bytes and high bytes
 /// apart. Normals are octahedral (Q. Meyer and others, "On floating-point normal vectors", 2010), a
-/// byte an axis. Corners count back from the highest one so far. All of it is meant to be packed.
+/// byte an axis. Corners count back from the highest one so far. The bytes are meant to be
+/// compressed.
 /// @param inShare of the triangles to keep; 1: all.
 CodedMesh CodeMesh(const PartMesh& inMesh, double inShare);
 

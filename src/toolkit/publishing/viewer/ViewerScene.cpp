@@ -173,10 +173,10 @@ bool ViewerScene::IsEmpty() const { return content_->pairs.empty(); }
 
 namespace {
 
-/// The curve of an interference, of which a result has but points. It promises no order, though those
-/// that follow one another mostly are neighbours: near ones are joined, the nearest first, each with
-/// at most two (the greedy tour of J. L. Bentley, "Fast algorithms for geometric traveling salesman
-/// problems", 1992), until the curve is as long as the result says.
+/// The curve of an interference, of which a result has but points. It promises no order, though
+/// those that follow one another mostly are neighbours: near ones are joined, the nearest first,
+/// each with at most two (the greedy tour of J. L. Bentley, "Fast algorithms for geometric
+/// traveling salesman problems", 1992), until the curve is as long as the result says.
 /// @return pairs of places in inPoints.
 std::vector<std::array<std::size_t, 2>> CurveThrough(const std::vector<ZORMathVector>& inPoints,
                                                      double inLength) {

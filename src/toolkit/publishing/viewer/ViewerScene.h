@@ -13,7 +13,7 @@
 
 namespace ZORToolkit {
 
-/// Each part once, its instances, and of each interference what its picture shows and from where.
+/// Each part once, its instances, and for each interference its picture's products and camera.
 class ViewerScene {
  public:
   /// @param inRoot of an opened model.
@@ -26,8 +26,9 @@ class ViewerScene {
   void Add(const std::string& inKey, const ResolvedInterference& inResolved,
            const PictureCamera& inCamera);
 
-  /// "scene", JSON, and "part-0", "part-1", …; packed. Of parts that no instance shows there is none.
-  /// @param inMaxSize of all blocks as base64; above it triangles are left out, and the scene says so.
+  /// "scene", JSON, and "part-0", "part-1", …; compressed. Parts without an instance have none.
+  /// @param inMaxSize of all blocks as base64; above it triangles are left out, and the scene says
+  /// so.
   std::vector<PageBlock> Blocks(std::size_t inMaxSize) const;
   bool IsEmpty() const;
 
