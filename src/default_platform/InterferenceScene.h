@@ -15,6 +15,7 @@
 
 namespace ZORDefault {
 
+/// A camera that was stored with an interference. Lengths in millimetres; planes of 0 do not clip.
 struct StoredViewpoint {
   ZOR3DViewpoint::Projection projection = ZOR3DViewpoint::kConic;
   ZORMathVector origin;
@@ -24,6 +25,7 @@ struct StoredViewpoint {
   double farPlane = 0;
 };
 
+/// How the points of an interference are marked.
 enum class MarkerKind {
   kBalls,     ///< a ball at each point
   kDimension  ///< a dimension line where there are exactly two points, else balls
@@ -39,6 +41,7 @@ struct InterferenceGeometry {
 /// Red, green, blue, alpha.
 typedef std::array<std::uint8_t, 4> SceneColour;
 
+/// The colours of a scene, as ChooseColours gives them.
 struct SceneColours {
   std::optional<SceneColour> imposedOnSecond;  ///< where it could not be told from the first
   SceneColour markers;
@@ -48,11 +51,13 @@ struct SceneColours {
 /// @param inProducts of an opened model; empty where one is missing.
 ZOR_PLATFORM_EXPORT SceneColours ChooseColours(const std::array<ZORIProduct_var, 2>& inProducts);
 
+/// A product of a scene and its placement.
 struct SceneProduct {
   ZORIProduct_var product;  ///< of an opened model; empty where it is missing
   std::optional<ZORMathTransformation> rootFromProduct;  ///< nothing: as in the model
 };
 
+/// What PrintPictures draws of an interference.
 struct InterferenceScene {
   /// The two products by themselves, so that a picture changes nothing of the model; each keeps its
   /// model alive. Empty where one is missing.
@@ -61,6 +66,7 @@ struct InterferenceScene {
   ZORISiInterference_var interference;
 };
 
+/// Makes the scene of an interference. The model and its products are not changed.
 /// @param inColours nothing: they are chosen here.
 ZOR_PLATFORM_EXPORT InterferenceScene MakeInterferenceScene(
     const InterferenceGeometry& inGeometry, const std::array<SceneProduct, 2>& inProducts,

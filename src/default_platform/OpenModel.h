@@ -21,6 +21,7 @@ struct PartMesh;
 
 namespace ZORDefault {
 
+/// Why a model cannot be opened.
 enum class ModelErrorKind {
   kFile,         ///< it does not exist, is a folder, is empty, cannot be read, changes all the time
   kFormat,       ///< of no known format, or cut off
@@ -48,6 +49,7 @@ class ZOR_PLATFORM_EXPORT ModelError : public std::runtime_error {
   ModelErrorKind kind_;
 };
 
+/// How a model is read.
 struct ModelOptions {
   /// How far triangles may lie from a part's surface, as a share of the diagonal of the part's box:
   /// above 0, at most 0.1.

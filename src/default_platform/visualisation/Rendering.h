@@ -14,6 +14,7 @@ namespace ZORDefault {
 /// Of a picture's width and height.
 inline constexpr int kMaxPictureSize = 16384;
 
+/// @return whether width and height are 1 to kMaxPictureSize.
 ZOR_PLATFORM_EXPORT bool IsPictureSize(int inWidth, int inHeight);
 
 /// @param inSupport null: default settings. Sizes as IsPictureSize allows.

@@ -53,6 +53,7 @@ struct DetectionOptions {
   std::function<void(const std::string&)> warn;  ///< called with one line; may be empty
 };
 
+/// A product that was checked, or several that count as one.
 struct DetectedProduct {
   std::string path;      ///< aliases from below the root, joined by " --++-- "
   std::string partName;  ///< may be empty
@@ -66,6 +67,7 @@ struct DetectedViewpoint {
   double focusDistance = 0, nearPlane = 0, farPlane = 0;
 };
 
+/// A clash, contact or clearance violation of two products. Lengths in millimetres.
 struct DetectedInterference {
   enum class Kind { kClash, kContact, kClearance };
   std::size_t first = 0, second = 0;  ///< positions in DetectionResult::products
@@ -81,6 +83,7 @@ struct DetectedInterference {
   std::optional<double> meshPrecision;
 };
 
+/// The result of a detection, or of a share of it.
 struct DetectionResult {
   std::string model;     ///< the file's name
   std::string document;  ///< the root's alias
@@ -99,6 +102,7 @@ struct DetectionResult {
   std::string computationCase;
 };
 
+/// A day of the Gregorian calendar.
 struct CalendarDate {
   int day = 1, month = 1, year = 1970;
 };

@@ -27,6 +27,7 @@ struct ImportedEntry : ReviewEntry {
   std::vector<std::string> labels;
 };
 
+/// The decisions that were made in another tool.
 struct ImportedReview {
   std::string document;                ///< of the result
   std::vector<ImportedEntry> entries;  ///< only what was changed, by number

@@ -47,6 +47,7 @@ class ZOR_TOOLKIT_EXPORT PublishedPage {
   std::string ManifestText() const;
   /// The bytes of a picture by the name of its file.
   std::optional<std::string> Picture(const std::string& inName) const;
+  /// The bytes of a block, decompressed; nothing when the page has none of that name.
   std::optional<std::string> Block(const std::string& inName) const;
   /// As it was packed.
   std::optional<std::string> PackedBlock(const std::string& inName) const;

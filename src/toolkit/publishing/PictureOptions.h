@@ -4,6 +4,7 @@
 
 namespace ZORToolkit {
 
+/// The formats that pictures are written in.
 enum class PictureFormat { kJpeg, kPng };
 
 /// The name of a format for PrintPictures.

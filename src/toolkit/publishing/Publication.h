@@ -20,6 +20,7 @@ class SharedDrawing;
 /// What is framed where an interference has no viewpoint; values of the setting "PictureZoom".
 enum class PictureZoom { kInterference = 0, kProducts = 1 };
 
+/// What is published, where, and how it is drawn.
 struct PublicationOptions {
   std::string folder;      ///< made where it is missing; the path of the page when isOneFile
   bool isOneFile = false;  ///< pictures, geometry and the result stand in the page
@@ -58,6 +59,7 @@ ZOR_TOOLKIT_EXPORT void SetTarget(PublicationOptions& ioOptions, const std::stri
 /// The name of a file without its folder, UTF-8.
 ZOR_TOOLKIT_EXPORT std::string FileNameOf(const std::string& inPath);
 
+/// What a publication holds.
 struct Published {
   std::string page;  ///< path of the page; of the folder where none was to be made
   std::size_t interferences = 0;

@@ -59,6 +59,7 @@ class ZOR_TOOLKIT_EXPORT InterferenceScenes {
   InterferenceScenes(const InterferenceScenes&) = delete;
   InterferenceScenes& operator=(const InterferenceScenes&) = delete;
 
+  /// Finds the products of an interference in the model, and how they are placed and coloured.
   ResolvedInterference Resolve(const InterferenceRecord& inRecord, ProductPlaces inPlaces);
 
  private:

@@ -22,11 +22,13 @@ struct WorkSample {
   double openSeconds = 0;  ///< until the first item can be done, the model in the cache
 };
 
+/// One share of a plan.
 struct PlannedShare {
   std::size_t items = 0;
   double seconds = 0;  ///< on one core, with the opening
 };
 
+/// The shares of a work and how long they are expected to take.
 struct Plan {
   std::vector<PlannedShare> shares;
   std::size_t items = 0, timed = 0;

@@ -30,6 +30,7 @@ struct ShareEntry {
   std::string hash;
 };
 
+/// What a share says of itself: of which work it is, and what of it is done.
 struct ShareManifest {
   std::string folder;  ///< as it was given; not part of the file
   std::string verb;    ///< "publish" or "detect"

@@ -28,6 +28,7 @@ struct Part {
   double pointPrecision = 0;
 };
 
+/// An instance of a part.
 struct Product {
   std::uint32_t part = 0;
   Placement rootFromProduct{{{1, 0, 0, 0}, {0, 1, 0, 0}, {0, 0, 1, 0}}};
@@ -61,6 +62,7 @@ struct Options {
 
 enum class Kind { kClash, kContact, kClearance };
 
+/// A clash, contact or clearance violation of two products.
 struct Interference {
   std::uint32_t first = 0, second = 0;  ///< products, first < second
   Kind kind = Kind::kContact;
@@ -86,6 +88,7 @@ struct Unjudged {
   std::uint32_t verdict = 0;  ///< with another part: the number of the verdict
 };
 
+/// All that a search found, or a share of it.
 struct Findings {
   std::vector<Interference> interferences;  ///< in the order of the products
   /// Shared by all interferences of the same parts in the same placement to each other; the first

@@ -18,6 +18,7 @@ struct Task {
   gp_Trsf firstFromSecond;
 };
 
+/// A pair of products and its task.
 struct PairOfProducts {
   std::uint32_t first = 0, second = 0;
   std::size_t task = 0;

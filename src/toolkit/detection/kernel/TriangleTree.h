@@ -10,6 +10,7 @@
 
 namespace ZORDetection {
 
+/// Built by median splits along the longest axis.
 class TriangleTree {
  public:
   struct Node {

@@ -13,15 +13,18 @@ namespace ZORToolkit {
 
 // Texts are UTF-8 as the file has them, empty where it has none. Lengths are metres.
 
+/// An object of the model, by its GUID and by the names that tools have for it.
 struct BcfComponent {
   std::string ifcGuid, originatingSystem, authoringToolId;
 };
 
+/// Components that are shown in a colour.
 struct BcfColouring {
   std::string colour;  ///< hexadecimal RRGGBB or AARRGGBB
   std::vector<BcfComponent> components;
 };
 
+/// The camera of a viewpoint. Directions need not be unit vectors.
 struct BcfCamera {
   bool isPerspective = true;
   std::array<double, 3> point{}, direction{}, up{};
@@ -39,6 +42,7 @@ struct BcfView {
   int lines = 0, clippingPlanes = 0, bitmaps = 0;
 };
 
+/// A viewpoint of a topic, with its snapshot.
 struct BcfViewpoint {
   std::string guid;
   std::string file, snapshot;  ///< names in the topic's folder
@@ -47,14 +51,17 @@ struct BcfViewpoint {
   BcfView view;
 };
 
+/// A comment on a topic. Dates are as the file has them, in the form of XML.
 struct BcfComment {
   std::string guid, date, author, text, viewpoint, modifiedDate, modifiedAuthor;
 };
 
+/// A document that a topic refers to.
 struct BcfDocumentReference {
   std::string guid, document, description;  ///< document: a name, a URL or a document's GUID
 };
 
+/// An issue, with its comments and viewpoints.
 struct BcfTopic {
   std::string folder;  ///< in the archive
   std::string guid, type, status, title, priority, description, stage, assignedTo;
@@ -64,9 +71,11 @@ struct BcfTopic {
   std::vector<BcfComment> comments;
   std::vector<BcfViewpoint> viewpoints;
 
+  /// @return the number of viewpoints with a snapshot.
   ZOR_TOOLKIT_EXPORT int Snapshots() const;
 };
 
+/// All that a BCF file holds.
 struct BcfProject {
   std::string version;  ///< "2.0", "2.1", "3.0"; where no file says, what its structure is of
   std::string guid, name;

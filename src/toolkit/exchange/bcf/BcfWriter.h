@@ -15,11 +15,13 @@
 
 namespace ZORToolkit {
 
+/// The versions of BCF that are written.
 enum class BcfVersion { k21, k30 };
 
 /// The longest side of a picture in a BCF file, in pixels.
 inline constexpr int kMaxSnapshotSize = 1500;
 
+/// What is written, and with which pictures.
 struct BcfOptions {
   BcfVersion version = BcfVersion::k21;
   std::optional<GroupOptions> grouping;  ///< nothing: a topic for each interference
@@ -42,6 +44,7 @@ struct NotCarried {
   std::string kept;  ///< where it is to be found nevertheless; empty: nowhere
 };
 
+/// What was written, and what BCF has no place for.
 struct BcfWritten {
   std::size_t topics = 0, interferences = 0;
   std::size_t pictures = 0;  ///< topics whose picture shows one of their products

@@ -28,6 +28,7 @@ ZOR_TOOLKIT_EXPORT std::vector<NotCarried> ForEachSheetRow(
     ClashDocument& ioResult, const RecordFilter& inFilter,
     const std::function<void(const std::vector<SheetCell>& inCells)>& inVisit);
 
+/// What is written, and with which thumbnails.
 struct SpreadsheetOptions {
   std::optional<RecordFilter> filter;  ///< nothing: all of them
   GroupOptions grouping;
@@ -37,6 +38,7 @@ struct SpreadsheetOptions {
   std::function<void(std::size_t inDone, std::size_t inAll)> drawn;  ///< may be empty
 };
 
+/// What was written, and what a workbook has no place for.
 struct SpreadsheetWritten {
   std::size_t interferences = 0, pictures = 0;
   std::vector<NotCarried> notCarried;

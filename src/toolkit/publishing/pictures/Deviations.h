@@ -15,6 +15,7 @@ namespace ZORToolkit {
 /// the model since their placements in the result cannot be trusted.
 class Deviations {
  public:
+  /// @param inNumber of the interference, as warnings call it.
   void Add(int inNumber, const InterferenceRecord& inRecord,
            const ResolvedInterference& inResolved);
   /// A line for each kind, if there is any.

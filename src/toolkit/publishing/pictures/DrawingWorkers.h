@@ -7,6 +7,7 @@
 
 namespace ZORToolkit {
 
+/// A number of independent drawings.
 struct DrawingWork {
   std::size_t count = 0;
   std::function<void(std::size_t)> draw;  ///< called in one of the processes for each index
