@@ -156,15 +156,22 @@ void DOM_Tree::ImportAttributes(const DOM_Tree& inSource, const NodeRecord& inFr
 
 inline void DOM_Tree::CopyAttributes(const NodeRecord& inFrom, NodeRecord& outTo) {
   Attribute* link = &outTo.firstAttribute;
-  for (Attribute at = inFrom.firstAttribute; at != 0;) {
-    const AttributeRecord& attribute = attributes_[at];
-    const Attribute copy = TakeAttribute();
-    AttributeRecord& record = attributes_[copy];
-    record = {attribute.value, attribute.name, 0};
-    *link = copy;
+  const auto append = [&](Attribute inNew, const AttributeRecord& inAttribute) {
+    AttributeRecord& record = attributes_[inNew];
+    record = {inAttribute.value, inAttribute.name, 0};
+    *link = inNew;
     link = &record.next;
+  };
+  // Those of the last copy that was freed, mostly.
+  Attribute at = inFrom.firstAttribute;
+  Attribute free = freeAttribute_;
+  while (at != 0 && free != 0) {
+    const AttributeRecord& attribute = attributes_[at];
+    append(std::exchange(free, attributes_[free].next), attribute);
     at = attribute.next;
   }
+  freeAttribute_ = free;
+  for (; at != 0; at = attributes_[at].next) append(attributes_.Add(), attributes_[at]);
 }
 
 inline DOM_Tree::NodeRecord& DOM_Tree::CopyOne(const DOM_Tree& inSource, const NodeRecord& inFrom,
