@@ -4,6 +4,7 @@ set(CMAKE_SHARED_LIBRARY_PREFIX "")
 set(CMAKE_SHARED_MODULE_PREFIX "")
 include_directories(SYSTEM ${ZOR_SYSROOT}/include)
 add_compile_definitions(U_STATIC_IMPLEMENTATION)  # ICU and Xerces-C are linked in
+find_library(ZLIB_LIBRARY libz.a)
 set(ZOR_COMPILER_LIBRARIES)
 foreach(name libgcc_s_seh-1.dll libstdc++-6.dll libwinpthread-1.dll)
   execute_process(COMMAND ${CMAKE_CXX_COMPILER} -print-file-name=${name}

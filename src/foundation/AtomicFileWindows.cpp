@@ -69,16 +69,19 @@ bool AtomicFile::KeepAttributes(int /*inDescriptor*/) const { return true; }
 void AtomicFile::Rename() {
   temporary_->Close();  // an open file is not renamed by every file system
   const std::wstring from = WidePath(temporary_->Path()), to = WidePath(target_);
-  const bool isReplaced = !isNew_ && Replace(to, from);
   // Flushed to the disk; where there is no such file yet, or the file system cannot replace one.
   const DWORD flags =
       MOVEFILE_WRITE_THROUGH | (options_.mayReplace ? MOVEFILE_REPLACE_EXISTING : 0);
-  if (isReplaced || MoveFileExW(from.c_str(), to.c_str(), flags) != FALSE) {
-    temporary_->Release();
-    return;
+  for (int i = 0; i < kTriesWhileInUse; ++i) {
+    const bool isReplaced = !isNew_ && Replace(to, from);
+    if (isReplaced || MoveFileExW(from.c_str(), to.c_str(), flags) != FALSE) {
+      temporary_->Release();
+      return;
+    }
+    const DWORD error = GetLastError();
+    if (!IsInUse(error)) throw FileError(path_, ErrorNumberOf(error));
+    Sleep(kMillisecondsBetweenTries);
   }
-  const DWORD error = GetLastError();
-  if (!IsInUse(error)) throw FileError(path_, ErrorNumberOf(error));
   OverwriteTarget(temporary_->Reopen());
 }
 

@@ -6,6 +6,7 @@
 #include <algorithm>
 #include <array>
 #include <cerrno>
+#include <optional>
 #include <utility>
 
 namespace ZORFoundation {
@@ -57,6 +58,23 @@ constexpr std::array<std::pair<unsigned long, int>, 29> kErrorNumbers = {{
     {ERROR_NOT_SUPPORTED, EINVAL},
 }};
 
+/// Why a path was not opened: that of Windows says less.
+int OpenErrorOf(const std::wstring& inPath, DWORD inError) {
+  constexpr std::size_t kLongestName = 255;
+  const auto isFolder = [](const std::wstring& inPlace) -> std::optional<bool> {
+    const DWORD attributes = GetFileAttributesW(inPlace.c_str());
+    if (attributes == INVALID_FILE_ATTRIBUTES) return std::nullopt;
+    return (attributes & FILE_ATTRIBUTE_DIRECTORY) != 0;
+  };
+  if (isFolder(inPath).value_or(false)) return EISDIR;
+  const int error = ErrorNumberOf(inError);
+  const std::size_t slash = inPath.find_last_of(L'\\');
+  if (error != ENOENT) return error;
+  if (inPath.size() - (slash + 1) > kLongestName) return ENAMETOOLONG;
+  return slash != inPath.npos && !isFolder(inPath.substr(0, slash)).value_or(true) ? ENOTDIR
+                                                                                   : error;
+}
+
 }  // namespace
 
 std::wstring WideText(std::string_view inText) {
@@ -103,15 +121,18 @@ bool IsInUse(unsigned long inError) {
 }
 
 int OpenShared(const std::string& inPath, const OpenRequest& inRequest) {
-  const HANDLE handle = CreateFileW(WidePath(inPath).c_str(), inRequest.access,
-                                    FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,
-                                    inRequest.disposition, inRequest.attributes, nullptr);
+  HANDLE handle = INVALID_HANDLE_VALUE;
+  for (int i = 0; i < kTriesWhileInUse; ++i) {
+    if (i > 0) Sleep(kMillisecondsBetweenTries);
+    handle = CreateFileW(WidePath(inPath).c_str(), inRequest.access,
+                         FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,
+                         inRequest.disposition, inRequest.attributes, nullptr);
+    if (handle != INVALID_HANDLE_VALUE || GetLastError() != ERROR_SHARING_VIOLATION) break;
+  }
   if (handle == INVALID_HANDLE_VALUE) {
     const DWORD error = GetLastError();
-    const DWORD attributes = GetFileAttributesW(WidePath(inPath).c_str());
-    const bool isFolder =
-        attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DIRECTORY) != 0;
-    errno = isFolder ? EISDIR : ErrorNumberOf(error);
+    errno = OpenErrorOf(WidePath(inPath), error);
+    SetLastError(error);
     return -1;
   }
   const bool writes = (inRequest.access & GENERIC_WRITE) != 0;

@@ -25,6 +25,9 @@ ZOR_FOUNDATION_EXPORT int ErrorNumberOf(unsigned long inError);
 
 /// Whether a call failed because another program has the file open.
 ZOR_FOUNDATION_EXPORT bool IsInUse(unsigned long inError);
+/// Writers such as this one, indexers and virus scanners have a file for a moment only.
+inline constexpr int kTriesWhileInUse = 20;
+inline constexpr unsigned long kMillisecondsBetweenTries = 10;
 
 struct OpenRequest {
   unsigned long access = GENERIC_READ;

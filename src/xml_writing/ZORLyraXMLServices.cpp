@@ -216,7 +216,12 @@ HRESULT ZORLyraXMLServices::CreateNewFederatorDocument(ZORUnicodeString inPath,
                                                        ZORUnicodeString inStyleSheet,
                                                        int inIndent) {
   writer_state::Select(inIndent, inDTDIdentifier, inStyleSheet, "FederatorClashElement");
+#ifdef _WIN32
+  std::ofstream file(
+      ToWide(inPath.ConvertToChar()).c_str());  // narrow text need not be the system's
+#else
   std::ofstream file(inPath.ConvertToChar());
+#endif
   if (!file.is_open()) return E_FAIL;
   file << XMLDeclaration().ConvertToChar();
   if (inDTDIdentifier != "")

@@ -422,7 +422,7 @@ TEST(Merge, ElementNamesAreComparedWithLetterCase) {
 TEST(Merge, SamplesReloadWithTheSumOfTheirInterferences) {
   std::vector<std::string> samples;
   for (const auto& entry : fs::directory_iterator(ZOR_SOURCE_DIR "/samples"))
-    if (entry.path().string().ends_with(".clash.xml")) samples.push_back(entry.path());
+    if (entry.path().string().ends_with(".clash.xml")) samples.push_back(entry.path().string());
   ASSERT_EQ(samples.size(), 6u);
   const support::TemporaryFolder folder;
   ZORLyraXMLServices writer;

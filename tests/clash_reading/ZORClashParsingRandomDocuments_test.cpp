@@ -213,10 +213,7 @@ class Representative {
 
 class RandomDocuments : public testing::TestWithParam<const char*> {
  protected:
-  RandomDocuments() : language_("ZOR_LANG", GetParam()) {
-    folder_.WriteSettings("ClashPublish", "PublishDefDir = \"/pub\"\n");
-    setenv("ZOR_LANG", GetParam(), 1);  // the folder has set it to English
-  }
+  RandomDocuments() { folder_.WriteSettings("ClashPublish", "PublishDefDir = \"/pub\"\n"); }
 
   Answers Compare(SharedReader& ioReader, const pugi::xml_node& inRoot,
                   const std::string& inWhere) {
@@ -227,8 +224,8 @@ class RandomDocuments : public testing::TestWithParam<const char*> {
   }
 
  private:
-  ScopedVariable language_;
   PlatformFolder folder_;
+  ScopedVariable language_{"ZOR_LANG", GetParam()};  // which the folder has set to English
   ScopedVariable catalogues_{"ZOR_CATALOGUE_PATH", ZOR_SOURCE_DIR "/resources/catalogues"};
 };
 

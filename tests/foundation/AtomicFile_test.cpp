@@ -3,10 +3,12 @@
 #include <fcntl.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#ifndef _WIN32
 #include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/xattr.h>
 #include <unistd.h>
+#endif
 
 #include <cerrno>
 #include <csignal>
@@ -29,6 +31,7 @@ using ZORFoundation::WriteWholeFile;
 
 namespace {
 
+#ifndef _WIN32
 constexpr uid_t kNobody = 65534;
 
 struct stat StatusOf(const std::string& inPath) {
@@ -40,6 +43,7 @@ struct stat StatusOf(const std::string& inPath) {
 unsigned int ModeOf(const std::string& inPath) { return StatusOf(inPath).st_mode & 07777U; }
 
 rlimit FileSizeLimit(rlim_t inBytes) { return {inBytes, inBytes}; }
+#endif
 
 std::vector<std::string> NamesIn(const fs::path& inFolder) {
   std::vector<std::string> names;
@@ -152,6 +156,7 @@ TEST_F(AtomicFileTest, WhatWritesByThePathIsTakenUp) {
   EXPECT_EQ(ReadFile(Path("a")), "by its path");
 }
 
+#ifndef _WIN32
 TEST_F(AtomicFileTest, WhatReplacesTheNewFileIsTakenUp) {
   folder_.WriteFile("a", "old");
   chmod(Path("a").c_str(), 0640);
@@ -171,6 +176,7 @@ TEST_F(AtomicFileTest, PathThatIsNoTextIsWrittenByOneThatIs) {
   file.Commit();
   EXPECT_EQ(ReadFile(Path("caf\xE9/a")), "text");
 }
+#endif
 
 TEST_F(AtomicFileTest, SeveralThreadsEachReplaceItWhole) {
   std::vector<std::thread> threads;
@@ -186,6 +192,7 @@ TEST_F(AtomicFileTest, SeveralThreadsEachReplaceItWhole) {
   ExpectNames({"a"});
 }
 
+#ifndef _WIN32
 TEST_F(AtomicFileTest, LinkStaysAndItsTargetIsReplaced) {
   folder_.WriteFile("real/a", "old");
   fs::create_symlink("real/a", Path("link"));
@@ -218,6 +225,7 @@ TEST_F(AtomicFileTest, LinkInACircleIsRefusedAndStays) {
   ExpectNames({"one", "two"});
   EXPECT_TRUE(fs::is_symlink(Path("one")));
 }
+#endif
 
 TEST_F(AtomicFileTest, TemporaryFolderHoldsTheNewFileUntilCommit) {
   fs::create_directory(Path("work"));
@@ -232,6 +240,7 @@ TEST_F(AtomicFileTest, TemporaryFolderHoldsTheNewFileUntilCommit) {
   EXPECT_EQ(ReadFile(Path("a")), "new");
 }
 
+#ifndef _WIN32
 TEST_F(AtomicFileTest, TemporaryFolderIsNotForWhatALinkLeadsTo) {
   for (const char* folder : {"work", "real"}) fs::create_directory(Path(folder));
   fs::create_symlink("real/a", Path("link"));
@@ -318,9 +327,11 @@ TEST_F(AtomicFileTest, WriteBeyondTheFileSizeLimitLeavesTheOldOne) {
   EXPECT_EQ(ReadFile(Path("a")), "old");
   ExpectNames({"a"});
 }
+#endif
 
 // ---- what the new file has of the old one
 
+#ifndef _WIN32
 TEST_F(AtomicFileTest, CommitKeepsPermissions) {
   for (const unsigned int mode : {0600U, 0640U, 0666U, 0755U, 04755U, 02750U}) {
     folder_.WriteFile("a", "old");
@@ -445,6 +456,7 @@ TEST_F(AtomicFileTest, CommitKeepsAccessControlList) {
             static_cast<ssize_t>(sizeof list));
   EXPECT_TRUE(std::equal(list, list + sizeof list, kept));
 }
+#endif
 
 // ---- temporary files
 

@@ -2,10 +2,12 @@
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
+#ifndef _WIN32
 #include <sys/socket.h>
 #include <sys/stat.h>
 #include <sys/un.h>
 #include <unistd.h>
+#endif
 
 #include <cerrno>
 #include <filesystem>
@@ -82,6 +84,7 @@ TEST(ReadWholeFile, FolderIsRefused) {
   EXPECT_EQ(CodeOf(folder.path.string()), EISDIR);
 }
 
+#ifndef _WIN32
 TEST(ReadWholeFile, PipeIsRefusedWithoutWaiting) {
   const TemporaryFolder folder;
   ASSERT_EQ(mkfifo(folder.FilePath("pipe").c_str(), 0600), 0);
@@ -115,6 +118,7 @@ TEST(ReadWholeFile, SocketIsRefused) {
   EXPECT_EQ(CodeOf(path), ESPIPE);
   close(socket);
 }
+#endif
 
 TEST(ReadWholeFile, LimitIsTheLargestThatIsRead) {
   const TemporaryFolder folder;
@@ -123,6 +127,7 @@ TEST(ReadWholeFile, LimitIsTheLargestThatIsRead) {
   EXPECT_EQ(CodeOf(folder.FilePath("a"), {.maxSize = 999}), EFBIG);
 }
 
+#ifndef _WIN32
 TEST(ReadWholeFile, LinkIsFollowedAndACircleRefused) {
   const TemporaryFolder folder;
   folder.WriteFile("a", "text");
@@ -150,6 +155,7 @@ TEST(ReadWholeFile, UnreadableFileIsRefused) {
 TEST(ReadWholeFile, FileThatTheSystemMakesUpIsReadToItsEnd) {
   EXPECT_NE(ReadWholeFile("/proc/self/status").bytes.find("Name:"), std::string::npos);
 }
+#endif
 
 TEST(ReadWholeFile, TriedOneGivesNothingInPlaceOfAReason) {
   const TemporaryFolder folder;

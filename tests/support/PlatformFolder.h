@@ -11,6 +11,7 @@
 #include <random>
 #include <string>
 
+#include "foundation/NativePath.h"
 #include "support/ScopedVariable.h"
 
 namespace support {
@@ -20,6 +21,17 @@ inline std::string ReadFile(const std::filesystem::path& inPath) {
   EXPECT_TRUE(file.is_open()) << inPath;
   return {std::istreambuf_iterator<char>(file), {}};
 }
+inline std::string ReadFile(const std::string& inPath) {
+  return ReadFile(ZORFoundation::NativePath(inPath));
+}
+inline std::string ReadFile(const char* inPath) { return ReadFile(std::string(inPath)); }
+
+/// What separates folders in a list of them.
+#ifdef _WIN32
+inline constexpr char kListSeparator[] = ";";
+#else
+inline constexpr char kListSeparator[] = ":";
+#endif
 
 /// A new folder, removed with all that it holds when this ends.
 class TemporaryFolder {
@@ -32,9 +44,11 @@ class TemporaryFolder {
   TemporaryFolder(const TemporaryFolder&) = delete;
   TemporaryFolder& operator=(const TemporaryFolder&) = delete;
 
-  std::string FilePath(const std::string& inName) const { return (path / inName).string(); }
+  std::string FilePath(const std::string& inName) const {
+    return (path / ZORFoundation::NativePath(inName)).string();
+  }
   void WriteFile(const std::string& inName, const std::string& inBytes) const {
-    const std::filesystem::path file = path / inName;
+    const std::filesystem::path file = path / ZORFoundation::NativePath(inName);
     std::filesystem::create_directories(file.parent_path());
     std::ofstream(file, std::ios::binary) << inBytes;
   }

@@ -6,6 +6,10 @@
 #include <optional>
 #include <string>
 
+#ifdef _WIN32
+extern "C" __declspec(dllimport) int __stdcall SetEnvironmentVariableA(const char*, const char*);
+#endif
+
 namespace support {
 
 /// Sets a variable of the environment and restores its former state at the end.
@@ -21,7 +25,11 @@ class ScopedVariable {
 
  private:
 #ifdef _WIN32
-  void Set(const char* inValue) { _putenv_s(name_, inValue == nullptr ? "" : inValue); }
+  void Set(const char* inValue) {
+    _putenv_s(name_, inValue == nullptr ? "" : inValue);
+    SetEnvironmentVariableA(name_,
+                            inValue);  // an empty value too, which the C library takes for none
+  }
 #else
   void Set(const char* inValue) {
     if (inValue == nullptr)

@@ -1,8 +1,10 @@
 // What cannot be read is refused with one line that says why, whatever it is.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#ifndef _WIN32
 #include <sys/stat.h>
 #include <unistd.h>
+#endif
 
 #include <algorithm>
 #include <random>
@@ -91,6 +93,7 @@ TEST(BadInput, MissingFileIsNamedWithTheSystemsReason) {
                 "lyra: no/such.xml: No such file or directory");
 }
 
+#ifndef _WIN32
 TEST(BadInput, UnreadableFileIsRefused) {
   if (geteuid() == 0) GTEST_SKIP() << "the superuser may read everything";
   const TemporaryDirectory directory;
@@ -98,17 +101,20 @@ TEST(BadInput, UnreadableFileIsRefused) {
   ASSERT_EQ(chmod(path.c_str(), 0), 0);
   ExpectRefused(RunCommand({"info", path}), "lyra: " + path + ": Permission denied");
 }
+#endif
 
 TEST(BadInput, DirectoryIsRefused) {
   ExpectRefused(RunCommand({"info", "samples"}), "lyra: samples: is a directory");
 }
 
+#ifndef _WIN32
 TEST(BadInput, PipeWithoutWriterIsRefusedAtOnce) {
   const TemporaryDirectory directory;
   const std::string path = directory.Path("pipe");
   ASSERT_EQ(mkfifo(path.c_str(), 0600), 0);
   ExpectRefused(RunCommand({"info", path}), "lyra: " + path + ": is not a regular file");
 }
+#endif
 
 TEST(BadInput, DeviceIsRefused) {
   ExpectRefused(RunCommand({"info", "/dev/zero"}), "lyra: /dev/zero: is not a regular file");
@@ -151,7 +157,7 @@ TEST(BadInput, UnknownDeclaredEncodingIsRefused) {
 }
 
 TEST(BadInput, BinaryFileIsRefused) {
-  ExpectFileRefused(ReadFile(ZOR_BINARY_DIR "/bin/lyra").substr(0, 100000), ":");
+  ExpectFileRefused(ReadFile(kLyraProgram).substr(0, 100000), ":");
 }
 
 TEST(BadInput, FileOfZeroBytesIsRefused) { ExpectFileRefused(std::string(5000, '\0'), ":"); }

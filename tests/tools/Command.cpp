@@ -1,56 +1,44 @@
 #include "tools/Command.h"
 
-#include <fcntl.h>
-#include <spawn.h>
-#include <sys/wait.h>
-#include <unistd.h>
-
 #include <algorithm>
-#include <cstdlib>
 #include <filesystem>
 #include <fstream>
+#include <random>
 #include <sstream>
 #include <stdexcept>
 
+#include "foundation/NativePath.h"
+#include "tools/RunProgram.h"
+
 namespace fs = std::filesystem;
 
-namespace {
-const std::string kProgram = ZOR_BINARY_DIR "/bin/lyra";
+const std::string kLyraProgram = LYRA_PROGRAM;
 
-int RunProgram(std::vector<std::string> inWords, const TemporaryDirectory& inStreams) {
-  std::vector<char*> words;
-  for (std::string& word : inWords) words.push_back(word.data());
-  words.push_back(nullptr);
-  posix_spawn_file_actions_t actions;
-  posix_spawn_file_actions_init(&actions);
-  const std::string in = inStreams.Path("in"), out = inStreams.Path("out"),
-                    error = inStreams.Path("error");
-  posix_spawn_file_actions_addopen(&actions, 0, in.c_str(), O_RDONLY, 0);
-  posix_spawn_file_actions_addopen(&actions, 1, out.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
-  posix_spawn_file_actions_addopen(&actions, 2, error.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
-  posix_spawn_file_actions_addchdir_np(&actions, ZOR_SOURCE_DIR);
-  pid_t process = 0;
-  const int failure = posix_spawn(&process, words[0], &actions, nullptr, words.data(), environ);
-  posix_spawn_file_actions_destroy(&actions);
-  if (failure != 0) throw std::runtime_error("cannot run " + inWords[0]);
-  int status = 0;
-  waitpid(process, &status, 0);
-  return WIFSIGNALED(status) ? -WTERMSIG(status) : WEXITSTATUS(status);
+namespace {
+CommandResult Run(const std::vector<std::string>& inWords, const std::string& inStandardInput,
+                  const std::string& inFolder = ZOR_SOURCE_DIR) {
+  const TemporaryDirectory streams;
+  const ProgramStreams files = {streams.Write("in", inStandardInput), streams.Path("out"),
+                                streams.Path("error")};
+  const int code = RunProgram(inWords, inFolder, files);
+  return {code, ReadFile(files.out), ReadFile(files.error)};
 }
 
-CommandResult Run(const std::vector<std::string>& inWords, const std::string& inStandardInput) {
-  const TemporaryDirectory streams;
-  streams.Write("in", inStandardInput);
-  const int code = RunProgram(inWords, streams);
-  return {code, ReadFile(streams.Path("out")), ReadFile(streams.Path("error"))};
+std::vector<std::string> WordsWith(const std::vector<std::string>& inArguments) {
+  std::vector<std::string> words = {kLyraProgram};
+  words.insert(words.end(), inArguments.begin(), inArguments.end());
+  return words;
 }
 }  // namespace
 
 CommandResult RunCommand(const std::vector<std::string>& inArguments,
                          const std::string& inStandardInput) {
-  std::vector<std::string> words = {kProgram};
-  words.insert(words.end(), inArguments.begin(), inArguments.end());
-  return Run(words, inStandardInput);
+  return Run(WordsWith(inArguments), inStandardInput);
+}
+
+CommandResult RunCommandIn(const std::string& inFolder,
+                           const std::vector<std::string>& inArguments) {
+  return Run(WordsWith(inArguments), {}, inFolder);
 }
 
 CommandResult RunShell(const std::string& inLine) {
@@ -58,9 +46,10 @@ CommandResult RunShell(const std::string& inLine) {
 }
 
 TemporaryDirectory::TemporaryDirectory() {
-  std::string pattern = (fs::temp_directory_path() / "lyra_test_XXXXXX").string();
-  if (mkdtemp(pattern.data()) == nullptr) throw std::runtime_error("no temporary directory");
-  path_ = pattern;
+  do
+    path_ = (fs::temp_directory_path() / ("lyra_test_" + std::to_string(std::random_device()())))
+                .generic_string();
+  while (!fs::create_directory(path_));
 }
 
 TemporaryDirectory::~TemporaryDirectory() {
@@ -69,14 +58,14 @@ TemporaryDirectory::~TemporaryDirectory() {
 }
 
 std::string TemporaryDirectory::Write(const std::string& inName, const std::string& inBytes) const {
-  std::ofstream stream(Path(inName), std::ios::binary);
+  std::ofstream stream(ZORFoundation::NativePath(Path(inName)), std::ios::binary);
   stream << inBytes;
   if (!stream.flush()) throw std::runtime_error("cannot write " + Path(inName));
   return Path(inName);
 }
 
 std::string ReadFile(const std::string& inPath) {
-  std::ifstream stream(inPath, std::ios::binary);
+  std::ifstream stream(ZORFoundation::NativePath(inPath), std::ios::binary);
   if (!stream) throw std::runtime_error("cannot read " + inPath);
   std::ostringstream bytes;
   bytes << stream.rdbuf();

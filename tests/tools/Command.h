@@ -11,9 +11,14 @@ struct CommandResult {
   std::string out, error;
 };
 
+/// The built command.
+extern const std::string kLyraProgram;
+
 /// Runs the built command in the source directory, with the tests' environment.
 CommandResult RunCommand(const std::vector<std::string>& inArguments,
                          const std::string& inStandardInput = {});
+CommandResult RunCommandIn(const std::string& inFolder,
+                           const std::vector<std::string>& inArguments);
 /// Runs a shell command line there; "lyra" is the command.
 CommandResult RunShell(const std::string& inLine);
 

@@ -3,8 +3,11 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
+#include <iterator>
 #include <nlohmann/json.hpp>
+#include <sstream>
 
+#include "support/ScopedVariable.h"
 #include "tools/Command.h"
 
 using testing::HasSubstr;
@@ -20,7 +23,8 @@ struct Project : TemporaryDirectory {
     Write("results/push.xml", ReadFile(ZOR_SOURCE_DIR "/samples/pushdevice.clash.xml"));
   }
   CommandResult In(const std::string& inCommand) const {
-    return RunShell("cd " + Path("") + " && lyra " + inCommand);
+    std::istringstream words(inCommand);
+    return RunCommandIn(Path(""), {std::istream_iterator<std::string>(words), {}});
   }
   /// What a check says of each link of a federator document.
   std::vector<std::string> Check(const std::string& inFederator, int inCode) const {
@@ -145,10 +149,10 @@ TEST(LinksCheck, SoundDocumentEndsWell) {
 TEST(Path, ReferenceIsResolvedByTheTableOfLocations) {
   const TemporaryDirectory directory;
   directory.Write("DLNames.toml", "Reports = \"/srv/${LYRA_TEST_PLACE}/reports\"\n");
-  const std::string run =
-      "ZOR_SETTINGS_PATH=" + directory.Path("") + " LYRA_TEST_PLACE=x lyra path ";
-  EXPECT_EQ(RunShell(run + "'ZORDLN://Reports\\a\\b.xsl'").out, "/srv/x/reports\\a\\b.xsl\n");
-  EXPECT_EQ(RunShell(run + "Reports").out, "/srv/x/reports\n");
+  const support::ScopedVariable settings("ZOR_SETTINGS_PATH", directory.Path(""));
+  const support::ScopedVariable place("LYRA_TEST_PLACE", "x");
+  EXPECT_EQ(RunCommand({"path", "ZORDLN://Reports\\a\\b.xsl"}).out, "/srv/x/reports\\a\\b.xsl\n");
+  EXPECT_EQ(RunCommand({"path", "Reports"}).out, "/srv/x/reports\n");
 }
 
 TEST(Path, UnknownReferenceFails) {
@@ -160,9 +164,9 @@ TEST(Path, UnknownReferenceFails) {
 TEST(Path, DirectoryThatCannotBeExpandedFails) {
   const TemporaryDirectory directory;
   directory.Write("DLNames.toml", "Reports = \"/srv/${LYRA_TEST_ABSENT}\"\n");
-  const std::string run = "ZOR_SETTINGS_PATH=" + directory.Path("") + " lyra path ";
-  EXPECT_EQ(RunShell(run + "'ZORDLN://Reports\\a'").code, 1);
-  EXPECT_EQ(RunShell(run + "Reports").code, 1);
+  const support::ScopedVariable settings("ZOR_SETTINGS_PATH", directory.Path(""));
+  EXPECT_EQ(RunCommand({"path", "ZORDLN://Reports\\a"}).code, 1);
+  EXPECT_EQ(RunCommand({"path", "Reports"}).code, 1);
 }
 
 TEST(Path, OtherTextComesBackAsItIs) {

@@ -5,6 +5,7 @@
 #include <array>
 
 #include "ZORClashParsing.h"
+#include "support/ScopedVariable.h"
 #include "toolkit/publishing/ReportWriter.h"
 #include "tools/Command.h"
 
@@ -174,10 +175,8 @@ TEST(Report, StyleSheetComesFromTheSettings) {
   const TemporaryDirectory directory;
   directory.Write("ClashPublish.toml", "XslTemplate = \"house.xsl\"\n");
   const std::string path = directory.Path("report.xml");
-  ASSERT_EQ(RunShell("ZOR_SETTINGS_PATH=" + directory.Path("") +
-                     " lyra report samples/as1.clash.xml -o " + path)
-                .code,
-            0);
+  const support::ScopedVariable settings("ZOR_SETTINGS_PATH", directory.Path(""));
+  ASSERT_EQ(RunCommand({"report", "samples/as1.clash.xml", "-o", path}).code, 0);
   EXPECT_THAT(ReadFile(path), HasSubstr("href=\"house.xsl\""));
 }
 

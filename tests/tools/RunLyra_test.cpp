@@ -4,6 +4,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include "support/ScopedVariable.h"
 #include "tools/Command.h"
 
 using testing::EndsWith;
@@ -167,7 +168,8 @@ TEST(Terminal, NoColorKeepsTheHeaderPlain) {
 }
 
 TEST(Terminal, NothingIsCutOrBoldInAFile) {
-  const CommandResult result = RunShell("COLUMNS=20 lyra list samples/as1.clash.xml");
+  const support::ScopedVariable columns("COLUMNS", "20");
+  const CommandResult result = RunCommand({"list", "samples/as1.clash.xml"});
   EXPECT_EQ(result.out.find('\033'), std::string::npos);
   EXPECT_EQ(result.out.find("…"), std::string::npos);
 }

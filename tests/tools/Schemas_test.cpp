@@ -30,7 +30,7 @@ std::vector<std::string> FilesIn(const std::string& inFolder, const std::string&
                                  const std::string& inEnd) {
   std::vector<std::string> files;
   for (const auto& entry : fs::directory_iterator(std::string(ZOR_SOURCE_DIR "/") + inFolder)) {
-    const std::string name = entry.path().filename();
+    const std::string name = entry.path().filename().string();
     if (name.starts_with(inStart) && name.ends_with(inEnd)) files.push_back(inFolder + "/" + name);
   }
   return files;

@@ -207,7 +207,7 @@ TEST_F(TextDump, InAMissingFolderGivesThePlatformsCode) {
 }
 
 TEST_F(TextDump, OntoAFolderGivesThePlatformsCode) {
-  EXPECT_EQ(writer_.DumpDocument(folder_.path.c_str()), kZORFileIsDirectory);
+  EXPECT_EQ(writer_.DumpDocument(folder_.path.string().c_str()), kZORFileIsDirectory);
 }
 
 TEST_F(TextDump, OnAFullDiskGivesThePlatformsCode) {
@@ -348,7 +348,7 @@ TEST_F(TreeDump, OfEverySampleReadsBackAsTheSameTree) {
   for (const auto& entry : fs::directory_iterator(ZOR_SOURCE_DIR "/samples")) {
     if (!entry.path().string().ends_with(".clash.xml")) continue;
     ++samples;
-    const DOM_Document document = Loaded(entry.path());
+    const DOM_Document document = Loaded(entry.path().string());
     ASSERT_EQ(
         writer_.DumpDocument(document.getDocumentElement(), path_.c_str(), "", "s.xsl", "", 1, 0),
         S_OK);
@@ -408,7 +408,8 @@ TEST_F(FileCopy, OfPathsThatDoNotFitGivesThePlatformsCodeOfTheCopy) {
   const std::string longest(255, 'n');
   folder_.WriteFile(longest, "bytes");
   fs::create_directory(folder_.path / "to");
-  EXPECT_EQ(writer_.CopyFile(longest.c_str(), folder_.path.c_str(), folder_.FilePath("to").c_str()),
+  EXPECT_EQ(writer_.CopyFile(longest.c_str(), folder_.path.string().c_str(),
+                             folder_.FilePath("to").c_str()),
             kZORFileBadPath);
   EXPECT_TRUE(fs::is_empty(folder_.path / "to"));
 }

@@ -55,6 +55,7 @@ std::span<const Verb> Verbs() {
 }
 
 CommandLine::CommandLine() : app("Reads and shows the XML results of clash analyses.", "lyra") {
+  app.allow_windows_style_options(false);  // a path there may begin with a slash too
   app.set_help_flag("-h,--help", "Print this help");
   app.set_version_flag("--version", "lyra " LYRA_VERSION, "Print the version");
   app.add_option("--lang", language, "Language of the documents' words, before or after the verb")

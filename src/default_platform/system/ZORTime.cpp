@@ -4,16 +4,22 @@
 
 namespace {
 
+/// After this many seconds the calendar repeats itself.
+constexpr long long k400Years = 146'097LL * 86'400;
+
 // The calendar's fields; those of an empty tm where the year does not fit an int.
 tm FieldsOf(long long inSeconds, ZORTz inZone) {
   const time_t seconds = static_cast<time_t>(inSeconds);
   tm fields{};
-  if (inZone == kZORTzUniversal) {
-    if (!gmtime_r(&seconds, &fields)) return tm{};
-  } else {
+  if (inZone != kZORTzUniversal)
     tzset();  // the zone is read afresh: localtime_r alone would keep the first one
-    if (!localtime_r(&seconds, &fields)) return tm{};
-  }
+  const tm* const done =
+      inZone == kZORTzUniversal ? gmtime_r(&seconds, &fields) : localtime_r(&seconds, &fields);
+  if (done != nullptr) return fields;
+  if (inSeconds >= 0 || inSeconds < -k400Years) return tm{};
+  // The C library of Windows knows no time before 1970.
+  fields = FieldsOf(inSeconds + k400Years, inZone);
+  fields.tm_year -= 400;
   return fields;
 }
 

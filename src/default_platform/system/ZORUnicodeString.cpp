@@ -311,7 +311,12 @@ HRESULT ZORUnicodeString::ConvertToUTF8(char* outBytes, std::size_t* outCount) c
 HRESULT ZORUnicodeString::ConvertToWChar(wchar_t* outWide) const {
   if (!outWide) return E_INVALIDARG;
   if constexpr (sizeof(wchar_t) == sizeof(char16_t)) {
-    for (const char16_t unit : std::u16string_view(units_)) *outWide++ = static_cast<wchar_t>(unit);
+    for (std::size_t position = 0; position < units_.size();) {
+      const std::size_t begin = position;
+      const char32_t character = ZORFoundation::NextCharacter(units_, position);
+      if (position == begin + 2) *outWide++ = static_cast<wchar_t>(units_[begin]);
+      *outWide++ = static_cast<wchar_t>(position == begin + 2 ? units_[begin + 1] : character);
+    }
   } else {
     for (std::size_t position = 0; position < units_.size();)
       *outWide++ = static_cast<wchar_t>(ZORFoundation::NextCharacter(units_, position));

@@ -11,6 +11,7 @@
 
 #include "default_platform/ModelProgram.h"
 #include "default_platform/OpenModel.h"
+#include "foundation/NativePath.h"
 #include "foundation/Vector3.h"
 #include "toolkit/Error.h"
 #include "toolkit/detection/DetectionTask.h"
@@ -92,7 +93,7 @@ class Detection {
 
   DetectionResult Run() {
     ChooseLeaves();
-    result_.model = std::filesystem::path(model_).filename().string();
+    result_.model = ZORFoundation::NativePath(model_).filename().string();
     result_.document = tree_.RootAlias();
     result_.tolerance = options_.tolerance;
     result_.contactGap = options_.contactGap;

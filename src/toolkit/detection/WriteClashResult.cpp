@@ -1,8 +1,9 @@
 #include <charconv>
 #include <cstdlib>
-#include <ctime>
 #include <fstream>
 
+#include "foundation/NativePath.h"
+#include "platform/system/ZORTime.h"
 #include "toolkit/Error.h"
 #include "toolkit/detection/Detect.h"
 #include "toolkit/detection/Viewpoints.h"
@@ -155,17 +156,15 @@ class ResultWriter {
 }  // namespace
 
 CalendarDate DateOfWriting() {
-  std::time_t time = std::time(nullptr);
-  if (const char* const epoch = std::getenv("SOURCE_DATE_EPOCH"))
-    time = static_cast<std::time_t>(std::strtoll(epoch, nullptr, 10));
-  std::tm parts{};
-  gmtime_r(&time, &parts);
-  return {parts.tm_mday, parts.tm_mon + 1, parts.tm_year + 1900};
+  const char* const epoch = std::getenv("SOURCE_DATE_EPOCH");
+  const ZORTime time = epoch == nullptr ? ZORTime() : ZORTime(std::strtoll(epoch, nullptr, 10));
+  return {time.GetDay(kZORTzUniversal), time.GetMonth(kZORTzUniversal),
+          time.GetYear(kZORTzUniversal)};
 }
 
 void WriteClashResult(const DetectionResult& inResult, const CalendarDate& inDate,
                       const std::string& inPath) {
-  std::ofstream stream(inPath, std::ios::binary | std::ios::trunc);
+  std::ofstream stream(ZORFoundation::NativePath(inPath), std::ios::binary | std::ios::trunc);
   ResultWriter(inResult, stream).Write(inDate);
   stream.close();
   if (!stream) throw Error(inPath, "cannot be written");

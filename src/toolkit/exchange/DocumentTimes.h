@@ -10,6 +10,7 @@
 #include <optional>
 #include <string>
 
+#include "platform/system/ZORTime.h"
 #include "toolkit/records/DocumentRecords.h"
 
 namespace ZORToolkit {
@@ -46,12 +47,15 @@ inline std::time_t EpochOf(const DocumentRecord& inDocument) {
 
 /// The same as XML has times, such as "2026-11-20T00:00:00Z".
 inline std::string TimeOf(const DocumentRecord& inDocument) {
-  const std::time_t epoch = EpochOf(inDocument);
-  std::tm parts{};
-  gmtime_r(&epoch, &parts);
-  char text[32];
-  std::strftime(text, sizeof text, "%Y-%m-%dT%H:%M:%SZ", &parts);
-  return parts.tm_year < -900 ? "1980-01-01T00:00:00Z" : text;
+  const ZORTime time(EpochOf(inDocument));
+  const int year = time.GetYear(kZORTzUniversal);
+  if (year < 1000) return "1980-01-01T00:00:00Z";
+  char text[80];
+  std::snprintf(text, sizeof text, "%d-%02d-%02dT%02d:%02d:%02dZ", year,
+                time.GetMonth(kZORTzUniversal), time.GetDay(kZORTzUniversal),
+                time.GetHour(kZORTzUniversal), time.GetMinute(kZORTzUniversal),
+                time.GetSecond(kZORTzUniversal));
+  return text;
 }
 
 }  // namespace ZORToolkit

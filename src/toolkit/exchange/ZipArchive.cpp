@@ -1,5 +1,4 @@
-// Reading and writing zip archives by libzip, and UUIDs by libuuid.
-#include <uuid/uuid.h>
+// Reading and writing zip archives by libzip.
 #include <zip.h>
 
 #include <algorithm>
@@ -259,9 +258,4 @@ ZOR_EXCHANGE_EXPORT bool ZORWriteArchive(const std::string& inPath,
     outReason = refused.reason;
     return false;
   }
-}
-
-ZOR_EXCHANGE_EXPORT void ZORNameUuid(const ZORToolkit::Uuid& inNamespace, const std::string& inName,
-                                     ZORToolkit::Uuid& outUuid) {
-  uuid_generate_sha1(outUuid.data(), inNamespace.data(), inName.data(), inName.size());
 }

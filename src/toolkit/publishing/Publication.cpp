@@ -9,6 +9,7 @@
 #include "PrintPictures.h"
 #include "foundation/AtomicFile.h"
 #include "foundation/Hash.h"
+#include "foundation/NativePath.h"
 #include "foundation/ReadWholeFile.h"
 #include "foundation/TemporaryFile.h"
 #include "foundation/Vector3.h"
@@ -35,6 +36,7 @@
 #include "toolkit/review/Match.h"
 
 namespace fs = std::filesystem;
+using ZORFoundation::NativePath;
 
 namespace ZORToolkit {
 namespace {
@@ -75,7 +77,7 @@ class Publication {
   }
 
   Published Make(const std::function<ZORIProduct_var()>& inOpenModel) {
-    const WorkFolder work(folder_);
+    const WorkFolder work(NativePath(folder_));
     if (!options_.isOneFile && MakesPage()) RequireOwnFiles(options_, styleSheet_);
     Published made;
     if (!options_.model.empty()) made.failures = Draw(inOpenModel());
@@ -84,7 +86,7 @@ class Publication {
     EditResult();
     const std::string manifest = ManifestText();
     const std::string page = MakePageOf(options_, styleSheet_, result_, published_);
-    fs::path path = options_.folder;
+    fs::path path = NativePath(options_.folder);
     if (options_.isOneFile) {
       WriteOneFile(page, manifest);
     } else {
@@ -141,10 +143,10 @@ class Publication {
 
   /// What the pictures are made from.
   std::string Stamp() const {
-    const auto time = fs::last_write_time(options_.model).time_since_epoch().count();
+    const auto time = fs::last_write_time(NativePath(options_.model)).time_since_epoch().count();
     return "result " + ZORFoundation::HexText(hash_) + "\nmodel " +
-           fs::canonical(options_.model).string() + " " +
-           std::to_string(fs::file_size(options_.model)) + " " + std::to_string(time) +
+           fs::canonical(NativePath(options_.model)).string() + " " +
+           std::to_string(fs::file_size(NativePath(options_.model))) + " " + std::to_string(time) +
            "\npictures " + FormatName(options_.format) + " " + std::to_string(options_.size.width) +
            "x" + std::to_string(options_.size.height) +
            (options_.places == ProductPlaces::kModel ? " model " : " result ") + PictureSettings() +
@@ -153,7 +155,7 @@ class Publication {
 
   /// Which products the model has, and where and in which colours they are shown.
   void Resolve(const ZORIProduct_var& inRoot) {
-    published_.model = Utf8(FromUtf8(fs::path(options_.model).filename().string()));
+    published_.model = Utf8(FromUtf8(NativePath(options_.model).filename().string()));
     published_.isAsInModel = options_.places == ProductPlaces::kModel;
     InterferenceScenes scenes(inRoot);
     Deviations deviations;
@@ -175,7 +177,8 @@ class Publication {
 
   /// @return how many interferences got no picture although the model has one of their products.
   std::size_t Draw(const ZORIProduct_var& inRoot) {
-    PictureStore store(folder_, options_.format == PictureFormat::kPng ? ".png" : ".jpg");
+    PictureStore store(NativePath(folder_),
+                       options_.format == PictureFormat::kPng ? ".png" : ".jpg");
     Resolve(inRoot);
     std::vector<std::size_t> wanted;
     std::set<std::string> numbers;
@@ -243,7 +246,7 @@ class Publication {
 
   void DrawBefore(const Before& inBefore, const PictureStore& inStore) const {
     try {
-      fs::current_path(inStore.DrawingFolder());
+      fs::current_path(NativePath(inStore.DrawingFolder()));
       PictureDrawing(-inBefore.record.index, inBefore.resolved, inStore, options_).DrawAlone();
     } catch (const std::exception&) {
       // The page shows no picture of it then.
@@ -254,7 +257,7 @@ class Publication {
     const std::string name = inStore.PictureName(kOverviewNumber);
     if (overview_ == nullptr || inStore.Has(name)) return;
     try {
-      fs::current_path(inStore.DrawingFolder());
+      fs::current_path(NativePath(inStore.DrawingFolder()));
       PrintPictures::TakeRepImage(overview_, FromUtf8(name), FormatName(options_.format),
                                   options_.size.width, options_.size.height, 1, 0);
       inStore.Finish(kOverviewNumber);
@@ -305,7 +308,7 @@ class Publication {
     if (inItem >= inWanted.size()) return DrawBefore(before_[inItem - inWanted.size()], inStore);
     const std::size_t n = inWanted[inItem];
     try {
-      fs::current_path(inStore.DrawingFolder());
+      fs::current_path(NativePath(inStore.DrawingFolder()));
       PictureDrawing(published_.interferences[n].number, resolved_[n], inStore, options_).Draw();
     } catch (const std::exception&) {
       // Its picture is not there, which is what is looked for at the end.

@@ -5,6 +5,7 @@
 #include <optional>
 #include <utility>
 
+#include "foundation/NativePath.h"
 #include "foundation/ReadWholeFile.h"
 #include "toolkit/publishing/OneFile.h"
 #include "toolkit/publishing/folder/Manifest.h"
@@ -20,7 +21,7 @@ namespace {
 class FoundPublication {
  public:
   explicit FoundPublication(const PublicationOptions& inOptions) : folder_(inOptions.folder) {
-    const bool isFolder = fs::is_directory(folder_);
+    const bool isFolder = fs::is_directory(ZORFoundation::NativePath(folder_));
     const std::string path = isFolder ? folder_ + "/" + kManifestFile : folder_;
     std::string bytes = ZORFoundation::ReadWholeFile(path).bytes;
     if (!isFolder) {
@@ -78,16 +79,16 @@ std::vector<std::string> VerifyPublication(const PublicationOptions& inOptions) 
 }
 
 void SetTarget(PublicationOptions& ioOptions, const std::string& inPath) {
-  std::string ending = fs::path(inPath).extension().string();
+  std::string ending = ZORFoundation::NativePath(inPath).extension().string();
   std::ranges::transform(ending, ending.begin(), [](unsigned char inByte) {
     return static_cast<char>(std::tolower(inByte));
   });
   ioOptions.folder = inPath;
-  ioOptions.isOneFile = ending == ".html" && !fs::is_directory(inPath);
+  ioOptions.isOneFile = ending == ".html" && !fs::is_directory(ZORFoundation::NativePath(inPath));
 }
 
 std::string FileNameOf(const std::string& inPath) {
-  return Utf8(FromUtf8(fs::path(inPath).filename().string()));
+  return Utf8(FromUtf8(ZORFoundation::NativePath(inPath).filename().string()));
 }
 
 }  // namespace ZORToolkit

@@ -7,6 +7,7 @@
 #include <set>
 
 #include "BuildPath.h"
+#include "foundation/NativePath.h"
 #include "toolkit/records/DocumentText.h"
 #include "toolkit/records/ElementWalk.h"
 
@@ -186,6 +187,7 @@ std::vector<LinkRecord> ReadLinks(ClashDocument& ioDocument) {
 }  // namespace ZORToolkit
 
 namespace fs = std::filesystem;
+using ZORFoundation::NativePath;
 
 namespace ZORToolkit {
 namespace {
@@ -193,7 +195,8 @@ namespace {
 constexpr const char* kLogicalScheme = "ZORDLN://";
 
 fs::path DirectoryOf(const std::string& inFederator) {
-  return inFederator == "-" ? fs::current_path() : fs::absolute(inFederator).parent_path();
+  return inFederator == "-" ? fs::current_path()
+                            : fs::absolute(NativePath(inFederator)).parent_path();
 }
 
 /// The path without links and dots as far as it exists.
@@ -211,7 +214,7 @@ std::string WithSlashes(std::string inPath) {
 std::string WhatIsWrongWith(const std::string& inPath) {
   if (inPath.empty()) return "missing: unknown logical name";
   std::error_code error;  // such as a loop of links, which opening the file names
-  if (!fs::exists(inPath, error) && !error) return "missing";
+  if (!fs::exists(NativePath(inPath), error) && !error) return "missing";
   try {
     const ClashDocument document(inPath);
     return document.HasInterferences() ? ""
@@ -226,10 +229,11 @@ std::string WhatIsWrongWith(const std::string& inPath) {
 }  // namespace
 
 std::string LinkTo(const std::string& inFile, const std::string& inFederator) {
-  if (fs::path(inFile).is_absolute()) return inFile;
-  return Canonical(fs::absolute(inFile))
+  const fs::path file = NativePath(inFile);
+  if (file.is_absolute()) return inFile;
+  return Canonical(fs::absolute(file))
       .lexically_relative(Canonical(DirectoryOf(inFederator)))
-      .string();
+      .generic_string();
 }
 
 std::string LinkedPath(const std::string& inLink, const std::string& inFederator) {
@@ -238,11 +242,11 @@ std::string LinkedPath(const std::string& inLink, const std::string& inFederator
     link = WithSlashes(Utf8(BuildPath::TransformPathnameFromDLName(FromUtf8(link))));
     if (link.empty() || link == "error") return {};
   }
-  const fs::path path = DirectoryOf(inFederator) / link;
+  const fs::path path = DirectoryOf(inFederator) / NativePath(link);
   std::error_code ignored;
   // Documents from the library's home system separate folders by backslashes.
   if (!fs::exists(path, ignored) && link.find('\\') != std::string::npos)
-    return (DirectoryOf(inFederator) / WithSlashes(link)).string();
+    return (DirectoryOf(inFederator) / NativePath(WithSlashes(link))).string();
   return path.string();
 }
 
@@ -253,7 +257,7 @@ std::vector<std::string> CheckLinks(const std::vector<LinkRecord>& inLinks,
   for (const LinkRecord& link : inLinks) {
     const std::string path = LinkedPath(link.link, inFederator);
     std::string problem = link.link.empty() ? "missing: the link is empty" : WhatIsWrongWith(path);
-    if (!path.empty() && !seen.insert(Canonical(path)).second)
+    if (!path.empty() && !seen.insert(Canonical(NativePath(path))).second)
       problem += problem.empty() ? "listed twice" : ", listed twice";
     problems.push_back(problem);
   }

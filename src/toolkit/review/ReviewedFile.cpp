@@ -4,6 +4,7 @@
 #include <fstream>
 #include <utility>
 
+#include "foundation/NativePath.h"
 #include "foundation/ReadWholeFile.h"
 #include "toolkit/records/ClashDocumentEdit.h"
 
@@ -13,7 +14,7 @@ namespace {
 constexpr std::uint64_t kMaxSize = 0x7fffffff;  // what the library reads from memory
 
 HRESULT WriteBytes(const std::string& inBytes, const std::string& inPath) {
-  std::ofstream file(std::filesystem::path(inPath), std::ios::binary);
+  std::ofstream file(ZORFoundation::NativePath(inPath), std::ios::binary);
   file.write(inBytes.data(), static_cast<std::streamsize>(inBytes.size()));
   return file.flush() ? S_OK : E_FAIL;
 }

@@ -7,6 +7,7 @@
 #include "foundation/AtomicFile.h"
 #include "foundation/Descriptor.h"
 #include "foundation/Hash.h"
+#include "foundation/NativePath.h"
 #include "foundation/Process.h"
 #include "foundation/ReadWholeFile.h"
 #include "foundation/TerminationSignals.h"
@@ -63,7 +64,7 @@ class Checkpoint {
     return file_.Get();
   }
 
-  void Remove() const { fs::remove(path_); }
+  void Remove() const { fs::remove(ZORFoundation::NativePath(path_)); }
 
  private:
   static std::string TitleOf(const ShareManifest& inManifest) {
@@ -109,7 +110,7 @@ ShareSize DetectShare(const std::string& inModel, DetectionOptions inOptions,
     inOptions.known = {FindingsOf(*found)};
     known = found->held;
   }
-  fs::create_directories(inManifest.folder);
+  fs::create_directories(ZORFoundation::NativePath(inManifest.folder));
   if (inOptions.known.empty()) WriteShare(inManifest);
   Checkpoint checkpoint(inManifest);
   if (const auto kept = inResumes ? checkpoint.Read(known) : std::nullopt)

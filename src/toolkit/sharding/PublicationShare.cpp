@@ -8,6 +8,7 @@
 
 #include "foundation/AtomicFile.h"
 #include "foundation/Hash.h"
+#include "foundation/NativePath.h"
 #include "foundation/Process.h"
 #include "foundation/ReadWholeFile.h"
 #include "toolkit/publishing/pictures/PictureDrawing.h"
@@ -124,8 +125,8 @@ class DrawingFromShares : public SharedDrawing {
     for (const ShareEntry& file : inShare.files) {
       if (!file.name.starts_with(kPictures)) continue;
       names.push_back(fs::path(file.name).filename().string());
-      fs::copy_file(fs::path(inShare.folder) / file.name,
-                    fs::path(inStore.DrawingFolder()) / names.back(),
+      fs::copy_file(ZORFoundation::NativePath(inShare.folder) / file.name,
+                    ZORFoundation::NativePath(inStore.DrawingFolder()) / names.back(),
                     fs::copy_options::overwrite_existing);
       if (names.size() < kNamesAtOnce) continue;
       inStore.TakeOver(names);
@@ -189,7 +190,8 @@ bool IsWhole(const ShareManifest& inFound) {
   std::set<std::string> damaged;
   for (const std::string& name : DamagedFiles(inFound)) damaged.insert(StemOf(name));
   for (const ShareEntry& file : inFound.files)
-    if (damaged.contains(StemOf(file.name))) fs::remove(fs::path(inFound.folder) / file.name);
+    if (damaged.contains(StemOf(file.name)))
+      fs::remove(ZORFoundation::NativePath(inFound.folder) / file.name);
   return inFound.isComplete && damaged.empty();
 }
 
@@ -205,7 +207,7 @@ ShareSize PublishShare(ClashDocument& ioResult, PublicationOptions inOptions,
     if (found && IsWhole(*found)) return {found->held.size(), true};
     inOptions.resume = found.has_value();
   }
-  fs::create_directories(inManifest.folder);
+  fs::create_directories(ZORFoundation::NativePath(inManifest.folder));
   inManifest.plan = kNothing;
   WriteShare(inManifest);
   DrawingOfShare drawing(inManifest);

@@ -6,6 +6,7 @@
 
 #include "foundation/AtomicFile.h"
 #include "foundation/Hash.h"
+#include "foundation/NativePath.h"
 #include "foundation/ReadWholeFile.h"
 #include "toolkit/Error.h"
 
@@ -18,7 +19,7 @@ using Json = nlohmann::ordered_json;
 constexpr char kFormat[] = "zorlyra-share/1";
 
 std::string PathOf(const std::string& inFolder, const std::string& inName) {
-  return (fs::path(inFolder) / inName).string();
+  return (ZORFoundation::NativePath(inFolder) / inName).string();
 }
 
 std::string HashText(const std::string& inBytes) {
@@ -27,7 +28,7 @@ std::string HashText(const std::string& inBytes) {
 
 /// A manifest can lead to no file outside its folder.
 bool IsBelow(const std::string& inName) {
-  const fs::path path(inName);
+  const fs::path path = ZORFoundation::NativePath(inName);
   return !inName.empty() && path.is_relative() && std::ranges::find(path, "..") == path.end();
 }
 
@@ -128,12 +129,14 @@ void RequireAll(const std::vector<ShareManifest>& inSorted) {
 
 ShareInput ShareInputOf(const std::string& inRole, const std::string& inPath) {
   const std::string bytes = ZORFoundation::ReadWholeFile(inPath).bytes;
-  return {inRole, fs::absolute(inPath).lexically_normal().string(), HashText(bytes)};
+  return {inRole, fs::absolute(ZORFoundation::NativePath(inPath)).lexically_normal().string(),
+          HashText(bytes)};
 }
 
 ShareManifest ReadShare(const std::string& inFolder) {
   const std::string path = PathOf(inFolder, kShareFile);
-  if (!fs::exists(path)) throw Error(inFolder + ": is no share: there is no " + kShareFile);
+  if (!fs::exists(ZORFoundation::NativePath(path)))
+    throw Error(inFolder + ": is no share: there is no " + kShareFile);
   const std::string bytes = ZORFoundation::ReadWholeFile(path).bytes;
   try {
     ShareManifest manifest = ManifestFrom(Json::parse(bytes));
@@ -147,7 +150,8 @@ ShareManifest ReadShare(const std::string& inFolder) {
 
 std::optional<ShareManifest> FindShare(const ShareManifest& inManifest,
                                        const std::function<void(const std::string&)>& inWarn) {
-  if (!fs::exists(PathOf(inManifest.folder, kShareFile))) return std::nullopt;
+  if (!fs::exists(ZORFoundation::NativePath(PathOf(inManifest.folder, kShareFile))))
+    return std::nullopt;
   std::string why;
   try {
     ShareManifest found = ReadShare(inManifest.folder);

@@ -1,9 +1,11 @@
 #include "platform/system/ZORFile.h"
 
 #include <gtest/gtest.h>
+#ifndef _WIN32
 #include <sys/resource.h>
 #include <sys/stat.h>
 #include <unistd.h>
+#endif
 
 #include <csignal>
 #include <filesystem>
@@ -17,6 +19,8 @@ using support::TemporaryFolder;
 namespace fs = std::filesystem;
 
 namespace {
+
+const std::string kSeparator(1, static_cast<char>(fs::path::preferred_separator));
 
 std::wstring Wide(const std::string& inPath) {
   std::wstring wide(inPath.size() + 1, L'?');
@@ -37,6 +41,7 @@ int FilesIn(const TemporaryFolder& inFolder) {
   return static_cast<int>(std::distance(begin, fs::directory_iterator()));
 }
 
+#ifndef _WIN32
 // The process may write files of so many bytes only, for as long as a scope lasts.
 class SizeLimit {
  public:
@@ -54,6 +59,7 @@ class SizeLimit {
   void (*handler_)(int);
   rlimit before_{};
 };
+#endif
 
 }  // namespace
 
@@ -78,6 +84,7 @@ TEST(ZORFileAccess, UnknownModeIsRefused) {
   EXPECT_NE(ZORFileAccess("/", 8), 0);
 }
 
+#ifndef _WIN32
 TEST(ZORFileAccess, ForbiddenFileIsRefused) {
   if (geteuid() == 0) GTEST_SKIP() << "nothing is forbidden to root";
   const TemporaryFolder folder;
@@ -87,6 +94,7 @@ TEST(ZORFileAccess, ForbiddenFileIsRefused) {
   EXPECT_NE(ZORFileAccess(folder.FilePath("a").c_str(), 4), 0);
   EXPECT_NE(ZORFileAccess(folder.FilePath("a").c_str(), 2), 0);
 }
+#endif
 
 TEST(ZORFOpen, MakesEmptiesAndAppends) {
   const TemporaryFolder folder;
@@ -160,6 +168,7 @@ TEST(ZORFWrite, WritesNothingAndMuch) {
   EXPECT_EQ(ReadFile(folder.FilePath("a")), much);
 }
 
+#ifndef _WIN32
 TEST(ZORFWrite, FullDiskIsReported) {
   int descriptor = -1;
   std::size_t written = 99;
@@ -182,6 +191,7 @@ TEST(ZORFWrite, PartThatFittedIsReported) {
   EXPECT_EQ(written, 1000u);
   EXPECT_EQ(ZORFClose(descriptor), S_OK);
 }
+#endif
 
 TEST(ZORFWrite, ClosedDescriptorFails) {
   std::size_t written = 99;
@@ -225,13 +235,16 @@ TEST(ZORFCopy, OntoItselfLeavesTheFileWhole) {
   const TemporaryFolder folder;
   folder.WriteFile("a", "text");
   fs::create_hard_link(folder.FilePath("a"), folder.FilePath("b"));
-  fs::create_symlink("a", folder.FilePath("c"));
   EXPECT_EQ(Copy(folder.FilePath("a"), folder.FilePath("a")), S_OK);
   EXPECT_EQ(Copy(folder.FilePath("a"), folder.FilePath("b")), S_OK);
+#ifndef _WIN32
+  fs::create_symlink("a", folder.FilePath("c"));
   EXPECT_EQ(Copy(folder.FilePath("a"), folder.FilePath("c")), S_OK);
+#endif
   EXPECT_EQ(ReadFile(folder.FilePath("a")), "text");
 }
 
+#ifndef _WIN32
 TEST(ZORFCopy, OntoALinkChangesTheFileThatItLeadsTo) {
   const TemporaryFolder folder;
   folder.WriteFile("source", "new");
@@ -263,6 +276,7 @@ TEST(ZORFCopy, DeviceIsWrittenIntoNotReplaced) {
   EXPECT_TRUE(fs::is_character_file("/dev/full"));
   EXPECT_TRUE(fs::is_character_file("/dev/null"));
 }
+#endif
 
 TEST(ZORFCopy, MissingSourceOrDirectoryIsReported) {
   const TemporaryFolder folder;
@@ -290,6 +304,7 @@ TEST(ZORFCopy, ExistingTargetIsRefusedOnDemand) {
   EXPECT_EQ(ReadFile(folder.FilePath("new")), "text");
 }
 
+#ifndef _WIN32
 TEST(ZORFCopy, OldTargetKeepsItsPermissions) {
   const TemporaryFolder folder;
   folder.WriteFile("source", "text");
@@ -317,6 +332,7 @@ TEST(ZORFCopy, NewTargetHasThePermissionsOfTheSource) {
   EXPECT_EQ(Copy(folder.FilePath("source"), folder.FilePath("new")), S_OK);
   EXPECT_EQ(fs::status(folder.FilePath("new")).permissions(), fs::perms(0700));
 }
+#endif
 
 TEST(ZORFCopy, UnknownFlagsAndNullAreRefused) {
   EXPECT_EQ(ZORFCopy(nullptr, L"a", 0), E_INVALIDARG);
@@ -328,20 +344,20 @@ TEST(ZORFCopy, UnknownFlagsAndNullAreRefused) {
 TEST(ZORMakePath, JoinsWithOneSeparator) {
   char path[260];
   EXPECT_EQ(ZORMakePath("/srv", "a.xml", path), S_OK);
-  EXPECT_STREQ(path, "/srv/a.xml");
+  EXPECT_EQ(path, "/srv" + kSeparator + "a.xml");
   EXPECT_EQ(ZORMakePath("/srv/", "a.xml", path), S_OK);
   EXPECT_STREQ(path, "/srv/a.xml");
   EXPECT_EQ(ZORMakePath("", "a.xml", path), S_OK);
   EXPECT_STREQ(path, "a.xml");
   EXPECT_EQ(ZORMakePath("/srv", "", path), S_OK);
-  EXPECT_STREQ(path, "/srv/");
+  EXPECT_EQ(path, "/srv" + kSeparator);
 }
 
 TEST(ZORMakePath, LongestPathFits) {
   char path[260];
   const std::string name(254, 'n');
   EXPECT_EQ(ZORMakePath("/srv", name.c_str(), path), S_OK);
-  EXPECT_EQ(path, "/srv/" + name);
+  EXPECT_EQ(path, "/srv" + kSeparator + name);
 }
 
 TEST(ZORMakePath, LongerPathIsRefused) {

@@ -122,7 +122,8 @@ TEST(ZORMsgCatalog, LanguageWithoutCatalogueFallsBackToEnglish) {
 TEST(ZORMsgCatalog, FirstDirectoryOfThePathWins) {
   const TemporaryFolder first, second;
   second.WriteFile("en/Which.toml", "name = \"second\"");
-  const ScopedVariable path("ZOR_CATALOGUE_PATH", first.path.string() + ":" + second.path.string());
+  const ScopedVariable path("ZOR_CATALOGUE_PATH",
+                            first.path.string() + support::kListSeparator + second.path.string());
   EXPECT_EQ(MessageOf("Which", "name"), "second");
   first.WriteFile("en/Which.toml", "name = \"first\"");
   EXPECT_EQ(MessageOf("Which", "name"), "first");

@@ -177,8 +177,9 @@ TEST(ZORSettingRepository, RepositoryOutlivesItsFile) {
 TEST(ZORSettingRepository, FirstDirectoryOfThePathWins) {
   const TemporaryFolder first, second;
   second.WriteFile("Kinds.toml", "number = 2");
-  const ScopedVariable path("ZOR_SETTINGS_PATH",
-                            "::" + first.path.string() + ":" + second.path.string() + ":");
+  const std::string separator = support::kListSeparator;
+  const ScopedVariable path("ZOR_SETTINGS_PATH", separator + separator + first.path.string() +
+                                                     separator + second.path.string() + separator);
   EXPECT_EQ(Read("number", 0), 2);
   first.WriteFile("Kinds.toml", "other = 1");
   EXPECT_EQ(Read("number", 0), 0) << "files are not merged";
@@ -187,7 +188,11 @@ TEST(ZORSettingRepository, FirstDirectoryOfThePathWins) {
 TEST(ZORSettingRepository, UserDirectoryComesAfterThePath) {
   const PlatformFolder folder;
   const TemporaryFolder configuration;
+#ifdef _WIN32
+  const ScopedVariable variable("APPDATA", configuration.path.string());
+#else
   const ScopedVariable variable("XDG_CONFIG_HOME", configuration.path.string());
+#endif
   configuration.WriteFile("zorlyra/Kinds.toml", "number = 5");
   EXPECT_EQ(Read("number", 0), 5);
   folder.WriteSettings("Kinds", "number = 6");

@@ -64,8 +64,8 @@ TEST(ZORUnicodeStringDifferential, WellFormedDoublesAreReadToTheBit) {
     std::memcpy(&number, &bits, sizeof(number));
     char text[64];
     std::snprintf(text, sizeof(text), i % 2 ? "%.17g" : "%.9e", number);
-    double expected = -7, actual = -7;
-    ASSERT_EQ(std::sscanf(text, "%le", &expected), 1);
+    const double expected = std::strtod(text, nullptr);
+    double actual = -7;
     ASSERT_EQ(ZORUnicodeString(text).ConvertToNum(&actual), 1) << text;
     ASSERT_TRUE(SameDouble(actual, expected)) << text;
   }

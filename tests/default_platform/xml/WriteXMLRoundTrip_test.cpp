@@ -131,7 +131,7 @@ TEST(WriteXMLRoundTrip, SplitSectionsKeepTheirCharacters) {
 TEST(WriteXMLRoundTrip, AllSamplesReadBackEqual) {
   int samples = 0;
   for (const auto& entry : std::filesystem::directory_iterator(ZOR_SOURCE_DIR "/samples")) {
-    const std::string path = entry.path();
+    const std::string path = entry.path().string();
     if (!path.ends_with(".clash.xml")) continue;
     DOMParser parser;
     parser.parse(path.c_str());

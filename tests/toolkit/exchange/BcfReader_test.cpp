@@ -84,9 +84,9 @@ TEST(BcfReader, ReadsEveryOfficialCaseAsAnotherReaderDoes) {
   std::size_t topics = 0, components = 0;
   for (const auto& file : std::filesystem::directory_iterator(OfficialFolder() + "/cases")) {
     SCOPED_TRACE(file.path());
-    const BcfProject project = ReadBcf(file.path());
+    const BcfProject project = ReadBcf(file.path().string());
     EXPECT_THAT(file.path().filename().string(), StartsWith(project.version + "_"));
-    const auto entries = ReadArchive(file.path());
+    const auto entries = ReadArchive(file.path().string());
     for (const BcfTopic& topic : project.topics) {
       ++topics;
       ExpectCounts(topic, entries.at(topic.folder + "/markup.bcf"));

@@ -41,7 +41,7 @@ std::vector<std::string> SamplePaths() {
   for (const char* const folder : {"/samples", "/tests/golden/inputs"})
     for (const auto& entry :
          std::filesystem::directory_iterator(std::string(ZOR_SOURCE_DIR) + folder))
-      if (entry.path().extension() == ".xml") paths.push_back(entry.path());
+      if (entry.path().extension() == ".xml") paths.push_back(entry.path().string());
   return paths;
 }
 

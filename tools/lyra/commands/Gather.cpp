@@ -4,6 +4,7 @@
 #include <filesystem>
 #include <memory>
 
+#include "foundation/NativePath.h"
 #include "foundation/Process.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
@@ -47,7 +48,7 @@ std::string PlanJson(const char* inVerb, const Plan& inPlan, double inMegabytes)
 int Gather(const GatherOptions& inOptions, Output& ioOutput) {
   inOptions.reading.Check();
   const std::vector<ShareManifest> shares = ReadAllShares(inOptions.folders);
-  if (std::filesystem::exists(std::filesystem::path(inOptions.output) / kShareFile))
+  if (std::filesystem::exists(ZORFoundation::NativePath(inOptions.output) / kShareFile))
     throw InputError(inOptions.output + ": is a share itself");
   const std::string& verb = shares.front().verb;
   if (verb == "publish") return GatherPublish(shares, inOptions, ioOutput);

@@ -6,6 +6,7 @@
 #include <optional>
 #include <thread>
 
+#include "foundation/NativePath.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
@@ -56,7 +57,7 @@ PublicationOptions ToolkitOptions(const PublishOptions& inOptions) {
   SetTarget(options, inOptions.directory);
   // A share is a folder whatever its name, which says what it is a share of.
   if (!inOptions.sharing.shard.empty() &&
-      std::filesystem::path(inOptions.directory).extension() == ".html")
+      ZORFoundation::NativePath(inOptions.directory).extension() == ".html")
     options.isOneFile = true;
   options.isCompact = inOptions.format.empty() && options.isOneFile;
   const bool isPng = options.isCompact || (!inOptions.format.empty() &&
@@ -173,7 +174,7 @@ int Extract(const ExtractOptions& inOptions, Output& ioOutput) {
   const PublishedPage page(inOptions.file, BytesOfInput(inOptions.file));
   const std::string bytes = inOptions.manifest ? page.ManifestText() : page.Result();
   OutputFile output(inOptions.output);
-  std::ofstream file(std::filesystem::path(output.Path()), std::ios::binary);
+  std::ofstream file(ZORFoundation::NativePath(output.Path()), std::ios::binary);
   file.write(bytes.data(), static_cast<std::streamsize>(bytes.size()));
   output.Check(file.flush() ? S_OK : E_FAIL);
   output.Finish(ioOutput);

@@ -3,6 +3,7 @@
 #include <memory>
 
 #include "ZORLyraGeneralServices.h"
+#include "foundation/NativePath.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/Verbs.h"
 #include "lyra/commands/Model.h"
@@ -104,7 +105,7 @@ int Render(const RenderOptions& inOptions, Output& ioOutput) {
   Fill(scene, inOptions, root);
   OutputFile file(inOptions.picture);
   TakePicture(*scene.Rep(), picture, file.Path());
-  if (fs::is_empty(file.Path()))
+  if (fs::is_empty(ZORFoundation::NativePath(file.Path())))
     throw InputError(inOptions.picture + ": the picture cannot be drawn or written");
   file.Finish(ioOutput);
   return 0;

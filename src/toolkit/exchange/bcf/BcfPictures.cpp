@@ -4,6 +4,7 @@
 
 #include "PrintPictures.h"
 #include "default_platform/SettingOverride.h"
+#include "foundation/NativePath.h"
 #include "foundation/ReadWholeFile.h"
 #include "platform/visualisation/ZOR3DRep.h"
 #include "platform/visualisation/ZOR3DViewpoint.h"
@@ -71,7 +72,7 @@ constexpr double kDefaultAspect = 756.0 / 506.0;
 
 std::optional<PictureSize> SizeOfPng(const std::string& inPath) {
   char begin[24] = {};
-  std::ifstream file(std::filesystem::path(inPath), std::ios::binary);
+  std::ifstream file(ZORFoundation::NativePath(inPath), std::ios::binary);
   if (!file.read(begin, sizeof begin) || std::string_view(begin, 8) != "\x89PNG\r\n\x1a\n")
     return std::nullopt;
   const auto number = [&](std::size_t inFirst) {
@@ -86,7 +87,7 @@ std::optional<PictureSize> SizeOfPng(const std::string& inPath) {
 /// Looks for the frame's header among the segments (ITU T.81, annex B).
 std::optional<PictureSize> SizeOfPicture(const std::string& inPath) {
   if (const std::optional<PictureSize> size = SizeOfPng(inPath)) return size;
-  std::ifstream file(std::filesystem::path(inPath), std::ios::binary);
+  std::ifstream file(ZORFoundation::NativePath(inPath), std::ios::binary);
   const auto byte = [&] { return static_cast<int>(static_cast<unsigned char>(file.get())); };
   const auto number = [&] {
     const int high = byte();
@@ -119,11 +120,11 @@ std::string WhitePng() {
 }
 
 SnapshotMaker::SnapshotMaker(const BcfOptions& inOptions, const std::string& inResultPath)
-    : options_(inOptions), resultFolder_(fs::path(inResultPath).parent_path()) {}
+    : options_(inOptions), resultFolder_(ZORFoundation::NativePath(inResultPath).parent_path()) {}
 
 std::string SnapshotMaker::PagePicture(int inNumber) const {
   for (const char* const ending : {".png", ".jpg"}) {
-    const fs::path path = fs::path(options_.page) / "pictures" /
+    const fs::path path = ZORFoundation::NativePath(options_.page) / "pictures" /
                           ("interference_" + std::to_string(inNumber) + ending);
     if (fs::exists(path)) return path.string();
   }
@@ -135,7 +136,7 @@ std::string SnapshotMaker::ReadyPicture(const InterferenceRecord& inRecord, bool
   if (!options_.page.empty())
     path = PagePicture(inRecord.index);
   else if (!inHasModel && !inRecord.picture.empty())
-    path = (resultFolder_ / inRecord.picture).string();
+    path = (resultFolder_ / ZORFoundation::NativePath(inRecord.picture)).string();
   if (path.empty()) return {};
   const std::optional<PictureSize> size = SizeOfPicture(path);
   return size && size->width >= 1 && size->height >= 1 ? path : "";
@@ -178,7 +179,7 @@ void SnapshotMaker::Draw(const std::vector<std::size_t>& inWanted,
   const ZORFoundation::ScratchFolder& folder = folder_.emplace();
   const ZORDefault::SettingOverride framesTheInterference("ClashPublish", "PictureZoom", 0);
   const auto pathOf = [&](std::size_t inIndex, const char* inEnding) {
-    return folder.Path() + "/" + std::to_string(inIndex) + inEnding;
+    return ZORFoundation::NativePath(folder.Path() + "/" + std::to_string(inIndex) + inEnding);
   };
   DrawingWork work;
   work.count = inWanted.size();
@@ -189,8 +190,8 @@ void SnapshotMaker::Draw(const std::vector<std::size_t>& inWanted,
     std::ofstream(pathOf(i, ".camera"), std::ios::binary)
         .write(reinterpret_cast<const char*>(&camera), sizeof camera);
     PrintPictures::PrintListVisuToFile(scene.products[0], "", scene.products[1], "",
-                                       scene.interference, FromUtf8(pathOf(i, ".png")), "PNG",
-                                       options_.size.width, options_.size.height, 1, 0);
+                                       scene.interference, FromUtf8(pathOf(i, ".png").string()),
+                                       "PNG", options_.size.width, options_.size.height, 1, 0);
   };
   work.isDone = [&](std::size_t inDone, double) {
     if (options_.drawn) options_.drawn(inDone, inWanted.size());
@@ -202,7 +203,7 @@ void SnapshotMaker::Draw(const std::vector<std::size_t>& inWanted,
     if (!file.read(reinterpret_cast<char*>(&snapshot.camera), sizeof snapshot.camera))
       throw Error("a picture cannot be drawn");
     snapshot.aspectRatio = static_cast<double>(options_.size.width) / options_.size.height;
-    snapshot.picture = pathOf(i, ".png");
+    snapshot.picture = pathOf(i, ".png").string();
     if (!SizeOfPng(snapshot.picture)) {
       snapshot.picture.clear();
       snapshot.showsProducts = false;

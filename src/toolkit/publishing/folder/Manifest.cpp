@@ -5,6 +5,7 @@
 #include <map>
 #include <nlohmann/json.hpp>
 
+#include "foundation/NativePath.h"
 #include "foundation/ReadWholeFile.h"
 #include "toolkit/publishing/folder/PublishedFiles.h"
 #include "toolkit/publishing/page/PageLibrary.h"
@@ -51,7 +52,7 @@ HashedFile HashedBytes(const std::string& inName, std::string_view inBytes) {
 }
 
 HashedFile HashedFileAt(const std::string& inPath) {
-  const std::string name = std::filesystem::path(inPath).filename().string();
+  const std::string name = ZORFoundation::NativePath(inPath).filename().string();
   return HashedBytes(Utf8(FromUtf8(name)), ZORFoundation::ReadWholeFile(inPath).bytes);
 }
 

@@ -8,6 +8,7 @@
 
 #include "ZORLyraXMLServices.h"
 #include "foundation/AtomicFile.h"
+#include "foundation/NativePath.h"
 #include "foundation/ReadWholeFile.h"
 #include "platform/system/ZORSettingRepository.h"
 #include "toolkit/Error.h"
@@ -51,7 +52,7 @@ std::string StyleSheetOfSetting() {
   ZORUnicodeString ignored;
   if (settings == nullptr || FAILED(settings->ReadSetting("XslTemplate", &ignored))) return {};
   std::string path = Utf8(ZORLyraXMLServices().getStyleSheetFromSetting());
-  if (!fs::exists(path)) std::ranges::replace(path, '\\', '/');
+  if (!fs::exists(ZORFoundation::NativePath(path))) std::ranges::replace(path, '\\', '/');
   return path;
 }
 
@@ -93,7 +94,8 @@ class OwnFiles {
   template <class IsOwn>
   void RequireOwn(const std::string& inName, const IsOwn& inIsOwn) const {
     const std::string path = folder_ + "/" + inName;
-    if (!fs::is_regular_file(path)) return;  // what else cannot be written says so itself
+    if (!fs::is_regular_file(ZORFoundation::NativePath(path)))
+      return;  // what else cannot be written says so itself
     if (!inIsOwn(ZORFoundation::ReadWholeFile(path).bytes))
       throw Error(path + ": is in the way of the page and was not made by lyra publish");
   }
@@ -147,7 +149,8 @@ std::string StyleSheetPath(const PublicationOptions& inOptions) {
 }
 
 std::string FileNameOf(const PageStyleSheet& inSheet) {
-  return inSheet.path.empty() ? kReportStyleSheet : fs::path(inSheet.path).filename().string();
+  return inSheet.path.empty() ? kReportStyleSheet
+                              : ZORFoundation::NativePath(inSheet.path).filename().string();
 }
 
 PageStyleSheet::PageStyleSheet(const PublicationOptions& inOptions)

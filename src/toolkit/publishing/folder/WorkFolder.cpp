@@ -4,6 +4,7 @@
 #include <thread>
 #include <vector>
 
+#include "foundation/NativePath.h"
 #include "toolkit/Error.h"
 
 namespace fs = std::filesystem;
@@ -44,7 +45,7 @@ void WorkFolder::Lock(const fs::path& inFolder) {
   using Clock = std::chrono::steady_clock;
   const auto end = Clock::now() + std::chrono::milliseconds(500);
   for (;; std::this_thread::sleep_for(std::chrono::milliseconds(10))) {
-    fs::create_directory(path_);
+    fs::create_directory(ZORFoundation::NativePath(path_));
     if (TryLock()) return;
     if (Clock::now() > end)
       throw Error(inFolder.string(), "another lyra publishes into this folder");
@@ -53,8 +54,8 @@ void WorkFolder::Lock(const fs::path& inFolder) {
 
 void WorkFolder::RemoveFiles() const {
   std::vector<fs::path> files;
-  for (const fs::directory_entry& entry : fs::directory_iterator(path_))
-    if (entry.path() != lockPath_) files.push_back(entry.path());
+  for (const fs::directory_entry& entry : fs::directory_iterator(ZORFoundation::NativePath(path_)))
+    if (entry.path() != ZORFoundation::NativePath(lockPath_)) files.push_back(entry.path());
   for (const fs::path& file : files) fs::remove(file);
 }
 

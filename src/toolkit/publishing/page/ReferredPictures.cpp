@@ -3,6 +3,7 @@
 #include <filesystem>
 #include <utility>
 
+#include "foundation/NativePath.h"
 #include "foundation/ReadWholeFile.h"
 #include "toolkit/publishing/page/PageLibrary.h"
 
@@ -24,7 +25,8 @@ std::string ReferredPictures::Refer(const std::string& inFolder, const std::stri
   if (isCompact_)
     if (std::string webp = LoadPageLibrary().webpFromPng(bytes); !webp.empty()) {
       bytes = std::move(webp);
-      file = HashedBytes(fs::path(inPath).replace_extension(".webp").string(), bytes);
+      file =
+          HashedBytes(ZORFoundation::NativePath(inPath).replace_extension(".webp").string(), bytes);
     }
   const auto [place, isNew] =
       ids_.try_emplace(file.sha256, std::string("zor-").append(file.sha256, 0, 20));

@@ -4,6 +4,7 @@
 #include <regex>
 
 #include "foundation/AtomicFile.h"
+#include "foundation/NativePath.h"
 #include "toolkit/publishing/page/PageLibrary.h"
 
 namespace fs = std::filesystem;
@@ -28,7 +29,7 @@ bool IsGeometryScript(std::string_view inText) { return inText.starts_with(kScri
 std::vector<fs::path> GeometryFilesIn(const std::string& inFolder) {
   static const std::regex names(R"((scene|part-\d+)\.js)");
   std::vector<fs::path> files;
-  const fs::path folder = fs::path(inFolder) / kViewerFolder;
+  const fs::path folder = ZORFoundation::NativePath(inFolder) / kViewerFolder;
   if (fs::is_directory(folder))
     for (const fs::directory_entry& entry : fs::directory_iterator(folder))
       if (std::regex_match(entry.path().filename().string(), names)) files.push_back(entry.path());
@@ -39,7 +40,7 @@ void WriteGeometry(const std::vector<PageBlock>& inBlocks, const std::string& in
                    const std::string& inWorkFolder) {
   for (const fs::path& file : GeometryFilesIn(inFolder)) fs::remove(file);
   if (inBlocks.empty()) return;
-  fs::create_directories(fs::path(inFolder) / kViewerFolder);
+  fs::create_directories(ZORFoundation::NativePath(inFolder) / kViewerFolder);
   ZORFoundation::AtomicFileOptions written;
   written.temporaryFolder = inWorkFolder;
   for (const PageBlock& block : inBlocks)
