@@ -41,8 +41,8 @@ Steps DiffWithZORLyra(const Arguments& inArguments) {
   });
   ReviewedResult was, is;
   TimeStep("read", steps, [&] {
-    was = ReadForReview(*oldDocument);
-    is = ReadForReview(*newDocument);
+    was = ReadForReview(*oldDocument, {.geometries = true});
+    is = ReadForReview(*newDocument, {.geometries = true, .identities = true});
   });
   ResultDiff diff;
   TimeStep("diff", steps, [&] { diff = Diff(was, is); });
@@ -69,7 +69,8 @@ Steps CarryWithZORLyra(const Arguments& inArguments) {
   });
   int changed = 0;
   TimeStep("carry", steps, [&] {
-    const ReviewedResult was = ReadForReview(*oldDocument), is = ReadForReview(*newDocument);
+    const ReviewedResult was = ReadForReview(*oldDocument, {.geometries = true});
+    const ReviewedResult is = ReadForReview(*newDocument, {.geometries = true});
     const CarryPlan plan = PlanCarry(was, is, Diff(was, is));
     changed = ApplyReviewEdits(*newDocument, is, plan.edits);
   });
@@ -90,7 +91,7 @@ Steps GroupWithZORLyra(const Arguments& inArguments) {
   TimeStep("load", steps, [&] { document.emplace(inArguments.at(0)); });
   std::vector<InterferenceGroup> groups;
   TimeStep("group", steps, [&] {
-    const ReviewedResult result = ReadForReview(*document);
+    const ReviewedResult result = ReadForReview(*document, {.identities = true});
     groups = GroupInterferences(result);
   });
   ResultHash hash;

@@ -4,6 +4,8 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <cstdint>
+#include <cstring>
 #include <string_view>
 
 #include "ZORFoundationExport.h"
@@ -17,8 +19,16 @@ inline bool IsHighSurrogate(char32_t inUnit) { return inUnit >= 0xD800 && inUnit
 inline bool IsLowSurrogate(char32_t inUnit) { return inUnit >= 0xDC00 && inUnit <= 0xDFFF; }
 
 inline bool IsAscii(std::string_view inBytes) {
-  return std::all_of(inBytes.begin(), inBytes.end(),
-                     [](char inByte) { return static_cast<unsigned char>(inByte) < 0x80; });
+  const char* at = inBytes.data();
+  const char* const end = at + inBytes.size();
+  std::uint64_t all = 0;
+  for (; end - at >= 8; at += 8) {
+    std::uint64_t block = 0;
+    std::memcpy(&block, at, sizeof block);
+    all |= block;
+  }
+  for (; at != end; ++at) all |= static_cast<unsigned char>(*at);
+  return (all & 0x8080808080808080u) == 0;
 }
 
 /// @return whether all of it is well-formed UTF-8.

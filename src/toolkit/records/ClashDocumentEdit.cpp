@@ -61,14 +61,22 @@ void ClashDocumentEdit::SetRetrieve(const ElementHandle& inInterference,
   SetWord(inInterference, "RetrieveInf", inRetrieve);
 }
 
+const DOMString& ClashDocumentEdit::WordText(const std::string& inText) {
+  KnownWord& known = words_[inText.size() % words_.size()];
+  if (known.text.isNull() || known.word != inText) known = {inText, DocumentString(inText)};
+  return known.text;
+}
+
 void ClashDocumentEdit::SetStatusAsWritten(const ElementHandle& inInterference,
                                            const std::string& inText) {
-  DOM_Element(inInterference.element_).setAttribute("Status", DocumentString(inText));
+  static const DOMString kName("Status");
+  DOM_Element(inInterference.element_).setAttribute(kName, WordText(inText));
 }
 
 void ClashDocumentEdit::SetRetrieveAsWritten(const ElementHandle& inInterference,
                                              const std::string& inText) {
-  DOM_Element(inInterference.element_).setAttribute("RetrieveInf", DocumentString(inText));
+  static const DOMString kName("RetrieveInf");
+  DOM_Element(inInterference.element_).setAttribute(kName, WordText(inText));
 }
 
 void ClashDocumentEdit::SetOnlyChild(const ElementHandle& inParent, const char* inName,

@@ -2,6 +2,7 @@
 #ifndef ZOR_TOOLKIT_RECORDS_CLASH_DOCUMENT_EDIT_H
 #define ZOR_TOOLKIT_RECORDS_CLASH_DOCUMENT_EDIT_H
 
+#include <array>
 #include <memory>
 #include <string>
 #include <vector>
@@ -71,8 +72,15 @@ class ZOR_TOOLKIT_EXPORT ClashDocumentEdit {
   void SetOnlyChild(const ElementHandle& inParent, const char* inName, const char* inAttribute,
                     const std::string& inValue);
   void RemoveReplaced(const Prologue& inPrologue);
+  const DOMString& WordText(const std::string& inText);
 
   ClashDocument& document_;
+  // The same few words are set again and again; by their lengths.
+  struct KnownWord {
+    std::string word;
+    DOMString text;
+  };
+  std::array<KnownWord, 16> words_;
 };
 
 /// Folds clash documents into one: the first takes in the others. Raises Error for a document of

@@ -29,7 +29,10 @@ class NearestPoints {
  public:
   /// @param inMaxDistance of the first three coordinates.
   NearestPoints(Points inPoints, double inMaxDistance)
-      : points_(inPoints), maxDistance_(inMaxDistance), order_(inPoints.size()) {
+      : points_(inPoints),
+        maxDistance_(inMaxDistance),
+        farSquared_(1.000001 * inMaxDistance * inMaxDistance),
+        order_(inPoints.size()) {
     std::iota(order_.begin(), order_.end(), 0);
     Split(0, order_.size(), 0);
   }
@@ -78,7 +81,8 @@ class NearestPoints {
 
   void Offer(int inCandidate, const AssignmentPoint& inPoint) {
     const AssignmentPoint& candidate = points_[static_cast<std::size_t>(inCandidate)];
-    if (std::sqrt(SquaredDistance(candidate, inPoint, 3)) > maxDistance_) return;
+    const double squared = SquaredDistance(candidate, inPoint, 3);
+    if (squared > farSquared_ || std::sqrt(squared) > maxDistance_) return;
     const std::pair found(SquaredDistance(candidate, inPoint, 4), inCandidate);
     if (nearest_.size() == kMaxCandidates) {
       if (!(found < nearest_.front())) return;
@@ -95,19 +99,26 @@ class NearestPoints {
 
   Points points_;
   double maxDistance_;
+  double farSquared_;  // surely beyond it
   std::vector<int> order_;
   std::vector<std::pair<double, int>> nearest_;  // a heap, the farthest first
 };
 
 /// Places of the points by what they are, equal ones by their order.
 std::vector<int> Sorted(Points inPoints) {
-  std::vector<int> order(inPoints.size());
-  std::iota(order.begin(), order.end(), 0);
-  std::ranges::sort(order, [&](int inA, int inB) {
-    const AssignmentPoint& a = inPoints[static_cast<std::size_t>(inA)];
-    const AssignmentPoint& b = inPoints[static_cast<std::size_t>(inB)];
-    return std::tie(a.at, a.kind, inA) < std::tie(b.at, b.kind, inB);
+  std::vector<std::pair<double, int>> keyed;  // by the first coordinate, which mostly decides
+  keyed.reserve(inPoints.size());
+  for (const AssignmentPoint& point : inPoints)
+    keyed.emplace_back(point.at[0], static_cast<int>(keyed.size()));
+  std::ranges::sort(keyed, [&](const auto& inA, const auto& inB) {
+    if (inA.first != inB.first) return inA.first < inB.first;
+    const AssignmentPoint& a = inPoints[static_cast<std::size_t>(inA.second)];
+    const AssignmentPoint& b = inPoints[static_cast<std::size_t>(inB.second)];
+    return std::tie(a.at, a.kind, inA.second) < std::tie(b.at, b.kind, inB.second);
   });
+  std::vector<int> order;
+  order.reserve(keyed.size());
+  for (const auto& [first, point] : keyed) order.push_back(point);
   return order;
 }
 
@@ -119,7 +130,11 @@ struct Edge {
 class Solver {
  public:
   Solver(Points inRows, Points inColumns, const AssignmentCosts& inCosts)
-      : rows_(inRows), columns_(inColumns), costs_(inCosts) {
+      : rows_(inRows),
+        columns_(inColumns),
+        costs_(inCosts),
+        rowOrder_(Sorted(inRows)),
+        columnOrder_(Sorted(inColumns)) {
     result_.columnOfRow.assign(inRows.size(), -1);
     result_.isAmbiguous.assign(inRows.size(), 0);
     rowOfColumn_.assign(inColumns.size(), -1);
@@ -140,7 +155,7 @@ class Solver {
  private:
   // Costs are a metric, so that some best assignment holds all pairs that cost nothing.
   void AssignEqualPoints() {
-    const std::vector<int> rows = Sorted(rows_), columns = Sorted(columns_);
+    const std::vector<int>&rows = rowOrder_, &columns = columnOrder_;
     const auto key = [](const AssignmentPoint& inPoint) {
       return std::tie(inPoint.at, inPoint.kind);
     };
@@ -175,9 +190,10 @@ class Solver {
 
   /// Free points that stand at one spot.
   typedef std::vector<std::vector<int>> Spots;
-  static Spots SpotsOf(Points inPoints, const std::vector<int>& inTaken) {
+  static Spots SpotsOf(Points inPoints, const std::vector<int>& inOrder,
+                       const std::vector<int>& inTaken) {
     Spots spots;
-    for (const int point : Sorted(inPoints)) {
+    for (const int point : inOrder) {
       const auto p = static_cast<std::size_t>(point);
       if (inTaken[p] >= 0) continue;
       if (spots.empty() || inPoints[static_cast<std::size_t>(spots.back()[0])].at != inPoints[p].at)
@@ -189,12 +205,12 @@ class Solver {
 
   void FindEdges() {
     edges_.resize(rows_.size());
-    const Spots spots = SpotsOf(columns_, rowOfColumn_);
+    const Spots spots = SpotsOf(columns_, columnOrder_, rowOfColumn_);
     std::vector<AssignmentPoint> places;
     for (const std::vector<int>& spot : spots)
       places.push_back(columns_[static_cast<std::size_t>(spot[0])]);
     NearestPoints nearest(places, costs_.maxDistance);
-    for (const std::vector<int>& rows : SpotsOf(rows_, result_.columnOfRow)) {
+    for (const std::vector<int>& rows : SpotsOf(rows_, rowOrder_, result_.columnOfRow)) {
       std::vector<std::pair<double, int>> found =
           nearest.Of(rows_[static_cast<std::size_t>(rows[0])]);
       std::ranges::sort(found);
@@ -308,6 +324,7 @@ class Solver {
 
   Points rows_, columns_;
   AssignmentCosts costs_;
+  std::vector<int> rowOrder_, columnOrder_;  // see Sorted
   Assignment result_;
   std::vector<int> rowOfColumn_, freeRows_;
   std::vector<std::vector<Edge>> edges_;  // of each row

@@ -42,6 +42,7 @@ class CarryPlanner {
       : old_(inOld), new_(inNew), keepChanged_(inKeepChanged) {}
 
   CarryPlan Plan(const ResultDiff& inDiff) {
+    plan_.edits.reserve(new_.interferences.size());
     for (const DiffEntry& entry : inDiff.entries) {
       if (entry.newPosition < 0) {
         plan_.left += IsDecided(RecordAt(old_, entry.oldPosition));
@@ -151,12 +152,12 @@ int ApplyReviewEdits(ClashDocument& ioDocument, const ReviewedResult& inResult,
     const bool hasStatus = wanted.status && *wanted.status != record.status;
     const bool hasComment = wanted.comment && *wanted.comment != record.comment;
     const bool hasRetrieve = wanted.retrieve && *wanted.retrieve != record.retrieve;
-    if (hasStatus)
-      edit.SetStatusAsWritten(inResult.ElementOf(record), language.Translate(*wanted.status));
-    if (hasRetrieve)
-      edit.SetRetrieveAsWritten(inResult.ElementOf(record), language.Translate(*wanted.retrieve));
-    if (hasComment) edit.SetComment(inResult.ElementOf(record), *wanted.comment);
-    count += hasStatus || hasComment || hasRetrieve;
+    if (!hasStatus && !hasComment && !hasRetrieve) continue;
+    const ElementHandle element = inResult.ElementOf(record);
+    if (hasStatus) edit.SetStatusAsWritten(element, language.Translate(*wanted.status));
+    if (hasRetrieve) edit.SetRetrieveAsWritten(element, language.Translate(*wanted.retrieve));
+    if (hasComment) edit.SetComment(element, *wanted.comment);
+    ++count;
   }
   return count;
 }

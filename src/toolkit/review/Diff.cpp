@@ -31,14 +31,8 @@ class Coverage {
   explicit Coverage(const std::vector<SpecifiedPair>& inSpecifications) {
     for (const SpecifiedPair& specification : inSpecifications) {
       const auto& [first, second] = specification.products;
-      for (const std::string_view a : {first.alias, first.id}) {
-        products_.insert(a);
-        for (const std::string_view b : {second.alias, second.id}) {
-          products_.insert(b);
-          pairs_.insert({a, b});
-          pairs_.insert({b, a});
-        }
-      }
+      Add(first.alias, second);
+      if (first.id != first.alias) Add(first.id, second);
     }
   }
 
@@ -56,6 +50,17 @@ class Coverage {
   }
 
  private:
+  void Add(std::string_view inFirst, const SpecifiedPair::Names& inSecond) {
+    products_.insert(inFirst);
+    Add(inFirst, inSecond.alias);
+    if (inSecond.id != inSecond.alias) Add(inFirst, inSecond.id);
+  }
+  void Add(std::string_view inFirst, std::string_view inSecond) {
+    products_.insert(inSecond);
+    pairs_.insert({inFirst, inSecond});
+    pairs_.insert({inSecond, inFirst});
+  }
+
   typedef std::pair<std::string_view, std::string_view> Pair;
   struct PairHash {
     std::size_t operator()(const Pair& inPair) const {
@@ -362,14 +367,18 @@ ResultDiff Diff(const ReviewedResult& inOld, const ReviewedResult& inNew,
 
 std::vector<std::string> EntryIds(const ResultDiff& inDiff, const ReviewedResult& inOld,
                                   const ReviewedResult& inNew) {
-  std::vector<std::string> oldIds, newIds = StableIds(inNew), ids;
+  std::vector<int> gone;
+  for (const DiffEntry& entry : inDiff.entries)
+    if (entry.newPosition < 0) gone.push_back(entry.oldPosition);
+  const std::vector<std::uint64_t> newIds = StableIdNumbers(inNew);
+  const std::vector<std::uint64_t> goneIds = StableIdNumbers(inOld, gone);
+  std::vector<std::string> ids;
   ids.reserve(inDiff.entries.size());
-  for (const DiffEntry& entry : inDiff.entries) {
-    const bool isOld = entry.newPosition < 0;
-    if (isOld && oldIds.empty()) oldIds = StableIds(inOld);
-    ids.push_back(isOld ? oldIds[static_cast<std::size_t>(entry.oldPosition)]
-                        : newIds[static_cast<std::size_t>(entry.newPosition)]);
-  }
+  std::size_t nextGone = 0;
+  for (const DiffEntry& entry : inDiff.entries)
+    ids.push_back(ZORFoundation::HexText(
+        entry.newPosition < 0 ? goneIds[nextGone++]
+                              : newIds[static_cast<std::size_t>(entry.newPosition)]));
   return ids;
 }
 

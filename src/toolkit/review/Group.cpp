@@ -1,10 +1,11 @@
 #include "toolkit/review/Group.h"
 
 #include <algorithm>
+#include <array>
+#include <charconv>
 #include <cmath>
 #include <numeric>
 #include <tuple>
-#include <unordered_map>
 
 #include "toolkit/review/HashInput.h"
 #include "toolkit/review/PlaceClusters.h"
@@ -18,11 +19,55 @@ std::string_view PartOf(const ReviewProduct& inProduct) {
 }
 
 std::string_view AssemblyOf(const ReviewProduct& inProduct) {
-  const bool hasPath = inProduct.id.find(kPathSeparator) != std::string_view::npos;
-  const std::string_view path = hasPath ? inProduct.id : inProduct.Name();
-  const std::size_t at = path.rfind(kPathSeparator);
+  std::string_view path = inProduct.id;
+  std::size_t at = LastSeparator(path);
+  if (at == std::string_view::npos) {
+    path = inProduct.Name();
+    at = LastSeparator(path);
+  }
   return at == std::string_view::npos ? "(top)" : path.substr(0, at);
 }
+
+/// Numbers different texts in the order in which they come; by open addressing.
+class TextNumbers {
+ public:
+  int NumberOf(std::string_view inText) {
+    if (2 * (texts_.size() + 1) > slots_.size()) Grow();
+    const std::uint64_t hash = ZORFoundation::Hash64Of(inText);
+    const std::size_t mask = slots_.size() - 1;
+    std::size_t slot = hash & mask;
+    for (; slots_[slot].number >= 0; slot = (slot + 1) & mask)
+      if (slots_[slot].hash == hash &&
+          texts_[static_cast<std::size_t>(slots_[slot].number)] == inText)
+        return slots_[slot].number;
+    slots_[slot] = {hash, static_cast<int>(texts_.size())};
+    texts_.push_back(inText);
+    return slots_[slot].number;
+  }
+
+  const std::vector<std::string_view>& Texts() const { return texts_; }
+
+ private:
+  struct Slot {
+    std::uint64_t hash = 0;
+    int number = -1;
+  };
+
+  void Grow() {
+    std::vector<Slot> slots(4 * slots_.size());
+    const std::size_t mask = slots.size() - 1;
+    for (const Slot& one : slots_) {
+      if (one.number < 0) continue;
+      std::size_t slot = one.hash & mask;
+      while (slots[slot].number >= 0) slot = (slot + 1) & mask;
+      slots[slot] = one;
+    }
+    slots_.swap(slots);
+  }
+
+  std::vector<std::string_view> texts_;
+  std::vector<Slot> slots_ = std::vector<Slot>(64);
+};
 
 /// What products are grouped by, numbered in the order of the texts; 0 is the empty text, which is
 /// also that of a missing product.
@@ -30,14 +75,12 @@ class ProductLabels {
  public:
   ProductLabels(const std::vector<ReviewProduct>& inProducts, GroupBy inBy) : texts_{""} {
     if (inBy == GroupBy::kPlace) return;
-    numbers_.resize(inProducts.size());
-    std::unordered_map<std::string_view, int> known{{"", 0}};
-    for (std::size_t i = 0; i < inProducts.size(); ++i) {
-      const std::string_view text = TextOf(inProducts[i], inBy);
-      const auto [found, isNew] = known.try_emplace(text, static_cast<int>(texts_.size()));
-      if (isNew) texts_.push_back(text);
-      numbers_[i] = found->second;
-    }
+    numbers_.reserve(inProducts.size());
+    TextNumbers numbers;
+    numbers.NumberOf("");
+    for (const ReviewProduct& product : inProducts)
+      numbers_.push_back(numbers.NumberOf(TextOf(product, inBy)));
+    texts_ = numbers.Texts();
     Sort();
   }
 
@@ -110,8 +153,11 @@ class Grouper {
 
   void ReadPlaces() {
     if (!places_.empty()) return;
-    places_ = PlacesOf(result_);
-    ids_ = StableIdNumbers(result_, places_);
+    places_ = result_.places;
+    if (places_.empty())
+      for (const ReviewRecord& record : result_.interferences)
+        places_.push_back(result_.PlaceOf(record));
+    ids_ = StableIdNumbers(result_);
   }
 
   void CountProducts() {
@@ -119,6 +165,25 @@ class Grouper {
     for (const ReviewRecord& record : result_.interferences)
       for (const int product : record.products)
         if (product >= 0) ++counts_[static_cast<std::size_t>(product)];
+  }
+
+  /// Members come in their order; of many by counting, eleven bits of the keys at a time.
+  void Sort(std::vector<Keyed>& ioKeyed) {
+    constexpr std::size_t kMany = 512;
+    constexpr int kBits = 11;
+    constexpr std::uint64_t kMask = (std::uint64_t{1} << kBits) - 1;
+    if (ioKeyed.size() < kMany) return std::sort(ioKeyed.begin(), ioKeyed.end());
+    std::uint64_t differing = 0;
+    for (const Keyed& one : ioKeyed) differing |= one.key ^ ioKeyed.front().key;
+    for (int shift = 0; shift < 64; shift += kBits) {
+      if (((differing >> shift) & kMask) == 0) continue;
+      std::array<std::uint32_t, kMask + 1> ends{};
+      for (const Keyed& one : ioKeyed) ++ends[(one.key >> shift) & kMask];
+      std::exclusive_scan(ends.begin(), ends.end(), ends.begin(), 0u);
+      sorted_.resize(ioKeyed.size());
+      for (const Keyed& one : ioKeyed) sorted_[ends[(one.key >> shift) & kMask]++] = one;
+      ioKeyed.swap(sorted_);
+    }
   }
 
   std::vector<InterferenceGroup> Split(const std::vector<int>& inMembers, std::size_t inLevel,
@@ -133,7 +198,7 @@ class Grouper {
     std::vector<Keyed> keyed = options_.by[inLevel] == GroupBy::kPlace
                                    ? KeyedByPlace(inMembers)
                                    : KeyedByLabel(inMembers, inLevel);
-    std::sort(keyed.begin(), keyed.end());
+    Sort(keyed);
     const std::vector<Bucket> buckets = BucketsOf(keyed);
     groups.reserve(buckets.size());
     for (const Bucket& bucket : buckets) {
@@ -254,8 +319,10 @@ class Grouper {
   static std::string RoundedText(double inNumber) {
     constexpr double kPlain = 100'000;  // below it a number needs no exponent
     const double rounded = std::round(inNumber) + 0.0;
-    return std::abs(rounded) < kPlain ? std::to_string(static_cast<int>(rounded))
-                                      : Number(rounded).text;
+    if (!(std::abs(rounded) < kPlain)) return Number(rounded).text;
+    char digits[8];
+    const auto end = std::to_chars(digits, std::end(digits), static_cast<int>(rounded));
+    return {digits, end.ptr};
   }
 
   void Describe(InterferenceGroup& ioGroup, std::string_view inParentId) {
@@ -282,6 +349,7 @@ class Grouper {
   const GroupOptions& options_;
   std::vector<std::uint64_t> ids_;  // of the interferences, where they are grouped by place
   HashInput input_;
+  std::vector<Keyed> sorted_;
   std::vector<ProductLabels> labels_;  // of each level; none of places
   std::vector<std::optional<double>> values_;
   std::vector<std::optional<Position>> places_;

@@ -18,7 +18,7 @@ constexpr double kValueWeight = 0.1;  // what a small difference of values costs
 /// An interference of the pair in hand.
 struct Item {
   int position;
-  std::size_t first;  // which of its products is the pair's first
+  std::uint32_t first;  // which of its products is the pair's first
 };
 typedef std::vector<Item> Items;
 
@@ -63,23 +63,11 @@ class PairMatcher {
 
   /// By the texts of placements and points, without understanding them.
   bool IsAtSamePlace(const Item& inOld, const Item& inNew) const {
-    const ReviewRecord &was = Old(inOld), &is = New(inNew);
+    const WrittenGeometry was = old_.GeometryOf(Old(inOld)), is = new_.GeometryOf(New(inNew));
     const std::size_t swap = inOld.first == inNew.first ? 0 : 1;
-    return StandsAlike(was, 0, is, swap) && StandsAlike(was, 1, is, 1 - swap) &&
-           old_.HasPointsOf(was, new_, is);
-  }
-
-  /// The first placement of a product has been compared already.
-  bool StandsAlike(const ReviewRecord& inOld, std::size_t inOldProduct, const ReviewRecord& inNew,
-                   std::size_t inNewProduct) const {
-    const int was = inOld.products[inOldProduct], is = inNew.products[inNewProduct];
-    if (was < 0 || is < 0) return was == is;
-    const ElementNumber from = inOld.productElements[inOldProduct];
-    const ElementNumber to = inNew.productElements[inNewProduct];
-    if (old_.products[static_cast<std::size_t>(was)].element == from &&
-        new_.products[static_cast<std::size_t>(is)].element == to)
-      return match_.productsOfOld[static_cast<std::size_t>(was)].isUnmoved;
-    return old_.HasPlacementOf(from, new_, to);
+    return was.placements[0] == is.placements[swap] &&
+           was.placements[1] == is.placements[1 - swap] && was.points == is.points &&
+           was.points != WrittenGeometry::kNeverAlike;
   }
 
   static Places PlacesOf(const ReviewedResult& inResult, const Item& inItem) {
@@ -178,13 +166,13 @@ class PairMatcher {
   }
 
   void SetBoth(const Item& inOld, const Item& inNew, std::string_view inReason, bool inIsUnmoved) {
-    PartnerOf(inOld) = {inNew.position, inReason, inIsUnmoved};
-    PartnerOfNew(inNew) = {inOld.position, inReason, inIsUnmoved};
+    PartnerOf(inOld) = {inNew.position, inIsUnmoved, inReason};
+    PartnerOfNew(inNew) = {inOld.position, inIsUnmoved, inReason};
   }
 
   /// The only ones of their pair, where all is where it was.
   void SetUnmoved(const Item& inOld, const Item& inNew) {
-    const bool hasPlace = old_.HasPoints(Old(inOld));
+    const bool hasPlace = old_.GeometryOf(Old(inOld)).points > WrittenGeometry::kNoPoints;
     std::string_view reason =
         hasPlace ? "same products, same place" : "same products, the only one of the pair";
     const std::string products = ReasonOfProducts(Old(inOld));
@@ -292,7 +280,7 @@ class PairRows {
       for (int& product : products)
         if (product >= 0)
           product = match_.productsOfOld[static_cast<std::size_t>(product)].position;
-    const std::size_t first = products[1] < products[0] ? 1 : 0;
+    const std::uint32_t first = products[1] < products[0] ? 1 : 0;
     rows_.push_back({products[first], products[1 - first], inIsNew, {inRecord.index - 1, first}});
     ++ends_[PlaceOf(products[first])];
   }

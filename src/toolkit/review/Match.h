@@ -19,10 +19,10 @@ struct MatchOptions {
 /// What one result is in the other, by positions in ReviewedResult.
 struct ResultMatch {
   struct Partner {
-    int position = -1;        ///< in the other result, -1 for none
-    std::string_view reason;  ///< why this one, or why none; lives as long as the match
+    int position = -1;  ///< in the other result, -1 for none
     /// Its placement, or the placements and points of an interference, are written alike.
     bool isUnmoved = false;
+    std::string_view reason;  ///< why this one, or why none; lives as long as the match
   };
   std::vector<Partner> productsOfOld, productsOfNew;
   std::vector<Partner> interferencesOfOld, interferencesOfNew;

@@ -46,9 +46,9 @@ class ProductMatcher {
   }
 
   void Set(int inOld, int inNew, std::string_view inReason) {
-    const bool isUnmoved = old_.HasPlacementOf(Old(inOld).element, new_, New(inNew).element);
-    match_.productsOfOld[static_cast<std::size_t>(inOld)] = {inNew, inReason, isUnmoved};
-    match_.productsOfNew[static_cast<std::size_t>(inNew)] = {inOld, inReason, isUnmoved};
+    const bool isUnmoved = old_.WrittenPlacementOf(inOld) == new_.WrittenPlacementOf(inNew);
+    match_.productsOfOld[static_cast<std::size_t>(inOld)] = {inNew, isUnmoved, inReason};
+    match_.productsOfNew[static_cast<std::size_t>(inNew)] = {inOld, isUnmoved, inReason};
   }
 
   void ByKey() {
@@ -190,7 +190,7 @@ std::string Millimetres(double inLength) {
 }
 
 double Motions::Of(ElementNumber inOld, ElementNumber inNew) const {
-  if (old_.HasPlacementOf(inOld, new_, inNew)) return 0;
+  if (old_.WrittenPlacement(inOld) == new_.WrittenPlacement(inNew)) return 0;
   const std::optional<Placement> was = old_.PlacementOf(inOld), is = new_.PlacementOf(inNew);
   if (!was || !is || *was == *is) return 0;
   return FrameDistance(FrameOf(*was), FrameOf(*is));
@@ -209,8 +209,8 @@ double Motions::Of(const ReviewRecord& inOld, std::size_t inOldProduct, const Re
 double Motions::Relative(const ReviewRecord& inOld, const ReviewRecord& inNew,
                          bool inIsSwapped) const {
   const std::size_t first = inIsSwapped ? 1 : 0;
-  if (old_.HasPlacementOf(inOld.productElements[0], new_, inNew.productElements[first]) &&
-      old_.HasPlacementOf(inOld.productElements[1], new_, inNew.productElements[1 - first]))
+  const WrittenGeometry was = old_.GeometryOf(inOld), is = new_.GeometryOf(inNew);
+  if (was.placements[0] == is.placements[first] && was.placements[1] == is.placements[1 - first])
     return 0;
   const auto oldFirst = old_.PlacementOf(inOld.productElements[0]);
   const auto oldSecond = old_.PlacementOf(inOld.productElements[1]);

@@ -5,24 +5,35 @@
 #include "toolkit/records/ElementWalk.h"
 #include "toolkit/review/LanguageWords.h"
 #include "toolkit/review/ReviewSource.h"
+#include "toolkit/review/StableIds.h"
 
 namespace ZORToolkit {
 namespace {
 
 class ReviewReader {
  public:
-  explicit ReviewReader(ClashDocument& ioDocument)
-      : document_(ioDocument), source_(std::make_shared<ReviewSource>(ioDocument.Root())) {}
+  ReviewReader(ClashDocument& ioDocument, const ReviewReading& inReading)
+      : document_(ioDocument),
+        reading_(inReading),
+        identityHasher_(result_),
+        usualCount_(ZORDefault::TreeReader(ioDocument.Root()).ElementEnd() / kUsualNodes),
+        source_(std::make_shared<ReviewSource>(ioDocument.Root(), 2 * usualCount_)) {}
 
   ReviewedResult Read() {
     result_.name = document_.Name();
     result_.kind = document_.Kind();
     result_.source = source_;
-    constexpr std::size_t kUsualNodes = 44;  // of an interference
-    result_.interferences.reserve(source_->Tree().ElementEnd() / kUsualNodes);
+    result_.interferences.reserve(usualCount_);
+    result_.products.reserve(2 * usualCount_);  // memory that is not used costs nothing
+    if (reading_.geometries) result_.geometries.reserve(usualCount_);
+    if (reading_.identities) {
+      result_.places.reserve(usualCount_);
+      result_.identities.reserve(usualCount_);
+    }
     const Element root = ZORDefault::TreeReader::ElementOf(document_.Root());
     if (result_.kind == DocumentKind::kInterference) {
       ReadSingle(root);
+      FinishBlock();
       return std::move(result_);
     }
     source_->ForEachChild(root, [&](Element inChild, Named inNamed) {
@@ -30,11 +41,13 @@ class ReviewReader {
       if (inNamed == Named::kProductsInSpec) ReadSpecifications(inChild);
       if (inNamed == Named::kClashSpec) ReadComputation(inChild);
     });
+    FinishBlock();
     return std::move(result_);
   }
 
  private:
   typedef ReviewSource::Element Element;
+  static constexpr std::size_t kUsualNodes = 44;  // of an interference
 
   std::string TextOf(Element inElement, Named inAttribute) {
     return std::string(source_->Text(source_->Attribute(inElement, inAttribute)));
@@ -78,6 +91,7 @@ class ReviewReader {
   }
 
   void ReadInterference(Element inElement, int inComputationCase) {
+    if (awaitedCount_ + 2 > awaited_.size()) FinishBlock();
     ReviewRecord& record = result_.interferences.emplace_back();
     record.index = static_cast<int>(result_.interferences.size());
     record.computationCase = inComputationCase;
@@ -147,7 +161,7 @@ class ReviewReader {
     });
     for (std::size_t i = 0; i < 2; ++i)
       if (ioRecord.productElements[i] != 0)
-        ioRecord.products[i] = ProductOf(ioRecord.productElements[i]);
+        Await(ioRecord.index - 1, i, ioRecord.productElements[i]);
   }
 
   void ReadRule(Element inRule, const WrittenNumber& inClearance, ReviewRecord& ioRecord) {
@@ -158,19 +172,70 @@ class ReviewReader {
     ioRecord.computationCase = CaseOf(TextOf(inRule, Named::kTypeCalc));
   }
 
-  int ProductOf(Element inElement) {
+  // Products are looked for some at a time, since each is at another place in memory
+
+  struct AwaitedProduct {
     StoredText id = nullptr, alias = nullptr, part = nullptr;
+    ReviewSource::ProductKey key;
+    int position = 0;  // of the interference
+    std::size_t which = 0;
+    Element element = 0;
+  };
+
+  void Await(int inPosition, std::size_t inWhich, Element inElement) {
+    AwaitedProduct& awaited = awaited_[awaitedCount_++];
+    awaited = {};
     source_->ForEachAttribute(inElement, [&](Named inNamed, StoredText inText) {
-      if (inNamed == Named::kDescriptionId) id = inText;
-      if (inNamed == Named::kAlias) alias = inText;
-      if (inNamed == Named::kShapeName) part = inText;
+      if (inNamed == Named::kDescriptionId) awaited.id = inText;
+      if (inNamed == Named::kAlias) awaited.alias = inText;
+      if (inNamed == Named::kShapeName) awaited.part = inText;
     });
-    const ReviewSource::ProductKey key = ReviewSource::KeyOf(id, alias, part);
-    const int known = source_->Find(key, -1);
+    awaited.key = ReviewSource::KeyOf(awaited.id, awaited.alias, awaited.part);
+    awaited.position = inPosition;
+    awaited.which = inWhich;
+    awaited.element = inElement;
+    source_->Expect(awaited.key);
+  }
+
+  /// What is left to do of some interferences, while their memory is near.
+  void FinishBlock() {
+    FindProducts();
+    for (; finishedCount_ < result_.interferences.size(); ++finishedCount_) {
+      const ReviewRecord& record = result_.interferences[finishedCount_];
+      if (reading_.geometries) ReadGeometry(record);
+      if (!reading_.identities) continue;
+      result_.places.push_back(source_->PlaceOf(record));
+      result_.identities.push_back(identityHasher_.OfInterference(record, result_.places.back()));
+    }
+  }
+
+  void ReadGeometry(const ReviewRecord& inRecord) {
+    const WrittenGeometry& geometry =
+        result_.geometries.emplace_back(source_->GeometryOf(inRecord));
+    for (std::size_t i = 0; i < 2; ++i) {
+      if (inRecord.products[i] < 0) continue;
+      ReviewProduct& product = result_.products[static_cast<std::size_t>(inRecord.products[i])];
+      if (product.element == inRecord.productElements[i])
+        product.placement = geometry.placements[i];
+    }
+  }
+
+  void FindProducts() {
+    for (std::size_t i = 0; i < awaitedCount_; ++i) {
+      const AwaitedProduct& awaited = awaited_[i];
+      const auto position = static_cast<std::size_t>(awaited.position);
+      result_.interferences[position].products[awaited.which] = PositionOf(awaited);
+    }
+    awaitedCount_ = 0;
+  }
+
+  int PositionOf(const AwaitedProduct& inProduct) {
+    const int known = source_->Find(inProduct.key, -1);
     if (known >= 0) return known;
-    source_->Add(key);
-    result_.products.push_back(
-        {source_->Text(id), source_->Text(alias), source_->Text(part), inElement});
+    source_->Add(inProduct.key);
+    const std::string_view id = source_->Text(inProduct.id);
+    result_.products.push_back({id, source_->Text(inProduct.alias, inProduct.id, id),
+                                source_->Text(inProduct.part), inProduct.element, 0});
     return source_->ProductCount() - 1;
   }
 
@@ -225,8 +290,14 @@ class ReviewReader {
   }
 
   ClashDocument& document_;
-  std::shared_ptr<ReviewSource> source_;
+  ReviewReading reading_;
   ReviewedResult result_;
+  IdentityHasher identityHasher_;
+  std::size_t usualCount_;  // of interferences
+  std::shared_ptr<ReviewSource> source_;
+  std::array<AwaitedProduct, 16> awaited_;
+  std::size_t awaitedCount_ = 0;
+  std::size_t finishedCount_ = 0;  // of the interferences
   std::array<RecentWords, 256> recentWords_;
   std::unordered_map<std::string, Words> words_;
   std::unordered_map<std::string, int> cases_;
@@ -234,9 +305,9 @@ class ReviewReader {
 
 }  // namespace
 
-ReviewedResult ReadForReview(ClashDocument& ioDocument) {
+ReviewedResult ReadForReview(ClashDocument& ioDocument, const ReviewReading& inReading) {
   ioDocument.RequireInterferences();
-  return ReviewReader(ioDocument).Read();
+  return ReviewReader(ioDocument, inReading).Read();
 }
 
 }  // namespace ZORToolkit

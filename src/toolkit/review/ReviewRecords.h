@@ -20,8 +20,16 @@ typedef std::array<double, 3> Position;  ///< millimetres
 
 /// Between the names of a path of instances.
 inline constexpr std::string_view kPathSeparator = " --++-- ";
+/// @return where the last one begins, npos for none.
+inline std::size_t LastSeparator(std::string_view inPath) {
+  constexpr std::size_t kMiddle = 4;  // its last '+', which few names have
+  for (std::size_t at = inPath.rfind('+'); at != std::string_view::npos && at >= kMiddle;
+       at = inPath.rfind('+', at - 1))
+    if (inPath.substr(at - kMiddle).starts_with(kPathSeparator)) return at - kMiddle;
+  return std::string_view::npos;
+}
 inline std::string_view LastName(std::string_view inPath) {
-  const std::size_t at = inPath.rfind(kPathSeparator);
+  const std::size_t at = LastSeparator(inPath);
   return at == std::string_view::npos ? inPath : inPath.substr(at + kPathSeparator.size());
 }
 
@@ -39,7 +47,8 @@ typedef std::uint32_t ElementNumber;
 /// when alias and part are.
 struct ZOR_TOOLKIT_EXPORT ReviewProduct {
   std::string_view id, alias, part;
-  ElementNumber element = 0;  ///< the first in the result
+  ElementNumber element = 0;    ///< the first in the result
+  std::uint64_t placement = 0;  ///< as WrittenGeometry, where that was read
 
   /// What a person calls it: its alias, or its identifier when it has none.
   std::string_view Name() const { return alias.empty() ? id : alias; }
@@ -61,6 +70,20 @@ struct ReviewRecord {
   bool hasMoreGeometry = false;
 };
 
+/// What a document says of an interference's geometry, hashed: equal where it is written alike, and
+/// then the same; others may still be the same numbers.
+struct WrittenGeometry {
+  static constexpr std::uint64_t kNeverAlike = 0, kNoGeometry = 1, kNoPoints = 2;
+  std::array<std::uint64_t, 2> placements{};  ///< of its products
+  std::uint64_t points = kNeverAlike;
+};
+
+/// What is read along with the records, while their memory is at hand, for who will ask for all of
+/// it. What is not read is answered from the document.
+struct ReviewReading {
+  bool geometries = false, identities = false;
+};
+
 /// Identifiers and aliases of the products of both sides of a specification.
 struct SpecifiedPair {
   struct Names {
@@ -74,7 +97,11 @@ struct ZOR_TOOLKIT_EXPORT ReviewedResult {
   std::string name;  ///< of the document
   DocumentKind kind = DocumentKind::kClash;
   std::vector<ReviewProduct> products;
-  std::vector<ReviewRecord> interferences;    ///< in document order
+  std::vector<ReviewRecord> interferences;  ///< in document order
+  // Of each interference, where they were read
+  std::vector<WrittenGeometry> geometries;
+  std::vector<std::optional<Position>> places;
+  std::vector<std::uint64_t> identities;      ///< what their identifiers are made of
   std::vector<std::string> computationCases;  ///< of result sets and of violated rules, each once
   std::vector<SpecifiedPair> specifications;
   bool hasSpecification = false;   ///< there is an element for them, however empty
@@ -90,14 +117,11 @@ struct ZOR_TOOLKIT_EXPORT ReviewedResult {
   std::optional<Placement> PlacementOf(ElementNumber inProduct) const;
   /// The mean of its points.
   std::optional<Position> PlaceOf(const ReviewRecord& inRecord) const;
-  bool HasPoints(const ReviewRecord& inRecord) const;
   bool HasPlacement(ElementNumber inProduct) const;  ///< whole or not
-  /// Whether the placements of two products, or the points of two interferences, are written alike:
-  /// then they are the same; others may still be the same numbers.
-  bool HasPlacementOf(ElementNumber inProduct, const ReviewedResult& inOther,
-                      ElementNumber inOtherProduct) const;
-  bool HasPointsOf(const ReviewRecord& inRecord, const ReviewedResult& inOther,
-                   const ReviewRecord& inOtherRecord) const;
+  /// As WrittenGeometry.
+  std::uint64_t WrittenPlacement(ElementNumber inProduct) const;
+  std::uint64_t WrittenPlacementOf(int inProduct) const;  ///< by its position
+  WrittenGeometry GeometryOf(const ReviewRecord& inRecord) const;
   /// The position of a product of another result that is the same by identifier, -1 for none.
   /// @param inProduct a position in that result.
   /// @param inGuess a position in this one that is likely.
@@ -106,7 +130,8 @@ struct ZOR_TOOLKIT_EXPORT ReviewedResult {
 
 /// Reads all that reviewing needs, in one pass; numbers and placements wait until they are asked
 /// for. Raises Error for a document of a kind that has no interferences.
-ZOR_TOOLKIT_EXPORT ReviewedResult ReadForReview(ClashDocument& ioDocument);
+ZOR_TOOLKIT_EXPORT ReviewedResult ReadForReview(ClashDocument& ioDocument,
+                                                const ReviewReading& inReading = {});
 
 }  // namespace ZORToolkit
 

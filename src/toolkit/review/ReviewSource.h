@@ -3,6 +3,7 @@
 #define ZOR_TOOLKIT_REVIEW_REVIEW_SOURCE_H
 
 #include <array>
+#include <cstdlib>
 #include <memory>
 #include <string>
 #include <string_view>
@@ -59,10 +60,16 @@ typedef const DOM_Text* StoredText;
 
 inline bool IsSame(StoredText inA, StoredText inB) {
   if (inA == inB || inA == nullptr || inB == nullptr) return inA == inB;
-  return inA->head == inB->head && std::memcmp(inA + 1, inB + 1, inA->View().Bytes()) == 0;
+  return inA->head == inB->head && AreSameBytes(inA->Latin1(), inB->Latin1(), inA->View().Bytes());
 }
 inline std::uint64_t HashOf(StoredText inText) {
   return HashOfBytes(inText + 1, inText->View().Bytes()) ^ inText->head;
+}
+
+/// A step of a hash of numbers.
+inline std::uint64_t Mix(std::uint64_t inHash, std::uint64_t inPart) {
+  inHash = (inHash ^ inPart) * 0x9E3779B97F4A7C15u;
+  return inHash ^ (inHash >> 31);
 }
 
 /// The document's tree, the texts that it does not hold as UTF-8, and its products by what tells
@@ -71,7 +78,8 @@ class ReviewSource {
  public:
   typedef ZORDefault::TreeReader::Element Element;
 
-  explicit ReviewSource(const DOM_Node& inRoot);
+  /// @param inUsualProducts about how many products there are, for the room that they need.
+  ReviewSource(const DOM_Node& inRoot, std::size_t inUsualProducts);
 
   const ZORDefault::TreeReader& Tree() const { return tree_; }
   template <class Visit>  // Visit(Element, Named)
@@ -92,6 +100,10 @@ class ReviewSource {
   /// As UTF-8; valid as long as this.
   std::string_view Text(StoredText inText);
   std::string_view Keep(std::string_view inText);
+  /// As Text, of one that is likely to be said by another text that is kept already.
+  std::string_view Text(StoredText inText, StoredText inOther, std::string_view inKept) {
+    return inText != nullptr && ZORToolkit::IsSame(inText, inOther) ? inKept : Text(inText);
+  }
 
   // Products
   struct ProductKey {
@@ -103,19 +115,19 @@ class ReviewSource {
   /// @param inGuess a position that is looked at first.
   int Find(const ProductKey& inKey, int inGuess) const;
   void Add(const ProductKey& inKey);  ///< one that there is not, at the next position
+  /// Has the memory that Find will look at fetched meanwhile.
+  void Expect(const ProductKey& inKey) const {
+    __builtin_prefetch(&slots_[inKey.hash & (slotCount_ - 1)]);
+  }
   const ProductKey& Key(int inProduct) const {
     return products_[static_cast<std::size_t>(inProduct)];
   }
   int ProductCount() const { return static_cast<int>(products_.size()); }
 
   // Geometry
-  /// Whether the placements of two products, or the points of two interferences, are written alike:
-  /// then they are the same; others may still be the same numbers.
-  bool HasPlacementOf(Element inProduct, const ReviewSource& inOther, Element inOtherProduct) const;
-  bool HasPoints(const ReviewRecord& inRecord) const;
+  std::uint64_t WrittenPlacement(Element inProduct) const;
+  WrittenGeometry GeometryOf(const ReviewRecord& inRecord) const;
   bool HasPlacement(Element inProduct) const { return FirstNamed(inProduct, Named::kMatrix) != 0; }
-  bool HasPointsOf(const ReviewRecord& inRecord, const ReviewSource& inOther,
-                   const ReviewRecord& inOtherRecord) const;
   std::optional<Placement> PlacementOf(Element inProduct) const;
   /// Calls inVisit(Element) for each "GeometricAspect" of an interference.
   template <class Visit>
@@ -138,12 +150,8 @@ class ReviewSource {
   Element FirstNamed(Element inParent, Named inName) const {
     return NextNamed(tree_.FirstElement(inParent), inName);
   }
-  Element Following(Element inElement, Named inName) const {
-    return NextNamed(tree_.NextElement(inElement), inName);
-  }
-  bool HasAttributesOf(Element inElement, const ReviewSource& inOther,
-                       Element inOtherElement) const;
-  bool HasPartsOf(Element inElement, const ReviewSource& inOther, Element inOtherElement) const;
+  void AddAttributes(Element inElement, std::uint64_t& ioHash) const;
+  std::uint64_t WrittenPoints(const ReviewRecord& inRecord) const;
   /// Reads the three attributes from inFirst on and calls inOther(Named, StoredText) for the rest.
   /// @return whether all three are numbers.
   template <class Other>
@@ -151,6 +159,9 @@ class ReviewSource {
   bool ReadTriple(Element inElement, Named inFirst, double* outTriple) const;
   std::optional<Placement> PlacementIn(Element inMatrix) const;
   static bool IsSame(const ProductKey& inA, const ProductKey& inB);
+  std::string_view Encoded(const DOM_Text& inText);
+  char* RoomFor(std::size_t inBytes);
+  std::string_view Kept(std::size_t inBytes);  ///< what was written there
   std::size_t SlotOf(const ProductKey& inKey) const;
 
   ZORDefault::TreeReader tree_;
@@ -159,11 +170,21 @@ class ReviewSource {
   char* free_ = nullptr;
   std::size_t room_ = 0;
   std::vector<ProductKey> products_;
-  // Open addressing, a power of two; a position and one, and the upper half of the hash.
+  // Open addressing; a position and one, and the upper half of the hash.
   struct Slot {
-    std::uint32_t tag = 0, product = 0;
+    std::uint32_t tag, product;
   };
-  std::vector<Slot> slots_;
+  struct FreeSlots {
+    void operator()(Slot* inSlots) const { std::free(inSlots); }
+  };
+  void MakeSlots(std::size_t inCount);
+  std::unique_ptr<Slot[], FreeSlots> slots_;
+  std::size_t slotCount_ = 0;  // a power of two
+  struct RecentText {
+    StoredText stored = nullptr;
+    std::string_view text;
+  };
+  std::array<RecentText, 64> recentTexts_;  // those that were encoded, by their place
 };
 
 }  // namespace ZORToolkit

@@ -29,11 +29,14 @@ std::string BytesOfInput(const std::string& inPath) {
   return ZORFoundation::ReadWholeFile(inPath, options).bytes;
 }
 
-ReviewedFile::ReviewedFile(const std::string& inPath)
-    : ReviewedFile(inPath, BytesOfInput(inPath)) {}
+ReviewedFile::ReviewedFile(const std::string& inPath, const ReviewReading& inReading)
+    : ReviewedFile(inPath, BytesOfInput(inPath), inReading) {}
 
-ReviewedFile::ReviewedFile(const std::string& inPath, std::string inBytes)
-    : bytes(std::move(inBytes)), document(inPath, bytes), result(ReadForReview(document)) {}
+ReviewedFile::ReviewedFile(const std::string& inPath, std::string inBytes,
+                           const ReviewReading& inReading)
+    : bytes(std::move(inBytes)),
+      document(inPath, bytes),
+      result(ReadForReview(document, inReading)) {}
 
 int ReviewedFile::Apply(std::span<const ReviewEdit> inEdits) {
   const int changed = ApplyReviewEdits(document, result, inEdits);
@@ -55,7 +58,7 @@ CarryPlan CarryInto(ReviewedFile& ioNew, const ReviewedFile& inOld, const DiffOp
 }
 
 HRESULT SettleAsBefore(const ReviewedFile& inPrevious, const std::string& inPath) {
-  ReviewedFile now(inPath);
+  ReviewedFile now(inPath, {.geometries = true});
   CarryInto(now, inPrevious);
   return now.isChanged ? now.Write(inPath) : S_OK;
 }

@@ -15,7 +15,7 @@ ZOR_TOOLKIT_EXPORT std::string BytesOfInput(const std::string& inPath);
 /// A result with its bytes, which are written where nothing changes.
 struct ZOR_TOOLKIT_EXPORT ReviewedFile {
   /// @param inPath a file, or "-" for standard input. Raises Error or ZORFoundation::FileError.
-  explicit ReviewedFile(const std::string& inPath);
+  explicit ReviewedFile(const std::string& inPath, const ReviewReading& inReading = {});
 
   /// @return how many interferences changed.
   int Apply(std::span<const ReviewEdit> inEdits);
@@ -29,7 +29,7 @@ struct ZOR_TOOLKIT_EXPORT ReviewedFile {
   bool isChanged = false;
 
  private:
-  ReviewedFile(const std::string& inPath, std::string inBytes);
+  ReviewedFile(const std::string& inPath, std::string inBytes, const ReviewReading& inReading);
 };
 
 /// Takes the decisions of an old result over into a new one, see PlanCarry. One that was not computed

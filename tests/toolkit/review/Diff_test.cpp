@@ -194,6 +194,43 @@ TEST(ReviewRecords, WordsOfOtherLanguagesAreUnderstood) {
       result.PlacementOf(result.interferences[0].productElements[0]));  // with decimal commas
 }
 
+void CompareReadings(const TestResult& inOld, const TestResult& inNew) {
+  ClashDocument was("was.xml", inOld.Xml()), is("is.xml", inNew.Xml());
+  const ReviewReading all{.geometries = true, .identities = true};
+  const ReviewedResult oldPlain = ReadForReview(was), newPlain = ReadForReview(is);
+  const ReviewedResult oldAll = ReadForReview(was, all), newAll = ReadForReview(is, all);
+  const ResultDiff expected = Diff(oldPlain, newPlain), found = Diff(oldAll, newAll);
+  EXPECT_EQ(StableIds(newPlain), StableIds(newAll));
+  const std::vector<std::string> oldIds = StableIds(oldPlain),
+                                 ids = EntryIds(found, oldAll, newAll);
+  EXPECT_EQ(EntryIds(expected, oldPlain, newPlain), ids);
+  ASSERT_EQ(expected.entries.size(), found.entries.size());
+  for (std::size_t i = 0; i < ids.size(); ++i) {
+    const DiffEntry &one = expected.entries[i], &other = found.entries[i];
+    EXPECT_EQ(std::tie(one.itsClass, one.oldPosition, one.newPosition, one.reason),
+              std::tie(other.itsClass, other.oldPosition, other.newPosition, other.reason));
+    EXPECT_EQ(one.changes.size(), other.changes.size());
+    if (one.newPosition < 0) {
+      EXPECT_EQ(oldIds[static_cast<std::size_t>(one.oldPosition)], ids[i]);
+    }
+  }
+}
+
+TEST(ReviewRecords, WhatIsReadAlongIsWhatTheDocumentAnswers) {
+  std::mt19937 random(7);
+  TestResult was = RandomResult(random, 20, 120);
+  for (std::size_t i = 0; i < 20; ++i)  // of one pair, some without a place
+    was.interferences.push_back(was.interferences[i % 4]);
+  was.interferences.back().hasPlace = false;
+  TestResult is = was;
+  is.products[3].at[1] += 40;
+  std::swap(is.interferences[5].first, is.interferences[5].second);
+  is.interferences[6].value = "-77";
+  is.interferences.erase(is.interferences.begin() + 10, is.interferences.begin() + 30);
+  CompareReadings(was, is);
+  CompareReadings(is, was);
+}
+
 // Identifiers
 
 TEST(StableIds, DoNotDependOnOrderPlaceOfTheAssemblyOrWords) {

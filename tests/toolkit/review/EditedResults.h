@@ -79,7 +79,7 @@ struct TestResult {
 struct Loaded {
   explicit Loaded(const std::string& inXml)
       : document(std::make_unique<ZORToolkit::ClashDocument>("test.xml", inXml)),
-        result(ZORToolkit::ReadForReview(*document)) {}
+        result(ZORToolkit::ReadForReview(*document, {.geometries = true, .identities = true})) {}
   explicit Loaded(const TestResult& inResult) : Loaded(inResult.Xml()) {}
 
   std::unique_ptr<ZORToolkit::ClashDocument> document;

@@ -49,7 +49,7 @@ void WriteInterferences(ClashDocument& ioDocument, Output& ioOutput) {
   ioOutput.Write(",\n\"interferences\":");
   JsonArray array(ioOutput);
   if (ioDocument.HasInterferences()) {
-    const std::vector<std::string> ids = StableIds(ReadForReview(ioDocument));
+    const std::vector<std::string> ids = StableIds(ReadForReview(ioDocument, {.identities = true}));
     ForEachInterference(ioDocument, RecordPart::kAll, [&](const InterferenceRecord& inRecord) {
       array.Add(IdentifiedRecord{inRecord, ids[static_cast<std::size_t>(inRecord.index - 1)]});
     });

@@ -126,10 +126,10 @@ void PrintTable(const Compared& inCompared, bool inIsAll, Output& ioOutput) {
 
 /// @param inKeepsBytes for a page that gives its result back; a large result is read without them.
 struct DiffInput {
-  DiffInput(const std::string& inPath, bool inKeepsBytes)
+  DiffInput(const std::string& inPath, bool inKeepsBytes, const ReviewReading& inReading)
       : bytes(inKeepsBytes ? BytesOfInput(inPath) : std::string()),
         document(inKeepsBytes ? ClashDocument(inPath, bytes) : ClashDocument(inPath)),
-        result(ReadForReview(document)) {}
+        result(ReadForReview(document, inReading)) {}
 
   std::string bytes;
   ClashDocument document;
@@ -194,7 +194,9 @@ int Diff(const DiffVerbOptions& inOptions, Output& ioOutput) {
   inOptions.reading.Check();
   ChooseLanguage(inOptions.compare.language);
   const bool hasPage = !inOptions.page.empty();
-  DiffInput oldInput(inOptions.oldFile, hasPage), newInput(inOptions.newFile, hasPage);
+  const ReviewReading newReading{.geometries = true, .identities = inOptions.json || inOptions.csv};
+  DiffInput oldInput(inOptions.oldFile, hasPage, {.geometries = true});
+  DiffInput newInput(inOptions.newFile, hasPage, newReading);
   const ReviewedResult &oldResult = oldInput.result, &newResult = newInput.result;
   ZORIProduct_var root;
   if (!inOptions.model.empty()) {

@@ -96,11 +96,12 @@ int Gate(const GateOptions& inOptions, Output& ioOutput) {
   if (policy.NeedsBaseline() && inOptions.baseline.empty())
     throw UsageError("gate: the policy compares with an older result: --baseline is missing");
   ClashDocument document(inOptions.file);
-  const ReviewedResult result = ReadForReview(document);
+  const bool hasBaseline = !inOptions.baseline.empty();
+  const ReviewedResult result = ReadForReview(document, {.geometries = hasBaseline});
   std::optional<ResultDiff> diff;
-  if (!inOptions.baseline.empty()) {
+  if (hasBaseline) {
     ClashDocument older(inOptions.baseline);
-    diff = Diff(ReadForReview(older), result, compare);
+    diff = Diff(ReadForReview(older, {.geometries = true}), result, compare);
   }
   const ResultDiff* const baseline = diff ? &*diff : nullptr;
   const GateOutcome outcome = Judge(policy, result, baseline);

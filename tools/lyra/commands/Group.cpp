@@ -1,4 +1,5 @@
 // lyra group RESULT
+#include <algorithm>
 #include <memory>
 #include <sstream>
 
@@ -40,7 +41,8 @@ int Group(const GroupOptionsOfVerb& inOptions, Output& ioOutput) {
   const GroupOptions options = inOptions.grouping.Get();
   ChooseLanguage(inOptions.language);
   ClashDocument document(inOptions.file);
-  const ReviewedResult result = ReadForReview(document);
+  const bool hasPlaces = std::ranges::count(options.by, GroupBy::kPlace) > 0;
+  const ReviewedResult result = ReadForReview(document, {.identities = hasPlaces});
   const auto groups = GroupInterferences(result, options);
   if (inOptions.json) {
     std::vector<OrderedJson> rows;

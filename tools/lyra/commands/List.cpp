@@ -53,7 +53,7 @@ void ForEachAccepted(ClashDocument& ioDocument, const RecordFilter& inFilter, Re
 }
 
 void PrintJson(ClashDocument& ioDocument, const RecordFilter& inFilter, Output& ioOutput) {
-  const std::vector<std::string> ids = StableIds(ReadForReview(ioDocument));
+  const std::vector<std::string> ids = StableIds(ReadForReview(ioDocument, {.identities = true}));
   JsonArray array(ioOutput);
   ForEachAccepted(ioDocument, inFilter, RecordPart::kAll, [&](const InterferenceRecord& inRecord) {
     array.Add(IdentifiedRecord{inRecord, ids[static_cast<std::size_t>(inRecord.index - 1)]});

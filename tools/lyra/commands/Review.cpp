@@ -33,8 +33,9 @@ struct CarryOptions {
 int Carry(const CarryOptions& inOptions, Output& ioOutput) {
   const DiffOptions options = inOptions.compare.Get();
   ChooseLanguage(inOptions.compare.language);
-  const ReviewInput was(inOptions.oldFile);
-  ReviewInput is(inOptions.newFile);
+  const ReviewReading reading{.geometries = true};
+  const ReviewInput was(inOptions.oldFile, reading);
+  ReviewInput is(inOptions.newFile, reading);
   const CarryPlan plan = CarryInto(is, was, options, inOptions.keepChanged);
   WriteReviewed(is, inOptions.output, ioOutput);
   if (inOptions.verbose && was.bytes != is.bytes)  // else it was not computed again
@@ -159,9 +160,10 @@ int Apply(const ReviewOptions& inOptions, Output& ioOutput) {
 int Merge(const ReviewOptions& inOptions, Output& ioOutput) {
   RequireFiles(inOptions, 3, "BASE, MINE and THEIRS");
   const Preference preference = PreferenceOf(inOptions);
-  const ReviewInput base(inOptions.files[0]);
-  ReviewInput mine(inOptions.files[1]);
-  const ReviewInput theirs(inOptions.files[2]);
+  const ReviewReading reading{.geometries = true};
+  const ReviewInput base(inOptions.files[0], reading);
+  ReviewInput mine(inOptions.files[1], reading);
+  const ReviewInput theirs(inOptions.files[2], reading);
   const MergePlan plan = PlanMerge(base.result, mine.result, theirs.result, preference);
   mine.Apply(plan.edits);
   WriteReviewed(mine, inOptions.output, ioOutput);

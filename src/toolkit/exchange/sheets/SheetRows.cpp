@@ -53,7 +53,9 @@ std::string FittingCell(std::string_view inText) {
 }
 
 SheetRows::SheetRows(ClashDocument& ioResult)
-    : document_(ioResult), result_(ReadForReview(ioResult)), ids_(StableIds(result_)) {
+    : document_(ioResult),
+      result_(ReadForReview(ioResult, {.identities = true})),
+      ids_(StableIds(result_)) {
   if (result_.source == nullptr) return;
   const ZORDefault::TreeReader& tree = result_.source->Tree();
   for (ZORDefault::TreeReader::Name name = 0; name < tree.NameEnd(); ++name)
