@@ -143,6 +143,7 @@ TEST(GroupVerb, JsonIsNested) {
   }
   EXPECT_EQ(members, 32);
   EXPECT_EQ(RunCommand({"group", kAs1, "--by", "colour"}).code, 2);
+  EXPECT_EQ(RunCommand({"group", kAs1, "--by", ""}).code, 2);
 }
 
 TEST(ReviewVerb, SetDecidesOnAGroup) {

@@ -1,4 +1,6 @@
 #include <algorithm>
+#include <initializer_list>
+#include <limits>
 #include <nlohmann/json.hpp>
 
 #include "foundation/Hash.h"
@@ -11,7 +13,7 @@ namespace {
 constexpr char kFormat[] = "zorlyra-review/1";
 using Json = nlohmann::json;
 
-/// Reads the members of one object and refuses what it does not know.
+/// Reads the members of one object.
 class Members {
  public:
   Members(const Json& inObject, std::string inFile, std::string inPart = {})
@@ -37,7 +39,15 @@ class Members {
     const Json* const value = Find(inName);
     if (value == nullptr) return 0;
     if (!value->is_number_integer()) Fail(std::string("\"") + inName + "\" is no number");
+    constexpr int kMost = std::numeric_limits<int>::max();
+    const bool fits = value->is_number_unsigned() && value->get<std::uint64_t>() <= kMost;
+    if (!fits) Fail(std::string("\"") + inName + "\" is no index: " + value->dump());
     return value->get<int>();
+  }
+  /// A misspelt name would lose what stands behind it.
+  void RefuseAllBut(std::initializer_list<std::string_view> inNames) const {
+    for (const auto& [name, value] : object_.items())
+      if (std::ranges::find(inNames, name) == inNames.end()) Fail("unknown key \"" + name + "\"");
   }
 
  private:
@@ -48,7 +58,8 @@ class Members {
 std::optional<std::string> StatusIn(Members& ioMembers, const char* inName) {
   std::optional<std::string> text = ioMembers.Text(inName);
   if (!text || text->empty()) return std::nullopt;
-  std::string english = EnglishWord(*text);
+  const std::string given = *text;
+  std::string english = EnglishWord(given);
   if (english.empty()) {
     std::ranges::transform(*text, text->begin(), [](unsigned char inByte) {
       return inByte == '-' ? ' ' : static_cast<char>(std::tolower(inByte));
@@ -57,13 +68,14 @@ std::optional<std::string> StatusIn(Members& ioMembers, const char* inName) {
     english = EnglishWord(*text);
   }
   if (english.empty() || english == "Old" || english == "New")
-    ioMembers.Fail(std::string("\"") + inName + "\": unknown status \"" + *text +
+    ioMembers.Fail(std::string("\"") + inName + "\": unknown status \"" + given +
                    "\"; known are Relevant, Irrelevant, Not inspected");
   return english;
 }
 
 ReviewEntry EntryIn(const Json& inEntry, const std::string& inFile, std::size_t inNumber) {
   Members members(inEntry, inFile, "entry " + std::to_string(inNumber) + ": ");
+  members.RefuseAllBut({"id", "index", "baseStatus", "status", "comment", "who", "when"});
   ReviewEntry entry;
   entry.id = members.Text("id").value_or("");
   if (entry.id.empty()) members.Fail("has no \"id\"");

@@ -218,9 +218,15 @@ TEST(ReviewFile, WhatIsNoneIsRefusedWithItsPlace) {
   EXPECT_THAT(reasonFor("{}"), HasSubstr("no review file"));
   EXPECT_THAT(reasonFor("[]"), HasSubstr("no object"));
   EXPECT_THAT(reasonFor(R"({"format":"zorlyra-review/1"})"), HasSubstr("entries"));
-  EXPECT_THAT(reasonFor(ReviewOf("a", R"(,"status":"maybe")")), HasSubstr("unknown status"));
+  EXPECT_THAT(reasonFor(ReviewOf("a", R"(,"status":"maybe")")),
+              HasSubstr("unknown status \"maybe\""));
+  EXPECT_THAT(reasonFor(ReviewOf("a", R"(,"statsu":"Relevant")")),
+              HasSubstr("entry 1: unknown key \"statsu\""));
   EXPECT_THAT(reasonFor(ReviewOf("a", R"(,"index":"1")")), HasSubstr("\"index\" is no number"));
   EXPECT_THAT(reasonFor(ReviewOf("a", R"(,"index":1e999)")), HasSubstr("too large"));
+  for (const char* index : {"99999999999", "-1"})
+    EXPECT_THAT(reasonFor(ReviewOf("a", std::string(R"(,"index":)") + index)),
+                HasSubstr(std::string("\"index\" is no index: ") + index));
 }
 
 }  // namespace

@@ -78,6 +78,7 @@ GroupOptions GroupVerbOptions::Get() const {
   if (by.empty()) return options;
   options.by.clear();
   for (const std::string& list : by) {
+    if (list.empty()) ChosenWord("--by", list, kCriteria);
     std::istringstream words(list);
     for (std::string word; std::getline(words, word, ',');)
       options.by.push_back(static_cast<GroupBy>(ChosenWord("--by", word, kCriteria)));
