@@ -1,13 +1,14 @@
 // Windows makes UUIDs by chance and of the clock only: those of names are RFC 4122's, 4.3, on its SHA-1.
 #include <algorithm>
 
+#include "foundation/PluginFunction.h"
 #include "foundation/WindowsCalls.h"
 #include "toolkit/exchange/ExchangeLibrary.h"
 // After the types that it needs.
 #include <bcrypt.h>
 
-extern "C" __attribute__((visibility("default"))) void ZORNameUuid(
-    const ZORToolkit::Uuid& inNamespace, const std::string& inName, ZORToolkit::Uuid& outUuid) {
+ZOR_PLUGIN_FUNCTION void ZORNameUuid(const ZORToolkit::Uuid& inNamespace, const std::string& inName,
+                                     ZORToolkit::Uuid& outUuid) {
   std::vector<unsigned char> bytes(inNamespace.begin(), inNamespace.end());
   bytes.insert(bytes.end(), inName.begin(), inName.end());
   std::array<unsigned char, 20> hash{};

@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <memory>
 
+#include "foundation/PluginFunction.h"
 #include "toolkit/exchange/ExchangeLibrary.h"
 
 namespace ZORToolkit {
@@ -91,8 +92,8 @@ std::string ToPng(const Pixels& inPixels) {
 }  // namespace
 }  // namespace ZORToolkit
 
-extern "C" __attribute__((visibility("default"))) bool ZORPngFromPicture(
-    const std::string& inPicture, std::size_t inMaxSide, std::string& outPng) {
+ZOR_PLUGIN_FUNCTION bool ZORPngFromPicture(const std::string& inPicture, std::size_t inMaxSide,
+                                           std::string& outPng) {
   using namespace ZORToolkit;
   Pixels pixels = FromPng(inPicture);
   if (pixels.bytes.empty()) pixels = FromJpeg(inPicture);

@@ -7,6 +7,7 @@
 #include <exception>
 #include <memory>
 
+#include "foundation/PluginFunction.h"
 #include "toolkit/exchange/ExchangeLibrary.h"
 
 namespace ZORToolkit {
@@ -228,9 +229,7 @@ class ArchiveWriter {
 }  // namespace
 }  // namespace ZORToolkit
 
-#define ZOR_EXCHANGE_EXPORT extern "C" __attribute__((visibility("default")))
-
-ZOR_EXCHANGE_EXPORT bool ZORReadArchive(
+ZOR_PLUGIN_FUNCTION bool ZORReadArchive(
     const std::string& inPath, const std::function<bool(std::string_view)>& inWants,
     const std::function<void(ZORToolkit::ArchiveEntry&&)>& inVisit, std::string& outReason) {
   try {
@@ -242,7 +241,7 @@ ZOR_EXCHANGE_EXPORT bool ZORReadArchive(
   }
 }
 
-ZOR_EXCHANGE_EXPORT bool ZORWriteArchive(const std::string& inPath,
+ZOR_PLUGIN_FUNCTION bool ZORWriteArchive(const std::string& inPath,
                                          std::span<const ZORToolkit::NewArchiveEntry> inEntries,
                                          std::string& outReason) {
   try {

@@ -75,7 +75,8 @@ std::optional<std::string> StatusIn(Members& ioMembers, const char* inName) {
 
 ReviewEntry EntryIn(const Json& inEntry, const std::string& inFile, std::size_t inNumber) {
   Members members(inEntry, inFile, "entry " + std::to_string(inNumber) + ": ");
-  members.RefuseAllBut({"id", "index", "baseStatus", "status", "comment", "who", "when"});
+  members.RefuseAllBut(
+      {"id", "index", "baseStatus", "status", "comment", "who", "when", "assignee", "labels"});
   ReviewEntry entry;
   entry.id = members.Text("id").value_or("");
   if (entry.id.empty()) members.Fail("has no \"id\"");

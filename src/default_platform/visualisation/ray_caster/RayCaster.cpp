@@ -10,6 +10,7 @@
 #include "default_platform/visualisation/ray_caster/RenderScene.h"
 #include "default_platform/visualisation/ray_caster/Sampling.h"
 #include "foundation/ParallelFor.h"
+#include "foundation/PluginFunction.h"
 
 namespace ZORRayCaster {
 namespace {
@@ -163,7 +164,7 @@ bool RenderIds(const PictureRequest& inRequest,
 }  // namespace
 }  // namespace ZORRayCaster
 
-extern "C" __attribute__((visibility("default"))) const ZORDefault::RayCaster* ZORGetRayCaster() {
+ZOR_PLUGIN_FUNCTION const ZORDefault::RayCaster* ZORGetRayCaster() {
   static constexpr ZORDefault::RayCaster kRayCaster{&ZORRayCaster::Render, &ZORRayCaster::RenderIds,
                                                     &ZORRayCaster::EncodeJpeg,
                                                     &ZORRayCaster::EncodePng};

@@ -10,6 +10,7 @@
 #include <xercesc/util/XMLUniDefs.hpp>
 
 #include "default_platform/xml/full_scanner/DocumentEntity.h"
+#include "foundation/PluginFunction.h"
 #include "foundation/Utf8.h"
 #include "platform/xml/DOM_Node.h"
 
@@ -317,10 +318,8 @@ bool PrepareLibrary() {
 
 }  // namespace
 
-extern "C" __attribute__((visibility("default"))) bool ZORScanAnyDocument(ByteReader& ioReader,
-                                                                          const char* inName,
-                                                                          ScanSink& ioSink,
-                                                                          ScanFailure& outFailure) {
+ZOR_PLUGIN_FUNCTION bool ZORScanAnyDocument(ByteReader& ioReader, const char* inName,
+                                            ScanSink& ioSink, ScanFailure& outFailure) {
   try {
     if (!PrepareLibrary()) throw ScanFailure{0, 0, "the XML library cannot be prepared"};
     ScannerMemory memory;

@@ -6,6 +6,7 @@
 #include <memory>
 #include <utility>
 
+#include "foundation/PluginFunction.h"
 #include "toolkit/exchange/ExchangeLibrary.h"
 
 namespace ZORToolkit {
@@ -161,7 +162,7 @@ class XlsxWriter final : public SpreadsheetWriter {
 }  // namespace
 }  // namespace ZORToolkit
 
-extern "C" __attribute__((visibility("default"))) ZORToolkit::SpreadsheetWriter* ZORNewSpreadsheet(
-    const std::string& inPath, std::int64_t inTime) {
+ZOR_PLUGIN_FUNCTION ZORToolkit::SpreadsheetWriter* ZORNewSpreadsheet(const std::string& inPath,
+                                                                     std::int64_t inTime) {
   return new ZORToolkit::XlsxWriter(inPath, inTime);
 }

@@ -16,6 +16,8 @@
 #include <string_view>
 #include <utility>
 
+#include "foundation/PluginFunction.h"
+
 namespace ZORToolkit {
 namespace {
 
@@ -228,7 +230,7 @@ bool MakePage(const PageRequest& inRequest, Page& outPage) {
 
 }  // namespace ZORToolkit
 
-extern "C" __attribute__((visibility("default"))) const ZORToolkit::PageLibrary* ZORPageLibrary() {
+ZOR_PLUGIN_FUNCTION const ZORToolkit::PageLibrary* ZORPageLibrary() {
   using namespace ZORToolkit;
   static constexpr PageLibrary kLibrary = {
       MakePage,   kPageStyle, kPageScript, kReportStyleSheet, kReportType,      Sha256,      Base64,
