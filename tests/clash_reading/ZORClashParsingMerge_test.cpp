@@ -8,7 +8,13 @@
 #include "ZORLyraXMLServices.h"
 #include "platform/xml/DOM_DOMException.h"
 #include "platform/xml/ZORXMLParser.h"
+#include "support/LoadedDocument.h"
 #include "support/PlatformFolder.h"
+#include "support/XMLText.h"
+
+using support::Loaded;
+using support::Parsed;
+using support::WrittenText;
 
 namespace fs = std::filesystem;
 
@@ -23,26 +29,6 @@ const std::string kSpecificationsLine =
 const std::string kCountLine = "About to set Number of Interference in XML\n";
 const std::string kAllLines =
     kRootLine + kProductsLine + kInterferencesLine + kSpecificationsLine + kCountLine;
-
-DOM_Document Parsed(std::string inXml) {
-  DOM_Document document;
-  ZORUnicodeString kind;
-  ZORClashParsing(inXml.data(), static_cast<int>(inXml.size())).LoadSequence(document, kind);
-  return document;
-}
-
-DOM_Document Loaded(std::string inPath) {
-  DOM_Document document;
-  ZORUnicodeString kind;
-  EXPECT_EQ(ZORClashParsing(inPath.data()).LoadSequence(document, kind), S_OK);
-  return document;
-}
-
-std::string Serialised(const DOM_Node& inNode) {
-  DOMString text;
-  EXPECT_EQ(ZORXMLParser::WriteXML(inNode, "UTF-8", text), S_OK);
-  return text.DOMStringToZORUnicodeString().ConvertToChar();
-}
 
 /// Merges on a reader that has loaded nothing.
 struct Merge {
@@ -61,20 +47,15 @@ struct Merge {
 std::string Merged(const std::string& inFirst, const std::string& inSecond) {
   DOM_Document first = Parsed(inFirst);
   DOM_Document second = Parsed(inSecond);
-  const std::string secondBefore = Serialised(second);
+  const std::string secondBefore = WrittenText(second);
   EXPECT_EQ(Merge(first, second).result, S_OK);
-  EXPECT_EQ(Serialised(second), secondBefore);
-  return Serialised(first);
+  EXPECT_EQ(WrittenText(second), secondBefore);
+  return WrittenText(first);
 }
 
 /// The code of what a merge raises; 0 when it raises nothing.
 int Raised(DOM_Document& ioFirst, DOM_Document& inSecond) {
-  try {
-    Merge(ioFirst, inSecond);
-    return 0;
-  } catch (const DOM_DOMException& error) {
-    return error.code;
-  }
+  return support::CodeOf([&] { Merge(ioFirst, inSecond); });
 }
 
 /// How many interferences a document has and declares.
@@ -121,14 +102,14 @@ TEST(Merge, SecondNullLeavesTheFirstAndTracesFourLines) {
   const Merge merge(first, second);
   EXPECT_EQ(merge.result, S_OK);
   EXPECT_EQ(merge.trace, kRootLine + kProductsLine + kInterferencesLine + kNothingLine);
-  EXPECT_EQ(Serialised(first), text);
+  EXPECT_EQ(WrittenText(first), text);
 }
 
 TEST(Merge, SecondNullLeavesAFirstThatCannotTakeInterferences) {
   DOM_Document first = Parsed("<ClashElement/>");
   DOM_Document second;
   EXPECT_EQ(Merge(first, second).result, S_OK);
-  EXPECT_EQ(Serialised(first), "<ClashElement/>");
+  EXPECT_EQ(WrittenText(first), "<ClashElement/>");
 }
 
 TEST(Merge, OrdinaryDocumentsTraceFiveLinesBehindTheCallersText) {
@@ -234,7 +215,7 @@ TEST(Merge, SecondWithoutRootAddsNothing) {
   const Merge merge(first, second);
   EXPECT_EQ(merge.result, S_OK);
   EXPECT_EQ(merge.trace, kAllLines);
-  EXPECT_EQ(Serialised(first), "<ClashElement><ClashResult NbInterf=\"2\"/></ClashElement>");
+  EXPECT_EQ(WrittenText(first), "<ClashElement><ClashResult NbInterf=\"2\"/></ClashElement>");
 }
 
 TEST(Merge, MissingCountAttributeIsNotAdded) {
@@ -302,18 +283,18 @@ TEST(Merge, TextAsLastChildRaisesTheDocumentsErrorWithoutAResultSet) {
   DOM_Document first = Parsed(text);
   DOM_Document second = Parsed(
       "<ClashElement><ClashResult NbInterf=\"1\"><Interference/></ClashResult></ClashElement>");
-  const std::string secondBefore = Serialised(second);
+  const std::string secondBefore = WrittenText(second);
   EXPECT_EQ(Raised(first, second), DOM_DOMException::HIERARCHY_REQUEST_ERR);
-  EXPECT_EQ(Serialised(first), text);
-  EXPECT_EQ(Serialised(second), secondBefore);
+  EXPECT_EQ(WrittenText(first), text);
+  EXPECT_EQ(WrittenText(second), secondBefore);
 
   // Both can be merged with others afterwards.
   DOM_Document third = Parsed("<ClashElement><ClashResult NbInterf=\"0\"/></ClashElement>");
   EXPECT_EQ(Merge(third, second).result, S_OK);
-  EXPECT_EQ(Serialised(third), secondBefore);
+  EXPECT_EQ(WrittenText(third), secondBefore);
   first.getDocumentElement().appendChild(first.createElement("ClashResult"));
   EXPECT_EQ(Merge(first, second).result, S_OK);
-  EXPECT_EQ(Serialised(first),
+  EXPECT_EQ(WrittenText(first),
             "<ClashElement><Date/>text<ClashResult><Interference/></ClashResult></ClashElement>");
 }
 
@@ -335,12 +316,12 @@ TEST(Merge, FirstWhoseRootIsEmptyBecomesTheSecond) {
   DOM_Document first = Parsed("<ClashElement/>");
   DOM_Document second = Parsed(
       "<ClashElement><ClashResult NbInterf=\"1\"><Interference/></ClashResult></ClashElement>");
-  const std::string secondBefore = Serialised(second);
+  const std::string secondBefore = WrittenText(second);
   const Merge merge(first, second);
   EXPECT_EQ(merge.result, S_OK);
   EXPECT_EQ(merge.trace, kAllLines);
   EXPECT_TRUE(first == second);
-  EXPECT_EQ(Serialised(second), secondBefore);
+  EXPECT_EQ(WrittenText(second), secondBefore);
 }
 
 // The root found before is still that of the document that the first handle referred to, and a node
@@ -350,11 +331,11 @@ TEST(Merge, FirstWhoseRootIsEmptyRaisesTheDocumentsErrorForSpecifications) {
   const DOM_Document firstBefore = first;
   DOM_Document second =
       Parsed("<ClashElement><ProductsInSpec><Specification/></ProductsInSpec></ClashElement>");
-  const std::string secondBefore = Serialised(second);
+  const std::string secondBefore = WrittenText(second);
   EXPECT_EQ(Raised(first, second), DOM_DOMException::WRONG_DOCUMENT_ERR);
   EXPECT_TRUE(first == second);
-  EXPECT_EQ(Serialised(second), secondBefore);
-  EXPECT_EQ(Serialised(firstBefore), "<ClashElement/>");
+  EXPECT_EQ(WrittenText(second), secondBefore);
+  EXPECT_EQ(WrittenText(firstBefore), "<ClashElement/>");
 }
 
 TEST(Merge, FirstWithoutRootBecomesTheSecond) {
@@ -362,12 +343,12 @@ TEST(Merge, FirstWithoutRootBecomesTheSecond) {
   DOM_Document second = Parsed(
       "<ClashElement><ClashResult NbInterf=\"1\"><Interference/></ClashResult><ProductsInSpec>"
       "<Specification/></ProductsInSpec></ClashElement>");
-  const std::string secondBefore = Serialised(second);
+  const std::string secondBefore = WrittenText(second);
   const Merge merge(first, second);
   EXPECT_EQ(merge.result, S_OK);
   EXPECT_EQ(merge.trace, kAllLines);
   EXPECT_TRUE(first == second);
-  EXPECT_EQ(Serialised(second), secondBefore);
+  EXPECT_EQ(WrittenText(second), secondBefore);
 }
 
 TEST(Merge, DocumentWithItselfDoublesIt) {
@@ -377,7 +358,7 @@ TEST(Merge, DocumentWithItselfDoublesIt) {
       "</ClashElement>");
   DOM_Document same = document;
   EXPECT_EQ(Merge(document, same).result, S_OK);
-  EXPECT_EQ(Serialised(document),
+  EXPECT_EQ(WrittenText(document),
             "<ClashElement><ClashResult NbInterf=\"4\"><Interference Name=\"1\"/> "
             "<Interference Name=\"2\"/><Interference Name=\"1\"/><Interference Name=\"2\"/>"
             "</ClashResult><ProductsInSpec><Specification/><Specification/></ProductsInSpec>"
@@ -433,9 +414,9 @@ TEST(Merge, SamplesReloadWithTheSumOfTheirInterferences) {
     DOM_Document second = Loaded(other);
     const Counts firstCounts(first);
     const Counts secondCounts(second);
-    const std::string secondBefore = Serialised(second);
+    const std::string secondBefore = WrittenText(second);
     ASSERT_EQ(Merge(first, second).result, S_OK);
-    EXPECT_EQ(Serialised(second), secondBefore);
+    EXPECT_EQ(WrittenText(second), secondBefore);
 
     const std::string path = folder.FilePath("merged.clash.xml");
     ASSERT_EQ(writer.DumpDocument(first.getDocumentElement(), path.c_str(), "", "", "", 1, 1),
@@ -444,6 +425,6 @@ TEST(Merge, SamplesReloadWithTheSumOfTheirInterferences) {
     EXPECT_GT(firstCounts.present, 0) << one;
     EXPECT_EQ(Counts(merged).present, firstCounts.present + secondCounts.present);
     EXPECT_EQ(Counts(merged).declared, std::to_string(Counts(merged).present));
-    EXPECT_EQ(Serialised(merged.getDocumentElement()), Serialised(first.getDocumentElement()));
+    EXPECT_EQ(WrittenText(merged.getDocumentElement()), WrittenText(first.getDocumentElement()));
   }
 }

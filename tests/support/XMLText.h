@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "platform/xml/DOMParser.h"
+#include "platform/xml/DOM_DOMException.h"
 #include "platform/xml/ZORXMLParseError.h"
 #include "platform/xml/ZORXMLParser.h"
 
@@ -37,6 +38,28 @@ inline std::string ParseErrorOf(std::string_view inText) {
     return "";
   } catch (const ZORXMLParseError& error) {
     return error.what();
+  }
+}
+
+/// The same for a file.
+inline std::string FileErrorOf(const std::string& inPath) {
+  DOMParser parser;
+  try {
+    parser.parse(inPath.c_str());
+    return "";
+  } catch (const ZORXMLParseError& error) {
+    return error.what();
+  }
+}
+
+/// The code of the exception with which a change of a tree is refused, 0 when it is done.
+template <typename Change>
+int CodeOf(Change inChange) {
+  try {
+    inChange();
+    return 0;
+  } catch (const DOM_DOMException& error) {
+    return error.code;
   }
 }
 

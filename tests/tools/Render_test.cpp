@@ -1,14 +1,16 @@
 // Pictures of CAD models from a shell.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-#include <png.h>
 
-#include <cstring>
+#include <array>
 #include <filesystem>
 #include <vector>
 
+#include "support/PngPicture.h"
 #include "tools/Command.h"
 
+using support::Picture;
+using support::ReadPng;
 using testing::HasSubstr;
 using testing::MatchesRegex;
 
@@ -18,29 +20,8 @@ namespace {
 
 const std::string kModel = "samples/as1-oc-214.stp";
 
-struct Picture {
-  int width = 0, height = 0;
-  std::vector<unsigned char> pixels;
-
-  bool IsWhite(int inColumn, int inRow) const {
-    const unsigned char* pixel = &pixels[3 * static_cast<std::size_t>(inRow * width + inColumn)];
-    return pixel[0] == 255 && pixel[1] == 255 && pixel[2] == 255;
-  }
-};
-
-/// A picture without pixels for what is no PNG file.
-Picture ReadPng(const std::string& inPath) {
-  Picture picture;
-  png_image image;
-  std::memset(&image, 0, sizeof image);
-  image.version = PNG_IMAGE_VERSION;
-  if (!png_image_begin_read_from_file(&image, inPath.c_str())) return picture;
-  image.format = PNG_FORMAT_RGB;
-  picture.width = static_cast<int>(image.width);
-  picture.height = static_cast<int>(image.height);
-  picture.pixels.resize(PNG_IMAGE_SIZE(image));
-  png_image_finish_read(&image, nullptr, picture.pixels.data(), 0, nullptr);
-  return picture;
+bool IsWhite(const Picture& inPicture, int inColumn, int inRow) {
+  return inPicture.At(inColumn, inRow) == std::array<int, 3>{255, 255, 255};
 }
 
 /// The part of a picture that is not white.
@@ -55,7 +36,7 @@ Extent ExtentOf(const Picture& inPicture) {
   Extent extent;
   for (int row = 0; row < inPicture.height; ++row) {
     for (int column = 0; column < inPicture.width; ++column) {
-      if (inPicture.IsWhite(column, row)) continue;
+      if (IsWhite(inPicture, column, row)) continue;
       if (extent.bottom < 0) extent.topColumn = column;
       extent.left = std::min(extent.left, column);
       extent.right = std::max(extent.right, column);
@@ -165,8 +146,8 @@ TEST_F(Render, SizeIsThatOfThePicture) {
 TEST_F(Render, BackgroundIsWhiteUnlessItIsKept) {
   BytesOf("white.png", {"--size", "60x40"});
   BytesOf("kept.png", {"--size", "60x40", "--keep-background"});
-  EXPECT_TRUE(ReadPng(directory.Path("white.png")).IsWhite(0, 0));
-  EXPECT_FALSE(ReadPng(directory.Path("kept.png")).IsWhite(0, 0));
+  EXPECT_TRUE(IsWhite(ReadPng(directory.Path("white.png")), 0, 0));
+  EXPECT_FALSE(IsWhite(ReadPng(directory.Path("kept.png")), 0, 0));
   EXPECT_NE(BytesOf("white.jpg"), BytesOf("kept.jpg", {"--keep-background"}));
 }
 

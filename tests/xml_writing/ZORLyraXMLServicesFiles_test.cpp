@@ -7,7 +7,13 @@
 #include "platform/system/ZORFile.h"
 #include "platform/xml/DOM_Document.h"
 #include "platform/xml/ZORXMLParser.h"
+#include "support/LoadedDocument.h"
 #include "support/PlatformFolder.h"
+#include "support/XMLText.h"
+
+using support::Loaded;
+using support::Parsed;
+using support::WrittenText;
 
 namespace fs = std::filesystem;
 
@@ -16,26 +22,6 @@ const std::string kDeclaration = "<?xml version=\"1.0\" encoding=\"UTF-8\"?>";
 const std::string kFederator = "<FederatorClashElement><Elements/></FederatorClashElement>";
 const std::string kStyleSheet = "<?xml-stylesheet type=\"text/xsl\" href=\"s.xsl\"?>";
 const std::string kDocumentType = "<!DOCTYPE T SYSTEM \"d.dtd\">";
-
-std::string Serialised(const DOM_Node& inNode) {
-  DOMString text;
-  EXPECT_EQ(ZORXMLParser::WriteXML(inNode, "UTF-8", text), S_OK);
-  return text.DOMStringToZORUnicodeString().ConvertToChar();
-}
-
-DOM_Document Parsed(std::string inXml) {
-  DOM_Document document;
-  ZORUnicodeString kind;
-  ZORClashParsing(inXml.data(), static_cast<int>(inXml.size())).LoadSequence(document, kind);
-  return document;
-}
-
-DOM_Document Loaded(std::string inPath) {
-  DOM_Document document;
-  ZORUnicodeString kind;
-  EXPECT_EQ(ZORClashParsing(inPath.data()).LoadSequence(document, kind), S_OK);
-  return document;
-}
 
 class Files : public testing::Test {
  protected:
@@ -249,13 +235,13 @@ TEST_F(TreeDump, OfALongTextIsTheSerialisedNode) {
     std::string text = "<a k='" + shift;
     for (int i = 0; i < 100'000; ++i) text += "\xF0\x9F\x98\x80\xC3\xA9z";
     const DOM_Document document = Parsed(text + "'/>");
-    EXPECT_TRUE(DumpText(document, "", "", 0) == Serialised(document)) << shift;
+    EXPECT_TRUE(DumpText(document, "", "", 0) == WrittenText(document)) << shift;
   }
 }
 
 TEST_F(TreeDump, WithoutAnythingIsTheSerialisedNode) {
   const DOM_Document document = Parsed("<A x='1'><B/>t\u00e9xt</A>");
-  EXPECT_EQ(DumpText(document, "", "", 0), Serialised(document));
+  EXPECT_EQ(DumpText(document, "", "", 0), WrittenText(document));
 }
 
 TEST_F(TreeDump, WithAnyPrologueFlagButOneHasNoDeclaration) {
@@ -352,8 +338,8 @@ TEST_F(TreeDump, OfEverySampleReadsBackAsTheSameTree) {
     ASSERT_EQ(
         writer_.DumpDocument(document.getDocumentElement(), path_.c_str(), "", "s.xsl", "", 1, 0),
         S_OK);
-    EXPECT_EQ(Serialised(Loaded(path_).getDocumentElement()),
-              Serialised(document.getDocumentElement()))
+    EXPECT_EQ(WrittenText(Loaded(path_).getDocumentElement()),
+              WrittenText(document.getDocumentElement()))
         << entry.path();
   }
   EXPECT_EQ(samples, 6);

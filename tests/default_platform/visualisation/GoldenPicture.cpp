@@ -1,16 +1,19 @@
 #include "default_platform/visualisation/GoldenPicture.h"
 
 #include <gtest/gtest.h>
-#include <png.h>
 
 #include <algorithm>
 #include <cstdlib>
 #include <filesystem>
 
+#include "support/PngPicture.h"
+
 namespace fs = std::filesystem;
 
 namespace pictures {
 namespace {
+
+using support::ReadPng;
 
 // On the processor that renewed them the pictures are the same to the byte. Another one may round
 // otherwise: a pixel on a border may then fall to the other side.
@@ -19,19 +22,6 @@ constexpr double kDifferingShare = 0.001;
 
 fs::path GoldenPath(const std::string& inName) {
   return fs::path(ZOR_SOURCE_DIR) / "tests/golden/pictures" / (inName + ".png");
-}
-
-Picture ReadPng(const fs::path& inPath) {
-  png_image image{};
-  image.version = PNG_IMAGE_VERSION;
-  Picture picture;
-  if (!png_image_begin_read_from_file(&image, inPath.c_str())) return picture;
-  image.format = PNG_FORMAT_RGB;
-  picture.width = static_cast<int>(image.width);
-  picture.height = static_cast<int>(image.height);
-  picture.pixels.resize(PNG_IMAGE_SIZE(image));
-  png_image_finish_read(&image, nullptr, picture.pixels.data(), 0, nullptr);
-  return picture;
 }
 
 void WritePng(const fs::path& inPath, const Picture& inPicture) {

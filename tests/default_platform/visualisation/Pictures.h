@@ -2,26 +2,14 @@
 #ifndef ZOR_TESTS_DEFAULT_PLATFORM_VISUALISATION_PICTURES_H
 #define ZOR_TESTS_DEFAULT_PLATFORM_VISUALISATION_PICTURES_H
 
-#include <array>
-#include <cstdint>
 #include <functional>
-#include <vector>
 
 #include "platform/visualisation/ZORPrint3DRepImage.h"
+#include "support/Picture.h"
 
 namespace pictures {
 
-struct Picture {
-  int width = 0;
-  int height = 0;
-  std::vector<std::uint8_t> pixels;  // empty when nothing was drawn
-
-  std::array<int, 3> At(int inX, int inY) const {
-    const std::size_t place = 3 * (static_cast<std::size_t>(inY) * static_cast<std::size_t>(width) +
-                                   static_cast<std::size_t>(inX));
-    return {pixels[place], pixels[place + 1], pixels[place + 2]};
-  }
-};
+using support::Picture;
 
 typedef std::function<void(ZORPrint3DRepImage&)> SetUp;
 

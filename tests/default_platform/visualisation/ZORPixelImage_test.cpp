@@ -3,7 +3,6 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <jpeglib.h>
-#include <png.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -13,6 +12,7 @@
 #include <string>
 
 #include "platform/system/ZORFile.h"
+#include "support/PngPicture.h"
 
 namespace fs = std::filesystem;
 
@@ -58,16 +58,6 @@ std::vector<std::uint8_t> SomePixels() {
   return pixels;
 }
 
-std::vector<std::uint8_t> DecodedPng(const std::string& inPath) {
-  png_image image{};
-  image.version = PNG_IMAGE_VERSION;
-  if (!png_image_begin_read_from_file(&image, inPath.c_str())) return {};
-  image.format = PNG_FORMAT_RGB;
-  std::vector<std::uint8_t> pixels(PNG_IMAGE_SIZE(image));
-  png_image_finish_read(&image, nullptr, pixels.data(), 0, nullptr);
-  return pixels;
-}
-
 std::vector<std::uint8_t> DecodedJpeg(const std::string& inPath) {
   jpeg_decompress_struct state;
   jpeg_error_mgr errors;
@@ -93,7 +83,7 @@ ZORPixelImage Sample() { return ZORPixelImage(kWidth, kHeight, SomePixels()); }
 TEST_F(ZORPixelImageFiles, PngHoldsTheVeryPixels) {
   const ZORPixelImage image(kWidth, kHeight, SomePixels());
   EXPECT_EQ(image.Write("PNG", PathOf("a.png").c_str()), S_OK);
-  EXPECT_EQ(DecodedPng(PathOf("a.png")), SomePixels());
+  EXPECT_EQ(support::ReadPng(PathOf("a.png")).pixels, SomePixels());
 }
 
 TEST_F(ZORPixelImageFiles, JpegHoldsNearlyThePixels) {
@@ -131,7 +121,7 @@ TEST_F(ZORPixelImageFiles, OldFileIsReplacedAndNothingElseIsLeft) {
   WriteText("a.png", "old");
   const ZORPixelImage image(kWidth, kHeight, SomePixels());
   EXPECT_EQ(image.Write("PNG", PathOf("a.png").c_str()), S_OK);
-  EXPECT_EQ(DecodedPng(PathOf("a.png")), SomePixels());
+  EXPECT_EQ(support::ReadPng(PathOf("a.png")).pixels, SomePixels());
   EXPECT_THAT(Files(), testing::ElementsAre("a.png"));
 }
 
@@ -154,14 +144,14 @@ TEST_F(ZORPixelImageFiles, LinkStaysAndItsTargetIsReplaced) {
   const ZORPixelImage image(kWidth, kHeight, SomePixels());
   EXPECT_EQ(image.Write("PNG", PathOf("link.png").c_str()), S_OK);
   EXPECT_TRUE(fs::is_symlink(PathOf("link.png")));
-  EXPECT_EQ(DecodedPng(PathOf("target.png")), SomePixels());
+  EXPECT_EQ(support::ReadPng(PathOf("target.png")).pixels, SomePixels());
 }
 
 TEST_F(ZORPixelImageFiles, DanglingLinkStaysAndLeadsToThePicture) {
   fs::create_symlink("real.png", PathOf("link.png"));
   EXPECT_EQ(Sample().Write("PNG", PathOf("link.png").c_str()), S_OK);
   EXPECT_TRUE(fs::is_symlink(PathOf("link.png")));
-  EXPECT_EQ(DecodedPng(PathOf("real.png")), SomePixels());
+  EXPECT_EQ(support::ReadPng(PathOf("real.png")).pixels, SomePixels());
 }
 
 TEST_F(ZORPixelImageFiles, LinkInACircleIsRefusedAndStays) {
@@ -198,7 +188,7 @@ TEST_F(ZORPixelImageFiles, FoldersInAnyLanguageAreFound) {
   fs::create_directory(PathOf("\xC3\xA9\xE6\x97\xA5"));
   const ZORPixelImage image(kWidth, kHeight, SomePixels());
   EXPECT_EQ(image.Write("PNG", PathOf("\xC3\xA9\xE6\x97\xA5/a.png").c_str()), S_OK);
-  EXPECT_EQ(DecodedPng(PathOf("\xC3\xA9\xE6\x97\xA5/a.png")), SomePixels());
+  EXPECT_EQ(support::ReadPng(PathOf("\xC3\xA9\xE6\x97\xA5/a.png")).pixels, SomePixels());
 }
 
 TEST_F(ZORPixelImageFiles, NameThatIsNoTextIsKept) {

@@ -6,26 +6,13 @@
 #include "support/PlatformFolder.h"
 #include "support/XMLText.h"
 
+using support::FileErrorOf;
 using support::Narrow;
 using support::ParseErrorOf;
 using support::ParseText;
 using support::RootOf;
 using support::TemporaryFolder;
 using support::WrittenText;
-
-namespace {
-
-std::string FileErrorOf(const std::string& inPath) {
-  DOMParser parser;
-  try {
-    parser.parse(inPath.c_str());
-    return "";
-  } catch (const ZORXMLParseError& error) {
-    return error.what();
-  }
-}
-
-}  // namespace
 
 TEST(DOMParser, HasNoDocumentBeforeItParses) { EXPECT_TRUE(DOMParser().getDocument().isNull()); }
 

@@ -2,24 +2,12 @@
 
 #include <gtest/gtest.h>
 
-#include "platform/xml/DOM_DOMException.h"
 #include "support/TreeEquality.h"
 
+using support::CodeOf;
 using support::Narrow;
 using support::ParseText;
 using support::WrittenText;
-
-namespace {
-template <typename Change>
-int CodeOf(Change inChange) {
-  try {
-    inChange();
-    return 0;
-  } catch (const DOM_DOMException& error) {
-    return error.code;
-  }
-}
-}  // namespace
 
 TEST(DOM_Document, CreateDocumentHasNoRoot) {
   const DOM_Document document = DOM_Document::createDocument();

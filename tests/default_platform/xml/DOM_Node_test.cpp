@@ -2,29 +2,15 @@
 
 #include <gtest/gtest.h>
 
-#include "platform/xml/DOM_DOMException.h"
 #include "platform/xml/DOM_NamedNodeMap.h"
 #include "platform/xml/DOM_NodeList.h"
 #include "support/TreeEquality.h"
 
+using support::CodeOf;
 using support::Narrow;
 using support::ParseText;
 using support::RootOf;
 using support::WrittenText;
-
-namespace {
-
-template <typename Change>
-int CodeOf(Change inChange) {
-  try {
-    inChange();
-    return 0;
-  } catch (const DOM_DOMException& error) {
-    return error.code;
-  }
-}
-
-}  // namespace
 
 // ---- null handles
 

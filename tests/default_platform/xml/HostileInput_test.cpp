@@ -17,6 +17,7 @@
 #include "support/PlatformFolder.h"
 #include "support/TreeEquality.h"
 
+using support::FileErrorOf;
 using support::ParseErrorOf;
 using support::ParseText;
 using support::RootOf;
@@ -30,16 +31,6 @@ std::string Repeated(const std::string& inText, std::size_t inCount) {
   text.reserve(inText.size() * inCount);
   for (std::size_t i = 0; i < inCount; ++i) text += inText;
   return text;
-}
-
-std::string FileErrorOf(const std::string& inPath) {
-  DOMParser parser;
-  try {
-    parser.parse(inPath.c_str());
-    return "";
-  } catch (const ZORXMLParseError& error) {
-    return error.what();
-  }
 }
 
 #ifdef _WIN32
