@@ -1,5 +1,6 @@
 #include "lyra/RunLyra.h"
 
+#include <algorithm>
 #include <cstdio>
 #include <cstdlib>
 #include <exception>
@@ -7,6 +8,7 @@
 #include <string>
 #include <vector>
 
+#include "foundation/Process.h"
 #include "foundation/TerminationSignals.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/CommandLine.h"
@@ -55,11 +57,19 @@ int Act(const std::vector<DeclaredVerb>& inVerbs, Output& ioOutput) {
   return kWrongUsage;
 }
 
+/// What follows the command's name, the last word first, as the parser takes them.
+std::vector<std::string> WordsForParser(int inCount, char** inArguments) {
+  std::vector<std::string> words = ZORFoundation::WordsOfCommandLine(inCount, inArguments);
+  std::ranges::reverse(words);
+  if (!words.empty()) words.pop_back();
+  return words;
+}
+
 int ParseAndAct(int inCount, char** inArguments, Output& ioOutput) {
   CommandLine line;
   CLI::App& app = line.app;
   try {
-    app.parse(inCount, inArguments);
+    app.parse(WordsForParser(inCount, inArguments));
   } catch (const CLI::CallForHelp&) {
     if (const std::string word = WordInPlaceOfVerb(app); !word.empty())
       return ComplainOfUsage("unknown verb \"" + word + "\"");
