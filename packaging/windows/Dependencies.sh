@@ -105,7 +105,9 @@ BuildDependencies() {
   BuildWithCMake googletest . -DBUILD_GMOCK=ON
   Fetch icu
   BuildWithCMake icu-common "$top/packaging/windows/icu" -DICU_SOURCE="$work/sources/icu/source"
-  PART=src BuildWithCMake xerces-c . -Dnetwork=OFF -Dtranscoder=windows -Dmessage-loader=inmemory -Dxmlch-type=char16_t
+  # It reads other encodings as on Unix, by ICU, whose tables are in its one library here.
+  PART=src BuildWithCMake xerces-c . -Dnetwork=OFF -Dtranscoder=icu -DICU_DATA_LIBRARY_RELEASE="$sysroot/lib/libicuuc.a" \
+    -DCMAKE_CXX_FLAGS=-DU_STATIC_IMPLEMENTATION -Dmessage-loader=inmemory -Dxmlch-type=char16_t
   BuildWithCMake pugixml . -DPUGIXML_BUILD_TESTS=OFF
   BuildWithCMake libpng1.6 . "${zlib[@]}" -DPNG_SHARED=OFF -DPNG_TESTS=OFF -DPNG_EXECUTABLES=OFF
   BuildWithCMake libjpeg-turbo . -DENABLE_SHARED=OFF -DWITH_SIMD=OFF

@@ -42,7 +42,7 @@ class ZOR_FOUNDATION_EXPORT AtomicFile {
 
   void Write(std::string_view inBytes) { temporary_->Write(inBytes); }
   /// The new file, for writers that take a path or a descriptor.
-  const TemporaryFile& Temporary() const { return *temporary_; }
+  TemporaryFile& Temporary() { return *temporary_; }
   void Commit();
 
  private:

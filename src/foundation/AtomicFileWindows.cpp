@@ -14,15 +14,26 @@ DWORD AttributesOf(const std::string& inPath) {
   return GetFileAttributesW(WidePath(inPath).c_str());
 }
 
+/// Removes what another program may still have open, as one does that replaces it too.
+void RemoveWhenFree(const std::wstring& inPath) {
+  for (int i = 0; i < kTriesWhileInUse; ++i) {
+    if (DeleteFileW(inPath.c_str()) != FALSE || !IsInUse(GetLastError())) return;
+    Sleep(kMillisecondsBetweenTries);
+  }
+}
+
 /// The old file gets a name of ours until it is gone: one that was made up by Windows could stay.
 bool Replace(const std::wstring& inOld, const std::wstring& inNew) {
   const std::wstring former = inNew + L".old";
   const bool isDone = ReplaceFileW(inOld.c_str(), inNew.c_str(), former.c_str(),
                                    REPLACEFILE_IGNORE_MERGE_ERRORS, nullptr, nullptr) != FALSE;
-  if (!isDone && GetFileAttributesW(inOld.c_str()) == INVALID_FILE_ATTRIBUTES)
-    MoveFileExW(former.c_str(), inOld.c_str(), 0);
-  else
-    DeleteFileW(former.c_str());
+  const auto isThere = [&] { return GetFileAttributesW(inOld.c_str()) != INVALID_FILE_ATTRIBUTES; };
+  // Another program may be putting its own there.
+  for (int i = 0; i < kTriesWhileInUse && !isDone && !isThere(); ++i) {
+    if (MoveFileExW(former.c_str(), inOld.c_str(), 0) != FALSE) return false;
+    Sleep(kMillisecondsBetweenTries);
+  }
+  if (isDone || isThere()) RemoveWhenFree(former);
   return isDone;
 }
 

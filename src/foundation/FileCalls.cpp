@@ -48,8 +48,8 @@ int ReopenIfReplaced(int inDescriptor, const std::string& inPath) {
 
 FileError WhyNotOpened(const std::string& inPath) { return FileError(inPath, errno); }
 
-std::string Utf8PathOf(int inDescriptor, const std::string& inPath) {
-  return IsUtf8(inPath) ? inPath : "/proc/self/fd/" + std::to_string(inDescriptor);
+std::string Utf8PathOf(int& ioDescriptor, const std::string& inPath) {
+  return IsUtf8(inPath) ? inPath : "/proc/self/fd/" + std::to_string(ioDescriptor);
 }
 
 int CutHere(int inDescriptor) {

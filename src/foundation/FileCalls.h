@@ -36,8 +36,9 @@ int ReopenIfReplaced(int inDescriptor, const std::string& inPath);
 /// What is raised when a file could not be opened by one of these.
 FileError WhyNotOpened(const std::string& inPath);
 
-/// A path to an open file that is valid UTF-8 for as long as it is open.
-std::string Utf8PathOf(int inDescriptor, const std::string& inPath);
+/// A path in valid UTF-8 to an open file, which another program or library may write or replace. It
+/// stays open but on Windows, where the descriptor becomes -1; see ReopenIfReplaced.
+std::string Utf8PathOf(int& ioDescriptor, const std::string& inPath);
 
 /// Ends an open file where it was last written.
 int CutHere(int inDescriptor);

@@ -1,5 +1,6 @@
 #include <atomic>
 #include <cerrno>
+#include <utility>
 
 #include "foundation/FileCalls.h"
 #include "foundation/Hash.h"
@@ -52,7 +53,11 @@ FileError WhyNotOpened(const std::string& inPath) {
   return FileError(inPath, EACCES, "is open in another program, which does not let it be written");
 }
 
-std::string Utf8PathOf(int /*inDescriptor*/, const std::string& inPath) { return inPath; }
+// Closed: a writer may put another file in its place, which Windows allows of none that is open.
+std::string Utf8PathOf(int& ioDescriptor, const std::string& inPath) {
+  if (ioDescriptor >= 0) CloseDescriptor(std::exchange(ioDescriptor, -1));
+  return inPath;
+}
 
 int CutHere(int inDescriptor) {
   return SetEndOfFile(HandleOf(inDescriptor)) != FALSE ? 0 : ErrorNumberOf(GetLastError());

@@ -38,7 +38,7 @@ TemporaryFile::~TemporaryFile() {
   if (!path_.empty()) RemoveFile(path_.c_str());
 }
 
-std::string TemporaryFile::Utf8Path() const { return Utf8PathOf(descriptor_, path_); }
+std::string TemporaryFile::Utf8Path() { return Utf8PathOf(descriptor_, path_); }
 
 void TemporaryFile::Write(std::string_view inBytes) {
   std::size_t written = 0;

@@ -25,8 +25,8 @@ class ZOR_FOUNDATION_EXPORT TemporaryFile {
 
   const std::string& Path() const { return path_; }
   /// A path to the same file that is valid UTF-8 whatever the folder's name, for as long as this
-  /// lives.
-  std::string Utf8Path() const;
+  /// lives. For others to write, so on Windows the descriptor is closed until Reopen.
+  std::string Utf8Path();
   /// Open for reading and writing.
   int Descriptor() const { return descriptor_; }
 

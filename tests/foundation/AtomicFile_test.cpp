@@ -271,7 +271,7 @@ TEST_F(AtomicFileTest, PipeGetsAllTheBytesAndStays) {
   std::thread reader([&] {
     const int pipe = open(Path("pipe").c_str(), O_RDONLY);
     char part[4096];
-    for (ssize_t count; (count = read(pipe, part, sizeof part)) > 0;)
+    for (ssize_t count = 0; (count = read(pipe, part, sizeof part)) > 0;)
       received.append(part, static_cast<std::size_t>(count));
     close(pipe);
   });
@@ -353,7 +353,7 @@ TEST_F(AtomicFileTest, NewFileHasThePermissionsThatTheMaskLeaves) {
 TEST_F(AtomicFileTest, UnfinishedFileIsReadByNobodyElse) {
   folder_.WriteFile("a", "old");
   chmod(Path("a").c_str(), 0666);
-  const AtomicFile file(Path("a"));
+  AtomicFile file(Path("a"));
   EXPECT_EQ(ModeOf(file.Temporary().Path()), 0600U);
 }
 

@@ -13,7 +13,6 @@
 #include "tools/Command.h"
 
 using testing::HasSubstr;
-using testing::MatchesRegex;
 using testing::StartsWith;
 
 namespace {
@@ -130,13 +129,12 @@ TEST(BadInput, MalformedFileIsRefusedWithItsPlace) {
   const TemporaryDirectory directory;
   const std::string path = directory.Write("bad.xml", "<ClashElement>\n  <a></b>\n</ClashElement>");
   const CommandResult result = RunCommand({"list", path});
-  ExpectRefused(result, "lyra: " + path + ":2:");
-  EXPECT_THAT(result.error, MatchesRegex("lyra: .*:2:[0-9]+: .+\n"));
+  ExpectRefused(result, "lyra: " + path + ":2:8: expected end of tag 'a'\n");
 }
 
 TEST(BadInput, MalformedStandardInputIsRefusedWithItsPlace) {
-  EXPECT_THAT(RunCommand({"list", "-"}, "<ClashElement>\n<").error,
-              MatchesRegex("lyra: -:2:[0-9]+: .+\n"));
+  EXPECT_EQ(RunCommand({"list", "-"}, "<ClashElement>\n<").error,
+            "lyra: -:2:2: element name expected\n");
 }
 
 TEST(BadInput, ForeignRootIsRefusedByItsName) {
@@ -166,7 +164,12 @@ TEST(BadInput, ControlCharactersInAReasonAreShownEscaped) {
   const TemporaryDirectory directory;
   const std::string path = directory.Path("a\nb\033[31m");
   const CommandResult result = RunCommand({"info", path});
-  EXPECT_THAT(result.error, HasSubstr("a\\u{A}b\\u{1B}[31m: No such file"));
+#ifdef _WIN32
+  const std::string reason = "Invalid argument";  // no name of a file
+#else
+  const std::string reason = "No such file";
+#endif
+  EXPECT_THAT(result.error, HasSubstr("a\\u{A}b\\u{1B}[31m: " + reason));
   EXPECT_EQ(std::count(result.error.begin(), result.error.end(), '\n'), 1);
 }
 

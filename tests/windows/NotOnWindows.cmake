@@ -62,8 +62,20 @@ zor_leave_out(PrintPicturesTeardown_test "the loader of Windows puts no function
 zor_leave_out(ZORLyraGeneralServicesWithoutLengthMagnitude_test "the loader of Windows puts no function of a program in the place of a library's")
 zor_leave_out(ZORLyraXMLServicesFailingFiles_test "the loader of Windows puts no function of a program in the place of a library's")
 zor_leave_out(ZORLyraXMLServicesTakeRepImage_test "the loader of Windows puts no function of a program in the place of a library's")
-zor_leave_out(InterfaceRegistry_test "units of quantities are not built"
-  Interfaces.OfMagnitudesAndUnitsAreFoundByName)
+zor_leave_out(ZORSettingRepository_test "a user's own settings are in another folder of Unix"
+  ZORSettingRepository.HomeHoldsTheUserDirectoryByDefault)
+if(NOT ZOR_WITH_UNITS)
+  zor_leave_out(InterfaceRegistry_test "units of quantities are not built"
+    Interfaces.OfMagnitudesAndUnitsAreFoundByName)
+  zor_leave_out(ZORLyraGeneralServices_test "units of quantities are not built"
+    ZORLyraGeneralServices.ConvertValueInMMReadsALengthWithItsUnit
+    ZORLyraGeneralServices.ConvertValueInMMReadsABareNumberAsMillimetres
+    ZORLyraGeneralServices.ConvertValueInMMToleratesBlanks
+    ZORLyraGeneralServices.ConvertValueInMMOfUnreadableTextIsItsMarker
+    ZORLyraGeneralServices.ConvertValueInMMOfAnEmptyTextIsItsMarker
+    ZORLyraGeneralServices.ConvertValueInMMGivesNegativeLengths
+    ZORLyraGeneralServices.ConvertValueInMMGivesLengthsThatEqualAMarker)
+endif()
 zor_leave_out(BadInput_test "permissions, pipes and limits of Unix"
   BadInput.UnreadableFileIsRefused BadInput.PipeWithoutWriterIsRefusedAtOnce BadInput.DeviceIsRefused
   BadInput.DocumentBeyondTheMemoryIsRefused)
@@ -79,6 +91,10 @@ zor_leave_out(Report_test "validated and shown by programs of Unix"
   Report.ControlCharactersNeverReachTheFile)
 zor_leave_out(ReviewVerbs_test "validated by programs of Unix"
   GateVerb.ReportsAreValid)
+if(NOT ZOR_WITH_PAGES)
+  zor_leave_out(ReviewVerbs_test "pages and pictures are not built"
+    DiffVerb.PageShowsWhatBecameOfEach)
+endif()
 zor_leave_out(RunLyra_test "a shell, devices and terminals of Unix"
   Streams.PipeOnStandardInputIsReadForADash Streams.ReaderThatLeavesEndsTheCommandQuietly Streams.FullDiskIsReported
   Streams.FullDiskIsReportedForAShortAnswerToo Streams.ClosedStandardOutputIsReported

@@ -367,7 +367,7 @@ TEST_F(FileCopy, TakesDirectoriesThatEndInASeparator) {
 
 TEST_F(FileCopy, TakesNamesBeyondASCII) {
   folder_.WriteFile("d\u00e9part/\u65e5.xml", "bytes");
-  fs::create_directory(folder_.path / "arriv\u00e9e");
+  fs::create_directory(folder_.path / ZORFoundation::NativePath("arriv\u00e9e"));
   EXPECT_EQ(writer_.CopyFile("\u65e5.xml", folder_.FilePath("d\u00e9part").c_str(),
                              folder_.FilePath("arriv\u00e9e").c_str()),
             S_OK);

@@ -2,12 +2,14 @@
 // for the common formats.
 #include <algorithm>
 #include <charconv>
+#include <cmath>
 #include <cstdio>
 #include <cstring>
 #include <limits>
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 
 #include "default_platform/system/CLocale.h"
 #include "platform/system/ZORUnicodeString.h"
@@ -153,6 +155,17 @@ std::string Print(const char* inFormat, Number inNumber) {
   return text;
 }
 
+// As the C library of Unix prints it. That of MinGW makes up the sign; it prints infinity right.
+std::string PrintNaN(const std::string& inFormat, std::size_t inLetter, double inNaN) {
+  const std::size_t begin = inFormat.rfind('%', inLetter);
+  std::string text = Print(inFormat.substr(begin, inLetter + 1 - begin).c_str(),
+                           std::copysign(std::numeric_limits<double>::infinity(), inNaN));
+  for (const auto& [infinite, none] : {std::pair("inf", "nan"), std::pair("INF", "NAN")})
+    if (const std::size_t at = text.find(infinite); at != text.npos) text.replace(at, 3, none);
+  const std::string around = inFormat.substr(0, begin) + "%s" + inFormat.substr(inLetter + 1);
+  return Print(around.c_str(), text.c_str());
+}
+
 bool IsFormat(const char* inFormat, const char* inPlain) {
   return inFormat && std::strcmp(inFormat, inPlain) == 0;
 }
@@ -180,8 +193,10 @@ HRESULT ZORUnicodeString::BuildFromNum(double inNumber, const char* inFormat) {
     BuildFromLatin1(digits, static_cast<std::size_t>(end - digits));
     return S_OK;
   }
-  if (!FindConversion(inFormat, NumberKind::kDouble, FormatUse::kPrint)) return E_INVALIDARG;
-  const std::string text = Print(inFormat, inNumber);
+  const auto letter = FindConversion(inFormat, NumberKind::kDouble, FormatUse::kPrint);
+  if (!letter) return E_INVALIDARG;
+  const std::string text =
+      std::isnan(inNumber) ? PrintNaN(inFormat, *letter, inNumber) : Print(inFormat, inNumber);
   BuildFromUTF8(text.data(), text.size());
   return S_OK;
 }

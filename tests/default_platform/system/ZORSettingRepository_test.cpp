@@ -199,6 +199,7 @@ TEST(ZORSettingRepository, UserDirectoryComesAfterThePath) {
   EXPECT_EQ(Read("number", 0), 6);
 }
 
+#ifndef _WIN32
 TEST(ZORSettingRepository, HomeHoldsTheUserDirectoryByDefault) {
   const PlatformFolder folder;
   const TemporaryFolder home;
@@ -207,6 +208,7 @@ TEST(ZORSettingRepository, HomeHoldsTheUserDirectoryByDefault) {
   home.WriteFile(".config/zorlyra/Kinds.toml", "number = 5");
   EXPECT_EQ(Read("number", 0), 5);
 }
+#endif
 
 TEST(ZORSettingRepository, InstalledDefaultsAreFoundBesideTheLibrary) {
   const PlatformFolder folder;

@@ -49,9 +49,7 @@ TEST(ZORUnicodeString, ConvertToNumStopsAtWhatDoesNotFit) {
 }
 
 TEST(ZORUnicodeString, ConvertToNumWithoutNumberLeavesTheTarget) {
-  for (const char* const text : {"", " ", "abc", "-", "+", "--1", "+-1", "- 1",
-                                 "\xC2\xA0"
-                                 "1"}) {
+  for (const char* const text : {"", " ", "abc", "-", "+", "--1", "+-1", "- 1", "\u00A01"}) {
     int number = 17;
     double real = 17.5;
     EXPECT_EQ(ZORUnicodeString(text).ConvertToNum(&number), 0) << text;
@@ -149,6 +147,16 @@ TEST(ZORUnicodeString, BuildFromNumWritesDoubles) {
   EXPECT_EQ(Built(0.1, "%g"), "0.1");
   EXPECT_EQ(Built(1234.5, "%le"), "1.234500e+03");
   EXPECT_EQ(Built(1.0 / 3, "%.3lf"), "0.333");
+}
+
+TEST(ZORUnicodeString, BuildFromNumWritesTheSignOfNoNumber) {
+  const double nan = std::numeric_limits<double>::quiet_NaN(), negative = std::copysign(nan, -1);
+  for (const char* const format : {"%f", "%g", "%le", "%.3f"}) {
+    EXPECT_EQ(Built(nan, format), "nan");
+    EXPECT_EQ(Built(negative, format), "-nan");
+  }
+  EXPECT_EQ(Built(nan, "inf %+8G%%"), "inf     +NAN%");
+  EXPECT_EQ(Built(negative, "%%<%-8.2E>"), "%<-NAN    >");
 }
 
 TEST(ZORUnicodeString, BuildFromNumWritesTheLongestNumbers) {

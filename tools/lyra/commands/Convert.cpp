@@ -65,12 +65,13 @@ int WriteText(const ConvertOptions& inOptions, Output& ioOutput,
     return 0;
   }
   OutputFile file(inOptions.output);
-  const std::unique_ptr<std::FILE, int (*)(std::FILE*)> stream(
+  std::unique_ptr<std::FILE, int (*)(std::FILE*)> stream(
       ZORFoundation::OpenStream(file.Path()), &std::fclose);
   if (stream == nullptr) throw ZORFoundation::FileError(inOptions.output, errno);
   Output text(stream.get());
   inWrite(text);
   text.Finish();
+  stream.reset();  // Windows renames no file that is open
   file.Finish(ioOutput);
   return 0;
 }

@@ -176,7 +176,8 @@ int Extract(const ExtractOptions& inOptions, Output& ioOutput) {
   OutputFile output(inOptions.output);
   std::ofstream file(ZORFoundation::NativePath(output.Path()), std::ios::binary);
   file.write(bytes.data(), static_cast<std::streamsize>(bytes.size()));
-  output.Check(file.flush() ? S_OK : E_FAIL);
+  file.close();  // Windows renames no file that is open
+  output.Check(file ? S_OK : E_FAIL);
   output.Finish(ioOutput);
   return 0;
 }

@@ -47,13 +47,13 @@ class OutputFile {
   explicit OutputFile(const std::string& inPath);
 
   /// Where the new file is to be written, in UTF-8 whatever the user's path is.
-  std::string Path() const { return Temporary().Utf8Path(); }
+  std::string Path() { return Temporary().Utf8Path(); }
   /// Raises FileError for a code that says that writing failed.
   void Check(HRESULT inResult) const;
   void Finish(Output& ioOutput);
 
  private:
-  const ZORFoundation::TemporaryFile& Temporary() const {
+  ZORFoundation::TemporaryFile& Temporary() {
     return file_ ? file_->Temporary() : *forStream_;
   }
 
