@@ -1,6 +1,5 @@
 // The reader on a platform that has no catalogue or cannot prepare its XML library. This program
 // takes the place of these operations of the platform.
-#include <dlfcn.h>
 #include <gtest/gtest.h>
 
 #include <stdexcept>
@@ -8,6 +7,7 @@
 #include "platform/system/ZORMsgCatalog.h"
 #include "platform/xml/ZORXMLParser.h"
 #include "support/LoadedReader.h"
+#include "support/OriginalFunction.h"
 
 namespace {
 bool canInitialize = true;
@@ -22,9 +22,7 @@ ZORMsg ZORMsgCatalog::GetCatalogMsg(const char* inKey) const {
 
 HRESULT ZORXMLParser::Initialize() {
   if (!canInitialize) throw std::runtime_error("not prepared");
-  static auto* const original =
-      reinterpret_cast<HRESULT (*)()>(dlsym(RTLD_NEXT, "_ZN12ZORXMLParser10InitializeEv"));
-  return original();
+  return support::CallOriginal<HRESULT>("_ZN12ZORXMLParser10InitializeEv");
 }
 
 namespace {

@@ -6,6 +6,7 @@
 
 #include "BuildPath.h"
 #include "platform/system/ZORTime.h"
+#include "support/ScopedVariable.h"
 
 namespace {
 long long secondsNow = 0;
@@ -45,7 +46,7 @@ TEST(BuildPathDateStamp, MidnightIsZero) {
 }
 
 TEST(BuildPathDateStamp, TimeIsLocal) {
-  setenv("TZ", "XYZ-5:30", 1);  // five and a half hours ahead of UTC
+  const support::ScopedVariable zone("TZ", "XYZ-5:30");  // five and a half hours ahead of UTC
   tzset();
   EXPECT_EQ(StampAt(0), "1_1_1970_5_30_0");
 }

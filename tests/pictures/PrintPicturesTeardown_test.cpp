@@ -1,6 +1,5 @@
 // Taking a picture's scene apart, on a platform whose calls raise errors. This program's operators
 // new and delete tell when a block of memory was freed.
-#include <dlfcn.h>
 #include <gtest/gtest.h>
 
 #include <cstdlib>
@@ -13,6 +12,7 @@
 #include "pictures/FakeObjects.h"
 #include "platform/visualisation/ZOR3DBagRep.h"
 #include "support/AbandonedMemory.h"
+#include "support/OriginalFunction.h"
 
 namespace {
 
@@ -66,12 +66,9 @@ void ZORRep::Destroy() {
 }
 
 unsigned int ZORBaseUnknown::Release() {
-  using Operation = unsigned int(ZORBaseUnknown*);
-  static auto* const original =
-      reinterpret_cast<Operation*>(dlsym(RTLD_NEXT, "_ZN14ZORBaseUnknown7ReleaseEv"));
   if (dynamic_cast<ZOR3DViewpoint*>(this) && recorded.calls.ends_with("image released;"))
     teardown.Make("release viewpoint");
-  return original(this);
+  return support::CallOriginal<unsigned int>("_ZN14ZORBaseUnknown7ReleaseEv", this);
 }
 
 namespace {

@@ -335,7 +335,7 @@ TEST_F(Interferences, PartsAreNotWrittenForAnotherTextThanTrue) {
 TEST_F(Interferences, PartsAreNotWrittenWithoutTheVariable) {
   clash.parts = {&parts[0]};
   settings.WriteFile("system/Clash.toml", "ModeOfSubInterf = 1\n");
-  unsetenv("TRX_VELD_SUBINTERF");
+  wanted.emplace("TRX_VELD_SUBINTERF", std::nullopt);
   Print();
   EXPECT_FALSE(Happened("_SubItf_"));
 }

@@ -12,30 +12,30 @@ extern "C" __declspec(dllimport) int __stdcall SetEnvironmentVariableA(const cha
 
 namespace support {
 
-/// Sets a variable of the environment and restores its former state at the end.
+/// Sets a variable of the environment, or unsets it, and restores its former state at the end.
 class ScopedVariable {
  public:
-  ScopedVariable(const char* inName, const std::string& inValue) : name_(inName) {
+  ScopedVariable(const char* inName, const std::optional<std::string>& inValue) : name_(inName) {
     if (const char* const former = std::getenv(inName)) former_ = former;
-    Set(inValue.c_str());
+    Set(inValue);
   }
-  ~ScopedVariable() { Set(former_ ? former_->c_str() : nullptr); }
+  ~ScopedVariable() { Set(former_); }
   ScopedVariable(const ScopedVariable&) = delete;
   ScopedVariable& operator=(const ScopedVariable&) = delete;
 
  private:
 #ifdef _WIN32
-  void Set(const char* inValue) {
-    _putenv_s(name_, inValue == nullptr ? "" : inValue);
-    SetEnvironmentVariableA(name_,
-                            inValue);  // an empty value too, which the C library takes for none
+  void Set(const std::optional<std::string>& inValue) {
+    _putenv_s(name_, inValue ? inValue->c_str() : "");
+    // An empty value too, which the C library takes for none.
+    SetEnvironmentVariableA(name_, inValue ? inValue->c_str() : nullptr);
   }
 #else
-  void Set(const char* inValue) {
-    if (inValue == nullptr)
-      unsetenv(name_);
+  void Set(const std::optional<std::string>& inValue) {
+    if (inValue)
+      setenv(name_, inValue->c_str(), 1);
     else
-      setenv(name_, inValue, 1);
+      unsetenv(name_);
   }
 #endif
 

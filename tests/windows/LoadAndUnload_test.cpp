@@ -8,45 +8,15 @@
 #include <set>
 #include <thread>
 
-#include "foundation/WindowsCalls.h"
+#include "windows/LoadedFile.h"
+
+using namespace support;
 
 namespace {
 
 constexpr wchar_t kLibrary[] = L"ZORLyra.dll";
 
-// ---- a loaded file's tables
-
-const IMAGE_NT_HEADERS& HeadersOf(HMODULE inModule) {
-  const char* const base = reinterpret_cast<const char*>(inModule);
-  const auto& dos = *reinterpret_cast<const IMAGE_DOS_HEADER*>(base);
-  return *reinterpret_cast<const IMAGE_NT_HEADERS*>(base + dos.e_lfanew);
-}
-
-struct Exports {
-  explicit Exports(HMODULE inModule) : base(reinterpret_cast<char*>(inModule)) {
-    const DWORD place = HeadersOf(inModule)
-                            .OptionalHeader.DataDirectory[IMAGE_DIRECTORY_ENTRY_EXPORT]
-                            .VirtualAddress;
-    const auto& directory = *reinterpret_cast<const IMAGE_EXPORT_DIRECTORY*>(base + place);
-    addresses = reinterpret_cast<DWORD*>(base + directory.AddressOfFunctions);
-    const auto* const texts = reinterpret_cast<const DWORD*>(base + directory.AddressOfNames);
-    const auto* const ordinals =
-        reinterpret_cast<const WORD*>(base + directory.AddressOfNameOrdinals);
-    for (DWORD i = 0; i < directory.NumberOfNames; ++i)
-      entries.emplace_back(base + texts[i], addresses + ordinals[i]);
-  }
-
-  char* base;
-  DWORD* addresses;
-  std::vector<std::pair<std::string, DWORD*>> entries;
-};
-
-void WriteProtected(void* outPlace, const void* inBytes, std::size_t inCount) {
-  DWORD former = 0;
-  ASSERT_NE(VirtualProtect(outPlace, inCount, PAGE_EXECUTE_READWRITE, &former), FALSE);
-  std::memcpy(outPlace, inBytes, inCount);
-  VirtualProtect(outPlace, inCount, former, &former);
-}
+// ---- replaced exports
 
 /// A jump to a function, in memory near enough to a loaded file to be among its exports.
 char* JumpNear(char* inBase, const void* inFunction) {
@@ -54,9 +24,7 @@ char* JumpNear(char* inBase, const void* inFunction) {
     auto* const code = static_cast<char*>(
         VirtualAlloc(inBase + offset, 4096, MEM_COMMIT | MEM_RESERVE, PAGE_EXECUTE_READWRITE));
     if (code == nullptr) continue;
-    std::memcpy(code, "\x48\xB8", 2);  // mov rax, address; jmp rax
-    std::memcpy(code + 2, &inFunction, sizeof inFunction);
-    std::memcpy(code + 10, "\xFF\xE0", 2);
+    std::memcpy(code, JumpTo(inFunction).data(), sizeof(Jump));
     return code;
   }
   return nullptr;
@@ -120,14 +88,13 @@ BOOL WINAPI CountCall(HINSTANCE, DWORD, LPVOID) {
 int CallsForAThread(HMODULE inModule) {
   char* const entry =
       reinterpret_cast<char*>(inModule) + HeadersOf(inModule).OptionalHeader.AddressOfEntryPoint;
-  char former[12], jump[12] = {'\x48', '\xB8', 0, 0, 0, 0, 0, 0, 0, 0, '\xFF', '\xE0'};
-  const auto function = reinterpret_cast<std::uintptr_t>(&CountCall);
-  std::memcpy(jump + 2, &function, sizeof function);
-  std::memcpy(former, entry, sizeof former);
-  WriteProtected(entry, jump, sizeof jump);
+  Jump former{};
+  std::memcpy(former.data(), entry, sizeof former);
+  const Jump jump = JumpTo(reinterpret_cast<const void*>(&CountCall));
+  WriteProtected(entry, jump.data(), sizeof jump);
   entryCalls = 0;
   std::thread([] {}).join();
-  WriteProtected(entry, former, sizeof former);
+  WriteProtected(entry, former.data(), sizeof former);
   return entryCalls;
 }
 

@@ -54,14 +54,6 @@ zor_leave_out(ZORFile_test "links, devices, permissions and limits of Unix"
   ZORFCopy.DeviceIsWrittenIntoNotReplaced ZORFCopy.OldTargetKeepsItsPermissions
   ZORFCopy.OntoADanglingLinkMakesTheFileThatItLeadsTo ZORFCopy.NewTargetHasThePermissionsOfTheSource)
 zor_leave_out(TerminationSignals_test "a process of Windows is not ended by a signal")
-zor_leave_out(ZORClashParsingFailingPlatform_test "the loader of Windows puts no function of a program in the place of a library's")
-zor_leave_out(BuildPathDateStamp_test "the loader of Windows puts no function of a program in the place of a library's")
-zor_leave_out(PrintPictures_test "the loader of Windows puts no function of a program in the place of a library's")
-zor_leave_out(PrintPicturesPreviews_test "the loader of Windows puts no function of a program in the place of a library's")
-zor_leave_out(PrintPicturesTeardown_test "the loader of Windows puts no function of a program in the place of a library's")
-zor_leave_out(ZORLyraGeneralServicesWithoutLengthMagnitude_test "the loader of Windows puts no function of a program in the place of a library's")
-zor_leave_out(ZORLyraXMLServicesFailingFiles_test "the loader of Windows puts no function of a program in the place of a library's")
-zor_leave_out(ZORLyraXMLServicesTakeRepImage_test "the loader of Windows puts no function of a program in the place of a library's")
 zor_leave_out(ZORSettingRepository_test "a user's own settings are in another folder of Unix"
   ZORSettingRepository.HomeHoldsTheUserDirectoryByDefault)
 if(NOT ZOR_WITH_UNITS)
@@ -91,9 +83,13 @@ zor_leave_out(Report_test "validated and shown by programs of Unix"
   Report.ControlCharactersNeverReachTheFile)
 zor_leave_out(ReviewVerbs_test "validated by programs of Unix"
   GateVerb.ReportsAreValid)
+zor_leave_out(Exchange_test "other programs that read what is written, by a shell"
+  ConvertToXlsx.IsOpenedByAnotherSpreadsheet ConvertToBcf.IsReadByAReaderThatNobodyHereWrote)
 if(NOT ZOR_WITH_PAGES)
   zor_leave_out(ReviewVerbs_test "pages and pictures are not built"
     DiffVerb.PageShowsWhatBecameOfEach)
+  zor_leave_out(Exchange_test "pages and pictures are not built"
+    ConvertToBcf.WritesWhatTheOfficialSchemasAllow ConvertToXlsx.HasThumbnailsOfAModelOrOfAPage)
 endif()
 zor_leave_out(RunLyra_test "a shell, devices and terminals of Unix"
   Streams.PipeOnStandardInputIsReadForADash Streams.ReaderThatLeavesEndsTheCommandQuietly Streams.FullDiskIsReported
