@@ -23,9 +23,7 @@ constexpr int kUnusable = 1;
 constexpr int kWrongUsage = 2;
 
 /// Writes one line on stderr; a document's or a path's line feeds do not make it two.
-void Complain(const std::string& inReason) {
-  std::fprintf(stderr, "lyra: %s\n", Printable(inReason).c_str());
-}
+void Complain(const std::string& inReason) { WriteError("lyra: " + Printable(inReason) + "\n"); }
 
 int ComplainOfUsage(const std::string& inReason) {
   Complain(inReason);

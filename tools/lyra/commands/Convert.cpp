@@ -16,6 +16,7 @@
 #include "lyra/terminal/Progress.h"
 #include "lyra/terminal/SafeText.h"
 #include "lyra/terminal/Table.h"
+#include "lyra/terminal/Terminal.h"
 #include "toolkit/exchange/bcf/BcfWriter.h"
 #include "toolkit/exchange/sheets/ResultSheet.h"
 #include "toolkit/review/Match.h"
@@ -65,8 +66,8 @@ int WriteText(const ConvertOptions& inOptions, Output& ioOutput,
     return 0;
   }
   OutputFile file(inOptions.output);
-  std::unique_ptr<std::FILE, int (*)(std::FILE*)> stream(
-      ZORFoundation::OpenStream(file.Path()), &std::fclose);
+  std::unique_ptr<std::FILE, int (*)(std::FILE*)> stream(ZORFoundation::OpenStream(file.Path()),
+                                                         &std::fclose);
   if (stream == nullptr) throw ZORFoundation::FileError(inOptions.output, errno);
   Output text(stream.get());
   inWrite(text);
@@ -125,7 +126,7 @@ std::string TextOf(const std::vector<NotCarried>& inNotCarried, const std::strin
 /// Says what became of the result where the file does not go.
 void Say(const ConvertOptions& inOptions, const std::string& inReport, Output& ioOutput) {
   if (inOptions.output.empty() || inOptions.output == "-")
-    std::fputs(inReport.c_str(), stderr);
+    WriteError(inReport);
   else
     ioOutput.Write(inReport);
 }
@@ -218,7 +219,7 @@ int ConvertToBcf(const ConvertOptions& inOptions, Output& ioOutput) {
       WriteBcf(conversion.Document(), options, conversion.ModelOpener(), conversion.File().Path());
   conversion.EndProgress();
   for (const std::string& warning : written.warnings)
-    std::fprintf(stderr, "lyra: warning: %s\n", Printable(warning).c_str());
+    WriteError("lyra: warning: " + Printable(warning) + "\n");
   conversion.File().Finish(ioOutput);
   Say(inOptions, ReportOf(inOptions, written), ioOutput);
   return 0;

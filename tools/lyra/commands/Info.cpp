@@ -9,6 +9,7 @@
 #include "lyra/commands/RecordsJson.h"
 #include "lyra/terminal/SafeText.h"
 #include "lyra/terminal/Table.h"
+#include "lyra/terminal/Terminal.h"
 #include "toolkit/records/DocumentRecords.h"
 
 namespace lyra {
@@ -167,7 +168,7 @@ int Info(const InfoOptions& inOptions, Output& ioOutput) {
         printer.Print(ReadDocument(file), path);
       }
     } catch (const InputError& error) {
-      std::fprintf(stderr, "lyra: %s\n", Printable(error.what()).c_str());
+      WriteError("lyra: " + Printable(error.what()) + "\n");
       code = 1;
     }
   }

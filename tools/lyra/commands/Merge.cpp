@@ -1,9 +1,9 @@
 // lyra merge A B [C …] -o OUT
-#include <cstdio>
 #include <memory>
 
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
+#include "lyra/terminal/Terminal.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -22,7 +22,7 @@ int Merge(MergeOptions& ioOptions, Output& ioOutput) {
   std::string trace;
   const std::unique_ptr<ClashDocument> merged =
       MergeClashes(ioOptions.files, ioOptions.sumCounts, trace);
-  if (ioOptions.verbose) std::fputs(trace.c_str(), stderr);
+  if (ioOptions.verbose) WriteError(trace);
   OutputFile output(ioOptions.output);
   output.Check(ClashDocumentEdit(*merged).Dump(ioOptions.prologue, output.Path()));
   output.Finish(ioOutput);

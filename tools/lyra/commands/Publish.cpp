@@ -17,6 +17,7 @@
 #include "lyra/commands/Shares.h"
 #include "lyra/terminal/Progress.h"
 #include "lyra/terminal/SafeText.h"
+#include "lyra/terminal/Terminal.h"
 #include "toolkit/publishing/OneFile.h"
 #include "toolkit/publishing/Publication.h"
 #include "toolkit/sharding/PublicationShare.h"
@@ -186,7 +187,7 @@ int Extract(const ExtractOptions& inOptions, Output& ioOutput) {
 
 void SayOnStandardError(std::optional<DrawingProgress>& ioProgress, PublicationOptions& ioOptions) {
   ioOptions.warn = [](const std::string& inWarning) {
-    std::fprintf(stderr, "lyra: warning: %s\n", Printable(inWarning).c_str());
+    WriteError("lyra: warning: " + Printable(inWarning) + "\n");
   };
   ioOptions.drawn = [&](std::size_t inDone, std::size_t inAll) { ioProgress->Show(inDone, inAll); };
 }

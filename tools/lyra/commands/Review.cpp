@@ -13,6 +13,7 @@
 #include "lyra/commands/ReviewImport.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Table.h"
+#include "lyra/terminal/Terminal.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -63,7 +64,7 @@ void RequireFiles(const ReviewOptions& inOptions, std::size_t inCount, const cha
 /// Where a list goes when the document itself goes to standard output.
 void PrintList(const std::string& inText, const ReviewOptions& inOptions, Output& ioOutput) {
   if (inOptions.output != "-") return ioOutput.Write(inText);
-  std::fputs(inText.c_str(), stderr);
+  WriteError(inText);
 }
 
 Preference PreferenceOf(const ReviewOptions& inOptions) {
@@ -150,8 +151,8 @@ int Apply(const ReviewOptions& inOptions, Output& ioOutput) {
   input.Apply(plan.edits);
   WriteReviewed(input, inOptions.output, ioOutput);
   for (const ReviewEntry& entry : plan.unknown)
-    std::fprintf(stderr, "note: the result has no interference %s (%d in the review)\n",
-                 Printable(entry.id).c_str(), entry.index);
+    WriteError("note: the result has no interference " + Printable(entry.id) + " (" +
+               std::to_string(entry.index) + " in the review)\n");
   if (inOptions.json || !plan.conflicts.empty())
     PrintConflicts(plan.conflicts, inOptions, ioOutput);
   return plan.conflicts.empty() || !inOptions.prefer.empty() ? 0 : kConflicts;
@@ -168,9 +169,9 @@ int Merge(const ReviewOptions& inOptions, Output& ioOutput) {
   mine.Apply(plan.edits);
   WriteReviewed(mine, inOptions.output, ioOutput);
   if (plan.missing > 0)
-    std::fprintf(stderr, "note: %d decisions of %s are on interferences that %s has not\n",
-                 plan.missing, Printable(inOptions.files[2]).c_str(),
-                 Printable(inOptions.files[1]).c_str());
+    WriteError("note: " + std::to_string(plan.missing) + " decisions of " +
+               Printable(inOptions.files[2]) + " are on interferences that " +
+               Printable(inOptions.files[1]) + " has not\n");
   if (inOptions.json || !plan.conflicts.empty())
     PrintConflicts(plan.conflicts, inOptions, ioOutput);
   return plan.conflicts.empty() || preference != Preference::kNone ? 0 : kConflicts;

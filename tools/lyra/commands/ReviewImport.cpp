@@ -1,12 +1,11 @@
 #include "lyra/commands/ReviewImport.h"
 
-#include <cstdio>
-
 #include "foundation/ReadWholeFile.h"
 #include "lyra/CommandErrors.h"
 #include "lyra/commands/JsonDocument.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/SafeText.h"
+#include "lyra/terminal/Terminal.h"
 #include "toolkit/exchange/ReviewImport.h"
 #include "toolkit/records/RecordFilter.h"
 
@@ -37,7 +36,7 @@ void Report(const ReviewImportOptions& inOptions, const ImportedReview& inReview
             " changed\n";
   }
   if (inOptions.output == "-")
-    std::fputs(text.c_str(), stderr);
+    WriteError(text);
   else
     ioOutput.Write(text);
 }

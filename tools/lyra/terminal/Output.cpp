@@ -29,7 +29,10 @@ Output::Output(std::FILE* inStream)
       isStyled_(isTerminal_ && !IsSet("NO_COLOR")) {}
 
 void Output::Write(std::string_view inBytes) {
-  if (std::fwrite(inBytes.data(), 1, inBytes.size(), stream_) != inBytes.size()) Fail(errno);
+  const bool isWritten =
+      isTerminal_ ? WriteText(stream_, inBytes)
+                  : std::fwrite(inBytes.data(), 1, inBytes.size(), stream_) == inBytes.size();
+  if (!isWritten) Fail(errno);
 }
 
 void Output::Finish() {

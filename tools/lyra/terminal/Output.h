@@ -53,9 +53,7 @@ class OutputFile {
   void Finish(Output& ioOutput);
 
  private:
-  ZORFoundation::TemporaryFile& Temporary() {
-    return file_ ? file_->Temporary() : *forStream_;
-  }
+  ZORFoundation::TemporaryFile& Temporary() { return file_ ? file_->Temporary() : *forStream_; }
 
   std::string path_;  // as the user gave it
   std::optional<ZORFoundation::AtomicFile> file_;

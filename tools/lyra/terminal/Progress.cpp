@@ -30,8 +30,10 @@ void ProgressLine::Show(double inDone, const std::string& inRemark) {
   if (!isTerminal_ || percent == percent_) return;
   percent_ = percent;
   const int width = DisplayWidth(work_) + 5 + DisplayWidth(inRemark);
-  std::fprintf(stderr, "\r%s %3d%%%s%*s", work_.c_str(), percent, inRemark.c_str(),
-               std::max(width_ - width, 0), "");
+  char number[16];
+  std::snprintf(number, sizeof number, " %3d%%", percent);
+  const auto blanks = static_cast<std::size_t>(std::max(width_ - width, 0));
+  WriteError("\r" + work_ + number + inRemark + std::string(blanks, ' '));
   width_ = std::max(width_, width);
 }
 
@@ -44,7 +46,7 @@ void ProgressLine::Clear() {
 
 void ProgressLine::Warn(const std::string& inWarning) {
   Clear();
-  std::fprintf(stderr, "lyra: warning: %s\n", Printable(inWarning).c_str());
+  WriteError("lyra: warning: " + Printable(inWarning) + "\n");
 }
 
 std::string RateText(std::size_t inDone, std::size_t inAll, double inSeconds) {

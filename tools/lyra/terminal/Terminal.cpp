@@ -15,6 +15,10 @@ int TerminalWidth(std::FILE* inStream) {
   return ioctl(fileno(inStream), TIOCGWINSZ, &size) == 0 ? size.ws_col : 0;
 }
 
+bool WriteText(std::FILE* inStream, std::string_view inText) {
+  return std::fwrite(inText.data(), 1, inText.size(), inStream) == inText.size();
+}
+
 void PrepareStreams() {
   for (const int signal : {SIGPIPE, SIGXFSZ}) std::signal(signal, SIG_IGN);
 }
