@@ -7,13 +7,21 @@
 namespace {
 using namespace ZORToolkit;
 
-void HashGroups(const std::vector<InterferenceGroup>& inGroups, ResultHash& ioHash) {
-  for (const InterferenceGroup& group : inGroups) {
+void HashGroups(const GroupList& inGroups, ResultHash& ioHash) {
+  for (const InterferenceGroup group : inGroups) {
     ioHash.Add(group.Id());
-    ioHash.Add(group.label);
-    ioHash.Add(std::uint64_t{group.members.size()});
-    HashGroups(group.groups, ioHash);
+    ioHash.Add(group.Label());
+    ioHash.Add(std::uint64_t{group.Members().size()});
+    HashGroups(group.Groups(), ioHash);
   }
+}
+
+/// @return how long all labels are, so that they are made.
+std::size_t Name(const GroupList& inGroups) {
+  std::size_t length = 0;
+  for (const InterferenceGroup group : inGroups)
+    length += group.Id().size() + group.Label().size() + Name(group.Groups());
+  return length;
 }
 
 GatePolicy Policy() {
@@ -53,7 +61,7 @@ Steps DiffWithZORLyra(const Arguments& inArguments) {
     const DiffEntry& entry = diff.entries[i];
     hash.Add(Name(entry.itsClass));
     hash.Add(entry.reason);
-    for (const Change& change : entry.changes) hash.Add(change.from + change.to);
+    for (const Change& change : entry.changes) hash.Add(std::string(change.from).append(change.to));
     hash.Add(ids[i]);
   }
   steps.back().hash = hash.Value();
@@ -89,13 +97,15 @@ Steps GroupWithZORLyra(const Arguments& inArguments) {
   Steps steps;
   std::optional<ClashDocument> document;
   TimeStep("load", steps, [&] { document.emplace(inArguments.at(0)); });
-  std::vector<InterferenceGroup> groups;
+  ReviewedResult result;
+  std::optional<InterferenceGroups> groups;
   TimeStep("group", steps, [&] {
-    const ReviewedResult result = ReadForReview(*document, {.identities = true});
+    result = ReadForReview(*document, ReadingForGroups({}));
     groups = GroupInterferences(result);
   });
+  TimeStep("identifiers", steps, [&] { Name(*groups); });
   ResultHash hash;
-  HashGroups(groups, hash);
+  HashGroups(*groups, hash);
   steps.back().hash = hash.Value();
   return steps;
 }

@@ -86,16 +86,29 @@ py::list DiffRecords(const std::shared_ptr<PyDiff>& inDiff) {
   return rows;
 }
 
+struct PyChange {
+  std::string what, before, after;
+  bool isSubstantial;
+};
+
+std::vector<PyChange> ChangesOf(const PyDiffEntry& inEntry) {
+  std::vector<PyChange> changes;
+  for (const Change& change : inEntry.Entry().changes)
+    changes.push_back(
+        {change.what, std::string(change.from), std::string(change.to), change.isSubstantial});
+  return changes;
+}
+
 std::optional<int> NumberAt(int inPosition) {
   return inPosition < 0 ? std::nullopt : std::optional(inPosition + 1);
 }
 
 void DefineDiff(py::module_& ioModule) {
-  py::class_<Change>(ioModule, "Change", "What changed about an interference.")
-      .def_property_readonly("what", [](const Change& inChange) { return TextFrom(inChange.what); })
-      .def_readonly("before", &Change::from)
-      .def_readonly("after", &Change::to)
-      .def_readonly("is_substantial", &Change::isSubstantial,
+  py::class_<PyChange>(ioModule, "Change", "What changed about an interference.")
+      .def_readonly("what", &PyChange::what)
+      .def_readonly("before", &PyChange::before)
+      .def_readonly("after", &PyChange::after)
+      .def_readonly("is_substantial", &PyChange::isSubstantial,
                     "Whether it is another interference to decide on.");
   py::class_<PyDiffEntry>(ioModule, "DiffEntry", "What became of one interference.")
       .def_property_readonly(
@@ -111,8 +124,7 @@ void DefineDiff(py::module_& ioModule) {
           "Its number in the new result, or None.")
       .def_property_readonly(
           "reason", [](const PyDiffEntry& inEntry) { return TextFrom(inEntry.Entry().reason); })
-      .def_property_readonly("changes",
-                             [](const PyDiffEntry& inEntry) { return inEntry.Entry().changes; })
+      .def_property_readonly("changes", &ChangesOf)
       .def(
           "to_dict", [](const PyDiffEntry& inEntry) { return RecordFrom(inEntry.Identified()); },
           "As `lyra diff --json` has it.");
@@ -146,8 +158,9 @@ void DefineDiff(py::module_& ioModule) {
 // group
 
 struct PyGroup {
-  std::shared_ptr<const std::vector<InterferenceGroup>> all;
-  const InterferenceGroup* group;
+  LoadedPointer loaded;
+  InterferenceGroups all;
+  InterferenceGroup group;
 };
 
 GroupBy Criterion(const std::string& inWord) {
@@ -158,10 +171,10 @@ GroupBy Criterion(const std::string& inWord) {
   throw UnknownWord("by", inWord, kKnown);
 }
 
-std::vector<PyGroup> GroupsOf(const std::shared_ptr<const std::vector<InterferenceGroup>>& inAll,
-                              const std::vector<InterferenceGroup>& inGroups) {
+std::vector<PyGroup> GroupsOf(const LoadedPointer& inLoaded, const InterferenceGroups& inAll,
+                              const GroupList& inGroups) {
   std::vector<PyGroup> groups;
-  for (const InterferenceGroup& group : inGroups) groups.push_back({inAll, &group});
+  for (const InterferenceGroup group : inGroups) groups.push_back({inLoaded, inAll, group});
   return groups;
 }
 
@@ -174,40 +187,41 @@ std::vector<PyGroup> Group(const py::object& inResult,
     for (const std::string& word : *inBy) options.by.push_back(Criterion(word));
   }
   const LoadedPointer loaded = LoadedFrom(inResult);
-  std::shared_ptr<const std::vector<InterferenceGroup>> all;
+  std::optional<InterferenceGroups> all;
   {
     const LibraryScope library;
-    all = std::make_shared<const std::vector<InterferenceGroup>>(
-        GroupInterferences(loaded->Review(), options));
+    all = GroupInterferences(loaded->Review(), options);
   }
-  return GroupsOf(all, *all);
+  return GroupsOf(loaded, *all, *all);
 }
 
 void DefineGroup(py::module_& ioModule) {
   py::class_<PyGroup>(ioModule, "Group", "Interferences that belong together; see group().")
-      .def_property_readonly("id", [](const PyGroup& inGroup) { return inGroup.group->Id(); })
-      .def_property_readonly("by", [](const PyGroup& inGroup) { return Name(inGroup.group->by); })
+      .def_property_readonly("id", [](const PyGroup& inGroup) { return inGroup.group.Id(); })
+      .def_property_readonly("by", [](const PyGroup& inGroup) { return Name(inGroup.group.By()); })
       .def_property_readonly("label",
-                             [](const PyGroup& inGroup) { return TextFrom(inGroup.group->label); })
+                             [](const PyGroup& inGroup) { return TextFrom(inGroup.group.Label()); })
       .def_property_readonly(
           "members",
           [](const PyGroup& inGroup) {
-            std::vector<int> numbers = inGroup.group->members;
+            std::vector<int> numbers(inGroup.group.Members().begin(),
+                                     inGroup.group.Members().end());
             for (int& number : numbers) ++number;
             return numbers;
           },
           "The numbers of its interferences.")
       .def_property_readonly(
           "representative",
-          [](const PyGroup& inGroup) { return inGroup.group->representative + 1; },
+          [](const PyGroup& inGroup) { return inGroup.group.Representative() + 1; },
           "The number of the member of the worst value.")
-      .def_property_readonly("worst", [](const PyGroup& inGroup) { return inGroup.group->worst; })
-      .def_property_readonly(
-          "groups",
-          [](const PyGroup& inGroup) { return GroupsOf(inGroup.all, inGroup.group->groups); })
-      .def("__len__", [](const PyGroup& inGroup) { return inGroup.group->members.size(); })
+      .def_property_readonly("worst", [](const PyGroup& inGroup) { return inGroup.group.Worst(); })
+      .def_property_readonly("groups",
+                             [](const PyGroup& inGroup) {
+                               return GroupsOf(inGroup.loaded, inGroup.all, inGroup.group.Groups());
+                             })
+      .def("__len__", [](const PyGroup& inGroup) { return inGroup.group.Members().size(); })
       .def(
-          "to_dict", [](const PyGroup& inGroup) { return RecordFrom(*inGroup.group); },
+          "to_dict", [](const PyGroup& inGroup) { return RecordFrom(inGroup.group); },
           "As `lyra group --json` has it.");
   ioModule.def("group", &Group, py::arg("result"), py::kw_only(), py::arg("by") = py::none(),
                py::arg("distance") = GroupOptions().distance,

@@ -24,7 +24,7 @@ std::string WithLine(std::string_view inText, const std::string& inLine) {
 }
 
 /// "Reopened, was Relevant: value -2 -> -3.5".
-std::string ReopenedLine(std::string_view inStatus, const std::vector<Change>& inChanges) {
+std::string ReopenedLine(std::string_view inStatus, std::span<const Change> inChanges) {
   std::string line = std::string("Reopened, was ").append(inStatus);
   const char* separator = ": ";
   for (const Change& change : inChanges) {

@@ -4,6 +4,7 @@
 #include <cmath>
 #include <unordered_map>
 
+#include "default_platform/xml/TextStore.h"
 #include "foundation/Hash.h"
 #include "toolkit/review/ProductMatch.h"
 
@@ -247,8 +248,11 @@ class Differ {
       : old_(inOld), new_(inNew), motions_(inOld, inNew), options_(inOptions) {}
 
   ResultDiff Run() {
-    diff_.match = MatchResults(old_, new_, options_);
-    diff_.entries.reserve(new_.interferences.size());
+    diff_.match = MatchResults(motions_, options_);
+    diff_.sources = {old_.source, new_.source};
+    diff_.entries.reserve(new_.interferences.size() + static_cast<std::size_t>(std::ranges::count(
+                                                          diff_.match.interferencesOfOld, -1,
+                                                          &ResultMatch::Partner::position)));
     for (std::size_t i = 0; i < new_.interferences.size(); ++i) AddNew(i);
     std::optional<Comparability> comparability;
     for (std::size_t i = 0; i < old_.interferences.size(); ++i) {
@@ -260,58 +264,86 @@ class Differ {
       Add({isResolved ? DiffClass::kResolved : DiffClass::kNotComparable,
            static_cast<int>(i),
            -1,
-           isResolved ? partner.reason : diff_.match.Keep(std::move(whyNot)),
+           isResolved ? diff_.match.Reason(partner) : Keep(std::move(whyNot)),
            {}});
     }
     return std::move(diff_);
   }
 
  private:
-  void Add(DiffEntry inEntry) {
+  void Add(const DiffEntry& inEntry) {
     ++diff_.counts[static_cast<std::size_t>(inEntry.itsClass)];
-    diff_.entries.push_back(std::move(inEntry));
+    diff_.entries.push_back(inEntry);
   }
 
   void AddNew(std::size_t inPosition) {
     const ResultMatch::Partner& partner = diff_.match.interferencesOfNew[inPosition];
-    DiffEntry entry{
-        DiffClass::kNew, partner.position, static_cast<int>(inPosition), partner.reason, {}};
+    DiffEntry entry{DiffClass::kNew,
+                    partner.position,
+                    static_cast<int>(inPosition),
+                    diff_.match.Reason(partner),
+                    {}};
     if (partner.position >= 0) {
       entry.changes = ChangesOf(old_.interferences[static_cast<std::size_t>(partner.position)],
-                                new_.interferences[inPosition], partner.isUnmoved);
+                                new_.interferences[inPosition], partner.isUnmoved != 0);
       entry.itsClass = entry.changes.empty() ? DiffClass::kPersisting : DiffClass::kChanged;
     }
-    Add(std::move(entry));
+    Add(entry);
   }
 
-  std::vector<Change> ChangesOf(const ReviewRecord& inOld, const ReviewRecord& inNew,
-                                bool inIsUnmoved) const {
-    std::vector<Change> changes;
+  static bool IsSame(std::string_view inA, std::string_view inB) {
+    return inA.size() == inB.size() && AreSameBytes(inA.data(), inB.data(), inA.size());
+  }
+
+  /// @return what is added to the changes of all entries.
+  std::span<const Change> ChangesOf(const ReviewRecord& inOld, const ReviewRecord& inNew,
+                                    bool inIsUnmoved) {
+    std::size_t count = 0;
+    const auto add = [&](const Change& inChange) { RoomForChanges()[count++] = inChange; };
     const auto compare = [&](const char* inWhat, std::string_view inFrom, std::string_view inTo,
                              bool inIsSubstantial) {
-      if (inFrom != inTo)
-        changes.push_back({inWhat, std::string(inFrom), std::string(inTo), inIsSubstantial});
+      if (!IsSame(inFrom, inTo)) add({inWhat, inFrom, inTo, inIsSubstantial});
     };
     compare("type", inOld.type, inNew.type, true);
     if (!IsSameValue(inOld.value, inNew.value))
       compare("value", inOld.value.text, inNew.value.text, true);
-    if (!inIsUnmoved) ComparePlacements(inOld, inNew, changes);
+    if (!inIsUnmoved) ComparePlacements(inOld, inNew, add);
     compare("rule", inOld.rule, inNew.rule, true);
     compare("status", inOld.status, inNew.status, false);
     compare("comment", inOld.comment, inNew.comment, false);
+    if (count == 0) return {};
+    const std::span<const Change> changes(RoomForChanges(), count);
+    freeChanges_ += count;
+    leftChanges_ -= count;
     return changes;
   }
 
+  /// For those of one entry; they stay where they are.
+  Change* RoomForChanges() {
+    constexpr std::size_t kMostOfEntry = 7, kBlock = 1024;
+    if (leftChanges_ < kMostOfEntry) {
+      freeChanges_ = diff_.changes.emplace_back(new Change[kBlock]).get();
+      leftChanges_ = kBlock;
+    }
+    return freeChanges_;
+  }
+
+  std::string_view Keep(std::string inText) {
+    diff_.match.Keep(std::move(inText));
+    return diff_.match.reasons.back();
+  }
+
   bool IsSameValue(const WrittenNumber& inOld, const WrittenNumber& inNew) const {
-    if (inOld.text == inNew.text) return true;
+    if (IsSame(inOld.text, inNew.text)) return true;
     const std::optional<double> was = inOld.Value(), is = inNew.Value();
     if (!was || !is) return false;
     constexpr double kRounding = 1e-9;
     return std::abs(*was - *is) <= options_.tolerance + kRounding;
   }
 
+  template <class AddChange>
   void ComparePlacements(const ReviewRecord& inOld, const ReviewRecord& inNew,
-                         std::vector<Change>& ioChanges) const {
+                         const AddChange& inAdd) {
     const bool isSwapped = IsSwapped(inOld, inNew);
     bool isSubstantial = false, isKnown = false;
     for (std::size_t i = 0; i < 2; ++i) {
@@ -319,12 +351,12 @@ class Differ {
       if (motions_.Of(inOld, i, inNew, j) <= options_.tolerance) continue;
       if (!isKnown) isSubstantial = motions_.Relative(inOld, inNew, isSwapped) > options_.tolerance;
       isKnown = true;
-      ioChanges.push_back({"placement",
-                           PlacementText(ProductOf(old_, inOld.products[i]),
-                                         *old_.PlacementOf(inOld.productElements[i])),
-                           PlacementText(ProductOf(new_, inNew.products[j]),
-                                         *new_.PlacementOf(inNew.productElements[j])),
-                           isSubstantial});
+      inAdd({"placement",
+             Keep(PlacementText(ProductOf(old_, inOld.products[i]),
+                                *motions_.OldPlacementOf(inOld.productElements[i]))),
+             Keep(PlacementText(ProductOf(new_, inNew.products[j]),
+                                *motions_.NewPlacementOf(inNew.productElements[j]))),
+             isSubstantial});
     }
   }
 
@@ -345,6 +377,8 @@ class Differ {
   Motions motions_;
   const DiffOptions& options_;
   ResultDiff diff_;
+  Change* freeChanges_ = nullptr;  // where the next one is written
+  std::size_t leftChanges_ = 0;
 };
 
 }  // namespace

@@ -3,7 +3,9 @@
 #define ZOR_TOOLKIT_REVIEW_DIFF_H
 
 #include <array>
+#include <memory>
 #include <optional>
+#include <span>
 #include <string>
 #include <unordered_set>
 #include <vector>
@@ -17,9 +19,10 @@ inline constexpr std::size_t kDiffClassCount = 5;
 /// @return "new", "persisting", "changed", "resolved" or "notComparable".
 ZOR_TOOLKIT_EXPORT const char* Name(DiffClass inClass);
 
+/// Its texts live as long as the difference.
 struct Change {
-  std::string_view what;  ///< "type", "value", "placement", "rule", "status" or "comment"
-  std::string from, to;   ///< for a person; a value and a word as the documents have them
+  const char* what = "";      ///< "type", "value", "placement", "rule", "status" or "comment"
+  std::string_view from, to;  ///< for a person; a value and a word as the documents have them
   /// Whether it is another interference to decide on: a type, a value, a rule, or a placement of one
   /// product against the other. Products that moved together do not make it one.
   bool isSubstantial = false;
@@ -29,7 +32,7 @@ struct ZOR_TOOLKIT_EXPORT DiffEntry {
   DiffClass itsClass = DiffClass::kNew;
   int oldPosition = -1, newPosition = -1;  ///< in ReviewedResult::interferences, -1 for none
   std::string_view reason;                 ///< lives as long as the difference
-  std::vector<Change> changes;
+  std::span<const Change> changes;         ///< likewise
 
   /// Whether an old decision does not hold any more.
   bool IsReopened() const;
@@ -44,6 +47,8 @@ struct ZOR_TOOLKIT_EXPORT ResultDiff {
   std::vector<DiffEntry> entries;  ///< those with a new interference by its number, then the others
   std::array<int, kDiffClassCount> counts{};  ///< by DiffClass
   ResultMatch match;
+  std::vector<std::unique_ptr<Change[]>> changes;              ///< of the entries
+  std::array<std::shared_ptr<const ReviewSource>, 2> sources;  ///< for the texts of both results
 
   int Count(DiffClass inClass) const { return counts[static_cast<std::size_t>(inClass)]; }
   /// Whether there is anything but persisting interferences.

@@ -58,11 +58,10 @@ inline std::int64_t Cell(double inCoordinate) {
 }
 
 /// A place in the frame of a product; nothing when the product's placement is unknown or flat.
-inline std::optional<Point3> PlaceInFrame(const ReviewedResult& inResult, ElementNumber inProduct,
+inline std::optional<Point3> PlaceInFrame(const std::optional<Placement>& inPlacement,
                                           const Position& inPlace) {
-  const std::optional<Placement> placement = inResult.PlacementOf(inProduct);
-  if (!placement) return std::nullopt;
-  const std::optional<Frame> productFromWorld = Inverse(FrameOf(*placement));
+  if (!inPlacement) return std::nullopt;
+  const std::optional<Frame> productFromWorld = Inverse(FrameOf(*inPlacement));
   if (!productFromWorld) return std::nullopt;
   return *productFromWorld * ToPoint(inPlace);
 }

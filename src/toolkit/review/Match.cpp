@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <limits>
 #include <map>
-#include <tuple>
+#include <numeric>
 
 #include "toolkit/review/Assignment.h"
 #include "toolkit/review/Frames.h"
@@ -12,6 +12,7 @@
 namespace ZORToolkit {
 namespace {
 
+constexpr std::uint32_t kReasonBits = 0x7FFF'FFFF;  // of Partner::reason
 constexpr double kOtherType = 1;      // what another type costs, in millimetres of distance
 constexpr double kValueWeight = 0.1;  // what a small difference of values costs, likewise
 
@@ -28,9 +29,12 @@ typedef std::array<std::optional<Point3>, 3> Places;
 
 class PairMatcher {
  public:
-  PairMatcher(const ReviewedResult& inOld, const ReviewedResult& inNew,
-              const MatchOptions& inOptions, ResultMatch& ioMatch)
-      : old_(inOld), new_(inNew), motions_(inOld, inNew), options_(inOptions), match_(ioMatch) {}
+  PairMatcher(const Motions& inMotions, const MatchOptions& inOptions, ResultMatch& ioMatch)
+      : old_(inMotions.Old()),
+        new_(inMotions.New()),
+        motions_(inMotions),
+        options_(inOptions),
+        match_(ioMatch) {}
 
   void Match(const Items& inOlds, const Items& inNews) {
     if (inOlds.size() == 1 && inNews.size() == 1 && IsAtSamePlace(inOlds[0], inNews[0]))
@@ -39,8 +43,14 @@ class PairMatcher {
     news_ = inNews;
     oldPlaces_.clear();
     newPlaces_.clear();
-    for (const Item& item : olds_) oldPlaces_.push_back(PlacesOf(old_, item));
-    for (const Item& item : news_) newPlaces_.push_back(PlacesOf(new_, item));
+    for (const Item& item : olds_)
+      oldPlaces_.push_back(PlacesOf(Old(item), item, old_, [&](ElementNumber inProduct) {
+        return motions_.OldPlacementOf(inProduct);
+      }));
+    for (const Item& item : news_)
+      newPlaces_.push_back(PlacesOf(New(item), item, new_, [&](ElementNumber inProduct) {
+        return motions_.NewPlacementOf(inProduct);
+      }));
     const ReviewRecord &was = Old(olds_[0]), &is = New(news_[0]);
     const bool isSwapped = olds_[0].first != news_[0].first;
     motion_ = motions_.Relative(was, is, isSwapped);
@@ -70,12 +80,15 @@ class PairMatcher {
            was.points != WrittenGeometry::kNeverAlike;
   }
 
-  static Places PlacesOf(const ReviewedResult& inResult, const Item& inItem) {
-    const ReviewRecord& record = inResult.interferences[static_cast<std::size_t>(inItem.position)];
-    const std::optional<Position> world = inResult.PlaceOf(record);
+  template <class PlacementOf>
+  static Places PlacesOf(const ReviewRecord& inRecord, const Item& inItem,
+                         const ReviewedResult& inResult, const PlacementOf& inPlacementOf) {
+    const std::optional<Position> world = inResult.PlaceOf(inRecord);
     if (!world) return {};
-    return {ToPoint(*world), PlaceInFrame(inResult, record.productElements[inItem.first], *world),
-            PlaceInFrame(inResult, record.productElements[1 - inItem.first], *world)};
+    const auto inFrameOf = [&](std::size_t inProduct) {
+      return PlaceInFrame(inPlacementOf(inRecord.productElements[inProduct]), *world);
+    };
+    return {ToPoint(*world), inFrameOf(inItem.first), inFrameOf(1 - inItem.first)};
   }
 
   /// In the frame in which they are nearest; nothing when a place is unknown.
@@ -165,16 +178,15 @@ class PairMatcher {
     return match_.interferencesOfNew[static_cast<std::size_t>(inNew.position)];
   }
 
-  void SetBoth(const Item& inOld, const Item& inNew, std::string_view inReason, bool inIsUnmoved) {
-    PartnerOf(inOld) = {inNew.position, inIsUnmoved, inReason};
-    PartnerOfNew(inNew) = {inOld.position, inIsUnmoved, inReason};
+  void SetBoth(const Item& inOld, const Item& inNew, std::uint32_t inReason, bool inIsUnmoved) {
+    PartnerOf(inOld) = {inNew.position, inIsUnmoved, inReason & kReasonBits};
+    PartnerOfNew(inNew) = {inOld.position, inIsUnmoved, inReason & kReasonBits};
   }
 
   /// The only ones of their pair, where all is where it was.
   void SetUnmoved(const Item& inOld, const Item& inNew) {
     const bool hasPlace = old_.GeometryOf(Old(inOld)).points > WrittenGeometry::kNoPoints;
-    std::string_view reason =
-        hasPlace ? "same products, same place" : "same products, the only one of the pair";
+    std::uint32_t reason = hasPlace ? samePlace_ : onlyOne_;
     const std::string products = ReasonOfProducts(Old(inOld));
     if (!products.empty())
       reason = match_.Keep(products + (hasPlace ? ", same place" : ", the only one of the pair"));
@@ -204,7 +216,8 @@ class PairMatcher {
     std::string reason;
     for (const int product : inOld.products) {
       if (product < 0) continue;
-      const std::string_view why = match_.productsOfOld[static_cast<std::size_t>(product)].reason;
+      const std::string_view why =
+          match_.Reason(match_.productsOfOld[static_cast<std::size_t>(product)]);
       if (!why.empty() && !reason.empty()) reason += "; ";
       reason += why;
     }
@@ -213,18 +226,22 @@ class PairMatcher {
 
   void ExplainAlone() {
     for (const Item& item : olds_)
-      if (PartnerOf(item).position < 0)
-        PartnerOf(item).reason = "the new result has none of the pair at this place";
+      if (PartnerOf(item).position < 0) PartnerOf(item).reason = newHasNone_ & kReasonBits;
     for (const Item& item : news_)
-      if (PartnerOfNew(item).position < 0)
-        PartnerOfNew(item).reason = "the old result has none of the pair at this place";
+      if (PartnerOfNew(item).position < 0) PartnerOfNew(item).reason = oldHasNone_ & kReasonBits;
   }
 
   const ReviewedResult& old_;
   const ReviewedResult& new_;
-  Motions motions_;
+  const Motions& motions_;
   const MatchOptions& options_;
   ResultMatch& match_;
+  const std::uint32_t samePlace_ = match_.Keep("same products, same place");
+  const std::uint32_t onlyOne_ = match_.Keep("same products, the only one of the pair");
+  const std::uint32_t newHasNone_ =
+      match_.Keep("the new result has none of the pair at this place");
+  const std::uint32_t oldHasNone_ =
+      match_.Keep("the old result has none of the pair at this place");
   std::map<std::string_view, int> types_;
   Items olds_, news_;
   std::vector<Places> oldPlaces_, newPlaces_;  // of these
@@ -232,85 +249,95 @@ class PairMatcher {
   bool stands_ = false;                        // neither product moved
 };
 
-/// An interference among all of its pair; the products' numbers are those of the new result.
-struct PairRow {
-  int low, high;  // of the two products
-  bool isNew;
-  Item item;
-};
-
-/// All interferences whose products both results have, those of a pair together: by the lower
-/// product by counting, then by comparing.
+/// All interferences whose products both results have, those of a pair together, by the numbers of
+/// the products in the new result: by the lower one by counting, then by comparing.
 class PairRows {
  public:
   PairRows(const ReviewedResult& inOld, const ReviewedResult& inNew, ResultMatch& ioMatch)
       : match_(ioMatch), ends_(inNew.products.size() + 2) {
-    Collect(inOld, false, match_.productsOfOld, match_.interferencesOfOld);
-    Collect(inNew, true, match_.productsOfNew, match_.interferencesOfNew);
-    Sort();
-  }
-
-  const std::vector<PairRow>& Get() const { return rows_; }
-
- private:
-  void Collect(const ReviewedResult& inResult, bool inIsNew,
-               const std::vector<ResultMatch::Partner>& inProducts,
-               std::vector<ResultMatch::Partner>& outPartners) {
-    outPartners.resize(inResult.interferences.size());
-    rows_.reserve(rows_.size() + outPartners.size());
-    for (std::size_t i = 0; i < outPartners.size(); ++i) {
-      const ReviewRecord& record = inResult.interferences[i];
-      outPartners[i].reason = ReasonOfMissing(record, inProducts);
-      if (outPartners[i].reason.empty()) Add(record, inIsNew);
-    }
-  }
-
-  /// Why the other result cannot have it: it lacks one of the products.
-  static std::string_view ReasonOfMissing(const ReviewRecord& inRecord,
-                                          const std::vector<ResultMatch::Partner>& inPartners) {
-    for (const int product : inRecord.products)
-      if (product >= 0 && inPartners[static_cast<std::size_t>(product)].position < 0)
-        return inPartners[static_cast<std::size_t>(product)].reason;
-    return {};
-  }
-
-  void Add(const ReviewRecord& inRecord, bool inIsNew) {
-    std::array<int, 2> products = inRecord.products;
-    if (!inIsNew)
-      for (int& product : products)
-        if (product >= 0)
-          product = match_.productsOfOld[static_cast<std::size_t>(product)].position;
-    const std::uint32_t first = products[1] < products[0] ? 1 : 0;
-    rows_.push_back({products[first], products[1 - first], inIsNew, {inRecord.index - 1, first}});
-    ++ends_[PlaceOf(products[first])];
-  }
-
-  static std::size_t PlaceOf(int inProduct) { return static_cast<std::size_t>(inProduct) + 1; }
-
-  void Sort() {
-    std::uint32_t sum = 0;
-    for (std::uint32_t& end : ends_) {
-      const std::uint32_t count = end;
-      end = sum;
-      sum += count;
-    }
-    std::vector<PairRow> sorted(rows_.size());
-    for (const PairRow& row : rows_) sorted[ends_[PlaceOf(row.low)]++] = row;
-    rows_.swap(sorted);
-    const auto order = [](const PairRow& inRow) {
-      return std::tie(inRow.high, inRow.isNew, inRow.item.position);
+    const auto forEachResult = [&](const auto& inVisit) {
+      inVisit(inOld, std::uint64_t{0}, match_.productsOfOld, match_.interferencesOfOld);
+      inVisit(inNew, kIsNew, match_.productsOfNew, match_.interferencesOfNew);
     };
+    std::uint32_t count = 0;
+    forEachResult([&](const ReviewedResult& inResult, std::uint64_t, const auto& inProducts,
+                      auto& outPartners) {
+      outPartners.resize(inResult.interferences.size());
+      for (std::size_t i = 0; i < outPartners.size(); ++i) {
+        const ReviewRecord& record = inResult.interferences[i];
+        outPartners[i].reason = ReasonOfMissing(record, inProducts);
+        if (outPartners[i].reason != 0) continue;
+        ++ends_[PairOf(record, &inResult == &inOld).low];
+        ++count;
+      }
+    });
+    std::exclusive_scan(ends_.begin(), ends_.end(), ends_.begin(), 0u);
+    rows_.resize(count);
+    forEachResult([&](const ReviewedResult& inResult, std::uint64_t inIsNew, const auto&,
+                      const auto& inPartners) {
+      for (std::size_t i = 0; i < inPartners.size(); ++i) {
+        if (inPartners[i].reason != 0) continue;
+        const Pair pair = PairOf(inResult.interferences[i], &inResult == &inOld);
+        rows_[ends_[pair.low]++] = pair.high << 32 | inIsNew | i << 1 | pair.first;
+      }
+    });
     std::uint32_t begin = 0;
     for (const std::uint32_t end : ends_) {
-      if (end > begin + 1)
-        std::sort(rows_.begin() + begin, rows_.begin() + end,
-                  [&](const PairRow& inA, const PairRow& inB) { return order(inA) < order(inB); });
+      if (end > begin + 1) std::sort(rows_.begin() + begin, rows_.begin() + end);
       begin = end;
     }
   }
 
+  /// Calls inVisit(old interferences, new ones) for each pair.
+  template <class Visit>
+  void ForEachPair(const Visit& inVisit) const {
+    Items olds, news;
+    std::size_t at = 0;
+    for (const std::uint32_t end : ends_)
+      while (at < end) {
+        olds.clear();
+        news.clear();
+        for (const std::uint64_t high = rows_[at] >> 32; at < end && rows_[at] >> 32 == high; ++at)
+          ((rows_[at] & kIsNew) != 0 ? news : olds)
+              .push_back({static_cast<int>((rows_[at] & (kIsNew - 1)) >> 1),
+                          static_cast<std::uint32_t>(rows_[at] & 1)});
+        inVisit(olds, news);
+      }
+  }
+
+ private:
+  // A row: the higher product, whether the interference is new, its position, and which of its
+  // products is the lower one
+  static constexpr std::uint64_t kIsNew = std::uint64_t{1} << 31;
+  struct Pair {
+    std::size_t low;
+    std::uint64_t high, first;
+  };
+
+  /// Why the other result cannot have it: it lacks one of the products.
+  static std::uint32_t ReasonOfMissing(const ReviewRecord& inRecord,
+                                       const std::vector<ResultMatch::Partner>& inPartners) {
+    for (const int product : inRecord.products)
+      if (product >= 0 && inPartners[static_cast<std::size_t>(product)].position < 0)
+        return inPartners[static_cast<std::size_t>(product)].reason;
+    return 0;
+  }
+
+  /// 0 for no product.
+  Pair PairOf(const ReviewRecord& inRecord, bool inIsOld) const {
+    std::size_t products[2];
+    for (std::size_t i = 0; i < 2; ++i) {
+      int product = inRecord.products[i];
+      if (inIsOld && product >= 0)
+        product = match_.productsOfOld[static_cast<std::size_t>(product)].position;
+      products[i] = static_cast<std::size_t>(product + 1);
+    }
+    const std::size_t first = products[1] < products[0] ? 1 : 0;
+    return {products[first], products[1 - first], first};
+  }
+
   ResultMatch& match_;
-  std::vector<PairRow> rows_;
+  std::vector<std::uint64_t> rows_;
   std::vector<std::uint32_t> ends_;  // of the rows of each lower product, from that of none
 };
 
@@ -318,30 +345,25 @@ class PairRows {
 
 ResultMatch MatchResults(const ReviewedResult& inOld, const ReviewedResult& inNew,
                          const MatchOptions& inOptions) {
+  return MatchResults(Motions(inOld, inNew), inOptions);
+}
+
+ResultMatch MatchResults(const Motions& inMotions, const MatchOptions& inOptions) {
   ResultMatch match;
-  MatchProducts(inOld, inNew, inOptions.tolerance, match);
-  const PairRows pairRows(inOld, inNew, match);
-  const std::vector<PairRow>& rows = pairRows.Get();
-  PairMatcher matcher(inOld, inNew, inOptions, match);
-  Items olds, news;
-  for (std::size_t begin = 0, end = 0; begin < rows.size(); begin = end) {
-    olds.clear();
-    news.clear();
-    for (; end < rows.size() && rows[end].low == rows[begin].low &&
-           rows[end].high == rows[begin].high;
-         ++end)
-      (rows[end].isNew ? news : olds).push_back(rows[end].item);
-    if (!olds.empty() && !news.empty()) {
-      matcher.Match(olds, news);
-      continue;
-    }
-    for (const Item& item : olds)
+  MatchProducts(inMotions, inOptions.tolerance, match);
+  const PairRows pairs(inMotions.Old(), inMotions.New(), match);
+  PairMatcher matcher(inMotions, inOptions, match);
+  const std::uint32_t newHasNone = match.Keep("the new result has none of the pair");
+  const std::uint32_t oldHasNone = match.Keep("the old result has none of the pair");
+  pairs.ForEachPair([&](const Items& inOlds, const Items& inNews) {
+    if (!inOlds.empty() && !inNews.empty()) return matcher.Match(inOlds, inNews);
+    for (const Item& item : inOlds)
       match.interferencesOfOld[static_cast<std::size_t>(item.position)].reason =
-          "the new result has none of the pair";
-    for (const Item& item : news)
+          newHasNone & kReasonBits;
+    for (const Item& item : inNews)
       match.interferencesOfNew[static_cast<std::size_t>(item.position)].reason =
-          "the old result has none of the pair";
-  }
+          oldHasNone & kReasonBits;
+  });
   return match;
 }
 

@@ -21,12 +21,12 @@ struct ResultMatch {
   struct Partner {
     int position = -1;  ///< in the other result, -1 for none
     /// Its placement, or the placements and points of an interference, are written alike.
-    bool isUnmoved = false;
-    std::string_view reason;  ///< why this one, or why none; lives as long as the match
+    std::uint32_t isUnmoved : 1 = 0;
+    std::uint32_t reason : 31 = 0;  ///< why this one, or why none: its place in reasons
   };
   std::vector<Partner> productsOfOld, productsOfNew;
   std::vector<Partner> interferencesOfOld, interferencesOfNew;
-  std::deque<std::string> texts;  ///< those of the reasons that are not said of many
+  std::deque<std::string> reasons{""};  ///< live as long as the match
 
   ResultMatch() = default;
   ResultMatch(ResultMatch&&) = default;
@@ -34,7 +34,12 @@ struct ResultMatch {
   ResultMatch(const ResultMatch&) = delete;
   ResultMatch& operator=(const ResultMatch&) = delete;
 
-  std::string_view Keep(std::string inText) { return texts.emplace_back(std::move(inText)); }
+  std::string_view Reason(const Partner& inPartner) const { return reasons[inPartner.reason]; }
+  /// @return its place.
+  std::uint32_t Keep(std::string inReason) {
+    reasons.push_back(std::move(inReason));
+    return (static_cast<std::uint32_t>(reasons.size()) - 1) & 0x7FFF'FFFF;
+  }
 };
 
 /// Products are the same by identifier; of those left over by alias and part, then by the last name

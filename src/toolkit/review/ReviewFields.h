@@ -36,11 +36,12 @@ auto ValueOf(Maker& m, const IdentifiedEntry& inIdentified) {
 template <class Maker>
 typename Maker::Value ValueOf(Maker& m, const InterferenceGroup& inGroup) {
   return m.Object(
-      "id", m.Text(inGroup.Id()), "by", m.Text(Name(inGroup.by)), "label", m.Text(inGroup.label),
-      "size", m.Integer(static_cast<long long>(inGroup.members.size())), "members",
-      m.Array(inGroup.members, [&](int inPosition) { return m.Integer(inPosition + 1); }),
-      "representative", m.Integer(inGroup.representative + 1), "worst",
-      inGroup.worst ? m.Real(*inGroup.worst) : m.Null(), "groups", m.Records(inGroup.groups));
+      "id", m.Text(inGroup.Id()), "by", m.Text(Name(inGroup.By())), "label",
+      m.Text(inGroup.Label()), "size", m.Integer(static_cast<long long>(inGroup.Members().size())),
+      "members",
+      m.Array(inGroup.Members(), [&](int inPosition) { return m.Integer(inPosition + 1); }),
+      "representative", m.Integer(inGroup.Representative() + 1), "worst",
+      inGroup.Worst() ? m.Real(*inGroup.Worst()) : m.Null(), "groups", m.Records(inGroup.Groups()));
 }
 
 }  // namespace ZORToolkit

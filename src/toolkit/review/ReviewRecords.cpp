@@ -230,13 +230,12 @@ class ReviewReader {
   }
 
   int PositionOf(const AwaitedProduct& inProduct) {
-    const int known = source_->Find(inProduct.key, -1);
-    if (known >= 0) return known;
-    source_->Add(inProduct.key);
+    const int position = source_->FindOrAdd(inProduct.key);
+    if (static_cast<std::size_t>(position) < result_.products.size()) return position;
     const std::string_view id = source_->Text(inProduct.id);
     result_.products.push_back({id, source_->Text(inProduct.alias, inProduct.id, id),
                                 source_->Text(inProduct.part), inProduct.element, 0});
-    return source_->ProductCount() - 1;
+    return position;
   }
 
   int CaseOf(const std::string& inName) {

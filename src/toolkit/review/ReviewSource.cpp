@@ -112,12 +112,7 @@ std::string_view ReviewSource::Keep(std::string_view inText) {
   return Kept(inText.size());
 }
 
-std::string_view ReviewSource::Text(StoredText inText) {
-  if (inText == nullptr) return {};
-  if (!inText->IsWide()) {
-    const std::string_view bytes = inText->View().Latin1();
-    if (ZORFoundation::IsAscii(bytes)) return bytes;
-  }
+std::string_view ReviewSource::OtherText(StoredText inText) {
   // Texts that repeat are one in the tree.
   const auto place = reinterpret_cast<std::uintptr_t>(inText) / alignof(DOM_Text);
   RecentText& recent = recentTexts_[(place ^ (place >> 6)) % recentTexts_.size()];
@@ -138,17 +133,13 @@ std::string_view ReviewSource::Encoded(const DOM_Text& inText) {
 
 // ---- products
 
-bool ReviewSource::IsSame(const ProductKey& inA, const ProductKey& inB) {
-  return inA.hash == inB.hash && std::ranges::equal(inA.texts, inB.texts, ZORToolkit::IsSame);
-}
-
 ReviewSource::ProductKey ReviewSource::KeyOf(StoredText inId, StoredText inAlias,
                                              StoredText inPart) {
-  if (inId != nullptr && inId->Length() != 0) return {HashOf(inId), {inId, nullptr, nullptr}};
+  if (inId != nullptr && inId->Length() != 0) return {HashOf(inId), {inId, nullptr}};
   static constexpr DOM_Text kEmpty{0};
   const auto text = [](StoredText inText) { return inText == nullptr ? &kEmpty : inText; };
   const StoredText alias = text(inAlias), part = text(inPart);
-  return {Mix(HashOf(alias), HashOf(part)), {nullptr, alias, part}};
+  return {Mix(HashOf(alias), HashOf(part)), {alias, part}};
 }
 
 void ReviewSource::MakeSlots(std::size_t inCount) {
@@ -173,16 +164,20 @@ int ReviewSource::Find(const ProductKey& inKey, int inGuess) const {
   return static_cast<int>(slots_[SlotOf(inKey)].product) - 1;
 }
 
-void ReviewSource::Add(const ProductKey& inKey) {
+int ReviewSource::FindOrAdd(const ProductKey& inKey) {
+  Slot& found = slots_[SlotOf(inKey)];
+  if (found.product != 0) return static_cast<int>(found.product) - 1;
   products_.push_back(inKey);
-  const auto count = static_cast<std::uint32_t>(products_.size());
-  if (products_.size() * 2 <= slotCount_) {
-    slots_[SlotOf(inKey)] = {static_cast<std::uint32_t>(inKey.hash >> 32), count};
-    return;
-  }
+  found = {static_cast<std::uint32_t>(inKey.hash >> 32),
+           static_cast<std::uint32_t>(products_.size())};
+  if (products_.size() * 2 > slotCount_) GrowSlots();
+  return ProductCount() - 1;
+}
+
+void ReviewSource::GrowSlots() {
   MakeSlots(slotCount_ * 4);
   const std::size_t mask = slotCount_ - 1;
-  for (std::uint32_t i = 0; i < count; ++i) {
+  for (std::uint32_t i = 0; i < products_.size(); ++i) {
     std::size_t slot = products_[i].hash & mask;
     while (slots_[slot].product != 0) slot = (slot + 1) & mask;
     slots_[slot] = {static_cast<std::uint32_t>(products_[i].hash >> 32), i + 1};

@@ -4,6 +4,7 @@
 
 #include <array>
 #include <cstdlib>
+#include <cstring>
 #include <memory>
 #include <string>
 #include <string_view>
@@ -98,7 +99,12 @@ class ReviewSource {
   StoredText Attribute(Element inElement, Named inName) const;
 
   /// As UTF-8; valid as long as this.
-  std::string_view Text(StoredText inText);
+  std::string_view Text(StoredText inText) {
+    if (inText == nullptr) return {};
+    if (!inText->IsWide() && IsAsciiText(inText->Latin1(), inText->head))
+      return {inText->Latin1(), inText->head};
+    return OtherText(inText);
+  }
   std::string_view Keep(std::string_view inText);
   /// As Text, of one that is likely to be said by another text that is kept already.
   std::string_view Text(StoredText inText, StoredText inOther, std::string_view inKept) {
@@ -108,16 +114,21 @@ class ReviewSource {
   // Products
   struct ProductKey {
     std::uint64_t hash = 0;
-    std::array<StoredText, 3> texts{};  // the identifier alone, or alias and part after none
+    std::array<StoredText, 2> texts{};  // the identifier alone, or alias and part
   };
   static ProductKey KeyOf(StoredText inId, StoredText inAlias, StoredText inPart);
   /// The position of a product; -1 where there is none.
   /// @param inGuess a position that is looked at first.
   int Find(const ProductKey& inKey, int inGuess) const;
-  void Add(const ProductKey& inKey);  ///< one that there is not, at the next position
+  /// The position of a product, which is the next one where there was none.
+  int FindOrAdd(const ProductKey& inKey);
   /// Has the memory that Find will look at fetched meanwhile.
   void Expect(const ProductKey& inKey) const {
     __builtin_prefetch(&slots_[inKey.hash & (slotCount_ - 1)]);
+  }
+  /// Has what Find will look at of a product here or elsewhere fetched meanwhile.
+  void ExpectText(int inProduct) const {
+    if (inProduct < ProductCount()) __builtin_prefetch(Key(inProduct).texts[0]);
   }
   const ProductKey& Key(int inProduct) const {
     return products_[static_cast<std::size_t>(inProduct)];
@@ -158,7 +169,22 @@ class ReviewSource {
   bool ReadTriple(Element inElement, Named inFirst, double* outTriple, const Other& inOther) const;
   bool ReadTriple(Element inElement, Named inFirst, double* outTriple) const;
   std::optional<Placement> PlacementIn(Element inMatrix) const;
-  static bool IsSame(const ProductKey& inA, const ProductKey& inB);
+  static bool IsAsciiText(const char* inBytes, std::size_t inCount) {
+    constexpr std::uint64_t kHighBits = 0x8080808080808080u;
+    if (inCount <= 8) return (ShortBytes(inBytes, inCount) & kHighBits) == 0;
+    std::uint64_t all = 0, part = 0;
+    for (std::size_t at = 0; at + 8 < inCount; at += 8) {
+      std::memcpy(&part, inBytes + at, sizeof part);
+      all |= part;
+    }
+    std::memcpy(&part, inBytes + inCount - 8, sizeof part);
+    return ((all | part) & kHighBits) == 0;
+  }
+  std::string_view OtherText(StoredText inText);
+  static bool IsSame(const ProductKey& inA, const ProductKey& inB) {
+    return inA.hash == inB.hash && ZORToolkit::IsSame(inA.texts[0], inB.texts[0]) &&
+           ZORToolkit::IsSame(inA.texts[1], inB.texts[1]);
+  }
   std::string_view Encoded(const DOM_Text& inText);
   char* RoomFor(std::size_t inBytes);
   std::string_view Kept(std::size_t inBytes);  ///< what was written there
@@ -178,6 +204,7 @@ class ReviewSource {
     void operator()(Slot* inSlots) const { std::free(inSlots); }
   };
   void MakeSlots(std::size_t inCount);
+  void GrowSlots();
   std::unique_ptr<Slot[], FreeSlots> slots_;
   std::size_t slotCount_ = 0;  // a power of two
   struct RecentText {

@@ -87,8 +87,10 @@ std::uint64_t IdentityHasher::OfInterference(const ReviewRecord& inRecord,
                                              const std::optional<Position>& inWorld) {
   const std::size_t frame = AddPair(inRecord);
   if (!inWorld) return input_.Hash();
-  std::optional<Point3> place = PlaceInFrame(result_, inRecord.productElements[frame], *inWorld);
-  if (!place) place = PlaceInFrame(result_, inRecord.productElements[1 - frame], *inWorld);
+  std::optional<Point3> place =
+      PlaceInFrame(result_.PlacementOf(inRecord.productElements[frame]), *inWorld);
+  if (!place)
+    place = PlaceInFrame(result_.PlacementOf(inRecord.productElements[1 - frame]), *inWorld);
   if (!place) place = ToPoint(*inWorld);
   if (ZORFoundation::IsFinite(*place))
     for (const double coordinate : {place->x, place->y, place->z})

@@ -11,19 +11,29 @@ using namespace ZORToolkit;
 using namespace review_tests;
 using testing::ElementsAre;
 
-std::vector<InterferenceGroup> GroupsOf(const TestResult& inResult, std::vector<GroupBy> inBy,
-                                        double inDistance = 50) {
-  const Loaded loaded(inResult);
+/// Groups, and the result that they are of.
+struct Grouped : InterferenceGroups {
+  Grouped(std::shared_ptr<const Loaded> inLoaded, const GroupOptions& inOptions)
+      : InterferenceGroups(GroupInterferences(inLoaded->result, inOptions)),
+        loaded(std::move(inLoaded)) {}
+  std::shared_ptr<const Loaded> loaded;
+};
+
+Grouped GroupsOf(const TestResult& inResult, std::vector<GroupBy> inBy, double inDistance = 50) {
   GroupOptions options;
   options.by = inBy;
   options.distance = inDistance;
-  return GroupInterferences(loaded.result, options);
+  return {std::make_shared<const Loaded>(inResult), options};
 }
 
-std::vector<std::string> Labels(const std::vector<InterferenceGroup>& inGroups) {
+std::vector<std::string> Labels(const GroupList& inGroups) {
   std::vector<std::string> labels;
-  for (const InterferenceGroup& group : inGroups) labels.push_back(group.label);
+  for (const InterferenceGroup group : inGroups) labels.push_back(group.Label());
   return labels;
+}
+
+std::vector<int> Members(const InterferenceGroup& inGroup) {
+  return {inGroup.Members().begin(), inGroup.Members().end()};
 }
 
 /// Three bolts in one plate, and a rod beside it.
@@ -48,24 +58,24 @@ TestResult Bolts() {
 TEST(Group, SamePartsInAnyOrderBelongTogether) {
   const auto groups = GroupsOf(Bolts(), {GroupBy::kParts});
   EXPECT_THAT(Labels(groups), ElementsAre("bolt x plate", "plate x rod"));
-  EXPECT_THAT(groups[0].members, ElementsAre(0, 1, 2));
-  EXPECT_EQ(1, groups[0].representative);
-  EXPECT_EQ(-3, groups[0].worst);
-  EXPECT_EQ(std::nullopt, groups[1].worst);
-  EXPECT_EQ(3, groups[1].representative);
+  EXPECT_THAT(Members(groups[0]), ElementsAre(0, 1, 2));
+  EXPECT_EQ(1, groups[0].Representative());
+  EXPECT_EQ(-3, groups[0].Worst());
+  EXPECT_EQ(std::nullopt, groups[1].Worst());
+  EXPECT_EQ(3, groups[1].Representative());
 }
 
 TEST(Group, GroupsAreNestedInTheOrderAsked) {
   const auto groups = GroupsOf(Bolts(), {GroupBy::kParts, GroupBy::kAssemblies, GroupBy::kPlace});
-  EXPECT_THAT(Labels(groups[0].groups), ElementsAre("a x a", "a x b"));
-  EXPECT_EQ(2u, groups[0].groups[0].groups.size());  // 0 and 100 are more than 50 apart
-  EXPECT_EQ(1u, groups[0].groups[1].groups.size());
+  EXPECT_THAT(Labels(groups[0].Groups()), ElementsAre("a x a", "a x b"));
+  EXPECT_EQ(2u, groups[0].Groups()[0].Groups().size());  // 0 and 100 are more than 50 apart
+  EXPECT_EQ(1u, groups[0].Groups()[1].Groups().size());
 }
 
 TEST(Group, PlacesAreChainsOfShortSteps) {
   const auto groups = GroupsOf(Bolts(), {GroupBy::kPlace}, 45);
   ASSERT_EQ(3u, groups.size());
-  EXPECT_THAT(groups[0].members, ElementsAre(1, 2));
+  EXPECT_THAT(Members(groups[0]), ElementsAre(1, 2));
   EXPECT_EQ(2u, GroupsOf(Bolts(), {GroupBy::kPlace}, 100).size());
 }
 
@@ -99,11 +109,11 @@ TEST(Group, ClustersAreThoseOfEveryPair) {
           isChanged = true;
         }
     }
-    for (const InterferenceGroup& group : GroupsOf(result, {GroupBy::kPlace}, 30)) {
-      const int expected = cluster[static_cast<std::size_t>(group.members[0])];
+    for (const InterferenceGroup group : GroupsOf(result, {GroupBy::kPlace}, 30)) {
+      const int expected = cluster[static_cast<std::size_t>(group.Members()[0])];
       EXPECT_EQ(std::ranges::count(cluster, expected),
-                static_cast<std::ptrdiff_t>(group.members.size()));
-      for (const int member : group.members)
+                static_cast<std::ptrdiff_t>(group.Members().size()));
+      for (const int member : group.Members())
         EXPECT_EQ(expected, cluster[static_cast<std::size_t>(member)]);
     }
   }
@@ -111,10 +121,14 @@ TEST(Group, ClustersAreThoseOfEveryPair) {
 
 TEST(Group, IsFoundByItsIdentifierAlsoInside) {
   const auto groups = GroupsOf(Bolts(), {GroupBy::kParts, GroupBy::kAssemblies});
-  const InterferenceGroup& inner = groups[0].groups[1];
-  EXPECT_EQ(&inner, FindGroup(groups, inner.Id()));
-  EXPECT_EQ(nullptr, FindGroup(groups, "none"));
-  EXPECT_NE(groups[0].groups[0].number, groups[0].groups[1].number);
+  const InterferenceGroup inner = groups[0].Groups()[1];
+  const auto found = groups.Find(inner.Id());
+  ASSERT_TRUE(found);
+  EXPECT_EQ("a x b", found->Label());
+  EXPECT_EQ(Members(inner), Members(*found));
+  EXPECT_FALSE(groups.Find("none"));
+  EXPECT_FALSE(groups.Find(""));
+  EXPECT_NE(groups[0].Groups()[0].Number(), inner.Number());
 }
 
 TEST(Group, EmptyResultHasNoGroups) {

@@ -7,12 +7,11 @@
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/JsonDocument.h"
-#include "lyra/commands/JsonFields.h"
 #include "lyra/commands/Model.h"
 #include "lyra/commands/PublishRun.h"
+#include "lyra/commands/RecordsJson.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Table.h"
-#include "toolkit/review/ReviewFields.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -51,7 +50,7 @@ void PrintJson(const Compared& inCompared, const DiffOptions& inOptions, Output&
     for (std::size_t k = 0; k < ids.size(); ++k) {
       const DiffEntry& entry = inCompared.diff.entries[k];
       if (entry.itsClass != itsClass) continue;
-      ioOutput.Write(lineBegin + JsonLine(JsonOf(IdentifiedEntry{entry, ids[k]})));
+      ioOutput.Write(lineBegin + JsonText(IdentifiedEntry{entry, ids[k]}));
       lineBegin = ",\n";
     }
     ioOutput.Write(*lineBegin == ',' ? "\n]" : "]");

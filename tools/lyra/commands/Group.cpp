@@ -6,11 +6,9 @@
 #include "lyra/Verbs.h"
 #include "lyra/commands/CommonOptions.h"
 #include "lyra/commands/GroupOptions.h"
-#include "lyra/commands/JsonDocument.h"
-#include "lyra/commands/JsonFields.h"
+#include "lyra/commands/RecordsJson.h"
 #include "lyra/commands/ReviewInput.h"
 #include "lyra/terminal/Table.h"
-#include "toolkit/review/ReviewFields.h"
 
 namespace lyra {
 using namespace ZORToolkit;
@@ -25,15 +23,15 @@ struct GroupOptionsOfVerb {
 };
 
 /// Groups inside one that hold no less than it are left out: they say nothing new.
-void AddRows(const std::vector<InterferenceGroup>& inGroups, int inDepth, Table& ioTable) {
-  for (const InterferenceGroup& group : inGroups) {
-    ioTable.Add({std::to_string(group.members.size()), group.worst ? Number(*group.worst).text : "",
-                 std::to_string(group.representative + 1), Name(group.by),
-                 std::string(2 * static_cast<std::size_t>(inDepth), ' ') + group.label,
-                 group.Id()});
-    const std::vector<InterferenceGroup>* inner = &group.groups;
-    while (inner->size() == 1) inner = &inner->front().groups;
-    AddRows(*inner, inDepth + 1, ioTable);
+void AddRows(const GroupList& inGroups, int inDepth, Table& ioTable) {
+  for (const InterferenceGroup group : inGroups) {
+    ioTable.Add(
+        {std::to_string(group.Members().size()), group.Worst() ? Number(*group.Worst()).text : "",
+         std::to_string(group.Representative() + 1), Name(group.By()),
+         std::string(2 * static_cast<std::size_t>(inDepth), ' ') + group.Label(), group.Id()});
+    GroupList inner = group.Groups();
+    while (inner.size() == 1) inner = inner[0].Groups();
+    AddRows(inner, inDepth + 1, ioTable);
   }
 }
 
@@ -41,13 +39,10 @@ int Group(const GroupOptionsOfVerb& inOptions, Output& ioOutput) {
   const GroupOptions options = inOptions.grouping.Get();
   ChooseLanguage(inOptions.language);
   ClashDocument document(inOptions.file);
-  const bool hasPlaces = std::ranges::count(options.by, GroupBy::kPlace) > 0;
-  const ReviewedResult result = ReadForReview(document, {.identities = hasPlaces});
+  const ReviewedResult result = ReadForReview(document, ReadingForGroups(options));
   const auto groups = GroupInterferences(result, options);
   if (inOptions.json) {
-    std::vector<OrderedJson> rows;
-    for (const InterferenceGroup& group : groups) rows.push_back(JsonOf(group));
-    ioOutput.Write(JsonRows(rows) + "\n");
+    WriteJsonLines(groups, ioOutput);
     return 0;
   }
   std::vector<TableColumn> columns;

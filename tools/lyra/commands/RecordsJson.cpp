@@ -99,6 +99,8 @@ std::string JsonText(const DocumentRecord& inRecord) { return TextOf(inRecord); 
 std::string JsonText(const ComponentRecord& inRecord) { return TextOf(inRecord); }
 std::string JsonText(const SpecificationRecord& inRecord) { return TextOf(inRecord); }
 std::string JsonText(const LinkRecord& inRecord) { return TextOf(inRecord); }
+std::string JsonText(const InterferenceGroup& inGroup) { return TextOf(inGroup); }
+std::string JsonText(const IdentifiedEntry& inEntry) { return TextOf(inEntry); }
 std::string JsonText(const ModelProductRecord& inRecord) { return JsonLine(ToJson(inRecord)); }
 std::string JsonText(const BcfProject& inProject) {
   Json topics = Json::array();

@@ -8,6 +8,7 @@
 #include "lyra/terminal/Output.h"
 #include "toolkit/exchange/bcf/BcfFile.h"
 #include "toolkit/records/RecordFields.h"
+#include "toolkit/review/ReviewFields.h"
 
 namespace lyra {
 
@@ -18,6 +19,8 @@ std::string JsonText(const ZORToolkit::DocumentRecord& inRecord);
 std::string JsonText(const ZORToolkit::ComponentRecord& inRecord);
 std::string JsonText(const ZORToolkit::SpecificationRecord& inRecord);
 std::string JsonText(const ZORToolkit::LinkRecord& inRecord);
+std::string JsonText(const ZORToolkit::InterferenceGroup& inGroup);
+std::string JsonText(const ZORToolkit::IdentifiedEntry& inEntry);
 std::string JsonText(const ModelProductRecord& inRecord);
 std::string JsonText(const ZORToolkit::BcfProject& inProject);
 

@@ -99,11 +99,12 @@ void PrintConflicts(const std::vector<ReviewConflict>& inConflicts, const Review
 std::vector<int> ChosenPositions(const ReviewOptions& inOptions, ReviewInput& ioInput) {
   std::unordered_set<int> ofGroup;
   if (!inOptions.group.empty()) {
-    const auto groups = GroupInterferences(ioInput.result, inOptions.grouping.Get());
-    const InterferenceGroup* const group = FindGroup(groups, inOptions.group);
-    if (group == nullptr)
+    const GroupOptions options = inOptions.grouping.Get();
+    const InterferenceGroups groups = GroupInterferences(ioInput.result, options);
+    const auto group = groups.Find(inOptions.group);
+    if (!group)
       throw InputError(ioInput.document.Name() + ": there is no group " + inOptions.group);
-    ofGroup.insert(group->members.begin(), group->members.end());
+    ofGroup.insert(group->Members().begin(), group->Members().end());
   }
   const RecordFilter filter = FilterOfConditions(inOptions.only);
   std::vector<int> positions;

@@ -52,9 +52,9 @@ class TopicPlanner {
     PlannedTopic topic;
     topic.id = inGroup.Id();
     topic.guid = GuidNamed("group " + topic.id);
-    topic.groupLabel = inGroup.label;
-    topic.members = inGroup.members;
-    topic.representative = inGroup.representative;
+    topic.groupLabel = inGroup.Label();
+    topic.members.assign(inGroup.Members().begin(), inGroup.Members().end());
+    topic.representative = inGroup.Representative();
     Describe(topic);
     return topic;
   }
@@ -123,7 +123,7 @@ std::vector<PlannedTopic> PlanTopics(const ReviewedResult& inResult,
   const TopicPlanner planner(inResult, inIds);
   std::vector<PlannedTopic> topics;
   if (inGrouping != nullptr) {
-    for (const InterferenceGroup& group : GroupInterferences(inResult, *inGrouping))
+    for (const InterferenceGroup group : GroupInterferences(inResult, *inGrouping))
       topics.push_back(planner.OfGroup(group));
     return topics;
   }

@@ -190,12 +190,14 @@ class WorkbookMaker {
   void WriteGroups() {
     GroupOptions grouping = options_.grouping;
     while (grouping.by.size() > 1) grouping.by.pop_back();
-    std::vector<InterferenceGroup> groups = GroupInterferences(rows_.Result(), grouping);
-    for (InterferenceGroup& group : groups)
-      std::erase_if(group.members, [&](int inMember) {
-        return !std::binary_search(accepted_.begin(), accepted_.end(), inMember);
+    const InterferenceGroups all = GroupInterferences(rows_.Result(), grouping);
+    std::vector<std::pair<InterferenceGroup, double>> groups;  // with how many are accepted
+    for (const InterferenceGroup group : all) {
+      const auto count = std::ranges::count_if(group.Members(), [&](int inMember) {
+        return std::binary_search(accepted_.begin(), accepted_.end(), inMember);
       });
-    std::erase_if(groups, [](const InterferenceGroup& inGroup) { return inGroup.members.empty(); });
+      if (count > 0) groups.emplace_back(group, static_cast<double>(count));
+    }
     SheetLayout layout;
     layout.name = "Groups";
     layout.columns = {{"Group", 50},
@@ -206,11 +208,12 @@ class WorkbookMaker {
     layout.rows = groups.size();
     book_->AddSheet(layout);
     for (std::size_t i = 0; i < groups.size(); ++i) {
-      book_->Text(i, 0, FittingCell(groups[i].label));
-      book_->Number(i, 1, static_cast<double>(groups[i].members.size()));
-      if (groups[i].worst) book_->Number(i, 2, *groups[i].worst);
-      book_->Number(i, 3, groups[i].representative + 1);
-      book_->Text(i, 4, groups[i].Id());
+      const auto& [group, count] = groups[i];
+      book_->Text(i, 0, FittingCell(group.Label()));
+      book_->Number(i, 1, count);
+      if (group.Worst()) book_->Number(i, 2, *group.Worst());
+      book_->Number(i, 3, group.Representative() + 1);
+      book_->Text(i, 4, group.Id());
     }
   }
 

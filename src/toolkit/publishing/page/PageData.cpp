@@ -8,22 +8,22 @@ namespace {
 using Json = nlohmann::ordered_json;
 
 /// The groups of what the page shows; empty ones are left out.
-Json JsonOf(const std::vector<InterferenceGroup>& inGroups, const ReviewedResult& inResult,
+Json JsonOf(const GroupList& inGroups, const ReviewedResult& inResult,
             const std::vector<bool>& inIsShown) {
   Json groups = Json::array();
-  for (const InterferenceGroup& group : inGroups) {
+  for (const InterferenceGroup group : inGroups) {
     Json members = Json::array();
-    for (const int member : group.members) {
+    for (const int member : group.Members()) {
       const auto position = static_cast<std::size_t>(member);
       if (inIsShown[position]) members.push_back(inResult.interferences[position].index);
     }
     if (members.empty()) continue;
     Json json = {{"id", group.Id()},
-                 {"by", Name(group.by)},
-                 {"label", group.label},
+                 {"by", Name(group.By())},
+                 {"label", group.Label()},
                  {"members", members},
-                 {"groups", JsonOf(group.groups, inResult, inIsShown)}};
-    if (group.worst) json["worst"] = *group.worst;
+                 {"groups", JsonOf(group.Groups(), inResult, inIsShown)}};
+    if (group.Worst()) json["worst"] = *group.Worst();
     groups.push_back(json);
   }
   return groups;

@@ -17,7 +17,7 @@ void TakeChange(const DiffEntry& inEntry, PublishedInterference& outPublished) {
   outPublished.change = isComparable ? Name(inEntry.itsClass) : "not comparable";
   outPublished.reason = inEntry.reason;
   for (const Change& change : inEntry.changes)
-    outPublished.changes.push_back({std::string(change.what), change.from, change.to});
+    outPublished.changes.push_back({change.what, std::string(change.from), std::string(change.to)});
 }
 
 }  // namespace
