@@ -80,7 +80,8 @@ Steps DiffWithZORLyra(const Arguments& inArguments);
 /// Steps "load" of two documents and "carry": read both, match, and set the decisions of the first
 /// in the second.
 Steps CarryWithZORLyra(const Arguments& inArguments);
-/// Steps "load" and "group", or "gate": read, and group or judge.
+/// Steps "load", "group": read and group, and "identifiers": all labels and identifiers of groups.
+/// Or "load" and "gate": read and judge.
 Steps GroupWithZORLyra(const Arguments& inArguments);
 Steps GateWithZORLyra(const Arguments& inArguments);
 

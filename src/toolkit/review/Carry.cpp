@@ -42,7 +42,7 @@ class CarryPlanner {
       : old_(inOld), new_(inNew), keepChanged_(inKeepChanged) {}
 
   CarryPlan Plan(const ResultDiff& inDiff) {
-    plan_.edits.reserve(new_.interferences.size());
+    plan_.edits.reserve(new_.interferences.size());  // memory that is not used costs nothing
     for (const DiffEntry& entry : inDiff.entries) {
       if (entry.newPosition < 0) {
         plan_.left += IsDecided(RecordAt(old_, entry.oldPosition));
@@ -52,7 +52,10 @@ class CarryPlanner {
       edit.position = entry.newPosition;
       edit.retrieve = entry.oldPosition < 0 ? "New" : "Old";
       if (entry.oldPosition >= 0) Carry(entry, edit);
-      plan_.edits.push_back(std::move(edit));
+      const ReviewRecord& is = RecordAt(new_, entry.newPosition);
+      if (edit.retrieve != is.retrieve || (edit.status && *edit.status != is.status) ||
+          (edit.comment && *edit.comment != is.comment))
+        plan_.edits.push_back(std::move(edit));
     }
     return std::move(plan_);
   }
@@ -155,7 +158,8 @@ int ApplyReviewEdits(ClashDocument& ioDocument, const ReviewedResult& inResult,
     if (!hasStatus && !hasComment && !hasRetrieve) continue;
     const ElementHandle element = inResult.ElementOf(record);
     if (hasStatus) edit.SetStatusAsWritten(element, language.Translate(*wanted.status));
-    if (hasRetrieve) edit.SetRetrieveAsWritten(element, language.Translate(*wanted.retrieve));
+    if (hasRetrieve)
+      edit.SetRetrieveAsWritten(element, language.Translate(std::string(*wanted.retrieve)));
     if (hasComment) edit.SetComment(element, *wanted.comment);
     ++count;
   }

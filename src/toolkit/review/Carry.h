@@ -18,7 +18,7 @@ struct ReviewEdit {
   std::optional<std::string>
       status;  ///< "Relevant", "Irrelevant", "Not inspected" or a text as it is
   std::optional<std::string> comment;
-  std::optional<std::string> retrieve;  ///< "Old" or "New"
+  std::optional<std::string_view> retrieve;  ///< "Old" or "New", for good
 };
 
 /// Writes into a document what differs from what it says, in the language of its words. Everything
@@ -29,7 +29,7 @@ ZOR_TOOLKIT_EXPORT int ApplyReviewEdits(ClashDocument& ioDocument, const Reviewe
                                         std::span<const ReviewEdit> inEdits);
 
 struct CarryPlan {
-  std::vector<ReviewEdit> edits;  ///< of the new result
+  std::vector<ReviewEdit> edits;  ///< of the new result, where it says something else
   int carried = 0;                ///< decisions of the old result that hold
   int reopened = 0;               ///< decisions that have to be made again
   int replaced = 0;               ///< other decisions of the new result that gave way to old ones

@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <bit>
 #include <charconv>
-#include <compare>
 #include <map>
 #include <tuple>
 
@@ -84,7 +83,6 @@ class ProductMatcher {
   struct Texts {
     std::string_view name, part;
     bool operator==(const Texts&) const = default;
-    auto operator<=>(const Texts&) const = default;
   };
   struct LeftOver {
     std::uint64_t hash;  // of the texts, which mostly decides
@@ -92,8 +90,10 @@ class ProductMatcher {
     bool isNew;
     int product;
     bool operator<(const LeftOver& inOther) const {
-      return std::tie(hash, texts, isNew, product) <
-             std::tie(inOther.hash, inOther.texts, inOther.isNew, inOther.product);
+      const auto order = [](const LeftOver& inOne) {
+        return std::tie(inOne.hash, inOne.texts.name, inOne.texts.part, inOne.isNew, inOne.product);
+      };
+      return order(*this) < order(inOther);
     }
   };
 

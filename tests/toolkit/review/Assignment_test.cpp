@@ -84,6 +84,74 @@ TEST(Assignment, CostIsThatOfTheBestPermutation) {
   }
 }
 
+/// The least cost by the Hungarian method on all pairs (H. W. Kuhn, 1955), where what lies too far
+/// costs as much as a row that stays alone.
+double LeastCost(const Points& inRows, const Points& inColumns) {
+  const std::size_t count = inRows.size() + inColumns.size();  // with room for all to stay alone
+  const auto cost = [&](std::size_t inRow, std::size_t inColumn) {
+    if (inRow >= inRows.size()) return 0.0;
+    if (inColumn >= inColumns.size()) return kCosts.unassigned;
+    const auto &a = inRows[inRow].at, &b = inColumns[inColumn].at;
+    const bool isFar = std::hypot(a[0] - b[0], a[1] - b[1], a[2] - b[2]) > kCosts.maxDistance;
+    return isFar ? kCosts.unassigned : Cost(inRows[inRow], inColumns[inColumn]);
+  };
+  std::vector<double> ofRow(count + 1), ofColumn(count + 1);
+  std::vector<std::size_t> rowOf(count + 1), before(count + 1);
+  for (std::size_t row = 1; row <= count; ++row) {
+    rowOf[0] = row;
+    std::vector<double> least(count + 1, HUGE_VAL);
+    std::vector<char> isUsed(count + 1);
+    std::size_t at = 0;
+    for (; rowOf[at] != 0; at = before[0]) {
+      isUsed[at] = 1;
+      double delta = HUGE_VAL;
+      std::size_t next = 0;
+      for (std::size_t column = 1; column <= count; ++column) {
+        if (isUsed[column]) continue;
+        const double reduced =
+            cost(rowOf[at] - 1, column - 1) - ofRow[rowOf[at]] - ofColumn[column];
+        if (reduced < least[column]) {
+          least[column] = reduced;
+          before[column] = at;
+        }
+        if (least[column] < delta) {
+          delta = least[column];
+          next = column;
+        }
+      }
+      for (std::size_t column = 0; column <= count; ++column) {
+        if (isUsed[column]) {
+          ofRow[rowOf[column]] += delta;
+          ofColumn[column] -= delta;
+        } else {
+          least[column] -= delta;
+        }
+      }
+      before[0] = next;
+    }
+    for (std::size_t column = at; column != 0; column = before[column])
+      rowOf[column] = rowOf[before[column]];
+  }
+  double sum = 0;
+  for (std::size_t column = 1; column <= count; ++column)
+    sum += cost(rowOf[column] - 1, column - 1);
+  return sum;
+}
+
+TEST(Assignment, CostIsThatOfTheBestAmongAllPairs) {
+  std::mt19937 random(16);
+  for (int round = 0; round < 120; ++round) {
+    // From crowds, in which all may touch all, to points that mostly stay alone.
+    const double size = 5 + 3.0 * round;
+    Points rows = RandomPoints(random, 9 + random() % 20, size);
+    Points columns = RandomPoints(random, 9 + random() % 20, size);
+    for (AssignmentPoint& point : rows) point.at[0] -= size / 2;  // on both sides of zero
+    for (AssignmentPoint& point : columns) point.at[0] -= size / 2;
+    const Assignment best = BestAssignment(rows, columns, kCosts);
+    EXPECT_NEAR(LeastCost(rows, columns), CostOf(rows, columns, best.columnOfRow), 1e-6) << round;
+  }
+}
+
 double SecondsFor(const Points& inRows, const Points& inColumns, std::size_t& outAssigned) {
   const auto begin = std::chrono::steady_clock::now();
   const Assignment best = BestAssignment(inRows, inColumns, {10, 1, 1e12});

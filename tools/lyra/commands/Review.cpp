@@ -73,8 +73,18 @@ Preference PreferenceOf(const ReviewOptions& inOptions) {
                                                                      : Preference::kTheirs;
 }
 
+/// Which decision stands now.
+void NoteConflicts(std::size_t inCount, const ReviewOptions& inOptions) {
+  const bool isTheirs = PreferenceOf(inOptions) == Preference::kTheirs;
+  std::fprintf(stderr, "note: %zu conflict%s, %s as %s has them%s\n", inCount,
+               inCount == 1 ? "" : "s", inOptions.prefer.empty() ? "left" : "settled",
+               isTheirs ? "theirs" : "mine",
+               inOptions.prefer.empty() ? "; --prefer mine or theirs settles them" : "");
+}
+
 void PrintConflicts(const std::vector<ReviewConflict>& inConflicts, const ReviewOptions& inOptions,
                     Output& ioOutput) {
+  if (!inConflicts.empty()) NoteConflicts(inConflicts.size(), inOptions);
   std::string text;
   if (inOptions.json) {
     std::vector<OrderedJson> rows;
