@@ -2,6 +2,8 @@
 #ifndef ZOR_DEFAULT_PLATFORM_TREE_READER_H
 #define ZOR_DEFAULT_PLATFORM_TREE_READER_H
 
+#include <array>
+
 #include "default_platform/xml/DOM_HandleAccess.h"
 
 namespace ZORDefault {
@@ -35,6 +37,15 @@ class TreeReader {
       if (record.kind == DOM_Node::ELEMENT_NODE) inVisit(child, record.name);
       child = record.next;
     }
+  }
+
+  /// Where an element lies, its first attribute, and the text of that; null where there is none. What
+  /// comes next in the document mostly lies behind them.
+  std::array<const char*, 3> PlacesOf(Element inElement) const {
+    const DOM_Tree::AttributeRecord* const attribute = FirstAttribute(inElement);
+    const DOM_Text* const text = attribute == nullptr ? nullptr : &TextOf(*attribute);
+    return {reinterpret_cast<const char*>(&tree_->At(inElement)),
+            reinterpret_cast<const char*>(attribute), reinterpret_cast<const char*>(text)};
   }
 
   // The same step by step, for whoever walks two trees side by side

@@ -75,11 +75,13 @@ Preference PreferenceOf(const ReviewOptions& inOptions) {
 
 /// Which decision stands now.
 void NoteConflicts(std::size_t inCount, const ReviewOptions& inOptions) {
+  const bool isOpen = inOptions.prefer.empty();
   const bool isTheirs = PreferenceOf(inOptions) == Preference::kTheirs;
-  std::fprintf(stderr, "note: %zu conflict%s, %s as %s has them%s\n", inCount,
-               inCount == 1 ? "" : "s", inOptions.prefer.empty() ? "left" : "settled",
-               isTheirs ? "theirs" : "mine",
-               inOptions.prefer.empty() ? "; --prefer mine or theirs settles them" : "");
+  std::string text("note: conflicts: ");
+  text.append(std::to_string(inCount)).append(isOpen ? ", left" : ", settled");
+  text.append(isTheirs ? " as in theirs" : " as in mine");
+  if (isOpen) text += "; settle by --prefer mine or theirs";
+  WriteError(text.append(1, '\n'));
 }
 
 void PrintConflicts(const std::vector<ReviewConflict>& inConflicts, const ReviewOptions& inOptions,
