@@ -54,9 +54,10 @@ FileError WhyNotOpened(const std::string& inPath) {
 }
 
 // Closed: a writer may put another file in its place, which Windows allows of none that is open.
+// The path is marked where it is long, which other libraries do not do.
 std::string Utf8PathOf(int& ioDescriptor, const std::string& inPath) {
   if (ioDescriptor >= 0) CloseDescriptor(std::exchange(ioDescriptor, -1));
-  return inPath;
+  return Utf8Text(WidePath(inPath));
 }
 
 int CutHere(int inDescriptor) {

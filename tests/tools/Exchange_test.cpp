@@ -154,7 +154,7 @@ TEST(ConvertToBcf, WritesWhatTheOfficialSchemasAllow) {
 
 TEST(ConvertToBcf, WritesATopicForEachGroup) {
   const TemporaryDirectory folder;
-  const std::string file = folder.Path("groups.bcf");
+  const std::string file = folder.Path("\u5E72\u6E09\U0001F680.bcf");
   const json written = json::parse(Lyra(
       {"convert", kResult, "--to", "bcf", "--group", "--json", "--size", "60x40", "-o", file}));
   ExpectValid(file, "2.1");
@@ -232,7 +232,7 @@ TEST(ReviewImport, SaysWhatItDoesNotKnow) {
 
 TEST(ConvertToXlsx, WritesTypedCellsForEditing) {
   const TemporaryDirectory folder;
-  const std::string file = folder.Path("a.xlsx");
+  const std::string file = folder.Path("\u5E72\u6E09\U0001F680.xlsx");
   const json written =
       json::parse(Lyra({"convert", kResult, "--to", "xlsx", "--json", "-o", file}));
   EXPECT_EQ(written["interferences"], 32);

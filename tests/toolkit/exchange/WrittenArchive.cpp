@@ -9,6 +9,8 @@
 #include <initializer_list>
 #include <sstream>
 
+#include "foundation/NativePath.h"
+
 std::string WriteArchive(const std::string& inName, const Entries& inEntries, bool inIsEncrypted) {
   const std::string path = testing::TempDir() + inName;
   std::remove(path.c_str());
@@ -71,7 +73,7 @@ std::string WriteBytes(const std::string& inName, const std::string& inBytes) {
 
 std::string ReadBytes(const std::string& inPath) {
   std::ostringstream bytes;
-  bytes << std::ifstream(inPath, std::ios::binary).rdbuf();
+  bytes << std::ifstream(ZORFoundation::NativePath(inPath), std::ios::binary).rdbuf();
   return bytes.str();
 }
 
