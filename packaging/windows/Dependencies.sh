@@ -125,7 +125,7 @@ BuildModelDependencies() {
   BuildWithCMake libxslt . -DLIBXSLT_WITH_{CRYPTO,MODULES,PROGRAMS,PYTHON,TESTS}=OFF
   BuildNettle
   # The mirror lacks Debian's changes to it.
-  ORIGINAL=yes BuildWithCMake embree . -DEMBREE_MAX_ISA=AVX2 -DEMBREE_STATIC_LIB=ON \
+  ORIGINAL=yes BuildWithCMake embree . -DEMBREE_MAX_ISA=SSE4.2 -DEMBREE_STATIC_LIB=ON \
     -DCMAKE_PROJECT_embree3_INCLUDE="$top/packaging/windows/embree/Project.cmake" -DEMBREE_TASKING_SYSTEM=INTERNAL \
     -DEMBREE_{ISPC_SUPPORT,TUTORIALS}=OFF -DBUILD_TESTING=OFF \
     -DEMBREE_GEOMETRY_{CURVE,GRID,POINT,QUAD,SUBDIVISION,USER}=OFF

@@ -22,5 +22,5 @@ if [ -z "$lyra" ]; then
   echo "windows: no command for this system was found, so the pictures were not compared: see --compare-with"
   exit 0
 fi
-"$lyra" publish $result --model $model -o "$work/own"
+"$lyra" publish $result --model $model -o "$work/own" || Fail "$lyra did not publish it, so the pictures were not compared"
 /usr/bin/python3 packaging/windows/ComparePictures.py "$work/windows/pictures" "$work/own/pictures"
