@@ -124,8 +124,8 @@ BuildModelDependencies() {
   BuildWithCMake libxml2 . -DLIBXML2_WITH_{FTP,HTTP,ICONV,LZMA,PROGRAMS,PYTHON,TESTS,ZLIB}=OFF
   BuildWithCMake libxslt . -DLIBXSLT_WITH_{CRYPTO,MODULES,PROGRAMS,PYTHON,TESTS}=OFF
   BuildNettle
-  # The mirror lacks Debian's changes to it.
-  ORIGINAL=yes BuildWithCMake embree . -DEMBREE_MAX_ISA=SSE4.2 -DEMBREE_STATIC_LIB=ON \
+  # The mirror lacks Debian's changes to it. The compiler is Debian's, which makes code for AVX that needs no aligned stack.
+  ORIGINAL=yes BuildWithCMake embree . -DEMBREE_MAX_ISA=AVX2 -DEMBREE_STATIC_LIB=ON \
     -DCMAKE_PROJECT_embree3_INCLUDE="$top/packaging/windows/embree/Project.cmake" -DEMBREE_TASKING_SYSTEM=INTERNAL \
     -DEMBREE_{ISPC_SUPPORT,TUTORIALS}=OFF -DBUILD_TESTING=OFF \
     -DEMBREE_GEOMETRY_{CURVE,GRID,POINT,QUAD,SUBDIVISION,USER}=OFF

@@ -7,7 +7,7 @@ file(TOUCH ${CMAKE_CURRENT_SOURCE_DIR}/readme.pdf)
 # Leaves out its resources, which windres does not read, as they are in UTF-16, and what meets rays with curves, which
 # nothing asks for when it is built without them and which takes most of the time.
 function(zor_leave_out_sources)
-  foreach(target embree embree_sse42)
+  foreach(target embree embree_sse42 embree_avx embree_avx2)
     get_target_property(sources ${target} SOURCES)
     get_target_property(folder ${target} SOURCE_DIR)
     list(FILTER sources INCLUDE REGEX "(embree\\.rc|/curve_intersector_virtual_[^/]*\\.cpp)$")
