@@ -22,8 +22,8 @@ bool IsLatin1(std::u16string_view inUnits) {
 // Stored texts are as narrow as they can be, so equal ones have units of one size.
 bool AreSameAsStored(TextView inA, TextView inB) {
   return inA.IsWide() == inB.IsWide() && inA.Length() == inB.Length() &&
-         AreSameBytes(static_cast<const char*>(inA.Data()), static_cast<const char*>(inB.Data()),
-                      inA.Bytes());
+         ZORFoundation::AreSameBytes(static_cast<const char*>(inA.Data()),
+                                     static_cast<const char*>(inB.Data()), inA.Bytes());
 }
 
 }  // namespace
@@ -85,7 +85,7 @@ TextRef TextStore::AddStored(TextView inText) {
 }
 
 inline TextRef TextStore::AddShared(TextView inText) {
-  const std::uint64_t hash = HashOfBytes(inText.Data(), inText.Bytes());
+  const std::uint64_t hash = ZORFoundation::HashOfBytes(inText.Data(), inText.Bytes());
   Shared& slot = shared_[hash % kSharedSlots];
   if (slot.text == 0 || slot.hash != hash || !AreSameAsStored((*this)[slot.text].View(), inText))
     slot = {hash, AddUnshared(inText)};
@@ -136,7 +136,7 @@ const char16_t* TextStore::Widen(const DOM_Text& inText) {
 TextStore::Widened& TextStore::SlotOf(const DOM_Text* inNarrow) {
   const std::size_t mask = widened_.size() - 1;
   const auto address = reinterpret_cast<std::uintptr_t>(inNarrow);
-  std::size_t slot = HashOfBytes(&address, sizeof address) & mask;
+  std::size_t slot = ZORFoundation::HashOfBytes(&address, sizeof address) & mask;
   while (widened_[slot].narrow != nullptr && widened_[slot].narrow != inNarrow)
     slot = (slot + 1) & mask;
   return widened_[slot];
@@ -164,7 +164,8 @@ NameTable::NameTable(TextStore& ioTexts) : texts_(ioTexts), names_(1), slots_(kF
 
 std::size_t NameTable::SlotOf(std::u16string_view inName) const {
   const std::size_t mask = slots_.size() - 1;
-  std::size_t slot = HashOfBytes(inName.data(), inName.size() * sizeof(char16_t)) & mask;
+  std::size_t slot =
+      ZORFoundation::HashOfBytes(inName.data(), inName.size() * sizeof(char16_t)) & mask;
   while (slots_[slot] != 0 && !IsSameText(UnitsOf(slots_[slot]), inName)) slot = (slot + 1) & mask;
   return slot;
 }

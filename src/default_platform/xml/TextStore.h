@@ -12,36 +12,7 @@
 #include <vector>
 
 #include "default_platform/xml/Latin1.h"
-
-/// Up to seven bytes as a number, different for different bytes of one count; free of calls.
-inline std::uint64_t ShortBytes(const char* inBytes, std::size_t inCount) {
-  if (inCount >= 4) {
-    std::uint32_t first = 0, last = 0;
-    std::memcpy(&first, inBytes, 4);
-    std::memcpy(&last, inBytes + inCount - 4, 4);
-    return first | std::uint64_t{last} << 32;
-  }
-  if (inCount == 0) return 0;
-  const auto byte = [&](std::size_t inAt) {
-    return std::uint64_t{static_cast<unsigned char>(inBytes[inAt])};
-  };
-  return byte(0) | byte(inCount / 2) << 8 | byte(inCount - 1) << 16;
-}
-
-/// As memcmp, without a call: most texts and names are short.
-inline bool AreSameBytes(const char* inA, const char* inB, std::size_t inCount) {
-  constexpr std::size_t kLong = 64;
-  if (inCount < 8) return ShortBytes(inA, inCount) == ShortBytes(inB, inCount);
-  if (inCount > kLong) return std::memcmp(inA, inB, inCount) == 0;
-  const auto eight = [](const char* inBytes) {
-    std::uint64_t bytes = 0;
-    std::memcpy(&bytes, inBytes, 8);
-    return bytes;
-  };
-  for (std::size_t i = 0; i + 8 < inCount; i += 8)
-    if (eight(inA + i) != eight(inB + i)) return false;
-  return eight(inA + inCount - 8) == eight(inB + inCount - 8);
-}
+#include "foundation/Bytes.h"
 
 /// As ==, which the standard library does unit by unit.
 inline bool IsSameText(std::u16string_view inA, std::u16string_view inB) {
@@ -121,7 +92,7 @@ class TextStore {
   /// As Add. After a long run of different texts, as of numbers, only the last one is compared.
   TextRef Add(std::string_view inLatin1, TextSeries& ioSeries) {
     if (ioSeries.last == nullptr || ioSeries.last->head != inLatin1.size() ||
-        !AreSameBytes(ioSeries.last->Latin1(), inLatin1.data(), inLatin1.size()))
+        !ZORFoundation::AreSameBytes(ioSeries.last->Latin1(), inLatin1.data(), inLatin1.size()))
       return AddOther(inLatin1, ioSeries);
     ioSeries.newInARow = 0;
     return ioSeries.lastRef;
@@ -211,20 +182,5 @@ class NameTable {
   // address, all ASCII.
   mutable std::array<Found, kFound> found_{};
 };
-
-/// A fast hash of bytes, eight at a time.
-inline std::uint64_t HashOfBytes(const void* inBytes, std::size_t inCount) {
-  constexpr std::uint64_t kFactor = 0x9E3779B97F4A7C15u;
-  std::uint64_t hash = inCount * kFactor;
-  const char* at = static_cast<const char*>(inBytes);
-  for (; inCount >= 8; inCount -= 8, at += 8) {
-    std::uint64_t part = 0;
-    std::memcpy(&part, at, 8);
-    hash = (hash ^ part) * kFactor;
-    hash ^= hash >> 29;
-  }
-  if (inCount > 0) hash = (hash ^ ShortBytes(at, inCount)) * kFactor;
-  return hash ^ (hash >> 32);
-}
 
 #endif

@@ -268,13 +268,13 @@ const char* Utf8FastPath::NameEnd(const char* inPlace) const {
 
 Utf8FastPath::Name& Utf8FastPath::FindName(const char* inPlace, const char* inEnd) {
   const auto length = static_cast<std::size_t>(inEnd - inPlace);
-  const std::uint64_t hash = HashOfBytes(inPlace, length);
+  const std::uint64_t hash = ZORFoundation::HashOfBytes(inPlace, length);
   const std::size_t mask = slots_.size() - 1;
   std::size_t slot = hash & mask;
   for (; slots_[slot] != nullptr; slot = (slot + 1) & mask) {
     Name& known = *slots_[slot];
     if (known.hash == hash && known.utf8.size() == length &&
-        AreSameBytes(inPlace, known.utf8.data(), length))
+        ZORFoundation::AreSameBytes(inPlace, known.utf8.data(), length))
       return known;
   }
   text_.clear();

@@ -18,7 +18,7 @@ struct ReviewEdit {
   std::optional<std::string>
       status;  ///< "Relevant", "Irrelevant", "Not inspected" or a text as it is
   std::optional<std::string> comment;
-  std::optional<std::string_view> retrieve;  ///< "Old" or "New", for good
+  std::optional<std::string_view> retrieve;  ///< "Old" or "New", a literal
 };
 
 /// Writes into a document what differs from what it says, in the language of its words. Everything

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <cmath>
 
-#include "default_platform/xml/TextStore.h"
+#include "foundation/Bytes.h"
 #include "foundation/Hash.h"
 #include "toolkit/review/Comparability.h"
 #include "toolkit/review/ProductMatch.h"
@@ -71,7 +71,8 @@ class Differ {
   }
 
   static bool IsSame(std::string_view inA, std::string_view inB) {
-    return inA.size() == inB.size() && AreSameBytes(inA.data(), inB.data(), inA.size());
+    return inA.size() == inB.size() &&
+           ZORFoundation::AreSameBytes(inA.data(), inB.data(), inA.size());
   }
 
   /// @return what is added to the changes of all entries.

@@ -4,7 +4,7 @@
 #include <array>
 #include <numeric>
 
-#include "default_platform/xml/TextStore.h"
+#include "foundation/Bytes.h"
 
 namespace ZORToolkit {
 namespace {
@@ -54,7 +54,7 @@ class TextNumbers {
 
   std::uint32_t NumberOfOther(std::string_view inText) {
     if (2 * (texts_.size() + 1) > slots_.size()) Grow();
-    const std::uint64_t hash = HashOfBytes(inText.data(), inText.size());
+    const std::uint64_t hash = ZORFoundation::HashOfBytes(inText.data(), inText.size());
     const std::size_t mask = slots_.size() - 1;
     std::size_t slot = hash & mask;
     const auto tag = static_cast<std::uint32_t>(hash >> 32);
@@ -68,14 +68,15 @@ class TextNumbers {
 
   bool IsText(std::uint32_t inNumber, std::string_view inText) const {
     const std::string_view text = texts_[inNumber];
-    return text.size() == inText.size() && AreSameBytes(text.data(), inText.data(), text.size());
+    return text.size() == inText.size() &&
+           ZORFoundation::AreSameBytes(text.data(), inText.data(), text.size());
   }
 
   void Grow() {
     slots_.assign(4 * slots_.size(), {});
     const std::size_t mask = slots_.size() - 1;
     for (std::uint32_t i = 0; i < texts_.size(); ++i) {
-      const std::uint64_t hash = HashOfBytes(texts_[i].data(), texts_[i].size());
+      const std::uint64_t hash = ZORFoundation::HashOfBytes(texts_[i].data(), texts_[i].size());
       std::size_t slot = hash & mask;
       while (slots_[slot].number != 0) slot = (slot + 1) & mask;
       slots_[slot] = {static_cast<std::uint32_t>(hash >> 32), i + 1};

@@ -6,6 +6,7 @@
 #include <map>
 #include <tuple>
 
+#include "foundation/Bytes.h"
 #include "toolkit/review/Assignment.h"
 #include "toolkit/review/Frames.h"
 #include "toolkit/review/ReviewSource.h"
@@ -115,8 +116,9 @@ class ProductMatcher {
         const Texts texts = inTextsOf(product);
         if (texts.name.empty()) continue;
         if (inMaxDistance < kUnlimited && !inResult.PlacementOf(product.element)) continue;
-        const std::uint64_t hash = Mix(HashOfBytes(texts.name.data(), texts.name.size()),
-                                       HashOfBytes(texts.part.data(), texts.part.size()));
+        const std::uint64_t hash =
+            Mix(ZORFoundation::HashOfBytes(texts.name.data(), texts.name.size()),
+                ZORFoundation::HashOfBytes(texts.part.data(), texts.part.size()));
         leftOver.push_back({hash, texts, inIsNew, static_cast<int>(i)});
       }
     };

@@ -3,6 +3,7 @@
 #include <bit>
 #include <utility>
 
+#include "foundation/Bytes.h"
 #include "foundation/Utf8.h"
 #include "toolkit/review/ReviewSource.h"
 
@@ -145,7 +146,8 @@ void ReviewSource::AddAttributes(Element inElement, std::uint64_t& ioHash) const
       return part;
     };
     for (std::size_t at = 0; at + 8 < count; at += 8) hash = Mix(hash, eight(at));
-    const std::uint64_t last = count <= 8 ? ShortBytes(bytes, count) : eight(count - 8);
+    const std::uint64_t last =
+        count <= 8 ? ZORFoundation::ShortBytes(bytes, count) : eight(count - 8);
     const std::uint64_t what = static_cast<std::uint64_t>(inNamed) << 32 | inText->head;
     hash = Mix(hash, last * kOtherFactor + what);
   });

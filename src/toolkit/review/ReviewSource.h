@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "default_platform/TreeReader.h"
+#include "foundation/Bytes.h"
 #include "toolkit/review/ReviewRecords.h"
 
 namespace ZORToolkit {
@@ -61,10 +62,11 @@ typedef const DOM_Text* StoredText;
 
 inline bool IsSame(StoredText inA, StoredText inB) {
   if (inA == inB || inA == nullptr || inB == nullptr) return inA == inB;
-  return inA->head == inB->head && AreSameBytes(inA->Latin1(), inB->Latin1(), inA->View().Bytes());
+  return inA->head == inB->head &&
+         ZORFoundation::AreSameBytes(inA->Latin1(), inB->Latin1(), inA->View().Bytes());
 }
 inline std::uint64_t HashOf(StoredText inText) {
-  return HashOfBytes(inText + 1, inText->View().Bytes()) ^ inText->head;
+  return ZORFoundation::HashOfBytes(inText + 1, inText->View().Bytes()) ^ inText->head;
 }
 
 /// A step of a hash of numbers.
@@ -171,7 +173,7 @@ class ReviewSource {
   std::optional<Placement> PlacementIn(Element inMatrix) const;
   static bool IsAsciiText(const char* inBytes, std::size_t inCount) {
     constexpr std::uint64_t kHighBits = 0x8080808080808080u;
-    if (inCount <= 8) return (ShortBytes(inBytes, inCount) & kHighBits) == 0;
+    if (inCount <= 8) return (ZORFoundation::ShortBytes(inBytes, inCount) & kHighBits) == 0;
     std::uint64_t all = 0, part = 0;
     for (std::size_t at = 0; at + 8 < inCount; at += 8) {
       std::memcpy(&part, inBytes + at, sizeof part);
