@@ -59,18 +59,6 @@ zor_leave_out(ZORLyraXMLServicesFiles_test "a full device of Unix"
   TreeDump.OnAFullDiskGivesThePlatformsCode)
 zor_leave_out(ZORSettingRepository_test "a user's own settings are in another folder of Unix"
   ZORSettingRepository.HomeHoldsTheUserDirectoryByDefault)
-if(NOT ZOR_WITH_UNITS)
-  zor_leave_out(InterfaceRegistry_test "units of quantities are not built"
-    Interfaces.OfMagnitudesAndUnitsAreFoundByName)
-  zor_leave_out(ZORLyraGeneralServices_test "units of quantities are not built"
-    ZORLyraGeneralServices.ConvertValueInMMReadsALengthWithItsUnit
-    ZORLyraGeneralServices.ConvertValueInMMReadsABareNumberAsMillimetres
-    ZORLyraGeneralServices.ConvertValueInMMToleratesBlanks
-    ZORLyraGeneralServices.ConvertValueInMMOfUnreadableTextIsItsMarker
-    ZORLyraGeneralServices.ConvertValueInMMOfAnEmptyTextIsItsMarker
-    ZORLyraGeneralServices.ConvertValueInMMGivesNegativeLengths
-    ZORLyraGeneralServices.ConvertValueInMMGivesLengthsThatEqualAMarker)
-endif()
 zor_leave_out(BadInput_test "permissions, pipes and limits of Unix"
   BadInput.UnreadableFileIsRefused BadInput.PipeWithoutWriterIsRefusedAtOnce BadInput.DeviceIsRefused
   BadInput.DocumentBeyondTheMemoryIsRefused)

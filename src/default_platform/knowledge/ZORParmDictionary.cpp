@@ -1,36 +1,20 @@
 #include "platform/knowledge/ZORParmDictionary.h"
 
-#include <udunits2.h>
-
 #include <charconv>
 #include <cmath>
 #include <cstring>
 #include <map>
-#include <memory>
 #include <mutex>
 #include <optional>
 #include <string>
 #include <string_view>
 #include <utility>
 
-#include "default_platform/system/CLocale.h"
+#include "default_platform/knowledge/UnitConversion.h"
 
 namespace {
 
-using ZORDefault::CLocaleScope;
-
 // ---- quantities
-
-// The dictionary of the installed UDUNITS-2; null when it cannot be read. Reading takes about ten
-// milliseconds, so it waits until a unit is asked for. Numbers in it have decimal points.
-ut_system* UnitSystem() {
-  static ut_system* const system = [] {
-    const CLocaleScope cLocale;
-    ut_set_error_message_handler(&ut_ignore);
-    return ut_read_xml(nullptr);
-  }();
-  return system;
-}
 
 bool IsLetter(char inByte) {
   return (inByte >= 'a' && inByte <= 'z') || (inByte >= 'A' && inByte <= 'Z') ||
@@ -57,28 +41,6 @@ bool IsProductOfUnits(std::string_view inUnit) {
   return true;
 }
 
-using UnitPointer = std::unique_ptr<ut_unit, decltype(&ut_free)>;
-
-UnitPointer ParseUnit(const std::string& inUnit) {
-  return UnitPointer(ut_parse(UnitSystem(), inUnit.c_str(), UT_UTF8), &ut_free);
-}
-
-// What a unit has to be multiplied by to give another.
-std::optional<double> ConversionFactor(const std::string& inFrom, const std::string& inTo) {
-  const CLocaleScope cLocale;
-  const UnitPointer from = ParseUnit(inFrom);
-  const UnitPointer to = ParseUnit(inTo);
-  const std::unique_ptr<cv_converter, decltype(&cv_free)> converter(
-      ut_get_converter(from.get(), to.get()), &cv_free);
-  if (!converter) return std::nullopt;
-  const double factor = cv_convert_double(converter.get(), 1);
-  // UDUNITS also converts reciprocals (Hz to s), plain numbers to angles and scales with another
-  // zero, none of which is a multiple.
-  const UnitPointer multiple(ut_scale(factor, to.get()), &ut_free);
-  if (!multiple || ut_compare(from.get(), multiple.get()) != 0) return std::nullopt;
-  return factor;
-}
-
 // Remembered, since a document says "mm" many times.
 std::optional<double> FactorOf(const std::string& inUnit, const std::string& inBase) {
   constexpr std::size_t kMaxRemembered = 256;
@@ -90,7 +52,7 @@ std::optional<double> FactorOf(const std::string& inUnit, const std::string& inB
   const auto known = factors->find({inUnit, inBase});
   if (known != factors->end()) return known->second;
   if (factors->size() == kMaxRemembered) factors->clear();
-  return (*factors)[{inUnit, inBase}] = ConversionFactor(inUnit, inBase);
+  return (*factors)[{inUnit, inBase}] = ZORDefault::ConversionFactor(inUnit, inBase);
 }
 
 // Text without the blanks at its ends; those that typesetting puts before units count too.
@@ -128,7 +90,7 @@ double Multiplied(double inNumber, double inFactor) {
 
 // Reads a decimal number followed by a unit, blanks allowed around both; the value in base units.
 std::optional<double> ReadQuantity(const ZORUnicodeString& inText, const std::string& inBase) {
-  if (!UnitSystem()) return std::nullopt;
+  if (!ZORDefault::AreUnitsKnown()) return std::nullopt;
   const ZORUnicodeString trimmed = WithoutBlanks(inText);
   std::string_view text = trimmed.ConvertToChar();
   const std::optional<double> number = TakeNumber(text);
@@ -202,6 +164,6 @@ const auto& Magnitudes() {
 
 ZORICkeMagnitude_var ZORParmDictionary::FindMagnitude(const ZORUnicodeString& inName) {
   const auto found = Magnitudes().find(inName.ConvertToChar());
-  if (found == Magnitudes().end() || UnitSystem() == nullptr) return ZORICkeMagnitude_var();
+  if (found == Magnitudes().end() || !ZORDefault::AreUnitsKnown()) return ZORICkeMagnitude_var();
   return found->second;
 }
