@@ -66,8 +66,7 @@ class Solver {
   }
 
  private:
-  // Costs are a metric, so that some best assignment holds all pairs that cost
-  // nothing.
+  // Costs are a metric, so that some best assignment holds all pairs that cost nothing.
   void AssignEqualPoints() {
     const std::vector<int>&rows = rowOrder_, &columns = columnOrder_;
     const auto key = [](const AssignmentPoint& inPoint) {
@@ -148,8 +147,7 @@ class Solver {
     std::ranges::sort(freeRows_);
   }
 
-  /// Of columns at one spot each row begins with another, so that they are
-  /// enough for all rows.
+  /// Of columns at one spot each row begins with another, so that they are enough for all rows.
   void AddEdges(int inRow, std::size_t inRank, NearestPoints::Found inFound, const Spots& inSpots) {
     const AssignmentPoint& row = rows_[static_cast<std::size_t>(inRow)];
     const std::size_t begin = edges_.size();

@@ -69,8 +69,9 @@ class Coverage {
   std::unordered_set<Pair, PairHash> pairs_;
 };
 
-/// See Comparability.
-class Checks {
+}  // namespace
+
+class Comparability::Checks {
  public:
   Checks(const ReviewedResult& inOld, const ReviewedResult& inNew, const DiffOptions& inOptions,
          const ResultMatch& inMatch)
@@ -228,20 +229,13 @@ class Checks {
   mutable std::optional<std::unordered_set<std::string>> newTypes_;
 };
 
-}  // namespace
-
-class Comparability::Reasons : public Checks {
- public:
-  using Checks::Checks;
-};
-
 Comparability::Comparability(const ReviewedResult& inOld, const ReviewedResult& inNew,
                              const DiffOptions& inOptions, const ResultMatch& inMatch)
-    : reasons_(std::make_unique<const Reasons>(inOld, inNew, inOptions, inMatch)) {}
+    : checks_(std::make_unique<const Checks>(inOld, inNew, inOptions, inMatch)) {}
 Comparability::~Comparability() = default;
 
 std::string Comparability::WhyNot(const ReviewRecord& inOld) const {
-  return reasons_->WhyNot(inOld);
+  return checks_->WhyNot(inOld);
 }
 
 }  // namespace ZORToolkit

@@ -20,8 +20,8 @@ class Comparability {
   std::string WhyNot(const ReviewRecord& inOld) const;
 
  private:
-  class Reasons;
-  std::unique_ptr<const Reasons> reasons_;
+  class Checks;
+  std::unique_ptr<const Checks> checks_;
 };
 
 }  // namespace ZORToolkit

@@ -12,7 +12,7 @@
 namespace ZORToolkit {
 namespace {
 
-constexpr std::uint32_t kReasonBits = 0x7FFF'FFFF;  // of Partner::reason
+constexpr std::uint32_t kReasonBits = ResultMatch::kReasonBits;
 constexpr double kOtherType = 1;      // what another type costs, in millimetres of distance
 constexpr double kValueWeight = 0.1;  // what a small difference of values costs, likewise
 

@@ -18,6 +18,7 @@ struct MatchOptions {
 
 /// What one result is in the other, by positions in ReviewedResult.
 struct ResultMatch {
+  static constexpr std::uint32_t kReasonBits = 0x7FFF'FFFF;  ///< of Partner::reason
   struct Partner {
     int position = -1;  ///< in the other result, -1 for none
     /// Its placement, or the placements and points of an interference, are written alike.
@@ -38,7 +39,7 @@ struct ResultMatch {
   /// @return its place.
   std::uint32_t Keep(std::string inReason) {
     reasons.push_back(std::move(inReason));
-    return (static_cast<std::uint32_t>(reasons.size()) - 1) & 0x7FFF'FFFF;
+    return (static_cast<std::uint32_t>(reasons.size()) - 1) & kReasonBits;
   }
 };
 

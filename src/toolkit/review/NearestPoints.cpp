@@ -42,10 +42,8 @@ NearestPoints::Found NearestPoints::Of(const AssignmentPoint& inPoint) {
   return nearest_;
 }
 
-/// Cells are twice the distance wide, so that what is near a point is in eight
-/// of them.
-/// @return whether few points share a cell, and all are where cells can be
-/// counted.
+/// Cells are twice the distance wide, so that what is near a point is in eight of them.
+/// @return whether few points share a cell, and all are where cells can be counted.
 bool NearestPoints::MakeGrid() {
   constexpr double kFarthestCell = 1e9;
   constexpr std::uint64_t kCrowd = 16;

@@ -9,10 +9,9 @@
 
 namespace ZORToolkit {
 
-/// Points that are asked which of them are near another one: by a grid where
-/// few are within the distance that is asked for, so that all are found in
-/// linear time, else by a balanced k-d tree over their order (J. L. Bentley,
-/// 1975).
+/// Points that are asked which of them are near another one: by a grid where few are within the
+/// distance that is asked for, so that all are found in linear time, else by a balanced k-d tree
+/// over their order (J. L. Bentley, 1975).
 class NearestPoints {
  public:
   typedef std::span<const std::pair<double, int>> Found;
@@ -22,9 +21,8 @@ class NearestPoints {
   NearestPoints(std::span<const AssignmentPoint> inPoints, double inMaxDistance,
                 std::size_t inMaxCount);
 
-  /// The nearest by all four coordinates, as pairs of squared distance and
-  /// point, the nearest first; of those at one distance the first. Valid until
-  /// the next call.
+  /// The nearest by all four coordinates, as pairs of squared distance and point, the nearest first;
+  /// of those at one distance the first. Valid until the next call.
   Found Of(const AssignmentPoint& inPoint);
 
  private:

@@ -48,9 +48,9 @@ class ProductMatcher {
   void Set(int inOld, int inNew, std::uint32_t inReason) {
     const bool isUnmoved = old_.WrittenPlacementOf(inOld) == new_.WrittenPlacementOf(inNew);
     match_.productsOfOld[static_cast<std::size_t>(inOld)] = {inNew, isUnmoved,
-                                                             inReason & 0x7FFF'FFFF};
+                                                             inReason & ResultMatch::kReasonBits};
     match_.productsOfNew[static_cast<std::size_t>(inNew)] = {inOld, isUnmoved,
-                                                             inReason & 0x7FFF'FFFF};
+                                                             inReason & ResultMatch::kReasonBits};
   }
 
   void ByKey() {
@@ -208,7 +208,8 @@ class ProductMatcher {
                              Partners& ioPartners) {
       for (std::size_t i = 0; i < ioPartners.size(); ++i)
         if (ioPartners[i].position < 0)
-          ioPartners[i].reason = match_.Keep(Quoted(inResult.products[i]) + inWhere) & 0x7FFF'FFFF;
+          ioPartners[i].reason =
+              match_.Keep(Quoted(inResult.products[i]) + inWhere) & ResultMatch::kReasonBits;
     };
     explain(old_, " is in the old result only", match_.productsOfOld);
     explain(new_, " is in the new result only", match_.productsOfNew);
